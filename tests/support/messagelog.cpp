@@ -1,0 +1,87 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "messagelog.h"
+
+#include <QMutex>
+#include <QMutexLocker>
+#include <QStringList>
+
+namespace {
+
+// A message handler is a plain function and messages come from any thread.
+QMutex mutex;
+QList<MessageLog::Message> messages;
+QtMessageHandler previousHandler = nullptr;
+
+void record(QtMsgType type, const QMessageLogContext &context, const QString &text)
+{
+    if (type == QtFatalMsg) {
+        previousHandler(type, context, text);
+        return;
+    }
+    const QMutexLocker locker(&mutex);
+    messages.append({type, QString::fromUtf8(context.category), text});
+}
+
+QString describe(const MessageLog::Message &message)
+{
+    static const char *const names[] = {"debug", "warning", "critical", "fatal", "info"};
+    return QStringLiteral("%1 [%2] %3")
+        .arg(QLatin1String(names[message.type]), message.category, message.text);
+}
+
+} // namespace
+
+MessageLog::MessageLog()
+{
+    messages.clear();
+    previousHandler = qInstallMessageHandler(record);
+}
+
+MessageLog::~MessageLog()
+{
+    qInstallMessageHandler(previousHandler);
+}
+
+QList<MessageLog::Message> MessageLog::takeAll()
+{
+    const QMutexLocker locker(&mutex);
+    QList<Message> taken;
+    taken.swap(messages);
+    return taken;
+}
+
+QStringList MessageLog::takeTexts()
+{
+    QStringList texts;
+    const auto taken = takeAll();
+    for (const Message &message : taken) {
+        texts.append(message.text);
+    }
+    return texts;
+}
+
+bool MessageLog::isEmpty() const
+{
+    const QMutexLocker locker(&mutex);
+    return messages.isEmpty();
+}
+
+namespace QTest {
+
+char *toString(const MessageLog::Message &message)
+{
+    return qstrdup(qUtf8Printable(describe(message)));
+}
+
+char *toString(const QList<MessageLog::Message> &list)
+{
+    QStringList lines;
+    for (const MessageLog::Message &message : list) {
+        lines.append(describe(message));
+    }
+    return qstrdup(qUtf8Printable(lines.join(QLatin1Char('\n'))));
+}
+
+} // namespace QTest

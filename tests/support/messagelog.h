@@ -1,0 +1,50 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#ifndef MESSAGELOG_H
+#define MESSAGELOG_H
+
+#include <QList>
+#include <QString>
+#include <QtGlobal>
+
+/*
+    Takes every message that is logged while it lives. A test asks for the messages that it expects,
+    in their order; whatever is left is unexpected and should fail it:
+
+        void init() { m_log = std::make_unique<MessageLog>(); }
+        void cleanup() { QCOMPARE(m_log->takeAll(), QList<MessageLog::Message>()); m_log.reset(); }
+
+    Debug messages below the threshold of their category never reach it, as anywhere.
+*/
+class MessageLog
+{
+public:
+    struct Message {
+        QtMsgType type;
+        QString category;
+        QString text;
+        bool operator==(const Message &other) const
+        {
+            return type == other.type && category == other.category && text == other.text;
+        }
+    };
+
+    MessageLog();
+    ~MessageLog();
+    Q_DISABLE_COPY_MOVE(MessageLog)
+
+    // All messages so far, the oldest first; they are forgotten.
+    QList<Message> takeAll();
+    // The texts of takeAll(), where type and category are of no interest.
+    QStringList takeTexts();
+    bool isEmpty() const;
+};
+
+// For the output of QCOMPARE.
+namespace QTest {
+char *toString(const MessageLog::Message &message);
+char *toString(const QList<MessageLog::Message> &messages);
+}
+
+#endif

@@ -24,13 +24,6 @@ void record(QtMsgType type, const QMessageLogContext &context, const QString &te
     messages.append({type, QString::fromUtf8(context.category), text});
 }
 
-QString describe(const MessageLog::Message &message)
-{
-    static const char *const names[] = {"debug", "warning", "critical", "fatal", "info"};
-    return QStringLiteral("%1 [%2] %3")
-        .arg(QLatin1String(names[message.type]), message.category, message.text);
-}
-
 } // namespace
 
 MessageLog::MessageLog()
@@ -62,26 +55,14 @@ QStringList MessageLog::takeTexts()
     return texts;
 }
 
-bool MessageLog::isEmpty() const
+QString MessageLog::takeReport()
 {
-    const QMutexLocker locker(&mutex);
-    return messages.isEmpty();
-}
-
-namespace QTest {
-
-char *toString(const MessageLog::Message &message)
-{
-    return qstrdup(qUtf8Printable(describe(message)));
-}
-
-char *toString(const QList<MessageLog::Message> &list)
-{
+    static const char *const types[] = {"debug", "warning", "critical", "fatal", "info"};
     QStringList lines;
-    for (const MessageLog::Message &message : list) {
-        lines.append(describe(message));
+    const auto taken = takeAll();
+    for (const Message &message : taken) {
+        lines.append(QStringLiteral("%1 [%2] %3")
+                         .arg(QLatin1String(types[message.type]), message.category, message.text));
     }
-    return qstrdup(qUtf8Printable(lines.join(QLatin1Char('\n'))));
+    return lines.join(QLatin1Char('\n'));
 }
-
-} // namespace QTest

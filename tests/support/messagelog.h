@@ -6,6 +6,7 @@
 
 #include <QList>
 #include <QString>
+#include <QStringList>
 #include <QtGlobal>
 
 /*
@@ -13,7 +14,7 @@
     in their order; whatever is left is unexpected and should fail it:
 
         void init() { m_log = std::make_unique<MessageLog>(); }
-        void cleanup() { QCOMPARE(m_log->takeAll(), QList<MessageLog::Message>()); m_log.reset(); }
+        void cleanup() { QCOMPARE(m_log->takeReport(), QString()); m_log.reset(); }
 
     Debug messages below the threshold of their category never reach it, as anywhere.
 */
@@ -38,13 +39,8 @@ public:
     QList<Message> takeAll();
     // The texts of takeAll(), where type and category are of no interest.
     QStringList takeTexts();
-    bool isEmpty() const;
+    // takeAll() as a text of a line each.
+    QString takeReport();
 };
-
-// For the output of QCOMPARE.
-namespace QTest {
-char *toString(const MessageLog::Message &message);
-char *toString(const QList<MessageLog::Message> &messages);
-}
 
 #endif

@@ -1,0 +1,189 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "quickaction.h"
+
+#include <QDBusConnection>
+#include <QDBusError>
+#include <QDBusMessage>
+#include <QDBusMetaType>
+#include <QFileInfo>
+#include <QQmlInfo>
+#include <QSettings>
+
+#include <cstring>
+
+namespace {
+
+constexpr QLatin1String titleKey("title");
+constexpr QLatin1String translationCatalogKey("translation-catalog");
+constexpr QLatin1String iconKey("icon");
+constexpr QLatin1String priorityKey("priority");
+constexpr QLatin1String requiresPackageKey("requires-package");
+constexpr QLatin1String serviceKey("remote-service");
+constexpr QLatin1String pathKey("remote-path");
+constexpr QLatin1String interfaceKey("remote-interface");
+constexpr QLatin1String methodKey("remote-method");
+constexpr QLatin1String argumentsKey("remote-arguments");
+constexpr QLatin1String argumentKey("argument");
+
+// The longest signature that D-Bus knows, and so more arguments than any call can have.
+constexpr size_t maximumSignature = 255;
+constexpr int enoughArguments = 256;
+
+// Opening a pipe waits for somebody to write to it: only files are opened. Whatever else is there
+// cannot be read, and what is not there any more reads as a file without keys.
+bool isReadable(const QString &path)
+{
+    const QFileInfo entry(path);
+    return entry.isFile() || !entry.exists();
+}
+
+// What keeps a call from being sent. QtDBus would not notice: it sends a call without a service to
+// the bus itself, and crashes on a signature that is too long.
+QDBusError whyUnsendable(const QuickActionsModel::Action &action)
+{
+    if (action.service().isEmpty()) {
+        return {QDBusError::InvalidService, QStringLiteral("The call names no service")};
+    }
+    if (action.method().isEmpty()) {
+        return {QDBusError::InvalidMember, QStringLiteral("The call names no method")};
+    }
+    size_t signature = 0;
+    const QVariantList arguments = action.arguments();
+    for (const QVariant &argument : arguments) {
+        const char *type = QDBusMetaType::typeToSignature(argument.userType());
+        if (type == nullptr) {
+            return {QDBusError::InvalidArgs, QStringLiteral("An argument has no D-Bus type")};
+        }
+        signature += std::strlen(type);
+    }
+    if (signature > maximumSignature) {
+        return {QDBusError::InvalidArgs, QStringLiteral("The call has too many arguments")};
+    }
+    return {};
+}
+
+} // namespace
+
+QuickActionsModel::Action::Action(const QString &path, bool enabled)
+    : m_path(path), m_config(readActionConfig(path)), m_enabled(enabled)
+{
+    // Read as text: as a variant, a number that is too large for an integer would wrap around.
+    bool isInteger = false;
+    const int priority = text(priorityKey).toInt(&isInteger);
+    if (isInteger) {
+        m_priority = priority;
+    }
+}
+
+QString QuickActionsModel::Action::title() const
+{
+    return text(titleKey);
+}
+
+QVariant QuickActionsModel::Action::icon() const
+{
+    return m_config.value(iconKey);
+}
+
+QString QuickActionsModel::Action::translationCatalog() const
+{
+    return text(translationCatalogKey);
+}
+
+QString QuickActionsModel::Action::requiredPackage() const
+{
+    return text(requiresPackageKey);
+}
+
+QString QuickActionsModel::Action::service() const
+{
+    return text(serviceKey);
+}
+
+QString QuickActionsModel::Action::objectPath() const
+{
+    return text(pathKey);
+}
+
+QString QuickActionsModel::Action::interface() const
+{
+    return text(interfaceKey);
+}
+
+QString QuickActionsModel::Action::method() const
+{
+    return text(methodKey);
+}
+
+QVariantList QuickActionsModel::Action::arguments() const
+{
+    return m_config.value(argumentsKey).toList();
+}
+
+bool QuickActionsModel::Action::trigger(QObject *receiver, const char *returnMethod,
+                                        const char *errorMethod) const
+{
+    QDBusConnection bus = QDBusConnection::sessionBus();
+    QDBusError error = whyUnsendable(*this);
+    if (!error.isValid()) {
+        QDBusMessage call =
+            QDBusMessage::createMethodCall(service(), objectPath(), interface(), method());
+        call.setArguments(arguments());
+        if (bus.callWithCallback(call, receiver, returnMethod, errorMethod)) {
+            return true;
+        }
+        error = bus.lastError();
+    }
+
+    // Error name and message fill one place and the last one stays open: log readers know the line
+    // in just this form.
+    const QString text = QStringLiteral("Failed to initialize dbus call to: service=%1 path=%2 "
+                                        "interface=%3 method=%4. Error was: %5 %6")
+                             .arg(service(), objectPath(), interface(), method(),
+                                  error.name() + QLatin1Char(' ') + error.message());
+    qmlInfo(receiver).noquote() << text;
+    return false;
+}
+
+bool QuickActionsModel::Action::operator==(const Action &other) const
+{
+    return m_path == other.m_path && m_config == other.m_config && m_enabled == other.m_enabled;
+}
+
+QVariantMap QuickActionsModel::Action::readActionConfig(const QString &path) const
+{
+    if (!isReadable(path)) {
+        qWarning("Unable to open action file");
+        return {};
+    }
+    QSettings settings(path, QSettings::IniFormat);
+    if (settings.status() != QSettings::NoError) {
+        qWarning("Unable to open action file");
+        return {};
+    }
+
+    QVariantMap config;
+    const QStringList keys = settings.childKeys();
+    for (const QString &key : keys) {
+        config.insert(key, settings.value(key));
+    }
+    // An array without elements is an entry too; no other group is of interest.
+    if (settings.childGroups().contains(argumentsKey)) {
+        QVariantList arguments;
+        const int size = qMin(settings.beginReadArray(argumentsKey), enoughArguments);
+        for (int i = 0; i < size; ++i) {
+            settings.setArrayIndex(i);
+            arguments.append(settings.value(argumentKey));
+        }
+        settings.endArray();
+        config.insert(argumentsKey, arguments);
+    }
+    return config;
+}
+
+QString QuickActionsModel::Action::text(QLatin1String key) const
+{
+    return m_config.value(key).toString();
+}

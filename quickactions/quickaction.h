@@ -1,0 +1,63 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#ifndef QUICKACTION_H
+#define QUICKACTION_H
+
+#include "quickactionsmodel.h"
+
+#include <QVariantMap>
+
+#include <optional>
+
+/*
+    A quick action as its definition file describes it: a value that is read once and needs no
+   model. The path of the file is the action's identity.
+*/
+class QuickActionsModel::Action
+{
+public:
+    Action(const QString &path, bool enabled);
+
+    QString path() const { return m_path; }
+    // Whether the user has enabled the action.
+    bool enabled() const { return m_enabled; }
+
+    // The keys of the file, with their values as QSettings gives them: a value with a comma is a
+    // list, and a list of several texts reads as no text. Whatever the file lacks is empty.
+    QVariantMap config() const { return m_config; }
+    QString title() const;
+    QVariant icon() const;
+    QString translationCatalog() const;
+    QString requiredPackage() const;
+    // The place among the actions that the user has not ordered.
+    std::optional<int> priority() const { return m_priority; }
+
+    // The D-Bus call.
+    QString service() const;
+    QString objectPath() const;
+    QString interface() const;
+    QString method() const;
+    QVariantList arguments() const;
+
+    // Sends the call on the session bus and returns at once. The receiver's slots get the reply, or
+    // the error together with the message that was sent; either may be null. A call that cannot be
+    // sent is reported on the receiver's QML warning channel; the result tells.
+    bool trigger(QObject *receiver, const char *returnMethod, const char *errorMethod) const;
+
+    bool operator==(const Action &other) const;
+    bool operator!=(const Action &other) const { return !(*this == other); }
+
+    // An empty map if the file cannot be read.
+    QVariantMap readActionConfig(const QString &path) const;
+
+private:
+    QString text(QLatin1String key) const;
+
+    QString m_path;
+    QVariantMap m_config;
+    bool m_enabled;
+    std::optional<int> m_priority;
+};
+
+#endif

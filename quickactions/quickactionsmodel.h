@@ -1,0 +1,104 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#ifndef QUICKACTIONSMODEL_H
+#define QUICKACTIONSMODEL_H
+
+#include "catalogtable.h"
+#include "directorywatcher.h"
+#include "mgconfitem.h"
+
+#include <QAbstractListModel>
+#include <QDir>
+#include <QQmlParserStatus>
+#include <QTimer>
+
+#include <memory>
+#include <vector>
+
+class QDBusError;
+class QDBusMessage;
+
+/*
+    The quick actions that packages offer and the user has enabled, for the events screen; with
+    showPotential every action that is offered, for the page on which the user chooses.
+
+    Reads the definition files in /usr/share/glimmera/quickactions and follows that directory and
+    the user's lists in dconf.
+*/
+class QuickActionsModel : public QAbstractListModel, public QQmlParserStatus
+{
+    Q_OBJECT
+    Q_INTERFACES(QQmlParserStatus)
+    Q_PROPERTY(
+        bool showPotential READ showPotential WRITE setShowPotential NOTIFY showPotentialChanged)
+    Q_PROPERTY(int count READ count NOTIFY countChanged)
+
+public:
+    class Action;
+
+    // The numbers coincide with those of Qt's display, decoration, edit and tool tip roles: views
+    // that know nothing of this model show the title and the icon.
+    enum Role { TitleRole, IconRole, PathRole, EnabledRole };
+
+    explicit QuickActionsModel(QObject *parent = nullptr);
+    ~QuickActionsModel() override;
+
+    bool showPotential() const;
+    void setShowPotential(bool showPotential);
+    int count() const;
+
+    int rowCount(const QModelIndex &parent = QModelIndex()) const override;
+    QVariant data(const QModelIndex &index, int role) const override;
+    QHash<int, QByteArray> roleNames() const override;
+
+    Q_INVOKABLE QVariantMap get(int index) const;
+    Q_INVOKABLE void triggerAction(int index);
+
+    void classBegin() override;
+    void componentComplete() override;
+
+public Q_SLOTS:
+    void enableAction(const QString &path);
+    void disableAction(const QString &path);
+    void move(int index, int newIndex);
+
+Q_SIGNALS:
+    void showPotentialChanged();
+    void countChanged();
+
+private Q_SLOTS:
+    void loadActions();
+    void updateEnabledActions();
+    void directoryChanged();
+    void triggerActionError(const QDBusError &error, const QDBusMessage &msg);
+    void showStorePackage(const QString &packageName);
+
+private:
+    bool hasRow(int index) const;
+    void removeRowsExcept(const QSet<QString> &paths);
+    void addAction(int row, const Action &action);
+    void updateAction(int row, const Action &action);
+    int insertionIndexByPriority(const Action &action) const;
+    void addTranslatorForAction(const Action &action);
+    void removeTranslatorForAction(const Action &action);
+    void writeEnabledList(const QStringList &list);
+
+    CatalogTable m_catalogs;
+    std::vector<std::unique_ptr<Action>> m_rows;
+    const QDir m_directory;
+    DirectoryWatcher m_watcher;
+    QTimer m_reloadTimer;
+    MGConfItem m_enabledItem;
+    MGConfItem m_blockedItem;
+    QStringList m_enabledList;
+    QStringList m_blockedList;
+    bool m_showPotential = false;
+    bool m_complete = false;
+    // While move() writes the enabled list: the change that dconf reports is the model's own.
+    bool m_moving = false;
+    // While rows are announced and changed: whoever follows the model may call back into it.
+    bool m_changing = false;
+};
+
+#endif

@@ -1,0 +1,46 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#ifndef RECORDINGSERVICE_H
+#define RECORDINGSERVICE_H
+
+#include <QDBusConnection>
+#include <QDBusMessage>
+#include <QDBusVirtualObject>
+
+/*
+    A D-Bus peer that owns a service name on a connection of its own and keeps every method call to
+    any of its objects.
+*/
+class RecordingService : public QDBusVirtualObject
+{
+    Q_OBJECT
+
+public:
+    enum class Answer { Reply, Error, Nothing };
+
+    // Ends the test program if the name is not to be had.
+    RecordingService(QDBusConnection::BusType bus, const QString &service);
+    ~RecordingService() override;
+    Q_DISABLE_COPY_MOVE(RecordingService)
+
+    // What calls are answered with; an error has the given name.
+    void setAnswer(Answer answer, const QString &errorName = QString());
+    QList<QDBusMessage> calls() const { return m_calls; }
+    QDBusConnection connection() const { return m_connection; }
+
+    QString introspect(const QString &path) const override;
+    bool handleMessage(const QDBusMessage &message, const QDBusConnection &connection) override;
+
+Q_SIGNALS:
+    void called(const QDBusMessage &message);
+
+private:
+    QDBusConnection m_connection;
+    QString m_service;
+    Answer m_answer = Answer::Reply;
+    QString m_errorName;
+    QList<QDBusMessage> m_calls;
+};
+
+#endif

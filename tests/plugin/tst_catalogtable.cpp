@@ -1,0 +1,234 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "catalogtable.h"
+#include "files.h"
+#include "messagelog.h"
+
+#include <QScopedValueRollback>
+#include <QtTest>
+
+#include <functional>
+
+class TestCatalogTable : public QObject
+{
+    Q_OBJECT
+
+private Q_SLOTS:
+    void init();
+    void cleanup();
+
+    void languageWinsOverEngineeringEnglish();
+    void sharesOneCatalogAmongItsUsers();
+    void oneRemovalTakesOutEveryUse();
+    void emptyNameIsNoCatalog();
+    void installsCatalogsThatDoNotExist();
+    void laterCatalogsWin();
+    void keepsItsLanguage();
+    void freshTranslatorAfterRemoval();
+    void removingTheUnknownIsHarmless();
+    void leavesTheApplicationWithItsOwner();
+    void mayBeCalledBackByLanguageChanges();
+    void tablesShareNothing();
+
+private:
+    QList<QTranslator *> translators() const { return m_owner->findChildren<QTranslator *>(); }
+
+    std::unique_ptr<MessageLog> m_log;
+    std::unique_ptr<QObject> m_owner;
+    std::unique_ptr<CatalogTable> m_table;
+};
+
+namespace {
+
+const QString maps = QStringLiteral("maps");
+const QString a = QStringLiteral("/definitions/a");
+const QString b = QStringLiteral("/definitions/b");
+
+QString title()
+{
+    return qtTrId("maps-title");
+}
+
+QString englishOnly()
+{
+    return qtTrId("maps-english");
+}
+
+} // namespace
+
+void TestCatalogTable::init()
+{
+    for (const auto *name : {"maps_eng_en", "maps-fi", "maps-de", "atlas_eng_en"}) {
+        Files::installCatalog(QString::fromLatin1(name));
+    }
+    QLocale::setDefault(QLocale(QStringLiteral("fi_FI")));
+    m_log = std::make_unique<MessageLog>();
+    m_owner = std::make_unique<QObject>();
+    m_table = std::make_unique<CatalogTable>(m_owner.get());
+}
+
+void TestCatalogTable::cleanup()
+{
+    m_table.reset();
+    m_owner.reset();
+    QCOMPARE(title(), QStringLiteral("maps-title"));
+    QCOMPARE(m_log->takeReport(), QString());
+    m_log.reset();
+}
+
+void TestCatalogTable::languageWinsOverEngineeringEnglish()
+{
+    m_table->addDefinition(a, maps);
+    QCOMPARE(title(), QStringLiteral("Kartat"));
+    QCOMPARE(englishOnly(), QStringLiteral("Maps, English only"));
+}
+
+void TestCatalogTable::sharesOneCatalogAmongItsUsers()
+{
+    m_table->addDefinition(a, maps);
+    m_table->addDefinition(b, maps);
+    QCOMPARE(translators().size(), 2);
+
+    m_table->removeDefinition(a, maps);
+    QCOMPARE(title(), QStringLiteral("Kartat"));
+    QCOMPARE(englishOnly(), QStringLiteral("Maps, English only"));
+
+    m_table->removeDefinition(b, maps);
+    QCOMPARE(title(), QStringLiteral("maps-title"));
+    QCOMPARE(englishOnly(), QStringLiteral("maps-english"));
+}
+
+void TestCatalogTable::oneRemovalTakesOutEveryUse()
+{
+    m_table->addDefinition(a, maps);
+    m_table->addDefinition(a, maps);
+    m_table->removeDefinition(a, maps);
+    QCOMPARE(title(), QStringLiteral("maps-title"));
+    QCOMPARE(englishOnly(), QStringLiteral("maps-english"));
+}
+
+void TestCatalogTable::emptyNameIsNoCatalog()
+{
+    m_table->addDefinition(a, QString());
+    QCOMPARE(translators().size(), 0);
+    m_table->removeDefinition(a, QString());
+}
+
+void TestCatalogTable::installsCatalogsThatDoNotExist()
+{
+    m_table->addDefinition(a, QStringLiteral("nowhere"));
+    QCOMPARE(translators().size(), 2);
+    QVERIFY(translators().at(0)->isEmpty());
+    QVERIFY(translators().at(1)->isEmpty());
+    QCOMPARE(title(), QStringLiteral("maps-title"));
+
+    // Installed and counted all the same: loaded by hand, they answer.
+    QVERIFY(translators().at(1)->load(QStringLiteral("maps-fi"),
+                                      QStringLiteral("/usr/share/translations")));
+    QCOMPARE(title(), QStringLiteral("Kartat"));
+    m_table->removeDefinition(a, QStringLiteral("nowhere"));
+    QCOMPARE(title(), QStringLiteral("maps-title"));
+}
+
+void TestCatalogTable::laterCatalogsWin()
+{
+    m_table->addDefinition(a, maps);
+    m_table->addDefinition(b, QStringLiteral("atlas"));
+    QCOMPARE(title(), QStringLiteral("Atlas"));
+    m_table->removeDefinition(b, QStringLiteral("atlas"));
+    QCOMPARE(title(), QStringLiteral("Kartat"));
+}
+
+void TestCatalogTable::keepsItsLanguage()
+{
+    m_table->addDefinition(a, maps);
+    QLocale::setDefault(QLocale(QStringLiteral("de_DE")));
+    m_table->addDefinition(b, maps);
+    QCOMPARE(title(), QStringLiteral("Kartat"));
+}
+
+void TestCatalogTable::freshTranslatorAfterRemoval()
+{
+    m_table->addDefinition(a, maps);
+    m_table->removeDefinition(a, maps);
+    // Whoever is in the middle of asking a translator may go on.
+    QCOMPARE(translators().size(), 2);
+
+    QLocale::setDefault(QLocale(QStringLiteral("de_DE")));
+    m_table->addDefinition(a, maps);
+    QCOMPARE(translators().size(), 4);
+    QCOMPARE(title(), QStringLiteral("Karten"));
+}
+
+void TestCatalogTable::removingTheUnknownIsHarmless()
+{
+    m_table->removeDefinition(a, maps);
+    m_table->addDefinition(a, maps);
+    m_table->removeDefinition(b, maps);
+    m_table->removeDefinition(a, QStringLiteral("atlas"));
+    QCOMPARE(title(), QStringLiteral("Kartat"));
+}
+
+void TestCatalogTable::leavesTheApplicationWithItsOwner()
+{
+    m_table->addDefinition(a, maps);
+    m_table.reset();
+    QCOMPARE(title(), QStringLiteral("maps-title"));
+    QCOMPARE(translators().size(), 2);
+}
+
+void TestCatalogTable::mayBeCalledBackByLanguageChanges()
+{
+    // Installing and removing a catalog that has texts announces a language change at once.
+    class Listener : public QObject
+    {
+    public:
+        explicit Listener(std::function<void()> answer) : m_answer(std::move(answer)) { }
+        bool eventFilter(QObject *watched, QEvent *event) override
+        {
+            // The answer changes the language itself.
+            if (event->type() == QEvent::LanguageChange && !m_answering) {
+                const QScopedValueRollback<bool> answering(m_answering, true);
+                ++count;
+                m_answer();
+            }
+            return QObject::eventFilter(watched, event);
+        }
+        int count = 0;
+
+    private:
+        std::function<void()> m_answer;
+        bool m_answering = false;
+    };
+
+    Listener listener([this] {
+        m_table->addDefinition(b, QStringLiteral("nowhere"));
+        m_table->removeDefinition(b, QStringLiteral("nowhere"));
+        m_table->addDefinition(b, maps);
+    });
+    QCoreApplication::instance()->installEventFilter(&listener);
+    m_table->addDefinition(a, maps);
+    QCOMPARE(listener.count, 1);
+    m_table->removeDefinition(a, maps);
+    QCOMPARE(title(), QStringLiteral("Kartat"));
+    m_table->clear();
+    QCoreApplication::instance()->removeEventFilter(&listener);
+}
+
+void TestCatalogTable::tablesShareNothing()
+{
+    QObject otherOwner;
+    CatalogTable other(&otherOwner);
+    other.addDefinition(a, maps);
+    m_table->addDefinition(a, maps);
+    QCOMPARE(otherOwner.findChildren<QTranslator *>().size(), 2);
+    QCOMPARE(translators().size(), 2);
+
+    m_table->removeDefinition(a, maps);
+    QCOMPARE(title(), QStringLiteral("Kartat"));
+}
+
+QTEST_GUILESS_MAIN(TestCatalogTable)
+
+#include "tst_catalogtable.moc"

@@ -1,0 +1,153 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "directorywatcher.h"
+#include "files.h"
+#include "messagelog.h"
+
+#include <QTemporaryDir>
+#include <QtTest>
+
+class TestDirectoryWatcher : public QObject
+{
+    Q_OBJECT
+
+private Q_SLOTS:
+    void init();
+    void cleanup();
+
+    void reportsEntries();
+    void reportsDirectoryMadeLater();
+    void reportsDirectoryMadeAndFilledAtOnce();
+    void reportsDirectoryMadeAgain();
+    void reportsDirectoryReplacedAtOnce();
+    void reportsDirectoryRenamedAway();
+    void ignoresItsParents();
+
+private:
+    QString path(const char *name) const { return m_root->filePath(QString::fromLatin1(name)); }
+
+    std::unique_ptr<MessageLog> m_log;
+    std::unique_ptr<QTemporaryDir> m_root;
+    QString m_directory;
+};
+
+void TestDirectoryWatcher::init()
+{
+    m_log = std::make_unique<MessageLog>();
+    m_root = std::make_unique<QTemporaryDir>();
+    m_directory = path("a/b/c");
+}
+
+void TestDirectoryWatcher::cleanup()
+{
+    m_root.reset();
+    QCOMPARE(m_log->takeReport(), QString());
+    m_log.reset();
+}
+
+void TestDirectoryWatcher::reportsEntries()
+{
+    Files::makeFolder(m_directory);
+    const DirectoryWatcher watcher(m_directory);
+    QSignalSpy spy(&watcher, &DirectoryWatcher::directoryChanged);
+    Files::write(m_directory + QStringLiteral("/file"), "x");
+    QVERIFY(spy.wait());
+    QCOMPARE(spy.first(), QVariantList{m_directory});
+
+    spy.clear();
+    Files::remove(m_directory + QStringLiteral("/file"));
+    QVERIFY(spy.wait());
+}
+
+void TestDirectoryWatcher::reportsDirectoryMadeLater()
+{
+    const DirectoryWatcher watcher(m_directory);
+    QSignalSpy spy(&watcher, &DirectoryWatcher::directoryChanged);
+    // One level at a time, each seen before the next is made, and all at once below.
+    Files::makeFolder(path("a"));
+    QVERIFY(!spy.wait(100));
+    Files::makeFolder(path("a/b"));
+    QVERIFY(!spy.wait(100));
+    Files::makeFolder(m_directory);
+    QVERIFY(spy.wait());
+
+    spy.clear();
+    Files::write(m_directory + QStringLiteral("/file"), "x");
+    QVERIFY(spy.wait());
+}
+
+void TestDirectoryWatcher::reportsDirectoryMadeAndFilledAtOnce()
+{
+    const DirectoryWatcher watcher(m_directory);
+    QSignalSpy spy(&watcher, &DirectoryWatcher::directoryChanged);
+    Files::write(m_directory + QStringLiteral("/file"), "x");
+    QVERIFY(spy.wait());
+
+    spy.clear();
+    Files::write(m_directory + QStringLiteral("/another"), "x");
+    QVERIFY(spy.wait());
+}
+
+void TestDirectoryWatcher::reportsDirectoryMadeAgain()
+{
+    Files::makeFolder(m_directory);
+    const DirectoryWatcher watcher(m_directory);
+    QSignalSpy spy(&watcher, &DirectoryWatcher::directoryChanged);
+    Files::remove(path("a"));
+    QVERIFY(spy.wait());
+
+    spy.clear();
+    Files::makeFolder(m_directory);
+    QVERIFY(spy.wait());
+
+    spy.clear();
+    Files::write(m_directory + QStringLiteral("/file"), "x");
+    QVERIFY(spy.wait());
+}
+
+void TestDirectoryWatcher::reportsDirectoryReplacedAtOnce()
+{
+    Files::makeFolder(m_directory);
+    const DirectoryWatcher watcher(m_directory);
+    QSignalSpy spy(&watcher, &DirectoryWatcher::directoryChanged);
+    // Nobody sees the moment without the directory.
+    Files::remove(m_directory);
+    Files::makeFolder(m_directory);
+    QVERIFY(spy.wait());
+
+    spy.clear();
+    Files::write(m_directory + QStringLiteral("/file"), "x");
+    QVERIFY(spy.wait());
+}
+
+void TestDirectoryWatcher::reportsDirectoryRenamedAway()
+{
+    Files::makeFolder(m_directory);
+    const DirectoryWatcher watcher(m_directory);
+    QSignalSpy spy(&watcher, &DirectoryWatcher::directoryChanged);
+    QVERIFY(QDir().rename(m_directory, path("a/b/elsewhere")));
+    QVERIFY(spy.wait());
+
+    spy.clear();
+    Files::write(path("a/b/elsewhere/file"), "x");
+    QVERIFY(!spy.wait(100));
+    Files::makeFolder(m_directory);
+    QVERIFY(spy.wait());
+}
+
+void TestDirectoryWatcher::ignoresItsParents()
+{
+    Files::makeFolder(m_directory);
+    const DirectoryWatcher present(m_directory);
+    const DirectoryWatcher missing(path("a/b/missing"));
+    QSignalSpy presentSpy(&present, &DirectoryWatcher::directoryChanged);
+    QSignalSpy missingSpy(&missing, &DirectoryWatcher::directoryChanged);
+    Files::write(path("a/b/file"), "x");
+    QVERIFY(!missingSpy.wait(200));
+    QCOMPARE(presentSpy.size(), 0);
+}
+
+QTEST_GUILESS_MAIN(TestDirectoryWatcher)
+
+#include "tst_directorywatcher.moc"

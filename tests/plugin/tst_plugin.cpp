@@ -1,0 +1,231 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+// The module as a QML engine meets it, loaded from the build tree.
+
+#include "files.h"
+#include "messagelog.h"
+
+#include <QJsonObject>
+#include <QPluginLoader>
+#include <QQmlComponent>
+#include <QQmlEngine>
+#include <QQmlExtensionInterface>
+#include <QQmlExtensionPlugin>
+#include <QtTest>
+
+class TestPlugin : public QObject
+{
+    Q_OBJECT
+
+private Q_SLOTS:
+    void init();
+    void cleanup();
+
+    void metaData();
+    void oneInstance();
+    void typesAreCreatable_data();
+    void typesAreCreatable();
+    void otherVersionsAreNotThere();
+    void languageWinsOverEngineeringEnglish();
+    void englishAnswersWithoutACatalog();
+    void followsLanguageChanges();
+    void filtersNoEvent();
+    void translatorsGoWithTheirEngine();
+
+private:
+    static QString libraryPath();
+    // Has the engine evaluate a small document that imports the module.
+    static std::unique_ptr<QObject> create(QQmlEngine *engine, const QByteArray &object,
+                                           const QByteArray &version = "1.0");
+
+    std::unique_ptr<MessageLog> m_log;
+};
+
+namespace {
+
+QString both()
+{
+    return qtTrId("settings-test-both");
+}
+
+QString englishOnly()
+{
+    return qtTrId("settings-test-english");
+}
+
+} // namespace
+
+QString TestPlugin::libraryPath()
+{
+    return QStringLiteral(QML_BUILD_DIR
+                          "/com/marlo/settings/system/libmarlosystemsettingsplugin.so");
+}
+
+std::unique_ptr<QObject> TestPlugin::create(QQmlEngine *engine, const QByteArray &object,
+                                            const QByteArray &version)
+{
+    engine->addImportPath(QStringLiteral(QML_BUILD_DIR));
+    QQmlComponent component(engine);
+    component.setData("import QtQml 2.15\nimport com.marlo.settings.system " + version + "\n"
+                          + object,
+                      QUrl(QStringLiteral("test.qml")));
+    std::unique_ptr<QObject> created(component.create());
+    if (created == nullptr) {
+        qWarning("%s", qPrintable(component.errorString()));
+    }
+    return created;
+}
+
+void TestPlugin::init()
+{
+    for (const auto *name :
+         {"settings-system_eng_en", "settings-system-fi", "settings-system-de"}) {
+        Files::installCatalog(QString::fromLatin1(name));
+    }
+    QLocale::setDefault(QLocale(QStringLiteral("fi_FI")));
+    m_log = std::make_unique<MessageLog>();
+}
+
+void TestPlugin::cleanup()
+{
+    QCOMPARE(m_log->takeReport(), QString());
+    m_log.reset();
+}
+
+void TestPlugin::metaData()
+{
+    const QPluginLoader loader(libraryPath());
+    const QJsonObject metaData = loader.metaData();
+    QCOMPARE(metaData.value(QStringLiteral("IID")).toString(),
+             QStringLiteral("com.marlo.settings.system"));
+    QCOMPARE(metaData.value(QStringLiteral("className")).toString(),
+             QStringLiteral("SystemSettingsPlugin"));
+    QCOMPARE(metaData.value(QStringLiteral("MetaData")).toObject(), QJsonObject());
+}
+
+void TestPlugin::oneInstance()
+{
+    QPluginLoader loader(libraryPath());
+    QPointer<QObject> instance = loader.instance();
+    QVERIFY2(instance != nullptr, qPrintable(loader.errorString()));
+    QCOMPARE(instance->metaObject()->className(), "SystemSettingsPlugin");
+    QVERIFY(qobject_cast<QQmlExtensionInterface *>(instance) != nullptr);
+    QVERIFY(instance->parent() == nullptr);
+    QCOMPARE(loader.instance(), instance.data());
+    // Nothing of its own for QML or slots to reach.
+    QCOMPARE(instance->metaObject()->propertyCount(),
+             QQmlExtensionPlugin::staticMetaObject.propertyCount());
+    QCOMPARE(instance->metaObject()->methodCount(),
+             QQmlExtensionPlugin::staticMetaObject.methodCount());
+
+    delete instance.data();
+    QVERIFY(instance == nullptr);
+    QVERIFY(loader.instance() != nullptr);
+}
+
+void TestPlugin::typesAreCreatable_data()
+{
+    QTest::addColumn<QByteArray>("className");
+    QTest::newRow("QuickActionsModel") << QByteArray("QuickActionsModel");
+}
+
+void TestPlugin::typesAreCreatable()
+{
+    QFETCH(QByteArray, className);
+    QQmlEngine engine;
+    const auto object = create(&engine, QByteArray(QTest::currentDataTag()) + " {}");
+    QVERIFY(object != nullptr);
+    QCOMPARE(object->metaObject()->className(), className.constData());
+}
+
+void TestPlugin::otherVersionsAreNotThere()
+{
+    for (const QByteArray version : {"0.9", "1.1", "2.0"}) {
+        QQmlEngine engine;
+        QVERIFY(create(&engine, "QtObject {}", version) == nullptr);
+        const QString errors = m_log->takeReport();
+        QVERIFY2(errors.contains(QStringLiteral("is not installed")), qPrintable(errors));
+    }
+}
+
+void TestPlugin::languageWinsOverEngineeringEnglish()
+{
+    QQmlEngine engine;
+    const auto object = create(&engine,
+                               "QtObject { property string both: qsTrId('settings-test-both')\n"
+                               "property string english: qsTrId('settings-test-english') }");
+    QVERIFY(object != nullptr);
+    QCOMPARE(object->property("both").toString(), QStringLiteral("Molemmat"));
+    QCOMPARE(object->property("english").toString(), QStringLiteral("English only"));
+}
+
+void TestPlugin::englishAnswersWithoutACatalog()
+{
+    QLocale::setDefault(QLocale(QStringLiteral("sv_SE")));
+    QQmlEngine engine;
+    QVERIFY(create(&engine, "QtObject {}") != nullptr);
+    QCOMPARE(both(), QStringLiteral("Both, engineering English"));
+}
+
+void TestPlugin::followsLanguageChanges()
+{
+    QQmlEngine engine;
+    const auto object =
+        create(&engine, "QtObject { property string both: qsTrId('settings-test-both') }");
+    QVERIFY(object != nullptr);
+
+    QLocale::setDefault(QLocale(QStringLiteral("de_DE")));
+    QEvent change(QEvent::LanguageChange);
+    QCoreApplication::sendEvent(&engine, &change);
+    engine.retranslate();
+    QCOMPARE(object->property("both").toString(), QStringLiteral("Beide"));
+    QCOMPARE(englishOnly(), QStringLiteral("English only"));
+
+    QLocale::setDefault(QLocale(QStringLiteral("sv_SE")));
+    QCoreApplication::sendEvent(&engine, &change);
+    QCOMPARE(both(), QStringLiteral("Both, engineering English"));
+}
+
+void TestPlugin::filtersNoEvent()
+{
+    class Engine : public QQmlEngine
+    {
+    public:
+        bool event(QEvent *event) override
+        {
+            languageChanges += event->type() == QEvent::LanguageChange ? 1 : 0;
+            return QQmlEngine::event(event);
+        }
+        int languageChanges = 0;
+    };
+
+    Engine engine;
+    QVERIFY(create(&engine, "QtObject {}") != nullptr);
+    QEvent change(QEvent::LanguageChange);
+    QCoreApplication::sendEvent(&engine, &change);
+    QCOMPARE(engine.languageChanges, 1);
+}
+
+void TestPlugin::translatorsGoWithTheirEngine()
+{
+    auto first = std::make_unique<QQmlEngine>();
+    QVERIFY(create(first.get(), "QtObject {}") != nullptr);
+    QLocale::setDefault(QLocale(QStringLiteral("de_DE")));
+    auto second = std::make_unique<QQmlEngine>();
+    QVERIFY(create(second.get(), "QtObject {}") != nullptr);
+
+    // A pair each: the later engine's language wins, and the earlier one's is still there.
+    QCOMPARE(first->findChildren<QTranslator *>().size(), 2);
+    QCOMPARE(second->findChildren<QTranslator *>().size(), 2);
+    QCOMPARE(both(), QStringLiteral("Beide"));
+    second.reset();
+    QCOMPARE(both(), QStringLiteral("Molemmat"));
+    first.reset();
+    QCOMPARE(both(), QStringLiteral("settings-test-both"));
+    QCOMPARE(englishOnly(), QStringLiteral("settings-test-english"));
+}
+
+QTEST_GUILESS_MAIN(TestPlugin)
+
+#include "tst_plugin.moc"

@@ -1,0 +1,73 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "files.h"
+
+#include <QDir>
+#include <QFile>
+#include <QFileInfo>
+#include <QSaveFile>
+
+#include <sys/stat.h>
+
+namespace {
+
+void require(bool done, const char *what, const QString &path)
+{
+    if (!done) {
+        qFatal("cannot %s %s", what, qPrintable(path));
+    }
+}
+
+QString catalogPath(const QString &name)
+{
+    return QStringLiteral("/usr/share/translations/%1.qm").arg(name);
+}
+
+} // namespace
+
+void Files::write(const QString &path, const QByteArray &content)
+{
+    makeFolder(QFileInfo(path).path());
+    QSaveFile file(path);
+    require(file.open(QIODevice::WriteOnly) && file.write(content) == content.size()
+                && file.commit(),
+            "write", path);
+}
+
+void Files::remove(const QString &path)
+{
+    const QFileInfo entry(path);
+    if (entry.isDir() && !entry.isSymLink()) {
+        require(QDir(path).removeRecursively(), "remove", path);
+    } else if (entry.exists() || entry.isSymLink()) {
+        require(QFile::remove(path), "remove", path);
+    }
+}
+
+void Files::makeFolder(const QString &path)
+{
+    require(QDir().mkpath(path), "make", path);
+}
+
+void Files::makePipe(const QString &path)
+{
+    require(mkfifo(QFile::encodeName(path).constData(), 0600) == 0, "make", path);
+}
+
+void Files::makeLink(const QString &target, const QString &path)
+{
+    require(QFile::link(target, path), "make", path);
+}
+
+void Files::installCatalog(const QString &name)
+{
+    QFile compiled(QStringLiteral(CATALOG_DIR "/%1.qm").arg(name));
+    require(compiled.open(QIODevice::ReadOnly), "read", compiled.fileName());
+    write(catalogPath(name), compiled.readAll());
+}
+
+void Files::removeCatalog(const QString &name)
+{
+    remove(catalogPath(name));
+}

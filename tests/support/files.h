@@ -1,0 +1,29 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#ifndef FILES_H
+#define FILES_H
+
+#include <QByteArray>
+#include <QString>
+
+/*
+    Files of the throw-away root. Each of these ends the test program if it cannot do what it says.
+*/
+namespace Files {
+
+// Makes the folders on the way; the file is complete when it appears under its name.
+void write(const QString &path, const QByteArray &content);
+// Removes a file or a whole folder, if it is there.
+void remove(const QString &path);
+void makeFolder(const QString &path);
+void makePipe(const QString &path);
+void makeLink(const QString &target, const QString &path);
+
+// Installs a compiled catalog of tests/catalogs in /usr/share/translations, or removes it.
+void installCatalog(const QString &name);
+void removeCatalog(const QString &name);
+
+} // namespace Files
+
+#endif

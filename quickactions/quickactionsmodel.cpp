@@ -95,7 +95,9 @@ QuickActionsModel::QuickActionsModel(QObject *parent)
 
 QuickActionsModel::~QuickActionsModel()
 {
-    // Announces language changes, which may lead back to data(): while there is a model to ask.
+    // Announces language changes, which may lead back here: while there is a model to ask, but one
+    // that loads nothing any more.
+    m_complete = false;
     m_catalogs.clear();
 }
 
@@ -259,13 +261,13 @@ void QuickActionsModel::disableAction(const QString &path)
 */
 void QuickActionsModel::move(int index, int newIndex)
 {
-    if (index < 0 || newIndex < 0 || index >= m_enabledList.size()
-        || newIndex >= m_enabledList.size()) {
-        return;
-    }
     if (m_changing) {
         QMetaObject::invokeMethod(
             this, [this, index, newIndex] { move(index, newIndex); }, Qt::QueuedConnection);
+        return;
+    }
+    if (index < 0 || newIndex < 0 || index >= m_enabledList.size()
+        || newIndex >= m_enabledList.size()) {
         return;
     }
 

@@ -22,10 +22,11 @@ RecordingService::~RecordingService()
     QDBusConnection::disconnectFromBus(m_connection.name());
 }
 
-void RecordingService::setAnswer(Answer answer, const QString &errorName)
+void RecordingService::setAnswer(Answer answer, const QString &errorName, const QString &errorText)
 {
     m_answer = answer;
     m_errorName = errorName;
+    m_errorText = errorText;
 }
 
 QString RecordingService::introspect(const QString &path) const
@@ -42,7 +43,7 @@ bool RecordingService::handleMessage(const QDBusMessage &message, const QDBusCon
         connection.send(message.createReply());
         break;
     case Answer::Error:
-        connection.send(message.createErrorReply(m_errorName, QStringLiteral("as told")));
+        connection.send(message.createErrorReply(m_errorName, m_errorText));
         break;
     case Answer::Nothing:
         break;

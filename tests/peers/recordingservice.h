@@ -24,8 +24,9 @@ public:
     ~RecordingService() override;
     Q_DISABLE_COPY_MOVE(RecordingService)
 
-    // What calls are answered with; an error has the given name.
-    void setAnswer(Answer answer, const QString &errorName = QString());
+    // What calls are answered with; an error has the given name and text.
+    void setAnswer(Answer answer, const QString &errorName = QString(),
+                   const QString &errorText = QStringLiteral("as told"));
     QList<QDBusMessage> calls() const { return m_calls; }
     QDBusConnection connection() const { return m_connection; }
 
@@ -40,6 +41,7 @@ private:
     QString m_service;
     Answer m_answer = Answer::Reply;
     QString m_errorName;
+    QString m_errorText;
     QList<QDBusMessage> m_calls;
 };
 

@@ -24,6 +24,13 @@ QString catalogPath(const QString &name)
     return QStringLiteral("/usr/share/translations/%1.qm").arg(name);
 }
 
+// Started by hand, as root even, a test must not write to the root of the machine.
+void requireThrowAwayRoot(const QString &path)
+{
+    require(qEnvironmentVariableIsSet("MARLO_THROW_AWAY_ROOT"),
+            "run outside the throw-away root of tests/sandbox and touch", path);
+}
+
 } // namespace
 
 void Files::write(const QString &path, const QByteArray &content)
@@ -37,6 +44,7 @@ void Files::write(const QString &path, const QByteArray &content)
 
 void Files::remove(const QString &path)
 {
+    requireThrowAwayRoot(path);
     const QFileInfo entry(path);
     if (entry.isDir() && !entry.isSymLink()) {
         require(QDir(path).removeRecursively(), "remove", path);
@@ -47,16 +55,19 @@ void Files::remove(const QString &path)
 
 void Files::makeFolder(const QString &path)
 {
+    requireThrowAwayRoot(path);
     require(QDir().mkpath(path), "make", path);
 }
 
 void Files::makePipe(const QString &path)
 {
+    requireThrowAwayRoot(path);
     require(mkfifo(QFile::encodeName(path).constData(), 0600) == 0, "make", path);
 }
 
 void Files::makeLink(const QString &target, const QString &path)
 {
+    requireThrowAwayRoot(path);
     require(QFile::link(target, path), "make", path);
 }
 

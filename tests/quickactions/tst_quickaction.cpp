@@ -1,0 +1,531 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+// The reader of definition files and the calls that they describe.
+
+#include "files.h"
+#include "messagelog.h"
+#include "quickaction.h"
+#include "recordingservice.h"
+
+#include <QtTest>
+
+#include <unistd.h>
+
+using Action = QuickActionsModel::Action;
+using Answer = RecordingService::Answer;
+
+class TestQuickAction : public QObject
+{
+    Q_OBJECT
+
+private Q_SLOTS:
+    void init();
+    void cleanup();
+
+    void keepsPathAndState();
+    void readsKeys_data();
+    void readsKeys();
+    void readsArguments_data();
+    void readsArguments();
+    void readsOfLatin1();
+    void hugeArraysEnd();
+    void ignoresOtherGroups();
+    void questions();
+    void missingKeysAreEmpty();
+    void listsAreNoText();
+    void priority_data();
+    void priority();
+    void unreadable_data();
+    void unreadable();
+    void vanished();
+    void linesThatAreNoKeys();
+    void comparison();
+    void copies();
+
+    void sendsTheCall();
+    void argumentsStayAsRead();
+    void noArguments_data();
+    void noArguments();
+    void refusesBeforeSending_data();
+    void refusesBeforeSending();
+    void valuesMayLookLikePlaceholders();
+    void mostArgumentsThatCanBeSent();
+    void deliversTheReply();
+    void deliversTheError();
+
+private:
+    QString write(const QByteArray &content) const;
+
+    std::unique_ptr<MessageLog> m_log;
+    QString m_path;
+};
+
+namespace {
+
+constexpr char unreadableWarning[] = "warning [default] Unable to open action file";
+
+const QByteArray lampCall = "remote-service=org.example.lamp\n"
+                            "remote-path=/lamp\n"
+                            "remote-interface=org.example.Lamp\n"
+                            "remote-method=toggle\n";
+
+QByteArray arguments(int count)
+{
+    QByteArray section = "[remote-arguments]\nsize=" + QByteArray::number(count) + '\n';
+    for (int i = 1; i <= count; ++i) {
+        section += QByteArray::number(i) + "\\argument=value " + QByteArray::number(i) + '\n';
+    }
+    return section;
+}
+
+class Receiver : public QObject
+{
+    Q_OBJECT
+
+public:
+    int replies = 0;
+    QList<QDBusError> errors;
+    QList<QDBusMessage> sent;
+
+public Q_SLOTS:
+    void reply() { ++replies; }
+    void error(const QDBusError &error, const QDBusMessage &message)
+    {
+        errors.append(error);
+        sent.append(message);
+    }
+};
+
+} // namespace
+
+QString TestQuickAction::write(const QByteArray &content) const
+{
+    Files::write(m_path, content);
+    return m_path;
+}
+
+void TestQuickAction::init()
+{
+    // A name for each row of test data: QSettings remembers a file by its name, size and time, and
+    // the next row may write as many bytes in the same millisecond.
+    static int count = 0;
+    m_path = QStringLiteral("/usr/share/glimmera/quickactions/%1.conf").arg(++count);
+    Files::remove(m_path);
+    m_log = std::make_unique<MessageLog>();
+}
+
+void TestQuickAction::cleanup()
+{
+    QCOMPARE(m_log->takeReport(), QString());
+    m_log.reset();
+    Files::remove(m_path);
+}
+
+void TestQuickAction::keepsPathAndState()
+{
+    write("title=x\n");
+    QCOMPARE(Action(m_path, true).path(), m_path);
+    QVERIFY(Action(m_path, true).enabled());
+    QVERIFY(!Action(m_path, false).enabled());
+}
+
+void TestQuickAction::readsKeys_data()
+{
+    QTest::addColumn<QByteArray>("content");
+    QTest::addColumn<QVariantMap>("config");
+
+    const auto map = [](const char *key, const QVariant &value) {
+        return QVariantMap{{QString::fromLatin1(key), value}};
+    };
+    QTest::newRow("before any section")
+        << QByteArray("title=x\n") << map("title", QStringLiteral("x"));
+    QTest::newRow("in the general section")
+        << QByteArray("[General]\ntitle=x\n") << map("title", QStringLiteral("x"));
+    QTest::newRow("unknown key") << QByteArray("colour=red\n")
+                                 << map("colour", QStringLiteral("red"));
+    QTest::newRow("empty value") << QByteArray("title=\n") << map("title", QString());
+    QTest::newRow("list") << QByteArray("title=a, b\n")
+                          << map("title", QStringList{QStringLiteral("a"), QStringLiteral("b")});
+    QTest::newRow("quoted comma") << QByteArray("title=\"a, b\"\n")
+                                  << map("title", QStringLiteral("a, b"));
+    QTest::newRow("comment") << QByteArray("; title=x\n") << QVariantMap();
+    QTest::newRow("empty file") << QByteArray() << QVariantMap();
+}
+
+void TestQuickAction::readsKeys()
+{
+    QFETCH(QByteArray, content);
+    QFETCH(QVariantMap, config);
+    write(content);
+    const Action action(m_path, false);
+    QCOMPARE(action.config(), config);
+    QCOMPARE(action.readActionConfig(m_path), config);
+}
+
+void TestQuickAction::readsArguments_data()
+{
+    QTest::addColumn<QByteArray>("content");
+    QTest::addColumn<QVariant>("expected");
+
+    const QVariant none; // no such entry at all
+    const QVariantList empty;
+    const auto list = [](const QVariantList &values) { return QVariant(values); };
+    QTest::newRow("no section") << QByteArray("title=x\n") << none;
+    QTest::newRow("in their order")
+        << QByteArray("[remote-arguments]\nsize=2\n2\\argument=b\n1\\argument=a\n")
+        << list({QStringLiteral("a"), QStringLiteral("b")});
+    QTest::newRow("always texts") << QByteArray(
+        "[remote-arguments]\nsize=2\n1\\argument=1\n2\\argument=true\n")
+                                  << list({QStringLiteral("1"), QStringLiteral("true")});
+    QTest::newRow("list among them")
+        << QByteArray("[remote-arguments]\nsize=1\n1\\argument=a, b\n")
+        << list({QStringList{QStringLiteral("a"), QStringLiteral("b")}});
+    QTest::newRow("size 0") << QByteArray("[remote-arguments]\nsize=0\n1\\argument=a\n")
+                            << list(empty);
+    QTest::newRow("no size") << QByteArray("[remote-arguments]\n1\\argument=a\n") << list(empty);
+    QTest::newRow("negative size")
+        << QByteArray("[remote-arguments]\nsize=-3\n1\\argument=a\n") << list(empty);
+    QTest::newRow("smaller size") << QByteArray(
+        "[remote-arguments]\nsize=1\n1\\argument=a\n2\\argument=b\n")
+                                  << list({QStringLiteral("a")});
+    QTest::newRow("missing element") << QByteArray("[remote-arguments]\nsize=2\n2\\argument=b\n")
+                                     << list({QVariant(), QStringLiteral("b")});
+    QTest::newRow("section wins over key of that name")
+        << QByteArray("remote-arguments=x\n[remote-arguments]\nsize=1\n1\\argument=a\n")
+        << list({QStringLiteral("a")});
+}
+
+void TestQuickAction::readsArguments()
+{
+    QFETCH(QByteArray, content);
+    QFETCH(QVariant, expected);
+    write(content);
+    const QVariantMap config = Action(m_path, false).config();
+    QCOMPARE(config.contains(QStringLiteral("remote-arguments")), expected.isValid());
+    QCOMPARE(config.value(QStringLiteral("remote-arguments")), expected);
+}
+
+void TestQuickAction::readsOfLatin1()
+{
+    write("title=\xe4\n");
+    QCOMPARE(Action(m_path, false).title(), QStringLiteral("\u00e4"));
+    write("title=\xc3\xa4!\n");
+    QCOMPARE(Action(m_path, false).title(), QStringLiteral("\u00c3\u00a4!"));
+}
+
+void TestQuickAction::hugeArraysEnd()
+{
+    write("[remote-arguments]\nsize=2000000000\n1\\argument=a\n");
+    QCOMPARE(Action(m_path, false).arguments().size(), 256);
+}
+
+void TestQuickAction::ignoresOtherGroups()
+{
+    write("icon=i\n[extra]\ntitle=x\n[Remote-Arguments]\nsize=1\n1\\argument=a\n");
+    QCOMPARE(Action(m_path, false).config(),
+             (QVariantMap{{QStringLiteral("icon"), QStringLiteral("i")}}));
+}
+
+void TestQuickAction::questions()
+{
+    write("title=t\nicon=i\ntranslation-catalog=c\nrequires-package=p\npriority=7\n" + lampCall
+          + arguments(1));
+    const Action action(m_path, false);
+    QCOMPARE(action.title(), QStringLiteral("t"));
+    QCOMPARE(action.icon(), QVariant(QStringLiteral("i")));
+    QCOMPARE(action.translationCatalog(), QStringLiteral("c"));
+    QCOMPARE(action.requiredPackage(), QStringLiteral("p"));
+    QCOMPARE(action.priority(), std::optional<int>(7));
+    QCOMPARE(action.service(), QStringLiteral("org.example.lamp"));
+    QCOMPARE(action.objectPath(), QStringLiteral("/lamp"));
+    QCOMPARE(action.interface(), QStringLiteral("org.example.Lamp"));
+    QCOMPARE(action.method(), QStringLiteral("toggle"));
+    QCOMPARE(action.arguments(), QVariantList{QStringLiteral("value 1")});
+}
+
+void TestQuickAction::missingKeysAreEmpty()
+{
+    write("colour=red\n");
+    const Action action(m_path, false);
+    QCOMPARE(action.title(), QString());
+    QCOMPARE(action.icon(), QVariant());
+    QCOMPARE(action.translationCatalog(), QString());
+    QCOMPARE(action.requiredPackage(), QString());
+    QVERIFY(!action.priority());
+    QCOMPARE(action.service(), QString());
+    QCOMPARE(action.arguments(), QVariantList());
+}
+
+void TestQuickAction::listsAreNoText()
+{
+    write("title=a, b\nicon=a, b\n");
+    const Action action(m_path, false);
+    QCOMPARE(action.title(), QString());
+    QCOMPARE(action.icon(), QVariant(QStringList{QStringLiteral("a"), QStringLiteral("b")}));
+}
+
+void TestQuickAction::priority_data()
+{
+    QTest::addColumn<QByteArray>("value");
+    QTest::addColumn<int>("expected");
+    constexpr int none = INT_MIN;
+    QTest::newRow("0") << QByteArray("0") << 0;
+    QTest::newRow("positive") << QByteArray("20") << 20;
+    QTest::newRow("negative") << QByteArray("-1") << -1;
+    QTest::newRow("quoted") << QByteArray("\"5\"") << 5;
+    QTest::newRow("empty") << QByteArray() << none;
+    QTest::newRow("word") << QByteArray("first") << none;
+    QTest::newRow("fraction") << QByteArray("1.5") << none;
+    QTest::newRow("list") << QByteArray("1, 2") << none;
+    QTest::newRow("beyond 32 bits") << QByteArray("99999999999") << none;
+}
+
+void TestQuickAction::priority()
+{
+    QFETCH(QByteArray, value);
+    QFETCH(int, expected);
+    write("priority=" + value + '\n');
+    QCOMPARE(Action(m_path, false).priority().value_or(INT_MIN), expected);
+}
+
+void TestQuickAction::unreadable_data()
+{
+    QTest::addColumn<QByteArray>("kind");
+    for (const char *kind : {"unclosed section", "directory", "pipe", "link to a pipe",
+                             "link to a device", "no permission"}) {
+        QTest::newRow(kind) << QByteArray(kind);
+    }
+}
+
+void TestQuickAction::unreadable()
+{
+    QFETCH(QByteArray, kind);
+    const QString target = m_path + QStringLiteral(".target");
+    Files::remove(target);
+    if (kind == "unclosed section") {
+        write("title=x\n[remote-arguments\n");
+    } else if (kind == "directory") {
+        Files::makeFolder(m_path);
+    } else if (kind == "pipe") {
+        Files::makePipe(m_path);
+    } else if (kind == "link to a pipe") {
+        Files::makePipe(target);
+        Files::makeLink(target, m_path);
+    } else if (kind == "link to a device") {
+        Files::makeLink(QStringLiteral("/dev/zero"), m_path);
+    } else {
+        write("title=x\n");
+        QVERIFY(QFile::setPermissions(m_path, {}));
+        if (access(qPrintable(m_path), R_OK) == 0) {
+            QSKIP("every file can be read by this user");
+        }
+    }
+    QCOMPARE(Action(m_path, true).config(), QVariantMap());
+    QCOMPARE(m_log->takeReport(), QString::fromLatin1(unreadableWarning));
+    Files::remove(target);
+}
+
+void TestQuickAction::vanished()
+{
+    QCOMPARE(Action(m_path, true).config(), QVariantMap());
+    QCOMPARE(Action(m_path, true).path(), m_path);
+    Files::makeLink(QStringLiteral("/nowhere"), m_path);
+    QCOMPARE(Action(m_path, true).config(), QVariantMap());
+}
+
+void TestQuickAction::linesThatAreNoKeys()
+{
+    write("some words\ntitle=x\n");
+    QCOMPARE(Action(m_path, true).title(), QStringLiteral("x"));
+}
+
+void TestQuickAction::comparison()
+{
+    write("title=x\n");
+    const Action action(m_path, true);
+    QVERIFY(action == Action(m_path, true));
+    QVERIFY(!(action != Action(m_path, true)));
+    QVERIFY(action != Action(m_path, false));
+
+    const QString other = m_path + QStringLiteral(".other");
+    Files::write(other, "title=x\n");
+    QVERIFY(action != Action(other, true));
+    Files::remove(other);
+
+    write("title=another\n");
+    QVERIFY(action != Action(m_path, true));
+    QVERIFY(!(action == Action(m_path, true)));
+}
+
+void TestQuickAction::copies()
+{
+    write("title=x\npriority=3\n");
+    const Action action(m_path, true);
+    const Action copy(action);
+    QVERIFY(copy == action);
+    Action assigned(QStringLiteral("/nowhere"), false);
+    QVERIFY(assigned != action);
+    assigned = action;
+    QVERIFY(assigned == action);
+    QCOMPARE(assigned.priority(), std::optional<int>(3));
+}
+
+void TestQuickAction::sendsTheCall()
+{
+    RecordingService lamp(QDBusConnection::SessionBus, QStringLiteral("org.example.lamp"));
+    write(lampCall + arguments(2));
+    Receiver receiver;
+    QVERIFY(Action(m_path, true).trigger(&receiver, nullptr, nullptr));
+    QCOMPARE(lamp.calls().size(), 0); // nobody waited
+
+    QTRY_COMPARE(lamp.calls().size(), 1);
+    const QDBusMessage call = lamp.calls().constFirst();
+    QCOMPARE(call.type(), QDBusMessage::MethodCallMessage);
+    QCOMPARE(call.path(), QStringLiteral("/lamp"));
+    QCOMPARE(call.interface(), QStringLiteral("org.example.Lamp"));
+    QCOMPARE(call.member(), QStringLiteral("toggle"));
+    QCOMPARE(call.signature(), QStringLiteral("ss"));
+    QCOMPARE(call.arguments(),
+             (QVariantList{QStringLiteral("value 1"), QStringLiteral("value 2")}));
+}
+
+void TestQuickAction::argumentsStayAsRead()
+{
+    RecordingService lamp(QDBusConnection::SessionBus, QStringLiteral("org.example.lamp"));
+    write(lampCall
+          + "[remote-arguments]\nsize=3\n1\\argument=1\n2\\argument=true\n3\\argument=a, b\n");
+    Receiver receiver;
+    QVERIFY(Action(m_path, true).trigger(&receiver, nullptr, nullptr));
+    QTRY_COMPARE(lamp.calls().size(), 1);
+    const QDBusMessage call = lamp.calls().constFirst();
+    QCOMPARE(call.signature(), QStringLiteral("ssas"));
+    QCOMPARE(call.arguments(),
+             (QVariantList{QStringLiteral("1"), QStringLiteral("true"),
+                           QStringList{QStringLiteral("a"), QStringLiteral("b")}}));
+}
+
+void TestQuickAction::noArguments_data()
+{
+    QTest::addColumn<QByteArray>("section");
+    QTest::newRow("no section") << QByteArray();
+    QTest::newRow("size 0") << QByteArray("[remote-arguments]\nsize=0\n");
+    QTest::newRow("no size") << QByteArray("[remote-arguments]\n1\\argument=a\n");
+}
+
+void TestQuickAction::noArguments()
+{
+    QFETCH(QByteArray, section);
+    RecordingService lamp(QDBusConnection::SessionBus, QStringLiteral("org.example.lamp"));
+    write(lampCall + section);
+    Receiver receiver;
+    QVERIFY(Action(m_path, true).trigger(&receiver, nullptr, nullptr));
+    QTRY_COMPARE(lamp.calls().size(), 1);
+    QCOMPARE(lamp.calls().constFirst().signature(), QString());
+}
+
+void TestQuickAction::refusesBeforeSending_data()
+{
+    QTest::addColumn<QByteArray>("content");
+    QTest::addColumn<QString>("expected");
+
+    const QString lamp = QStringLiteral("service=org.example.lamp path=/lamp "
+                                        "interface=org.example.Lamp method=toggle. Error was: ");
+    QTest::newRow("no service")
+        << QByteArray(
+               "remote-path=/lamp\nremote-interface=org.example.Lamp\nremote-method=toggle\n")
+        << QStringLiteral(
+               "service= path=/lamp interface=org.example.Lamp method=toggle. Error was: "
+               "org.qtproject.QtDBus.Error.InvalidService The call names no service %6");
+    QTest::newRow("no method")
+        << QByteArray("remote-service=org.example.lamp\nremote-path=/lamp\n"
+                      "remote-interface=org.example.Lamp\n")
+        << QStringLiteral(
+               "service=org.example.lamp path=/lamp interface=org.example.Lamp method=. Error was: "
+               "org.qtproject.QtDBus.Error.InvalidMember The call names no method %6");
+    QTest::newRow("empty file")
+        << QByteArray()
+        << QStringLiteral("service= path= interface= method=. Error was: "
+                          "org.qtproject.QtDBus.Error.InvalidService The call names no service %6");
+    QTest::newRow("too many arguments") << lampCall + arguments(256)
+                                        << lamp
+            + QStringLiteral("org.freedesktop.DBus.Error.InvalidArgs "
+                             "The call has too many arguments %6");
+    QTest::newRow("too long a signature")
+        << lampCall + arguments(254) + "255\\argument=a, b\nsize=255\n"
+        << lamp
+            + QStringLiteral("org.freedesktop.DBus.Error.InvalidArgs "
+                             "The call has too many arguments %6");
+    QTest::newRow("missing argument") << lampCall + "[remote-arguments]\nsize=1\n"
+                                      << lamp
+            + QStringLiteral("org.freedesktop.DBus.Error.InvalidArgs "
+                             "An argument has no D-Bus type %6");
+}
+
+void TestQuickAction::refusesBeforeSending()
+{
+    QFETCH(QByteArray, content);
+    QFETCH(QString, expected);
+    RecordingService lamp(QDBusConnection::SessionBus, QStringLiteral("org.example.lamp"));
+    write(content);
+    Receiver receiver;
+    QVERIFY(
+        !Action(m_path, true).trigger(&receiver, nullptr, SLOT(error(QDBusError, QDBusMessage))));
+    // Said once, on the channel of the receiver; nothing goes out and nothing comes later.
+    QCOMPARE(m_log->takeReport(),
+             QStringLiteral("info [default] <Unknown File>: QML Receiver: "
+                            "Failed to initialize dbus call to: ")
+                 + expected);
+    QTest::qWait(50);
+    QCOMPARE(lamp.calls().size(), 0);
+    QCOMPARE(receiver.errors.size(), 0);
+}
+
+void TestQuickAction::valuesMayLookLikePlaceholders()
+{
+    write("remote-service=%2\nremote-path=%3\nremote-interface=%4 %1\n");
+    Receiver receiver;
+    QVERIFY(!Action(m_path, true).trigger(&receiver, nullptr, nullptr));
+    const QString text = m_log->takeReport();
+    QVERIFY2(text.contains(QStringLiteral("service=%2 path=%3 interface=%4 %1 method=. ")),
+             qPrintable(text));
+}
+
+void TestQuickAction::mostArgumentsThatCanBeSent()
+{
+    RecordingService lamp(QDBusConnection::SessionBus, QStringLiteral("org.example.lamp"));
+    write(lampCall + arguments(255));
+    Receiver receiver;
+    QVERIFY(Action(m_path, true).trigger(&receiver, nullptr, nullptr));
+    QTRY_COMPARE(lamp.calls().size(), 1);
+    QCOMPARE(lamp.calls().constFirst().arguments().size(), 255);
+}
+
+void TestQuickAction::deliversTheReply()
+{
+    RecordingService lamp(QDBusConnection::SessionBus, QStringLiteral("org.example.lamp"));
+    write(lampCall);
+    Receiver receiver;
+    QVERIFY(Action(m_path, true)
+                .trigger(&receiver, SLOT(reply()), SLOT(error(QDBusError, QDBusMessage))));
+    QTRY_COMPARE(receiver.replies, 1);
+    QCOMPARE(receiver.errors.size(), 0);
+}
+
+void TestQuickAction::deliversTheError()
+{
+    RecordingService lamp(QDBusConnection::SessionBus, QStringLiteral("org.example.lamp"));
+    lamp.setAnswer(Answer::Error, QStringLiteral("org.example.Error.Broken"));
+    write(lampCall);
+    Receiver receiver;
+    QVERIFY(Action(m_path, true)
+                .trigger(&receiver, SLOT(reply()), SLOT(error(QDBusError, QDBusMessage))));
+    QTRY_COMPARE(receiver.errors.size(), 1);
+    QCOMPARE(receiver.errors.constFirst().name(), QStringLiteral("org.example.Error.Broken"));
+    QCOMPARE(receiver.sent.constFirst().member(), QStringLiteral("toggle"));
+    QCOMPARE(receiver.replies, 0);
+}
+
+QTEST_GUILESS_MAIN(TestQuickAction)
+
+#include "tst_quickaction.moc"

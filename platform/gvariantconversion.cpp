@@ -1,0 +1,260 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "gvariantconversion.h"
+
+#include <QByteArray>
+#include <QString>
+#include <QStringList>
+#include <glib.h>
+
+namespace {
+
+// Within the 128 levels of GVariant the database gives back 41 maps in each other, three levels
+// each, and no more. D-Bus, by which programs pass settings on, carries 32 arrays in each other.
+constexpr int maximumNesting = 32;
+
+GVariantPtr sink(GVariant *floating)
+{
+    return GVariantPtr(g_variant_ref_sink(floating));
+}
+
+bool isUnicodeWithoutNul(const QString &text)
+{
+    return text.isValidUtf16() && !text.contains(QChar::Null);
+}
+
+GVariantPtr refuseText(QString *reason)
+{
+    *reason = QStringLiteral("text of type QString with a NUL or half a surrogate pair");
+    return nullptr;
+}
+
+GVariantPtr refuseNesting(const char *type, QString *reason)
+{
+    *reason = QStringLiteral("a value of type %1 nested deeper than %2 levels")
+                  .arg(QLatin1String(type), QString::number(maximumNesting));
+    return nullptr;
+}
+
+GVariantPtr convert(const QVariant &value, int nesting, QString *reason);
+
+GVariantPtr convertText(const QString &text, QString *reason)
+{
+    if (!isUnicodeWithoutNul(text)) {
+        return refuseText(reason);
+    }
+    return sink(g_variant_new_string(text.toUtf8().constData()));
+}
+
+GVariantPtr convertStringList(const QStringList &list, QString *reason)
+{
+    GVariantBuilder builder;
+    g_variant_builder_init(&builder, G_VARIANT_TYPE_STRING_ARRAY);
+    for (const QString &text : list) {
+        if (!isUnicodeWithoutNul(text)) {
+            g_variant_builder_clear(&builder);
+            return refuseText(reason);
+        }
+        g_variant_builder_add(&builder, "s", text.toUtf8().constData());
+    }
+    return sink(g_variant_builder_end(&builder));
+}
+
+GVariantPtr convertList(const QVariantList &list, int nesting, QString *reason)
+{
+    if (nesting > maximumNesting) {
+        return refuseNesting("QVariantList", reason);
+    }
+    GVariantBuilder builder;
+    g_variant_builder_init(&builder, G_VARIANT_TYPE("av"));
+    for (const QVariant &element : list) {
+        const GVariantPtr converted = convert(element, nesting, reason);
+        if (!converted) {
+            g_variant_builder_clear(&builder);
+            return nullptr;
+        }
+        g_variant_builder_add(&builder, "v", converted.get());
+    }
+    return sink(g_variant_builder_end(&builder));
+}
+
+GVariantPtr convertMap(const QVariantMap &map, int nesting, QString *reason)
+{
+    if (nesting > maximumNesting) {
+        return refuseNesting("QVariantMap", reason);
+    }
+    GVariantBuilder builder;
+    g_variant_builder_init(&builder, G_VARIANT_TYPE_VARDICT);
+    for (auto it = map.cbegin(); it != map.cend(); ++it) {
+        const GVariantPtr converted = isUnicodeWithoutNul(it.key())
+            ? convert(it.value(), nesting, reason)
+            : refuseText(reason);
+        if (!converted) {
+            g_variant_builder_clear(&builder);
+            return nullptr;
+        }
+        g_variant_builder_add(&builder, "{sv}", it.key().toUtf8().constData(), converted.get());
+    }
+    return sink(g_variant_builder_end(&builder));
+}
+
+GVariantPtr convert(const QVariant &value, int nesting, QString *reason)
+{
+    switch (value.userType()) {
+    case QMetaType::Bool:
+        return sink(g_variant_new_boolean(value.toBool() ? TRUE : FALSE));
+    case QMetaType::Int:
+        return sink(g_variant_new_int32(value.toInt()));
+    case QMetaType::UInt:
+        return sink(g_variant_new_uint32(value.toUInt()));
+    case QMetaType::LongLong:
+        return sink(g_variant_new_int64(value.toLongLong()));
+    case QMetaType::ULongLong:
+        return sink(g_variant_new_uint64(value.toULongLong()));
+    case QMetaType::Float:
+    case QMetaType::Double:
+        return sink(g_variant_new_double(value.toDouble()));
+    case QMetaType::QString:
+        return convertText(value.toString(), reason);
+    case QMetaType::QStringList:
+        return convertStringList(value.toStringList(), reason);
+    case QMetaType::QVariantList:
+        return convertList(value.toList(), nesting + 1, reason);
+    case QMetaType::QVariantMap:
+    case QMetaType::QVariantHash: // sorted as a map, or an equal hash might look like another value
+        return convertMap(value.toMap(), nesting + 1, reason);
+    default:
+        *reason = value.isValid()
+            ? QStringLiteral("a value of type %1").arg(QLatin1String(value.typeName()))
+            : QStringLiteral("an invalid QVariant");
+        return nullptr;
+    }
+}
+
+QVariant convert(GVariant *value);
+
+QString text(GVariant *value)
+{
+    gsize length = 0;
+    const char *const utf8 = g_variant_get_string(value, &length);
+    const QString text = QString::fromUtf8(utf8, static_cast<int>(length));
+    // QString takes U+FEFF at the start for a mark of the encoding and drops it.
+    const bool marked =
+        QByteArray::fromRawData(utf8, static_cast<int>(length)).startsWith("\xEF\xBB\xBF");
+    return marked ? QChar(QChar::ByteOrderMark) + text : text;
+}
+
+GVariantPtr childAt(GVariant *container, gsize index)
+{
+    return GVariantPtr(g_variant_get_child_value(container, index));
+}
+
+QVariantList list(GVariant *container)
+{
+    const gsize count = g_variant_n_children(container);
+    QVariantList list;
+    list.reserve(static_cast<int>(count));
+    for (gsize i = 0; i < count; ++i) {
+        list.append(convert(childAt(container, i).get()));
+    }
+    return list;
+}
+
+QStringList stringList(GVariant *array)
+{
+    const gsize count = g_variant_n_children(array);
+    QStringList list;
+    list.reserve(static_cast<int>(count));
+    for (gsize i = 0; i < count; ++i) {
+        list.append(text(childAt(array, i).get()));
+    }
+    return list;
+}
+
+QVariantMap map(GVariant *dictionary)
+{
+    const gsize count = g_variant_n_children(dictionary);
+    QVariantMap map;
+    for (gsize i = 0; i < count; ++i) {
+        const GVariantPtr entry = childAt(dictionary, i);
+        const QString key = convert(childAt(entry.get(), 0).get()).toString();
+        if (!map.contains(key)) { // of equal keys the first counts, as in GLib's own look-up
+            map.insert(key, convert(childAt(entry.get(), 1).get()));
+        }
+    }
+    return map;
+}
+
+QVariant convertArray(GVariant *array)
+{
+    if (g_variant_is_of_type(array, G_VARIANT_TYPE_STRING_ARRAY)) {
+        return stringList(array);
+    }
+    if (g_variant_is_of_type(array, G_VARIANT_TYPE_BYTESTRING)) {
+        return QByteArray(static_cast<const char *>(g_variant_get_data(array)),
+                          static_cast<int>(g_variant_get_size(array)));
+    }
+    if (g_variant_is_of_type(array, G_VARIANT_TYPE_DICTIONARY)) {
+        return map(array);
+    }
+    return list(array);
+}
+
+QVariant convert(GVariant *value)
+{
+    switch (g_variant_classify(value)) {
+    case G_VARIANT_CLASS_BOOLEAN:
+        return g_variant_get_boolean(value) != FALSE;
+    case G_VARIANT_CLASS_BYTE:
+        return static_cast<int>(g_variant_get_byte(value));
+    case G_VARIANT_CLASS_INT16:
+        return static_cast<int>(g_variant_get_int16(value));
+    case G_VARIANT_CLASS_UINT16:
+        return static_cast<uint>(g_variant_get_uint16(value));
+    case G_VARIANT_CLASS_INT32:
+        return g_variant_get_int32(value);
+    case G_VARIANT_CLASS_UINT32:
+        return g_variant_get_uint32(value);
+    case G_VARIANT_CLASS_INT64:
+        return static_cast<qlonglong>(g_variant_get_int64(value));
+    case G_VARIANT_CLASS_UINT64:
+        return static_cast<qulonglong>(g_variant_get_uint64(value));
+    case G_VARIANT_CLASS_HANDLE:
+        return g_variant_get_handle(value);
+    case G_VARIANT_CLASS_DOUBLE:
+        return g_variant_get_double(value);
+    case G_VARIANT_CLASS_STRING:
+    case G_VARIANT_CLASS_OBJECT_PATH:
+    case G_VARIANT_CLASS_SIGNATURE:
+        return text(value);
+    case G_VARIANT_CLASS_VARIANT:
+    case G_VARIANT_CLASS_MAYBE:
+        return g_variant_n_children(value) > 0 ? convert(childAt(value, 0).get()) : QVariant();
+    case G_VARIANT_CLASS_ARRAY:
+        return convertArray(value);
+    case G_VARIANT_CLASS_TUPLE:
+    case G_VARIANT_CLASS_DICT_ENTRY:
+        return list(value);
+    }
+    return {};
+}
+
+} // namespace
+
+void GVariantUnref::operator()(GVariant *value) const
+{
+    g_variant_unref(value);
+}
+
+GVariantPtr toGVariant(const QVariant &value, QString *reason)
+{
+    return convert(value, 0, reason);
+}
+
+QVariant toQVariant(GVariant *value)
+{
+    // Data in its normal form is what it says it is: its strings are Unicode, its nesting is
+    // bounded, and no part of it overlaps another to unfold into more than was stored.
+    return g_variant_is_normal_form(value) ? convert(value) : QVariant();
+}

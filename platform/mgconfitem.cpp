@@ -1,0 +1,190 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "mgconfitem.h"
+
+#include <QAbstractEventDispatcher>
+#include <QSemaphore>
+#include <QtDebug>
+#include <cstdlib>
+#include <dconf.h>
+
+namespace {
+
+// How long an exiting process waits for dconf-service to take what was set last.
+constexpr int exitTimeoutMs = 2000;
+
+DConfClient *client();
+
+// dconf sends one change at a time from a thread of its own: what was set just before the process
+// exits is still waiting there. The wait is in another thread because it has no time limit.
+void flushWrites()
+{
+    static auto *const done = new QSemaphore; // for the thread, which may outlast this function
+    GThread *const thread = g_thread_try_new(
+        "settings-flush",
+        [](gpointer) -> gpointer {
+            dconf_client_sync(client());
+            done->release();
+            return nullptr;
+        },
+        nullptr, nullptr);
+    if (thread) {
+        g_thread_unref(thread);
+        done->tryAcquire(1, exitTimeoutMs);
+    }
+}
+
+// One for the process, so that every item sees at once what another one sets.
+DConfClient *client()
+{
+    static DConfClient *const client = [] {
+        std::atexit(flushWrites);
+        return dconf_client_new();
+    }();
+    return client;
+}
+
+void meetBus(GObject *, GAsyncResult *result, gpointer)
+{
+    GError *error = nullptr;
+    GDBusConnection *const bus = g_bus_get_finish(result, &error);
+    if (bus) {
+        // The connection that dconf uses, too. By default GLib ends the process when the bus goes.
+        g_dbus_connection_set_exit_on_close(bus, FALSE);
+        g_object_unref(bus);
+        return;
+    }
+    qWarning("MGConfItem: without a session bus settings can neither be stored nor followed: %s",
+             error->message);
+    g_error_free(error);
+}
+
+// Once per process, as soon as there is an event loop to judge.
+void warnOfLimits()
+{
+    static bool warned = false;
+    const QAbstractEventDispatcher *const dispatcher = QAbstractEventDispatcher::instance();
+    if (warned || !dispatcher) {
+        return;
+    }
+    warned = true;
+    if (dispatcher->inherits("QEventDispatcherGlib")) {
+        g_bus_get(G_BUS_TYPE_SESSION, nullptr, meetBus, nullptr);
+    } else {
+        qWarning("MGConfItem: the event dispatcher is not GLib's: changes by other processes and "
+                 "failures to store will not be seen");
+    }
+}
+
+} // namespace
+
+MGConfItem::MGConfItem(const QString &key, QObject *parent) : QObject(parent), m_key(key)
+{
+    const QByteArray path = key.toUtf8();
+    if (!key.isValidUtf16() || key.contains(QChar::Null) || !dconf_is_key(path, nullptr)) {
+        qWarning("MGConfItem: \"%s\" is not a dconf key", path.constData());
+        return;
+    }
+    m_path = path;
+    warnOfLimits();
+
+    const auto changed = [](DConfClient *, const char *prefix, const char *const *changes,
+                            const char *, gpointer item) {
+        auto *const self = static_cast<MGConfItem *>(item);
+        if (self->isAmong(prefix, changes)) {
+            self->update();
+        }
+    };
+    m_handler = g_signal_connect(client(), "changed", G_CALLBACK(+changed), this);
+    dconf_client_watch_fast(client(), m_path.constData());
+    m_lastValue.reset(dconf_client_read(client(), m_path.constData()));
+}
+
+MGConfItem::~MGConfItem()
+{
+    if (!m_path.isEmpty()) {
+        dconf_client_unwatch_fast(client(), m_path.constData());
+        g_signal_handler_disconnect(client(), m_handler);
+    }
+}
+
+QString MGConfItem::key() const
+{
+    return m_key;
+}
+
+QVariant MGConfItem::value() const
+{
+    if (m_path.isEmpty()) {
+        return {};
+    }
+    const GVariantPtr value(dconf_client_read(client(), m_path.constData()));
+    return value ? toQVariant(value.get()) : QVariant();
+}
+
+QVariant MGConfItem::value(const QVariant &defaultValue) const
+{
+    const QVariant current = value();
+    return current.isValid() ? current : defaultValue;
+}
+
+void MGConfItem::set(const QVariant &value)
+{
+    if (!value.isValid()) {
+        unset();
+        return;
+    }
+    if (m_path.isEmpty()) {
+        return;
+    }
+    QString reason;
+    const GVariantPtr converted = toGVariant(value, &reason);
+    if (!converted) {
+        qWarning("MGConfItem: %s cannot hold %s", m_path.constData(), qUtf8Printable(reason));
+        return;
+    }
+    write(converted.get());
+}
+
+void MGConfItem::unset()
+{
+    if (!m_path.isEmpty()) {
+        write(nullptr);
+    }
+}
+
+// A change names a key, or with a slash at its end a whole folder.
+bool MGConfItem::isAmong(const char *prefix, const char *const *changes) const
+{
+    for (; *changes; ++changes) {
+        const QByteArray path = QByteArray(prefix) + *changes;
+        if (path.endsWith('/') ? m_path.startsWith(path) : m_path == path) {
+            return true;
+        }
+    }
+    return false;
+}
+
+void MGConfItem::update()
+{
+    GVariantPtr value(dconf_client_read(client(), m_path.constData()));
+    const bool same = value && m_lastValue ? g_variant_equal(value.get(), m_lastValue.get())
+                                           : !value && !m_lastValue;
+    if (same) {
+        return;
+    }
+    m_lastValue = std::move(value);
+    Q_EMIT valueChanged(); // the last step: a slot may have deleted this item
+}
+
+void MGConfItem::write(GVariant *value)
+{
+    // A slot that is called from here may delete this item, so no member is used afterwards.
+    const QByteArray path = m_path;
+    GError *error = nullptr;
+    if (!dconf_client_write_fast(client(), path.constData(), value, &error)) {
+        qWarning("MGConfItem: %s cannot be written: %s", path.constData(), error->message);
+        g_error_free(error);
+    }
+}

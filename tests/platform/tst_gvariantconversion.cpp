@@ -1,0 +1,429 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "gvariantconversion.h"
+#include "messagelog.h"
+
+#include <QDate>
+#include <QDebug>
+#include <QRandomGenerator>
+#include <QTest>
+#include <QUrl>
+#include <glib.h>
+#include <limits>
+
+namespace {
+
+// QVariants of different types may compare equal; their descriptions do not.
+QString describe(const QVariant &value)
+{
+    QString description;
+    QDebug(&description).nospace() << value;
+    return description;
+}
+
+QString print(GVariant *value)
+{
+    gchar *const text = g_variant_print(value, TRUE);
+    const QString copy = QString::fromUtf8(text);
+    g_free(text);
+    return copy;
+}
+
+GVariantPtr parse(const QByteArray &text)
+{
+    return GVariantPtr(g_variant_parse(nullptr, text.constData(), nullptr, nullptr, nullptr));
+}
+
+// Data that nobody has looked at, as a damaged database holds it.
+GVariantPtr untrusted(const char *type, const QByteArray &data)
+{
+    GBytes *const bytes = g_bytes_new(data.constData(), static_cast<gsize>(data.size()));
+    GVariant *const value = g_variant_new_from_bytes(G_VARIANT_TYPE(type), bytes, FALSE);
+    g_bytes_unref(bytes);
+    return GVariantPtr(g_variant_ref_sink(value));
+}
+
+QVariant nest(int levels, bool inMaps)
+{
+    QVariant value = 1;
+    for (int i = 0; i < levels; ++i) {
+        value = inMaps ? QVariant(QVariantMap{{QStringLiteral("k"), value}})
+                       : QVariant(QVariantList{value});
+    }
+    return value;
+}
+
+} // namespace
+
+class TestGVariantConversion : public QObject {
+    Q_OBJECT
+
+private Q_SLOTS:
+    void init() { m_log = std::make_unique<MessageLog>(); }
+    void cleanup()
+    {
+        QCOMPARE(m_log->takeAll(), QList<MessageLog::Message>());
+        m_log.reset();
+    }
+
+    void bothWays_data();
+    void bothWays();
+    void floatBecomesDouble();
+    void notANumberStaysOne();
+    void equalHashesBecomeEqualValues();
+    void refusesOtherTypes_data();
+    void refusesOtherTypes();
+    void refusesTextThatIsNone_data();
+    void refusesTextThatIsNone();
+    void holdsThirtyTwoLevels_data();
+    void holdsThirtyTwoLevels();
+    void readsForeignTypes_data();
+    void readsForeignTypes();
+    void readsTheFirstOfEqualKeys();
+    void damagedDataIsInvalid_data();
+    void damagedDataIsInvalid();
+    void deepDataIsInvalid();
+    void anyBytesAreSafe_data();
+    void anyBytesAreSafe();
+
+private:
+    std::unique_ptr<MessageLog> m_log;
+};
+
+void TestGVariantConversion::bothWays_data()
+{
+    QTest::addColumn<QVariant>("value");
+    QTest::addColumn<QString>("printed");
+
+    const QString text = QStringLiteral("text");
+    QTest::newRow("true") << QVariant(true) << QStringLiteral("true");
+    QTest::newRow("false") << QVariant(false) << QStringLiteral("false");
+    QTest::newRow("int") << QVariant(std::numeric_limits<int>::min())
+                         << QStringLiteral("-2147483648");
+    QTest::newRow("uint") << QVariant(std::numeric_limits<uint>::max())
+                          << QStringLiteral("uint32 4294967295");
+    QTest::newRow("qlonglong") << QVariant(std::numeric_limits<qlonglong>::min())
+                               << QStringLiteral("int64 -9223372036854775808");
+    QTest::newRow("qulonglong") << QVariant(std::numeric_limits<qulonglong>::max())
+                                << QStringLiteral("uint64 18446744073709551615");
+    QTest::newRow("double") << QVariant(0.1) << QStringLiteral("0.10000000000000001");
+    QTest::newRow("infinity") << QVariant(-std::numeric_limits<double>::infinity())
+                              << QStringLiteral("-inf");
+    QTest::newRow("string") << QVariant(text) << QStringLiteral("'text'");
+    QTest::newRow("empty string") << QVariant(QString()) << QStringLiteral("''");
+    QTest::newRow("beyond Latin") << QVariant(QStringLiteral("Ünïcödé 日本 😀"))
+                                  << QStringLiteral("'Ünïcödé 日本 😀'");
+    QTest::newRow("byte order mark")
+        << QVariant(QString(QChar::ByteOrderMark) + QChar(QChar::ByteOrderMark) + text)
+        << QStringLiteral("'\\ufeff\\ufefftext'");
+    QTest::newRow("string list") << QVariant(
+        QStringList{QStringLiteral("b"), QString(), QStringLiteral("a")})
+                                 << QStringLiteral("['b', '', 'a']");
+    QTest::newRow("empty string list") << QVariant(QStringList()) << QStringLiteral("@as []");
+    QTest::newRow("list") << QVariant(QVariantList{1, text, QVariantList{true}})
+                          << QStringLiteral("[<1>, <'text'>, <[<true>]>]");
+    QTest::newRow("empty list") << QVariant(QVariantList()) << QStringLiteral("@av []");
+    QTest::newRow("map") << QVariant(QVariantMap{{QStringLiteral("b"), 1.5},
+                                                 {QStringLiteral("a"), QStringList{text}},
+                                                 {QString(), QVariantMap()}})
+                         << QStringLiteral("{'': <@a{sv} {}>, 'a': <['text']>, 'b': <1.5>}");
+    QTest::newRow("empty map") << QVariant(QVariantMap()) << QStringLiteral("@a{sv} {}");
+    QTest::newRow("maps in lists in maps") << QVariant(
+        QVariantMap{{QStringLiteral("k"), QVariantList{QVariantMap{{QStringLiteral("l"), 7U}}}}})
+                                           << QStringLiteral("{'k': <[<{'l': <uint32 7>}>]>}");
+}
+
+void TestGVariantConversion::bothWays()
+{
+    QFETCH(const QVariant, value);
+    QFETCH(const QString, printed);
+
+    QString reason;
+    const GVariantPtr converted = toGVariant(value, &reason);
+    QVERIFY2(converted, qPrintable(reason));
+    QCOMPARE(reason, QString());
+    QVERIFY(!g_variant_is_floating(converted.get()));
+    QCOMPARE(print(converted.get()), printed);
+
+    const QVariant back = toQVariant(converted.get());
+    QCOMPARE(describe(back), describe(value));
+    QCOMPARE(back, value);
+}
+
+void TestGVariantConversion::floatBecomesDouble()
+{
+    QString reason;
+    const GVariantPtr converted = toGVariant(0.5F, &reason);
+    QVERIFY(converted);
+    QCOMPARE(describe(toQVariant(converted.get())), describe(0.5));
+}
+
+void TestGVariantConversion::notANumberStaysOne()
+{
+    QString reason;
+    const GVariantPtr converted = toGVariant(std::numeric_limits<double>::quiet_NaN(), &reason);
+    QVERIFY(converted);
+    QCOMPARE(print(converted.get()), QStringLiteral("nan"));
+    QVERIFY(qIsNaN(toQVariant(converted.get()).toDouble()));
+}
+
+void TestGVariantConversion::equalHashesBecomeEqualValues()
+{
+    QVariantHash forward;
+    QVariantHash backward;
+    backward.reserve(1000);
+    for (int i = 0; i < 50; ++i) {
+        forward.insert(QString::number(i), i);
+        backward.insert(QString::number(49 - i), 49 - i);
+    }
+    QCOMPARE(forward, backward);
+    QVERIFY(forward.keys() != backward.keys());
+
+    QString reason;
+    const GVariantPtr first = toGVariant(forward, &reason);
+    const GVariantPtr second = toGVariant(backward, &reason);
+    QVERIFY(first && second);
+    QVERIFY(g_variant_equal(first.get(), second.get()));
+    QCOMPARE(describe(toQVariant(first.get())), describe(QVariant(forward).toMap()));
+}
+
+void TestGVariantConversion::refusesOtherTypes_data()
+{
+    QTest::addColumn<QVariant>("value");
+    QTest::addColumn<QString>("reason");
+
+    const auto type = [](const char *name) {
+        return QStringLiteral("a value of type %1").arg(QLatin1String(name));
+    };
+    QTest::newRow("bytes") << QVariant(QByteArray("bytes")) << type("QByteArray");
+    QTest::newRow("date") << QVariant(QDate(2026, 1, 2)) << type("QDate");
+    QTest::newRow("URL") << QVariant(QUrl(QStringLiteral("file:///x"))) << type("QUrl");
+    QTest::newRow("character") << QVariant(QChar(u'x')) << type("QChar");
+    QTest::newRow("null pointer") << QVariant::fromValue(nullptr) << type("std::nullptr_t");
+    QTest::newRow("object") << QVariant::fromValue<QObject *>(this) << type("QObject*");
+    QTest::newRow("in a list") << QVariant(QVariantList{1, QByteArray()}) << type("QByteArray");
+    QTest::newRow("in a map") << QVariant(QVariantMap{{QStringLiteral("k"), QUrl()}})
+                              << type("QUrl");
+    QTest::newRow("in a hash") << QVariant(QVariantHash{{QStringLiteral("k"), QUrl()}})
+                               << type("QUrl");
+    QTest::newRow("invalid") << QVariant() << QStringLiteral("an invalid QVariant");
+    QTest::newRow("invalid in a list")
+        << QVariant(QVariantList{QVariant()}) << QStringLiteral("an invalid QVariant");
+}
+
+void TestGVariantConversion::refusesOtherTypes()
+{
+    QFETCH(const QVariant, value);
+    QFETCH(const QString, reason);
+
+    QString given;
+    QVERIFY(!toGVariant(value, &given));
+    QCOMPARE(given, reason);
+}
+
+void TestGVariantConversion::refusesTextThatIsNone_data()
+{
+    QTest::addColumn<QString>("text");
+
+    const QString around = QStringLiteral("x");
+    QTest::newRow("NUL") << around + QChar(QChar::Null) + around;
+    QTest::newRow("NUL at the end") << around + QChar(QChar::Null);
+    QTest::newRow("high surrogate") << around + QChar(0xD83D) + around;
+    QTest::newRow("high surrogate at the end") << around + QChar(0xD83D);
+    QTest::newRow("low surrogate") << QString(QChar(0xDE00)) + around;
+    QTest::newRow("swapped surrogates") << QString(QChar(0xDE00)) + QChar(0xD83D);
+}
+
+void TestGVariantConversion::refusesTextThatIsNone()
+{
+    QFETCH(const QString, text);
+
+    const QString fine = QStringLiteral("fine");
+    const QVariantList carriers = {
+        text,
+        QStringList{fine, text},
+        QVariantList{fine, text},
+        QVariantMap{{fine, text}},
+        QVariantMap{{text, fine}},
+        QVariantHash{{text, fine}},
+        QVariantList{QVariantMap{{fine, QVariantMap{{text, fine}}}}},
+        QVariantMap{{fine, QStringList{text}}},
+    };
+    for (const QVariant &carrier : carriers) {
+        QString reason;
+        QVERIFY2(!toGVariant(carrier, &reason), qPrintable(describe(carrier)));
+        QCOMPARE(reason,
+                 QStringLiteral("text of type QString with a NUL or half a surrogate pair"));
+    }
+}
+
+void TestGVariantConversion::holdsThirtyTwoLevels_data()
+{
+    QTest::addColumn<bool>("inMaps");
+    QTest::addColumn<QString>("type");
+
+    QTest::newRow("lists") << false << QStringLiteral("QVariantList");
+    QTest::newRow("maps") << true << QStringLiteral("QVariantMap");
+}
+
+void TestGVariantConversion::holdsThirtyTwoLevels()
+{
+    QFETCH(const bool, inMaps);
+    QFETCH(const QString, type);
+
+    QString reason;
+    const GVariantPtr deepest = toGVariant(nest(32, inMaps), &reason);
+    QVERIFY(deepest);
+    QCOMPARE(toQVariant(deepest.get()), nest(32, inMaps));
+
+    const auto levels = {33, 10000};
+    for (const int deeper : levels) {
+        QVERIFY(!toGVariant(nest(deeper, inMaps), &reason));
+        QCOMPARE(reason,
+                 QStringLiteral("a value of type %1 nested deeper than 32 levels").arg(type));
+    }
+}
+
+void TestGVariantConversion::readsForeignTypes_data()
+{
+    QTest::addColumn<QVariant>("value");
+
+    const auto text = [](const char *latin) { return QString::fromLatin1(latin); };
+    QTest::newRow("byte 0xff") << QVariant(255);
+    QTest::newRow("int16 -5") << QVariant(-5);
+    QTest::newRow("uint16 65535") << QVariant(65535U);
+    QTest::newRow("handle 3") << QVariant(3);
+    QTest::newRow("objectpath '/a/b'") << QVariant(text("/a/b"));
+    QTest::newRow("signature 'a{sv}'") << QVariant(text("a{sv}"));
+    QTest::newRow("<<<'deep'>>>") << QVariant(text("deep"));
+    QTest::newRow("[1, 2]") << QVariant(QVariantList{1, 2});
+    QTest::newRow("@ai []") << QVariant(QVariantList());
+    QTest::newRow("[['a'], []]") << QVariant(QVariantList{QStringList{text("a")}, QStringList()});
+    QTest::newRow("[objectpath '/a']") << QVariant(QVariantList{text("/a")});
+    QTest::newRow("@ay [0x61, 0x00, 0xff]") << QVariant(QByteArray("a\0\xff", 3));
+    QTest::newRow("b'bytes'") << QVariant(QByteArray("bytes\0", 6));
+    QTest::newRow("@ay []") << QVariant(QByteArray(""));
+    QTest::newRow("{'a': 1}") << QVariant(QVariantMap{{text("a"), 1}});
+    QTest::newRow("{'a': 'b'}") << QVariant(QVariantMap{{text("a"), text("b")}});
+    QTest::newRow("@a{ss} {}") << QVariant(QVariantMap());
+    QTest::newRow("{objectpath '/a': <1>}") << QVariant(QVariantMap{{text("/a"), 1}});
+    QTest::newRow("{1: 'x', -2: 'y'}")
+        << QVariant(QVariantMap{{text("1"), text("x")}, {text("-2"), text("y")}});
+    QTest::newRow("{true: 1}") << QVariant(QVariantMap{{text("true"), 1}});
+    QTest::newRow("{uint64 18446744073709551615: 1}")
+        << QVariant(QVariantMap{{text("18446744073709551615"), 1}});
+    QTest::newRow("{1.5: 1}") << QVariant(QVariantMap{{text("1.5"), 1}});
+    QTest::newRow("@ms nothing") << QVariant();
+    QTest::newRow("@ms 'some'") << QVariant(text("some"));
+    QTest::newRow("@mms just nothing") << QVariant();
+    QTest::newRow("@ami [just 1, nothing]") << QVariant(QVariantList{1, QVariant()});
+    QTest::newRow("()") << QVariant(QVariantList());
+    QTest::newRow("('a', 1, [true])") << QVariant(QVariantList{text("a"), 1, QVariantList{true}});
+    QTest::newRow("{'a', 1}") << QVariant(QVariantList{text("a"), 1}); // an entry on its own
+}
+
+void TestGVariantConversion::readsForeignTypes()
+{
+    QFETCH(const QVariant, value);
+
+    const GVariantPtr foreign = parse(QTest::currentDataTag());
+    QVERIFY(foreign);
+    QCOMPARE(describe(toQVariant(foreign.get())), describe(value));
+}
+
+void TestGVariantConversion::readsTheFirstOfEqualKeys()
+{
+    const GVariantPtr foreign = parse("{'a': 1, 'b': 2, 'a': 3}");
+    QCOMPARE(toQVariant(foreign.get()).toMap(),
+             (QVariantMap{{QStringLiteral("a"), 1}, {QStringLiteral("b"), 2}}));
+}
+
+void TestGVariantConversion::damagedDataIsInvalid_data()
+{
+    QTest::addColumn<QByteArray>("type");
+    QTest::addColumn<QByteArray>("data");
+
+    const auto row = [](const char *name, const char *type, const QByteArray &data) {
+        QTest::newRow(name) << QByteArray(type) << data;
+    };
+    row("boolean of 2", "b", "\2");
+    row("integer of three bytes", "i", "123");
+    row("string without its end", "s", "abc");
+    row("string of Latin-1", "s", QByteArray("\xe4\0", 2));
+    row("string of half a surrogate pair", "s", QByteArray("\xed\xa0\xbd\0", 4));
+    row("string with a NUL", "s", QByteArray("a\0b\0", 4));
+    row("empty string data", "s", "");
+    row("object path that is none", "o", QByteArray("no path\0", 8));
+    row("signature that is none", "g", QByteArray("!\0", 2));
+    row("list whose offsets lie outside", "as", QByteArray("a\0\xff", 3));
+    row("list whose elements overlap", "as", QByteArray("a\0\2\0\2\0\2", 7));
+    row("variant of no type", "v", QByteArray("1234\0!", 6));
+    row("variant without its end", "v", "1234");
+    row("map with a damaged key", "a{sv}", QByteArray("\xff\0\0\0\0\0\0\0\1\0i\2\x0c", 13));
+    row("maybe of two sizes", "mi", "12345");
+}
+
+void TestGVariantConversion::damagedDataIsInvalid()
+{
+    QFETCH(const QByteArray, type);
+    QFETCH(const QByteArray, data);
+
+    const GVariantPtr value = untrusted(type, data);
+    QCOMPARE(describe(toQVariant(value.get())), describe(QVariant()));
+}
+
+void TestGVariantConversion::deepDataIsInvalid()
+{
+    // Each "v" holds the one before it: its data, a zero and its type.
+    QByteArray data("\1\0b", 3);
+    for (int level = 0; level < 10000; ++level) {
+        data += QByteArray("\0v", 2);
+    }
+    const GVariantPtr value = untrusted("v", data);
+    QCOMPARE(describe(toQVariant(value.get())), describe(QVariant()));
+}
+
+void TestGVariantConversion::anyBytesAreSafe_data()
+{
+    QTest::addColumn<QByteArray>("type");
+
+    const auto types = {"b",     "y",       "s",     "o",  "g",   "v",     "d",
+                        "h",     "as",      "ay",    "av", "aas", "a{sv}", "a{ss}",
+                        "a{iv}", "a{dv}",   "ms",    "mv", "ami", "(sv)",  "(iasa{sv})",
+                        "{sv}",  "aaaaaav", "a(yv)", "()", "a()", "m()"};
+    for (const char *type : types) {
+        QTest::newRow(type) << QByteArray(type);
+    }
+}
+
+// A fixed seed: the same bytes in every run.
+void TestGVariantConversion::anyBytesAreSafe()
+{
+    QFETCH(const QByteArray, type);
+
+    const QByteArray common("\0\0\0\0\1\2\3\4sviba{}()y\xff", 19);
+    QRandomGenerator random(20260101);
+    for (int round = 0; round < 2000; ++round) {
+        QByteArray data(random.bounded(64), '\0');
+        for (char &byte : data) {
+            byte = common.at(random.bounded(common.size()));
+        }
+        const GVariantPtr value = untrusted(type, data);
+        const QVariant converted = toQVariant(value.get());
+        if (!g_variant_is_normal_form(value.get())) {
+            QVERIFY2(!converted.isValid(), data.toHex().constData());
+        }
+    }
+}
+
+int main(int argc, char *argv[])
+{
+    g_log_set_always_fatal(static_cast<GLogLevelFlags>(G_LOG_LEVEL_ERROR | G_LOG_LEVEL_CRITICAL
+                                                       | G_LOG_LEVEL_WARNING));
+    QCoreApplication app(argc, argv);
+    TestGVariantConversion test;
+    return QTest::qExec(&test, argc, argv);
+}
+
+#include "tst_gvariantconversion.moc"

@@ -8,7 +8,7 @@
 #include <memory>
 
 class QString;
-typedef struct _GVariant GVariant; // NOLINT(modernize-use-using): GLib's own declaration
+using GVariant = struct _GVariant; // NOLINT(bugprone-reserved-identifier): as GLib declares it
 
 struct GVariantUnref {
     void operator()(GVariant *value) const;

@@ -83,6 +83,15 @@ int follow(QCoreApplication &app)
     return app.exec();
 }
 
+// As above, but sets nothing.
+int watch(QCoreApplication &app)
+{
+    const MGConfItem item(followedKey);
+    QObject::connect(&item, &MGConfItem::valueChanged, &app, [] { say("changed"); });
+    say("ready");
+    return app.exec();
+}
+
 // Says "ready" when its connection can be cut, "cut" when it was.
 int outliveTheBus(QCoreApplication &app)
 {
@@ -108,8 +117,11 @@ int outliveTheBus(QCoreApplication &app)
 }
 
 const QHash<QString, int (*)(QCoreApplication &)> all = {
-    {QStringLiteral("setAndExit"), setAndExit},           {QStringLiteral("setLocked"), setLocked},
-    {QStringLiteral("setAndSeeItFail"), setAndSeeItFail}, {QStringLiteral("follow"), follow},
+    {QStringLiteral("setAndExit"), setAndExit},
+    {QStringLiteral("setLocked"), setLocked},
+    {QStringLiteral("setAndSeeItFail"), setAndSeeItFail},
+    {QStringLiteral("follow"), follow},
+    {QStringLiteral("watch"), watch},
     {QStringLiteral("outliveTheBus"), outliveTheBus},
 };
 
@@ -192,6 +204,30 @@ private:
     QList<QByteArray> m_lines;
 };
 
+// A session bus for one child.
+class Bus : public QProcess {
+public:
+    Bus()
+    {
+        start(QStringLiteral("dbus-daemon"),
+              {QStringLiteral("--session"), QStringLiteral("--nofork"),
+               QStringLiteral("--print-address")});
+        if (waitForReadyRead()) {
+            m_address = QString::fromUtf8(readLine().trimmed());
+        }
+    }
+    ~Bus() override
+    {
+        kill();
+        waitForFinished();
+    }
+
+    QString address() const { return m_address; }
+
+private:
+    QString m_address;
+};
+
 // What the dconf tool prints; the tool is the other process of these tests.
 QByteArray dconf(const QStringList &arguments, const QByteArray &input = {})
 {
@@ -213,6 +249,14 @@ void dconfWrite(const QString &key, const char *value)
 QByteArray dconfRead(const QString &key)
 {
     return dconf({QStringLiteral("read"), key});
+}
+
+// Of dconf-service; 0 if it does not run.
+pid_t servicePid()
+{
+    const QDBusReply<uint> pid =
+        QDBusConnection::sessionBus().interface()->servicePid(QStringLiteral("ca.desrt.dconf"));
+    return static_cast<pid_t>(pid.value());
 }
 
 } // namespace
@@ -241,6 +285,7 @@ private Q_SLOTS:
     void followsOtherProcesses();
     void followsSeveralChangesAtOnce();
     void followsTheResetOfAFolder();
+    void missesNothingWhileTheBusIsSlow();
 
     void slotMaySet();
     void slotMayDeleteItsItem();
@@ -361,9 +406,12 @@ void TestMGConfItem::unsetForgetsTheValue()
     MGConfItem item(key);
     item.set(1);
     QTRY_COMPARE(dconfRead(key), QByteArray("1"));
+    const MGConfItem fresh(key); // has seen no change yet
     const QSignalSpy changed(&item, &MGConfItem::valueChanged);
+    const QSignalSpy freshChanged(&fresh, &MGConfItem::valueChanged);
     item.unset();
     QCOMPARE(changed.count(), 1);
+    QCOMPARE(freshChanged.count(), 1);
     QVERIFY(!item.value().isValid());
     item.unset();
     QCOMPARE(changed.count(), 1);
@@ -477,6 +525,24 @@ void TestMGConfItem::followsTheResetOfAFolder()
     QCOMPARE(insideChanged.count(), 1);
     QCOMPARE(emptyChanged.count(), 0);
     QCOMPARE(neighbourChanged.count(), 0);
+}
+
+void TestMGConfItem::missesNothingWhileTheBusIsSlow()
+{
+    // The change goes over another bus, so that no message of it reaches the item: dconf notices
+    // by itself what changed between the item's first look and the bus's answer.
+    Bus bus;
+    QVERIFY(!bus.address().isEmpty());
+    const auto pid = static_cast<pid_t>(bus.processId());
+    QCOMPARE(::kill(pid, SIGSTOP), 0);
+    Child child({QStringLiteral("watch")},
+                {{QStringLiteral("DBUS_SESSION_BUS_ADDRESS"), bus.address()}});
+    QVERIFY(child.says("ready"));
+    dconfWrite(scenarios::followedKey, "'theirs'");
+    QCOMPARE(dconfRead(scenarios::followedKey), QByteArray("'theirs'"));
+    QCOMPARE(child.lines(), QList<QByteArray>{"ready"});
+    QCOMPARE(::kill(pid, SIGCONT), 0);
+    QVERIFY(child.says("changed"));
 }
 
 void TestMGConfItem::slotMaySet()
@@ -752,8 +818,14 @@ void TestMGConfItem::failedStoreReverts()
         QVERIFY(QFile(config.filePath(folder)).open(QIODevice::WriteOnly));
 
         connect(&item, &MGConfItem::valueChanged, this, [&] { seen.append(item.value()); });
+        // The service must not fail before the new value was seen.
+        const pid_t pid = servicePid();
+        QVERIFY(pid > 0);
+        QCOMPARE(::kill(pid, SIGSTOP), 0);
         item.set(2);
-        QCOMPARE(seen, QVariantList{2});
+        const QVariantList seenAtOnce = seen;
+        QCOMPARE(::kill(pid, SIGCONT), 0);
+        QCOMPARE(seenAtOnce, QVariantList{2});
         QTRY_COMPARE(seen, (QVariantList{2, 1}));
     }
     item.set(3);
@@ -788,10 +860,8 @@ void TestMGConfItem::exitLosesNothing()
 void TestMGConfItem::exitDoesNotHangOnAStoppedService()
 {
     dconfWrite(QStringLiteral("/test/key"), "1"); // starts the service, if need be
-    const QDBusReply<uint> service =
-        QDBusConnection::sessionBus().interface()->servicePid(QStringLiteral("ca.desrt.dconf"));
-    QVERIFY(service.isValid());
-    const auto pid = static_cast<pid_t>(service.value());
+    const pid_t pid = servicePid();
+    QVERIFY(pid > 0);
     QCOMPARE(::kill(pid, SIGSTOP), 0);
     Child child({QStringLiteral("setAndExit"), QStringLiteral("2")});
     // An answer that never comes counts as a failure after 25 s; nobody waits that long.
@@ -819,6 +889,7 @@ void TestMGConfItem::withoutGlibWarnsOnce()
 {
     Child child({QStringLiteral("follow")}, {{QStringLiteral("QT_NO_GLIB"), QStringLiteral("1")}});
     QVERIFY(child.says("ready"));
+    QTRY_COMPARE(dconfRead(scenarios::followedKey), QByteArray("'own'"));
     dconfWrite(scenarios::followedKey, "'theirs'");
     QTest::qWait(300);
     child.terminate();
@@ -840,16 +911,10 @@ void TestMGConfItem::withoutGlibWarnsOnce()
 
 void TestMGConfItem::outlivesTheBus()
 {
-    QProcess bus;
-    bus.start(QStringLiteral("dbus-daemon"),
-              {QStringLiteral("--session"), QStringLiteral("--nofork"),
-               QStringLiteral("--print-address")});
-    QVERIFY(bus.waitForReadyRead());
-    const QString address = QString::fromUtf8(bus.readLine().trimmed());
-    QVERIFY(!address.isEmpty());
-
+    Bus bus;
+    QVERIFY(!bus.address().isEmpty());
     Child child({QStringLiteral("outliveTheBus")},
-                {{QStringLiteral("DBUS_SESSION_BUS_ADDRESS"), address}});
+                {{QStringLiteral("DBUS_SESSION_BUS_ADDRESS"), bus.address()}});
     QVERIFY(child.says("ready"));
     bus.kill();
     QVERIFY(bus.waitForFinished());

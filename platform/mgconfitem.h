@@ -19,7 +19,8 @@
     emitted, before set() returns; it is stored in the background, whether or not the item lives on.
     If it could not be stored the key falls back to its old value, with another valueChanged().
 */
-class MGConfItem : public QObject {
+class MGConfItem : public QObject
+{
     Q_OBJECT
 
 public:

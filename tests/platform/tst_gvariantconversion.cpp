@@ -56,7 +56,8 @@ QVariant nest(int levels, bool inMaps)
 
 } // namespace
 
-class TestGVariantConversion : public QObject {
+class TestGVariantConversion : public QObject
+{
     Q_OBJECT
 
 private Q_SLOTS:

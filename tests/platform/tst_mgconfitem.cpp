@@ -145,7 +145,8 @@ QString describe(const QVariant &value)
     return description;
 }
 
-class Child : public QProcess {
+class Child : public QProcess
+{
 public:
     explicit Child(const QStringList &scenario, const QMap<QString, QString> &environment = {})
     {
@@ -205,7 +206,8 @@ private:
 };
 
 // A session bus for one child.
-class Bus : public QProcess {
+class Bus : public QProcess
+{
 public:
     Bus()
     {
@@ -261,7 +263,8 @@ pid_t servicePid()
 
 } // namespace
 
-class TestMGConfItem : public QObject {
+class TestMGConfItem : public QObject
+{
     Q_OBJECT
 
 private Q_SLOTS:

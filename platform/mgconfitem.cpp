@@ -12,7 +12,7 @@
 namespace {
 
 // How long an exiting process waits for dconf-service to take what was set last.
-constexpr int exitTimeoutMs = 2000;
+constexpr int exitTimeoutMs = 5000;
 
 DConfClient *client();
 

@@ -211,9 +211,10 @@ class Bus : public QProcess
 public:
     Bus()
     {
+        const QString folder = qEnvironmentVariable("XDG_RUNTIME_DIR");
         start(QStringLiteral("dbus-daemon"),
               {QStringLiteral("--session"), QStringLiteral("--nofork"),
-               QStringLiteral("--print-address")});
+               QStringLiteral("--print-address"), QStringLiteral("--address=unix:dir=") + folder});
         if (waitForReadyRead()) {
             m_address = QString::fromUtf8(readLine().trimmed());
         }
@@ -251,6 +252,13 @@ void dconfWrite(const QString &key, const char *value)
 QByteArray dconfRead(const QString &key)
 {
     return dconf({QStringLiteral("read"), key});
+}
+
+// Every test has keys of its own: what one set last may be stored when the next one runs.
+QString newKey()
+{
+    static int count = 0;
+    return QStringLiteral("/test/key%1").arg(++count);
 }
 
 // Of dconf-service; 0 if it does not run.
@@ -320,7 +328,7 @@ private:
 
 void TestMGConfItem::startsUnset()
 {
-    const QString key = QStringLiteral("/test/key");
+    const QString key = newKey();
     QObject parent;
     const auto *const item = new MGConfItem(key, &parent);
     QCOMPARE(item->parent(), &parent);
@@ -331,10 +339,10 @@ void TestMGConfItem::startsUnset()
 
 void TestMGConfItem::setIsSeenByEveryItemBeforeItReturns()
 {
-    const QString key = QStringLiteral("/test/key");
+    const QString key = newKey();
     MGConfItem item(key);
     const MGConfItem another(key);
-    const MGConfItem other(QStringLiteral("/test/key2"));
+    const MGConfItem other(key + QLatin1Char('x'));
     const QSignalSpy changed(&item, &MGConfItem::valueChanged);
     const QSignalSpy anotherChanged(&another, &MGConfItem::valueChanged);
     const QSignalSpy otherChanged(&other, &MGConfItem::valueChanged);
@@ -368,9 +376,8 @@ void TestMGConfItem::equalValueEmitsNothing()
         QStringList(),
         QVariantMap{{QStringLiteral("k"), QVariantList{1, 2}}},
     };
-    for (int i = 0; i < values.count(); ++i) {
-        const QVariant &value = values.at(i);
-        const QString key = QStringLiteral("/test/key%1").arg(i);
+    for (const QVariant &value : values) {
+        const QString key = newKey();
         MGConfItem item(key);
         item.set(value);
         const QSignalSpy changed(&item, &MGConfItem::valueChanged);
@@ -391,7 +398,7 @@ void TestMGConfItem::equalValueEmitsNothing()
 
 void TestMGConfItem::anotherTypeIsAnotherValue()
 {
-    MGConfItem item(QStringLiteral("/test/key"));
+    MGConfItem item(newKey());
     item.set(1);
     const QSignalSpy changed(&item, &MGConfItem::valueChanged);
     item.set(1U);
@@ -405,7 +412,7 @@ void TestMGConfItem::anotherTypeIsAnotherValue()
 
 void TestMGConfItem::unsetForgetsTheValue()
 {
-    const QString key = QStringLiteral("/test/key");
+    const QString key = newKey();
     MGConfItem item(key);
     item.set(1);
     QTRY_COMPARE(dconfRead(key), QByteArray("1"));
@@ -423,7 +430,7 @@ void TestMGConfItem::unsetForgetsTheValue()
 
 void TestMGConfItem::invalidValueUnsets()
 {
-    const QString key = QStringLiteral("/test/key");
+    const QString key = newKey();
     MGConfItem item(key);
     item.set(1);
     const QSignalSpy changed(&item, &MGConfItem::valueChanged);
@@ -446,7 +453,7 @@ void TestMGConfItem::temporaryItemStores()
 
 void TestMGConfItem::deletedItemHearsNothing()
 {
-    const QString key = QStringLiteral("/test/key");
+    const QString key = newKey();
     int heard = 0;
     auto item = std::make_unique<MGConfItem>(key);
     connect(item.get(), &MGConfItem::valueChanged, this, [&heard] { ++heard; });
@@ -454,6 +461,7 @@ void TestMGConfItem::deletedItemHearsNothing()
     const QSignalSpy changed(&another, &MGConfItem::valueChanged);
     item.reset();
     MGConfItem(key).set(1);
+    QTRY_COMPARE(dconfRead(key), QByteArray("1"));
     dconfWrite(key, "2");
     QTRY_COMPARE(changed.count(), 2); // the other item still follows the key
     QCOMPARE(heard, 0);
@@ -461,7 +469,7 @@ void TestMGConfItem::deletedItemHearsNothing()
 
 void TestMGConfItem::followsOtherProcesses()
 {
-    const QString key = QStringLiteral("/test/key");
+    const QString key = newKey();
     const MGConfItem item(key);
     const MGConfItem another(key);
     QSignalSpy changed(&item, &MGConfItem::valueChanged);
@@ -550,7 +558,7 @@ void TestMGConfItem::missesNothingWhileTheBusIsSlow()
 
 void TestMGConfItem::slotMaySet()
 {
-    const QString key = QStringLiteral("/test/key");
+    const QString key = newKey();
     MGConfItem first(key);
     MGConfItem second(key);
     QVariantList seenByFirst;
@@ -570,25 +578,25 @@ void TestMGConfItem::slotMaySet()
 
 void TestMGConfItem::slotMayDeleteItsItem()
 {
-    const QString key = QStringLiteral("/test/key");
-    const auto deleteOnChange = [this, &key] {
+    const auto deleteOnChange = [this](const QString &key) {
         auto *const item = new MGConfItem(key);
         connect(item, &MGConfItem::valueChanged, this, [item] { delete item; });
         return QPointer<MGConfItem>(item);
     };
 
-    const QPointer<MGConfItem> setsItself = deleteOnChange();
+    const QPointer<MGConfItem> setsItself = deleteOnChange(newKey());
     setsItself->set(1);
     QVERIFY(!setsItself);
 
-    const QPointer<MGConfItem> follows = deleteOnChange();
+    const QString key = newKey();
+    const QPointer<MGConfItem> follows = deleteOnChange(key);
     dconfWrite(key, "2");
     QTRY_VERIFY(!follows);
 }
 
 void TestMGConfItem::slotMayDeleteAnotherItem()
 {
-    const QString key = QStringLiteral("/test/key");
+    const QString key = newKey();
     const QPointer<MGConfItem> before = new MGConfItem(key);
     const QPointer<MGConfItem> deleter = new MGConfItem(key);
     const QPointer<MGConfItem> after = new MGConfItem(key);
@@ -608,7 +616,7 @@ void TestMGConfItem::slotMayDeleteAnotherItem()
 
 void TestMGConfItem::slotMayMakeAnItem()
 {
-    const QString key = QStringLiteral("/test/key");
+    const QString key = newKey();
     MGConfItem item(key);
     std::unique_ptr<MGConfItem> made;
     int heard = 0;
@@ -654,7 +662,7 @@ void TestMGConfItem::storesWhatOthersRead()
     QFETCH(const QVariant, value);
     QFETCH(const QByteArray, printed);
 
-    const QString key = QStringLiteral("/test/key");
+    const QString key = newKey();
     MGConfItem item(key);
     item.set(value);
     QCOMPARE(describe(item.value()), describe(value)); // on its way
@@ -690,7 +698,7 @@ void TestMGConfItem::readsWhatOthersStore()
 {
     QFETCH(const QVariant, value);
 
-    const QString key = QStringLiteral("/test/key");
+    const QString key = newKey();
     const MGConfItem item(key);
     QSignalSpy changed(&item, &MGConfItem::valueChanged);
     dconfWrite(key, QTest::currentDataTag());
@@ -720,7 +728,7 @@ void TestMGConfItem::refusesWhatCannotBeHeld()
     QFETCH(const QVariant, value);
     QFETCH(const QString, reason);
 
-    const QString key = QStringLiteral("/test/key");
+    const QString key = newKey();
     MGConfItem item(key);
     item.set(1);
     QTRY_COMPARE(dconfRead(key), QByteArray("1"));
@@ -728,7 +736,7 @@ void TestMGConfItem::refusesWhatCannotBeHeld()
     item.set(value);
     const MessageLog::Message warning{
         QtWarningMsg, QStringLiteral("default"),
-        QStringLiteral("MGConfItem: /test/key cannot hold %1").arg(reason)};
+        QStringLiteral("MGConfItem: %1 cannot hold %2").arg(key, reason)};
     QCOMPARE(m_log->takeAll(), QList<MessageLog::Message>{warning});
     QCOMPARE(changed.count(), 0);
     QCOMPARE(describe(item.value()), describe(1));
@@ -745,12 +753,12 @@ void TestMGConfItem::badKeyIsInert_data()
         QTest::newRow(name) << key << QString::fromUtf8(key.toUtf8().constData());
     };
     row("empty", QString());
-    row("relative", QStringLiteral("test/key"));
-    row("folder", QStringLiteral("/test/"));
+    row("relative", QStringLiteral("test/bad/key"));
+    row("folder", QStringLiteral("/test/bad/"));
     row("root", QStringLiteral("/"));
-    row("two slashes", QStringLiteral("/test//key"));
-    row("NUL", QStringLiteral("/test/key") + QChar(QChar::Null) + QStringLiteral("x"));
-    row("lone surrogate", QStringLiteral("/test/key") + QChar(0xD83D));
+    row("two slashes", QStringLiteral("/test/bad//key"));
+    row("NUL", QStringLiteral("/test/bad/key") + QChar(QChar::Null) + QStringLiteral("x"));
+    row("lone surrogate", QStringLiteral("/test/bad/key") + QChar(0xD83D));
 }
 
 void TestMGConfItem::badKeyIsInert()
@@ -768,10 +776,10 @@ void TestMGConfItem::badKeyIsInert()
     QCOMPARE(item.key(), key);
     QVERIFY(!item.value().isValid());
     QCOMPARE(describe(item.value(7)), describe(7));
-    dconf({QStringLiteral("write"), QStringLiteral("/test/key"), QStringLiteral("1")});
+    dconf({QStringLiteral("write"), QStringLiteral("/test/bad/key"), QStringLiteral("1")});
     QTest::qWait(50);
     QCOMPARE(changed.count(), 0);
-    QCOMPARE(dconf({QStringLiteral("list"), QStringLiteral("/test/")}), QByteArray("key"));
+    QCOMPARE(dconf({QStringLiteral("list"), QStringLiteral("/test/bad/")}), QByteArray("key"));
 }
 
 void TestMGConfItem::lockedKeyStays()
@@ -801,7 +809,7 @@ void TestMGConfItem::lockedKeyStays()
 
 void TestMGConfItem::failedStoreReverts()
 {
-    const QString key = QStringLiteral("/test/key");
+    const QString key = newKey();
     MGConfItem item(key);
     item.set(1);
     QTRY_COMPARE(dconfRead(key), QByteArray("1"));

@@ -165,12 +165,18 @@ QVariantMap QuickActionsModel::Action::readActionConfig(const QString &path) con
     }
 
     QVariantMap config;
-    const QStringList keys = settings.childKeys();
+    bool hasArguments = false;
+    const QStringList keys = settings.allKeys();
     for (const QString &key : keys) {
-        config.insert(key, settings.value(key));
+        const int groupLength = key.indexOf(QLatin1Char('/'));
+        if (groupLength < 0) {
+            config.insert(key, settings.value(key));
+        } else if (key.leftRef(groupLength) == argumentsKey) {
+            hasArguments = true;
+        }
     }
     // An array without elements is an entry too; no other group is of interest.
-    if (settings.childGroups().contains(argumentsKey)) {
+    if (hasArguments) {
         QVariantList arguments;
         const int size = qMin(settings.beginReadArray(argumentsKey), enoughArguments);
         for (int i = 0; i < size; ++i) {

@@ -1,0 +1,73 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+import QtQuick 2.15
+import QtQuick.Controls 2.15
+import QtQuick.Layouts 1.15
+// Importing the module brings the texts of the settings pages.
+import com.marlo.settings.system 1.0
+
+/*
+    The gallery: a start page that lists the pages, and a page for each of the module's types.
+*/
+ApplicationWindow {
+    id: window
+
+    readonly property alias pages: pages.list
+    readonly property alias currentPage: stack.currentItem
+
+    function open(page) {
+        close();
+        return stack.push("pages/" + page.file, StackView.Immediate);
+    }
+
+    function close() {
+        stack.pop(null, StackView.Immediate);
+    }
+
+    width: 360
+    height: 640
+    minimumWidth: 320
+    minimumHeight: 480
+    visible: true
+    title: qsTrId("gallery-title")
+
+    Pages {
+        id: pages
+    }
+
+    header: ToolBar {
+        RowLayout {
+            anchors.fill: parent
+
+            ToolButton {
+                visible: stack.depth > 1
+                icon.source: "icons/back.svg"
+                Accessible.name: qsTrId("gallery-back")
+                onClicked: window.close()
+            }
+            Label {
+                Layout.fillWidth: true
+                Layout.leftMargin: stack.depth > 1 ? 0 : 16
+                text: stack.currentItem.title
+                font.pixelSize: 20
+                elide: Text.ElideRight
+            }
+            LanguageButton {}
+        }
+    }
+
+    StackView {
+        id: stack
+        anchors.fill: parent
+        initialItem: StartPage {
+            pages: window.pages
+            onOpened: window.open(page)
+        }
+    }
+
+    Shortcut {
+        sequences: ["Esc", StandardKey.Back]
+        onActivated: window.close()
+    }
+}

@@ -1,0 +1,36 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+import QtQuick 2.15
+import QtQuick.Controls 2.15
+import gallery.stage 1.0
+
+/*
+    Shows the language and lets the user choose another.
+*/
+ToolButton {
+    id: button
+
+    readonly property var languages: ({ "en": "English", "fi": "Suomi", "de": "Deutsch" })
+
+    text: languages[Stage.language] || Stage.language
+    icon.source: "icons/language.svg"
+    font.capitalization: Font.MixedCase
+    Accessible.name: qsTrId("gallery-language")
+    onClicked: menu.open()
+
+    Menu {
+        id: menu
+        y: button.height
+
+        Repeater {
+            model: Object.keys(button.languages)
+            MenuItem {
+                text: button.languages[modelData]
+                checkable: true
+                checked: Stage.language === modelData
+                onTriggered: Stage.language = modelData
+            }
+        }
+    }
+}

@@ -1,0 +1,40 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+import QtQuick 2.15
+import QtQuick.Controls 2.15
+import QtQuick.Controls.impl 2.15
+import QtQuick.Controls.Material 2.15
+
+/*
+    A button of a home screen: an icon over a text of up to two lines.
+*/
+ItemDelegate {
+    id: tile
+
+    width: 104
+    height: 104
+    padding: 8
+    icon.width: 36
+    icon.height: 36
+    icon.color: Material.accent
+
+    contentItem: Column {
+        spacing: 4
+
+        IconImage {
+            anchors.horizontalCenter: parent.horizontalCenter
+            source: tile.icon.source
+            color: tile.icon.color
+            sourceSize: Qt.size(tile.icon.width, tile.icon.height)
+        }
+        Label {
+            width: parent.width
+            text: tile.text
+            horizontalAlignment: Text.AlignHCenter
+            wrapMode: Text.Wrap
+            maximumLineCount: 2
+            elide: Text.ElideRight
+        }
+    }
+}

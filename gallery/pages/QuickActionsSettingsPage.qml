@@ -1,0 +1,62 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+import QtQuick 2.15
+import QtQuick.Controls 2.15
+import QtQuick.Layouts 1.15
+import com.marlo.settings.system 1.0
+import ".."
+
+/*
+    The page on which a user chooses quick actions and drags them into order.
+*/
+GalleryPage {
+    title: qsTrId("gallery-quick-actions-settings")
+    ready: enabledActions.count > 0 && allActions.count > enabledActions.count
+
+    // Its rows are the user's list, entry by entry: what move() works on.
+    QuickActionsModel {
+        id: enabledActions
+    }
+
+    QuickActionsModel {
+        id: allActions
+        showPotential: true
+    }
+
+    Section {
+        title: qsTrId("gallery-quick-actions-order")
+
+        ReorderableList {
+            Layout.fillWidth: true
+            model: enabledActions
+            onMoved: enabledActions.move(from, to)
+        }
+        Note {
+            visible: enabledActions.count === 0
+            text: qsTrId("gallery-quick-actions-none")
+        }
+    }
+
+    Section {
+        title: qsTrId("gallery-quick-actions-available")
+
+        Repeater {
+            model: allActions
+            SwitchDelegate {
+                Layout.fillWidth: true
+                text: model.title || model.path
+                icon.source: model.icon ? "file://" + model.icon : ""
+                // An item has an `enabled` of its own, so the role is asked of the model.
+                checked: model.enabled
+                onToggled: {
+                    if (checked) {
+                        allActions.enableAction(model.path);
+                    } else {
+                        allActions.disableAction(model.path);
+                    }
+                }
+            }
+        }
+    }
+}

@@ -1,0 +1,11 @@
+<?xml version="1.0" encoding="utf-8"?>
+<!DOCTYPE TS>
+<TS version="2.1" language="de">
+<context>
+    <name></name>
+    <message id="recorder-record">
+        <source></source>
+        <translation>Ton aufnehmen</translation>
+    </message>
+</context>
+</TS>

@@ -3,6 +3,7 @@
 
 import QtQuick 2.15
 import QtQuick.Controls 2.15
+import QtQuick.Controls.Universal 2.15
 import QtQuick.Layouts 1.15
 // Importing the module brings the texts of the settings pages.
 import com.marlo.settings.system 1.0
@@ -36,7 +37,16 @@ ApplicationWindow {
         id: pages
     }
 
+    background: Rectangle {
+        color: "#f2f4f4"
+    }
+
     header: ToolBar {
+        Universal.theme: Universal.Dark
+        background: Rectangle {
+            color: window.Universal.accent
+        }
+
         RowLayout {
             anchors.fill: parent
 
@@ -50,7 +60,7 @@ ApplicationWindow {
                 Layout.fillWidth: true
                 Layout.leftMargin: stack.depth > 1 ? 0 : 16
                 text: stack.currentItem.title
-                font.pixelSize: 20
+                font.pixelSize: 18
                 elide: Text.ElideRight
             }
             LanguageButton {}

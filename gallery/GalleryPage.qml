@@ -18,6 +18,8 @@ Page {
 
     default property alias content: grid.data
 
+    background: null
+
     Flickable {
         id: flickable
         anchors.fill: parent
@@ -28,11 +30,11 @@ Page {
         GridLayout {
             id: grid
             x: (flickable.width - width) / 2
-            y: 16
-            width: Math.min(flickable.width - 32, 1040)
+            y: 8
+            width: Math.min(flickable.width - 16, 1040)
             columns: width >= 640 ? 2 : 1
-            columnSpacing: 32
-            rowSpacing: 24
+            columnSpacing: 8
+            rowSpacing: 8
         }
     }
 }

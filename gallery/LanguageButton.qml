@@ -3,6 +3,7 @@
 
 import QtQuick 2.15
 import QtQuick.Controls 2.15
+import QtQuick.Controls.Universal 2.15
 import gallery.stage 1.0
 
 /*
@@ -13,14 +14,14 @@ ToolButton {
 
     readonly property var languages: ({ "en": "English", "fi": "Suomi", "de": "Deutsch" })
 
-    text: languages[Stage.language] || Stage.language
+    text: Stage.language.toUpperCase()
     icon.source: "icons/language.svg"
-    font.capitalization: Font.MixedCase
     Accessible.name: qsTrId("gallery-language")
     onClicked: menu.open()
 
     Menu {
         id: menu
+        Universal.theme: Universal.Light
         y: button.height
 
         Repeater {

@@ -46,6 +46,7 @@ ListView {
             IconImage {
                 anchors.centerIn: parent
                 source: "icons/drag.svg"
+                sourceSize: Qt.size(24, 24)
                 color: row.icon.color
                 opacity: 0.5
             }

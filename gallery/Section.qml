@@ -3,25 +3,32 @@
 
 import QtQuick 2.15
 import QtQuick.Controls 2.15
-import QtQuick.Controls.Material 2.15
+import QtQuick.Controls.Universal 2.15
 import QtQuick.Layouts 1.15
 
 /*
     A part of a page, under a title. All sections of a page are of the same width.
 */
-ColumnLayout {
-    property alias title: heading.text
+Pane {
+    property alias heading: heading.text
+    default property alias content: column.data
 
     Layout.fillWidth: true
     Layout.preferredWidth: 1
     Layout.alignment: Qt.AlignTop
-    spacing: 8
+    padding: 12
+    background: Card {}
 
-    Label {
-        id: heading
-        Layout.fillWidth: true
-        color: Material.accent
-        font.weight: Font.Medium
-        elide: Text.ElideRight
+    contentItem: ColumnLayout {
+        id: column
+        spacing: 8
+
+        Label {
+            id: heading
+            Layout.fillWidth: true
+            color: Universal.accent
+            font.weight: Font.Medium
+            elide: Text.ElideRight
+        }
     }
 }

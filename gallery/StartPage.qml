@@ -3,6 +3,7 @@
 
 import QtQuick 2.15
 import QtQuick.Controls 2.15
+import QtQuick.Controls.Universal 2.15
 import QtQuick.Layouts 1.15
 
 /*
@@ -27,6 +28,11 @@ GalleryPage {
             text: modelData.title
             onClicked: start.opened(modelData)
 
+            padding: 12
+            background: Card {
+                color: entry.down ? "#e0e5e5" : entry.hovered ? "#f8fafa" : "white"
+                border.color: entry.visualFocus ? Universal.accent : "#d5dada"
+            }
             contentItem: ColumnLayout {
                 Label {
                     Layout.fillWidth: true

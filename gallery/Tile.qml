@@ -4,7 +4,7 @@
 import QtQuick 2.15
 import QtQuick.Controls 2.15
 import QtQuick.Controls.impl 2.15
-import QtQuick.Controls.Material 2.15
+import QtQuick.Controls.Universal 2.15
 
 /*
     A button of a home screen: an icon over a text of up to two lines.
@@ -12,12 +12,13 @@ import QtQuick.Controls.Material 2.15
 ItemDelegate {
     id: tile
 
-    width: 104
-    height: 104
-    padding: 8
+    width: 100
+    height: 96
+    horizontalPadding: 2
+    verticalPadding: 8
     icon.width: 36
     icon.height: 36
-    icon.color: Material.accent
+    icon.color: Universal.accent
 
     contentItem: Column {
         spacing: 4
@@ -31,6 +32,7 @@ ItemDelegate {
         Label {
             width: parent.width
             text: tile.text
+            font.pixelSize: 14
             horizontalAlignment: Text.AlignHCenter
             wrapMode: Text.Wrap
             maximumLineCount: 2

@@ -32,12 +32,13 @@ GalleryPage {
     Connections {
         target: Stage
         function onCallReceived(service, method, args) {
-            calls.append({ service: service, call: method + "(" + args.join(", ") + ")" });
+            const list = args.map(argument => '"' + argument + '"').join(", ");
+            calls.insert(0, { service: service, call: method + "(" + list + ")" });
         }
     }
 
     Section {
-        title: qsTrId("gallery-quick-actions-home")
+        heading: qsTrId("gallery-quick-actions-home")
 
         Flow {
             Layout.fillWidth: true
@@ -62,7 +63,7 @@ GalleryPage {
     }
 
     Section {
-        title: qsTrId("gallery-received-calls")
+        heading: qsTrId("gallery-received-calls")
 
         Note {
             visible: calls.count === 0

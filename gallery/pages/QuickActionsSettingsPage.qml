@@ -25,7 +25,7 @@ GalleryPage {
     }
 
     Section {
-        title: qsTrId("gallery-quick-actions-order")
+        heading: qsTrId("gallery-quick-actions-order")
 
         ReorderableList {
             Layout.fillWidth: true
@@ -39,7 +39,7 @@ GalleryPage {
     }
 
     Section {
-        title: qsTrId("gallery-quick-actions-available")
+        heading: qsTrId("gallery-quick-actions-available")
 
         Repeater {
             model: allActions

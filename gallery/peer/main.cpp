@@ -31,13 +31,14 @@ int main(int argc, char *argv[])
         qFatal("usage: gallery-peer SERVICE");
     }
 
-    RecordingService service(QDBusConnection::SessionBus, arguments.at(1));
+    const QString name = arguments.at(1);
+    RecordingService service(QDBusConnection::SessionBus, name);
     QDBusConnection bus = service.connection();
-    QObject::connect(&service, &RecordingService::called, [bus](const QDBusMessage &call) {
+    QObject::connect(&service, &RecordingService::called, [bus, name](const QDBusMessage &call) {
         QDBusMessage signal = QDBusMessage::createSignal(
             QStringLiteral("/"), QStringLiteral("com.marlo.settings.gallery.Peer"),
             QStringLiteral("CallReceived"));
-        signal.setArguments({call.service(), call.member(), texts(call.arguments())});
+        signal.setArguments({name, call.member(), texts(call.arguments())});
         bus.send(signal);
     });
     // Nobody else ends it: a service goes with its bus.

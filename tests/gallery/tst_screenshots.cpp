@@ -1,0 +1,159 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+// Takes the screenshots of the gallery as ./dev run does, and looks at them.
+
+#include <QDir>
+#include <QFile>
+#include <QImage>
+#include <QProcess>
+#include <QRegularExpression>
+#include <QSet>
+#include <QTemporaryDir>
+#include <QTest>
+
+namespace {
+
+constexpr QLatin1String gallery(GALLERY_DIR);
+constexpr int enoughColours = 50; // a page with nothing but its header has fewer
+constexpr int patience = 120000; // ms; the gallery's own watchdog barks before
+
+struct Result {
+    int exitCode = -1;
+    QString output;
+};
+
+Result takeScreenshots(const QString &program, const QString &folder)
+{
+    QProcess process;
+    process.setProcessChannelMode(QProcess::MergedChannels);
+    process.start(QStringLiteral(QML_PROGRAM),
+                  {program + QStringLiteral("/Screenshots.qml"), QStringLiteral("--"), folder});
+    Result result;
+    if (process.waitForFinished(patience) && process.exitStatus() == QProcess::NormalExit) {
+        result.exitCode = process.exitCode();
+    }
+    result.output = QString::fromUtf8(process.readAll());
+    return result;
+}
+
+// How many colours an image has, up to as many as are enough.
+int countColours(const QImage &image)
+{
+    QSet<QRgb> colours;
+    for (int y = 0; y < image.height() && colours.size() < enoughColours; ++y) {
+        for (int x = 0; x < image.width(); ++x) {
+            colours.insert(image.pixel(x, y));
+        }
+    }
+    return colours.size();
+}
+
+void copyFolder(const QString &from, const QString &to)
+{
+    QVERIFY(QDir().mkpath(to));
+    const QFileInfoList entries = QDir(from).entryInfoList(QDir::AllEntries | QDir::NoDotAndDotDot);
+    for (const QFileInfo &entry : entries) {
+        const QString target = to + QLatin1Char('/') + entry.fileName();
+        if (entry.isDir()) {
+            copyFolder(entry.filePath(), target);
+        } else {
+            QVERIFY2(QFile::copy(entry.filePath(), target), qPrintable(target));
+        }
+    }
+}
+
+} // namespace
+
+class ScreenshotsTest : public QObject
+{
+    Q_OBJECT
+
+private Q_SLOTS:
+    void everyPageIsShown();
+    void problemsAreReported_data();
+    void problemsAreReported();
+    void unwritableFolderIsReported();
+};
+
+void ScreenshotsTest::everyPageIsShown()
+{
+    const QTemporaryDir folder;
+    const Result result = takeScreenshots(gallery, folder.path());
+    QVERIFY2(result.exitCode == 0, qPrintable(result.output));
+
+    static const QRegularExpression line(QStringLiteral("^(?:qml: )?([\\w-]+): (.*\\.png)$"),
+                                         QRegularExpression::MultilineOption);
+    static const QRegularExpression size(QStringLiteral("-(\\d+)x(\\d+)-"));
+    int pages = 0;
+    QRegularExpressionMatchIterator lines = line.globalMatch(result.output);
+    while (lines.hasNext()) {
+        ++pages;
+        const QStringList files = lines.next().captured(2).split(QLatin1Char(' '));
+        QVERIFY2(files.size() >= 2, qPrintable(result.output));
+        for (const QString &file : files) {
+            const QImage image(folder.filePath(file));
+            const QRegularExpressionMatch expected = size.match(file);
+            QCOMPARE(image.size(),
+                     QSize(expected.captured(1).toInt(), expected.captured(2).toInt()));
+            QVERIFY2(countColours(image) >= enoughColours, qPrintable(file));
+        }
+    }
+    // The start page, and every file of a page: none may be missing in the list.
+    QCOMPARE(
+        pages,
+        1 + QDir(gallery + QStringLiteral("/pages")).entryList({QStringLiteral("*.qml")}).size());
+}
+
+void ScreenshotsTest::problemsAreReported_data()
+{
+    QTest::addColumn<QByteArray>("old");
+    QTest::addColumn<QByteArray>("replacement");
+    QTest::addColumn<QString>("report");
+
+    QTest::newRow("a page that does not load")
+        << QByteArray("QuickActionsModel {") << QByteArray("NoSuchType {") << "NoSuchType";
+    QTest::newRow("a warning of a binding")
+        << QByteArray("visible: calls.count === 0") << QByteArray("visible: nothing.count === 0")
+        << "ReferenceError: nothing is not defined";
+    QTest::newRow("a text without translation") << QByteArray("qsTrId(\"gallery-received-calls\")")
+                                                << QByteArray("qsTrId(\"gallery-no-such-text\")")
+                                                << "no translation of gallery-no-such-text";
+}
+
+void ScreenshotsTest::problemsAreReported()
+{
+    QFETCH(const QByteArray, old);
+    QFETCH(const QByteArray, replacement);
+    QFETCH(const QString, report);
+
+    const QTemporaryDir folder;
+    const QString copy = folder.filePath(QStringLiteral("gallery"));
+    copyFolder(gallery, copy);
+    QFile page(copy + QStringLiteral("/pages/QuickActionsPage.qml"));
+    QVERIFY(page.open(QIODevice::ReadWrite));
+    QByteArray content = page.readAll();
+    QVERIFY(content.contains(old));
+    content.replace(old, replacement);
+    page.resize(0);
+    page.seek(0);
+    page.write(content);
+    page.close();
+
+    const Result result = takeScreenshots(copy, folder.path());
+    QVERIFY2(result.exitCode > 0, qPrintable(result.output));
+    QVERIFY2(result.output.contains(report), qPrintable(result.output));
+    QVERIFY2(result.output.contains(QStringLiteral("screenshots: quick-actions (en): ")),
+             qPrintable(result.output));
+}
+
+void ScreenshotsTest::unwritableFolderIsReported()
+{
+    const Result result = takeScreenshots(gallery, QStringLiteral("/nonexistent"));
+    QCOMPARE(result.exitCode, 1);
+    QVERIFY2(result.output.contains(QStringLiteral("cannot save /nonexistent/start-")),
+             qPrintable(result.output));
+}
+
+QTEST_GUILESS_MAIN(ScreenshotsTest)
+#include "tst_screenshots.moc"

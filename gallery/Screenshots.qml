@@ -30,6 +30,7 @@ Gallery {
     property int view: views.length - 1
     property var files: []
     property bool grabbing: true
+    property bool failed: false
 
     function next() {
         if (++view === views.length) {
@@ -94,6 +95,10 @@ Gallery {
     }
 
     function fail(problem) {
+        if (failed) {
+            return;
+        }
+        failed = true;
         const page = shot < 0 ? "gallery" : shots[shot].name;
         console.error("screenshots: " + page + " (" + views[view].language + "): " + problem);
         Qt.exit(1);
@@ -108,7 +113,7 @@ Gallery {
         interval: 100
         repeat: true
         onTriggered: {
-            if (!gallery.grabbing && gallery.currentPage.ready) {
+            if (!gallery.grabbing && !gallery.failed && gallery.currentPage.ready) {
                 gallery.grab();
             }
         }

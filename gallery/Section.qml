@@ -21,7 +21,7 @@ Pane {
 
     contentItem: ColumnLayout {
         id: column
-        spacing: 8
+        spacing: 4
 
         Label {
             id: heading

@@ -41,10 +41,9 @@ void Stage::setLanguage(const QString &language)
         return;
     }
     QLocale::setDefault(QLocale(language));
-    // Translators that follow the language filter the engine's events; then it retranslates.
+    // Translators that follow the language filter this event; the engine retranslates on it.
     QEvent languageChange(QEvent::LanguageChange);
     QCoreApplication::sendEvent(m_engine, &languageChange);
-    m_engine->retranslate();
     Q_EMIT languageChanged();
 }
 

@@ -8,10 +8,10 @@
 
 namespace {
 
-constexpr QLatin1String catalog("settings-system");
-constexpr QLatin1String engineeringEnglishCatalog("settings-system_eng_en");
-constexpr QLatin1String prefix("-");
-constexpr QLatin1String directory("/usr/share/translations");
+const QLatin1String catalog("settings-system");
+const QLatin1String engineeringEnglishCatalog("settings-system_eng_en");
+const QLatin1String prefix("-");
+const QLatin1String directory("/usr/share/translations");
 
 } // namespace
 

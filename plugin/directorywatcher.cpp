@@ -25,8 +25,8 @@ QString nearestExisting(QString path)
 
 } // namespace
 
-DirectoryWatcher::DirectoryWatcher(const QString &directory, QObject *parent)
-    : QObject(parent), m_directory(directory)
+DirectoryWatcher::DirectoryWatcher(QString directory, QObject *parent)
+    : QObject(parent), m_directory(std::move(directory))
 {
     connect(&m_watcher, &QFileSystemWatcher::directoryChanged, this,
             &DirectoryWatcher::watchedChanged);

@@ -23,7 +23,7 @@ class DirectoryWatcher : public QObject
     Q_OBJECT
 
 public:
-    explicit DirectoryWatcher(const QString &directory, QObject *parent = nullptr);
+    explicit DirectoryWatcher(QString directory, QObject *parent = nullptr);
 
 Q_SIGNALS:
     // An entry was added, removed or renamed, or the directory itself came, went or was replaced.

@@ -15,17 +15,17 @@
 
 namespace {
 
-constexpr QLatin1String titleKey("title");
-constexpr QLatin1String translationCatalogKey("translation-catalog");
-constexpr QLatin1String iconKey("icon");
-constexpr QLatin1String priorityKey("priority");
-constexpr QLatin1String requiresPackageKey("requires-package");
-constexpr QLatin1String serviceKey("remote-service");
-constexpr QLatin1String pathKey("remote-path");
-constexpr QLatin1String interfaceKey("remote-interface");
-constexpr QLatin1String methodKey("remote-method");
-constexpr QLatin1String argumentsKey("remote-arguments");
-constexpr QLatin1String argumentKey("argument");
+const QLatin1String titleKey("title");
+const QLatin1String translationCatalogKey("translation-catalog");
+const QLatin1String iconKey("icon");
+const QLatin1String priorityKey("priority");
+const QLatin1String requiresPackageKey("requires-package");
+const QLatin1String serviceKey("remote-service");
+const QLatin1String pathKey("remote-path");
+const QLatin1String interfaceKey("remote-interface");
+const QLatin1String methodKey("remote-method");
+const QLatin1String argumentsKey("remote-arguments");
+const QLatin1String argumentKey("argument");
 
 // The longest signature that D-Bus knows, and so more arguments than any call can have.
 constexpr size_t maximumSignature = 255;

@@ -16,25 +16,25 @@
 
 namespace {
 
-constexpr QLatin1String definitionDirectory("/usr/share/glimmera/quickactions");
-constexpr QLatin1String definitionFilter("*.conf");
+const QLatin1String definitionDirectory("/usr/share/glimmera/quickactions");
+const QLatin1String definitionFilter("*.conf");
 constexpr int reloadDelay = 1000; // ms
 
-constexpr QLatin1String enabledKey("/desktop/glimmera-marlo-home/events_screen_actions");
-constexpr QLatin1String blockedKey("/desktop/glimmera-marlo-home/blocked_actions");
-constexpr QLatin1String userKey("/desktop/glimmera-marlo-home/events_screen_actions_user");
+const QLatin1String enabledKey("/desktop/glimmera-marlo-home/events_screen_actions");
+const QLatin1String blockedKey("/desktop/glimmera-marlo-home/blocked_actions");
+const QLatin1String userKey("/desktop/glimmera-marlo-home/events_screen_actions_user");
 
-constexpr QLatin1String noReplyError("org.freedesktop.DBus.Error.NoReply");
-constexpr QLatin1String serviceUnknownError("org.freedesktop.DBus.Error.ServiceUnknown");
+const QLatin1String noReplyError("org.freedesktop.DBus.Error.NoReply");
+const QLatin1String serviceUnknownError("org.freedesktop.DBus.Error.ServiceUnknown");
 
-constexpr QLatin1String storeService("com.marlo.marlostore");
-constexpr QLatin1String storePath("/StoreClient");
-constexpr QLatin1String storeInterface("com.marlo.marlostore");
-constexpr QLatin1String storeMethod("showApp");
+const QLatin1String storeService("com.marlo.marlostore");
+const QLatin1String storePath("/StoreClient");
+const QLatin1String storeInterface("com.marlo.marlostore");
+const QLatin1String storeMethod("showApp");
 
 QSet<QString> toSet(const QStringList &list)
 {
-    return QSet<QString>(list.cbegin(), list.cend());
+    return {list.cbegin(), list.cend()};
 }
 
 } // namespace

@@ -14,9 +14,9 @@
 namespace {
 
 // The signal of the sample services (gallery/peer).
-constexpr QLatin1String peerPath("/");
-constexpr QLatin1String peerInterface("com.marlo.settings.gallery.Peer");
-constexpr QLatin1String peerSignal("CallReceived");
+const QLatin1String peerPath("/");
+const QLatin1String peerInterface("com.marlo.settings.gallery.Peer");
+const QLatin1String peerSignal("CallReceived");
 
 } // namespace
 

@@ -14,7 +14,7 @@
 
 namespace {
 
-constexpr QLatin1String gallery(GALLERY_DIR);
+const QLatin1String gallery(GALLERY_DIR);
 // A page without content is of one colour below the header; smooth text and icons bring many.
 constexpr int headerHeight = 48;
 constexpr int enoughColours = 20;

@@ -1,0 +1,120 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "fileremover.h"
+
+#include "directoryemptier.h"
+#include "filedescriptor.h"
+
+#include <QByteArray>
+#include <QFile>
+
+#include <array>
+#include <cerrno>
+#include <cstdio>
+#include <memory>
+
+#include <fcntl.h>
+#include <mntent.h>
+#include <sys/stat.h>
+#include <sys/sysmacros.h>
+
+namespace {
+
+constexpr char mountTablePath[] = "/etc/mtab";
+constexpr std::size_t mountEntrySize = 12288;
+
+struct CloseMountTable {
+    void operator()(FILE *table) const { endmntent(table); }
+};
+using MountTable = std::unique_ptr<FILE, CloseMountTable>;
+
+FileDescriptor openDirectory(const char *path)
+{
+    return FileDescriptor(open(path, O_RDONLY | O_DIRECTORY | O_NOFOLLOW | O_CLOEXEC));
+}
+
+bool isRootDirectory(const struct stat &directory)
+{
+    struct stat root = {};
+    return stat("/", &root) != 0
+        || (root.st_dev == directory.st_dev && root.st_ino == directory.st_ino);
+}
+
+// Whether the directory may lie on the device. This cannot be known of file systems that number
+// themselves instead of bearing the number of their block device (major number 0), nor of a device
+// without a node here.
+bool mayLieOn(const QByteArray &device, const struct stat &directory)
+{
+    struct stat node = {};
+    return stat(device.constData(), &node) != 0 || !S_ISBLK(node.st_mode)
+        || major(directory.st_dev) == 0 || directory.st_dev == node.st_rdev;
+}
+
+// Empties the card that is mounted on the directory, given in the bytes of the mount table: they
+// are its name in whatever encoding.
+bool emptyMount(const QByteArray &device, const char *directory)
+{
+    // Relative to the current folder there is no card, and an empty name would be that very folder.
+    if (directory[0] != '/') {
+        return false;
+    }
+    // The table names directories by their real path. Where something else stands by now (a link, a
+    // file, the folder beneath a card that was unmounted meanwhile), it is not the card and stays.
+    FileDescriptor fd = openDirectory(directory);
+    if (!fd.isOpen()) {
+        // A card that cannot be read counts as empty, as for removeAllEntries().
+        return errno != ENOTDIR;
+    }
+    struct stat info = {};
+    if (fstat(fd.get(), &info) != 0 || isRootDirectory(info) || !mayLieOn(device, info)) {
+        return false;
+    }
+    return emptyDirectory(std::move(fd));
+}
+
+} // namespace
+
+FileRemover::FileRemover(const QString &devicePath) : m_devicePath(devicePath)
+{
+}
+
+void FileRemover::run()
+{
+    if (emptyCard()) {
+        Q_EMIT completed();
+    } else {
+        Q_EMIT error();
+    }
+}
+
+bool FileRemover::removeAllEntries(const QString &path)
+{
+    FileDescriptor fd = openDirectory(QFile::encodeName(path).constData());
+    return !fd.isOpen() || emptyDirectory(std::move(fd));
+}
+
+bool FileRemover::emptyCard() const
+{
+    const QByteArray device = QFile::encodeName(m_devicePath);
+    // Other sources are words like "tmpfs" and "none", which name no card and occur many times.
+    if (!device.startsWith('/')) {
+        return false;
+    }
+    const MountTable table(setmntent(mountTablePath, "r"));
+    if (!table) {
+        return false;
+    }
+    mntent entry = {};
+    std::array<char, mountEntrySize> buffer = {};
+    while (getmntent_r(table.get(), &entry, buffer.data(), static_cast<int>(buffer.size()))) {
+        // The C library cuts a line that is longer than the buffer and skips its rest. Cut within
+        // the directory it has no type, and the directory may be another one.
+        const bool cut = entry.mnt_type[0] == '\0';
+        // A card that is mounted twice gets a second attempt through its other mount directory.
+        if (!cut && device == entry.mnt_fsname && emptyMount(device, entry.mnt_dir)) {
+            return true;
+        }
+    }
+    return false;
+}

@@ -1,0 +1,43 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#ifndef FILEREMOVER_H
+#define FILEREMOVER_H
+
+#include <QObject>
+#include <QRunnable>
+#include <QString>
+
+/*
+    Removes all files and folders from a mounted memory card and leaves its mount directory in
+   place.
+
+    Made for one run on a thread pool, which deletes it afterwards. Exactly one of the two signals
+   is emitted, once, from the pool's thread, as the last thing that run() does.
+*/
+class FileRemover : public QObject, public QRunnable {
+    Q_OBJECT
+
+public:
+    // The card is found in the mount table by this device node, for example /dev/mmcblk1p1.
+    explicit FileRemover(const QString &devicePath);
+
+    void run() override;
+
+    // Removes everything below the directory. True when all of it went; an empty directory and one
+    // that cannot be read give true, too.
+    static bool removeAllEntries(const QString &path);
+
+Q_SIGNALS:
+    // The card is empty.
+    void completed();
+    // No card is mounted from the device, or something is left on it.
+    void error();
+
+private:
+    bool emptyCard() const;
+
+    const QString m_devicePath;
+};
+
+#endif

@@ -1,0 +1,140 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "filetree.h"
+
+#include <QtGlobal>
+
+#include <algorithm>
+#include <cerrno>
+#include <cstring>
+
+#include <dirent.h>
+#include <fcntl.h>
+#include <sys/socket.h>
+#include <sys/stat.h>
+#include <sys/un.h>
+#include <unistd.h>
+
+namespace {
+
+int require(int result, const QByteArray &path)
+{
+    if (result < 0) {
+        qFatal("cannot make %s: %s", path.constData(), std::strerror(errno));
+    }
+    return result;
+}
+
+void append(QByteArrayList &paths, const QByteArray &folder, const QByteArray &prefix)
+{
+    const QByteArrayList names = FileTree::list(folder);
+    for (const QByteArray &name : names) {
+        const QByteArray path = folder + '/' + name;
+        paths.append(prefix + name);
+        struct stat info = {};
+        if (lstat(path.constData(), &info) == 0 && S_ISDIR(info.st_mode)) {
+            append(paths, path, prefix + name + '/');
+        }
+    }
+}
+
+} // namespace
+
+void FileTree::makeFolder(const QByteArray &path)
+{
+    require(mkdir(path.constData(), 0700), path);
+}
+
+void FileTree::makeFile(const QByteArray &path, const QByteArray &content)
+{
+    const int fd =
+        require(open(path.constData(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, 0600), path);
+    require(static_cast<int>(write(fd, content.constData(), static_cast<size_t>(content.size()))),
+            path);
+    close(fd);
+}
+
+void FileTree::makeFiles(const QByteArray &folder, int count)
+{
+    for (int i = 0; i < count; ++i) {
+        makeFile(folder + "/file" + QByteArray::number(i));
+    }
+}
+
+void FileTree::makeLink(const QByteArray &path, const QByteArray &target)
+{
+    require(symlink(target.constData(), path.constData()), path);
+}
+
+void FileTree::makePipe(const QByteArray &path)
+{
+    require(mkfifo(path.constData(), 0600), path);
+}
+
+void FileTree::makeSocket(const QByteArray &path)
+{
+    sockaddr_un address = {};
+    address.sun_family = AF_UNIX;
+    Q_ASSERT(path.size() < int(sizeof(address.sun_path)));
+    std::copy(path.begin(), path.end(), address.sun_path);
+    const int fd = require(socket(AF_UNIX, SOCK_STREAM | SOCK_CLOEXEC, 0), path);
+    require(bind(fd, reinterpret_cast<const sockaddr *>(&address), sizeof(address)), path);
+    close(fd);
+}
+
+void FileTree::makeChain(const QByteArray &path, int depth, const QByteArray &name)
+{
+    int fd = require(open(path.constData(), O_RDONLY | O_DIRECTORY | O_CLOEXEC), path);
+    for (int level = 0; level < depth; ++level) {
+        require(mkdirat(fd, name.constData(), 0700), name);
+        const int below =
+            require(openat(fd, name.constData(), O_RDONLY | O_DIRECTORY | O_CLOEXEC), name);
+        close(fd);
+        fd = below;
+    }
+    close(fd);
+}
+
+QByteArray FileTree::chainPath(const QByteArray &path, int depth, const QByteArray &name)
+{
+    return path + ('/' + name).repeated(depth);
+}
+
+bool FileTree::exists(const QByteArray &path)
+{
+    struct stat info = {};
+    return lstat(path.constData(), &info) == 0;
+}
+
+QByteArray FileTree::read(const QByteArray &path)
+{
+    const int fd = open(path.constData(), O_RDONLY | O_CLOEXEC);
+    char buffer[4096];
+    const ssize_t size = ::read(fd, buffer, sizeof(buffer));
+    close(fd);
+    return size < 0 ? QByteArray() : QByteArray(buffer, int(size));
+}
+
+QByteArrayList FileTree::list(const QByteArray &path)
+{
+    QByteArrayList names;
+    if (DIR *folder = opendir(path.constData())) {
+        while (const dirent *entry = readdir(folder)) {
+            const QByteArray name = entry->d_name;
+            if (name != "." && name != "..") {
+                names.append(name);
+            }
+        }
+        closedir(folder);
+    }
+    return names;
+}
+
+QByteArrayList FileTree::listAll(const QByteArray &path)
+{
+    QByteArrayList paths;
+    append(paths, path, QByteArray());
+    std::sort(paths.begin(), paths.end());
+    return paths;
+}

@@ -1,0 +1,801 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "directoryemptier.h"
+#include "filedescriptor.h"
+#include "filetree.h"
+#include "messagelog.h"
+#include "systemcalls.h"
+
+#include <QFile>
+#include <QHash>
+#include <QTemporaryDir>
+#include <QTest>
+#include <QVector>
+
+#include <algorithm>
+#include <cerrno>
+#include <cstring>
+#include <memory>
+
+#include <dirent.h>
+#include <fcntl.h>
+#include <pthread.h>
+#include <sys/mount.h>
+#include <sys/prctl.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+using namespace FileTree;
+
+namespace {
+
+constexpr int maxOpenDescriptors = 57;
+constexpr std::size_t smallStackSize = 256 * 1024;
+
+bool empty(const QByteArray &path)
+{
+    return emptyDirectory(
+        FileDescriptor(open(path.constData(), O_RDONLY | O_DIRECTORY | O_NOFOLLOW | O_CLOEXEC)));
+}
+
+// Counts what the walk asks of the kernel, by the name of the call.
+class CallCounter {
+public:
+    CallCounter()
+    {
+        SystemCalls &hooks = SystemCalls::hooks();
+        const SystemCalls &real = SystemCalls::real();
+        for (int fd = 0; fd < 256; ++fd) {
+            if (fcntl(fd, F_GETFD) == -1) {
+                m_free.append(fd);
+            }
+        }
+        hooks.openat = [this, &real](int directory, const char *name, int flags) {
+            ++counts["openat"];
+            const int fd = real.openat(directory, name, flags);
+            // The lowest free one is given out, so that all below are in use.
+            openDescriptors = std::max(openDescriptors, m_free.indexOf(fd) + 1);
+            return fd;
+        };
+        hooks.unlinkat = [this, &real](int directory, const char *name, int flags) {
+            ++counts["unlinkat"];
+            return real.unlinkat(directory, name, flags);
+        };
+        hooks.fstat = [this, &real](int fd, struct stat *info) {
+            ++counts["fstat"];
+            return real.fstat(fd, info);
+        };
+        hooks.fstatat = [this, &real](int directory, const char *name, struct stat *info,
+                                      int flags) {
+            ++counts["fstatat"];
+            return real.fstatat(directory, name, info, flags);
+        };
+        hooks.getdents64 = [this, &real](int directory, void *buffer, size_t size) {
+            ++counts["getdents64"];
+            return real.getdents64(directory, buffer, size);
+        };
+    }
+    ~CallCounter() { SystemCalls::hooks() = {}; }
+    Q_DISABLE_COPY_MOVE(CallCounter)
+
+    QHash<QByteArray, int> counts;
+    int openDescriptors = 0;
+
+private:
+    QVector<int> m_free;
+};
+
+QByteArray nameOf(int directory)
+{
+    return QFile::symLinkTarget(QStringLiteral("/proc/self/fd/%1").arg(directory)).toLocal8Bit();
+}
+
+// Calls a function once, before the first removal of the name.
+void beforeRemovalOf(const QByteArray &name, std::function<void()> function)
+{
+    auto called = std::make_shared<bool>(false);
+    SystemCalls::hooks().unlinkat = [=](int directory, const char *entry, int flags) {
+        if (!*called && name == entry) {
+            *called = true;
+            function();
+        }
+        return SystemCalls::real().unlinkat(directory, entry, flags);
+    };
+}
+
+void rename(const QByteArray &from, const QByteArray &to)
+{
+    if (::rename(from.constData(), to.constData()) != 0) {
+        qFatal("cannot rename %s: %s", from.constData(), std::strerror(errno));
+    }
+}
+
+// The listing of a folder as the kernel writes it, with other types or other names.
+template<typename Change> void changeListings(Change change)
+{
+    SystemCalls::hooks().getdents64 = [=](int directory, void *buffer, size_t size) {
+        const ssize_t filled = SystemCalls::real().getdents64(directory, buffer, size);
+        for (ssize_t offset = 0; offset < filled;) {
+            auto *entry = reinterpret_cast<dirent64 *>(static_cast<char *>(buffer) + offset);
+            offset += entry->d_reclen;
+            change(entry);
+        }
+        return filled;
+    };
+}
+
+// Swaps two entries again and again until it is ended, with this program at the latest.
+pid_t startSwapping(const QByteArray &first, const QByteArray &second)
+{
+    const pid_t pid = fork();
+    if (pid == 0) {
+        prctl(PR_SET_PDEATHSIG, SIGKILL);
+        while (true) {
+            renameat2(AT_FDCWD, first.constData(), AT_FDCWD, second.constData(), RENAME_EXCHANGE);
+        }
+    }
+    return pid;
+}
+
+// Moves a folder out of a tree and back again until it is ended, with this program at the latest.
+pid_t startMoving(const QByteArray &inside, const QByteArray &outside)
+{
+    const pid_t pid = fork();
+    if (pid == 0) {
+        prctl(PR_SET_PDEATHSIG, SIGKILL);
+        while (true) {
+            ::rename(inside.constData(), outside.constData());
+            ::rename(outside.constData(), inside.constData());
+        }
+    }
+    return pid;
+}
+
+void stop(pid_t pid)
+{
+    kill(pid, SIGKILL);
+    waitpid(pid, nullptr, 0);
+}
+
+} // namespace
+
+class tst_DirectoryEmptier : public QObject {
+    Q_OBJECT
+
+private Q_SLOTS:
+    void init();
+    void cleanup();
+
+    void emptyFolder();
+    void everyKindOfEntry();
+    void listsWholeThenRemovesInDirectoryOrder();
+    void callsIntoTheKernel_data();
+    void callsIntoTheKernel();
+    void unknownTypes();
+    void unknownTypeOfVanishedEntry();
+    void namesThatLeadElsewhere();
+    void wideFolder();
+    void wideFoldersInDeepTree();
+    void veryDeep();
+    void failureStopsNothing();
+    void failureFarDown();
+    void folderThatDoesNotOpen();
+    void listingThatBreaksOff();
+    void mountInside();
+    void bindMountInside();
+    void folderBecomesLink_data();
+    void folderBecomesLink();
+    void folderBecomesLinkToParent();
+    void fileBecomesFolder();
+    void folderMovedOutNearby();
+    void folderMovedOutFarDown();
+    void wayMovedOutFarDown();
+    void wayMovedOutAndReplaced();
+    void entryVanishes();
+    void raceOfFoldersAndLinks();
+    void raceOfMovedFolders();
+
+private:
+    void checkOutside();
+
+    std::unique_ptr<MessageLog> m_log;
+    std::unique_ptr<QTemporaryDir> m_dir;
+    QByteArray m_top;
+    QByteArray m_outside;
+    QByteArrayList m_outsideBefore;
+};
+
+void tst_DirectoryEmptier::init()
+{
+    m_log = std::make_unique<MessageLog>();
+    m_dir = std::make_unique<QTemporaryDir>();
+    m_top = QFile::encodeName(m_dir->filePath(QStringLiteral("card")));
+    m_outside = QFile::encodeName(m_dir->filePath(QStringLiteral("outside")));
+    makeFolder(m_top);
+    makeFolder(m_outside);
+    makeFolder(m_outside + "/folder");
+    makeFile(m_outside + "/folder/file", "precious");
+    makeFile(m_outside + "/file", "precious");
+    m_outsideBefore = listAll(m_outside);
+}
+
+void tst_DirectoryEmptier::cleanup()
+{
+    SystemCalls::hooks() = {};
+    checkOutside();
+    // QTemporaryDir gives up on the deepest trees.
+    QVERIFY(empty(QFile::encodeName(m_dir->path())));
+    m_dir.reset();
+    QCOMPARE(m_log->takeAll(), QList<MessageLog::Message>());
+    m_log.reset();
+}
+
+void tst_DirectoryEmptier::checkOutside()
+{
+    QByteArrayList left = listAll(m_outside);
+    for (const QByteArray &path : qAsConst(m_outsideBefore)) {
+        QVERIFY2(left.contains(path), path.constData());
+    }
+    QCOMPARE(read(m_outside + "/file"), QByteArray("precious"));
+    QCOMPARE(read(m_outside + "/folder/file"), QByteArray("precious"));
+}
+
+void tst_DirectoryEmptier::emptyFolder()
+{
+    QVERIFY(empty(m_top));
+    QVERIFY(exists(m_top));
+}
+
+void tst_DirectoryEmptier::everyKindOfEntry()
+{
+    makeFile(m_top + "/file", "content");
+    makeFile(m_top + "/.hidden");
+    makeFile(m_top + "/...");
+    makeFile(m_top + "/caf\xe9 \xff\xfe");
+    makeFile(m_top + "/\xc3\x9cmlaut");
+    makeFile(m_top + "/line\nbreak\\040");
+    makeFile(m_top + '/' + QByteArray(255, 'n'));
+    makeLink(m_top + "/toFolder", m_outside);
+    makeLink(m_top + "/toFile", m_outside + "/file");
+    makeLink(m_top + "/toLink", m_top + "/toFolder");
+    makeLink(m_top + "/toParent", "..");
+    makeLink(m_top + "/dangling", "/nowhere/at/all");
+    makeLink(m_top + "/toItself", m_top + "/toItself");
+    makePipe(m_top + "/pipe");
+    makeSocket(m_top + "/socket");
+    makeFolder(m_top + "/.hiddenFolder");
+    makeFile(m_top + "/.hiddenFolder/.hidden");
+    makeFolder(m_top + "/\xe9t\xe9");
+    makeFile(m_top + "/\xe9t\xe9/\x80");
+    makeLink(m_top + "/\xe9t\xe9/link", "../..");
+    makeFolder(m_top + "/\xe9t\xe9/folder");
+    QVERIFY(empty(m_top));
+    QCOMPARE(list(m_top), QByteArrayList());
+    QVERIFY(exists(m_top));
+}
+
+void tst_DirectoryEmptier::listsWholeThenRemovesInDirectoryOrder()
+{
+    // Enough for a folder to be read in several pieces.
+    makeFolder(m_top + "/a");
+    makeFiles(m_top + "/a", 3000);
+    makeFolder(m_top + "/b");
+    makeFiles(m_top + "/b", 10);
+    makeFiles(m_top, 3000);
+    QHash<QByteArray, QByteArrayList> expected;
+    for (const QByteArray &folder : {m_top, m_top + "/a", m_top + "/b"}) {
+        expected[folder] = list(folder);
+    }
+
+    QHash<QByteArray, QByteArrayList> removed;
+    QHash<QByteArray, bool> listed;
+    SystemCalls::hooks().getdents64 = [&](int directory, void *buffer, size_t size) {
+        const ssize_t filled = SystemCalls::real().getdents64(directory, buffer, size);
+        listed[nameOf(directory)] = filled == 0;
+        return filled;
+    };
+    SystemCalls::hooks().unlinkat = [&](int directory, const char *name, int flags) {
+        const QByteArray folder = nameOf(directory);
+        if (listed.value(folder)) {
+            removed[folder].append(name);
+        }
+        return SystemCalls::real().unlinkat(directory, name, flags);
+    };
+    QVERIFY(empty(m_top));
+    QCOMPARE(removed, expected);
+}
+
+void tst_DirectoryEmptier::callsIntoTheKernel_data()
+{
+    QTest::addColumn<int>("folders");
+    QTest::addColumn<int>("files");
+
+    QTest::newRow("flat") << 0 << 2000;
+    QTest::newRow("nested") << 20 << 100;
+}
+
+void tst_DirectoryEmptier::callsIntoTheKernel()
+{
+    QFETCH(const int, folders);
+    QFETCH(const int, files);
+    for (int i = 0; i < folders; ++i) {
+        makeFolder(m_top + '/' + QByteArray::number(i));
+        makeFiles(m_top + '/' + QByteArray::number(i), files);
+    }
+    if (folders == 0) {
+        makeFiles(m_top, files);
+    }
+    const int pieces = folders == 0 ? 3 : 1; // of 32 KiB
+
+    CallCounter counter;
+    QVERIFY(empty(m_top));
+    QCOMPARE(list(m_top), QByteArrayList());
+    // One removal an entry; a folder is also opened, looked at, and read to its end.
+    const int entries = folders == 0 ? files : folders * (files + 1);
+    QCOMPARE(counter.counts.value("unlinkat"), entries);
+    QCOMPARE(counter.counts.value("fstatat"), 0);
+    QCOMPARE(counter.counts.value("openat"), folders);
+    QCOMPARE(counter.counts.value("fstat"), folders + 1);
+    QVERIFY(counter.counts.value("getdents64") <= (pieces + 1) * (folders + 1));
+}
+
+void tst_DirectoryEmptier::unknownTypes()
+{
+    makeFiles(m_top, 5);
+    makeFolder(m_top + "/folder");
+    makeFiles(m_top + "/folder", 5);
+    makeLink(m_top + "/folder/link", m_outside + "/folder");
+    makeLink(m_top + "/link", m_outside);
+    makePipe(m_top + "/pipe");
+
+    CallCounter counter;
+    changeListings([](dirent64 *entry) { entry->d_type = DT_UNKNOWN; });
+    QVERIFY(empty(m_top));
+    QCOMPARE(list(m_top), QByteArrayList());
+    QCOMPARE(counter.counts.value("fstatat"), 14); // each entry once
+    QCOMPARE(counter.counts.value("openat"), 1);
+    QCOMPARE(counter.counts.value("unlinkat"), 14);
+}
+
+void tst_DirectoryEmptier::unknownTypeOfVanishedEntry()
+{
+    makeFiles(m_top, 5);
+    changeListings([](dirent64 *entry) { entry->d_type = DT_UNKNOWN; });
+    SystemCalls::hooks().fstatat = [&](int, const char *name, struct stat *, int) {
+        if (qstrcmp(name, "file3") == 0) {
+            unlink((m_top + "/file3").constData());
+        }
+        errno = ENOENT;
+        return -1;
+    };
+    QVERIFY(!empty(m_top));
+    QCOMPARE(list(m_top), QByteArrayList());
+}
+
+void tst_DirectoryEmptier::namesThatLeadElsewhere()
+{
+    makeFolder(m_top + "/abcdefghij123456");
+    makeFile(m_top + "/klmnopqrst12");
+    makeFile(m_top + "/other");
+    changeListings([](dirent64 *entry) {
+        if (qstrcmp(entry->d_name, "abcdefghij123456") == 0) {
+            std::strcpy(entry->d_name, "../outside/folder");
+        } else if (qstrcmp(entry->d_name, "klmnopqrst12") == 0) {
+            std::strcpy(entry->d_name, "../outside/file");
+        }
+    });
+    // Shorter or as long as the names they replace: records have room for a few bytes more.
+    QVERIFY(!empty(m_top));
+    QVERIFY(!exists(m_top + "/other"));
+}
+
+void tst_DirectoryEmptier::wideFolder()
+{
+    makeFiles(m_top, 20000);
+    CallCounter counter;
+    QVERIFY(empty(m_top));
+    QCOMPARE(list(m_top), QByteArrayList());
+    QCOMPARE(counter.counts.value("openat"), 0);
+}
+
+void tst_DirectoryEmptier::wideFoldersInDeepTree()
+{
+    // Deeper than descriptors are kept, with work left at every level on the way back.
+    constexpr int depth = 150;
+    makeChain(m_top, depth);
+    for (int level = 0; level <= depth; ++level) {
+        const QByteArray folder = chainPath(m_top, level);
+        makeFiles(folder, 20);
+        for (const char *side : {"/a", "/z"}) {
+            makeFolder(folder + side);
+            makeFiles(folder + side, 5);
+        }
+        makeLink(folder + "/link", m_outside);
+    }
+    CallCounter counter;
+    QVERIFY(empty(m_top));
+    QCOMPARE(list(m_top), QByteArrayList());
+    QCOMPARE(counter.openDescriptors, maxOpenDescriptors);
+    // A folder is opened once, and those that are not kept open once more on the way back.
+    QCOMPARE(counter.counts.value("openat"),
+             depth + 2 * (depth + 1) + depth - maxOpenDescriptors + 2);
+}
+
+void tst_DirectoryEmptier::veryDeep()
+{
+    makeChain(m_top, 50000);
+    struct Run {
+        QByteArray top;
+        bool emptied = false;
+        int openDescriptors = 0;
+    } run;
+    run.top = m_top;
+
+    pthread_attr_t attributes = {};
+    QCOMPARE(pthread_attr_init(&attributes), 0);
+    QCOMPARE(pthread_attr_setstacksize(&attributes, smallStackSize), 0);
+    pthread_t thread = {};
+    const auto body = [](void *argument) -> void * {
+        auto *const run = static_cast<Run *>(argument);
+        CallCounter counter;
+        run->emptied = empty(run->top);
+        run->openDescriptors = counter.openDescriptors;
+        return nullptr;
+    };
+    QCOMPARE(pthread_create(&thread, &attributes, body, &run), 0);
+    pthread_join(thread, nullptr);
+    pthread_attr_destroy(&attributes);
+
+    QVERIFY(run.emptied);
+    QCOMPARE(run.openDescriptors, maxOpenDescriptors);
+    QCOMPARE(list(m_top), QByteArrayList());
+}
+
+void tst_DirectoryEmptier::failureStopsNothing()
+{
+    makeFiles(m_top, 50);
+    makeFolder(m_top + "/a");
+    makeFolder(m_top + "/a/b");
+    makeFiles(m_top + "/a/b", 50);
+    makeFolder(m_top + "/a/c");
+    makeFiles(m_top + "/a/c", 50);
+    QByteArrayList attempted;
+    SystemCalls::hooks().unlinkat = [&](int directory, const char *name, int flags) {
+        if ((flags & AT_REMOVEDIR) != 0) {
+            attempted.append(name);
+        }
+        if (qstrcmp(name, "file7") == 0 && nameOf(directory).endsWith("/b")) {
+            errno = EPERM;
+            return -1;
+        }
+        return SystemCalls::real().unlinkat(directory, name, flags);
+    };
+    QVERIFY(!empty(m_top));
+    QCOMPARE(listAll(m_top), (QByteArrayList{"a", "a/b", "a/b/file7"}));
+    // A folder that something is left in is not even tried.
+    QCOMPARE(attempted, QByteArrayList{"c"});
+}
+
+void tst_DirectoryEmptier::failureFarDown()
+{
+    constexpr int depth = 150;
+    makeChain(m_top, depth);
+    for (int level = 0; level <= depth; ++level) {
+        makeFiles(chainPath(m_top, level), 3);
+    }
+    makeFile(chainPath(m_top, depth) + "/stuck");
+    SystemCalls::hooks().unlinkat = [&](int directory, const char *name, int flags) {
+        if (qstrcmp(name, "stuck") == 0) {
+            errno = EROFS;
+            return -1;
+        }
+        return SystemCalls::real().unlinkat(directory, name, flags);
+    };
+    QVERIFY(!empty(m_top));
+    const QByteArrayList left = listAll(m_top);
+    QCOMPARE(left.size(), depth + 1);
+    QVERIFY(left.last().endsWith("/stuck"));
+}
+
+void tst_DirectoryEmptier::folderThatDoesNotOpen()
+{
+    makeFolder(m_top + "/empty");
+    makeFolder(m_top + "/full");
+    makeFile(m_top + "/full/file");
+    makeFiles(m_top, 5);
+    QByteArrayList attempted;
+    SystemCalls::hooks().openat = [&](int, const char *, int) {
+        errno = EACCES;
+        return -1;
+    };
+    SystemCalls::hooks().unlinkat = [&](int directory, const char *name, int flags) {
+        if ((flags & AT_REMOVEDIR) != 0) {
+            attempted.append(name);
+        }
+        return SystemCalls::real().unlinkat(directory, name, flags);
+    };
+    QVERIFY(!empty(m_top));
+    QCOMPARE(listAll(m_top), (QByteArrayList{"full", "full/file"}));
+    std::sort(attempted.begin(), attempted.end());
+    QCOMPARE(attempted, (QByteArrayList{"empty", "full"}));
+
+    SystemCalls::hooks() = {};
+    unlink((m_top + "/full/file").constData());
+    SystemCalls::hooks().openat = [&](int, const char *, int) {
+        errno = EACCES;
+        return -1;
+    };
+    QVERIFY(empty(m_top));
+    QCOMPARE(list(m_top), QByteArrayList());
+}
+
+void tst_DirectoryEmptier::listingThatBreaksOff()
+{
+    makeFolder(m_top + "/unreadable");
+    makeFile(m_top + "/unreadable/file");
+    makeFiles(m_top, 5);
+    SystemCalls::hooks().getdents64 = [&](int directory, void *buffer, size_t size) -> ssize_t {
+        if (nameOf(directory).endsWith("/unreadable")) {
+            errno = EIO;
+            return -1;
+        }
+        return SystemCalls::real().getdents64(directory, buffer, size);
+    };
+    QVERIFY(!empty(m_top));
+    QCOMPARE(listAll(m_top), (QByteArrayList{"unreadable", "unreadable/file"}));
+
+    SystemCalls::hooks().getdents64 = [](int, void *, size_t) -> ssize_t {
+        errno = EIO;
+        return -1;
+    };
+    QVERIFY(empty(m_top));
+    QCOMPARE(listAll(m_top), (QByteArrayList{"unreadable", "unreadable/file"}));
+}
+
+void tst_DirectoryEmptier::mountInside()
+{
+    makeFiles(m_top, 5);
+    makeFolder(m_top + "/folder");
+    const QByteArray mounted = m_top + "/folder/mounted";
+    makeFolder(mounted);
+    QCOMPARE(mount("tmpfs", mounted.constData(), "tmpfs", 0, nullptr), 0);
+    makeFile(mounted + "/file");
+    makeFolder(mounted + "/inner");
+    makeFiles(m_top + "/folder", 5);
+    const bool emptied = empty(m_top);
+    const QByteArrayList left = listAll(m_top);
+    QCOMPARE(umount(mounted.constData()), 0);
+    QVERIFY(!emptied);
+    QCOMPARE(left,
+             (QByteArrayList{"folder", "folder/mounted", "folder/mounted/file",
+                             "folder/mounted/inner"}));
+}
+
+void tst_DirectoryEmptier::bindMountInside()
+{
+    // Mounted, but of the same device: what is in it is on the card.
+    const QByteArray mounted = m_top + "/mounted";
+    makeFolder(mounted);
+    makeFolder(m_top + "/other");
+    QCOMPARE(mount((m_top + "/other").constData(), mounted.constData(), nullptr, MS_BIND, nullptr),
+             0);
+    makeFiles(mounted, 5);
+    const bool emptied = empty(m_top);
+    const QByteArrayList left = listAll(m_top);
+    QCOMPARE(umount(mounted.constData()), 0);
+    QVERIFY(!emptied);
+    QVERIFY(left.contains("mounted"));
+    QVERIFY(!left.contains("mounted/file0"));
+    QVERIFY(!left.contains("other/file0"));
+}
+
+void tst_DirectoryEmptier::folderBecomesLink_data()
+{
+    QTest::addColumn<QByteArray>("target");
+    QTest::addColumn<bool>("unknownType");
+
+    QTest::newRow("to a folder") << QByteArray("../outside/folder") << false;
+    QTest::newRow("to a file") << QByteArray("../outside/file") << false;
+    QTest::newRow("to nothing") << QByteArray("../outside/nothing") << false;
+    QTest::newRow("after it was asked for") << QByteArray("../outside/folder") << true;
+}
+
+void tst_DirectoryEmptier::folderBecomesLink()
+{
+    QFETCH(const QByteArray, target);
+    QFETCH(const bool, unknownType);
+    makeFolder(m_top + "/victim");
+    makeFiles(m_top + "/victim", 3);
+    makeFiles(m_top, 5);
+    if (unknownType) {
+        changeListings([](dirent64 *entry) { entry->d_type = DT_UNKNOWN; });
+    }
+    SystemCalls::hooks().openat = [&](int directory, const char *name, int flags) {
+        if (qstrcmp(name, "victim") == 0) {
+            rename(m_top + "/victim", m_outside + "/moved");
+            makeLink(m_top + "/victim", target);
+        }
+        return SystemCalls::real().openat(directory, name, flags);
+    };
+    QVERIFY(!empty(m_top));
+    QCOMPARE(list(m_top), QByteArrayList{"victim"});
+    QCOMPARE(list(m_outside + "/moved").size(), 3);
+}
+
+void tst_DirectoryEmptier::folderBecomesLinkToParent()
+{
+    // While the walk is in the folder already.
+    makeFolder(m_top + "/victim");
+    makeFile(m_top + "/victim/trigger");
+    makeFiles(m_top, 5);
+    beforeRemovalOf("trigger", [&] {
+        rename(m_top + "/victim", m_outside + "/moved");
+        makeLink(m_top + "/victim", "..");
+    });
+    QVERIFY(!empty(m_top));
+    QCOMPARE(list(m_top), QByteArrayList{"victim"});
+}
+
+void tst_DirectoryEmptier::fileBecomesFolder()
+{
+    makeFile(m_top + "/file");
+    makeFile(m_top + "/other");
+    auto swapped = false;
+    SystemCalls::hooks().unlinkat = [&](int directory, const char *name, int flags) {
+        if (!swapped && qstrcmp(name, "file") == 0) {
+            swapped = true;
+            unlink((m_top + "/file").constData());
+            makeFolder(m_top + "/file");
+        }
+        return SystemCalls::real().unlinkat(directory, name, flags);
+    };
+    QVERIFY(!empty(m_top));
+    QCOMPARE(list(m_top), QByteArrayList{"file"});
+}
+
+void tst_DirectoryEmptier::folderMovedOutNearby()
+{
+    // The folders above are still open: their entries go.
+    makeChain(m_top, 10);
+    for (int level = 0; level <= 10; ++level) {
+        makeFiles(chainPath(m_top, level), 3);
+    }
+    makeFile(chainPath(m_top, 8) + "/trigger");
+    beforeRemovalOf("trigger", [&] { rename(chainPath(m_top, 5), m_outside + "/moved"); });
+    QVERIFY(!empty(m_top));
+    // d/d/d/d was left when its entry could not be removed.
+    QCOMPARE(listAll(m_top), (QByteArrayList{"d", "d/d", "d/d/d", "d/d/d/d"}));
+}
+
+void tst_DirectoryEmptier::folderMovedOutFarDown()
+{
+    // Nothing above the folder is open any more, and its ".." leads outside: the way back is found
+    // from the top.
+    constexpr int depth = 150;
+    makeChain(m_top, depth);
+    for (int level = 0; level <= depth; ++level) {
+        makeFiles(chainPath(m_top, level), 3);
+    }
+    makeFile(chainPath(m_top, depth) + "/trigger");
+    beforeRemovalOf("trigger", [&] { rename(chainPath(m_top, 20), m_outside + "/moved"); });
+    makeFiles(m_outside, 3);
+    m_outsideBefore = listAll(m_outside);
+    QVERIFY(!empty(m_top));
+    const QByteArrayList left = listAll(m_top);
+    QCOMPARE(left.size(), 19);
+    QCOMPARE(m_top + '/' + left.last(), chainPath(m_top, 19));
+    QCOMPARE(list(m_outside + "/moved"), QByteArrayList());
+}
+
+void tst_DirectoryEmptier::wayMovedOutFarDown()
+{
+    // Two folders move: the way back ends above the higher one.
+    constexpr int depth = 150;
+    makeChain(m_top, depth);
+    for (int level = 0; level <= depth; ++level) {
+        makeFiles(chainPath(m_top, level), 3);
+    }
+    makeFile(chainPath(m_top, depth) + "/trigger");
+    beforeRemovalOf("trigger", [&] {
+        rename(chainPath(m_top, 40), m_outside + "/moved");
+        rename(chainPath(m_top, 10), m_outside + "/movedToo");
+        makeFolder(m_outside + "/movedToo/precious");
+        makeFile(m_outside + "/movedToo/precious/file");
+    });
+    QVERIFY(!empty(m_top));
+    const QByteArrayList left = listAll(m_top);
+    QCOMPARE(left.size(), 9);
+    QCOMPARE(m_top + '/' + left.last(), chainPath(m_top, 9));
+    QVERIFY(exists(m_outside + "/movedToo/precious/file"));
+}
+
+void tst_DirectoryEmptier::wayMovedOutAndReplaced()
+{
+    // In the place of a folder on the way stands another one: it was not listed and is not entered.
+    constexpr int depth = 150;
+    makeChain(m_top, depth);
+    for (int level = 0; level <= depth; ++level) {
+        makeFiles(chainPath(m_top, level), 3);
+    }
+    makeFile(chainPath(m_top, depth) + "/trigger");
+    makeFolder(m_outside + "/other");
+    makeChain(m_outside + "/other", 30);
+    makeFiles(m_outside + "/other", 3);
+    beforeRemovalOf("trigger", [&] {
+        rename(chainPath(m_top, 30), m_outside + "/moved");
+        rename(chainPath(m_top, 20), m_outside + "/movedToo");
+        rename(m_outside + "/other", chainPath(m_top, 20));
+    });
+    QVERIFY(!empty(m_top));
+    QCOMPARE(list(chainPath(m_top, 19)), QByteArrayList{"d"});
+    QCOMPARE(list(chainPath(m_top, 20)).size(), 4);
+    QVERIFY(exists(chainPath(m_top, 50)));
+    QCOMPARE(list(m_top), QByteArrayList{"d"});
+}
+
+void tst_DirectoryEmptier::entryVanishes()
+{
+    makeFiles(m_top, 5);
+    makeFolder(m_top + "/folder");
+    makeFile(m_top + "/folder/trigger");
+    beforeRemovalOf("trigger", [&] { unlink((m_top + "/folder/trigger").constData()); });
+    // The call failed, whatever the reason: it is not this walk that removed the entry.
+    QVERIFY(!empty(m_top));
+    QCOMPARE(listAll(m_top), QByteArrayList{"folder"});
+}
+
+void tst_DirectoryEmptier::raceOfFoldersAndLinks()
+{
+    for (int run = 0; run < 20; ++run) {
+        for (int i = 0; i < 10; ++i) {
+            const QByteArray folder = m_top + "/folder" + QByteArray::number(i);
+            makeFolder(folder);
+            makeFolder(folder + "/victim");
+            makeFiles(folder + "/victim", 20);
+        }
+        makeLink(m_outside + "/link", m_outside);
+        const pid_t swapper = startSwapping(m_top + "/folder5/victim", m_outside + "/link");
+        const pid_t swapper2 = startSwapping(m_top + "/folder2", m_top + "/folder7/victim");
+        QVERIFY(swapper > 0 && swapper2 > 0);
+        empty(m_top);
+        stop(swapper);
+        stop(swapper2);
+        checkOutside();
+        QVERIFY(!QTest::currentTestFailed());
+        // Whatever state it was left in, undisturbed it goes.
+        QVERIFY(empty(m_top));
+        unlink((m_outside + "/link").constData());
+        if (exists(m_outside + "/link")) {
+            QVERIFY(empty(m_outside + "/link"));
+            rmdir((m_outside + "/link").constData());
+        }
+    }
+}
+
+void tst_DirectoryEmptier::raceOfMovedFolders()
+{
+    for (int run = 0; run < 20; ++run) {
+        makeChain(m_top, 90);
+        makeFiles(chainPath(m_top, 90), 200);
+        const pid_t mover = startMoving(chainPath(m_top, 80), m_outside + "/moved");
+        const pid_t mover2 = startMoving(chainPath(m_top, 10), m_outside + "/movedToo");
+        QVERIFY(mover > 0 && mover2 > 0);
+        empty(m_top);
+        stop(mover);
+        stop(mover2);
+        checkOutside();
+        QVERIFY(!QTest::currentTestFailed());
+        QVERIFY(empty(m_top));
+        for (const char *name : {"/moved", "/movedToo"}) {
+            if (exists(m_outside + name)) {
+                QVERIFY(empty(m_outside + name));
+                rmdir((m_outside + name).constData());
+            }
+        }
+    }
+}
+
+QTEST_GUILESS_MAIN(tst_DirectoryEmptier)
+
+#include "tst_directoryemptier.moc"

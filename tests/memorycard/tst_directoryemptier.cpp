@@ -418,8 +418,8 @@ void tst_DirectoryEmptier::wideFoldersInDeepTree()
     QCOMPARE(list(m_top), QByteArrayList());
     QCOMPARE(counter.openDescriptors, maxOpenDescriptors);
     // A folder is opened once, and those that are not kept open once more on the way back.
-    QCOMPARE(counter.counts.value("openat"),
-             depth + 2 * (depth + 1) + depth - maxOpenDescriptors + 2);
+    QVERIFY(counter.counts.value("openat") > depth + 2 * (depth + 1));
+    QVERIFY(counter.counts.value("openat") < 2 * depth + 2 * (depth + 1));
 }
 
 void tst_DirectoryEmptier::veryDeep()

@@ -4,6 +4,7 @@
 #include "fileremover.h"
 #include "filetree.h"
 #include "messagelog.h"
+#include "scratchfilesystem.h"
 
 #include <QFile>
 #include <QMetaMethod>
@@ -194,14 +195,13 @@ private:
     QByteArray makeCard(const char *name);
 
     std::unique_ptr<MessageLog> m_log;
-    std::unique_ptr<QTemporaryDir> m_dir;
+    std::unique_ptr<ScratchFileSystem> m_files;
 };
 
 void tst_FileRemover::init()
 {
     m_log = std::make_unique<MessageLog>();
-    m_dir = std::make_unique<QTemporaryDir>();
-    QVERIFY(m_dir->isValid());
+    m_files = std::make_unique<ScratchFileSystem>();
     makeFolder(path("outside"));
     makeFile(path("outside/file"), "precious");
     writeMountTable(QByteArray());
@@ -210,9 +210,7 @@ void tst_FileRemover::init()
 void tst_FileRemover::cleanup()
 {
     QCOMPARE(read(path("outside/file")), QByteArray("precious"));
-    // QTemporaryDir leaves names that are no text.
-    QVERIFY(FileRemover::removeAllEntries(m_dir->path()));
-    m_dir.reset();
+    m_files.reset();
     QCOMPARE(m_log->takeAll(), QList<MessageLog::Message>());
     m_log.reset();
 }
@@ -227,7 +225,7 @@ void tst_FileRemover::writeMountTable(const QByteArray &content)
 
 QByteArray tst_FileRemover::path(const char *name) const
 {
-    return QFile::encodeName(m_dir->path()) + '/' + name;
+    return m_files->path(name);
 }
 
 QByteArray tst_FileRemover::makeCard(const char *name)
@@ -545,7 +543,8 @@ void tst_FileRemover::lineCutWithinDirectory()
     // Escapes make a line four times as long as its directory, so that the front of a line may name
     // another directory, which exists.
     const int escapes = 3000;
-    QByteArray folder = m_dir->path().toUtf8();
+    QByteArray folder = path("folder");
+    makeFolder(folder);
     QByteArray padding;
     while (folder.size() < escapes) {
         folder += '/' + QByteArray(200, ' ');
@@ -748,7 +747,9 @@ void tst_FileRemover::folderOfAnotherDisk()
     // A block device whose node is here, and a folder of another: the card was unmounted meanwhile.
     QByteArray node;
     struct stat disk = {};
-    const QByteArray card = makeCard("card");
+    const QTemporaryDir onDisk;
+    const QByteArray card = QFile::encodeName(onDisk.path());
+    makeFiles(card, 4);
     struct stat folder = {};
     QCOMPARE(stat(card.constData(), &folder), 0);
     const QByteArrayList names = list("/dev");

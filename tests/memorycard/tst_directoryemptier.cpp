@@ -125,6 +125,34 @@ template<typename Change> void changeListings(Change change)
     };
 }
 
+// A chain of folders, each with files and full folders on both sides of the next one in directory
+// order, whichever way that runs: the walk has something left to do in all of them on its way back.
+void makeDeepTree(const QByteArray &top, int depth)
+{
+    for (int level = 0; level <= depth; ++level) {
+        const QByteArray folder = chainPath(top, level);
+        for (const char *const side : {"/a", "/z"}) {
+            makeFile(folder + side + "File");
+            makeFolder(folder + side + "Folder");
+            makeFile(folder + side + "Folder/file");
+            if (level < depth && !exists(chainPath(top, level + 1))) {
+                makeFolder(chainPath(top, level + 1));
+            }
+        }
+    }
+}
+
+// What a walk would remove that took this folder for one of such a tree.
+void makeBait(const QByteArray &folder)
+{
+    makeFolder(folder + "/d");
+    for (const char *const side : {"/a", "/z"}) {
+        makeFile(folder + side + "File");
+        makeFolder(folder + side + "Folder");
+        makeFile(folder + side + "Folder/file");
+    }
+}
+
 // Swaps two entries again and again until it is ended, with this program at the latest.
 pid_t startSwapping(const QByteArray &first, const QByteArray &second)
 {
@@ -192,6 +220,7 @@ private Q_SLOTS:
     void folderMovedOutFarDown();
     void wayMovedOutFarDown();
     void wayMovedOutAndReplaced();
+    void descriptorsAfterDetour();
     void entryVanishes();
     void raceOfFoldersAndLinks();
     void raceOfMovedFolders();
@@ -401,16 +430,7 @@ void tst_DirectoryEmptier::wideFoldersInDeepTree()
 {
     // Deeper than descriptors are kept, with work left at every level on the way back.
     constexpr int depth = 150;
-    makeChain(m_top, depth);
-    for (int level = 0; level <= depth; ++level) {
-        const QByteArray folder = chainPath(m_top, level);
-        makeFiles(folder, 20);
-        for (const char *side : {"/a", "/z"}) {
-            makeFolder(folder + side);
-            makeFiles(folder + side, 5);
-        }
-        makeLink(folder + "/link", m_outside);
-    }
+    makeDeepTree(m_top, depth);
     CallCounter counter;
     QVERIFY(empty(m_top));
     QCOMPARE(list(m_top), QByteArrayList());
@@ -478,10 +498,7 @@ void tst_DirectoryEmptier::failureStopsNothing()
 void tst_DirectoryEmptier::failureFarDown()
 {
     constexpr int depth = 150;
-    makeChain(m_top, depth);
-    for (int level = 0; level <= depth; ++level) {
-        makeFiles(chainPath(m_top, level), 3);
-    }
+    makeDeepTree(m_top, depth);
     makeFile(chainPath(m_top, depth) + "/stuck");
     SystemCalls::hooks().unlinkat = [&](int directory, const char *name, int flags) {
         if (qstrcmp(name, "stuck") == 0) {
@@ -655,10 +672,7 @@ void tst_DirectoryEmptier::fileBecomesFolder()
 void tst_DirectoryEmptier::folderMovedOutNearby()
 {
     // The folders above are still open: their entries go.
-    makeChain(m_top, 10);
-    for (int level = 0; level <= 10; ++level) {
-        makeFiles(chainPath(m_top, level), 3);
-    }
+    makeDeepTree(m_top, 10);
     makeFile(chainPath(m_top, 8) + "/trigger");
     beforeRemovalOf("trigger", [&] { rename(chainPath(m_top, 5), m_outside + "/moved"); });
     QVERIFY(!empty(m_top));
@@ -671,13 +685,10 @@ void tst_DirectoryEmptier::folderMovedOutFarDown()
     // Nothing above the folder is open any more, and its ".." leads outside: the way back is found
     // from the top.
     constexpr int depth = 150;
-    makeChain(m_top, depth);
-    for (int level = 0; level <= depth; ++level) {
-        makeFiles(chainPath(m_top, level), 3);
-    }
+    makeDeepTree(m_top, depth);
     makeFile(chainPath(m_top, depth) + "/trigger");
     beforeRemovalOf("trigger", [&] { rename(chainPath(m_top, 20), m_outside + "/moved"); });
-    makeFiles(m_outside, 3);
+    makeBait(m_outside);
     m_outsideBefore = listAll(m_outside);
     QVERIFY(!empty(m_top));
     const QByteArrayList left = listAll(m_top);
@@ -690,46 +701,69 @@ void tst_DirectoryEmptier::wayMovedOutFarDown()
 {
     // Two folders move: the way back ends above the higher one.
     constexpr int depth = 150;
-    makeChain(m_top, depth);
-    for (int level = 0; level <= depth; ++level) {
-        makeFiles(chainPath(m_top, level), 3);
-    }
+    makeDeepTree(m_top, depth);
     makeFile(chainPath(m_top, depth) + "/trigger");
     beforeRemovalOf("trigger", [&] {
         rename(chainPath(m_top, 40), m_outside + "/moved");
         rename(chainPath(m_top, 10), m_outside + "/movedToo");
-        makeFolder(m_outside + "/movedToo/precious");
-        makeFile(m_outside + "/movedToo/precious/file");
     });
+    makeBait(m_outside);
+    m_outsideBefore = listAll(m_outside);
     QVERIFY(!empty(m_top));
     const QByteArrayList left = listAll(m_top);
     QCOMPARE(left.size(), 9);
     QCOMPARE(m_top + '/' + left.last(), chainPath(m_top, 9));
-    QVERIFY(exists(m_outside + "/movedToo/precious/file"));
+    // What lay between the two is out of the card and stays.
+    QVERIFY(exists(chainPath(m_outside + "/movedToo", 29)));
 }
 
 void tst_DirectoryEmptier::wayMovedOutAndReplaced()
 {
     // In the place of a folder on the way stands another one: it was not listed and is not entered.
     constexpr int depth = 150;
-    makeChain(m_top, depth);
-    for (int level = 0; level <= depth; ++level) {
-        makeFiles(chainPath(m_top, level), 3);
-    }
+    makeDeepTree(m_top, depth);
     makeFile(chainPath(m_top, depth) + "/trigger");
     makeFolder(m_outside + "/other");
-    makeChain(m_outside + "/other", 30);
-    makeFiles(m_outside + "/other", 3);
+    makeDeepTree(m_outside + "/other", 30);
+    makeBait(m_outside);
+    m_outsideBefore = listAll(m_outside);
+    // Except the folder that is moved into the card.
+    m_outsideBefore.erase(
+        std::remove_if(m_outsideBefore.begin(), m_outsideBefore.end(),
+                       [](const QByteArray &path) { return path.startsWith("other"); }),
+        m_outsideBefore.end());
+    const int size = listAll(m_outside + "/other").size();
     beforeRemovalOf("trigger", [&] {
         rename(chainPath(m_top, 30), m_outside + "/moved");
         rename(chainPath(m_top, 20), m_outside + "/movedToo");
         rename(m_outside + "/other", chainPath(m_top, 20));
     });
     QVERIFY(!empty(m_top));
-    QCOMPARE(list(chainPath(m_top, 19)), QByteArrayList{"d"});
-    QCOMPARE(list(chainPath(m_top, 20)).size(), 4);
-    QVERIFY(exists(chainPath(m_top, 50)));
-    QCOMPARE(list(m_top), QByteArrayList{"d"});
+    QCOMPARE(listAll(chainPath(m_top, 20)).size(), size);
+    QCOMPARE(listAll(m_top).size(), 20 + size);
+}
+
+void tst_DirectoryEmptier::descriptorsAfterDetour()
+{
+    // As many are kept open after a way back from the top as before, in either direction.
+    makeDeepTree(m_top, 150);
+    makeFile(chainPath(m_top, 150) + "/trigger");
+    beforeRemovalOf("trigger", [&] {
+        rename(chainPath(m_top, 90), m_outside + "/moved");
+        // In the place of what is still to be removed there, for the walk to go down into.
+        for (const char *const side : {"/aFolder", "/zFolder"}) {
+            const QByteArray folder = chainPath(m_top, 89) + side;
+            if (exists(folder)) {
+                makeChain(folder, 200);
+            }
+        }
+    });
+    const auto unlinkat = SystemCalls::hooks().unlinkat;
+    CallCounter counter;
+    SystemCalls::hooks().unlinkat = unlinkat;
+    QVERIFY(!empty(m_top));
+    QCOMPARE(listAll(m_top).size(), 89);
+    QCOMPARE(counter.openDescriptors, maxOpenDescriptors);
 }
 
 void tst_DirectoryEmptier::entryVanishes()

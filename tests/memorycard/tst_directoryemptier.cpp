@@ -219,6 +219,7 @@ private Q_SLOTS:
     void folderMovedOutNearby();
     void folderMovedOutFarDown();
     void wayMovedOutFarDown();
+    void wayMovedOutAndReplaced_data();
     void wayMovedOutAndReplaced();
     void descriptorsAfterDetour();
     void entryVanishes();
@@ -717,14 +718,25 @@ void tst_DirectoryEmptier::wayMovedOutFarDown()
     QVERIFY(exists(chainPath(m_outside + "/movedToo", 29)));
 }
 
+void tst_DirectoryEmptier::wayMovedOutAndReplaced_data()
+{
+    QTest::addColumn<bool>("full");
+
+    QTest::newRow("by a full folder") << true;
+    QTest::newRow("by an empty folder") << false;
+}
+
 void tst_DirectoryEmptier::wayMovedOutAndReplaced()
 {
+    QFETCH(const bool, full);
     // In the place of a folder on the way stands another one: it was not listed and is not entered.
     constexpr int depth = 150;
     makeDeepTree(m_top, depth);
     makeFile(chainPath(m_top, depth) + "/trigger");
     makeFolder(m_outside + "/other");
-    makeDeepTree(m_outside + "/other", 30);
+    if (full) {
+        makeDeepTree(m_outside + "/other", 30);
+    }
     makeBait(m_outside);
     m_outsideBefore = listAll(m_outside);
     // Except the folder that is moved into the card.

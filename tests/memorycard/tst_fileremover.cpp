@@ -15,6 +15,7 @@
 #include <QThread>
 #include <QThreadPool>
 
+#include <atomic>
 #include <cerrno>
 #include <functional>
 #include <memory>
@@ -275,7 +276,7 @@ void tst_FileRemover::onThreadPool()
     Receiver receiver;
     connect(remover, &FileRemover::completed, &receiver, &Receiver::onCompleted);
     connect(remover, &FileRemover::error, &receiver, &Receiver::onError);
-    QThread *emitter = nullptr;
+    std::atomic<QThread *> emitter{nullptr};
     const auto note = [&] { emitter = QThread::currentThread(); };
     connect(remover, &FileRemover::completed, remover, note, Qt::DirectConnection);
     connect(remover, &FileRemover::error, remover, note, Qt::DirectConnection);
@@ -286,7 +287,7 @@ void tst_FileRemover::onThreadPool()
 
     // Nothing arrives before this thread returns to its event loop, though the remover is gone.
     QVERIFY(deleted.tryAcquire(1, runTimeout));
-    QVERIFY(emitter && emitter != QThread::currentThread());
+    QVERIFY(emitter.load() && emitter.load() != QThread::currentThread());
     QCOMPARE(receiver.completed + receiver.errors, 0);
     QTRY_COMPARE(receiver.completed + receiver.errors, 1);
     QCoreApplication::sendPostedEvents();

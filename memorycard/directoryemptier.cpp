@@ -35,7 +35,8 @@ struct Entry {
 
 // The entries of a folder in directory order, as packed as they come: a folder of 100,000 files is
 // held in a few MiB. Names are bytes and never pass through an encoding.
-class Listing {
+class Listing
+{
 public:
     void read(int directory, ReadBuffer &buffer)
     {
@@ -107,7 +108,8 @@ struct Folder {
     bool emptied = true;
 };
 
-class Walk {
+class Walk
+{
 public:
     bool run(FileDescriptor top)
     {

@@ -9,7 +9,8 @@
 #include <unistd.h>
 
 // Owns an open file descriptor, or none.
-class FileDescriptor {
+class FileDescriptor
+{
 public:
     FileDescriptor() = default;
     explicit FileDescriptor(int fd) : m_fd(fd) { }

@@ -13,6 +13,7 @@
 #include <cerrno>
 #include <cstdio>
 #include <memory>
+#include <utility>
 
 #include <fcntl.h>
 #include <mntent.h>
@@ -21,7 +22,7 @@
 
 namespace {
 
-constexpr char mountTablePath[] = "/etc/mtab";
+constexpr const char *mountTablePath = "/etc/mtab";
 constexpr std::size_t mountEntrySize = 12288;
 
 struct CloseMountTable {
@@ -75,7 +76,7 @@ bool emptyMount(const QByteArray &device, const char *directory)
 
 } // namespace
 
-FileRemover::FileRemover(const QString &devicePath) : m_devicePath(devicePath)
+FileRemover::FileRemover(QString devicePath) : m_devicePath(std::move(devicePath))
 {
 }
 

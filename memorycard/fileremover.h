@@ -15,12 +15,13 @@
     Made for one run on a thread pool, which deletes it afterwards. Exactly one of the two signals
    is emitted, once, from the pool's thread, as the last thing that run() does.
 */
-class FileRemover : public QObject, public QRunnable {
+class FileRemover : public QObject, public QRunnable
+{
     Q_OBJECT
 
 public:
     // The card is found in the mount table by this device node, for example /dev/mmcblk1p1.
-    explicit FileRemover(const QString &devicePath);
+    explicit FileRemover(QString devicePath);
 
     void run() override;
 

@@ -12,7 +12,8 @@
    lie in it, so that a remover that is broken and climbs out of its tree meets another device,
    where it would otherwise meet the developer's files.
 */
-class ScratchFileSystem {
+class ScratchFileSystem
+{
 public:
     // Ends the program when there is no right to mount, which the sandbox grants to everybody.
     ScratchFileSystem();

@@ -40,7 +40,8 @@ bool empty(const QByteArray &path)
 }
 
 // Counts what the walk asks of the kernel, by the name of the call.
-class CallCounter {
+class CallCounter
+{
 public:
     CallCounter()
     {
@@ -188,7 +189,8 @@ void stop(pid_t pid)
 
 } // namespace
 
-class tst_DirectoryEmptier : public QObject {
+class tst_DirectoryEmptier : public QObject
+{
     Q_OBJECT
 
 private Q_SLOTS:

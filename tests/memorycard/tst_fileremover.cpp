@@ -92,7 +92,8 @@ QByteArray line(const QByteArray &source, const QByteArray &directory)
 }
 
 // Root may read and remove everything; without these capabilities it is its folders' plain owner.
-class WithoutPrivileges {
+class WithoutPrivileges
+{
 public:
     WithoutPrivileges()
     {
@@ -121,7 +122,8 @@ private:
     __user_cap_data_struct m_old[1] = {};
 };
 
-class Receiver : public QObject {
+class Receiver : public QObject
+{
     Q_OBJECT
 
 public Q_SLOTS:
@@ -144,7 +146,8 @@ public:
 
 } // namespace
 
-class tst_FileRemover : public QObject {
+class tst_FileRemover : public QObject
+{
     Q_OBJECT
 
 private Q_SLOTS:

@@ -55,9 +55,13 @@ void DirectoryWatcher::watch()
 
 void DirectoryWatcher::watchedChanged(const QString &path)
 {
+    // What else happens in the parent is of no interest. The watches stay, too: taking them off
+    // would lose what the directory itself has yet to report.
+    if (path != m_directory && m_identity && m_identity == identify()) {
+        return;
+    }
     const Identity before = m_identity;
     watch();
-    // Whatever else happens in a parent is of no interest.
     if (path == m_directory || m_identity != before) {
         Q_EMIT directoryChanged(m_directory);
     }

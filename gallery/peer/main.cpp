@@ -31,7 +31,7 @@ int main(int argc, char *argv[])
         qFatal("usage: gallery-peer SERVICE");
     }
 
-    const QString name = arguments.at(1);
+    const QString &name = arguments.at(1);
     RecordingService service(QDBusConnection::SessionBus, name);
     QDBusConnection bus = service.connection();
     QObject::connect(&service, &RecordingService::called, [bus, name](const QDBusMessage &call) {

@@ -3,8 +3,15 @@
 
 #include "systemsettingsplugin.h"
 
+#include "androidsupport.h"
 #include "apptranslator.h"
+#include "bluetoothinfo.h"
+#include "kivinfo.h"
+#include "locationconfiguration.h"
+#include "modemfeaturereader.h"
 #include "quickactionsmodel.h"
+#include "termsofusemanager.h"
+#include "textfilereader.h"
 
 #include <QCoreApplication>
 #include <QQmlEngine>
@@ -14,11 +21,28 @@ namespace {
 constexpr int versionMajor = 1;
 constexpr int versionMinor = 0;
 
+// The engine takes ownership.
+QObject *createTextFileReader(QQmlEngine *engine, QJSEngine *scriptEngine)
+{
+    Q_UNUSED(engine)
+    Q_UNUSED(scriptEngine)
+    return new TextFileReader;
+}
+
 } // namespace
 
 void SystemSettingsPlugin::registerTypes(const char *uri)
 {
+    qmlRegisterSingletonType<TextFileReader>(uri, versionMajor, versionMinor, "TextFileReader",
+                                             createTextFileReader);
+    qmlRegisterType<AndroidSupport>(uri, versionMajor, versionMinor, "AndroidSupport");
+    qmlRegisterType<LocationConfiguration>(uri, versionMajor, versionMinor,
+                                           "LocationConfiguration");
+    qmlRegisterType<BluetoothInfo>(uri, versionMajor, versionMinor, "BluetoothInfo");
+    qmlRegisterType<KivInfo>(uri, versionMajor, versionMinor, "KivInfo");
     qmlRegisterType<QuickActionsModel>(uri, versionMajor, versionMinor, "QuickActionsModel");
+    qmlRegisterType<ModemFeatureReader>(uri, versionMajor, versionMinor, "ModemFeatures");
+    qmlRegisterType<TermsOfUseManager>(uri, versionMajor, versionMinor, "TermsOfUseManager");
 }
 
 void SystemSettingsPlugin::initializeEngine(QQmlEngine *engine, const char *uri)

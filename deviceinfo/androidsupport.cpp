@@ -1,0 +1,35 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "androidsupport.h"
+
+#include <QFile>
+
+namespace {
+
+constexpr QLatin1String runtimeDaemon("/usr/sbin/apkd");
+
+} // namespace
+
+/*!
+    \qmltype AndroidSupport
+    \inqmlmodule com.marlo.settings.system
+    \brief Tells whether the support for Android applications is installed.
+*/
+
+AndroidSupport::AndroidSupport(QObject *parent) : QObject(parent)
+{
+}
+
+/*!
+    \qmlproperty bool AndroidSupport::dataDirectoriesVisible
+    \readonly
+
+    Whether the data directories of Android applications are to be shown: true exactly when there
+    is a \c /usr/sbin/apkd, the daemon of the Android support. Looked up on every read. A binding
+    does not follow: an installation or removal shows when the property is read again.
+*/
+bool AndroidSupport::dataDirectoriesVisible() const
+{
+    return QFile::exists(runtimeDaemon);
+}

@@ -1,0 +1,47 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "bluetoothinfo.h"
+
+#include "endlessfile.h"
+
+#include <QFile>
+#include <QtDebug>
+
+namespace {
+
+constexpr QLatin1String addressFile("/var/lib/bluetooth/board-address");
+
+} // namespace
+
+/*!
+    \qmltype BluetoothInfo
+    \inqmlmodule com.marlo.settings.system
+    \brief Tells the address of the device's Bluetooth adapter.
+*/
+
+BluetoothInfo::BluetoothInfo(QObject *parent) : QObject(parent)
+{
+    initAdapterAddress();
+}
+
+/*!
+    \qmlproperty string BluetoothInfo::adapterAddress
+    \readonly
+
+    The address of the Bluetooth adapter in lower case, such as \c{00:1a:7d:da:71:13}: the first
+    line of \c /var/lib/bluetooth/board-address, whatever it holds, read when the object is created.
+    Empty, with a warning, if the file cannot be read.
+*/
+
+void BluetoothInfo::initAdapterAddress()
+{
+    QFile file(addressFile);
+    if (isEndless(addressFile) || !file.open(QIODevice::ReadOnly)) {
+        qWarning() << "Unable to open file:" << file.fileName();
+        return;
+    }
+    // As a C string: what follows a NUL is no address.
+    const QByteArray line = file.readLine();
+    m_adapterAddress = QString::fromLatin1(line.constData()).toLower().trimmed();
+}

@@ -1,0 +1,146 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "kivinfo.h"
+
+#include <QDBusArgument>
+#include <QDBusConnection>
+#include <QDBusMessage>
+#include <QDBusPendingCallWatcher>
+#include <QDBusPendingReply>
+
+namespace {
+
+constexpr QLatin1String daemonService("com.marlo.kivd");
+constexpr QLatin1String daemonPath("/com/marlo/kivd");
+constexpr QLatin1String daemonInterface("com.marlo.kivd");
+constexpr QLatin1String propertiesInterface("org.freedesktop.DBus.Properties");
+constexpr QLatin1String getMethod("Get");
+constexpr QLatin1String changedSignal("PropertiesChanged");
+constexpr QLatin1String changedSignature("a{sv}");
+
+constexpr QLatin1String idProperty("KIVID");
+constexpr QLatin1String readyProperty("Ready");
+constexpr int ready = 1;
+
+// What the daemon answers, or the default if it does not answer with just that type. The daemon
+// sends bare values: a variant, which other services would send, is refused as any other type is.
+template<typename Value> Value answer(const QDBusPendingCall &call)
+{
+    const QDBusPendingReply<Value> reply = call;
+    // An error first: its message would pass for a text.
+    return reply.isError() ? Value() : reply.value();
+}
+
+QVariantMap changedProperties(const QDBusMessage &message)
+{
+    const QVariant changed = message.arguments().value(1);
+    // Taking a map out of anything else is no failure that QtDBus reports: it crashes.
+    if (changed.userType() == qMetaTypeId<QDBusArgument>()
+        && changed.value<QDBusArgument>().currentSignature() != changedSignature) {
+        return {};
+    }
+    return qdbus_cast<QVariantMap>(changed);
+}
+
+} // namespace
+
+/*!
+    \qmltype KivInfo
+    \inqmlmodule com.marlo.settings.system
+    \brief Tells which smart back cover is attached to the device.
+
+    Asks the cover daemon, \c com.marlo.kivd on the system bus, when it is created, and follows its
+    \c PropertiesChanged signal from then on, also when the daemon starts only later. Without the
+    daemon, or if it answers with an error, the properties keep their defaults; nothing is logged.
+*/
+
+KivInfo::KivInfo(QObject *parent) : QObject(parent)
+{
+    // Plain messages: an interface object would wait for the daemon to describe itself.
+    connect(get(idProperty), &QDBusPendingCallWatcher::finished, this, &KivInfo::slotIdFinished);
+    connect(get(readyProperty), &QDBusPendingCallWatcher::finished, this,
+            &KivInfo::slotReadyFinished);
+    QDBusConnection::systemBus().connect(daemonService, daemonPath, propertiesInterface,
+                                         changedSignal, this,
+                                         SLOT(propertiesChanged(QDBusMessage)));
+}
+
+/*!
+    \qmlproperty string KivInfo::kivId
+    \readonly
+
+    The identifier of the attached cover, the daemon's property \c KIVID. Empty if none is attached.
+*/
+
+/*!
+    \qmlproperty bool KivInfo::kivReady
+    \readonly
+
+    Whether the daemon is ready: its property \c Ready is 1.
+*/
+
+/*!
+    \qmlsignal KivInfo::kivIdChanged()
+
+    Emitted after \l kivId has changed; before kivReadyChanged() if both change at once.
+*/
+
+/*!
+    \qmlsignal KivInfo::kivReadyChanged()
+
+    Emitted after \l kivReady has changed.
+*/
+
+// A reply overwrites what a signal told before it came: both tell the truth of their moment, and
+// the next signal puts it right.
+
+void KivInfo::slotIdFinished(QDBusPendingCallWatcher *watcher)
+{
+    watcher->deleteLater();
+    setKivId(answer<QString>(*watcher));
+}
+
+void KivInfo::slotReadyFinished(QDBusPendingCallWatcher *watcher)
+{
+    watcher->deleteLater();
+    setKivReady(answer<int>(*watcher) == ready);
+}
+
+void KivInfo::propertiesChanged(const QDBusMessage &message)
+{
+    const QVariantMap changed = changedProperties(message);
+    const auto id = changed.constFind(idProperty);
+    if (id != changed.constEnd()) {
+        setKivId(id->toString());
+    }
+    const auto readiness = changed.constFind(readyProperty);
+    if (readiness != changed.constEnd()) {
+        // As the widest integer: a number that is too large for a smaller one would wrap around.
+        setKivReady(readiness->toLongLong() == ready);
+    }
+}
+
+QDBusPendingCallWatcher *KivInfo::get(const QString &property)
+{
+    QDBusMessage call =
+        QDBusMessage::createMethodCall(daemonService, daemonPath, propertiesInterface, getMethod);
+    call.setArguments({daemonInterface, property});
+    return new QDBusPendingCallWatcher(QDBusConnection::systemBus().asyncCall(call), this);
+}
+
+void KivInfo::setKivId(const QString &kivId)
+{
+    if (m_kivId != kivId) {
+        m_kivId = kivId;
+        Q_EMIT kivIdChanged();
+    }
+}
+
+void KivInfo::setKivReady(bool kivReady)
+{
+    if (m_kivReady != kivReady) {
+        m_kivReady = kivReady;
+        Q_EMIT kivReadyChanged();
+    }
+}

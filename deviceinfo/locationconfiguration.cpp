@@ -1,0 +1,168 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "locationconfiguration.h"
+
+#include "endlessfile.h"
+#include "mgconfitem.h"
+
+#include <QFile>
+#include <QLocale>
+#include <QtDebug>
+
+namespace {
+
+constexpr QLatin1String customSettingsEnabledKey("/settings/location/custom_settings_enabled");
+constexpr QLatin1String customSettingsKey("/settings/location/custom_settings");
+
+constexpr QLatin1String gpsEntry("gps/enabled");
+constexpr QLatin1String mlsEntry("mls/enabled");
+constexpr QLatin1String mlsOnlineEntry("mls/online_enabled");
+constexpr QLatin1String hereEntry("here/enabled");
+
+// The states of an online service. The platform's library has names of its own for them; their
+// numbers are what is settled.
+using State = LocationSettings::OnlineAGpsState;
+constexpr auto unavailable = State(0);
+constexpr auto disabled = State(1);
+constexpr auto enabled = State(2);
+
+constexpr QLatin1String mlsAgreement("/usr/share/geoclue-provider-mlsdb/agreements/mls_consent_");
+constexpr QLatin1String hereAgreement("/usr/share/libherepositioning/agreements/here_consent_");
+constexpr QLatin1String englishSuffix("en_GB.txt");
+constexpr QLatin1String suffix(".txt");
+
+State toState(const QVariant &saved)
+{
+    return saved.toBool() ? enabled : disabled;
+}
+
+QString agreementText(QLatin1String base)
+{
+    const QString locale = QLocale().name();
+    QString path = base + locale + suffix;
+    if (!QFile::exists(path)) {
+        qWarning() << "No agreement found for" << locale << ", falling back to english";
+        path = base + englishSuffix;
+    }
+    QFile file(path);
+    if (isEndless(path) || !file.open(QIODevice::ReadOnly | QIODevice::Text)) {
+        return qtTrId("settings_location-la-no_agreement_text_found");
+    }
+    // As a C string: the text ends at the first NUL.
+    return QString::fromUtf8(file.readAll().constData());
+}
+
+} // namespace
+
+/*!
+    \qmltype LocationConfiguration
+    \inqmlmodule com.marlo.settings.system
+    \brief Switches the location services, and saves and restores the user's own choice.
+
+    Besides what is described here the type has the switches of the platform's location settings,
+    all of which can be read, written and followed: \c gpsEnabled and \c mlsEnabled (bool), and
+    \c mlsOnlineState and \c hereState, each 0 as long as the user has not agreed to the service's
+    terms, 1 if it is disabled and 2 if it is enabled.
+
+    \qml
+    LocationConfiguration {
+        id: location
+        Component.onCompleted: if (customSettingsEnabled) restoreCustomSettings()
+    }
+    \endqml
+*/
+
+LocationConfiguration::LocationConfiguration(QObject *parent)
+    : LocationSettings(parent),
+      m_customSettingsEnabled(MGConfItem(customSettingsEnabledKey).value().toBool())
+{
+}
+
+/*!
+    \qmlproperty string LocationConfiguration::hereAgreementText
+    \readonly
+
+    The text that the user agrees to before HERE positioning is used: the file
+    \c{/usr/share/libherepositioning/agreements/here_consent_<locale>.txt} of the default locale,
+    such as \c fi_FI. Without such a file it is that of \c en_GB, with a warning, and if the file
+    cannot be opened the translation of \c settings_location-la-no_agreement_text_found. Read from
+    the file on every read.
+*/
+QString LocationConfiguration::hereAgreementText() const
+{
+    return agreementText(hereAgreement);
+}
+
+/*!
+    \qmlproperty string LocationConfiguration::mlsOnlineAgreementText
+    \readonly
+
+    As \l hereAgreementText, for the online assistance of MLS:
+    \c{/usr/share/geoclue-provider-mlsdb/agreements/mls_consent_<locale>.txt}.
+*/
+QString LocationConfiguration::mlsOnlineAgreementText() const
+{
+    return agreementText(mlsAgreement);
+}
+
+/*!
+    \qmlproperty bool LocationConfiguration::customSettingsEnabled
+
+    Whether the user has chosen the switches one by one. Kept in
+    \c /settings/location/custom_settings_enabled (dconf, bool), which is read when the object is
+    created and not followed; false if it was never set.
+*/
+void LocationConfiguration::setCustomSettingsEnabled(bool enabled)
+{
+    if (m_customSettingsEnabled != enabled) {
+        MGConfItem(customSettingsEnabledKey).set(enabled);
+        m_customSettingsEnabled = enabled;
+        Q_EMIT customSettingsEnabledChanged();
+    }
+}
+
+/*!
+    \qmlmethod void LocationConfiguration::saveCustomSettings()
+
+    Stores the switches as they are in \c /settings/location/custom_settings (dconf, dictionary of
+    \c gps/enabled, \c mls/enabled, \c mls/online_enabled and \c here/enabled, all bool), in place
+    of those stored before.
+*/
+void LocationConfiguration::saveCustomSettings()
+{
+    const QVariantMap settings = {
+        {gpsEntry, gpsEnabled()},
+        {mlsEntry, mlsEnabled()},
+        {mlsOnlineEntry, mlsOnlineState() == enabled},
+        {hereEntry, hereState() == enabled},
+    };
+    MGConfItem(customSettingsKey).set(settings);
+}
+
+/*!
+    \qmlmethod void LocationConfiguration::restoreCustomSettings()
+
+    Sets the switches to what saveCustomSettings() stored last, in this or in any other process. A
+    switch that was not stored is switched off. An online service that the user has not agreed to
+    stays as it is.
+*/
+void LocationConfiguration::restoreCustomSettings()
+{
+    const QVariantMap settings = MGConfItem(customSettingsKey).value().toMap();
+    setGpsEnabled(settings.value(gpsEntry).toBool());
+    setMlsEnabled(settings.value(mlsEntry).toBool());
+    // Asked only now: the switches before may have changed the states.
+    if (mlsOnlineState() != unavailable) {
+        setMlsOnlineState(toState(settings.value(mlsOnlineEntry)));
+    }
+    if (hereState() != unavailable) {
+        setHereState(toState(settings.value(hereEntry)));
+    }
+}
+
+/*!
+    \qmlsignal LocationConfiguration::customSettingsEnabledChanged()
+
+    Emitted after \l customSettingsEnabled has changed.
+*/

@@ -1,0 +1,43 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "modemfeaturereader.h"
+
+#include "endlessfile.h"
+
+#include <QSettings>
+
+namespace {
+
+constexpr QLatin1String featuresFile("/usr/share/modem-software/features.ini");
+constexpr QLatin1String variantKey("variant");
+
+} // namespace
+
+/*!
+    \qmltype ModemFeatures
+    \instantiates ModemFeatureReader
+    \inqmlmodule com.marlo.settings.system
+    \brief Tells which variant of the modem software the device carries.
+*/
+
+ModemFeatureReader::ModemFeatureReader(QObject *parent) : QObject(parent)
+{
+}
+
+/*!
+    \qmlproperty string ModemFeatures::variant
+    \readonly
+
+    The key \c variant of \c /usr/share/modem-software/features.ini, which stands before the first
+    section or in the section \c General. Read from the file on every read. Empty if there is no
+    such file or key, and if the value is a list: an unquoted comma makes it one.
+*/
+QString ModemFeatureReader::variant() const
+{
+    if (isEndless(featuresFile)) {
+        return {};
+    }
+    const QSettings features(featuresFile, QSettings::IniFormat);
+    return features.value(variantKey).toString();
+}

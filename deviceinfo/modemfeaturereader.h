@@ -1,0 +1,23 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#ifndef MODEMFEATUREREADER_H
+#define MODEMFEATUREREADER_H
+
+#include <QObject>
+
+/*
+    The variant of the modem software that the device carries. QML knows it as ModemFeatures.
+*/
+class ModemFeatureReader : public QObject
+{
+    Q_OBJECT
+    Q_PROPERTY(QString variant READ variant CONSTANT)
+
+public:
+    explicit ModemFeatureReader(QObject *parent = nullptr);
+
+    QString variant() const;
+};
+
+#endif

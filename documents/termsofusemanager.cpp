@@ -1,0 +1,164 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "termsofusemanager.h"
+
+#include "endlessfile.h"
+
+#include <QFile>
+#include <QtDebug>
+
+namespace {
+
+constexpr QLatin1String platformPath("/usr/share/marlo-settings/platform-eula");
+constexpr QLatin1String platformTerms("/tarnwick_termsofuse-");
+constexpr QLatin1String vendorTerms("/full/");
+constexpr QLatin1String vendorSummary("/summary/");
+constexpr QLatin1String suffix(".txt");
+
+constexpr QLatin1String english("en_GB");
+constexpr int languageLength = 2;
+
+enum class Missing { Warn, Ignore };
+
+// Empty if there is neither a file for the locale nor one in English.
+QString findTerms(const QString &base, const QString &localeName, Missing missing)
+{
+    // The language alone is preferred to language and country on purpose, and the latter is looked
+    // for only behind an encoding: terms are installed by language, and vendors rely on the order.
+    QStringList candidates = {localeName, localeName.left(languageLength)};
+    const int encoding = localeName.indexOf(QLatin1Char('.'));
+    if (encoding > 0) {
+        candidates.append(localeName.left(encoding));
+    }
+    for (const QString &candidate : qAsConst(candidates)) {
+        const QString path = base + candidate + suffix;
+        if (QFile::exists(path)) {
+            return path;
+        }
+    }
+
+    if (localeName == english) {
+        return {};
+    }
+    if (missing == Missing::Warn) {
+        qWarning() << "TermsOfUseManager: unable to load locale-specific terms for locale"
+                   << localeName;
+    }
+    return findTerms(base, english, Missing::Ignore);
+}
+
+// The text ends at the first NUL, as a C string does.
+QString toText(const QByteArray &data)
+{
+    return QString::fromUtf8(data.constData()).trimmed();
+}
+
+QStringList readTerms(const QString &base, const QString &localeName)
+{
+    const QString path = findTerms(base, localeName, Missing::Warn);
+    if (path.isEmpty()) {
+        qWarning() << "TermsOfUseManager: unable to load either the specified locale or the "
+                      "English terms";
+        return {};
+    }
+    QFile file(path);
+    if (isEndless(path) || !file.open(QIODevice::ReadOnly | QIODevice::Text)) {
+        qWarning() << "TermsOfUseManager: unable to load terms from file" << path;
+        qWarning() << file.errorString();
+        return {};
+    }
+    const QString title = toText(file.readLine());
+    const QString body = toText(file.readAll());
+    return {title, body};
+}
+
+} // namespace
+
+/*!
+    \qmltype TermsOfUseManager
+    \inqmlmodule com.marlo.settings.system
+    \brief Finds and reads the terms of use in the user's language.
+
+    Terms are UTF-8 text files named by locale. For the locale name \c fi_FI.UTF-8 the first of
+    \c fi_FI.UTF-8.txt, \c fi.txt and \c fi_FI.txt that exists is read; for \c fi_FI, without an
+    encoding, \c fi_FI.txt or \c{fi.txt}. If there is none, with a warning, British English,
+    \c{en_GB.txt} or \c{en.txt}.
+
+    The first line of a file is the title and everything after it the body, both without white space
+    around them.
+
+    \qml
+    TermsOfUseManager {
+        readonly property var terms: platformTermsOfUse(Qt.locale().name)
+        readonly property string title: terms.length > 0 ? terms[0] : ""
+    }
+    \endqml
+*/
+
+TermsOfUseManager::TermsOfUseManager(QObject *parent) : QObject(parent)
+{
+}
+
+/*!
+    \qmlproperty bool TermsOfUseManager::hasVendorTermsOfUse
+    \readonly
+
+    Whether \l vendorPath is set and exists. Looked up on every read.
+*/
+bool TermsOfUseManager::hasVendorTermsOfUse() const
+{
+    return !m_vendorPath.isEmpty() && QFile::exists(m_vendorPath);
+}
+
+/*!
+    \qmlproperty string TermsOfUseManager::vendorPath
+
+    The directory of the vendor's terms: those in full are in its directory \c{full}, summaries in
+    \c{summary}. Empty by default.
+*/
+void TermsOfUseManager::setVendorPath(const QString &path)
+{
+    if (m_vendorPath != path) {
+        m_vendorPath = path;
+        Q_EMIT vendorPathChanged();
+    }
+}
+
+/*!
+    \qmlmethod list<string> TermsOfUseManager::platformTermsOfUse(string localeName)
+
+    Returns title and body of the platform's terms for \a localeName, from
+    \c{/usr/share/marlo-settings/platform-eula/tarnwick_termsofuse-<locale>.txt}. An empty list,
+    with warnings, if there are none or they cannot be read.
+*/
+QStringList TermsOfUseManager::platformTermsOfUse(const QString &localeName) const
+{
+    return readTerms(platformPath + platformTerms, localeName);
+}
+
+/*!
+    \qmlmethod list<string> TermsOfUseManager::vendorTermsOfUse(string localeName)
+
+    As platformTermsOfUse(), for the vendor's terms in full.
+*/
+QStringList TermsOfUseManager::vendorTermsOfUse(const QString &localeName) const
+{
+    return readTerms(m_vendorPath + vendorTerms, localeName);
+}
+
+/*!
+    \qmlmethod list<string> TermsOfUseManager::vendorTermsSummary(string localeName)
+
+    As platformTermsOfUse(), for the summary of the vendor's terms.
+*/
+QStringList TermsOfUseManager::vendorTermsSummary(const QString &localeName) const
+{
+    return readTerms(m_vendorPath + vendorSummary, localeName);
+}
+
+/*!
+    \qmlsignal TermsOfUseManager::vendorPathChanged()
+
+    Emitted after \l vendorPath has changed.
+*/

@@ -1,0 +1,39 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#ifndef TERMSOFUSEMANAGER_H
+#define TERMSOFUSEMANAGER_H
+
+#include <QObject>
+#include <QStringList>
+
+/*
+    The terms of use in the user's language: the platform's own, and those of the vendor of the
+    device, as title and body.
+*/
+class TermsOfUseManager : public QObject
+{
+    Q_OBJECT
+    Q_PROPERTY(bool hasVendorTermsOfUse READ hasVendorTermsOfUse NOTIFY vendorPathChanged)
+    Q_PROPERTY(QString vendorPath READ vendorPath WRITE setVendorPath NOTIFY vendorPathChanged)
+
+public:
+    explicit TermsOfUseManager(QObject *parent = nullptr);
+
+    bool hasVendorTermsOfUse() const;
+    QString vendorPath() const { return m_vendorPath; }
+    void setVendorPath(const QString &path);
+
+    // Title and body, or nothing if there are no terms to read.
+    Q_INVOKABLE QStringList platformTermsOfUse(const QString &localeName) const;
+    Q_INVOKABLE QStringList vendorTermsOfUse(const QString &localeName) const;
+    Q_INVOKABLE QStringList vendorTermsSummary(const QString &localeName) const;
+
+Q_SIGNALS:
+    void vendorPathChanged();
+
+private:
+    QString m_vendorPath;
+};
+
+#endif

@@ -1,0 +1,68 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#ifndef LOCATIONSETTINGS_H
+#define LOCATIONSETTINGS_H
+
+#include <QObject>
+
+class QVariant;
+
+/*
+    The switches of the device's location services: the satellite receiver (GPS), the MLS network
+    positioning with its online assistance, and the HERE positioning service.
+
+    They lie in dconf, so that every process sees the same switches and follows their changes. A
+    switch that was never set is off, and an online service never agreed to is not available.
+*/
+class LocationSettings : public QObject
+{
+    Q_OBJECT
+    Q_PROPERTY(bool gpsEnabled READ gpsEnabled WRITE setGpsEnabled NOTIFY gpsEnabledChanged)
+    Q_PROPERTY(bool mlsEnabled READ mlsEnabled WRITE setMlsEnabled NOTIFY mlsEnabledChanged)
+    Q_PROPERTY(OnlineAGpsState mlsOnlineState READ mlsOnlineState WRITE setMlsOnlineState NOTIFY
+                   mlsOnlineStateChanged)
+    Q_PROPERTY(OnlineAGpsState hereState READ hereState WRITE setHereState NOTIFY hereStateChanged)
+
+public:
+    // The numbers are what is stored, and what the settings pages know. The type is fixed because
+    // QML may write any number.
+    enum OnlineAGpsState : int {
+        OnlineAGpsNotAgreed = 0, // the user has not agreed to the terms of the service
+        OnlineAGpsDisabled = 1,
+        OnlineAGpsEnabled = 2,
+    };
+    Q_ENUM(OnlineAGpsState)
+
+    explicit LocationSettings(QObject *parent = nullptr);
+
+    bool gpsEnabled() const { return m_gpsEnabled; }
+    bool mlsEnabled() const { return m_mlsEnabled; }
+    OnlineAGpsState mlsOnlineState() const { return m_mlsOnlineState; }
+    OnlineAGpsState hereState() const { return m_hereState; }
+
+    // A change is seen, and its signal emitted, before these return. A number that is no state is
+    // refused with a warning.
+    void setGpsEnabled(bool enabled);
+    void setMlsEnabled(bool enabled);
+    void setMlsOnlineState(OnlineAGpsState state);
+    void setHereState(OnlineAGpsState state);
+
+Q_SIGNALS:
+    void gpsEnabledChanged();
+    void mlsEnabledChanged();
+    void mlsOnlineStateChanged();
+    void hereStateChanged();
+
+private:
+    template<typename Value>
+    void follow(const QString &key, Value LocationSettings::*member,
+                Value (*fromStored)(const QVariant &), void (LocationSettings::*changed)());
+
+    bool m_gpsEnabled = false;
+    bool m_mlsEnabled = false;
+    OnlineAGpsState m_mlsOnlineState = OnlineAGpsNotAgreed;
+    OnlineAGpsState m_hereState = OnlineAGpsNotAgreed;
+};
+
+#endif

@@ -1,0 +1,732 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "coverdaemon.h"
+#include "kivinfo.h"
+#include "messagelog.h"
+
+#include <QDBusArgument>
+#include <QDBusConnectionInterface>
+#include <QDBusMetaType>
+#include <QDBusObjectPath>
+#include <QDBusPendingCallWatcher>
+#include <QDBusVariant>
+#include <QProcess>
+#include <QtTest>
+
+class TestKivInfo : public QObject
+{
+    Q_OBJECT
+
+private Q_SLOTS:
+    void initTestCase();
+    void init();
+    void cleanup();
+
+    void properties();
+    void asksTheDaemonTwice();
+    void readsBothInEitherOrder();
+    void onlyOneIsReady_data();
+    void onlyOneIsReady();
+    void idIsAString_data();
+    void idIsAString();
+    void readinessIsAnInteger_data();
+    void readinessIsAnInteger();
+    void errorsKeepTheDefaults();
+    void lateRepliesOverwriteSignals();
+    void lateErrorsResetToTheDefaults();
+
+    void followsChanges();
+    void idChangesBeforeReadiness();
+    void convertsChanges_data();
+    void convertsChanges();
+    void sameValuesEmitNothing();
+    void invalidatedPropertiesKeepTheirValues();
+    void theFirstArgumentIsNotLookedAt();
+    void nonsenseChangesNothing_data();
+    void nonsenseChangesNothing();
+    void othersChangeNothing();
+    void severalFollowOneSignal();
+    void aHandlerMayCallBack();
+
+    void defaultsWithoutADaemon();
+    void followsADaemonThatStartsLater();
+    void followsADaemonThatHangs();
+    void defaultsWithoutABus();
+    void goesWithRepliesPending();
+
+private:
+    std::unique_ptr<MessageLog> m_log;
+};
+
+using StringMap = QMap<QString, QString>;
+using NumberMap = QMap<QString, int>;
+using NumberedMap = QMap<int, QDBusVariant>;
+using MapOfMaps = QMap<QString, QVariantMap>;
+
+Q_DECLARE_METATYPE(StringMap)
+Q_DECLARE_METATYPE(NumberMap)
+Q_DECLARE_METATYPE(NumberedMap)
+Q_DECLARE_METATYPE(MapOfMaps)
+Q_DECLARE_METATYPE(QList<QStringList>)
+
+namespace {
+
+const QString idProperty = QStringLiteral("KIVID");
+const QString readyProperty = QStringLiteral("Ready");
+const QString cover = QStringLiteral("cover-7");
+
+QVariant structure(const QString &first, const QString &second)
+{
+    QDBusArgument argument;
+    argument.beginStructure();
+    argument << first << second;
+    argument.endStructure();
+    return QVariant::fromValue(argument);
+}
+
+// Both replies have been dealt with, whatever they were.
+bool isSettled(const KivInfo &info)
+{
+    return info.findChildren<QDBusPendingCallWatcher *>().isEmpty();
+}
+
+// A last change, by which everything that was sent before it has arrived.
+const QString lastCover = QStringLiteral("last");
+
+void sendLast(CoverDaemon &daemon)
+{
+    daemon.sendChanges({{idProperty, lastCover}});
+}
+
+// Everything that the connection has sent is on its way to its receivers.
+void flush(QDBusConnection connection)
+{
+    const QDBusMessage call = QDBusMessage::createMethodCall(
+        QStringLiteral("org.freedesktop.DBus"), QStringLiteral("/"),
+        QStringLiteral("org.freedesktop.DBus"), QStringLiteral("GetId"));
+    QCOMPARE(connection.call(call).type(), QDBusMessage::ReplyMessage);
+}
+
+// A process of its own, because a process has one system bus.
+int withoutABus()
+{
+    const MessageLog log;
+    const KivInfo info;
+    QSignalSpy idChanged(&info, &KivInfo::kivIdChanged);
+    QCoreApplication::processEvents();
+    const bool isDefault = info.kivId().isEmpty() && !info.kivReady() && idChanged.isEmpty();
+    return isDefault && !QDBusConnection::systemBus().isConnected() ? 0 : 1;
+}
+
+} // namespace
+
+void TestKivInfo::initTestCase()
+{
+    qDBusRegisterMetaType<StringMap>();
+    qDBusRegisterMetaType<NumberMap>();
+    qDBusRegisterMetaType<NumberedMap>();
+    qDBusRegisterMetaType<MapOfMaps>();
+    qDBusRegisterMetaType<QList<QStringList>>();
+}
+
+void TestKivInfo::init()
+{
+    m_log = std::make_unique<MessageLog>();
+}
+
+void TestKivInfo::cleanup()
+{
+    QCOMPARE(m_log->takeReport(), QString());
+    m_log.reset();
+}
+
+void TestKivInfo::properties()
+{
+    const QMetaObject &type = KivInfo::staticMetaObject;
+    QCOMPARE(type.propertyCount() - type.propertyOffset(), 2);
+    const QMetaProperty id = type.property(type.propertyOffset());
+    QCOMPARE(id.name(), "kivId");
+    QCOMPARE(id.userType(), int(QMetaType::QString));
+    QVERIFY(!id.isWritable());
+    QCOMPARE(id.notifySignal().methodSignature(), QByteArray("kivIdChanged()"));
+    const QMetaProperty ready = type.property(type.propertyOffset() + 1);
+    QCOMPARE(ready.name(), "kivReady");
+    QCOMPARE(ready.userType(), int(QMetaType::Bool));
+    QVERIFY(!ready.isWritable());
+    QCOMPARE(ready.notifySignal().methodSignature(), QByteArray("kivReadyChanged()"));
+
+    QList<QByteArray> methods;
+    for (int i = type.methodOffset(); i < type.methodCount(); ++i) {
+        methods.append(type.method(i).methodSignature());
+        QCOMPARE(type.method(i).access(),
+                 i < type.methodOffset() + 2 ? QMetaMethod::Public : QMetaMethod::Private);
+    }
+    const QList<QByteArray> expected = {
+        "kivIdChanged()",
+        "kivReadyChanged()",
+        "slotIdFinished(QDBusPendingCallWatcher*)",
+        "slotReadyFinished(QDBusPendingCallWatcher*)",
+        "propertiesChanged(QDBusMessage)",
+    };
+    QCOMPARE(methods, expected);
+}
+
+void TestKivInfo::asksTheDaemonTwice()
+{
+    CoverDaemon daemon;
+    const KivInfo info;
+    daemon.answer(idProperty, {cover});
+    daemon.answer(readyProperty, {1});
+    QTRY_VERIFY(isSettled(info));
+
+    // Nothing else: no introspection, above all, which would have been waited for.
+    const QList<QDBusMessage> calls = daemon.calls();
+    QCOMPARE(calls.size(), 2);
+    for (const QDBusMessage &call : calls) {
+        QCOMPARE(call.path(), QStringLiteral("/com/marlo/kivd"));
+        QCOMPARE(call.interface(), QStringLiteral("org.freedesktop.DBus.Properties"));
+        QCOMPARE(call.member(), QStringLiteral("Get"));
+        QCOMPARE(call.signature(), QStringLiteral("ss"));
+        QCOMPARE(call.arguments().at(0).toString(), QStringLiteral("com.marlo.kivd"));
+    }
+    QCOMPARE(calls.at(0).arguments().at(1).toString(), idProperty);
+    QCOMPARE(calls.at(1).arguments().at(1).toString(), readyProperty);
+}
+
+void TestKivInfo::readsBothInEitherOrder()
+{
+    CoverDaemon daemon;
+    const KivInfo info;
+    QSignalSpy idChanged(&info, &KivInfo::kivIdChanged);
+    QSignalSpy readyChanged(&info, &KivInfo::kivReadyChanged);
+    QCOMPARE(info.kivId(), QString());
+    QVERIFY(!info.kivReady());
+
+    QTRY_COMPARE(daemon.calls().size(), 2);
+    daemon.answer(readyProperty, {1});
+    QTRY_VERIFY(info.kivReady());
+    QCOMPARE(info.kivId(), QString());
+    daemon.answer(idProperty, {cover});
+    QTRY_COMPARE(info.kivId(), cover);
+    QCOMPARE(idChanged.size(), 1);
+    QCOMPARE(readyChanged.size(), 1);
+    QTRY_VERIFY(isSettled(info));
+
+    // Now both are answered at once, and the identifier first.
+    const KivInfo another;
+    QTRY_COMPARE(another.kivId(), cover);
+    QTRY_VERIFY(another.kivReady());
+}
+
+void TestKivInfo::onlyOneIsReady_data()
+{
+    QTest::addColumn<int>("value");
+    QTest::addColumn<bool>("ready");
+    QTest::newRow("0") << 0 << false;
+    QTest::newRow("1") << 1 << true;
+    QTest::newRow("2") << 2 << false;
+    QTest::newRow("-1") << -1 << false;
+    QTest::newRow("257") << 257 << false;
+}
+
+void TestKivInfo::onlyOneIsReady()
+{
+    QFETCH(int, value);
+    QFETCH(bool, ready);
+    CoverDaemon daemon;
+    daemon.answer(idProperty, {cover});
+    daemon.answer(readyProperty, {value});
+    const KivInfo info;
+    QTRY_VERIFY(isSettled(info));
+    QCOMPARE(info.kivReady(), ready);
+
+    daemon.sendChanges({{readyProperty, ready ? 0 : 1}});
+    QTRY_COMPARE(info.kivReady(), !ready);
+    daemon.sendChanges({{readyProperty, value}});
+    sendLast(daemon);
+    QTRY_COMPARE(info.kivId(), lastCover);
+    QCOMPARE(info.kivReady(), ready);
+}
+
+void TestKivInfo::idIsAString_data()
+{
+    QTest::addColumn<QVariantList>("answer");
+    QTest::addColumn<QString>("id");
+
+    QTest::newRow("string") << QVariantList{cover} << cover;
+    QTest::newRow("string and more") << QVariantList{cover, 1, 2.0} << cover;
+    QTest::newRow("empty string") << QVariantList{QString()} << QString();
+    QTest::newRow("nothing") << QVariantList() << QString();
+    QTest::newRow("variant") << QVariantList{QVariant::fromValue(QDBusVariant(cover))} << QString();
+    QTest::newRow("integer") << QVariantList{1} << QString();
+    QTest::newRow("object path") << QVariantList{QVariant::fromValue(
+        QDBusObjectPath(QStringLiteral("/cover")))}
+                                 << QString();
+    QTest::newRow("strings") << QVariantList{QStringList(cover)} << QString();
+    QTest::newRow("bytes") << QVariantList{cover.toUtf8()} << QString();
+    QTest::newRow("structure") << QVariantList{structure(cover, cover)} << QString();
+    QTest::newRow("integer, then string") << QVariantList{1, cover} << QString();
+}
+
+void TestKivInfo::idIsAString()
+{
+    QFETCH(QVariantList, answer);
+    QFETCH(QString, id);
+    CoverDaemon daemon;
+    daemon.answer(idProperty, answer);
+    daemon.answer(readyProperty, {1});
+    const KivInfo info;
+    QSignalSpy idChanged(&info, &KivInfo::kivIdChanged);
+    QTRY_VERIFY(isSettled(info));
+    QCOMPARE(info.kivId(), id);
+    QCOMPARE(idChanged.size(), id.isEmpty() ? 0 : 1);
+    QVERIFY(info.kivReady());
+
+    // Until the next change signal.
+    sendLast(daemon);
+    QTRY_COMPARE(info.kivId(), lastCover);
+}
+
+void TestKivInfo::readinessIsAnInteger_data()
+{
+    QTest::addColumn<QVariantList>("answer");
+    QTest::addColumn<bool>("ready");
+
+    QTest::newRow("integer") << QVariantList{1} << true;
+    QTest::newRow("integer and more") << QVariantList{1, cover} << true;
+    QTest::newRow("nothing") << QVariantList() << false;
+    QTest::newRow("variant") << QVariantList{QVariant::fromValue(QDBusVariant(1))} << false;
+    QTest::newRow("unsigned") << QVariantList{1U} << false;
+    QTest::newRow("64 bits") << QVariantList{Q_INT64_C(1)} << false;
+    QTest::newRow("16 bits") << QVariantList{QVariant::fromValue(short(1))} << false;
+    QTest::newRow("byte") << QVariantList{QVariant::fromValue(uchar(1))} << false;
+    QTest::newRow("boolean") << QVariantList{true} << false;
+    QTest::newRow("floating point") << QVariantList{1.0} << false;
+    QTest::newRow("string") << QVariantList{QStringLiteral("1")} << false;
+    QTest::newRow("integers") << QVariantList{QVariant::fromValue(QList<int>{1})} << false;
+    QTest::newRow("string, then integer") << QVariantList{cover, 1} << false;
+}
+
+void TestKivInfo::readinessIsAnInteger()
+{
+    QFETCH(QVariantList, answer);
+    QFETCH(bool, ready);
+    CoverDaemon daemon;
+    daemon.answer(idProperty, {cover});
+    daemon.answer(readyProperty, answer);
+    const KivInfo info;
+    QSignalSpy readyChanged(&info, &KivInfo::kivReadyChanged);
+    QTRY_VERIFY(isSettled(info));
+    QCOMPARE(info.kivReady(), ready);
+    QCOMPARE(readyChanged.size(), ready ? 1 : 0);
+    QCOMPARE(info.kivId(), cover);
+}
+
+void TestKivInfo::errorsKeepTheDefaults()
+{
+    CoverDaemon daemon;
+    daemon.answerWithError(idProperty);
+    daemon.answerWithError(readyProperty);
+    const KivInfo info;
+    QSignalSpy idChanged(&info, &KivInfo::kivIdChanged);
+    QSignalSpy readyChanged(&info, &KivInfo::kivReadyChanged);
+    QTRY_VERIFY(isSettled(info));
+    QCOMPARE(info.kivId(), QString());
+    QVERIFY(!info.kivReady());
+    QVERIFY(idChanged.isEmpty());
+    QVERIFY(readyChanged.isEmpty());
+
+    // Nothing is asked again, and changes arrive as ever.
+    daemon.sendChanges({{idProperty, cover}, {readyProperty, 1}});
+    QTRY_COMPARE(info.kivId(), cover);
+    QVERIFY(info.kivReady());
+    QCOMPARE(daemon.calls().size(), 2);
+}
+
+void TestKivInfo::lateRepliesOverwriteSignals()
+{
+    CoverDaemon daemon;
+    const KivInfo info;
+    QTRY_COMPARE(daemon.calls().size(), 2);
+    daemon.sendChanges({{idProperty, QStringLiteral("newer")}, {readyProperty, 1}});
+    QTRY_COMPARE(info.kivId(), QStringLiteral("newer"));
+    QVERIFY(info.kivReady());
+
+    QSignalSpy idChanged(&info, &KivInfo::kivIdChanged);
+    QSignalSpy readyChanged(&info, &KivInfo::kivReadyChanged);
+    daemon.answer(idProperty, {cover});
+    daemon.answer(readyProperty, {0});
+    QTRY_VERIFY(isSettled(info));
+    QCOMPARE(info.kivId(), cover);
+    QVERIFY(!info.kivReady());
+    QCOMPARE(idChanged.size(), 1);
+    QCOMPARE(readyChanged.size(), 1);
+}
+
+void TestKivInfo::lateErrorsResetToTheDefaults()
+{
+    CoverDaemon daemon;
+    const KivInfo info;
+    QTRY_COMPARE(daemon.calls().size(), 2);
+    daemon.sendChanges({{idProperty, cover}, {readyProperty, 1}});
+    QTRY_VERIFY(info.kivReady());
+
+    QSignalSpy idChanged(&info, &KivInfo::kivIdChanged);
+    QSignalSpy readyChanged(&info, &KivInfo::kivReadyChanged);
+    daemon.answerWithError(idProperty);
+    daemon.answer(readyProperty, {QVariant::fromValue(QDBusVariant(1))});
+    QTRY_VERIFY(isSettled(info));
+    QCOMPARE(info.kivId(), QString());
+    QVERIFY(!info.kivReady());
+    QCOMPARE(idChanged.size(), 1);
+    QCOMPARE(readyChanged.size(), 1);
+}
+
+void TestKivInfo::followsChanges()
+{
+    CoverDaemon daemon;
+    daemon.answer(idProperty, {cover});
+    daemon.answer(readyProperty, {0});
+    const KivInfo info;
+    QTRY_VERIFY(isSettled(info));
+    QSignalSpy idChanged(&info, &KivInfo::kivIdChanged);
+    QSignalSpy readyChanged(&info, &KivInfo::kivReadyChanged);
+
+    daemon.sendChanges({{readyProperty, 1}});
+    QTRY_VERIFY(info.kivReady());
+    QCOMPARE(info.kivId(), cover);
+    QVERIFY(idChanged.isEmpty());
+
+    daemon.sendChanges({{idProperty, QString()}});
+    QTRY_COMPARE(info.kivId(), QString());
+    QCOMPARE(idChanged.size(), 1);
+    QVERIFY(info.kivReady());
+    QCOMPARE(readyChanged.size(), 1);
+
+    daemon.sendChanges({{idProperty, QStringLiteral("another")}, {QStringLiteral("Color"), 3}});
+    QTRY_COMPARE(info.kivId(), QStringLiteral("another"));
+    QCOMPARE(idChanged.size(), 2);
+    QCOMPARE(readyChanged.size(), 1);
+}
+
+void TestKivInfo::idChangesBeforeReadiness()
+{
+    CoverDaemon daemon;
+    const KivInfo info;
+    QStringList order;
+    connect(&info, &KivInfo::kivIdChanged, this, [&] {
+        order.append(QStringLiteral("id %1 %2").arg(info.kivId()).arg(info.kivReady()));
+    });
+    connect(&info, &KivInfo::kivReadyChanged, this, [&] {
+        order.append(QStringLiteral("ready %1 %2").arg(info.kivId()).arg(info.kivReady()));
+    });
+    daemon.sendChanges({{idProperty, cover}, {readyProperty, 1}});
+    QTRY_VERIFY(info.kivReady());
+    const QStringList expected = {QStringLiteral("id cover-7 0"),
+                                  QStringLiteral("ready cover-7 1")};
+    QCOMPARE(order, expected);
+}
+
+void TestKivInfo::convertsChanges_data()
+{
+    QTest::addColumn<QVariant>("value");
+    QTest::addColumn<QString>("id");
+    QTest::addColumn<bool>("ready");
+
+    const QString none;
+    QTest::newRow("number") << QVariant(7) << QStringLiteral("7") << false;
+    QTest::newRow("one") << QVariant(1) << QStringLiteral("1") << true;
+    QTest::newRow("one in 64 bits") << QVariant(Q_INT64_C(1)) << QStringLiteral("1") << true;
+    QTest::newRow("one as a byte")
+        << QVariant::fromValue(uchar(1)) << QStringLiteral("\u0001") << true;
+    QTest::newRow("one in the lower 32 bits")
+        << QVariant(Q_INT64_C(0x100000001)) << QStringLiteral("4294967297") << false;
+    QTest::newRow("true") << QVariant(true) << QStringLiteral("true") << true;
+    QTest::newRow("one as text") << QVariant(QStringLiteral("1")) << QStringLiteral("1") << true;
+    QTest::newRow("text") << QVariant(cover) << cover << false;
+    QTest::newRow("structure") << structure(cover, cover) << none << false;
+    QTest::newRow("map") << QVariant(QVariantMap{{idProperty, cover}}) << none << false;
+    QTest::newRow("numbers") << QVariant::fromValue(QList<int>{1}) << none << false;
+    QTest::newRow("object path") << QVariant::fromValue(QDBusObjectPath(QStringLiteral("/1")))
+                                 << none << false;
+    QTest::newRow("variant in a variant") << QVariant::fromValue(QDBusVariant(1)) << none << false;
+}
+
+void TestKivInfo::convertsChanges()
+{
+    QFETCH(QVariant, value);
+    QFETCH(QString, id);
+    QFETCH(bool, ready);
+    CoverDaemon daemon;
+    const KivInfo info;
+    daemon.sendChanges({{idProperty, QStringLiteral("before")}, {readyProperty, ready ? 0 : 1}});
+    QTRY_COMPARE(info.kivId(), QStringLiteral("before"));
+    daemon.sendChanges({{idProperty, value}, {readyProperty, value}});
+    QTRY_COMPARE(info.kivId(), id);
+    QCOMPARE(info.kivReady(), ready);
+}
+
+void TestKivInfo::sameValuesEmitNothing()
+{
+    CoverDaemon daemon;
+    daemon.answer(idProperty, {cover});
+    daemon.answer(readyProperty, {1});
+    const KivInfo info;
+    QTRY_VERIFY(isSettled(info));
+    QSignalSpy idChanged(&info, &KivInfo::kivIdChanged);
+    QSignalSpy readyChanged(&info, &KivInfo::kivReadyChanged);
+    daemon.sendChanges({{idProperty, cover}, {readyProperty, 1}});
+    daemon.sendChanges({{idProperty, cover}});
+    sendLast(daemon);
+    QTRY_COMPARE(info.kivId(), lastCover);
+    QCOMPARE(idChanged.size(), 1);
+    QVERIFY(readyChanged.isEmpty());
+
+    // Any number but 1 is the same as any other.
+    daemon.sendChanges({{readyProperty, 0}});
+    daemon.sendChanges({{readyProperty, 2}});
+    daemon.sendChanges({{idProperty, cover}});
+    QTRY_COMPARE(info.kivId(), cover);
+    QCOMPARE(readyChanged.size(), 1);
+}
+
+void TestKivInfo::invalidatedPropertiesKeepTheirValues()
+{
+    CoverDaemon daemon;
+    const KivInfo info;
+    daemon.sendChanges({{idProperty, cover}, {readyProperty, 1}});
+    QTRY_VERIFY(info.kivReady());
+    QSignalSpy idChanged(&info, &KivInfo::kivIdChanged);
+    daemon.sendChanges({}, {idProperty, readyProperty});
+    sendLast(daemon);
+    QTRY_COMPARE(info.kivId(), lastCover);
+    QCOMPARE(idChanged.size(), 1);
+    QVERIFY(info.kivReady());
+}
+
+void TestKivInfo::theFirstArgumentIsNotLookedAt()
+{
+    CoverDaemon daemon;
+    const KivInfo info;
+    daemon.sendPropertiesChanged({QStringLiteral("another.interface"),
+                                  QVariantMap{{idProperty, QStringLiteral("a")}}, QStringList()});
+    QTRY_COMPARE(info.kivId(), QStringLiteral("a"));
+    daemon.sendPropertiesChanged({7, QVariantMap{{idProperty, QStringLiteral("b")}}});
+    QTRY_COMPARE(info.kivId(), QStringLiteral("b"));
+}
+
+void TestKivInfo::nonsenseChangesNothing_data()
+{
+    QTest::addColumn<QVariantList>("arguments");
+
+    const QString name = QStringLiteral("com.marlo.kivd");
+    const QVariantMap changes = {{idProperty, cover}, {readyProperty, 0}};
+    const auto second = [&name](const QVariant &argument) {
+        return QVariantList{name, argument, QStringList()};
+    };
+    QTest::newRow("nothing") << QVariantList();
+    QTest::newRow("the first alone") << QVariantList{name};
+    QTest::newRow("a map in the first place") << QVariantList{changes};
+    QTest::newRow("a map in the third place") << QVariantList{name, name, changes};
+    QTest::newRow("s") << second(idProperty);
+    QTest::newRow("i") << second(1);
+    QTest::newRow("b") << second(false);
+    QTest::newRow("as") << second(QStringList{idProperty, cover});
+    QTest::newRow("ay") << second(QByteArray("KIVID"));
+    QTest::newRow("ai") << second(QVariant::fromValue(QList<int>{1, 2}));
+    QTest::newRow("aas") << second(
+        QVariant::fromValue(QList<QStringList>{{idProperty, cover}, {readyProperty}}));
+    QTest::newRow("av") << second(QVariantList{idProperty, cover});
+    QTest::newRow("(ss)") << second(structure(idProperty, cover));
+    QTest::newRow("(ii)") << second(QPoint(1, 2));
+    QTest::newRow("a{ss}") << second(QVariant::fromValue(StringMap{{idProperty, cover}}));
+    QTest::newRow("a{si}") << second(QVariant::fromValue(NumberMap{{readyProperty, 0}}));
+    QTest::newRow("a{iv}") << second(QVariant::fromValue(NumberedMap{{1, QDBusVariant(cover)}}));
+    QTest::newRow("a{sa{sv}}") << second(QVariant::fromValue(MapOfMaps{{idProperty, changes}}));
+    QTest::newRow("v") << second(QVariant::fromValue(QDBusVariant(changes)));
+    QTest::newRow("empty a{sv}") << second(QVariantMap());
+    QTest::newRow("other keys") << second(
+        QVariantMap{{QStringLiteral("kivid"), cover}, {QStringLiteral("READY"), 0}});
+}
+
+void TestKivInfo::nonsenseChangesNothing()
+{
+    QFETCH(QVariantList, arguments);
+    CoverDaemon daemon;
+    const KivInfo info;
+    daemon.sendChanges({{idProperty, QStringLiteral("before")}, {readyProperty, 1}});
+    QTRY_VERIFY(info.kivReady());
+    QSignalSpy idChanged(&info, &KivInfo::kivIdChanged);
+    QSignalSpy readyChanged(&info, &KivInfo::kivReadyChanged);
+    daemon.sendPropertiesChanged(arguments);
+    sendLast(daemon);
+    QTRY_COMPARE(info.kivId(), lastCover);
+    QCOMPARE(idChanged.size(), 1);
+    QVERIFY(readyChanged.isEmpty());
+}
+
+void TestKivInfo::othersChangeNothing()
+{
+    CoverDaemon daemon;
+    const KivInfo info;
+    daemon.sendChanges({{idProperty, QStringLiteral("before")}});
+    QTRY_COMPARE(info.kivId(), QStringLiteral("before"));
+    QSignalSpy idChanged(&info, &KivInfo::kivIdChanged);
+
+    const QString path = QStringLiteral("/com/marlo/kivd");
+    const QString interface = QStringLiteral("org.freedesktop.DBus.Properties");
+    const QString member = QStringLiteral("PropertiesChanged");
+    const auto send = [](QDBusConnection from, QDBusMessage signal) {
+        signal.setArguments({QStringLiteral("com.marlo.kivd"),
+                             QVariantMap{{idProperty, QStringLiteral("other")}}, QStringList()});
+        QVERIFY(from.send(signal));
+    };
+    const auto signal = &QDBusMessage::createSignal;
+    send(daemon.connection(), signal(path + QStringLiteral("/other"), interface, member));
+    send(daemon.connection(), signal(QStringLiteral("/"), interface, member));
+    send(daemon.connection(), signal(path, QStringLiteral("com.marlo.kivd"), member));
+    send(daemon.connection(), signal(path, interface, QStringLiteral("Changed")));
+    const QDBusConnection stranger =
+        QDBusConnection::connectToBus(QDBusConnection::SystemBus, QStringLiteral("stranger"));
+    send(stranger, signal(path, interface, member));
+    flush(stranger);
+
+    sendLast(daemon);
+    QTRY_COMPARE(info.kivId(), lastCover);
+    QCOMPARE(idChanged.size(), 1);
+    QDBusConnection::disconnectFromBus(stranger.name());
+}
+
+void TestKivInfo::severalFollowOneSignal()
+{
+    CoverDaemon daemon;
+    const KivInfo one;
+    const KivInfo another;
+    daemon.sendChanges({{idProperty, cover}, {readyProperty, 1}});
+    QTRY_VERIFY(one.kivReady());
+    QTRY_VERIFY(another.kivReady());
+    QCOMPARE(one.kivId(), cover);
+    QCOMPARE(another.kivId(), cover);
+}
+
+void TestKivInfo::aHandlerMayCallBack()
+{
+    CoverDaemon daemon;
+    daemon.answer(idProperty, {cover});
+    daemon.answer(readyProperty, {1});
+    const KivInfo info;
+    bool readyInside = false;
+    // A handler that makes another one, and waits for it, in the middle of a reply.
+    connect(&info, &KivInfo::kivIdChanged, this, [&readyInside] {
+        const KivInfo inner;
+        QTRY_VERIFY(isSettled(inner));
+        readyInside = inner.kivReady();
+    });
+    QTRY_VERIFY(isSettled(info));
+    QVERIFY(readyInside);
+    QCOMPARE(info.kivId(), cover);
+    QVERIFY(info.kivReady());
+
+    // A page that is left because its cover was taken off.
+    QPointer<KivInfo> page = new KivInfo;
+    QTRY_VERIFY(isSettled(*page));
+    connect(page, &KivInfo::kivIdChanged, page, &QObject::deleteLater);
+    daemon.sendChanges({{idProperty, QString()}, {readyProperty, 0}});
+    QTRY_VERIFY(page == nullptr);
+}
+
+void TestKivInfo::defaultsWithoutADaemon()
+{
+    const KivInfo info;
+    QSignalSpy idChanged(&info, &KivInfo::kivIdChanged);
+    QSignalSpy readyChanged(&info, &KivInfo::kivReadyChanged);
+    // The bus answers with an error, whose text is no identifier.
+    QTRY_VERIFY(isSettled(info));
+    QCOMPARE(info.kivId(), QString());
+    QVERIFY(!info.kivReady());
+    QVERIFY(idChanged.isEmpty());
+    QVERIFY(readyChanged.isEmpty());
+}
+
+void TestKivInfo::followsADaemonThatStartsLater()
+{
+    const KivInfo info;
+    QTRY_VERIFY(isSettled(info));
+    {
+        CoverDaemon daemon;
+        daemon.sendChanges({{idProperty, cover}, {readyProperty, 1}});
+        QTRY_VERIFY(info.kivReady());
+        QCOMPARE(info.kivId(), cover);
+        // It is not asked again.
+        QVERIFY(daemon.calls().isEmpty());
+    }
+    // What a daemon said last holds when it is gone, and a new one is followed.
+    CoverDaemon daemon;
+    QCOMPARE(info.kivId(), cover);
+    sendLast(daemon);
+    QTRY_COMPARE(info.kivId(), lastCover);
+    QVERIFY(info.kivReady());
+}
+
+void TestKivInfo::followsADaemonThatHangs()
+{
+    CoverDaemon daemon;
+    const KivInfo info;
+    QCOMPARE(info.kivId(), QString());
+    QVERIFY(!info.kivReady());
+    QTRY_COMPARE(daemon.calls().size(), 2);
+    QVERIFY(!isSettled(info));
+    daemon.sendChanges({{idProperty, cover}, {readyProperty, 1}});
+    QTRY_VERIFY(info.kivReady());
+    QCOMPARE(info.kivId(), cover);
+    QVERIFY(!isSettled(info));
+}
+
+void TestKivInfo::defaultsWithoutABus()
+{
+    QProcess child;
+    QProcessEnvironment environment = QProcessEnvironment::systemEnvironment();
+    environment.insert(QStringLiteral("DBUS_SYSTEM_BUS_ADDRESS"),
+                       QStringLiteral("unix:path=/nowhere"));
+    child.setProcessEnvironment(environment);
+    child.start(QCoreApplication::applicationFilePath(), {QStringLiteral("--without-a-bus")});
+    QVERIFY(child.waitForFinished(60000));
+    QCOMPARE(child.exitStatus(), QProcess::NormalExit);
+    QCOMPARE(child.exitCode(), 0);
+    QCOMPARE(child.readAllStandardError(), QByteArray());
+}
+
+void TestKivInfo::goesWithRepliesPending()
+{
+    CoverDaemon daemon;
+    auto info = std::make_unique<KivInfo>();
+    QTRY_COMPARE(daemon.calls().size(), 2);
+    info.reset();
+    daemon.answer(idProperty, {cover});
+    daemon.answer(readyProperty, {1});
+    daemon.sendChanges({{idProperty, cover}});
+
+    // Those before it were dropped by the time that this one is told.
+    const KivInfo another;
+    QTRY_VERIFY(isSettled(another));
+    QCOMPARE(another.kivId(), cover);
+
+    // And one that goes before its calls have even left.
+    delete new KivInfo;
+    flush(QDBusConnection::systemBus());
+    const KivInfo last;
+    QTRY_VERIFY(isSettled(last));
+}
+
+int main(int argc, char *argv[])
+{
+    QCoreApplication application(argc, argv);
+    if (QCoreApplication::arguments().contains(QStringLiteral("--without-a-bus"))) {
+        return withoutABus();
+    }
+    TestKivInfo test;
+    return QTest::qExec(&test, argc, argv);
+}
+
+#include "tst_kivinfo.moc"

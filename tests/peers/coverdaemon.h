@@ -1,0 +1,58 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#ifndef COVERDAEMON_H
+#define COVERDAEMON_H
+
+#include <QDBusConnection>
+#include <QDBusMessage>
+#include <QDBusVirtualObject>
+#include <QHash>
+
+/*
+    The smart back cover's daemon, com.marlo.kivd on the system bus, on a connection of its own. It
+    answers as it is told, right or wrong, and keeps every call to any of its objects.
+*/
+class CoverDaemon : public QDBusVirtualObject
+{
+    Q_OBJECT
+
+public:
+    // Ends the test program if the name is not to be had. A new daemon answers nothing.
+    CoverDaemon();
+    ~CoverDaemon() override;
+    Q_DISABLE_COPY_MOVE(CoverDaemon)
+
+    // What reads of a property are answered with, those that wait for an answer included. The
+    // arguments are sent as they are: the real daemon sends a bare string for KIVID and a bare
+    // 32 bit integer for Ready.
+    void answer(const QString &property, const QVariantList &arguments);
+    void answerWithError(const QString &property);
+
+    // Sends PropertiesChanged with these arguments, as they are.
+    void sendPropertiesChanged(const QVariantList &arguments);
+    // As the real daemon does.
+    void sendChanges(const QVariantMap &changes, const QStringList &invalidated = {});
+
+    QList<QDBusMessage> calls() const { return m_calls; }
+    QDBusConnection connection() const { return m_connection; }
+
+    QString introspect(const QString &path) const override;
+    bool handleMessage(const QDBusMessage &message, const QDBusConnection &connection) override;
+
+private:
+    struct Answer {
+        bool isError = false;
+        QVariantList arguments;
+    };
+
+    void setAnswer(const QString &property, const Answer &answer);
+    void send(const QDBusMessage &call, const Answer &answer);
+
+    QDBusConnection m_connection;
+    QHash<QString, Answer> m_answers;
+    QList<QDBusMessage> m_calls;
+    QList<QDBusMessage> m_waiting;
+};
+
+#endif

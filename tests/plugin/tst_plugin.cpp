@@ -26,6 +26,9 @@ private Q_SLOTS:
     void oneInstance();
     void typesAreCreatable_data();
     void typesAreCreatable();
+    void oneTextFileReaderPerEngine();
+    void theTextFileReaderIsNotCreatable();
+    void platformSwitchesAreReachable();
     void otherVersionsAreNotThere();
     void languageWinsOverEngineeringEnglish();
     void englishAnswersWithoutACatalog();
@@ -83,6 +86,8 @@ void TestPlugin::init()
          {"settings-system_eng_en", "settings-system-fi", "settings-system-de"}) {
         Files::installCatalog(QString::fromLatin1(name));
     }
+    // Without it BluetoothInfo warns.
+    Files::write(QStringLiteral("/var/lib/bluetooth/board-address"), "00:1A:7D:DA:71:13\n");
     QLocale::setDefault(QLocale(QStringLiteral("fi_FI")));
     m_log = std::make_unique<MessageLog>();
 }
@@ -127,7 +132,13 @@ void TestPlugin::oneInstance()
 void TestPlugin::typesAreCreatable_data()
 {
     QTest::addColumn<QByteArray>("className");
+    QTest::newRow("AndroidSupport") << QByteArray("AndroidSupport");
+    QTest::newRow("LocationConfiguration") << QByteArray("LocationConfiguration");
+    QTest::newRow("BluetoothInfo") << QByteArray("BluetoothInfo");
+    QTest::newRow("KivInfo") << QByteArray("KivInfo");
     QTest::newRow("QuickActionsModel") << QByteArray("QuickActionsModel");
+    QTest::newRow("ModemFeatures") << QByteArray("ModemFeatureReader");
+    QTest::newRow("TermsOfUseManager") << QByteArray("TermsOfUseManager");
 }
 
 void TestPlugin::typesAreCreatable()
@@ -137,6 +148,65 @@ void TestPlugin::typesAreCreatable()
     const auto object = create(&engine, QByteArray(QTest::currentDataTag()) + " {}");
     QVERIFY(object != nullptr);
     QCOMPARE(object->metaObject()->className(), className.constData());
+}
+
+void TestPlugin::oneTextFileReaderPerEngine()
+{
+    const QByteArray reader = "QtObject { property var reader: TextFileReader\n"
+                              "property bool same: reader === TextFileReader }";
+    const auto readerOf = [](const std::unique_ptr<QObject> &object) {
+        return object->property("reader").value<QObject *>();
+    };
+    auto engine = std::make_unique<QQmlEngine>();
+    const auto one = create(engine.get(), reader);
+    const auto another = create(engine.get(), reader);
+    QVERIFY(one != nullptr);
+    QVERIFY(another != nullptr);
+    const QPointer<QObject> instance = readerOf(one);
+    QVERIFY(instance != nullptr);
+    QCOMPARE(instance->metaObject()->className(), "TextFileReader");
+    QVERIFY(instance->parent() == nullptr);
+    QVERIFY(one->property("same").toBool());
+    QCOMPARE(readerOf(another), instance.data());
+
+    QQmlEngine anotherEngine;
+    const auto elsewhere = create(&anotherEngine, reader);
+    QVERIFY(elsewhere != nullptr);
+    const QPointer<QObject> anotherInstance = readerOf(elsewhere);
+    QVERIFY(anotherInstance != nullptr);
+    QVERIFY(anotherInstance != instance);
+
+    // Each goes with its engine.
+    engine.reset();
+    QVERIFY(instance == nullptr);
+    QVERIFY(anotherInstance != nullptr);
+}
+
+void TestPlugin::theTextFileReaderIsNotCreatable()
+{
+    QQmlEngine engine;
+    QVERIFY(create(&engine, "TextFileReader {}") == nullptr);
+    const QString errors = m_log->takeReport();
+    QVERIFY2(errors.contains(QStringLiteral("not creatable")), qPrintable(errors));
+}
+
+void TestPlugin::platformSwitchesAreReachable()
+{
+    QQmlEngine engine;
+    const auto object =
+        create(&engine,
+               "LocationConfiguration {\n"
+               "property int seen: 0\n"
+               "onHereStateChanged: seen = hereState\n"
+               "Component.onCompleted: { gpsEnabled = true; mlsEnabled = true;\n"
+               "    mlsOnlineState = 2; hereState = 1; saveCustomSettings();\n"
+               "    hereState = 2; gpsEnabled = false; restoreCustomSettings() } }");
+    QVERIFY(object != nullptr);
+    QCOMPARE(object->property("gpsEnabled"), QVariant(true));
+    QCOMPARE(object->property("mlsEnabled"), QVariant(true));
+    QCOMPARE(object->property("mlsOnlineState").toInt(), 2);
+    QCOMPARE(object->property("hereState").toInt(), 1);
+    QCOMPARE(object->property("seen"), QVariant(1));
 }
 
 void TestPlugin::otherVersionsAreNotThere()

@@ -1,0 +1,376 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "files.h"
+#include "messagelog.h"
+#include "termsofusemanager.h"
+
+#include <QtTest>
+
+class TestTermsOfUseManager : public QObject
+{
+    Q_OBJECT
+
+private Q_SLOTS:
+    void init();
+    void cleanup();
+
+    void propertiesAndMethods();
+    void vendorPath();
+    void hasVendorTermsOfUse();
+    void readsNothingBeforeItIsAsked();
+
+    void findsTheBestFile_data();
+    void findsTheBestFile();
+    void fallsBackToEnglish_data();
+    void fallsBackToEnglish();
+    void withoutEnglish_data();
+    void withoutEnglish();
+
+    void readsTitleAndBody_data();
+    void readsTitleAndBody();
+    void whatCannotBeOpened_data();
+    void whatCannotBeOpened();
+
+    void vendorTermsAndSummary();
+    void vendorTermsWithoutAPath();
+    void readsOnEveryCall();
+
+private:
+    std::unique_ptr<MessageLog> m_log;
+};
+
+using Make = void (*)(const QString &);
+Q_DECLARE_METATYPE(Make)
+
+namespace {
+
+const QString platformFolder = QStringLiteral("/usr/share/marlo-settings/platform-eula");
+const QString vendorFolder = QStringLiteral("/var/lib/marlo-vendor");
+const QString noTerms = QStringLiteral(
+    "warning [default] TermsOfUseManager: unable to load either the specified locale or the "
+    "English terms");
+
+QString platformFile(const QString &locale)
+{
+    return platformFolder + QStringLiteral("/tarnwick_termsofuse-%1.txt").arg(locale);
+}
+
+// Each file's title is its locale.
+void installPlatformTerms(const QStringList &locales)
+{
+    for (const QString &locale : locales) {
+        Files::write(platformFile(locale), locale.toUtf8() + "\nbody");
+    }
+}
+
+QStringList split(const char *names)
+{
+    return QString::fromLatin1(names).split(QLatin1Char(' '), Qt::SkipEmptyParts);
+}
+
+QString noLocalTerms(const QString &locale)
+{
+    return QStringLiteral("warning [default] TermsOfUseManager: unable to load locale-specific "
+                          "terms for locale \"%1\"")
+        .arg(locale);
+}
+
+} // namespace
+
+void TestTermsOfUseManager::init()
+{
+    Files::remove(platformFolder);
+    Files::remove(vendorFolder);
+    m_log = std::make_unique<MessageLog>();
+}
+
+void TestTermsOfUseManager::cleanup()
+{
+    QCOMPARE(m_log->takeReport(), QString());
+    m_log.reset();
+}
+
+void TestTermsOfUseManager::propertiesAndMethods()
+{
+    const QMetaObject &type = TermsOfUseManager::staticMetaObject;
+    QCOMPARE(type.propertyCount() - type.propertyOffset(), 2);
+    const QMetaProperty has = type.property(type.propertyOffset());
+    QCOMPARE(has.name(), "hasVendorTermsOfUse");
+    QCOMPARE(has.userType(), int(QMetaType::Bool));
+    QVERIFY(!has.isWritable());
+    QCOMPARE(has.notifySignal().methodSignature(), QByteArray("vendorPathChanged()"));
+    const QMetaProperty path = type.property(type.propertyOffset() + 1);
+    QCOMPARE(path.name(), "vendorPath");
+    QCOMPARE(path.userType(), int(QMetaType::QString));
+    QVERIFY(path.isWritable());
+    QCOMPARE(path.notifySignal().methodSignature(), QByteArray("vendorPathChanged()"));
+
+    QList<QByteArray> methods;
+    for (int i = type.methodOffset(); i < type.methodCount(); ++i) {
+        methods.append(type.method(i).methodSignature());
+        QCOMPARE(type.method(i).returnType(),
+                 i == type.methodOffset() ? int(QMetaType::Void) : int(QMetaType::QStringList));
+    }
+    const QList<QByteArray> expected = {"vendorPathChanged()", "platformTermsOfUse(QString)",
+                                        "vendorTermsOfUse(QString)", "vendorTermsSummary(QString)"};
+    QCOMPARE(methods, expected);
+}
+
+void TestTermsOfUseManager::vendorPath()
+{
+    TermsOfUseManager manager;
+    QSignalSpy changed(&manager, &TermsOfUseManager::vendorPathChanged);
+    QCOMPARE(manager.vendorPath(), QString());
+    manager.setVendorPath(QString());
+    manager.setVendorPath(QStringLiteral(""));
+    QVERIFY(changed.isEmpty());
+    manager.setVendorPath(vendorFolder);
+    QCOMPARE(manager.vendorPath(), vendorFolder);
+    QCOMPARE(changed.size(), 1);
+    manager.setVendorPath(vendorFolder);
+    QCOMPARE(changed.size(), 1);
+    manager.setVendorPath(QString());
+    QCOMPARE(manager.vendorPath(), QString());
+    QCOMPARE(changed.size(), 2);
+}
+
+void TestTermsOfUseManager::hasVendorTermsOfUse()
+{
+    TermsOfUseManager manager;
+    QVERIFY(!manager.hasVendorTermsOfUse());
+    manager.setVendorPath(vendorFolder);
+    QVERIFY(!manager.hasVendorTermsOfUse());
+    // Looked up on every read, and any entry will do.
+    Files::makeFolder(vendorFolder);
+    QVERIFY(manager.hasVendorTermsOfUse());
+    Files::remove(vendorFolder);
+    QVERIFY(!manager.hasVendorTermsOfUse());
+    Files::write(vendorFolder, {});
+    QVERIFY(manager.hasVendorTermsOfUse());
+    manager.setVendorPath(QString());
+    QVERIFY(!manager.hasVendorTermsOfUse());
+}
+
+void TestTermsOfUseManager::readsNothingBeforeItIsAsked()
+{
+    TermsOfUseManager manager;
+    manager.setVendorPath(QStringLiteral("/nowhere"));
+    manager.setVendorPath(QStringLiteral("no path at all"));
+    QVERIFY(!manager.hasVendorTermsOfUse());
+}
+
+void TestTermsOfUseManager::findsTheBestFile_data()
+{
+    QTest::addColumn<QString>("locale");
+    QTest::addColumn<QStringList>("files");
+    QTest::addColumn<QString>("found");
+
+    const auto row = [](const char *locale, const char *files, const char *found) {
+        QTest::newRow(
+            qPrintable(QStringLiteral("%1 of %2").arg(QLatin1String(locale), QLatin1String(files))))
+            << QString::fromLatin1(locale) << split(files) << QString::fromLatin1(found);
+    };
+    row("fi_FI.UTF-8", "fi_FI.UTF-8 fi fi_FI en_GB", "fi_FI.UTF-8");
+    row("fi_FI.UTF-8", "fi fi_FI en_GB", "fi"); // the language alone comes first, on purpose
+    row("fi_FI.UTF-8", "fi", "fi");
+    row("fi_FI.UTF-8", "fi_FI en_GB", "fi_FI");
+    row("fi_FI", "fi_FI fi en_GB", "fi_FI");
+    row("fi_FI", "fi en_GB", "fi");
+    row("fi", "fi en_GB", "fi");
+    row("fil_PH", "fi fil en_GB", "fi"); // the first two characters, whatever they are
+    row("fil_PH.UTF-8", "fil_PH en_GB", "fil_PH");
+    row("sr_RS.UTF-8@latin", "sr_RS en_GB", "sr_RS");
+    row("sr_RS.a.b", "sr_RS.a sr_RS", "sr_RS");
+    row("x", "x en_GB", "x");
+    row("en_GB", "en_GB en", "en_GB");
+    row("en_GB", "en", "en");
+    row("en_US", "en en_GB", "en");
+    row("en_GB.UTF-8", "en_GB", "en_GB");
+}
+
+void TestTermsOfUseManager::findsTheBestFile()
+{
+    QFETCH(QString, locale);
+    QFETCH(QStringList, files);
+    QFETCH(QString, found);
+    installPlatformTerms(files);
+    const TermsOfUseManager manager;
+    QCOMPARE(manager.platformTermsOfUse(locale), QStringList({found, QStringLiteral("body")}));
+}
+
+void TestTermsOfUseManager::fallsBackToEnglish_data()
+{
+    QTest::addColumn<QString>("locale");
+    QTest::addColumn<QStringList>("files");
+    QTest::addColumn<QString>("found");
+
+    const auto row = [](const char *locale, const char *files, const char *found) {
+        QTest::newRow(
+            qPrintable(QStringLiteral("%1 of %2").arg(QLatin1String(locale), QLatin1String(files))))
+            << QString::fromLatin1(locale) << split(files) << QString::fromLatin1(found);
+    };
+    row("de_DE", "en_GB", "en_GB");
+    row("de_DE", "en", "en");
+    row("de_DE", "en_GB en fi de_AT", "en_GB");
+    row("de_DE.UTF-8", "en_GB", "en_GB");
+    // Without an encoding, language and country are looked for only as the whole name.
+    row("de_DE@euro", "de_DE en_GB", "en_GB");
+    row(".UTF-8", "en_GB", "en_GB");
+    row("", "en_GB", "en_GB");
+    row("d", "de en_GB", "en_GB");
+    row("../de", "de en_GB", "en_GB");
+}
+
+void TestTermsOfUseManager::fallsBackToEnglish()
+{
+    QFETCH(QString, locale);
+    QFETCH(QStringList, files);
+    QFETCH(QString, found);
+    installPlatformTerms(files);
+    const TermsOfUseManager manager;
+    QCOMPARE(manager.platformTermsOfUse(locale), QStringList({found, QStringLiteral("body")}));
+    QCOMPARE(m_log->takeReport(), noLocalTerms(locale));
+}
+
+void TestTermsOfUseManager::withoutEnglish_data()
+{
+    QTest::addColumn<QString>("locale");
+    QTest::addColumn<QString>("warnings");
+    const QString de = QStringLiteral("de_DE");
+    const QString enUtf8 = QStringLiteral("en_GB.UTF-8");
+    const QString en = QStringLiteral("en_GB");
+    QTest::newRow("de_DE") << de << noLocalTerms(de) + QLatin1Char('\n') + noTerms;
+    QTest::newRow("en_GB.UTF-8") << enUtf8 << noLocalTerms(enUtf8) + QLatin1Char('\n') + noTerms;
+    QTest::newRow("en_GB") << en << noTerms;
+}
+
+void TestTermsOfUseManager::withoutEnglish()
+{
+    QFETCH(QString, locale);
+    QFETCH(QString, warnings);
+    installPlatformTerms({QStringLiteral("fi"), QStringLiteral("en_US"), QStringLiteral("de_AT")});
+    const TermsOfUseManager manager;
+    QCOMPARE(manager.platformTermsOfUse(locale), QStringList());
+    QCOMPARE(m_log->takeReport(), warnings);
+}
+
+void TestTermsOfUseManager::readsTitleAndBody_data()
+{
+    QTest::addColumn<QByteArray>("content");
+    QTest::addColumn<QString>("title");
+    QTest::addColumn<QString>("body");
+
+    const QString title = QStringLiteral("Terms");
+    QTest::newRow("one line") << QByteArray("Terms") << title << QString();
+    QTest::newRow("one line with its end") << QByteArray("Terms\n") << title << QString();
+    QTest::newRow("lines") << QByteArray("Terms\n\n One\n\n Two \n\n") << title
+                           << QStringLiteral("One\n\n Two");
+    QTest::newRow("blanks") << QByteArray(" \t Terms \n \t \n") << title << QString();
+    QTest::newRow("carriage returns")
+        << QByteArray("Terms\r\nOne\r\nTwo\r\n") << title << QStringLiteral("One\nTwo");
+    QTest::newRow("empty") << QByteArray() << QString() << QString();
+    QTest::newRow("an empty line first") << QByteArray("\nTerms\n") << QString() << title;
+    QTest::newRow("UTF-8") << QByteArray("K\xC3\xA4ytt\xC3\xB6\n\xE2\x9C\x93")
+                           << QStringLiteral("Käyttö") << QStringLiteral("✓");
+    QTest::newRow("byte-order mark")
+        << QByteArray("\xEF\xBB\xBFTerms\nbody") << title << QStringLiteral("body");
+    QTest::newRow("blanks that are no ASCII")
+        << QByteArray("\xC2\xA0Terms\xE2\x80\x83\n\xC2\xA0x") << title << QStringLiteral("x");
+    QTest::newRow("NUL") << QByteArray("Terms \0x\nbody \0x\n", 17) << title
+                         << QStringLiteral("body");
+    QTest::newRow("long") << QByteArray(100000, 'a') + '\n' + QByteArray(300000, 'b')
+                          << QString(100000, QLatin1Char('a')) << QString(300000, QLatin1Char('b'));
+}
+
+void TestTermsOfUseManager::readsTitleAndBody()
+{
+    QFETCH(QByteArray, content);
+    QFETCH(QString, title);
+    QFETCH(QString, body);
+    Files::write(platformFile(QStringLiteral("fi")), content);
+    const TermsOfUseManager manager;
+    const QStringList terms = manager.platformTermsOfUse(QStringLiteral("fi"));
+    QCOMPARE(terms, QStringList({title, body}));
+}
+
+void TestTermsOfUseManager::whatCannotBeOpened_data()
+{
+    QTest::addColumn<Make>("make");
+    QTest::addColumn<QString>("error");
+    QTest::newRow("folder") << Make([](const QString &path) { Files::makeFolder(path); })
+                            << QStringLiteral("file to open is a directory");
+    QTest::newRow("pipe") << Make([](const QString &path) { Files::makePipe(path); })
+                          << QStringLiteral("Unknown error");
+    QTest::newRow("device") << Make([](const QString &path) {
+        Files::makeLink(QStringLiteral("/dev/zero"), path);
+    }) << QStringLiteral("Unknown error");
+}
+
+void TestTermsOfUseManager::whatCannotBeOpened()
+{
+    QFETCH(Make, make);
+    QFETCH(QString, error);
+    // It exists, and so nothing else is tried.
+    installPlatformTerms({QStringLiteral("fi"), QStringLiteral("en_GB")});
+    const QString path = platformFile(QStringLiteral("fi_FI"));
+    make(path);
+    const TermsOfUseManager manager;
+    QCOMPARE(manager.platformTermsOfUse(QStringLiteral("fi_FI")), QStringList());
+    const QList<MessageLog::Message> expected = {
+        {QtWarningMsg, QStringLiteral("default"),
+         QStringLiteral("TermsOfUseManager: unable to load terms from file \"%1\"").arg(path)},
+        {QtWarningMsg, QStringLiteral("default"), QStringLiteral("\"%1\"").arg(error)},
+    };
+    QVERIFY(m_log->takeAll() == expected);
+}
+
+void TestTermsOfUseManager::vendorTermsAndSummary()
+{
+    installPlatformTerms({QStringLiteral("fi"), QStringLiteral("en_GB")});
+    Files::write(vendorFolder + QStringLiteral("/full/fi.txt"), "Full\nfull body\n");
+    Files::write(vendorFolder + QStringLiteral("/full/en_GB.txt"), "English\n");
+    Files::write(vendorFolder + QStringLiteral("/summary/fi.txt"), "Summary\nsummary body\n");
+    TermsOfUseManager manager;
+    manager.setVendorPath(vendorFolder);
+    const QString locale = QStringLiteral("fi_FI.UTF-8");
+    QCOMPARE(manager.vendorTermsOfUse(locale),
+             QStringList({QStringLiteral("Full"), QStringLiteral("full body")}));
+    QCOMPARE(manager.vendorTermsSummary(locale),
+             QStringList({QStringLiteral("Summary"), QStringLiteral("summary body")}));
+    QCOMPARE(manager.platformTermsOfUse(locale),
+             QStringList({QStringLiteral("fi"), QStringLiteral("body")}));
+
+    const QString german = QStringLiteral("de_DE");
+    QCOMPARE(manager.vendorTermsOfUse(german), QStringList({QStringLiteral("English"), QString()}));
+    QCOMPARE(m_log->takeReport(), noLocalTerms(german));
+    QCOMPARE(manager.vendorTermsSummary(german), QStringList());
+    QCOMPARE(m_log->takeReport(), noLocalTerms(german) + QLatin1Char('\n') + noTerms);
+}
+
+void TestTermsOfUseManager::vendorTermsWithoutAPath()
+{
+    const TermsOfUseManager manager;
+    const QString locale = QStringLiteral("fi");
+    QCOMPARE(manager.vendorTermsOfUse(locale), QStringList());
+    QCOMPARE(m_log->takeReport(), noLocalTerms(locale) + QLatin1Char('\n') + noTerms);
+    QCOMPARE(manager.vendorTermsSummary(locale), QStringList());
+    QCOMPARE(m_log->takeReport(), noLocalTerms(locale) + QLatin1Char('\n') + noTerms);
+}
+
+void TestTermsOfUseManager::readsOnEveryCall()
+{
+    const TermsOfUseManager manager;
+    const QString locale = QStringLiteral("fi");
+    Files::write(platformFile(locale), "one");
+    QCOMPARE(manager.platformTermsOfUse(locale), QStringList({QStringLiteral("one"), QString()}));
+    Files::write(platformFile(locale), "two");
+    QCOMPARE(manager.platformTermsOfUse(locale), QStringList({QStringLiteral("two"), QString()}));
+    Files::remove(platformFile(locale));
+    QCOMPARE(manager.platformTermsOfUse(locale), QStringList());
+    QCOMPARE(m_log->takeReport(), noLocalTerms(locale) + QLatin1Char('\n') + noTerms);
+}
+
+QTEST_GUILESS_MAIN(TestTermsOfUseManager)
+
+#include "tst_termsofusemanager.moc"

@@ -19,10 +19,8 @@ constexpr QLatin1String suffix(".txt");
 constexpr QLatin1String english("en_GB");
 constexpr int languageLength = 2;
 
-enum class Missing { Warn, Ignore };
-
 // Empty if there is neither a file for the locale nor one in English.
-QString findTerms(const QString &base, const QString &localeName, Missing missing)
+QString findTerms(const QString &base, const QString &localeName)
 {
     // The language alone is preferred to language and country on purpose, and the latter is looked
     // for only behind an encoding: terms are installed by language, and vendors rely on the order.
@@ -32,7 +30,7 @@ QString findTerms(const QString &base, const QString &localeName, Missing missin
         candidates.append(localeName.left(encoding));
     }
     for (const QString &candidate : qAsConst(candidates)) {
-        const QString path = base + candidate + suffix;
+        QString path = base + candidate + suffix;
         if (QFile::exists(path)) {
             return path;
         }
@@ -41,11 +39,9 @@ QString findTerms(const QString &base, const QString &localeName, Missing missin
     if (localeName == english) {
         return {};
     }
-    if (missing == Missing::Warn) {
-        qWarning() << "TermsOfUseManager: unable to load locale-specific terms for locale"
-                   << localeName;
-    }
-    return findTerms(base, english, Missing::Ignore);
+    qWarning() << "TermsOfUseManager: unable to load locale-specific terms for locale"
+               << localeName;
+    return findTerms(base, english);
 }
 
 // The text ends at the first NUL, as a C string does.
@@ -56,7 +52,7 @@ QString toText(const QByteArray &data)
 
 QStringList readTerms(const QString &base, const QString &localeName)
 {
-    const QString path = findTerms(base, localeName, Missing::Warn);
+    const QString path = findTerms(base, localeName);
     if (path.isEmpty()) {
         qWarning() << "TermsOfUseManager: unable to load either the specified locale or the "
                       "English terms";
@@ -108,7 +104,7 @@ TermsOfUseManager::TermsOfUseManager(QObject *parent) : QObject(parent)
 */
 bool TermsOfUseManager::hasVendorTermsOfUse() const
 {
-    return !m_vendorPath.isEmpty() && QFile::exists(m_vendorPath);
+    return QFile::exists(m_vendorPath);
 }
 
 /*!

@@ -51,7 +51,7 @@ QString TextFileReader::readContent(const QString &filePath) const
         return {};
     }
     // Not null from the start: this file can be read, however little is in it.
-    QString content = QStringLiteral("");
+    QString content = QLatin1String("");
     QTextStream stream(&file);
     QString line;
     while (!(line = stream.readLine()).isNull()) {
@@ -72,9 +72,9 @@ QString TextFileReader::readContent(const QString &filePath) const
 QString TextFileReader::collate(const QUrl &directory, const QString &separator,
                                 const QString &prefix) const
 {
-    // Of no path at all QDir would make the current folder.
+    // Empty for what is no local file; and of no path at all QDir would make the current folder.
     const QString path = directory.toLocalFile();
-    if (!directory.isLocalFile() || !isPath(path)) {
+    if (!isPath(path)) {
         return {};
     }
     QStringList contents;

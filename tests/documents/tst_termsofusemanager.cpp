@@ -24,6 +24,7 @@ private Q_SLOTS:
     void findsTheBestFile();
     void fallsBackToEnglish_data();
     void fallsBackToEnglish();
+    void aDotAtTheBeginningEndsNoLocale();
     void withoutEnglish_data();
     void withoutEnglish();
 
@@ -230,6 +231,16 @@ void TestTermsOfUseManager::fallsBackToEnglish()
     installPlatformTerms(files);
     const TermsOfUseManager manager;
     QCOMPARE(manager.platformTermsOfUse(locale), QStringList({found, QStringLiteral("body")}));
+    QCOMPARE(m_log->takeReport(), noLocalTerms(locale));
+}
+
+void TestTermsOfUseManager::aDotAtTheBeginningEndsNoLocale()
+{
+    installPlatformTerms({QString(), QStringLiteral("en_GB")});
+    const TermsOfUseManager manager;
+    const QString locale = QStringLiteral(".UTF-8");
+    QCOMPARE(manager.platformTermsOfUse(locale),
+             QStringList({QStringLiteral("en_GB"), QStringLiteral("body")}));
     QCOMPARE(m_log->takeReport(), noLocalTerms(locale));
 }
 

@@ -7,7 +7,7 @@
 
 namespace {
 
-constexpr QLatin1String runtimeDaemon("/usr/sbin/apkd");
+const QLatin1String runtimeDaemon("/usr/sbin/apkd");
 
 } // namespace
 

@@ -10,7 +10,7 @@
 
 namespace {
 
-constexpr QLatin1String addressFile("/var/lib/bluetooth/board-address");
+const QLatin1String addressFile("/var/lib/bluetooth/board-address");
 
 } // namespace
 

@@ -11,16 +11,16 @@
 
 namespace {
 
-constexpr QLatin1String daemonService("com.marlo.kivd");
-constexpr QLatin1String daemonPath("/com/marlo/kivd");
-constexpr QLatin1String daemonInterface("com.marlo.kivd");
-constexpr QLatin1String propertiesInterface("org.freedesktop.DBus.Properties");
-constexpr QLatin1String getMethod("Get");
-constexpr QLatin1String changedSignal("PropertiesChanged");
-constexpr QLatin1String changedSignature("a{sv}");
+const QLatin1String daemonService("com.marlo.kivd");
+const QLatin1String daemonPath("/com/marlo/kivd");
+const QLatin1String daemonInterface("com.marlo.kivd");
+const QLatin1String propertiesInterface("org.freedesktop.DBus.Properties");
+const QLatin1String getMethod("Get");
+const QLatin1String changedSignal("PropertiesChanged");
+const QLatin1String changedSignature("a{sv}");
 
-constexpr QLatin1String idProperty("KIVID");
-constexpr QLatin1String readyProperty("Ready");
+const QLatin1String idProperty("KIVID");
+const QLatin1String readyProperty("Ready");
 constexpr int ready = 1;
 
 // What the daemon answers, or the default if it does not answer with just that type. The daemon

@@ -12,13 +12,13 @@
 
 namespace {
 
-constexpr QLatin1String customSettingsEnabledKey("/settings/location/custom_settings_enabled");
-constexpr QLatin1String customSettingsKey("/settings/location/custom_settings");
+const QLatin1String customSettingsEnabledKey("/settings/location/custom_settings_enabled");
+const QLatin1String customSettingsKey("/settings/location/custom_settings");
 
-constexpr QLatin1String gpsEntry("gps/enabled");
-constexpr QLatin1String mlsEntry("mls/enabled");
-constexpr QLatin1String mlsOnlineEntry("mls/online_enabled");
-constexpr QLatin1String hereEntry("here/enabled");
+const QLatin1String gpsEntry("gps/enabled");
+const QLatin1String mlsEntry("mls/enabled");
+const QLatin1String mlsOnlineEntry("mls/online_enabled");
+const QLatin1String hereEntry("here/enabled");
 
 // The states of an online service. The platform's library has names of its own for them; their
 // numbers are what is settled.
@@ -27,10 +27,10 @@ constexpr auto unavailable = State(0);
 constexpr auto disabled = State(1);
 constexpr auto enabled = State(2);
 
-constexpr QLatin1String mlsAgreement("/usr/share/geoclue-provider-mlsdb/agreements/mls_consent_");
-constexpr QLatin1String hereAgreement("/usr/share/libherepositioning/agreements/here_consent_");
-constexpr QLatin1String englishSuffix("en_GB.txt");
-constexpr QLatin1String suffix(".txt");
+const QLatin1String mlsAgreement("/usr/share/geoclue-provider-mlsdb/agreements/mls_consent_");
+const QLatin1String hereAgreement("/usr/share/libherepositioning/agreements/here_consent_");
+const QLatin1String englishSuffix("en_GB.txt");
+const QLatin1String suffix(".txt");
 
 State toState(const QVariant &saved)
 {

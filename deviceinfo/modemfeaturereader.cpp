@@ -9,8 +9,8 @@
 
 namespace {
 
-constexpr QLatin1String featuresFile("/usr/share/modem-software/features.ini");
-constexpr QLatin1String variantKey("variant");
+const QLatin1String featuresFile("/usr/share/modem-software/features.ini");
+const QLatin1String variantKey("variant");
 
 } // namespace
 

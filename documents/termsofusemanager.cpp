@@ -10,13 +10,13 @@
 
 namespace {
 
-constexpr QLatin1String platformPath("/usr/share/marlo-settings/platform-eula");
-constexpr QLatin1String platformTerms("/tarnwick_termsofuse-");
-constexpr QLatin1String vendorTerms("/full/");
-constexpr QLatin1String vendorSummary("/summary/");
-constexpr QLatin1String suffix(".txt");
+const QLatin1String platformPath("/usr/share/marlo-settings/platform-eula");
+const QLatin1String platformTerms("/tarnwick_termsofuse-");
+const QLatin1String vendorTerms("/full/");
+const QLatin1String vendorSummary("/summary/");
+const QLatin1String suffix(".txt");
 
-constexpr QLatin1String english("en_GB");
+const QLatin1String english("en_GB");
 constexpr int languageLength = 2;
 
 // Empty if there is neither a file for the locale nor one in English.

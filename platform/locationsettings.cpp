@@ -9,10 +9,10 @@
 
 namespace {
 
-constexpr QLatin1String gpsEnabledKey("/settings/location/gps_enabled");
-constexpr QLatin1String mlsEnabledKey("/settings/location/mls_enabled");
-constexpr QLatin1String mlsOnlineStateKey("/settings/location/mls_online_state");
-constexpr QLatin1String hereStateKey("/settings/location/here_state");
+const QLatin1String gpsEnabledKey("/settings/location/gps_enabled");
+const QLatin1String mlsEnabledKey("/settings/location/mls_enabled");
+const QLatin1String mlsOnlineStateKey("/settings/location/mls_online_state");
+const QLatin1String hereStateKey("/settings/location/here_state");
 
 bool isState(int number)
 {

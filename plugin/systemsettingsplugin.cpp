@@ -6,12 +6,14 @@
 #include "androidsupport.h"
 #include "apptranslator.h"
 #include "bluetoothinfo.h"
+#include "eventswidgetsmodel.h"
 #include "kivinfo.h"
 #include "locationconfiguration.h"
 #include "modemfeaturereader.h"
 #include "quickactionsmodel.h"
 #include "termsofusemanager.h"
 #include "textfilereader.h"
+#include "titlesview.h"
 
 #include <QCoreApplication>
 #include <QQmlEngine>
@@ -41,6 +43,8 @@ void SystemSettingsPlugin::registerTypes(const char *uri)
     qmlRegisterType<BluetoothInfo>(uri, versionMajor, versionMinor, "BluetoothInfo");
     qmlRegisterType<KivInfo>(uri, versionMajor, versionMinor, "KivInfo");
     qmlRegisterType<QuickActionsModel>(uri, versionMajor, versionMinor, "QuickActionsModel");
+    qmlRegisterType<EventsWidgetsModel>(uri, versionMajor, versionMinor, "EventsWidgetsModel");
+    qmlRegisterType<TitlesView>(uri, versionMajor, versionMinor, "TitlesView");
     qmlRegisterType<ModemFeatureReader>(uri, versionMajor, versionMinor, "ModemFeatures");
     qmlRegisterType<TermsOfUseManager>(uri, versionMajor, versionMinor, "TermsOfUseManager");
 }

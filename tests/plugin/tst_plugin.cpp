@@ -137,6 +137,8 @@ void TestPlugin::typesAreCreatable_data()
     QTest::newRow("BluetoothInfo") << QByteArray("BluetoothInfo");
     QTest::newRow("KivInfo") << QByteArray("KivInfo");
     QTest::newRow("QuickActionsModel") << QByteArray("QuickActionsModel");
+    QTest::newRow("EventsWidgetsModel") << QByteArray("EventsWidgetsModel");
+    QTest::newRow("TitlesView") << QByteArray("TitlesView");
     QTest::newRow("ModemFeatures") << QByteArray("ModemFeatureReader");
     QTest::newRow("TermsOfUseManager") << QByteArray("TermsOfUseManager");
 }

@@ -1,0 +1,35 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#ifndef EVENTSWIDGET_H
+#define EVENTSWIDGET_H
+
+#include "eventswidgetsmodel.h"
+
+/*
+    An events widget as a definition file describes it, and how it stands with the user and the
+    device. Its path is its identity.
+*/
+struct EventsWidgetsModel::Widget {
+    QString file; // The definition file, absolute.
+    QString title; // Shown where translationId has no translation.
+    QString translationId; // Of the title.
+    QString descriptionId;
+    QString translationCatalog; // That of the file.
+    QString icon;
+    QString path;
+    QString availablePath;
+    int order = -1; // The place among the widgets; negative for none.
+    bool enabled = false; // By the user, or by default; known to the model.
+    bool defaultEnabled = false; // While the user has not chosen.
+    bool available = false; // As isAvailable() found it last.
+
+    // Whether there is now a file at availablePath; always if that is empty.
+    bool isAvailable() const;
+
+    // Leaves out file and translationCatalog on purpose: a widget that moves to another file, or
+    // whose file changes its catalog, is the same to whoever shows it and not reported as changed.
+    bool operator!=(const Widget &other) const;
+};
+
+#endif

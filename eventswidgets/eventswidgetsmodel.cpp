@@ -1,0 +1,414 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "eventswidgetsmodel.h"
+
+#include "eventswidget.h"
+#include "eventswidgetsfile.h"
+
+#include <QDirIterator>
+#include <QFileInfo>
+#include <QScopedValueRollback>
+
+#include <algorithm>
+#include <limits>
+
+namespace {
+
+constexpr QLatin1String definitionDirectory("/usr/share/glimmera/eventswidgets");
+constexpr QLatin1String definitionFilter("*.json");
+
+constexpr QLatin1String enabledKey("/desktop/glimmera-marlo-home/events_screen_widgets");
+
+QSet<QString> toSet(const QStringList &list)
+{
+    return QSet<QString>(list.cbegin(), list.cend());
+}
+
+QString translation(const QString &id, const QString &fallback)
+{
+    if (id.isEmpty()) {
+        return fallback;
+    }
+    const QString text = qtTrId(id.toLocal8Bit().constData());
+    return text == id ? fallback : text;
+}
+
+} // namespace
+
+/*!
+    \qmltype EventsWidgetsModel
+    \inqmlmodule com.marlo.settings.system
+    \brief Lists the widgets of the events screen.
+
+    Packages offer widgets by installing a definition file, \c{*.json}, into
+    \c /usr/share/glimmera/eventswidgets. The model lists all of them and follows the directory and
+    the user's choice, \c /desktop/glimmera-marlo-home/events_screen_widgets (dconf, list of
+    strings): the paths of the enabled widgets. While the user has chosen nothing, each widget is
+    enabled or not by its own default.
+
+    Roles: \c title and \c description (text in the user's language), \c icon and \c path (as in the
+    definition file; the path is the widget's identity), \c enabled (bool) and \c available (bool,
+    whether the file that the widget needs is there, see updateAvailable()).
+
+    A widget takes its place by its order when it is first listed and keeps it. A definition file
+    that cannot be read is passed over with a warning, as is each entry that is no widget.
+
+    \qml
+    Repeater {
+        model: EventsWidgetsModel { id: widgets }
+        delegate: Switch {
+            text: title
+            enabled: available
+            checked: model.enabled
+            onToggled: checked ? widgets.enableWidget(path) : widgets.disableWidget(path)
+        }
+    }
+    \endqml
+
+    \note What a handler of one of the model's signals asks of the model while rows are being
+    changed is done as soon as control returns to the event loop.
+*/
+
+EventsWidgetsModel::EventsWidgetsModel(QObject *parent)
+    : QAbstractListModel(parent), m_catalogs(this), m_watcher(definitionDirectory),
+      m_enabledItem(enabledKey)
+{
+    connect(&m_watcher, &DirectoryWatcher::directoryChanged, this,
+            &EventsWidgetsModel::directoryChanged);
+    connect(&m_writeWatcher, &WriteWatcher::written, this, &EventsWidgetsModel::directoryChanged);
+    connect(&m_enabledItem, &MGConfItem::valueChanged, this,
+            &EventsWidgetsModel::enabledWidgetsChanged);
+}
+
+EventsWidgetsModel::~EventsWidgetsModel()
+{
+    // Announces language changes, which may lead back to data(): while there is a model to ask.
+    m_catalogs.clear();
+}
+
+int EventsWidgetsModel::rowCount(const QModelIndex &parent) const
+{
+    return parent.isValid() ? 0 : m_rows.size();
+}
+
+QVariant EventsWidgetsModel::data(const QModelIndex &index, int role) const
+{
+    if (!hasIndex(index.row(), index.column(), index.parent())) {
+        return {};
+    }
+    const Widget &widget = m_rows.at(index.row());
+    switch (role) {
+    case TitleRole:
+        return translation(widget.translationId, widget.title);
+    case IconRole:
+        return widget.icon;
+    case PathRole:
+        return widget.path;
+    case EnabledRole:
+        return widget.enabled;
+    case DescriptionRole:
+        return translation(widget.descriptionId, QLatin1String(""));
+    case AvailableRole:
+        return widget.available;
+    default:
+        return {};
+    }
+}
+
+QHash<int, QByteArray> EventsWidgetsModel::roleNames() const
+{
+    return {
+        {TitleRole, "title"},
+        {IconRole, "icon"},
+        {PathRole, "path"},
+        {EnabledRole, "enabled"},
+        {DescriptionRole, "description"},
+        {AvailableRole, "available"},
+    };
+}
+
+void EventsWidgetsModel::classBegin()
+{
+}
+
+void EventsWidgetsModel::componentComplete()
+{
+    m_complete = true;
+    enabledWidgetsChanged();
+    directoryChanged();
+}
+
+/*!
+    \qmlmethod void EventsWidgetsModel::enableWidget(string path)
+
+    Adds the widget \a path at the end of the user's list, even if it is in there. The model follows
+    once dconf reports the change.
+
+    The first choice of all turns the defaults into a list of the user's own, in which every known
+    widget is enabled.
+*/
+void EventsWidgetsModel::enableWidget(const QString &path)
+{
+    m_enabledItem.set(enabledList() + QStringList(path));
+}
+
+/*!
+    \qmlmethod void EventsWidgetsModel::disableWidget(string path)
+
+    Takes the widget \a path out of the user's list, however often it is in there. The model follows
+    once dconf reports the change.
+
+    The first choice of all turns the defaults into a list of the user's own, in which every known
+    widget but this is enabled.
+*/
+void EventsWidgetsModel::disableWidget(const QString &path)
+{
+    QStringList list = enabledList();
+    list.removeAll(path);
+    m_enabledItem.set(list);
+}
+
+/*!
+    \qmlmethod void EventsWidgetsModel::directoryChanged()
+
+    Reads the definition files anew. The model does so itself whenever the directory changes or a
+    file in it has been written.
+*/
+void EventsWidgetsModel::directoryChanged()
+{
+    if (!m_complete) {
+        return;
+    }
+    if (m_changing) {
+        QMetaObject::invokeMethod(this, &EventsWidgetsModel::directoryChanged,
+                                  Qt::QueuedConnection);
+        return;
+    }
+    const QScopedValueRollback<bool> changing(m_changing, true);
+
+    std::vector<Widget> widgets = readWidgets();
+    QSet<QString> paths;
+    for (const Widget &widget : widgets) {
+        paths.insert(widget.path);
+    }
+    mergeWidgets(std::move(widgets));
+    removeRowsExcept(paths);
+}
+
+/*!
+    \qmlmethod void EventsWidgetsModel::enabledWidgetsChanged()
+
+    Reads the user's list anew. The model does so itself whenever dconf reports a change.
+*/
+void EventsWidgetsModel::enabledWidgetsChanged()
+{
+    if (!m_complete) {
+        return;
+    }
+    // Even in the middle of a change: the next choice starts from this list.
+    readEnabledList();
+    if (m_changing) {
+        QMetaObject::invokeMethod(this, &EventsWidgetsModel::enabledWidgetsChanged,
+                                  Qt::QueuedConnection);
+        return;
+    }
+    const QScopedValueRollback<bool> changing(m_changing, true);
+
+    const bool defaults = m_defaults;
+    const QSet<QString> enabledPaths = toSet(m_enabledList);
+    for (int row = 0; row < m_rows.size(); ++row) {
+        Widget &widget = m_rows[row];
+        const bool enabled = defaults ? widget.defaultEnabled : enabledPaths.contains(widget.path);
+        if (widget.enabled != enabled) {
+            widget.enabled = enabled;
+            Q_EMIT dataChanged(index(row), index(row));
+        }
+    }
+}
+
+/*!
+    \qmlmethod void EventsWidgetsModel::updateAvailable()
+
+    Looks anew whether the files are there that the widgets need. Nothing else does so while the
+    definition files stay as they are: call this when the widgets are about to be shown, or when
+    something that they need may have been installed or removed.
+*/
+void EventsWidgetsModel::updateAvailable()
+{
+    if (m_changing) {
+        QMetaObject::invokeMethod(this, &EventsWidgetsModel::updateAvailable, Qt::QueuedConnection);
+        return;
+    }
+    const QScopedValueRollback<bool> changing(m_changing, true);
+
+    for (int row = 0; row < m_rows.size(); ++row) {
+        Widget &widget = m_rows[row];
+        const bool available = widget.isAvailable();
+        if (widget.available != available) {
+            widget.available = available;
+            Q_EMIT dataChanged(index(row), index(row), {AvailableRole});
+        }
+    }
+}
+
+QStringList EventsWidgetsModel::enabledList() const
+{
+    // A choice that is made before anything was read must not replace the user's others.
+    return m_complete ? m_enabledList : m_enabledItem.value().toStringList();
+}
+
+void EventsWidgetsModel::readEnabledList()
+{
+    const QVariant value = m_enabledItem.value();
+    m_defaults = !value.isValid();
+    m_enabledList = value.toStringList();
+    if (m_defaults) {
+        for (const Widget &widget : qAsConst(m_rows)) {
+            m_enabledList.append(widget.path);
+        }
+    }
+}
+
+std::vector<EventsWidgetsModel::Widget> EventsWidgetsModel::readWidgets()
+{
+    m_writeWatcher.watch(definitionDirectory);
+
+    struct Catalog {
+        QString user;
+        QString name;
+    };
+    std::vector<Catalog> catalogs;
+    std::vector<Widget> widgets;
+    QDirIterator entries(definitionDirectory, {definitionFilter}, QDir::Files);
+    while (entries.hasNext()) {
+        const QString path = entries.next();
+        // The iterator lets links to pipes and devices through.
+        if (!entries.fileInfo().isFile()) {
+            continue;
+        }
+        std::optional<EventsWidgetsFile> file = readEventsWidgetsFile(path);
+        if (file) {
+            catalogs.push_back({entries.fileName(), file->translationCatalog});
+            std::move(file->widgets.begin(), file->widgets.end(), std::back_inserter(widgets));
+        }
+    }
+
+    if (m_defaults) {
+        m_enabledList.clear();
+        for (const Widget &widget : widgets) {
+            m_enabledList.append(widget.path);
+        }
+    }
+    const QSet<QString> enabledPaths = m_defaults ? QSet<QString>() : toSet(m_enabledList);
+    for (Widget &widget : widgets) {
+        widget.enabled = m_defaults ? widget.defaultEnabled : enabledPaths.contains(widget.path);
+    }
+
+    // Announces language changes, which may lead back here: everything is known by now.
+    for (const Catalog &catalog : catalogs) {
+        m_catalogs.addDefinition(catalog.user, catalog.name);
+    }
+    return widgets;
+}
+
+void EventsWidgetsModel::mergeWidgets(std::vector<Widget> widgets)
+{
+    indexRows();
+    for (Widget &widget : widgets) {
+        const int row = findWidget(widget.path);
+        if (row < 0) {
+            insertWidget(insertionIndexForWidget(widget), std::move(widget));
+        } else if (m_rows.at(row) != widget) {
+            updateWidget(row, widget);
+        }
+    }
+}
+
+void EventsWidgetsModel::insertWidget(int row, Widget widget)
+{
+    beginInsertRows({}, row, row);
+    m_index.insert(widget.path, row);
+    m_rows.insert(row, std::move(widget));
+    m_highestOrders.insert(row, std::numeric_limits<int>::min());
+    updateHighestOrders(row);
+    endInsertRows();
+}
+
+void EventsWidgetsModel::updateWidget(int row, const Widget &widget)
+{
+    // Stays where it is, on purpose, even with another order: rows do not jump under the user.
+    m_rows[row] = widget;
+    updateHighestOrders(row);
+    Q_EMIT dataChanged(index(row), index(row));
+}
+
+void EventsWidgetsModel::removeRowsExcept(const QSet<QString> &paths)
+{
+    int row = 0;
+    while (row < m_rows.size()) {
+        if (paths.contains(m_rows.at(row).path)) {
+            ++row;
+            continue;
+        }
+        beginRemoveRows({}, row, row);
+        // Finds no such user, on purpose: those of the catalogs are bare file names, and this is a
+        // path. Catalogs are only ever added; their texts stay at hand until the model goes.
+        m_catalogs.removeDefinition(m_rows.at(row).file, m_rows.at(row).translationCatalog);
+        m_rows.removeAt(row);
+        endRemoveRows();
+    }
+}
+
+void EventsWidgetsModel::indexRows()
+{
+    m_index.clear();
+    m_highestOrders.clear();
+    for (int row = 0; row < m_rows.size(); ++row) {
+        m_index.insert(m_rows.at(row).path, row);
+        m_highestOrders.append(highestOrder(row));
+    }
+}
+
+int EventsWidgetsModel::highestOrder(int row) const
+{
+    const int order = m_rows.at(row).order;
+    return row == 0 ? order : qMax(order, m_highestOrders.at(row - 1));
+}
+
+void EventsWidgetsModel::updateHighestOrders(int row)
+{
+    for (; row < m_rows.size(); ++row) {
+        const int highest = highestOrder(row);
+        if (m_highestOrders.at(row) == highest) {
+            // And so it is for all that follow.
+            return;
+        }
+        m_highestOrders[row] = highest;
+    }
+}
+
+int EventsWidgetsModel::findWidget(const QString &path) const
+{
+    const auto known = m_index.constFind(path);
+    if (known == m_index.constEnd()) {
+        return -1;
+    }
+    int row = *known;
+    while (m_rows.at(row).path != path) {
+        ++row;
+    }
+    return row;
+}
+
+int EventsWidgetsModel::insertionIndexForWidget(const Widget &widget) const
+{
+    if (widget.order < 0) {
+        return m_rows.size();
+    }
+    // Before the first row of a higher order. What stands behind that is not looked at: the rows
+    // are not sorted, and a place once taken is kept.
+    const auto higher =
+        std::upper_bound(m_highestOrders.cbegin(), m_highestOrders.cend(), widget.order);
+    return int(higher - m_highestOrders.cbegin());
+}

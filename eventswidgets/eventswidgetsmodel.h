@@ -1,0 +1,96 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#ifndef EVENTSWIDGETSMODEL_H
+#define EVENTSWIDGETSMODEL_H
+
+#include "catalogtable.h"
+#include "directorywatcher.h"
+#include "mgconfitem.h"
+#include "writewatcher.h"
+
+#include <QAbstractListModel>
+#include <QHash>
+#include <QList>
+#include <QQmlParserStatus>
+#include <QSet>
+#include <QStringList>
+#include <QVector>
+
+#include <vector>
+
+/*
+    The widgets that packages offer for the events screen, and which of them the user has enabled.
+
+    Reads the definition files in /usr/share/glimmera/eventswidgets and follows that directory and
+    the user's list in dconf.
+*/
+class EventsWidgetsModel : public QAbstractListModel, public QQmlParserStatus
+{
+    Q_OBJECT
+    Q_INTERFACES(QQmlParserStatus)
+
+public:
+    struct Widget;
+
+    enum Role {
+        TitleRole = Qt::UserRole,
+        IconRole,
+        PathRole,
+        EnabledRole,
+        DescriptionRole,
+        AvailableRole
+    };
+
+    explicit EventsWidgetsModel(QObject *parent = nullptr);
+    ~EventsWidgetsModel() override;
+
+    int rowCount(const QModelIndex &parent = QModelIndex()) const override;
+    QVariant data(const QModelIndex &index, int role) const override;
+    QHash<int, QByteArray> roleNames() const override;
+
+    void classBegin() override;
+    void componentComplete() override;
+
+public Q_SLOTS:
+    void enableWidget(const QString &path);
+    void disableWidget(const QString &path);
+    void directoryChanged();
+    void enabledWidgetsChanged();
+    void updateAvailable();
+
+private:
+    QStringList enabledList() const;
+    void readEnabledList();
+    std::vector<Widget> readWidgets();
+    void mergeWidgets(std::vector<Widget> widgets);
+    void insertWidget(int row, Widget widget);
+    void updateWidget(int row, const Widget &widget);
+    void removeRowsExcept(const QSet<QString> &paths);
+    void indexRows();
+    int highestOrder(int row) const;
+    void updateHighestOrders(int row);
+    int findWidget(const QString &path) const;
+    int insertionIndexForWidget(const Widget &widget) const;
+
+    CatalogTable m_catalogs;
+    QList<Widget> m_rows;
+    // Where to look for the row of a path, from there downwards, while widgets are merged.
+    QHash<QString, int> m_index;
+    // The highest order among the rows down to each one.
+    QVector<int> m_highestOrders;
+    DirectoryWatcher m_watcher;
+    WriteWatcher m_writeWatcher;
+    MGConfItem m_enabledItem;
+    // What the key holds. While it holds nothing: the paths of all widgets, on purpose. The first
+    // choice of the user stores them, so that each widget but the one that was switched is enabled
+    // from then on, whatever its default was.
+    QStringList m_enabledList;
+    // While the key holds nothing at all; an empty list is a choice.
+    bool m_defaults = false;
+    bool m_complete = false;
+    // While rows are announced and changed: whoever follows the model may call back into it.
+    bool m_changing = false;
+};
+
+#endif

@@ -1,0 +1,347 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "titlesview.h"
+
+#include <QJSValue>
+#include <QLocale>
+#include <QtDebug>
+
+#include <functional>
+
+namespace {
+
+// A role of a model, and the properties to follow from its values.
+class RolePath
+{
+public:
+    RolePath(const QString &path, const QHash<int, QByteArray> &roleNames)
+    {
+        const QStringList parts = path.split(QLatin1Char('.'), Qt::SkipEmptyParts);
+        if (parts.isEmpty()) {
+            return;
+        }
+        m_role = roleNames.key(parts.first().toLatin1(), noRole);
+        for (int i = 1; i < parts.size(); ++i) {
+            m_properties.append(parts.at(i).toUtf8());
+        }
+    }
+
+    // An unknown role is the same as the one of number 0, on purpose: there everything matches, and
+    // the model's display role is read.
+    bool isKnown() const { return m_role != noRole; }
+
+    QVariant value(const QModelIndex &index) const
+    {
+        QVariant value = index.data(m_role);
+        for (const QByteArray &property : m_properties) {
+            // A step from something that is no object, or a null one, leads nowhere and is left
+            // out.
+            if (const auto *object = value.value<QObject *>()) {
+                value = object->property(property.constData());
+            }
+        }
+        return value;
+    }
+
+private:
+    static constexpr int noRole = 0;
+
+    int m_role = noRole;
+    QVector<QByteArray> m_properties;
+};
+
+// Calls the function with every object in a value, and in the lists and maps that it is made of.
+void forEachObject(QVariant *value, const std::function<void(QObject *, QVariant *)> &function)
+{
+    if (value->userType() == QMetaType::QVariantList) {
+        QVariantList list = value->toList();
+        for (QVariant &element : list) {
+            forEachObject(&element, function);
+        }
+        *value = list;
+    } else if (value->userType() == QMetaType::QVariantMap) {
+        QVariantMap map = value->toMap();
+        for (QVariant &element : map) {
+            forEachObject(&element, function);
+        }
+        *value = map;
+    } else if (auto *object = value->value<QObject *>()) {
+        function(object, value);
+    }
+}
+
+} // namespace
+
+/*!
+    \qmltype TitlesView
+    \inqmlmodule com.marlo.settings.system
+    \brief Joins one role of the rows of a list model into a sentence.
+
+    The texts of \l role, of all rows or of those whose \l matchRole has the value \l match, are at
+    hand as a list, \l values, and joined in the way of the user's language, \l value: in English
+    "Clock, Weather, and Calendar". They follow rows that are inserted, removed or changed and a
+    reset of the model; they do not follow rows that are moved.
+
+    \l role and \l matchRole are role paths: the name of a role, or that followed by names of
+    properties, joined by dots, such as \c "contact.name.first" for a role that holds objects. A
+    property that an object lacks has no value; a step from something that is no object is left out.
+
+    \qml
+    Label {
+        text: titles.value
+        TitlesView {
+            id: titles
+            model: EventsWidgetsModel { }
+            role: "title"
+            matchRole: "enabled"
+            match: true
+        }
+    }
+    \endqml
+*/
+
+TitlesView::TitlesView(QObject *parent) : QObject(parent)
+{
+}
+
+/*!
+    \qmlproperty object TitlesView::model
+
+    The model that is read, a \c QAbstractListModel; null before the first one is set and after a
+    model was destroyed. Anything else is refused with a warning and the model stays. That includes
+    null: a model cannot be cleared.
+*/
+QObject *TitlesView::model() const
+{
+    return m_model;
+}
+
+void TitlesView::setModel(QObject *model)
+{
+    if (model == m_model) {
+        return;
+    }
+    auto *listModel = qobject_cast<QAbstractListModel *>(model);
+    if (listModel == nullptr) {
+        // Null too, on purpose: a page that is being taken down keeps the sentence that it shows.
+        qWarning() << "Unsupported model type" << model;
+        return;
+    }
+
+    for (const QMetaObject::Connection &connection : m_connections) {
+        disconnect(connection);
+    }
+    m_model = listModel;
+    m_connections = {
+        connect(listModel, &QAbstractItemModel::rowsInserted, this, &TitlesView::update),
+        connect(listModel, &QAbstractItemModel::rowsRemoved, this, &TitlesView::update),
+        connect(listModel, &QAbstractItemModel::dataChanged, this, &TitlesView::update),
+        connect(listModel, &QAbstractItemModel::modelReset, this, &TitlesView::update),
+        connect(listModel, &QObject::destroyed, this, &TitlesView::modelDestroyed),
+    };
+    Q_EMIT modelChanged();
+    update();
+}
+
+/*!
+    \qmlproperty string TitlesView::matchRole
+
+    The role path whose value selects the rows. Empty, the default, takes every row, and so does a
+    role that the model does not have.
+*/
+QString TitlesView::matchRole() const
+{
+    return m_matchRole;
+}
+
+void TitlesView::setMatchRole(const QString &matchRole)
+{
+    if (m_matchRole != matchRole) {
+        m_matchRole = matchRole;
+        Q_EMIT matchRoleChanged();
+        update();
+    }
+}
+
+/*!
+    \qmlproperty var TitlesView::match
+
+    The value that \l matchRole has to have, or a list of values one of which it has to have. An
+    object that is destroyed becomes null.
+*/
+QVariant TitlesView::match() const
+{
+    return m_match;
+}
+
+void TitlesView::setMatch(const QVariant &match)
+{
+    // An array of QML's arrives in a wrapping that equals nothing.
+    QVariant plain =
+        match.userType() == qMetaTypeId<QJSValue>() ? match.value<QJSValue>().toVariant() : match;
+    if (m_match == plain) {
+        return;
+    }
+    forEachObject(&m_match, [this](QObject *object, QVariant *) {
+        disconnect(object, &QObject::destroyed, this, &TitlesView::matchDestroyed);
+    });
+    forEachObject(&plain, [this](QObject *object, QVariant *) {
+        connect(object, &QObject::destroyed, this, &TitlesView::matchDestroyed,
+                Qt::UniqueConnection);
+    });
+    m_match = plain;
+    Q_EMIT matchChanged();
+    update();
+}
+
+/*!
+    \qmlproperty string TitlesView::role
+
+    The role path whose values are collected. Empty, the default, collects nothing; a role that the
+    model does not have reads the one that is meant for display.
+*/
+QString TitlesView::role() const
+{
+    return m_role;
+}
+
+void TitlesView::setRole(const QString &role)
+{
+    if (m_role != role) {
+        m_role = role;
+        Q_EMIT roleChanged();
+        update();
+    }
+}
+
+/*!
+    \qmlproperty string TitlesView::value
+    \readonly
+
+    The texts of \l values as one, joined in the way of the default locale at the time of reading.
+*/
+QString TitlesView::value() const
+{
+    return joined(m_values);
+}
+
+/*!
+    \qmlproperty list<string> TitlesView::values
+    \readonly
+
+    The texts of the rows that match, in the order of the model. A row without text gives an empty
+    one.
+*/
+QStringList TitlesView::values() const
+{
+    return m_values;
+}
+
+/*!
+    \qmlmethod string TitlesView::joined(list<string> list)
+
+    Returns the texts of \a list joined in the way of the default locale.
+*/
+QString TitlesView::joined(const QStringList &list) const
+{
+    return QLocale().createSeparatedList(list);
+}
+
+/*!
+    \qmlmethod void TitlesView::update()
+
+    Reads the model anew, for changes that the view does not follow, as of a row's place.
+*/
+void TitlesView::update()
+{
+    const QStringList values = collect();
+    if (m_values != values) {
+        m_values = values;
+        Q_EMIT valueChanged();
+    }
+}
+
+/*!
+    \qmlsignal TitlesView::modelChanged()
+
+    Emitted after \l model has changed, before it is read.
+*/
+
+/*!
+    \qmlsignal TitlesView::matchRoleChanged()
+
+    Emitted after \l matchRole has changed, before the model is read anew.
+*/
+
+/*!
+    \qmlsignal TitlesView::matchChanged()
+
+    Emitted after \l match has changed, before the model is read anew.
+*/
+
+/*!
+    \qmlsignal TitlesView::roleChanged()
+
+    Emitted after \l role has changed, before the model is read anew.
+*/
+
+/*!
+    \qmlsignal TitlesView::valueChanged()
+
+    Emitted after \l values and with it \l value have changed. A change of the default locale alone
+    is not noticed.
+*/
+
+QStringList TitlesView::collect() const
+{
+    QStringList values;
+    if (m_model == nullptr || m_role.isEmpty()) {
+        return values;
+    }
+    const QHash<int, QByteArray> roleNames = m_model->roleNames();
+    const RolePath matchRole(m_matchRole, roleNames);
+    const RolePath role(m_role, roleNames);
+
+    const int count = m_model->rowCount();
+    values.reserve(count);
+    // Reading an object's property may end the model.
+    for (int row = 0; row < count && m_model != nullptr; ++row) {
+        const QModelIndex index = m_model->index(row, 0);
+        if (!matchRole.isKnown() || matches(matchRole.value(index))) {
+            values.append(role.value(index).toString());
+        }
+    }
+    return values;
+}
+
+bool TitlesView::matches(const QVariant &value) const
+{
+    if (m_match.userType() == QMetaType::QStringList && value.canConvert<QString>()
+        && m_match.toStringList().contains(value.toString())) {
+        return true;
+    }
+    if (m_match.userType() == QMetaType::QVariantList && m_match.toList().contains(value)) {
+        return true;
+    }
+    // In this order: variants convert the right one to the type of the left, and not all
+    // conversions have a way back.
+    return m_match == value;
+}
+
+void TitlesView::modelDestroyed()
+{
+    Q_EMIT modelChanged();
+    update();
+}
+
+void TitlesView::matchDestroyed(QObject *object)
+{
+    forEachObject(&m_match, [object](QObject *held, QVariant *value) {
+        if (held == object) {
+            *value = QVariant::fromValue<QObject *>(nullptr);
+        }
+    });
+    Q_EMIT matchChanged();
+    update();
+}

@@ -1,0 +1,72 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#ifndef TITLESVIEW_H
+#define TITLESVIEW_H
+
+#include <QAbstractListModel>
+#include <QObject>
+#include <QPointer>
+#include <QStringList>
+#include <QVariant>
+
+#include <array>
+
+/*
+    One role of another list model as a list of texts and as a sentence in the user's language, of
+    all rows or of those that match.
+
+    A role path is a role's name, or that and the names of properties to follow into the objects
+   that the role holds, joined by dots.
+*/
+class TitlesView : public QObject
+{
+    Q_OBJECT
+    Q_PROPERTY(QObject *model READ model WRITE setModel NOTIFY modelChanged)
+    Q_PROPERTY(QString matchRole READ matchRole WRITE setMatchRole NOTIFY matchRoleChanged)
+    Q_PROPERTY(QVariant match READ match WRITE setMatch NOTIFY matchChanged)
+    Q_PROPERTY(QString role READ role WRITE setRole NOTIFY roleChanged)
+    Q_PROPERTY(QString value READ value NOTIFY valueChanged)
+    Q_PROPERTY(QStringList values READ values NOTIFY valueChanged)
+
+public:
+    explicit TitlesView(QObject *parent = nullptr);
+
+    QObject *model() const;
+    void setModel(QObject *model);
+    QString matchRole() const;
+    void setMatchRole(const QString &matchRole);
+    QVariant match() const;
+    void setMatch(const QVariant &match);
+    QString role() const;
+    void setRole(const QString &role);
+    QString value() const;
+    QStringList values() const;
+
+    Q_INVOKABLE QString joined(const QStringList &list) const;
+
+public Q_SLOTS:
+    void update();
+
+Q_SIGNALS:
+    void modelChanged();
+    void matchRoleChanged();
+    void matchChanged();
+    void roleChanged();
+    void valueChanged();
+
+private:
+    QStringList collect() const;
+    bool matches(const QVariant &value) const;
+    void modelDestroyed();
+    void matchDestroyed(QObject *object);
+
+    QPointer<QAbstractListModel> m_model;
+    std::array<QMetaObject::Connection, 5> m_connections;
+    QString m_matchRole;
+    QVariant m_match;
+    QString m_role;
+    QStringList m_values;
+};
+
+#endif

@@ -14,17 +14,17 @@
 
 namespace {
 
-constexpr QLatin1String translationCatalogKey("translation_catalog");
-constexpr QLatin1String widgetsKey("widgets");
+constexpr QStringView translationCatalogKey(u"translation_catalog");
+constexpr QStringView widgetsKey(u"widgets");
 
-constexpr QLatin1String pathKey("path");
-constexpr QLatin1String titleKey("title");
-constexpr QLatin1String translationIdKey("translation_id");
-constexpr QLatin1String descriptionIdKey("description_id");
-constexpr QLatin1String iconKey("icon");
-constexpr QLatin1String orderKey("order");
-constexpr QLatin1String defaultEnabledKey("default_enabled");
-constexpr QLatin1String availablePathKey("available_path");
+constexpr QStringView pathKey(u"path");
+constexpr QStringView titleKey(u"title");
+constexpr QStringView translationIdKey(u"translation_id");
+constexpr QStringView descriptionIdKey(u"description_id");
+constexpr QStringView iconKey(u"icon");
+constexpr QStringView orderKey(u"order");
+constexpr QStringView defaultEnabledKey(u"default_enabled");
+constexpr QStringView availablePathKey(u"available_path");
 
 constexpr int noOrder = -1;
 

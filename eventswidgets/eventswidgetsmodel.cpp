@@ -187,13 +187,16 @@ void EventsWidgetsModel::directoryChanged()
     }
     const QScopedValueRollback<bool> changing(m_changing, true);
 
+    QSet<QString> stale;
+    for (const Widget &widget : qAsConst(m_rows)) {
+        stale.insert(widget.path);
+    }
     std::vector<Widget> widgets = readWidgets();
-    QSet<QString> paths;
     for (const Widget &widget : widgets) {
-        paths.insert(widget.path);
+        stale.remove(widget.path);
     }
     mergeWidgets(std::move(widgets));
-    removeRowsExcept(paths);
+    removeRows(stale);
 }
 
 /*!
@@ -315,6 +318,7 @@ std::vector<EventsWidgetsModel::Widget> EventsWidgetsModel::readWidgets()
 void EventsWidgetsModel::mergeWidgets(std::vector<Widget> widgets)
 {
     indexRows();
+    m_index.reserve(m_index.size() + int(widgets.size()));
     for (Widget &widget : widgets) {
         const int row = findWidget(widget.path);
         if (row < 0) {
@@ -343,11 +347,14 @@ void EventsWidgetsModel::updateWidget(int row, const Widget &widget)
     Q_EMIT dataChanged(index(row), index(row));
 }
 
-void EventsWidgetsModel::removeRowsExcept(const QSet<QString> &paths)
+void EventsWidgetsModel::removeRows(const QSet<QString> &paths)
 {
+    if (paths.isEmpty()) {
+        return;
+    }
     int row = 0;
     while (row < m_rows.size()) {
-        if (paths.contains(m_rows.at(row).path)) {
+        if (!paths.contains(m_rows.at(row).path)) {
             ++row;
             continue;
         }

@@ -66,7 +66,7 @@ private:
     void mergeWidgets(std::vector<Widget> widgets);
     void insertWidget(int row, Widget widget);
     void updateWidget(int row, const Widget &widget);
-    void removeRowsExcept(const QSet<QString> &paths);
+    void removeRows(const QSet<QString> &paths);
     void indexRows();
     int highestOrder(int row) const;
     void updateHighestOrders(int row);

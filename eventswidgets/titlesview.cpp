@@ -305,12 +305,16 @@ QStringList TitlesView::collect() const
 
     const int count = m_model->rowCount();
     values.reserve(count);
-    // Reading an object's property may end the model.
+    // Whose property is read may end the model.
     for (int row = 0; row < count && m_model != nullptr; ++row) {
         const QModelIndex index = m_model->index(row, 0);
-        if (!matchRole.isKnown() || matches(matchRole.value(index))) {
+        const bool matched = !matchRole.isKnown() || matches(matchRole.value(index));
+        if (matched && m_model != nullptr) {
             values.append(role.value(index).toString());
         }
+    }
+    if (m_model == nullptr) {
+        values.clear();
     }
     return values;
 }

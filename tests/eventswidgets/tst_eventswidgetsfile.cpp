@@ -1,0 +1,435 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+// The reader of definition files, without a model.
+
+#include "eventswidgetsfile.h"
+#include "files.h"
+#include "messagelog.h"
+
+#include <QTemporaryDir>
+#include <QtTest>
+
+#include <functional>
+
+using Widget = EventsWidgetsModel::Widget;
+
+Q_DECLARE_METATYPE(std::function<void(EventsWidgetsModel::Widget *)>)
+
+class TestEventsWidgetsFile : public QObject
+{
+    Q_OBJECT
+
+private Q_SLOTS:
+    void init();
+    void cleanup();
+
+    void readsEveryKey();
+    void defaultsOfAbsentKeys();
+    void wrongTypesReadAsAbsent_data();
+    void wrongTypesReadAsAbsent();
+    void order_data();
+    void order();
+    void keepsTheOrderOfEntries();
+    void repeatedPathsAreReadAgain();
+    void ignoresUnknownKeys();
+    void skipsABOM();
+    void catalogWithoutWidgets_data();
+    void catalogWithoutWidgets();
+    void catalogBehindTheWidgets();
+    void entriesThatAreNoWidgets();
+    void boundedWarnings();
+    void noDefinition_data();
+    void noDefinition();
+    void missingFile();
+    void notARegularFile_data();
+    void notARegularFile();
+    void largeFile();
+    void tooLargeFile();
+    void availability();
+    void comparison_data();
+    void comparison();
+
+private:
+    std::optional<EventsWidgetsFile> read(const QByteArray &content);
+    QString warning(const char *text) const;
+
+    std::unique_ptr<MessageLog> m_log;
+    std::unique_ptr<QTemporaryDir> m_root;
+    QString m_path;
+};
+
+void TestEventsWidgetsFile::init()
+{
+    m_root = std::make_unique<QTemporaryDir>();
+    m_path = m_root->filePath(QStringLiteral("test.json"));
+    m_log = std::make_unique<MessageLog>();
+}
+
+void TestEventsWidgetsFile::cleanup()
+{
+    QCOMPARE(m_log->takeReport(), QString());
+    m_log.reset();
+    m_root.reset();
+}
+
+std::optional<EventsWidgetsFile> TestEventsWidgetsFile::read(const QByteArray &content)
+{
+    Files::write(m_path, content);
+    return readEventsWidgetsFile(m_path);
+}
+
+// As MessageLog reports it.
+QString TestEventsWidgetsFile::warning(const char *text) const
+{
+    return QStringLiteral("warning [default] %1 \"%2\"").arg(QLatin1String(text), m_path);
+}
+
+void TestEventsWidgetsFile::readsEveryKey()
+{
+    const auto file = read(R"({
+        "translation_catalog": "maps",
+        "widgets": [ {
+            "path": "/a.qml", "title": "Title", "translation_id": "t-id",
+            "description_id": "d-id", "icon": "image://icon", "order": 7,
+            "default_enabled": true, "available_path": "/nowhere/at/all"
+        } ]
+    })");
+    QVERIFY(file);
+    QCOMPARE(file->translationCatalog, QStringLiteral("maps"));
+    QCOMPARE(file->widgets.size(), size_t(1));
+    const Widget &widget = file->widgets.front();
+    QCOMPARE(widget.file, m_path);
+    QCOMPARE(widget.title, QStringLiteral("Title"));
+    QCOMPARE(widget.translationId, QStringLiteral("t-id"));
+    QCOMPARE(widget.descriptionId, QStringLiteral("d-id"));
+    QCOMPARE(widget.translationCatalog, QStringLiteral("maps"));
+    QCOMPARE(widget.icon, QStringLiteral("image://icon"));
+    QCOMPARE(widget.path, QStringLiteral("/a.qml"));
+    QCOMPARE(widget.availablePath, QStringLiteral("/nowhere/at/all"));
+    QCOMPARE(widget.order, 7);
+    QCOMPARE(widget.defaultEnabled, true);
+    QCOMPARE(widget.available, false);
+}
+
+void TestEventsWidgetsFile::defaultsOfAbsentKeys()
+{
+    const auto file = read(R"({ "widgets": [ { "path": "a" } ] })");
+    QVERIFY(file);
+    QCOMPARE(file->translationCatalog, QString());
+    const Widget &widget = file->widgets.at(0);
+    QCOMPARE(widget.title, QString());
+    QCOMPARE(widget.translationId, QString());
+    QCOMPARE(widget.descriptionId, QString());
+    QCOMPARE(widget.translationCatalog, QString());
+    QCOMPARE(widget.icon, QString());
+    QCOMPARE(widget.availablePath, QString());
+    QCOMPARE(widget.order, -1);
+    QCOMPARE(widget.defaultEnabled, false);
+    QCOMPARE(widget.available, true);
+}
+
+void TestEventsWidgetsFile::wrongTypesReadAsAbsent_data()
+{
+    QTest::addColumn<QByteArray>("value");
+    for (const QByteArray value :
+         {"null", "1", "1.5", "true", "\"text\"", "[\"a\"]", "{\"a\": 1}"}) {
+        QTest::newRow(value.constData()) << value;
+    }
+}
+
+void TestEventsWidgetsFile::wrongTypesReadAsAbsent()
+{
+    QFETCH(QByteArray, value);
+    const bool isText = value.startsWith('"');
+    const QString text = isText ? QStringLiteral("text") : QString();
+
+    const auto catalog = read(R"({ "widgets": [], "translation_catalog": )" + value + "}");
+    QVERIFY(catalog);
+    QCOMPARE(catalog->translationCatalog, text);
+
+    const auto file = read(R"({ "widgets": [ { "path": "a", "title": )" + value
+                           + R"(, "translation_id": )" + value + R"(, "description_id": )" + value
+                           + R"(, "icon": )" + value + R"(, "available_path": )" + value + "} ] }");
+    QVERIFY(file);
+    const Widget &widget = file->widgets.at(0);
+    QCOMPARE(widget.title, text);
+    QCOMPARE(widget.translationId, text);
+    QCOMPARE(widget.descriptionId, text);
+    QCOMPARE(widget.icon, text);
+    QCOMPARE(widget.availablePath, text);
+    QCOMPARE(widget.available, !isText);
+
+    const auto enabled =
+        read(R"({ "widgets": [ { "path": "a", "default_enabled": )" + value + "} ] }");
+    QVERIFY(enabled);
+    QCOMPARE(enabled->widgets.at(0).defaultEnabled, value == "true");
+
+    const auto path = read(R"({ "widgets": [ { "path": )" + value + "} ] }");
+    QVERIFY(path);
+    QCOMPARE(path->widgets.size(), size_t(isText ? 1 : 0));
+    QCOMPARE(m_log->takeReport(), isText ? QString() : warning("Invalid widget defined in"));
+
+    // No array is an empty one; of an array, what is no widget is left out.
+    const auto widgets = read(R"({ "widgets": )" + value + "}");
+    QVERIFY(widgets);
+    QCOMPARE(widgets->widgets.size(), size_t(0));
+    QCOMPARE(m_log->takeReport(),
+             value.startsWith('[') ? warning("Invalid widget defined in") : QString());
+}
+
+void TestEventsWidgetsFile::order_data()
+{
+    QTest::addColumn<QByteArray>("value");
+    QTest::addColumn<int>("order");
+    const auto row = [](const char *value, int order) {
+        QTest::newRow(value) << QByteArray(value) << order;
+    };
+    row("0", 0);
+    row("5", 5);
+    row("5.0", 5);
+    row("5.5", -1);
+    row("5e2", 500);
+    row("-1", -1);
+    row("-7", -7);
+    row("2147483647", std::numeric_limits<int>::max());
+    row("2147483648", -1);
+    row("-2147483648", std::numeric_limits<int>::min());
+    row("-2147483649", -1);
+    row("4294967296", -1);
+    row("1e300", -1);
+    row("\"5\"", -1);
+    row("true", -1);
+    row("null", -1);
+    row("[5]", -1);
+}
+
+void TestEventsWidgetsFile::order()
+{
+    QFETCH(QByteArray, value);
+    const auto file = read(R"({ "widgets": [ { "path": "a", "order": )" + value + "} ] }");
+    QVERIFY(file);
+    QTEST(file->widgets.at(0).order, "order");
+}
+
+void TestEventsWidgetsFile::keepsTheOrderOfEntries()
+{
+    const auto file = read(R"({ "widgets": [
+        { "path": "c", "order": 9 }, { "path": "a" }, { "path": "b", "order": 1 } ] })");
+    QVERIFY(file);
+    QCOMPARE(file->widgets.size(), size_t(3));
+    QCOMPARE(file->widgets.at(0).path, QStringLiteral("c"));
+    QCOMPARE(file->widgets.at(1).path, QStringLiteral("a"));
+    QCOMPARE(file->widgets.at(2).path, QStringLiteral("b"));
+}
+
+void TestEventsWidgetsFile::repeatedPathsAreReadAgain()
+{
+    const auto file = read(R"({ "widgets": [
+        { "path": "a", "title": "1" }, { "path": "a", "title": "2" } ] })");
+    QVERIFY(file);
+    QCOMPARE(file->widgets.size(), size_t(2));
+    QCOMPARE(file->widgets.at(1).title, QStringLiteral("2"));
+}
+
+void TestEventsWidgetsFile::ignoresUnknownKeys()
+{
+    const auto file = read(R"({ "x": [1, {"y": null}], "Widgets": [ 1 ],
+        "widgets": [ { "z": {"path": "b"}, "path": "a", "PATH": "c", "enabled": true } ] })");
+    QVERIFY(file);
+    QCOMPARE(file->widgets.size(), size_t(1));
+    QCOMPARE(file->widgets.at(0).path, QStringLiteral("a"));
+    QCOMPARE(file->widgets.at(0).enabled, false);
+}
+
+void TestEventsWidgetsFile::skipsABOM()
+{
+    const auto file = read("\xef\xbb\xbf{ \"widgets\": [ { \"path\": \"\xc3\xa4\" } ] }");
+    QVERIFY(file);
+    QCOMPARE(file->widgets.at(0).path, QString(QChar(0xe4)));
+}
+
+void TestEventsWidgetsFile::catalogWithoutWidgets_data()
+{
+    QTest::addColumn<QByteArray>("content");
+    QTest::newRow("no array") << QByteArray(R"({ "translation_catalog": "maps" })");
+    QTest::newRow("empty") << QByteArray(R"({ "translation_catalog": "maps", "widgets": [] })");
+}
+
+void TestEventsWidgetsFile::catalogWithoutWidgets()
+{
+    QFETCH(QByteArray, content);
+    const auto file = read(content);
+    QVERIFY(file);
+    QCOMPARE(file->translationCatalog, QStringLiteral("maps"));
+    QCOMPARE(file->widgets.size(), size_t(0));
+}
+
+void TestEventsWidgetsFile::catalogBehindTheWidgets()
+{
+    const auto file = read(R"({ "widgets": [ { "path": "a" } ], "translation_catalog": "maps" })");
+    QVERIFY(file);
+    QCOMPARE(file->widgets.at(0).translationCatalog, QStringLiteral("maps"));
+}
+
+void TestEventsWidgetsFile::entriesThatAreNoWidgets()
+{
+    const auto file = read(R"({ "widgets": [
+        1, { "path": "a" }, [], { "path": "" }, { }, { "path": "b" }, null ] })");
+    QVERIFY(file);
+    QCOMPARE(file->widgets.size(), size_t(2));
+    QCOMPARE(file->widgets.at(0).path, QStringLiteral("a"));
+    QCOMPARE(file->widgets.at(1).path, QStringLiteral("b"));
+    const QStringList warnings(QVector<QString>(5, warning("Invalid widget defined in")).toList());
+    QCOMPARE(m_log->takeReport(), warnings.join(QLatin1Char('\n')));
+}
+
+void TestEventsWidgetsFile::boundedWarnings()
+{
+    QByteArray entries;
+    for (int i = 0; i < 5000; ++i) {
+        entries += "0,";
+    }
+    const auto file = read(R"({ "widgets": [ )" + entries + R"({ "path": "a" } ] })");
+    QVERIFY(file);
+    QCOMPARE(file->widgets.size(), size_t(1));
+    QCOMPARE(m_log->takeAll().size(), 1000);
+}
+
+void TestEventsWidgetsFile::noDefinition_data()
+{
+    QTest::addColumn<QByteArray>("content");
+    QTest::newRow("empty") << QByteArray();
+    QTest::newRow("array") << QByteArray(R"([ { "translation_catalog": "maps" } ])");
+    QTest::newRow("text") << QByteArray("\"widgets\"");
+    QTest::newRow("null") << QByteArray("null");
+    QTest::newRow("not JSON") << QByteArray("widgets");
+    QTest::newRow("cut off") << QByteArray(R"({ "widgets": [ { "path": "a" } )");
+    QTest::newRow("more behind it") << QByteArray(R"({ "widgets": [] } x)");
+    QTest::newRow("not UTF-8") << QByteArray("{ \"widgets\": [ { \"path\": \"\xff\" } ] }");
+    QTest::newRow("UTF-16") << QByteArray("\xff\xfe{\0}\0", 6);
+    QTest::newRow("zeroes") << QByteArray(4096, '\0');
+    QTest::newRow("deep arrays") << QByteArray(100000, '[') + QByteArray(100000, ']');
+    QByteArray deep;
+    for (int i = 0; i < 100000; ++i) {
+        deep += R"({"widgets":)";
+    }
+    QTest::newRow("deep objects") << deep;
+}
+
+void TestEventsWidgetsFile::noDefinition()
+{
+    QFETCH(QByteArray, content);
+    QVERIFY(!read(content));
+    QCOMPARE(m_log->takeReport(), warning("Invalid Events Widget"));
+}
+
+void TestEventsWidgetsFile::missingFile()
+{
+    QVERIFY(!readEventsWidgetsFile(m_path));
+    QCOMPARE(m_log->takeReport(), warning("Failed to open"));
+}
+
+void TestEventsWidgetsFile::notARegularFile_data()
+{
+    QTest::addColumn<QString>("kind");
+    for (const auto *kind : {"pipe", "link to a pipe", "endless device", "folder"}) {
+        QTest::newRow(kind) << QString::fromLatin1(kind);
+    }
+}
+
+void TestEventsWidgetsFile::notARegularFile()
+{
+    // As if one took the place of a file that was listed.
+    QFETCH(QString, kind);
+    if (kind == QStringLiteral("pipe")) {
+        Files::makePipe(m_path);
+    } else if (kind == QStringLiteral("link to a pipe")) {
+        Files::makePipe(m_root->filePath(QStringLiteral("pipe")));
+        Files::makeLink(m_root->filePath(QStringLiteral("pipe")), m_path);
+    } else if (kind == QStringLiteral("endless device")) {
+        Files::makeLink(QStringLiteral("/dev/zero"), m_path);
+    } else {
+        Files::makeFolder(m_path);
+    }
+    QVERIFY(!readEventsWidgetsFile(m_path));
+    QCOMPARE(m_log->takeReport(), warning("Failed to open"));
+}
+
+void TestEventsWidgetsFile::largeFile()
+{
+    QByteArray content = R"({ "widgets": [ { "path": "a" } ], "x": ")";
+    content += QByteArray(20 * 1024 * 1024, 'x') + "\" }";
+    const auto file = read(content);
+    QVERIFY(file);
+    QCOMPARE(file->widgets.size(), size_t(1));
+}
+
+void TestEventsWidgetsFile::tooLargeFile()
+{
+    // A file of holes, which takes no room and would take all memory.
+    QFile file(m_path);
+    QVERIFY(file.open(QIODevice::WriteOnly));
+    file.write("{ \"widgets\": [] }");
+    QVERIFY(file.resize(1LL << 40));
+    file.close();
+    QVERIFY(!readEventsWidgetsFile(m_path));
+    QCOMPARE(m_log->takeReport(), warning("Invalid Events Widget"));
+}
+
+void TestEventsWidgetsFile::availability()
+{
+    Widget widget;
+    QVERIFY(widget.isAvailable());
+    widget.availablePath = m_root->filePath(QStringLiteral("needed"));
+    QVERIFY(!widget.isAvailable());
+    Files::write(widget.availablePath, "");
+    QVERIFY(widget.isAvailable());
+    Files::remove(widget.availablePath);
+    Files::makeFolder(widget.availablePath);
+    QVERIFY(widget.isAvailable());
+
+    const auto file = read(R"({ "widgets": [ { "path": "a", "available_path": ")"
+                           + widget.availablePath.toUtf8() + R"(" } ] })");
+    QVERIFY(file);
+    QCOMPARE(file->widgets.at(0).available, true);
+}
+
+void TestEventsWidgetsFile::comparison_data()
+{
+    using Change = std::function<void(Widget *)>;
+    QTest::addColumn<Change>("change");
+    QTest::addColumn<bool>("differs");
+    const auto row = [](const char *name, bool differs, Change change) {
+        QTest::newRow(name) << std::move(change) << differs;
+    };
+    const QString text = QStringLiteral("other");
+    row("nothing", false, [](Widget *) {});
+    row("file", false, [text](Widget *widget) { widget->file = text; });
+    row("catalog", false, [text](Widget *widget) { widget->translationCatalog = text; });
+    row("title", true, [text](Widget *widget) { widget->title = text; });
+    row("title id", true, [text](Widget *widget) { widget->translationId = text; });
+    row("description id", true, [text](Widget *widget) { widget->descriptionId = text; });
+    row("icon", true, [text](Widget *widget) { widget->icon = text; });
+    row("path", true, [text](Widget *widget) { widget->path = text; });
+    row("available path", true, [text](Widget *widget) { widget->availablePath = text; });
+    row("order", true, [](Widget *widget) { widget->order = 3; });
+    row("enabled", true, [](Widget *widget) { widget->enabled = true; });
+    row("default", true, [](Widget *widget) { widget->defaultEnabled = true; });
+    row("available", true, [](Widget *widget) { widget->available = true; });
+}
+
+void TestEventsWidgetsFile::comparison()
+{
+    QFETCH(std::function<void(Widget *)>, change);
+    QFETCH(bool, differs);
+    const Widget widget;
+    Widget other;
+    change(&other);
+    QCOMPARE(widget != other, differs);
+    QCOMPARE(other != widget, differs);
+}
+
+QTEST_GUILESS_MAIN(TestEventsWidgetsFile)
+
+#include "tst_eventswidgetsfile.moc"

@@ -3,33 +3,35 @@
 
 #include "eventswidgetsfile.h"
 
+#include "jsonreader.h"
+
 #include <QFile>
-#include <QJsonArray>
-#include <QJsonDocument>
-#include <QJsonObject>
 #include <QtDebug>
+
+#include <algorithm>
+#include <string_view>
 
 #include <fcntl.h>
 #include <sys/stat.h>
 
 namespace {
 
-constexpr QStringView translationCatalogKey(u"translation_catalog");
-constexpr QStringView widgetsKey(u"widgets");
+constexpr std::string_view translationCatalogKey("translation_catalog");
+constexpr std::string_view widgetsKey("widgets");
 
-constexpr QStringView pathKey(u"path");
-constexpr QStringView titleKey(u"title");
-constexpr QStringView translationIdKey(u"translation_id");
-constexpr QStringView descriptionIdKey(u"description_id");
-constexpr QStringView iconKey(u"icon");
-constexpr QStringView orderKey(u"order");
-constexpr QStringView defaultEnabledKey(u"default_enabled");
-constexpr QStringView availablePathKey(u"available_path");
+constexpr std::string_view pathKey("path");
+constexpr std::string_view titleKey("title");
+constexpr std::string_view translationIdKey("translation_id");
+constexpr std::string_view descriptionIdKey("description_id");
+constexpr std::string_view iconKey("icon");
+constexpr std::string_view orderKey("order");
+constexpr std::string_view defaultEnabledKey("default_enabled");
+constexpr std::string_view availablePathKey("available_path");
 
 constexpr int noOrder = -1;
 
-// A definition takes a few hundred bytes a widget. The main thread reads it, and parsed it takes up
-// to thirty times its size: whatever is larger than this is none.
+// A definition takes a few hundred bytes a widget. The main thread reads it, and in memory it may
+// take ten times its size: whatever is larger than this is none.
 constexpr qint64 maximumSize = 32 * 1024 * 1024;
 // The log is written while the main thread waits: no more lines than anybody reads.
 constexpr int maximumWarnings = 1000;
@@ -56,6 +58,55 @@ bool readFile(const QString &path, QByteArray *content)
     return true;
 }
 
+EventsWidgetsModel::Widget readWidget(JsonReader *reader)
+{
+    EventsWidgetsModel::Widget widget;
+    if (!reader->beginObject()) {
+        return widget;
+    }
+    std::string_view key;
+    while (reader->nextMember(&key)) {
+        if (key == pathKey) {
+            widget.path = reader->readString();
+        } else if (key == titleKey) {
+            widget.title = reader->readString();
+        } else if (key == translationIdKey) {
+            widget.translationId = reader->readString();
+        } else if (key == descriptionIdKey) {
+            widget.descriptionId = reader->readString();
+        } else if (key == iconKey) {
+            widget.icon = reader->readString();
+        } else if (key == orderKey) {
+            widget.order = reader->readInt(noOrder);
+        } else if (key == defaultEnabledKey) {
+            widget.defaultEnabled = reader->readBool();
+        } else if (key == availablePathKey) {
+            widget.availablePath = reader->readString();
+        } else {
+            reader->skip();
+        }
+    }
+    return widget;
+}
+
+// Counts the entries that are no widgets.
+std::vector<EventsWidgetsModel::Widget> readWidgets(JsonReader *reader, int *rejected)
+{
+    std::vector<EventsWidgetsModel::Widget> widgets;
+    *rejected = 0;
+    if (reader->beginArray()) {
+        while (reader->nextElement()) {
+            EventsWidgetsModel::Widget widget = readWidget(reader);
+            if (widget.path.isEmpty()) {
+                ++*rejected;
+            } else {
+                widgets.push_back(std::move(widget));
+            }
+        }
+    }
+    return widgets;
+}
+
 } // namespace
 
 std::optional<EventsWidgetsFile> readEventsWidgetsFile(const QString &path)
@@ -65,40 +116,32 @@ std::optional<EventsWidgetsFile> readEventsWidgetsFile(const QString &path)
         qWarning() << "Failed to open" << path;
         return {};
     }
-    const QJsonDocument document = QJsonDocument::fromJson(content);
-    if (!document.isObject()) {
+    EventsWidgetsFile file;
+    JsonReader reader(content);
+    int rejected = 0;
+    const bool isObject = reader.beginObject();
+    std::string_view key;
+    while (isObject && reader.nextMember(&key)) {
+        if (key == translationCatalogKey) {
+            file.translationCatalog = reader.readString();
+        } else if (key == widgetsKey) {
+            file.widgets = readWidgets(&reader, &rejected);
+        } else {
+            reader.skip();
+        }
+    }
+    if (!isObject || !reader.atEnd()) {
         qWarning() << "Invalid Events Widget" << path;
         return {};
     }
 
-    EventsWidgetsFile file;
-    const QJsonObject object = document.object();
-    file.translationCatalog = object.value(translationCatalogKey).toString();
-
-    int warnings = 0;
-    const QJsonArray entries = object.value(widgetsKey).toArray();
-    file.widgets.reserve(size_t(entries.size()));
-    for (const QJsonValue &value : entries) {
-        const QJsonObject entry = value.toObject();
-        EventsWidgetsModel::Widget widget;
-        widget.path = entry.value(pathKey).toString();
-        if (widget.path.isEmpty()) {
-            if (++warnings <= maximumWarnings) {
-                qWarning() << "Invalid widget defined in" << path;
-            }
-            continue;
-        }
+    for (int i = 0; i < std::min(rejected, maximumWarnings); ++i) {
+        qWarning() << "Invalid widget defined in" << path;
+    }
+    for (EventsWidgetsModel::Widget &widget : file.widgets) {
         widget.file = path;
-        widget.availablePath = entry.value(availablePathKey).toString();
-        widget.title = entry.value(titleKey).toString();
-        widget.translationId = entry.value(translationIdKey).toString();
-        widget.descriptionId = entry.value(descriptionIdKey).toString();
         widget.translationCatalog = file.translationCatalog;
-        widget.icon = entry.value(iconKey).toString();
-        widget.order = entry.value(orderKey).toInt(noOrder);
-        widget.defaultEnabled = entry.value(defaultEnabledKey).toBool();
         widget.available = widget.isAvailable();
-        file.widgets.push_back(std::move(widget));
     }
     return file;
 }

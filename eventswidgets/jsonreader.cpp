@@ -13,6 +13,7 @@ namespace {
 // As deep as QJsonDocument goes; deeper texts are attacks.
 constexpr int maximumDepth = 1024;
 constexpr std::string_view byteOrderMark("\xef\xbb\xbf");
+constexpr std::string_view otherTokens("{[\"tfn");
 constexpr int utf8Mib = 106;
 
 bool isSpace(char character)
@@ -106,7 +107,8 @@ bool JsonReader::readBool()
 
 int JsonReader::readInt(int defaultValue)
 {
-    if (peek() != '-' && !isDigit(peek())) {
+    // Whatever begins like nothing else is meant for a number.
+    if (otherTokens.find(peek()) != std::string_view::npos) {
         skip();
         return defaultValue;
     }

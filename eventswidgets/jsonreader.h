@@ -20,8 +20,9 @@
         if (!reader.atEnd()) ... // it was no JSON
 
     QJsonDocument makes a tree of everything first, which takes several times as long, and looking
-    values up in it half of that again. What is JSON and what is not is the same for both, and so
-   are the values: the last one of a repeated key counts, if its user has it so.
+    values up in it half of that again. Both agree on what is JSON and on every value; of a repeated
+    key the last one is to be taken. (Only a byte outside ASCII behind a backslash is an error here,
+    and a byte-order mark at the start of a string stays.)
 */
 class JsonReader
 {

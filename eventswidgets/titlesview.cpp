@@ -295,26 +295,37 @@ void TitlesView::update()
 
 QStringList TitlesView::collect() const
 {
-    QStringList values;
     if (m_model == nullptr || m_role.isEmpty()) {
-        return values;
+        return {};
     }
     const QHash<int, QByteArray> roleNames = m_model->roleNames();
     const RolePath matchRole(m_matchRole, roleNames);
     const RolePath role(m_role, roleNames);
 
+    // Shares the old list until something in it is different, which most changes of a model are
+    // not.
+    QStringList values = m_values;
+    int size = 0;
     const int count = m_model->rowCount();
-    values.reserve(count);
     // Whose property is read may end the model.
     for (int row = 0; row < count && m_model != nullptr; ++row) {
         const QModelIndex index = m_model->index(row, 0);
-        const bool matched = !matchRole.isKnown() || matches(matchRole.value(index));
-        if (matched && m_model != nullptr) {
-            values.append(role.value(index).toString());
+        if (matchRole.isKnown() && (!matches(matchRole.value(index)) || m_model == nullptr)) {
+            continue;
         }
+        const QString text = role.value(index).toString();
+        if (size == values.size()) {
+            values.append(text);
+        } else if (values.at(size) != text) {
+            values[size] = text;
+        }
+        ++size;
     }
     if (m_model == nullptr) {
-        values.clear();
+        return {};
+    }
+    if (size < values.size()) {
+        values.erase(values.begin() + size, values.end());
     }
     return values;
 }

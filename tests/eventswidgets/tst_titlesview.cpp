@@ -12,7 +12,7 @@
 
 #include <functional>
 
-Q_DECLARE_METATYPE(std::function<QVariant(const QVariant &)>)
+Q_DECLARE_METATYPE(std::function<QVariant(QVariant)>)
 
 class TestTitlesView : public QObject
 {
@@ -634,7 +634,7 @@ void TestTitlesView::objectsToMatch()
 
 void TestTitlesView::destroyedMatch_data()
 {
-    using Wrap = std::function<QVariant(const QVariant &)>;
+    using Wrap = std::function<QVariant(QVariant)>;
     QTest::addColumn<Wrap>("wrap");
     QTest::newRow("itself") << Wrap([](const QVariant &object) { return object; });
     QTest::newRow("list") << Wrap([](const QVariant &object) {
@@ -647,7 +647,7 @@ void TestTitlesView::destroyedMatch_data()
 
 void TestTitlesView::destroyedMatch()
 {
-    QFETCH(std::function<QVariant(const QVariant &)>, wrap);
+    QFETCH(std::function<QVariant(QVariant)>, wrap);
     auto object = std::make_unique<QObject>();
     auto replaced = std::make_unique<QObject>();
     ListModel model({named("a", 1)});

@@ -24,9 +24,8 @@
 #include <algorithm>
 #include <array>
 #include <cstdio>
+#include <ctime>
 #include <functional>
-
-#include <time.h>
 
 namespace {
 

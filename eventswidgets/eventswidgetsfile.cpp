@@ -32,7 +32,7 @@ constexpr int noOrder = -1;
 
 // A definition takes a few hundred bytes a widget. The main thread reads it, and in memory it may
 // take ten times its size: whatever is larger than this is none.
-constexpr qint64 maximumSize = 32 * 1024 * 1024;
+constexpr qint64 maximumSize = qint64(32) * 1024 * 1024;
 // The log is written while the main thread waits: no more lines than anybody reads.
 constexpr int maximumWarnings = 1000;
 

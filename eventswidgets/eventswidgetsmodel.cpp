@@ -22,7 +22,7 @@ constexpr QLatin1String enabledKey("/desktop/glimmera-marlo-home/events_screen_w
 
 QSet<QString> toSet(const QStringList &list)
 {
-    return QSet<QString>(list.cbegin(), list.cend());
+    return {list.cbegin(), list.cend()};
 }
 
 QString translation(const QString &id, const QString &fallback)
@@ -150,6 +150,7 @@ void EventsWidgetsModel::componentComplete()
 */
 void EventsWidgetsModel::enableWidget(const QString &path)
 {
+    // Not looked for first, on purpose: disableWidget() takes out whatever has gathered.
     m_enabledItem.set(enabledList() + QStringList(path));
 }
 
@@ -191,11 +192,11 @@ void EventsWidgetsModel::directoryChanged()
     for (const Widget &widget : qAsConst(m_rows)) {
         stale.insert(widget.path);
     }
-    std::vector<Widget> widgets = readWidgets();
+    const std::vector<Widget> widgets = readWidgets();
     for (const Widget &widget : widgets) {
         stale.remove(widget.path);
     }
-    mergeWidgets(std::move(widgets));
+    mergeWidgets(widgets);
     removeRows(stale);
 }
 
@@ -315,25 +316,25 @@ std::vector<EventsWidgetsModel::Widget> EventsWidgetsModel::readWidgets()
     return widgets;
 }
 
-void EventsWidgetsModel::mergeWidgets(std::vector<Widget> widgets)
+void EventsWidgetsModel::mergeWidgets(const std::vector<Widget> &widgets)
 {
     indexRows();
     m_index.reserve(m_index.size() + int(widgets.size()));
-    for (Widget &widget : widgets) {
+    for (const Widget &widget : widgets) {
         const int row = findWidget(widget.path);
         if (row < 0) {
-            insertWidget(insertionIndexForWidget(widget), std::move(widget));
+            insertWidget(insertionIndexForWidget(widget), widget);
         } else if (m_rows.at(row) != widget) {
             updateWidget(row, widget);
         }
     }
 }
 
-void EventsWidgetsModel::insertWidget(int row, Widget widget)
+void EventsWidgetsModel::insertWidget(int row, const Widget &widget)
 {
     beginInsertRows({}, row, row);
     m_index.insert(widget.path, row);
-    m_rows.insert(row, std::move(widget));
+    m_rows.insert(row, widget);
     m_highestOrders.insert(row, std::numeric_limits<int>::min());
     updateHighestOrders(row);
     endInsertRows();

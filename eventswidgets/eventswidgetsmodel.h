@@ -63,8 +63,8 @@ private:
     QStringList enabledList() const;
     void readEnabledList();
     std::vector<Widget> readWidgets();
-    void mergeWidgets(std::vector<Widget> widgets);
-    void insertWidget(int row, Widget widget);
+    void mergeWidgets(const std::vector<Widget> &widgets);
+    void insertWidget(int row, const Widget &widget);
     void updateWidget(int row, const Widget &widget);
     void removeRows(const QSet<QString> &paths);
     void indexRows();

@@ -234,13 +234,14 @@ JsonReader::Literal JsonReader::takeLiteral()
 
 QString JsonReader::decode(std::string_view text)
 {
+    const QTextCodec *const codec = QTextCodec::codecForMib(utf8Mib);
     QString decoded;
     const char *at = text.data();
     const char *const end = at + text.size();
     while (at < end) {
         const char *const escape = std::find(at, end, '\\');
         QTextCodec::ConverterState state(QTextCodec::IgnoreHeader);
-        decoded += QTextCodec::codecForMib(utf8Mib)->toUnicode(at, int(escape - at), &state);
+        decoded += codec->toUnicode(at, int(escape - at), &state);
         if (state.invalidChars > 0 || state.remainingChars > 0) {
             fail();
             return {};

@@ -400,8 +400,8 @@ void TestEventsWidgetsFile::comparison_data()
     using Change = std::function<void(Widget *)>;
     QTest::addColumn<Change>("change");
     QTest::addColumn<bool>("differs");
-    const auto row = [](const char *name, bool differs, Change change) {
-        QTest::newRow(name) << std::move(change) << differs;
+    const auto row = [](const char *name, bool differs, const Change &change) {
+        QTest::newRow(name) << change << differs;
     };
     const QString text = QStringLiteral("other");
     row("nothing", false, [](Widget *) {});

@@ -112,7 +112,7 @@ QString pathOf(const char *name)
 void writeFile(const char *name, const QByteArray &widgets, const char *catalog = "")
 {
     Files::write(pathOf(name),
-                 QByteArray("{ \"translation_catalog\": \"") + catalog + "\", \"widgets\": ["
+                 QByteArray(R"({ "translation_catalog": ")") + catalog + R"(", "widgets": [)"
                      + widgets + "] }");
 }
 

@@ -29,7 +29,7 @@
 
 namespace {
 
-constexpr QLatin1String directory("/usr/share/glimmera/eventswidgets");
+const QLatin1String directory("/usr/share/glimmera/eventswidgets");
 
 constexpr int rounds = 9;
 constexpr int few = 500;

@@ -15,10 +15,10 @@
 
 namespace {
 
-constexpr QLatin1String definitionDirectory("/usr/share/glimmera/eventswidgets");
-constexpr QLatin1String definitionFilter("*.json");
+const QLatin1String definitionDirectory("/usr/share/glimmera/eventswidgets");
+const QLatin1String definitionFilter("*.json");
 
-constexpr QLatin1String enabledKey("/desktop/glimmera-marlo-home/events_screen_widgets");
+const QLatin1String enabledKey("/desktop/glimmera-marlo-home/events_screen_widgets");
 
 QSet<QString> toSet(const QStringList &list)
 {

@@ -51,6 +51,7 @@ Gallery {
         }
         currentPage.demonstrate();
         grabbing = false;
+        watchdog.restart();
         still.restart();
     }
 

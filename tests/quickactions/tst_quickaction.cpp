@@ -10,8 +10,6 @@
 
 #include <QtTest>
 
-#include <unistd.h>
-
 using Action = QuickActionsModel::Action;
 using Answer = RecordingService::Answer;
 
@@ -111,6 +109,7 @@ void TestQuickAction::init()
     // the next row may write as many bytes in the same millisecond.
     static int count = 0;
     m_path = QStringLiteral("/usr/share/glimmera/quickactions/%1.conf").arg(++count);
+    Files::makeFolder(QFileInfo(m_path).path());
     Files::remove(m_path);
     m_log = std::make_unique<MessageLog>();
 }
@@ -292,8 +291,8 @@ void TestQuickAction::priority()
 void TestQuickAction::unreadable_data()
 {
     QTest::addColumn<QByteArray>("kind");
-    for (const char *kind : {"unclosed section", "directory", "pipe", "link to a pipe",
-                             "link to a device", "no permission"}) {
+    for (const char *kind :
+         {"unclosed section", "directory", "pipe", "link to a pipe", "link to a device"}) {
         QTest::newRow(kind) << QByteArray(kind);
     }
 }
@@ -314,12 +313,6 @@ void TestQuickAction::unreadable()
         Files::makeLink(target, m_path);
     } else if (kind == "link to a device") {
         Files::makeLink(QStringLiteral("/dev/zero"), m_path);
-    } else {
-        write("title=x\n");
-        QVERIFY(QFile::setPermissions(m_path, {}));
-        if (access(qPrintable(m_path), R_OK) == 0) {
-            QSKIP("every file can be read by this user");
-        }
     }
     QCOMPARE(Action(m_path, true).config(), QVariantMap());
     QCOMPARE(m_log->takeReport(), QString::fromLatin1(unreadableWarning));
@@ -376,10 +369,11 @@ void TestQuickAction::sendsTheCall()
     RecordingService lamp(QDBusConnection::SessionBus, QStringLiteral("org.example.lamp"));
     write(lampCall + arguments(2));
     Receiver receiver;
-    QVERIFY(Action(m_path, true).trigger(&receiver, nullptr, nullptr));
+    QVERIFY(Action(m_path, true).trigger(&receiver, SLOT(reply()), nullptr));
     QCOMPARE(lamp.calls().size(), 0); // nobody waited
 
-    QTRY_COMPARE(lamp.calls().size(), 1);
+    QTRY_COMPARE(receiver.replies, 1);
+    QCOMPARE(lamp.calls().size(), 1);
     const QDBusMessage call = lamp.calls().constFirst();
     QCOMPARE(call.type(), QDBusMessage::MethodCallMessage);
     QCOMPARE(call.path(), QStringLiteral("/lamp"));
@@ -396,8 +390,9 @@ void TestQuickAction::argumentsStayAsRead()
     write(lampCall
           + "[remote-arguments]\nsize=3\n1\\argument=1\n2\\argument=true\n3\\argument=a, b\n");
     Receiver receiver;
-    QVERIFY(Action(m_path, true).trigger(&receiver, nullptr, nullptr));
-    QTRY_COMPARE(lamp.calls().size(), 1);
+    QVERIFY(Action(m_path, true).trigger(&receiver, SLOT(reply()), nullptr));
+    QTRY_COMPARE(receiver.replies, 1);
+    QCOMPARE(lamp.calls().size(), 1);
     const QDBusMessage call = lamp.calls().constFirst();
     QCOMPARE(call.signature(), QStringLiteral("ssas"));
     QCOMPARE(call.arguments(),
@@ -419,8 +414,9 @@ void TestQuickAction::noArguments()
     RecordingService lamp(QDBusConnection::SessionBus, QStringLiteral("org.example.lamp"));
     write(lampCall + section);
     Receiver receiver;
-    QVERIFY(Action(m_path, true).trigger(&receiver, nullptr, nullptr));
-    QTRY_COMPARE(lamp.calls().size(), 1);
+    QVERIFY(Action(m_path, true).trigger(&receiver, SLOT(reply()), nullptr));
+    QTRY_COMPARE(receiver.replies, 1);
+    QCOMPARE(lamp.calls().size(), 1);
     QCOMPARE(lamp.calls().constFirst().signature(), QString());
 }
 
@@ -496,8 +492,9 @@ void TestQuickAction::mostArgumentsThatCanBeSent()
     RecordingService lamp(QDBusConnection::SessionBus, QStringLiteral("org.example.lamp"));
     write(lampCall + arguments(255));
     Receiver receiver;
-    QVERIFY(Action(m_path, true).trigger(&receiver, nullptr, nullptr));
-    QTRY_COMPARE(lamp.calls().size(), 1);
+    QVERIFY(Action(m_path, true).trigger(&receiver, SLOT(reply()), nullptr));
+    QTRY_COMPARE(receiver.replies, 1);
+    QCOMPARE(lamp.calls().size(), 1);
     QCOMPARE(lamp.calls().constFirst().arguments().size(), 255);
 }
 

@@ -9,6 +9,7 @@
 #include "eventswidgetsmodel.h"
 #include "kivinfo.h"
 #include "locationconfiguration.h"
+#include "memorycardformatter.h"
 #include "modemfeaturereader.h"
 #include "quickactionsmodel.h"
 #include "termsofusemanager.h"
@@ -45,6 +46,7 @@ void SystemSettingsPlugin::registerTypes(const char *uri)
     qmlRegisterType<QuickActionsModel>(uri, versionMajor, versionMinor, "QuickActionsModel");
     qmlRegisterType<EventsWidgetsModel>(uri, versionMajor, versionMinor, "EventsWidgetsModel");
     qmlRegisterType<TitlesView>(uri, versionMajor, versionMinor, "TitlesView");
+    qmlRegisterType<MemoryCardFormatter>(uri, versionMajor, versionMinor, "MemoryCardFormatter");
     qmlRegisterType<ModemFeatureReader>(uri, versionMajor, versionMinor, "ModemFeatures");
     qmlRegisterType<TermsOfUseManager>(uri, versionMajor, versionMinor, "TermsOfUseManager");
 }

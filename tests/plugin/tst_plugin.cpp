@@ -139,6 +139,7 @@ void TestPlugin::typesAreCreatable_data()
     QTest::newRow("QuickActionsModel") << QByteArray("QuickActionsModel");
     QTest::newRow("EventsWidgetsModel") << QByteArray("EventsWidgetsModel");
     QTest::newRow("TitlesView") << QByteArray("TitlesView");
+    QTest::newRow("MemoryCardFormatter") << QByteArray("MemoryCardFormatter");
     QTest::newRow("ModemFeatures") << QByteArray("ModemFeatureReader");
     QTest::newRow("TermsOfUseManager") << QByteArray("TermsOfUseManager");
 }

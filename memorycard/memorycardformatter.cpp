@@ -1,0 +1,612 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "memorycardformatter.h"
+
+#include "diskservice.h"
+#include "fileremover.h"
+
+#include <QDBusConnection>
+#include <QDBusError>
+#include <QDBusPendingCall>
+#include <QDBusPendingCallWatcher>
+#include <QFileInfo>
+#include <QLoggingCategory>
+#include <QThreadPool>
+
+namespace {
+
+Q_LOGGING_CATEGORY(lcMemoryCardLog, "org.tarnwickos.settings.memorycard", QtWarningMsg)
+
+constexpr QLatin1String helperProgram("/usr/libexec/sdcardhelper");
+constexpr QLatin1String helperFormatVfat("format_vfat");
+constexpr QLatin1String helperFormatExt4("format_ext4");
+constexpr QLatin1String helperProbe("probe");
+
+constexpr QLatin1String vfat("vfat");
+constexpr QLatin1String ext4("ext4");
+constexpr QLatin1String mkfsVfat("/sbin/mkfs.vfat");
+constexpr QLatin1String mkfsExt4("/sbin/mkfs.ext4");
+
+// Unmounting writes out whatever a slow card has not taken yet.
+constexpr int requestTimeout = 5 * 60 * 1000; // ms
+
+constexpr QLatin1String alreadyMounted("org.freedesktop.UDisks2.Error.AlreadyMounted");
+constexpr QLatin1String alreadyUnmounting("org.freedesktop.UDisks2.Error.AlreadyUnmounting");
+
+// Without a system bus a call would end without an answer.
+QDBusPendingCall send(const QDBusMessage &call)
+{
+    const QDBusConnection bus = QDBusConnection::systemBus();
+    if (!bus.isConnected()) {
+        return QDBusPendingCall::fromError(
+            {QDBusError::Disconnected, QStringLiteral("Not connected to the system bus")});
+    }
+    return bus.asyncCall(call, requestTimeout);
+}
+
+} // namespace
+
+/*!
+    \qmltype MemoryCardFormatter
+    \inqmlmodule com.marlo.settings.system
+    \brief Formats, empties, mounts, unmounts and probes a memory card.
+
+    A card is named twice: \l deviceName is what the disk service (UDisks2 on the system bus) knows
+    it by, \l devicePath is the device node of its partition. Every operation is a sequence of
+    commands that are carried out one after the other, without waiting, while \l status tells which:
+
+    \table
+    \header \li Operation \li Status on success
+    \row \li a new \l devicePath \li \c Probing, \c Idle
+    \row \li format() \li \c Unmounting, \c Formatting, \c Mounting, \c Idle
+    \row \li removeAllFiles() \li \c Mounting, \c RemovingFiles, \c Idle
+    \row \li mount() \li \c Mounting, \c Idle
+    \row \li unmount() \li \c Unmounting, \c Idle
+    \endtable
+
+    Formatting and probing are done by the program \c /usr/libexec/sdcardhelper. It is run with
+    \c format_vfat, \c format_ext4 or \c probe and the name of the partition, such as \c mmcblk1p1,
+    has to exit with 0 on success, and writes the type of the file system that it has found to its
+    standard output.
+
+    A failed command ends the sequence and leads to the status \c Error, from which every operation
+    is accepted again. Commands act on the card that was set when they were asked for, whatever is
+    set by the time they run.
+
+    \qml
+    MemoryCardFormatter {
+        deviceName: "mmcblk1p1"
+        devicePath: "/dev/mmcblk1p1"
+        onUnmountError: {
+            if (error === MemoryCardFormatter.ErrorDeviceBusy) {
+                console.log("something uses the card")
+            }
+        }
+    }
+    \endqml
+
+    Warnings are logged in the category \c org.tarnwickos.settings.memorycard, whose debug messages
+    are off by default.
+*/
+
+MemoryCardFormatter::MemoryCardFormatter(QObject *parent) : QObject(parent)
+{
+}
+
+MemoryCardFormatter::~MemoryCardFormatter()
+{
+    if (m_process == nullptr || m_process->state() == QProcess::NotRunning) {
+        return;
+    }
+    // As a child the process would be killed here and waited for. A card that is half formatted is
+    // of no use to anybody, and that it be formatted has been agreed to: the helper may finish. Its
+    // process object goes when it has; should the application end before, the helper goes on.
+    m_process->disconnect(this);
+    m_process->setParent(nullptr);
+    connect(m_process, &QProcess::stateChanged, m_process, [process = m_process](auto state) {
+        if (state == QProcess::NotRunning) {
+            process->deleteLater();
+        }
+    });
+    if (m_running != Formatting) {
+        m_process->kill();
+    }
+}
+
+/*!
+    \qmlproperty enumeration MemoryCardFormatter::status
+    \readonly
+
+    What the formatter does:
+
+    \value MemoryCardFormatter.Idle Nothing; the last sequence ended well, if there was one.
+    \value MemoryCardFormatter.Unmounting The card has been unmounted.
+    \value MemoryCardFormatter.Formatting The card is being formatted.
+    \value MemoryCardFormatter.RemovingFiles The files on the card are being removed.
+    \value MemoryCardFormatter.Mounting The card has been mounted.
+    \value MemoryCardFormatter.Probing The helper looks what file system is on the card.
+    \value MemoryCardFormatter.Error Nothing; the last sequence failed.
+
+    While the disk service is asked to mount or unmount, the status is still the one before.
+*/
+MemoryCardFormatter::Status MemoryCardFormatter::status() const
+{
+    return m_status;
+}
+
+/*!
+    \qmlproperty string MemoryCardFormatter::deviceName
+
+    The kernel name of the block device, such as \c mmcblk1p1, by which the disk service is asked to
+    mount and unmount it. It may be set at any time, for what is asked for from then on.
+*/
+QString MemoryCardFormatter::deviceName() const
+{
+    return m_deviceName;
+}
+
+void MemoryCardFormatter::setDeviceName(const QString &name)
+{
+    if (m_deviceName != name) {
+        qCDebug(lcMemoryCardLog) << "New device name" << name;
+        m_deviceName = name;
+        Q_EMIT deviceNameChanged();
+    }
+}
+
+/*!
+    \qmlproperty string MemoryCardFormatter::devicePath
+
+    The device node of the card's partition, such as \c /dev/mmcblk1p1. A new path is probed at
+    once. While the formatter is \l busy the path cannot be changed; that gives a warning.
+*/
+QString MemoryCardFormatter::devicePath() const
+{
+    return m_devicePath;
+}
+
+void MemoryCardFormatter::setDevicePath(const QString &path)
+{
+    if (m_devicePath == path) {
+        return;
+    }
+    if (busy()) {
+        qCWarning(lcMemoryCardLog)
+            << "Cannot change device path when not idle. Status is" << m_status;
+        return;
+    }
+    m_devicePath = path;
+    Q_EMIT devicePathChanged();
+    enqueue({Probing});
+    startIfNothingRuns();
+}
+
+/*!
+    \qmlproperty string MemoryCardFormatter::filesystemType
+    \readonly
+
+    The type of the file system on the card, such as \c vfat, as the helper program reported it when
+    it was last run to probe; a failed probe usually leaves it empty. The text is what the helper
+    writes to its standard output, without white space around it.
+*/
+QString MemoryCardFormatter::filesystemType() const
+{
+    return m_filesystemType;
+}
+
+/*!
+    \qmlproperty list<string> MemoryCardFormatter::supportedFormatTypes
+    \readonly
+
+    The types that format() can make: \c vfat if \c /sbin/mkfs.vfat can be run, \c ext4 if
+    \c /sbin/mkfs.ext4 can, in this order. Looked up on every read.
+*/
+QStringList MemoryCardFormatter::supportedFormatTypes() const
+{
+    QStringList types;
+    if (QFileInfo(mkfsVfat).isExecutable()) {
+        types.append(vfat);
+    }
+    if (QFileInfo(mkfsExt4).isExecutable()) {
+        types.append(ext4);
+    }
+    return types;
+}
+
+/*!
+    \qmlproperty bool MemoryCardFormatter::busy
+    \readonly
+
+    Whether \l status is neither \c Idle nor \c Error. The operations are refused then, with a
+    warning. It is false while the disk service is asked for the first step of a sequence: what is
+    asked for meanwhile is done afterwards.
+*/
+bool MemoryCardFormatter::busy() const
+{
+    return m_status != Idle && m_status != Error;
+}
+
+/*!
+    \qmlmethod void MemoryCardFormatter::format(string type)
+
+    Unmounts the card, makes a file system of the \a type \c vfat or \c ext4 on it, and mounts it.
+    \b {Everything on the card is lost.} The helper program is run for any other type too, without a
+    command word, and decides. An empty type or \l devicePath leads to \c Error with a warning, and
+    so does a card that is not mounted, with unmountError().
+*/
+void MemoryCardFormatter::format(const QString &type)
+{
+    if (busy()) {
+        qCWarning(lcMemoryCardLog) << "format() called when not idle. Status is" << m_status;
+        return;
+    }
+    if (m_devicePath.isEmpty()) {
+        qCWarning(lcMemoryCardLog) << "devicePath is empty.";
+        setStatus(Error);
+        return;
+    }
+    if (type.isEmpty()) {
+        qCWarning(lcMemoryCardLog) << "type is empty.";
+        setStatus(Error);
+        return;
+    }
+    enqueue({Unmounting, Formatting, Mounting}, type);
+    // Here as in the other operations: busy has not changed yet, but users rely on being told.
+    Q_EMIT busyChanged();
+    startIfNothingRuns();
+}
+
+/*!
+    \qmlmethod void MemoryCardFormatter::removeAllFiles()
+
+    Mounts the card, unless it is mounted, and removes all files and folders on it. What cannot be
+    removed stays and leads to \c Error once all else is gone. An empty \l devicePath leads to
+    \c Error with a warning.
+*/
+void MemoryCardFormatter::removeAllFiles()
+{
+    if (busy()) {
+        qCWarning(lcMemoryCardLog)
+            << "removeAllFiles() called when not idle. Status is" << m_status;
+        return;
+    }
+    if (m_devicePath.isEmpty()) {
+        qCWarning(lcMemoryCardLog) << "devicePath is empty.";
+        setStatus(Error);
+        return;
+    }
+    enqueue({Mounting, RemovingFiles});
+    Q_EMIT busyChanged();
+    startIfNothingRuns();
+}
+
+/*!
+    \qmlmethod void MemoryCardFormatter::mount()
+
+    Mounts the card. A card that is mounted gives mountError(), and the sequence goes on as if it
+    had not been. Without a \l deviceName nothing happens but a critical message, and the command is
+    lost.
+*/
+void MemoryCardFormatter::mount()
+{
+    if (busy()) {
+        qCWarning(lcMemoryCardLog) << "mount() called when not idle. Status is" << m_status;
+        return;
+    }
+    enqueue({Mounting});
+    Q_EMIT busyChanged();
+    startIfNothingRuns();
+}
+
+/*!
+    \qmlmethod void MemoryCardFormatter::unmount()
+
+    Unmounts the card. Without a \l deviceName nothing happens but a critical message, and the
+    command is lost.
+*/
+void MemoryCardFormatter::unmount()
+{
+    if (busy()) {
+        qCWarning(lcMemoryCardLog) << "unmount() called when not idle. Status is" << m_status;
+        return;
+    }
+    enqueue({Unmounting});
+    Q_EMIT busyChanged();
+    startIfNothingRuns();
+}
+
+/*!
+    \qmlsignal MemoryCardFormatter::statusChanged()
+
+    Emitted after \l status has changed.
+*/
+
+/*!
+    \qmlsignal MemoryCardFormatter::deviceNameChanged()
+
+    Emitted after \l deviceName has changed.
+*/
+
+/*!
+    \qmlsignal MemoryCardFormatter::devicePathChanged()
+
+    Emitted after \l devicePath has changed, before it is probed.
+*/
+
+/*!
+    \qmlsignal MemoryCardFormatter::filesystemTypeChanged()
+
+    Emitted after \l filesystemType has changed.
+*/
+
+/*!
+    \qmlsignal MemoryCardFormatter::busyChanged()
+
+    Emitted after \l busy has changed, and whenever an operation has been accepted.
+*/
+
+/*!
+    \qmlsignal MemoryCardFormatter::mountError(enumeration error)
+
+    Emitted when the disk service does not mount the card, before \l status changes. The \a error is
+    one of the disk service's own, \c {org.freedesktop.UDisks2.Error.*}; others lead to the status
+    \c Error only.
+
+    \value MemoryCardFormatter.ErrorFailed The operation failed.
+    \value MemoryCardFormatter.ErrorCancelled The operation was cancelled.
+    \value MemoryCardFormatter.ErrorAlreadyCancelled The operation had been cancelled before.
+    \value MemoryCardFormatter.ErrorNotAuthorized The user may not do this.
+    \value MemoryCardFormatter.ErrorNotAuthorizedCanObtain The user may not, but can get leave to.
+    \value MemoryCardFormatter.ErrorNotAuthorizedDismissed The user did not grant leave.
+    \value MemoryCardFormatter.ErrorAlreadyMounted The card is mounted; the sequence goes on.
+    \value MemoryCardFormatter.ErrorNotMounted The card is not mounted.
+    \value MemoryCardFormatter.ErrorOptionNotPermitted An option is not permitted.
+    \value MemoryCardFormatter.ErrorMountedByOtherUser Another user has mounted the card.
+    \value MemoryCardFormatter.ErrorAlreadyUnmounting The card is being unmounted; the sequence goes
+           on.
+    \value MemoryCardFormatter.ErrorNotSupported The operation is not supported.
+    \value MemoryCardFormatter.ErrorTimedout The operation took too long.
+    \value MemoryCardFormatter.ErrorWouldWakeup The operation would wake up a sleeping disk.
+    \value MemoryCardFormatter.ErrorDeviceBusy Something uses the card.
+*/
+
+/*!
+    \qmlsignal MemoryCardFormatter::unmountError(enumeration error)
+
+    Emitted when the disk service does not unmount the card, as mountError() is.
+*/
+
+void MemoryCardFormatter::commandError(QProcess::ProcessError error)
+{
+    Q_UNUSED(error)
+    dropSequence();
+    // A helper that crashes is still running when it is reported, and what has ended is seen by
+    // commandFinished(). One that could not be started has gone without that.
+    if (m_process == nullptr || m_process->state() == QProcess::NotRunning) {
+        clearAwayLater();
+    }
+    setStatus(Error);
+}
+
+void MemoryCardFormatter::commandFinished(int code, QProcess::ExitStatus status)
+{
+    if (m_running == Error) {
+        // The end of what commandError() has been told about.
+        clearAway();
+        return;
+    }
+    if (m_running == Probing) {
+        const QByteArray output = m_process->readAllStandardOutput().trimmed();
+        const QString filesystemType = QString::fromLatin1(output);
+        if (m_filesystemType != filesystemType) {
+            m_filesystemType = filesystemType;
+            Q_EMIT filesystemTypeChanged();
+        }
+    }
+    m_running = Idle;
+    if (code != 0 || status != QProcess::NormalExit) {
+        m_commands.clear();
+        setStatus(Error);
+        return;
+    }
+    doNextCommand();
+}
+
+void MemoryCardFormatter::fileRemoverFinished()
+{
+    m_running = Idle;
+    doNextCommand();
+}
+
+void MemoryCardFormatter::fileRemoverError()
+{
+    m_running = Idle;
+    m_commands.clear();
+    setStatus(Error);
+}
+
+void MemoryCardFormatter::setStatus(Status status)
+{
+    if (m_status == status) {
+        return;
+    }
+    const bool wasBusy = busy();
+    m_status = status;
+    qCDebug(lcMemoryCardLog) << "New status" << status;
+    Q_EMIT statusChanged();
+    if (busy() != wasBusy) {
+        Q_EMIT busyChanged();
+    }
+}
+
+void MemoryCardFormatter::enqueue(std::initializer_list<Status> commands, const QString &formatType)
+{
+    for (const Status command : commands) {
+        m_commands.enqueue({command, m_deviceName, m_devicePath, formatType});
+    }
+}
+
+void MemoryCardFormatter::startIfNothingRuns()
+{
+    if (m_running == Idle) {
+        doNextCommand();
+    }
+}
+
+void MemoryCardFormatter::doNextCommand()
+{
+    if (m_commands.isEmpty()) {
+        setStatus(Idle);
+        return;
+    }
+    const Command command = m_commands.dequeue();
+    if (m_process == nullptr && !isMountCommand(command.command)) {
+        m_process = new QProcess(this);
+        m_process->setStandardErrorFile(QProcess::nullDevice());
+        connect(m_process, &QProcess::errorOccurred, this, &MemoryCardFormatter::commandError);
+        connect(m_process, QOverload<int, QProcess::ExitStatus>::of(&QProcess::finished), this,
+                &MemoryCardFormatter::commandFinished);
+    }
+    switch (command.command) {
+    case Unmounting:
+    case Mounting:
+        startMountOperation(command);
+        break;
+    case Formatting:
+        startFormatting(command);
+        break;
+    case RemovingFiles:
+        startRemovingFiles(command);
+        break;
+    case Probing:
+        startProbing(command);
+        break;
+    default:
+        qCWarning(lcMemoryCardLog) << "Unknown command" << command.command;
+        break;
+    }
+}
+
+void MemoryCardFormatter::startFormatting(const Command &command)
+{
+    QStringList arguments;
+    // Any other type is left without a command word, on purpose: the helper's exit code decides.
+    if (command.formatType == vfat) {
+        arguments.append(helperFormatVfat);
+    } else if (command.formatType == ext4) {
+        arguments.append(helperFormatExt4);
+    }
+    arguments.append(QFileInfo(command.devicePath).fileName());
+    // Nobody reads what is written here, and a format must not die of a reader that has gone.
+    m_process->setStandardOutputFile(QProcess::nullDevice());
+    runHelper(Formatting, arguments);
+}
+
+void MemoryCardFormatter::startProbing(const Command &command)
+{
+    m_process->setStandardOutputFile(QString());
+    runHelper(Probing, {helperProbe, QFileInfo(command.devicePath).fileName()});
+}
+
+void MemoryCardFormatter::runHelper(Status command, const QStringList &arguments)
+{
+    m_running = command;
+    m_process->start(helperProgram, arguments);
+    // A program that is not there is reported later; until then it is being started.
+    if (m_process->state() != QProcess::NotRunning) {
+        setStatus(command);
+    }
+}
+
+void MemoryCardFormatter::startMountOperation(const Command &command)
+{
+    // A sequence that was asked for before the card had a name takes the one that it has got since.
+    const QString name = command.deviceName.isEmpty() ? m_deviceName : command.deviceName;
+    const bool mounts = command.command == Mounting;
+    if (name.isEmpty()) {
+        // The words are crossed, on purpose: log readers know the lines in just this form. The rest
+        // of the queue stays, and runs before what is asked for next.
+        qCCritical(lcMemoryCardLog)
+            << "Cannot" << (mounts ? "unmount" : "mount") << "without device name";
+        return;
+    }
+    m_running = command.command;
+    const QDBusMessage call =
+        mounts ? DiskService::mountCall(name) : DiskService::unmountCall(name);
+    auto *reply = new QDBusPendingCallWatcher(send(call), this);
+    connect(reply, &QDBusPendingCallWatcher::finished, this,
+            [this, running = command.command, method = call.member()](auto *finished) {
+                mountOperationFinished(running, method, finished);
+            });
+}
+
+void MemoryCardFormatter::mountOperationFinished(Status command, const QString &method,
+                                                 QDBusPendingCallWatcher *reply)
+{
+    reply->deleteLater();
+    if (!reply->isError()) {
+        setStatus(command);
+        commandFinished(0, QProcess::NormalExit);
+        return;
+    }
+
+    const QString name = reply->error().name();
+    qCWarning(lcMemoryCardLog) << method << "error:" << name.toLatin1().constData();
+    // What was to be done is done, or about to be.
+    const bool forgiven = name == alreadyMounted || name == alreadyUnmounting;
+    if (!forgiven) {
+        // Before anybody is told: what is asked for in answer is not part of what has failed.
+        dropSequence();
+        clearAwayLater();
+    }
+    if (const auto code = DiskService::errorCode(name)) {
+        if (command == Mounting) {
+            Q_EMIT mountError(*code);
+        } else {
+            Q_EMIT unmountError(*code);
+        }
+    }
+    if (forgiven) {
+        commandFinished(0, QProcess::NormalExit);
+    } else {
+        setStatus(Error);
+    }
+}
+
+void MemoryCardFormatter::startRemovingFiles(const Command &command)
+{
+    m_running = RemovingFiles;
+    // The pool deletes it.
+    auto *remover = new FileRemover(command.devicePath);
+    connect(remover, &FileRemover::completed, this, &MemoryCardFormatter::fileRemoverFinished);
+    connect(remover, &FileRemover::error, this, &MemoryCardFormatter::fileRemoverError);
+    QThreadPool::globalInstance()->start(remover);
+    setStatus(RemovingFiles);
+}
+
+void MemoryCardFormatter::dropSequence()
+{
+    m_commands.clear();
+    m_running = Error;
+}
+
+void MemoryCardFormatter::clearAwayLater()
+{
+    // Not at once: a process cannot be started again from within the report that it did not start.
+    QMetaObject::invokeMethod(this, &MemoryCardFormatter::clearAway, Qt::QueuedConnection);
+}
+
+void MemoryCardFormatter::clearAway()
+{
+    m_running = Idle;
+    // What was asked for since the failure.
+    if (!m_commands.isEmpty()) {
+        doNextCommand();
+    }
+}
+
+bool MemoryCardFormatter::isMountCommand(Status command)
+{
+    return command == Unmounting || command == Mounting;
+}

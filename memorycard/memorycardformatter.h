@@ -1,0 +1,136 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#ifndef MEMORYCARDFORMATTER_H
+#define MEMORYCARDFORMATTER_H
+
+#include <QObject>
+#include <QProcess>
+#include <QQueue>
+#include <QString>
+#include <QStringList>
+
+#include <initializer_list>
+
+class QDBusPendingCallWatcher;
+
+/*
+    Formats a memory card, removes all files from it, mounts and unmounts it, and tells what file
+    system is on it.
+
+    What is asked for becomes commands in a queue, of which one at a time is carried out: by the
+    helper program, by the disk service or by a FileRemover. Nothing here waits for any of them.
+*/
+class MemoryCardFormatter : public QObject
+{
+    Q_OBJECT
+    Q_PROPERTY(Status status READ status NOTIFY statusChanged)
+    Q_PROPERTY(QString deviceName READ deviceName WRITE setDeviceName NOTIFY deviceNameChanged)
+    Q_PROPERTY(QString devicePath READ devicePath WRITE setDevicePath NOTIFY devicePathChanged)
+    Q_PROPERTY(QString filesystemType READ filesystemType NOTIFY filesystemTypeChanged)
+    Q_PROPERTY(QStringList supportedFormatTypes READ supportedFormatTypes CONSTANT)
+    Q_PROPERTY(bool busy READ busy NOTIFY busyChanged)
+
+public:
+    // A state of the formatter; those between Idle and Error are the commands of its queue, too.
+    enum Status {
+        Idle,
+        Unmounting,
+        Formatting,
+        RemovingFiles,
+        Mounting,
+        Probing,
+        Error,
+    };
+    Q_ENUM(Status)
+
+    // Each stands for one error name of the disk service.
+    enum MountError {
+        ErrorFailed,
+        ErrorCancelled,
+        ErrorAlreadyCancelled,
+        ErrorNotAuthorized,
+        ErrorNotAuthorizedCanObtain,
+        ErrorNotAuthorizedDismissed,
+        ErrorAlreadyMounted,
+        ErrorNotMounted,
+        ErrorOptionNotPermitted,
+        ErrorMountedByOtherUser,
+        ErrorAlreadyUnmounting,
+        ErrorNotSupported,
+        ErrorTimedout,
+        ErrorWouldWakeup,
+        ErrorDeviceBusy,
+    };
+    Q_ENUM(MountError)
+
+    explicit MemoryCardFormatter(QObject *parent = nullptr);
+    ~MemoryCardFormatter() override;
+
+    Status status() const;
+    QString deviceName() const;
+    void setDeviceName(const QString &name);
+    QString devicePath() const;
+    void setDevicePath(const QString &path);
+    QString filesystemType() const;
+    QStringList supportedFormatTypes() const;
+    bool busy() const;
+
+    Q_INVOKABLE void format(const QString &type);
+    Q_INVOKABLE void removeAllFiles();
+    Q_INVOKABLE void mount();
+    Q_INVOKABLE void unmount();
+
+Q_SIGNALS:
+    void statusChanged();
+    void deviceNameChanged();
+    void devicePathChanged();
+    void filesystemTypeChanged();
+    void busyChanged();
+    void mountError(MountError error);
+    void unmountError(MountError error);
+
+private Q_SLOTS:
+    void commandError(QProcess::ProcessError error);
+    void commandFinished(int code, QProcess::ExitStatus status);
+    void fileRemoverFinished();
+    void fileRemoverError();
+
+private:
+    // A command and what it was asked for: the properties may change before its turn comes, and
+    // another card than the one that was asked for must never be formatted or emptied.
+    struct Command {
+        Status command;
+        QString deviceName;
+        QString devicePath;
+        QString formatType;
+    };
+
+    void setStatus(Status status);
+    void enqueue(std::initializer_list<Status> commands, const QString &formatType = QString());
+    void startIfNothingRuns();
+    void doNextCommand();
+    void startFormatting(const Command &command);
+    void startProbing(const Command &command);
+    void runHelper(Status command, const QStringList &arguments);
+    void startMountOperation(const Command &command);
+    void mountOperationFinished(Status command, const QString &method,
+                                QDBusPendingCallWatcher *reply);
+    void startRemovingFiles(const Command &command);
+    void dropSequence();
+    void clearAwayLater();
+    void clearAway();
+    static bool isMountCommand(Status command);
+
+    QProcess *m_process = nullptr;
+    QQueue<Command> m_commands;
+    Status m_status = Idle;
+    // The command that is under way; the status follows it only once the disk service has answered.
+    // Idle: none, the next may start. Error: one that has failed and is not out of the way yet.
+    Status m_running = Idle;
+    QString m_deviceName;
+    QString m_devicePath;
+    QString m_filesystemType;
+};
+
+#endif

@@ -1,0 +1,138 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "cardhelper.h"
+
+#include "files.h"
+
+#include <QFile>
+#include <QProcess>
+
+#include <csignal>
+#include <memory>
+
+namespace {
+
+const QString program = QStringLiteral("/usr/libexec/sdcardhelper");
+const QString folder = QStringLiteral("/usr/libexec/sdcardhelper.d");
+const QString script = QStringLiteral(SDCARDHELPER);
+
+constexpr auto executable = QFile::ReadOwner | QFile::ExeOwner;
+
+QString inFolder(const char *name)
+{
+    return folder + QLatin1Char('/') + QLatin1String(name);
+}
+
+// A process that has ended and is not reaped yet is not running.
+bool isRunning(qint64 pid)
+{
+    QFile file(QStringLiteral("/proc/%1/stat").arg(pid));
+    if (!file.open(QIODevice::ReadOnly)) {
+        return false;
+    }
+    const QByteArray stat = file.readAll();
+    return stat.mid(stat.lastIndexOf(')') + 2, 1) != "Z";
+}
+
+} // namespace
+
+CardHelper::CardHelper()
+{
+    remove();
+    Files::remove(folder);
+    Files::makeFolder(folder);
+    Files::makePipe(inFolder("go"));
+    // For reading too: neither this nor writing then waits for the helper.
+    m_go.setFileName(inFolder("go"));
+    if (!m_go.open(QIODevice::ReadWrite | QIODevice::Unbuffered)) {
+        qFatal("cannot open %s", qPrintable(m_go.fileName()));
+    }
+}
+
+CardHelper::~CardHelper()
+{
+    const auto left = running();
+    for (const qint64 pid : left) {
+        kill(static_cast<pid_t>(pid), SIGKILL);
+    }
+    remove();
+    Files::remove(folder);
+}
+
+QString CardHelper::path()
+{
+    return program;
+}
+
+void CardHelper::install(const QString &scenario, const QByteArray &output)
+{
+    if (QProcess::execute(script, {QStringLiteral("--check"), scenario}) != 0) {
+        qFatal("no such scenario: %s", qPrintable(scenario));
+    }
+    Files::write(inFolder("output"), output);
+    // Made anew each time: one that is being run must not be written to.
+    remove();
+    Files::write(
+        program,
+        QStringLiteral("#!/bin/sh\nexec %1 %2 %3 \"$@\"\n").arg(script, folder, scenario).toUtf8());
+    QFile::setPermissions(program, executable);
+}
+
+void CardHelper::installNotExecutable()
+{
+    remove();
+    Files::write(program, "#!/bin/sh\n");
+    QFile::setPermissions(program, QFile::ReadOwner);
+}
+
+void CardHelper::remove()
+{
+    Files::remove(program);
+}
+
+void CardHelper::release()
+{
+    m_go.write("\n");
+}
+
+QList<QStringList> CardHelper::runs() const
+{
+    QList<QStringList> runs;
+    const auto all = readRuns();
+    for (const Run &run : all) {
+        runs.append(run.arguments);
+    }
+    return runs;
+}
+
+QList<qint64> CardHelper::running() const
+{
+    QList<qint64> running;
+    const auto all = readRuns();
+    for (const Run &run : all) {
+        if (isRunning(run.pid)) {
+            running.append(run.pid);
+        }
+    }
+    return running;
+}
+
+QList<CardHelper::Run> CardHelper::readRuns() const
+{
+    QFile file(inFolder("runs"));
+    if (!file.open(QIODevice::ReadOnly)) {
+        return {};
+    }
+    QList<QByteArray> words = file.readAll().split('\0');
+    words.removeLast();
+    QList<Run> runs;
+    while (words.size() >= 2) {
+        Run run = {words.takeFirst().toLongLong(), {}};
+        for (int left = words.takeFirst().toInt(); left > 0; --left) {
+            run.arguments.append(QFile::decodeName(words.takeFirst()));
+        }
+        runs.append(run);
+    }
+    return runs;
+}

@@ -1,0 +1,50 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#ifndef CARDHELPER_H
+#define CARDHELPER_H
+
+#include <QByteArray>
+#include <QFile>
+#include <QList>
+#include <QString>
+#include <QStringList>
+
+/*
+    The program /usr/libexec/sdcardhelper in the throw-away root, which does what a test wants of it
+    (see the script of that name) and keeps what it is run with. None is there before install().
+*/
+class CardHelper
+{
+public:
+    CardHelper();
+    // Ends what it has left running.
+    ~CardHelper();
+    Q_DISABLE_COPY_MOVE(CardHelper)
+
+    static QString path();
+
+    // Ends the test program if there is no such scenario.
+    void install(const QString &scenario, const QByteArray &output = QByteArray());
+    // Something that is there and cannot be run.
+    void installNotExecutable();
+    void remove();
+    // Lets a helper that is held go on.
+    void release();
+
+    // The arguments of each run, the first one first.
+    QList<QStringList> runs() const;
+    // The process of each run that has not ended.
+    QList<qint64> running() const;
+
+private:
+    struct Run {
+        qint64 pid;
+        QStringList arguments;
+    };
+    QList<Run> readRuns() const;
+
+    QFile m_go;
+};
+
+#endif

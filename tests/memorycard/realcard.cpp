@@ -28,7 +28,7 @@ namespace {
 const QString udevd = QStringLiteral("/lib/systemd/systemd-udevd");
 const QString udisksd = QStringLiteral("/usr/libexec/udisks2/udisksd");
 const QString loopControl = QStringLiteral("/dev/loop-control");
-constexpr qint64 cardSize = 64 * 1024 * 1024;
+constexpr qint64 cardSize = qint64(64) * 1024 * 1024;
 constexpr int patience = 60000; // ms, of a machine that is very busy
 
 // As <linux/fs.h> of later kernels has it, and what keeps it from writing anything out.

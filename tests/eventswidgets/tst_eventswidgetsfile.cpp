@@ -32,6 +32,7 @@ private Q_SLOTS:
     void order();
     void keepsTheOrderOfEntries();
     void repeatedPathsAreReadAgain();
+    void lastOfARepeatedKeyCounts();
     void ignoresUnknownKeys();
     void skipsABOM();
     void catalogWithoutWidgets_data();
@@ -230,6 +231,21 @@ void TestEventsWidgetsFile::repeatedPathsAreReadAgain()
     QVERIFY(file);
     QCOMPARE(file->widgets.size(), size_t(2));
     QCOMPARE(file->widgets.at(1).title, QStringLiteral("2"));
+}
+
+void TestEventsWidgetsFile::lastOfARepeatedKeyCounts()
+{
+    const auto file = read(R"({ "widgets": [ 1, { "path": "a" } ], "widgets": [
+        { "path": 1, "title": "1", "order": 1, "path": "b", "title": "2", "order": "3" } ] })");
+    QVERIFY(file);
+    QCOMPARE(file->widgets.size(), size_t(1));
+    QCOMPARE(file->widgets.at(0).path, QStringLiteral("b"));
+    QCOMPARE(file->widgets.at(0).title, QStringLiteral("2"));
+    QCOMPARE(file->widgets.at(0).order, -1);
+
+    const auto none = read(R"({ "widgets": [ { "path": "a" } ], "widgets": 5 })");
+    QVERIFY(none);
+    QCOMPARE(none->widgets.size(), size_t(0));
 }
 
 void TestEventsWidgetsFile::ignoresUnknownKeys()

@@ -871,6 +871,7 @@ void TestEventsWidgetsModel::listInReadingOrderAfterAScan()
               R"({ "path": "b", "order": 2 }, { "path": "a", "order": 1 }, { "path": "b" })");
     Model model;
     QCOMPARE(paths(model), (QStringList{a, b}));
+    model.directoryChanged();
     model.enableWidget(c);
     QCOMPARE(storedList(), (QStringList{b, a, b, c}));
 }

@@ -540,6 +540,7 @@ void TestTitlesView::matches_data()
     QTest::newRow("bool") << QVariant(true) << list({"text 1", "one", "number 1", "true"});
     QTest::newRow("texts") << QVariant(list({"one", "2"})) << list({"one", "number 2", "list"});
     QTest::newRow("texts and true") << QVariant(list({"true"})) << list({"true"});
+    QTest::newRow("empty text") << QVariant(list({""})) << QStringList();
     QTest::newRow("no texts") << QVariant(QStringList()) << QStringList();
     QTest::newRow("values") << QVariant(QVariantList{QStringLiteral("one"), 2})
                             << list({"one", "number 2", "list"});
@@ -765,12 +766,15 @@ void TestTitlesView::signalsInOrder()
     connect(&view, &TitlesView::matchRoleChanged, this, note("matchRole"));
     connect(&view, &TitlesView::matchChanged, this, note("match"));
     connect(&view, &TitlesView::valueChanged, this, note("value"));
-    view.setModel(&model);
     view.setRole(name);
+    view.setModel(&model);
     view.setMatchRole(kind);
     view.setMatch(1);
+    view.setRole(QString());
+    view.setRole(name);
     QCOMPARE(seen,
-             list({"model ", "role ", "value a", "matchRole a", "value ", "match ", "value a"}));
+             list({"role ", "model ", "value a", "matchRole a", "value ", "match ", "value a",
+                   "role a", "value ", "role ", "value a"}));
 }
 
 void TestTitlesView::handlersMayCallBack()

@@ -3,7 +3,7 @@
 
 /*
     Loading events widgets, by their number and beside the parsing of their files alone, and a
-   titles view beside a bare loop over the data of its rows. Runs in the tests' throw-away root.
+    titles view beside a bare loop over the data of its rows. Runs in the tests' throw-away root.
 
     The two sides of a ratio take turns, and a figure is the median of the rounds' ratios, with the
     lowest and the highest. The exit status is 1 when a bar is clearly missed: by the median and by
@@ -234,6 +234,9 @@ bool compareTitles(const char *work, QAbstractListModel *model, const QVector<in
 
 int main(int argc, char *argv[])
 {
+    if (!qEnvironmentVariableIsSet("MARLO_THROW_AWAY_ROOT")) {
+        qFatal("runs only in the throw-away root of tests/sandbox");
+    }
     const QCoreApplication application(argc, argv);
     bool held = compareLoading(Layout::OneFile);
     held = compareLoading(Layout::OneFileEach) && held;

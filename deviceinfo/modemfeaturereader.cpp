@@ -3,7 +3,7 @@
 
 #include "modemfeaturereader.h"
 
-#include "endlessfile.h"
+#include "inifile.h"
 
 #include <QSettings>
 
@@ -35,7 +35,7 @@ ModemFeatureReader::ModemFeatureReader(QObject *parent) : QObject(parent)
 */
 QString ModemFeatureReader::variant() const
 {
-    if (isEndless(featuresFile)) {
+    if (!isPlainIni(featuresFile)) {
         return {};
     }
     const QSettings features(featuresFile, QSettings::IniFormat);

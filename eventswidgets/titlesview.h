@@ -17,7 +17,7 @@
     all rows or of those that match.
 
     A role path is a role's name, or that and the names of properties to follow into the objects
-   that the role holds, joined by dots.
+    that the role holds, joined by dots.
 */
 class TitlesView : public QObject
 {

@@ -13,7 +13,7 @@ class FileDescriptor;
     cannot be read counts as empty. Links are removed, never followed; a folder on another device is
     left as it is, which is a failure. Other processes may change the tree meanwhile: what they put
     in the place of a folder is not entered. The depth of the tree and the size of the thread's
-   stack do not matter, and at most 57 descriptors are open at a time.
+    stack do not matter, and at most 57 descriptors are open at a time.
 */
 bool emptyDirectory(FileDescriptor directory);
 

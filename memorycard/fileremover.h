@@ -10,10 +10,10 @@
 
 /*
     Removes all files and folders from a mounted memory card and leaves its mount directory in
-   place.
+    place.
 
     Made for one run on a thread pool, which deletes it afterwards. Exactly one of the two signals
-   is emitted, once, from the pool's thread, as the last thing that run() does.
+    is emitted, once, from the pool's thread, as the last thing that run() does.
 */
 class FileRemover : public QObject, public QRunnable
 {

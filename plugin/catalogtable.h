@@ -16,8 +16,8 @@ class QTranslator;
     for as long as a definition uses it. The catalogs lie in /usr/share/translations.
 
     A translator is asked before those that were installed earlier: definitions loaded later win
-   over earlier ones, and all of them over the settings pages' own catalog. A catalog keeps the
-   language that was current when its first user was added.
+    over earlier ones, and all of them over the settings pages' own catalog. A catalog keeps the
+    language that was current when its first user was added.
 */
 class CatalogTable
 {

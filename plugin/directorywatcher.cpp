@@ -26,7 +26,7 @@ QString nearestExisting(QString path)
 } // namespace
 
 DirectoryWatcher::DirectoryWatcher(QString directory, QObject *parent)
-    : QObject(parent), m_directory(std::move(directory))
+    : QObject(parent), m_directory(std::move(directory)), m_watcher(this)
 {
     connect(&m_watcher, &QFileSystemWatcher::directoryChanged, this,
             &DirectoryWatcher::watchedChanged);

@@ -16,7 +16,7 @@
     brings its directory as well, and the last one to go takes it along.
 
     QFileSystemWatcher sees neither, nor a directory that is renamed: this watches the parent too,
-   or the nearest one that exists.
+    or the nearest one that exists.
 */
 class DirectoryWatcher : public QObject
 {

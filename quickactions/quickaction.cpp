@@ -3,15 +3,13 @@
 
 #include "quickaction.h"
 
+#include "inifile.h"
+
 #include <QDBusConnection>
 #include <QDBusError>
 #include <QDBusMessage>
-#include <QDBusMetaType>
-#include <QFileInfo>
 #include <QQmlInfo>
 #include <QSettings>
-
-#include <cstring>
 
 namespace {
 
@@ -27,17 +25,10 @@ const QLatin1String methodKey("remote-method");
 const QLatin1String argumentsKey("remote-arguments");
 const QLatin1String argumentKey("argument");
 
-// The longest signature that D-Bus knows, and so more arguments than any call can have.
-constexpr size_t maximumSignature = 255;
+// The longest signature that D-Bus knows.
+constexpr int maximumSignature = 255;
+// More arguments than a call can have: a file may name any number of them.
 constexpr int enoughArguments = 256;
-
-// Opening a pipe waits for somebody to write to it: only files are opened. Whatever else is there
-// cannot be read, and what is not there any more reads as a file without keys.
-bool isReadable(const QString &path)
-{
-    const QFileInfo entry(path);
-    return entry.isFile() || !entry.exists();
-}
 
 // What keeps a call from being sent. QtDBus would not notice: it sends a call without a service to
 // the bus itself, and crashes on a signature that is too long.
@@ -49,14 +40,16 @@ QDBusError whyUnsendable(const QuickActionsModel::Action &action)
     if (action.method().isEmpty()) {
         return {QDBusError::InvalidMember, QStringLiteral("The call names no method")};
     }
-    size_t signature = 0;
+    int signature = 0;
     const QVariantList arguments = action.arguments();
     for (const QVariant &argument : arguments) {
-        const char *type = QDBusMetaType::typeToSignature(argument.userType());
-        if (type == nullptr) {
-            return {QDBusError::InvalidArgs, QStringLiteral("An argument has no D-Bus type")};
+        if (argument.userType() == QMetaType::QString) {
+            signature += 1; // s
+        } else if (argument.userType() == QMetaType::QStringList) {
+            signature += 2; // as
+        } else {
+            return {QDBusError::InvalidArgs, QStringLiteral("An argument is no text")};
         }
-        signature += std::strlen(type);
     }
     if (signature > maximumSignature) {
         return {QDBusError::InvalidArgs, QStringLiteral("The call has too many arguments")};
@@ -154,7 +147,7 @@ bool QuickActionsModel::Action::operator==(const Action &other) const
 
 QVariantMap QuickActionsModel::Action::readActionConfig(const QString &path) const
 {
-    if (!isReadable(path)) {
+    if (!isPlainIni(path)) {
         qWarning("Unable to open action file");
         return {};
     }

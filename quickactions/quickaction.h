@@ -12,7 +12,7 @@
 
 /*
     A quick action as its definition file describes it: a value that is read once and needs no
-   model. The path of the file is the action's identity.
+    model. The path of the file is the action's identity.
 */
 class QuickActionsModel::Action
 {

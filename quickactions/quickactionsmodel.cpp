@@ -47,13 +47,15 @@ QSet<QString> toSet(const QStringList &list)
     Packages offer a quick action by installing a definition file, \c{*.conf}, into
     \c /usr/share/glimmera/quickactions. The model lists those that the user has enabled, in the
     user's order; with \l showPotential it lists all of them. It follows the directory, about a
-   second after a change, and the user's lists:
+    second after a change, and the user's lists. (Rows that stay keep their places, though: what
+    another model or process orders anew is seen when the model is created the next time.)
 
     \list
     \li \c /desktop/glimmera-marlo-home/events_screen_actions (dconf, list of strings): the paths of
         the enabled actions' files, in the order in which they are shown.
     \li \c /desktop/glimmera-marlo-home/blocked_actions (dconf, list of strings): the paths of
-   actions that are never listed. \endlist
+    actions that are never listed.
+    \endlist
 
     Roles: \c title (text in the user's language, undefined if there is none), \c icon (as in the
     definition file), \c path (of the definition file, the action's identity) and \c enabled (bool).
@@ -64,7 +66,7 @@ QSet<QString> toSet(const QStringList &list)
     ListView {
         model: QuickActionsModel { id: actions }
         delegate: ItemDelegate {
-            text: title
+            text: model.title || ""
             onClicked: actions.triggerAction(index)
         }
     }
@@ -76,7 +78,8 @@ QSet<QString> toSet(const QStringList &list)
 
 QuickActionsModel::QuickActionsModel(QObject *parent)
     : QAbstractListModel(parent), m_catalogs(this), m_directory(definitionDirectory),
-      m_watcher(definitionDirectory), m_enabledItem(enabledKey), m_blockedItem(blockedKey)
+      m_watcher(definitionDirectory, this), m_reloadTimer(this), m_enabledItem(enabledKey),
+      m_blockedItem(blockedKey)
 {
     m_reloadTimer.setSingleShot(true);
     m_reloadTimer.setInterval(reloadDelay);
@@ -135,7 +138,7 @@ int QuickActionsModel::count() const
 
 int QuickActionsModel::rowCount(const QModelIndex &parent) const
 {
-    // Nobody asks a list for the rows below a row.
+    // The same for every parent, on purpose: a list has but one, and pages need not name it.
     Q_UNUSED(parent)
     return int(m_rows.size());
 }
@@ -196,12 +199,12 @@ QVariantMap QuickActionsModel::get(int index) const
     \qmlmethod void QuickActionsModel::triggerAction(int index)
 
     Sends the D-Bus call of the action at \a index on the session bus, without waiting for an
-   answer.
+    answer.
 
     If the call fails because its service does not exist, and the action names a package that it
     needs, the application store client (\c com.marlo.marlostore on the session bus) is asked to
-   show that package. Every failure but that of a service which does not answer in time gives a
-   warning, and so does an index without a row.
+    show that package. Every failure but that of a service which does not answer in time gives a
+    warning, and so does an index without a row.
 */
 void QuickActionsModel::triggerAction(int index)
 {
@@ -229,10 +232,13 @@ void QuickActionsModel::componentComplete()
     Adds the action of the definition file \a path at the end of the user's list, even if it is in
     there. The model follows once dconf reports the change. Notes in
     \c /desktop/glimmera-marlo-home/events_screen_actions_user (dconf, bool) that the user has
-   chosen.
+    chosen.
 */
 void QuickActionsModel::enableAction(const QString &path)
 {
+    if (putOff([this, path] { enableAction(path); })) {
+        return;
+    }
     writeEnabledList(m_enabledList + QStringList(path));
 }
 
@@ -245,6 +251,9 @@ void QuickActionsModel::enableAction(const QString &path)
 */
 void QuickActionsModel::disableAction(const QString &path)
 {
+    if (putOff([this, path] { disableAction(path); })) {
+        return;
+    }
     QStringList list = m_enabledList;
     list.removeAll(path);
     writeEnabledList(list);
@@ -254,16 +263,15 @@ void QuickActionsModel::disableAction(const QString &path)
     \qmlmethod void QuickActionsModel::move(int index, int newIndex)
 
     Moves the row and the entry of the user's list at \a index to \a newIndex, and notes that the
-   user has chosen, as enableAction() does. An index outside the user's list does nothing.
+    user has chosen, as enableAction() does. An index outside the user's list does nothing.
 
     The rows have to begin with the enabled actions in the user's order, as they do unless an
-   enabled action is missing or blocked, or has been enabled while \l showPotential was set.
+    enabled action is missing or blocked, has been enabled while \l showPotential was set, or has
+    been given another place by somebody else.
 */
 void QuickActionsModel::move(int index, int newIndex)
 {
-    if (m_changing) {
-        QMetaObject::invokeMethod(
-            this, [this, index, newIndex] { move(index, newIndex); }, Qt::QueuedConnection);
+    if (putOff([this, index, newIndex] { move(index, newIndex); })) {
         return;
     }
     if (index < 0 || newIndex < 0 || index >= m_enabledList.size()
@@ -315,20 +323,14 @@ void QuickActionsModel::move(int index, int newIndex)
 
 void QuickActionsModel::loadActions()
 {
-    if (!m_complete) {
-        return;
-    }
-    if (m_changing) {
-        QMetaObject::invokeMethod(this, &QuickActionsModel::loadActions, Qt::QueuedConnection);
+    if (!m_complete || putOff([this] { loadActions(); })) {
         return;
     }
 
     const int countBefore = count();
     {
         const QScopedValueRollback<bool> changing(m_changing, true);
-        // The lists of this load: a handler may change the model's own in the middle of it.
-        const QStringList enabledList = m_enabledList;
-        const QSet<QString> enabled = toSet(enabledList);
+        const QSet<QString> enabled = toSet(m_enabledList);
 
         QStringList offered;
         QSet<QString> selected;
@@ -362,7 +364,7 @@ void QuickActionsModel::loadActions()
         // The enabled ones first, in the order of the list: each goes behind those before it that
         // have a row, which are just those that have been met. A repeated entry is met once.
         QSet<QString> met;
-        for (const QString &path : enabledList) {
+        for (const QString &path : qAsConst(m_enabledList)) {
             if (selected.contains(path) && !met.contains(path)) {
                 addOrUpdate(Action(path, true), [&met] { return met.size(); });
                 met.insert(path);
@@ -382,10 +384,11 @@ void QuickActionsModel::loadActions()
 
 void QuickActionsModel::updateEnabledActions()
 {
-    if (!m_moving) {
-        m_enabledList = m_enabledItem.value().toStringList();
-        loadActions();
+    if (m_moving || putOff([this] { updateEnabledActions(); })) {
+        return;
     }
+    m_enabledList = m_enabledItem.value().toStringList();
+    loadActions();
 }
 
 void QuickActionsModel::directoryChanged()
@@ -433,6 +436,11 @@ void QuickActionsModel::showStorePackage(const QString &packageName)
     if (bus.call(call, QDBus::NoBlock).type() == QDBusMessage::ErrorMessage) {
         qmlInfo(this) << "call to com.marlo.marlostore failed: " << bus.lastError();
     }
+}
+
+bool QuickActionsModel::putOff(const std::function<void()> &request)
+{
+    return m_changing && QMetaObject::invokeMethod(this, request, Qt::QueuedConnection);
 }
 
 bool QuickActionsModel::hasRow(int index) const

@@ -13,6 +13,7 @@
 #include <QQmlParserStatus>
 #include <QTimer>
 
+#include <functional>
 #include <memory>
 #include <vector>
 
@@ -75,6 +76,8 @@ private Q_SLOTS:
     void showStorePackage(const QString &packageName);
 
 private:
+    // While rows are changed, whatever would change them again waits for the event loop: true then.
+    bool putOff(const std::function<void()> &request);
     bool hasRow(int index) const;
     void removeRowsExcept(const QSet<QString> &paths);
     void addAction(int row, const Action &action);

@@ -80,10 +80,10 @@ void TestModemFeatureReader::readsTheVariant_data()
     QTest::newRow("number") << QByteArray("variant=7\n") << QStringLiteral("7");
     QTest::newRow("comment") << QByteArray("variant=a;b\n") << QStringLiteral("a");
     QTest::newRow("Latin-1") << QByteArray("variant=\xE4\n") << QStringLiteral("\u00E4");
-    // The way in which QSettings itself writes a list.
-    QTest::newRow("list of one") << QByteArray("variant=@Variant(\\0\\0\\0\\v\\0\\0\\0\\x1\\0\\0\\0"
-                                               "\\x2\\0g)\n")
-                                 << QStringLiteral("g");
+    // QSettings would unpack whatever is in there, and the process might not survive it.
+    QTest::newRow("packed value") << QByteArray(
+        "variant=@Variant(\\0\\0\\0\\v\\0\\0\\0\\x1\\0\\0\\0"
+        "\\x2\\0g)\n") << QString();
 }
 
 void TestModemFeatureReader::readsTheVariant()

@@ -9,8 +9,8 @@
 
 /*
     Makes and reads trees of files whose names are any bytes, which QFile and QDir would pass
-   through the locale's encoding. What cannot be made ends the program: no test goes on with a tree
-   other than the one it asked for.
+    through the locale's encoding. What cannot be made ends the program: no test goes on with a tree
+    other than the one it asked for.
 */
 namespace FileTree {
 

@@ -9,8 +9,8 @@
 
 /*
     A file system of its own, in memory, on a temporary folder. Trees that are made to be removed
-   lie in it, so that a remover that is broken and climbs out of its tree meets another device,
-   where it would otherwise meet the developer's files.
+    lie in it, so that a remover that is broken and climbs out of its tree meets another device,
+    where it would otherwise meet the developer's files.
 */
 class ScratchFileSystem
 {

@@ -6,7 +6,7 @@
 
     Plays the disk service on the system bus. Says "ready" on its standard output, and then what it
     is asked, a line of JSON for each call. SCENARIO is what it does when it is asked; with a
-   METHOD, when it is asked for just that:
+    METHOD, when it is asked for just that:
 
       done            replies
       ERROR           answers with the disk service's error of that name, such as DeviceBusy

@@ -23,6 +23,7 @@ private Q_SLOTS:
     void reportsDirectoryReplacedAtOnce();
     void reportsDirectoryRenamedAway();
     void ignoresItsParents();
+    void losesNothingToItsParent();
 
 private:
     QString path(const char *name) const { return m_root->filePath(QString::fromLatin1(name)); }
@@ -146,6 +147,20 @@ void TestDirectoryWatcher::ignoresItsParents()
     Files::write(path("a/b/file"), "x");
     QVERIFY(!missingSpy.wait(200));
     QCOMPARE(presentSpy.size(), 0);
+}
+
+void TestDirectoryWatcher::losesNothingToItsParent()
+{
+    // Both are reported in one turn of the event loop, in any order: several times, several orders.
+    for (int i = 0; i < 20; ++i) {
+        const QString directory = path("a/") + QString::number(i);
+        Files::makeFolder(directory);
+        const DirectoryWatcher watcher(directory);
+        QSignalSpy spy(&watcher, &DirectoryWatcher::directoryChanged);
+        Files::makeFolder(directory + QStringLiteral(" sibling"));
+        Files::write(directory + QStringLiteral("/file"), "x");
+        QVERIFY(spy.wait());
+    }
 }
 
 QTEST_GUILESS_MAIN(TestDirectoryWatcher)

@@ -14,7 +14,7 @@
 
 /*
     What a QML test makes its world with: files, dconf keys, catalogs, the language, and D-Bus
-   peers.
+    peers.
 */
 class ThrowAwayRoot : public QObject
 {

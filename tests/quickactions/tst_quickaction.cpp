@@ -36,6 +36,11 @@ private Q_SLOTS:
     void priority();
     void unreadable_data();
     void unreadable();
+    void packedValues_data();
+    void packedValues();
+    void atSigns_data();
+    void atSigns();
+    void hugeFile();
     void vanished();
     void linesThatAreNoKeys();
     void comparison();
@@ -319,6 +324,69 @@ void TestQuickAction::unreadable()
     Files::remove(target);
 }
 
+void TestQuickAction::packedValues_data()
+{
+    QTest::addColumn<QByteArray>("content");
+    // Two billion elements, which would be all memory, and a list in a list in a list.
+    const QByteArray huge = "@Variant(\\0\\0\\0\\x9\\x7f\\xff\\xff\\xf0)";
+    QByteArray deep = "@Variant(";
+    for (int i = 0; i < 200000; ++i) {
+        deep += "\\0\\0\\0\\x9\\0\\0\\0\\x1";
+    }
+    QTest::newRow("huge") << "title=" + huge + '\n';
+    QTest::newRow("deep") << "title=" + deep.left(900000) + ")\n";
+    QTest::newRow("unused key") << "colour=" + huge + '\n';
+    QTest::newRow("argument") << "[remote-arguments]\nsize=1\n1\\argument=" + huge + '\n';
+    QTest::newRow("in a list") << "title=a, " + huge + '\n';
+    QTest::newRow("behind blanks") << "title= \t" + huge + '\n';
+    QTest::newRow("quoted") << "title=\"" + huge + "\"\n";
+    QTest::newRow("quotes within") << "title=@Va\"\"ri\"ant(\"" + huge.mid(9) + '\n';
+    QTest::newRow("escaped at sign") << "title=\\x40" + huge.mid(1) + '\n';
+    QTest::newRow("octal") << "title=\\100" + huge.mid(1) + '\n';
+    QTest::newRow("escaped letter") << "title=@V\\x61" + huge.mid(3) + '\n';
+    QTest::newRow("continued line") << "title=\\\n" + huge + '\n';
+    QTest::newRow("backslashes for nothing") << "title=\\q@\\zVa\\wriant(" + huge.mid(9) + '\n';
+    QTest::newRow("date and time") << QByteArray("title=@DateTime(\\0\\0\\0\\x10)\n");
+}
+
+// Each of these would end the process, or might.
+void TestQuickAction::packedValues()
+{
+    QFETCH(QByteArray, content);
+    write(content);
+    QCOMPARE(Action(m_path, true).config(), QVariantMap());
+    QCOMPARE(m_log->takeReport(), QString::fromLatin1(unreadableWarning));
+}
+
+void TestQuickAction::atSigns_data()
+{
+    QTest::addColumn<QByteArray>("value");
+    QTest::addColumn<QString>("title");
+    QTest::newRow("within") << QByteArray("a@Variant(b)") << QStringLiteral("a@Variant(b)");
+    QTest::newRow("name") << QByteArray("@marlo") << QStringLiteral("@marlo");
+    QTest::newRow("doubled") << QByteArray("@@Variant(") << QStringLiteral("@Variant(");
+    QTest::newRow("short") << QByteArray("@Var") << QStringLiteral("@Var");
+    QTest::newRow("alone") << QByteArray("@") << QStringLiteral("@");
+    QTest::newRow("escaped letter") << QByteArray("\\xe4iti") << QStringLiteral("\u00e4iti");
+}
+
+void TestQuickAction::atSigns()
+{
+    QFETCH(QByteArray, value);
+    QFETCH(QString, title);
+    write("title=" + value + '\n');
+    QCOMPARE(Action(m_path, true).title(), title);
+}
+
+void TestQuickAction::hugeFile()
+{
+    write("title=x\n");
+    QFile file(m_path);
+    QVERIFY(file.open(QIODevice::ReadWrite) && file.resize(qint64(1) << 40));
+    QCOMPARE(Action(m_path, true).config(), QVariantMap());
+    QCOMPARE(m_log->takeReport(), QString::fromLatin1(unreadableWarning));
+}
+
 void TestQuickAction::vanished()
 {
     QCOMPARE(Action(m_path, true).config(), QVariantMap());
@@ -452,10 +520,15 @@ void TestQuickAction::refusesBeforeSending_data()
         << lamp
             + QStringLiteral("org.freedesktop.DBus.Error.InvalidArgs "
                              "The call has too many arguments %6");
+    QTest::newRow("argument of another type")
+        << lampCall + "[remote-arguments]\nsize=1\n1\\argument=@Rect(1 2 3 4)\n"
+        << lamp
+            + QStringLiteral("org.freedesktop.DBus.Error.InvalidArgs "
+                             "An argument is no text %6");
     QTest::newRow("missing argument") << lampCall + "[remote-arguments]\nsize=1\n"
                                       << lamp
             + QStringLiteral("org.freedesktop.DBus.Error.InvalidArgs "
-                             "An argument has no D-Bus type %6");
+                             "An argument is no text %6");
 }
 
 void TestQuickAction::refusesBeforeSending()

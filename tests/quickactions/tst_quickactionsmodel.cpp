@@ -10,8 +10,6 @@
 #include <QProcess>
 #include <QtTest>
 
-#include <functional>
-
 class TestQuickActionsModel : public QObject
 {
     Q_OBJECT
@@ -72,6 +70,17 @@ private Q_SLOTS:
     void unreadableDefinitionIsListed();
     void directoriesAndPipesAmongTheDefinitions();
     void otherFilesAreNoDefinitions();
+
+    void countOfASwap();
+    void rowsGoOneByOne();
+    void negativePriorityStopsNothing();
+    void definitionFilterIgnoresCase();
+    void blockedListDuringAMove();
+    void orderOfSomebodyElse();
+    void moveAnsweredByShorteningTheList();
+    void firstChangeStartsTheDelay();
+    void writesTheListBeforeTheUserKey();
+    void catalogsOfARowChangeWithIt();
 
     void handlersMayCallBack_data();
     void handlersMayCallBack();
@@ -884,6 +893,132 @@ void TestQuickActionsModel::otherFilesAreNoDefinitions()
     QCOMPARE(loadedModel(true)->count(), 0);
 }
 
+void TestQuickActionsModel::countOfASwap()
+{
+    const QString a = add("a");
+    const QString b = add("b");
+    setEnabled({a});
+    QuickActionsModel *model = loadedModel();
+    QSignalSpy count(model, &QuickActionsModel::countChanged);
+    setEnabled({b});
+    QCOMPARE(names(model), list({"b"}));
+    QCOMPARE(count.size(), 0);
+}
+
+void TestQuickActionsModel::rowsGoOneByOne()
+{
+    setEnabled({add("a"), add("b"), add("c")});
+    QuickActionsModel *model = loadedModel();
+    QSignalSpy removed(model, &QAbstractItemModel::rowsRemoved);
+    setEnabled({});
+    QCOMPARE(removed.size(), 3);
+    for (const QVariantList &arguments : removed) {
+        QCOMPARE(arguments.mid(1), (QVariantList{0, 0}));
+    }
+}
+
+void TestQuickActionsModel::negativePriorityStopsNothing()
+{
+    const QString enabled = add("enabled", "priority=-3\n");
+    add("some", "priority=5\n");
+    setEnabled({enabled});
+    QCOMPARE(names(loadedModel(true)), list({"enabled", "some"}));
+}
+
+void TestQuickActionsModel::definitionFilterIgnoresCase()
+{
+    Files::write(directory + QStringLiteral("/A.CONF"), "title=x\n");
+    QCOMPARE(loadedModel(true)->count(), 1);
+}
+
+void TestQuickActionsModel::blockedListDuringAMove()
+{
+    const QString a = add("a");
+    const QString b = add("b");
+    setEnabled({a, b});
+    QuickActionsModel *model = loadedModel();
+    const MGConfItem follower(enabledKey);
+    connect(&follower, &MGConfItem::valueChanged, this, [&] { setBlocked({a}); });
+    model->move(0, 1);
+    QTRY_COMPARE(names(model), list({"b"}));
+}
+
+void TestQuickActionsModel::orderOfSomebodyElse()
+{
+    // Rows that stay keep their places; move() goes by the list.
+    const QString a = add("a");
+    const QString b = add("b");
+    setEnabled({a, b});
+    QuickActionsModel *model = loadedModel();
+    setEnabled({b, a});
+    QCOMPARE(names(model), list({"a", "b"}));
+    model->move(0, 1);
+    QCOMPARE(names(model), list({"b", "a"}));
+    QCOMPARE(enabledInDconf(), list({"a", "b"}));
+}
+
+void TestQuickActionsModel::moveAnsweredByShorteningTheList()
+{
+    const QString a = add("a");
+    const QString b = add("b");
+    setEnabled({a, b});
+    QuickActionsModel *model = loadedModel();
+    connect(model, &QAbstractItemModel::rowsAboutToBeMoved, this, [&] {
+        model->disableAction(a);
+        model->disableAction(b);
+    });
+    model->move(0, 1);
+    QTRY_COMPARE(model->count(), 0);
+    QCOMPARE(enabledInDconf(), QStringList());
+}
+
+void TestQuickActionsModel::firstChangeStartsTheDelay()
+{
+    const QuickActionsModel *model = loadedModel(true);
+    const auto *timer = model->findChild<QTimer *>();
+    QVERIFY(timer != nullptr);
+    QCOMPARE(timer->interval(), 1000);
+    QVERIFY(timer->isSingleShot());
+    QVERIFY(!timer->isActive());
+
+    add("a");
+    QTRY_VERIFY(timer->isActive());
+    QTRY_VERIFY(timer->remainingTime() < 700);
+    // A later change does not start it anew.
+    add("b");
+    QTest::qWait(50);
+    QVERIFY(timer->remainingTime() < 700);
+    QTRY_COMPARE(names(model), list({"a", "b"}));
+}
+
+void TestQuickActionsModel::writesTheListBeforeTheUserKey()
+{
+    const QString a = add("a");
+    setEnabled({});
+    QuickActionsModel *model = loadedModel();
+    const MGConfItem user(userKey);
+    QStringList enabledThen;
+    connect(&user, &MGConfItem::valueChanged, this, [&] { enabledThen = enabledInDconf(); });
+    model->enableAction(a);
+    QCOMPARE(enabledThen, list({"a"}));
+}
+
+void TestQuickActionsModel::catalogsOfARowChangeWithIt()
+{
+    // What can be read when a row is announced, and when it has gone.
+    const QString a = add("a", "title=maps-title\ntranslation-catalog=maps\n");
+    QuickActionsModel *model = loadedModel();
+    QStringList texts;
+    const auto note = [&] { texts.append(qtTrId("maps-title")); };
+    connect(model, &QAbstractItemModel::rowsAboutToBeInserted, this, note);
+    connect(model, &QAbstractItemModel::rowsInserted, this, note);
+    connect(model, &QAbstractItemModel::rowsAboutToBeRemoved, this, note);
+    connect(model, &QAbstractItemModel::rowsRemoved, this, note);
+    setEnabled({a});
+    setEnabled({});
+    QCOMPARE(texts, list({"maps-title", "Kartat", "Kartat", "maps-title"}));
+}
+
 void TestQuickActionsModel::handlersMayCallBack_data()
 {
     QTest::addColumn<QByteArray>("signal");
@@ -938,18 +1073,19 @@ void TestQuickActionsModel::handlersMayCallBack()
     model->setShowPotential(false);
     model->enableAction(b);
     QTRY_VERIFY(answers > 0);
-    QTest::qWait(50); // what was put off
     // In the end the rows are those of the list.
-    const QStringList listed = names(model);
-    QStringList expected = enabledInDconf();
-    if (model->showPotential()) {
-        expected += list({"a", "b", "c"});
-    }
-    expected.removeDuplicates();
-    QCOMPARE(QSet<QString>(listed.cbegin(), listed.cend()),
-             QSet<QString>(expected.cbegin(), expected.cend()));
-    QCOMPARE(listed.size(), expected.size());
-    QCOMPARE(model->count(), model->rowCount());
+    const auto settled = [&] {
+        QStringList expected = enabledInDconf();
+        if (model->showPotential()) {
+            expected += list({"a", "b", "c"});
+        }
+        expected.removeDuplicates();
+        expected.sort();
+        QStringList listed = names(model);
+        listed.sort();
+        return listed == expected;
+    };
+    QTRY_VERIFY(settled());
 }
 
 void TestQuickActionsModel::listsOfOtherTypes_data()

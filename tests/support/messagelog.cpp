@@ -28,6 +28,10 @@ void record(QtMsgType type, const QMessageLogContext &context, const QString &te
 
 MessageLog::MessageLog()
 {
+    // Every test has one, and none may run where what it does to files, keys and services stays.
+    if (!qEnvironmentVariableIsSet("MARLO_THROW_AWAY_ROOT")) {
+        qFatal("this test runs only in the throw-away root of tests/sandbox");
+    }
     messages.clear();
     previousHandler = qInstallMessageHandler(record);
 }

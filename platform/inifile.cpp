@@ -1,0 +1,113 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "inifile.h"
+
+#include <QByteArray>
+#include <QFile>
+
+#include <optional>
+
+#include <fcntl.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+namespace {
+
+constexpr qint64 maximumSize = qint64(1024) * 1024;
+
+int digitOf(char character)
+{
+    if (character >= '0' && character <= '9') {
+        return character - '0';
+    }
+    const char lower = char(character | 0x20);
+    return lower >= 'a' && lower <= 'f' ? lower - 'a' + 10 : 16;
+}
+
+// The next character of a value as QSettings understands it: quotes are not part of it, a character
+// may be escaped by its number, and a backslash before most others stands for nothing at all.
+std::optional<uint> nextCharacter(const QByteArray &data, int *position)
+{
+    while (*position < data.size()) {
+        const char character = data.at((*position)++);
+        if (character == '"') {
+            continue;
+        }
+        if (character != '\\') {
+            return uchar(character);
+        }
+        if (*position == data.size()) {
+            break;
+        }
+        const char escaped = data.at((*position)++);
+        const uint base = escaped == 'x' ? 16 : 8;
+        if (escaped == '\\' || escaped == '"') {
+            return uchar(escaped);
+        }
+        if (escaped != 'x' && digitOf(escaped) >= 8) {
+            continue;
+        }
+        uint number = escaped == 'x' ? 0 : uint(digitOf(escaped));
+        while (*position < data.size() && uint(digitOf(data.at(*position))) < base) {
+            number = number * base + uint(digitOf(data.at((*position)++)));
+        }
+        return number;
+    }
+    return {};
+}
+
+bool isSpace(uint character)
+{
+    return character == ' ' || character == '\t' || character == '\r' || character == '\n';
+}
+
+// Whether a value that begins at the position, or the element of a list, is one to unpack.
+bool isPacked(const QByteArray &data, int position)
+{
+    std::optional<uint> character;
+    do {
+        character = nextCharacter(data, &position);
+    } while (character && isSpace(*character));
+    if (character != uint('@')) {
+        return false;
+    }
+    QByteArray word;
+    while (word.size() < 9 && (character = nextCharacter(data, &position))) {
+        word += char(*character);
+    }
+    return word.startsWith("Variant(") || word.startsWith("DateTime(");
+}
+
+bool holdsPackedValues(const QByteArray &data)
+{
+    for (int position = 0; position < data.size(); ++position) {
+        const char character = data.at(position);
+        if ((character == '=' || character == ',') && isPacked(data, position + 1)) {
+            return true;
+        }
+    }
+    return false;
+}
+
+} // namespace
+
+bool isPlainIni(const QString &path)
+{
+    // Whatever lies there, opening it like this waits for nobody.
+    const int descriptor
+        = open(QFile::encodeName(path).constData(), O_RDONLY | O_NONBLOCK | O_NOCTTY | O_CLOEXEC);
+    if (descriptor < 0) {
+        return true;
+    }
+    struct stat entry = {};
+    bool isPlain = fstat(descriptor, &entry) == 0 && S_ISREG(entry.st_mode)
+        && entry.st_size <= maximumSize;
+    if (isPlain) {
+        QByteArray data(int(entry.st_size), Qt::Uninitialized);
+        data.truncate(int(qMax(ssize_t(0), read(descriptor, data.data(), size_t(data.size())))));
+        isPlain = !holdsPackedValues(data);
+    }
+    close(descriptor);
+    return isPlain;
+}

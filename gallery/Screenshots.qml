@@ -29,6 +29,7 @@ Gallery {
     property int shot: -1
     property int view: views.length - 1
     property var files: []
+    property bool demonstrated: false
     property bool grabbing: true
     property bool failed: false
 
@@ -49,9 +50,8 @@ Gallery {
             fail("does not load");
             return;
         }
-        currentPage.demonstrate();
+        demonstrated = false;
         grabbing = false;
-        watchdog.restart();
         still.restart();
     }
 
@@ -114,7 +114,14 @@ Gallery {
         interval: 100
         repeat: true
         onTriggered: {
-            if (!gallery.grabbing && !gallery.failed && gallery.currentPage.ready) {
+            if (gallery.grabbing || gallery.failed) {
+                return;
+            }
+            // As a user would: once the page is there.
+            if (!gallery.demonstrated) {
+                gallery.demonstrated = true;
+                gallery.currentPage.demonstrate();
+            } else if (gallery.currentPage.ready) {
                 gallery.grab();
             }
         }

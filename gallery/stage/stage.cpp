@@ -18,6 +18,11 @@ const QLatin1String peerPath("/");
 const QLatin1String peerInterface("com.marlo.settings.gallery.Peer");
 const QLatin1String peerSignal("CallReceived");
 
+// What the cover daemon tells of.
+const QString coverIdProperty = QStringLiteral("KIVID");
+const QString coverReadyProperty = QStringLiteral("Ready");
+const QString sampleCover = QStringLiteral("MARLO-COVER-07");
+
 } // namespace
 
 Stage::Stage(QQmlEngine *engine) : m_engine(engine)
@@ -28,6 +33,7 @@ Stage::Stage(QQmlEngine *engine) : m_engine(engine)
             SIGNAL(callReceived(QString, QString, QStringList)))) {
         qmlWarning(this) << "no session bus: received calls will not be shown";
     }
+    tellOfCover();
 }
 
 QString Stage::language() const
@@ -45,6 +51,25 @@ void Stage::setLanguage(const QString &language)
     QEvent languageChange(QEvent::LanguageChange);
     QCoreApplication::sendEvent(m_engine, &languageChange);
     Q_EMIT languageChanged();
+}
+
+void Stage::setCoverAttached(bool attached)
+{
+    if (attached == m_coverAttached) {
+        return;
+    }
+    m_coverAttached = attached;
+    tellOfCover();
+    Q_EMIT coverAttachedChanged();
+}
+
+void Stage::tellOfCover()
+{
+    const QString id = m_coverAttached ? sampleCover : QString();
+    const int ready = m_coverAttached ? 1 : 0;
+    m_coverDaemon.answer(coverIdProperty, {id});
+    m_coverDaemon.answer(coverReadyProperty, {ready});
+    m_coverDaemon.sendChanges({{coverIdProperty, id}, {coverReadyProperty, ready}});
 }
 
 void Stage::reportWarnings(const QList<QQmlError> &errors)

@@ -4,6 +4,8 @@
 #ifndef STAGE_H
 #define STAGE_H
 
+#include "coverdaemon.h"
+
 #include <QObject>
 #include <QStringList>
 
@@ -11,31 +13,42 @@ class QQmlEngine;
 class QQmlError;
 
 /*
-    Plays the device around the gallery's pages: changes the language as a home screen does, and
-    tells which calls the sample services on the session bus receive.
+    Plays the device around the gallery's pages: changes the language as a home screen does, tells
+    which calls the sample services on the session bus receive, and attaches and removes a smart
+    back cover.
 */
 class Stage : public QObject
 {
     Q_OBJECT
     // The name of a language, such as "fi".
     Q_PROPERTY(QString language READ language WRITE setLanguage NOTIFY languageChanged)
+    Q_PROPERTY(
+        bool coverAttached READ coverAttached WRITE setCoverAttached NOTIFY coverAttachedChanged)
 
 public:
     explicit Stage(QQmlEngine *engine);
 
     QString language() const;
     void setLanguage(const QString &language);
+    bool coverAttached() const { return m_coverAttached; }
+    void setCoverAttached(bool attached);
 
 Q_SIGNALS:
     void languageChanged();
+    void coverAttachedChanged();
     void callReceived(const QString &service, const QString &method, const QStringList &arguments);
     // A mistake in QML. What an object of a module reports for information is none.
     void warning(const QString &text);
 
 private:
+    void tellOfCover();
     void reportWarnings(const QList<QQmlError> &errors);
 
     QQmlEngine *m_engine;
+    // The pages meet it on the system bus alone. Its name is owned before there is a page: QtDBus
+    // may lose a signal that follows too soon on a new owner.
+    CoverDaemon m_coverDaemon;
+    bool m_coverAttached = false;
 };
 
 #endif

@@ -63,5 +63,209 @@
         <source></source>
         <translation>Neuer Wecker</translation>
     </message>
+    <message id="settings_location-la-no_agreement_text_found">
+        <source></source>
+        <translation>Die Bedingungen dieses Dienstes wurden nicht gefunden.</translation>
+    </message>
+    <message id="gallery-location">
+        <source></source>
+        <translation>Standort</translation>
+    </message>
+    <message id="gallery-location-about">
+        <source></source>
+        <translation>Ortungsdienste schalten, die Schalter speichern und wiederherstellen, und lesen, welchen Bedingungen zuzustimmen ist.</translation>
+    </message>
+    <message id="gallery-location-services">
+        <source></source>
+        <translation>Ortungsdienste</translation>
+    </message>
+    <message id="gallery-location-gps">
+        <source></source>
+        <translation>Satellitenortung (GPS)</translation>
+    </message>
+    <message id="gallery-location-mls">
+        <source></source>
+        <translation>Netzwerkortung (MLS)</translation>
+    </message>
+    <message id="gallery-location-mls-online">
+        <source></source>
+        <translation>MLS-Onlineunterstützung</translation>
+    </message>
+    <message id="gallery-location-here">
+        <source></source>
+        <translation>HERE-Ortung</translation>
+    </message>
+    <message id="gallery-location-agree-first">
+        <source></source>
+        <translation>Ein Onlinedienst lässt sich schalten, sobald seinen Bedingungen zugestimmt wurde.</translation>
+    </message>
+    <message id="gallery-location-custom">
+        <source></source>
+        <translation>Eigene Einstellungen</translation>
+    </message>
+    <message id="gallery-location-custom-enabled">
+        <source></source>
+        <translation>Eigene Einstellungen nutzen</translation>
+    </message>
+    <message id="gallery-location-save">
+        <source></source>
+        <translation>Speichern</translation>
+    </message>
+    <message id="gallery-location-restore">
+        <source></source>
+        <translation>Wiederherstellen</translation>
+    </message>
+    <message id="gallery-location-custom-note">
+        <source></source>
+        <translation>Die gespeicherten Schalter lassen sich später wiederherstellen, auch von anderen Anwendungen.</translation>
+    </message>
+    <message id="gallery-location-mls-terms">
+        <source></source>
+        <translation>Bedingungen von MLS online</translation>
+    </message>
+    <message id="gallery-location-here-terms">
+        <source></source>
+        <translation>Bedingungen von HERE</translation>
+    </message>
+    <message id="gallery-location-agree">
+        <source></source>
+        <translation>Ich stimme zu</translation>
+    </message>
+    <message id="gallery-location-withdraw">
+        <source></source>
+        <translation>Zustimmung widerrufen</translation>
+    </message>
+    <message id="gallery-cover">
+        <source></source>
+        <translation>Smarte Rückschale</translation>
+    </message>
+    <message id="gallery-cover-about">
+        <source></source>
+        <translation>Eine Rückschale anbringen und abnehmen und sehen, wie die Seite dem Rückschalendienst folgt.</translation>
+    </message>
+    <message id="gallery-cover-info">
+        <source></source>
+        <translation>Was der Dienst mitteilt</translation>
+    </message>
+    <message id="gallery-cover-id">
+        <source></source>
+        <translation>Kennung</translation>
+    </message>
+    <message id="gallery-cover-none">
+        <source></source>
+        <translation>Keine Rückschale</translation>
+    </message>
+    <message id="gallery-cover-daemon">
+        <source></source>
+        <translation>Rückschalendienst</translation>
+    </message>
+    <message id="gallery-cover-ready">
+        <source></source>
+        <translation>Bereit</translation>
+    </message>
+    <message id="gallery-cover-not-ready">
+        <source></source>
+        <translation>Nicht bereit</translation>
+    </message>
+    <message id="gallery-cover-device">
+        <source></source>
+        <translation>Am Gerät</translation>
+    </message>
+    <message id="gallery-cover-device-note">
+        <source></source>
+        <translation>Der Dienst am Systembus bemerkt die Rückschale und meldet sie der Seite.</translation>
+    </message>
+    <message id="gallery-cover-attach">
+        <source></source>
+        <translation>Rückschale anbringen</translation>
+    </message>
+    <message id="gallery-cover-remove">
+        <source></source>
+        <translation>Rückschale abnehmen</translation>
+    </message>
+    <message id="gallery-device">
+        <source></source>
+        <translation>Gerät</translation>
+    </message>
+    <message id="gallery-device-about">
+        <source></source>
+        <translation>Bluetooth-Adresse und Modemvariante sehen, und ob Android unterstützt wird.</translation>
+    </message>
+    <message id="gallery-device-radio">
+        <source></source>
+        <translation>Funk</translation>
+    </message>
+    <message id="gallery-device-bluetooth">
+        <source></source>
+        <translation>Bluetooth-Adresse</translation>
+    </message>
+    <message id="gallery-device-modem">
+        <source></source>
+        <translation>Modemvariante</translation>
+    </message>
+    <message id="gallery-device-unknown">
+        <source></source>
+        <translation>Unbekannt</translation>
+    </message>
+    <message id="gallery-device-storage">
+        <source></source>
+        <translation>Speicher</translation>
+    </message>
+    <message id="gallery-device-android">
+        <source></source>
+        <translation>Android-Datenordner</translation>
+    </message>
+    <message id="gallery-device-android-shown">
+        <source></source>
+        <translation>Sichtbar: Android-Unterstützung ist installiert</translation>
+    </message>
+    <message id="gallery-device-android-hidden">
+        <source></source>
+        <translation>Verborgen: keine Android-Unterstützung</translation>
+    </message>
+    <message id="gallery-terms">
+        <source></source>
+        <translation>Nutzungsbedingungen</translation>
+    </message>
+    <message id="gallery-terms-about">
+        <source></source>
+        <translation>Die Bedingungen der Plattform und des Herstellers in einer wählbaren Sprache lesen.</translation>
+    </message>
+    <message id="gallery-terms-locale">
+        <source></source>
+        <translation>Sprache der Bedingungen</translation>
+    </message>
+    <message id="gallery-terms-locale-note">
+        <source></source>
+        <translation>Bedingungen, die es in der Sprache nicht gibt, erscheinen auf Englisch.</translation>
+    </message>
+    <message id="gallery-terms-none">
+        <source></source>
+        <translation>Keine Bedingungen</translation>
+    </message>
+    <message id="gallery-text-files">
+        <source></source>
+        <translation>Textdateien</translation>
+    </message>
+    <message id="gallery-text-files-about">
+        <source></source>
+        <translation>Eine Datei lesen, und einen Ordner, dessen Dateien zu einem Text werden.</translation>
+    </message>
+    <message id="gallery-text-files-file">
+        <source></source>
+        <translation>Eine Datei</translation>
+    </message>
+    <message id="gallery-text-files-note">
+        <source></source>
+        <translation>Zeilenumbrüche einer Datei entfallen: Ein Text mit Absätzen wird in HTML geschrieben.</translation>
+    </message>
+    <message id="gallery-text-files-folder">
+        <source></source>
+        <translation>Ein Ordner</translation>
+    </message>
+    <message id="gallery-text-files-prefix">
+        <source></source>
+        <translation>Lizenzen der Beispieldateien:</translation>
+    </message>
 </context>
 </TS>

@@ -63,5 +63,209 @@
         <source></source>
         <translation>Uusi herätys</translation>
     </message>
+    <message id="settings_location-la-no_agreement_text_found">
+        <source></source>
+        <translation>Palvelun ehtoja ei löytynyt.</translation>
+    </message>
+    <message id="gallery-location">
+        <source></source>
+        <translation>Sijainti</translation>
+    </message>
+    <message id="gallery-location-about">
+        <source></source>
+        <translation>Kytke paikannuspalveluja, tallenna ja palauta kytkimet ja lue, mitä hyväksytään.</translation>
+    </message>
+    <message id="gallery-location-services">
+        <source></source>
+        <translation>Paikannuspalvelut</translation>
+    </message>
+    <message id="gallery-location-gps">
+        <source></source>
+        <translation>Satelliittipaikannus (GPS)</translation>
+    </message>
+    <message id="gallery-location-mls">
+        <source></source>
+        <translation>Verkkopaikannus (MLS)</translation>
+    </message>
+    <message id="gallery-location-mls-online">
+        <source></source>
+        <translation>MLS-verkkoavustus</translation>
+    </message>
+    <message id="gallery-location-here">
+        <source></source>
+        <translation>HERE-paikannus</translation>
+    </message>
+    <message id="gallery-location-agree-first">
+        <source></source>
+        <translation>Verkkopalvelun voi kytkeä, kun sen ehdot on hyväksytty.</translation>
+    </message>
+    <message id="gallery-location-custom">
+        <source></source>
+        <translation>Omat asetukset</translation>
+    </message>
+    <message id="gallery-location-custom-enabled">
+        <source></source>
+        <translation>Käytä omia asetuksia</translation>
+    </message>
+    <message id="gallery-location-save">
+        <source></source>
+        <translation>Tallenna</translation>
+    </message>
+    <message id="gallery-location-restore">
+        <source></source>
+        <translation>Palauta</translation>
+    </message>
+    <message id="gallery-location-custom-note">
+        <source></source>
+        <translation>Tallennetut kytkimet voi palauttaa myöhemmin, myös muista sovelluksista.</translation>
+    </message>
+    <message id="gallery-location-mls-terms">
+        <source></source>
+        <translation>MLS-verkkoavustuksen ehdot</translation>
+    </message>
+    <message id="gallery-location-here-terms">
+        <source></source>
+        <translation>HERE-paikannuksen ehdot</translation>
+    </message>
+    <message id="gallery-location-agree">
+        <source></source>
+        <translation>Hyväksyn</translation>
+    </message>
+    <message id="gallery-location-withdraw">
+        <source></source>
+        <translation>Peru suostumus</translation>
+    </message>
+    <message id="gallery-cover">
+        <source></source>
+        <translation>Älykuori</translation>
+    </message>
+    <message id="gallery-cover-about">
+        <source></source>
+        <translation>Kiinnitä ja irrota kuori ja katso, miten sivu seuraa kuoripalvelua.</translation>
+    </message>
+    <message id="gallery-cover-info">
+        <source></source>
+        <translation>Mitä palvelu kertoo</translation>
+    </message>
+    <message id="gallery-cover-id">
+        <source></source>
+        <translation>Tunniste</translation>
+    </message>
+    <message id="gallery-cover-none">
+        <source></source>
+        <translation>Ei kuorta</translation>
+    </message>
+    <message id="gallery-cover-daemon">
+        <source></source>
+        <translation>Kuoripalvelu</translation>
+    </message>
+    <message id="gallery-cover-ready">
+        <source></source>
+        <translation>Valmis</translation>
+    </message>
+    <message id="gallery-cover-not-ready">
+        <source></source>
+        <translation>Ei valmis</translation>
+    </message>
+    <message id="gallery-cover-device">
+        <source></source>
+        <translation>Laitteessa</translation>
+    </message>
+    <message id="gallery-cover-device-note">
+        <source></source>
+        <translation>Järjestelmäväylän palvelu huomaa kuoren ja kertoo siitä sivulle.</translation>
+    </message>
+    <message id="gallery-cover-attach">
+        <source></source>
+        <translation>Kiinnitä kuori</translation>
+    </message>
+    <message id="gallery-cover-remove">
+        <source></source>
+        <translation>Irrota kuori</translation>
+    </message>
+    <message id="gallery-device">
+        <source></source>
+        <translation>Laite</translation>
+    </message>
+    <message id="gallery-device-about">
+        <source></source>
+        <translation>Katso Bluetooth-osoite, modeemin versio ja onko Android-tuki asennettu.</translation>
+    </message>
+    <message id="gallery-device-radio">
+        <source></source>
+        <translation>Radio</translation>
+    </message>
+    <message id="gallery-device-bluetooth">
+        <source></source>
+        <translation>Bluetooth-osoite</translation>
+    </message>
+    <message id="gallery-device-modem">
+        <source></source>
+        <translation>Modeemin versio</translation>
+    </message>
+    <message id="gallery-device-unknown">
+        <source></source>
+        <translation>Ei tiedossa</translation>
+    </message>
+    <message id="gallery-device-storage">
+        <source></source>
+        <translation>Tallennustila</translation>
+    </message>
+    <message id="gallery-device-android">
+        <source></source>
+        <translation>Androidin datakansiot</translation>
+    </message>
+    <message id="gallery-device-android-shown">
+        <source></source>
+        <translation>Näytetään: Android-tuki on asennettu</translation>
+    </message>
+    <message id="gallery-device-android-hidden">
+        <source></source>
+        <translation>Piilotettu: Android-tukea ei ole</translation>
+    </message>
+    <message id="gallery-terms">
+        <source></source>
+        <translation>Käyttöehdot</translation>
+    </message>
+    <message id="gallery-terms-about">
+        <source></source>
+        <translation>Lue alustan ja valmistajan ehdot valitsemallasi kielellä.</translation>
+    </message>
+    <message id="gallery-terms-locale">
+        <source></source>
+        <translation>Ehtojen kieli</translation>
+    </message>
+    <message id="gallery-terms-locale-note">
+        <source></source>
+        <translation>Ehdot, joita ei ole tällä kielellä, näytetään englanniksi.</translation>
+    </message>
+    <message id="gallery-terms-none">
+        <source></source>
+        <translation>Ei ehtoja</translation>
+    </message>
+    <message id="gallery-text-files">
+        <source></source>
+        <translation>Tekstitiedostot</translation>
+    </message>
+    <message id="gallery-text-files-about">
+        <source></source>
+        <translation>Lue tiedosto sekä kansio, jonka tiedostoista tulee yksi teksti.</translation>
+    </message>
+    <message id="gallery-text-files-file">
+        <source></source>
+        <translation>Tiedosto</translation>
+    </message>
+    <message id="gallery-text-files-note">
+        <source></source>
+        <translation>Tiedoston rivinvaihdot jäävät pois: kappaleisiin jaettu teksti kirjoitetaan HTML:nä.</translation>
+    </message>
+    <message id="gallery-text-files-folder">
+        <source></source>
+        <translation>Kansio</translation>
+    </message>
+    <message id="gallery-text-files-prefix">
+        <source></source>
+        <translation>Esimerkkitiedostojen lisenssit:</translation>
+    </message>
 </context>
 </TS>

@@ -63,5 +63,209 @@
         <source></source>
         <translation>New alarm</translation>
     </message>
+    <message id="settings_location-la-no_agreement_text_found">
+        <source></source>
+        <translation>The terms of this service could not be found.</translation>
+    </message>
+    <message id="gallery-location">
+        <source></source>
+        <translation>Location</translation>
+    </message>
+    <message id="gallery-location-about">
+        <source></source>
+        <translation>Switch the location services, save and restore the switches, and read what to agree to.</translation>
+    </message>
+    <message id="gallery-location-services">
+        <source></source>
+        <translation>Location services</translation>
+    </message>
+    <message id="gallery-location-gps">
+        <source></source>
+        <translation>Satellite positioning (GPS)</translation>
+    </message>
+    <message id="gallery-location-mls">
+        <source></source>
+        <translation>Network positioning (MLS)</translation>
+    </message>
+    <message id="gallery-location-mls-online">
+        <source></source>
+        <translation>MLS online assistance</translation>
+    </message>
+    <message id="gallery-location-here">
+        <source></source>
+        <translation>HERE positioning</translation>
+    </message>
+    <message id="gallery-location-agree-first">
+        <source></source>
+        <translation>An online service can be switched once its terms are agreed to.</translation>
+    </message>
+    <message id="gallery-location-custom">
+        <source></source>
+        <translation>Custom settings</translation>
+    </message>
+    <message id="gallery-location-custom-enabled">
+        <source></source>
+        <translation>Use custom settings</translation>
+    </message>
+    <message id="gallery-location-save">
+        <source></source>
+        <translation>Save</translation>
+    </message>
+    <message id="gallery-location-restore">
+        <source></source>
+        <translation>Restore</translation>
+    </message>
+    <message id="gallery-location-custom-note">
+        <source></source>
+        <translation>The saved switches can be restored later, also by other applications.</translation>
+    </message>
+    <message id="gallery-location-mls-terms">
+        <source></source>
+        <translation>Terms of MLS online assistance</translation>
+    </message>
+    <message id="gallery-location-here-terms">
+        <source></source>
+        <translation>Terms of HERE positioning</translation>
+    </message>
+    <message id="gallery-location-agree">
+        <source></source>
+        <translation>I agree</translation>
+    </message>
+    <message id="gallery-location-withdraw">
+        <source></source>
+        <translation>Withdraw consent</translation>
+    </message>
+    <message id="gallery-cover">
+        <source></source>
+        <translation>Smart back cover</translation>
+    </message>
+    <message id="gallery-cover-about">
+        <source></source>
+        <translation>Attach and remove a cover, and see the page follow the cover daemon.</translation>
+    </message>
+    <message id="gallery-cover-info">
+        <source></source>
+        <translation>What the daemon tells</translation>
+    </message>
+    <message id="gallery-cover-id">
+        <source></source>
+        <translation>Identifier</translation>
+    </message>
+    <message id="gallery-cover-none">
+        <source></source>
+        <translation>No cover</translation>
+    </message>
+    <message id="gallery-cover-daemon">
+        <source></source>
+        <translation>Cover daemon</translation>
+    </message>
+    <message id="gallery-cover-ready">
+        <source></source>
+        <translation>Ready</translation>
+    </message>
+    <message id="gallery-cover-not-ready">
+        <source></source>
+        <translation>Not ready</translation>
+    </message>
+    <message id="gallery-cover-device">
+        <source></source>
+        <translation>On the device</translation>
+    </message>
+    <message id="gallery-cover-device-note">
+        <source></source>
+        <translation>The daemon on the system bus sees the cover and tells the page.</translation>
+    </message>
+    <message id="gallery-cover-attach">
+        <source></source>
+        <translation>Attach a cover</translation>
+    </message>
+    <message id="gallery-cover-remove">
+        <source></source>
+        <translation>Remove the cover</translation>
+    </message>
+    <message id="gallery-device">
+        <source></source>
+        <translation>Device</translation>
+    </message>
+    <message id="gallery-device-about">
+        <source></source>
+        <translation>See the Bluetooth address, the modem variant and whether Android is supported.</translation>
+    </message>
+    <message id="gallery-device-radio">
+        <source></source>
+        <translation>Radio</translation>
+    </message>
+    <message id="gallery-device-bluetooth">
+        <source></source>
+        <translation>Bluetooth address</translation>
+    </message>
+    <message id="gallery-device-modem">
+        <source></source>
+        <translation>Modem variant</translation>
+    </message>
+    <message id="gallery-device-unknown">
+        <source></source>
+        <translation>Unknown</translation>
+    </message>
+    <message id="gallery-device-storage">
+        <source></source>
+        <translation>Storage</translation>
+    </message>
+    <message id="gallery-device-android">
+        <source></source>
+        <translation>Android data folders</translation>
+    </message>
+    <message id="gallery-device-android-shown">
+        <source></source>
+        <translation>Shown: Android support is installed</translation>
+    </message>
+    <message id="gallery-device-android-hidden">
+        <source></source>
+        <translation>Hidden: no Android support</translation>
+    </message>
+    <message id="gallery-terms">
+        <source></source>
+        <translation>Terms of use</translation>
+    </message>
+    <message id="gallery-terms-about">
+        <source></source>
+        <translation>Read the terms of the platform and of the vendor in a language of your choice.</translation>
+    </message>
+    <message id="gallery-terms-locale">
+        <source></source>
+        <translation>Language of the terms</translation>
+    </message>
+    <message id="gallery-terms-locale-note">
+        <source></source>
+        <translation>Terms that lack the language are shown in English.</translation>
+    </message>
+    <message id="gallery-terms-none">
+        <source></source>
+        <translation>No terms</translation>
+    </message>
+    <message id="gallery-text-files">
+        <source></source>
+        <translation>Text files</translation>
+    </message>
+    <message id="gallery-text-files-about">
+        <source></source>
+        <translation>Read a file, and a folder whose files become one text.</translation>
+    </message>
+    <message id="gallery-text-files-file">
+        <source></source>
+        <translation>A file</translation>
+    </message>
+    <message id="gallery-text-files-note">
+        <source></source>
+        <translation>Line breaks of a file are dropped: a text with paragraphs is written in HTML.</translation>
+    </message>
+    <message id="gallery-text-files-folder">
+        <source></source>
+        <translation>A folder</translation>
+    </message>
+    <message id="gallery-text-files-prefix">
+        <source></source>
+        <translation>Licences of the sample files:</translation>
+    </message>
 </context>
 </TS>

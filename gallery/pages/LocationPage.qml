@@ -1,0 +1,129 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+import QtQuick 2.15
+import QtQuick.Controls 2.15
+import QtQuick.Layouts 1.15
+import com.marlo.settings.system 1.0
+import ".."
+
+/*
+    The location services: their switches, a set of them that is saved and restored, and the terms
+    that the user agrees to before an online service can be switched.
+*/
+GalleryPage {
+    // By their numbers, since platforms have different names for them.
+    enum OnlineState { NotAgreed, Disabled, Enabled }
+
+    readonly property bool mlsAgreed: location.mlsOnlineState !== LocationPage.OnlineState.NotAgreed
+    readonly property bool hereAgreed: location.hereState !== LocationPage.OnlineState.NotAgreed
+
+    title: qsTrId("gallery-location")
+    ready: location.gpsEnabled && mlsAgreed && mlsTerms.text !== "" && hereTerms.text !== ""
+
+    function demonstrate() {
+        location.gpsEnabled = true;
+        location.mlsEnabled = true;
+        location.mlsOnlineState = LocationPage.OnlineState.Enabled;
+        location.saveCustomSettings();
+        location.gpsEnabled = false;
+        location.restoreCustomSettings();
+    }
+
+    LocationConfiguration {
+        id: location
+    }
+
+    Section {
+        heading: qsTrId("gallery-location-services")
+
+        SwitchDelegate {
+            Layout.fillWidth: true
+            text: qsTrId("gallery-location-gps")
+            checked: location.gpsEnabled
+            onToggled: location.gpsEnabled = checked
+        }
+        SwitchDelegate {
+            Layout.fillWidth: true
+            text: qsTrId("gallery-location-mls")
+            checked: location.mlsEnabled
+            onToggled: location.mlsEnabled = checked
+        }
+        SwitchDelegate {
+            Layout.fillWidth: true
+            text: qsTrId("gallery-location-mls-online")
+            enabled: mlsAgreed
+            checked: location.mlsOnlineState === LocationPage.OnlineState.Enabled
+            onToggled: location.mlsOnlineState = checked ? LocationPage.OnlineState.Enabled
+                                                         : LocationPage.OnlineState.Disabled
+        }
+        SwitchDelegate {
+            Layout.fillWidth: true
+            text: qsTrId("gallery-location-here")
+            enabled: hereAgreed
+            checked: location.hereState === LocationPage.OnlineState.Enabled
+            onToggled: location.hereState = checked ? LocationPage.OnlineState.Enabled
+                                                    : LocationPage.OnlineState.Disabled
+        }
+        Note {
+            visible: !mlsAgreed || !hereAgreed
+            text: qsTrId("gallery-location-agree-first")
+        }
+    }
+
+    Section {
+        heading: qsTrId("gallery-location-custom")
+
+        SwitchDelegate {
+            Layout.fillWidth: true
+            text: qsTrId("gallery-location-custom-enabled")
+            checked: location.customSettingsEnabled
+            onToggled: location.customSettingsEnabled = checked
+        }
+        RowLayout {
+            Button {
+                Layout.fillWidth: true
+                Layout.preferredWidth: 1
+                text: qsTrId("gallery-location-save")
+                onClicked: location.saveCustomSettings()
+            }
+            Button {
+                Layout.fillWidth: true
+                Layout.preferredWidth: 1
+                text: qsTrId("gallery-location-restore")
+                onClicked: location.restoreCustomSettings()
+            }
+        }
+        Note {
+            text: qsTrId("gallery-location-custom-note")
+        }
+    }
+
+    Section {
+        heading: qsTrId("gallery-location-mls-terms")
+
+        Paragraph {
+            id: mlsTerms
+            text: location.mlsOnlineAgreementText
+        }
+        Button {
+            text: mlsAgreed ? qsTrId("gallery-location-withdraw") : qsTrId("gallery-location-agree")
+            onClicked: location.mlsOnlineState = mlsAgreed ? LocationPage.OnlineState.NotAgreed
+                                                           : LocationPage.OnlineState.Enabled
+        }
+    }
+
+    Section {
+        heading: qsTrId("gallery-location-here-terms")
+
+        Paragraph {
+            id: hereTerms
+            text: location.hereAgreementText
+        }
+        Button {
+            text: hereAgreed ? qsTrId("gallery-location-withdraw") : qsTrId("gallery-location-agree")
+            onClicked: location.hereState = hereAgreed ? LocationPage.OnlineState.NotAgreed
+                                                       : LocationPage.OnlineState.Enabled
+        }
+    }
+}

@@ -1,0 +1,70 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+import QtQuick 2.15
+import QtQuick.Controls 2.15
+import QtQuick.Layouts 1.15
+import com.marlo.settings.system 1.0
+import gallery.stage 1.0
+import ".."
+
+/*
+    The terms of use of the platform and of the vendor, in a language that can be chosen.
+*/
+GalleryPage {
+    readonly property var localeNames: ["en_GB", "fi_FI.UTF-8", "de_DE.UTF-8"]
+    property string localeName: localeNames.find(name => name.startsWith(Stage.language))
+
+    // Each a title and a body, or nothing.
+    readonly property var platformTerms: manager.platformTermsOfUse(localeName)
+    readonly property var vendorSummary: manager.vendorTermsSummary(localeName)
+    readonly property var vendorTerms: manager.vendorTermsOfUse(localeName)
+
+    title: qsTrId("gallery-terms")
+    ready: platformTerms.length === 2 && vendorSummary.length === 2 && vendorTerms.length === 2
+
+    TermsOfUseManager {
+        id: manager
+        vendorPath: "/usr/share/marlo-settings/vendor-eula"
+    }
+
+    Section {
+        heading: qsTrId("gallery-terms-locale")
+
+        ComboBox {
+            Layout.fillWidth: true
+            model: localeNames
+            currentIndex: localeNames.indexOf(localeName)
+            onActivated: localeName = localeNames[index]
+        }
+        Note {
+            text: qsTrId("gallery-terms-locale-note")
+        }
+    }
+
+    Section {
+        heading: platformTerms[0] || qsTrId("gallery-terms-none")
+
+        Paragraph {
+            text: platformTerms[1] || ""
+        }
+    }
+
+    Section {
+        visible: manager.hasVendorTermsOfUse
+        heading: vendorSummary[0] || qsTrId("gallery-terms-none")
+
+        Paragraph {
+            text: vendorSummary[1] || ""
+        }
+    }
+
+    Section {
+        visible: manager.hasVendorTermsOfUse
+        heading: vendorTerms[0] || qsTrId("gallery-terms-none")
+
+        Paragraph {
+            text: vendorTerms[1] || ""
+        }
+    }
+}

@@ -8,10 +8,13 @@
 
 #include <QJsonObject>
 #include <QPluginLoader>
+#include <QProcess>
 #include <QQmlComponent>
 #include <QQmlEngine>
 #include <QQmlExtensionInterface>
 #include <QQmlExtensionPlugin>
+#include <QRegularExpression>
+#include <QTemporaryFile>
 #include <QtTest>
 
 class TestPlugin : public QObject
@@ -24,6 +27,7 @@ private Q_SLOTS:
 
     void metaData();
     void oneInstance();
+    void exactlyTheseTypes();
     void typesAreCreatable_data();
     void typesAreCreatable();
     void oneTextFileReaderPerEngine();
@@ -127,6 +131,38 @@ void TestPlugin::oneInstance()
     delete instance.data();
     QVERIFY(instance == nullptr);
     QVERIFY(loader.instance() != nullptr);
+}
+
+void TestPlugin::exactlyTheseTypes()
+{
+#ifdef __SANITIZE_ADDRESS__
+    QSKIP("Debian's qmlplugindump is built without the sanitizer and cannot load the plugin");
+#endif
+    QTemporaryFile noDependencies;
+    QVERIFY(noDependencies.open() && noDependencies.write("[]") == 2 && noDependencies.flush());
+    QProcess dump;
+    dump.start(QStringLiteral("/usr/lib/qt5/bin/qmlplugindump"),
+               {QStringLiteral("-nonrelocatable"), QStringLiteral("-noinstantiate"),
+                QStringLiteral("-dependencies"), noDependencies.fileName(),
+                QStringLiteral("com.marlo.settings.system"), QStringLiteral("1.0"),
+                QStringLiteral(QML_BUILD_DIR)});
+    QVERIFY2(dump.waitForFinished() && dump.exitCode() == 0, dump.readAllStandardError());
+
+    QStringList exports;
+    const QString types = QString::fromUtf8(dump.readAllStandardOutput());
+    const QRegularExpression name(QStringLiteral("\"(com\\.marlo\\.settings\\.system/[^\"]+)\""));
+    for (auto it = name.globalMatch(types); it.hasNext();) {
+        exports.append(it.next().captured(1).section(QLatin1Char('/'), 1));
+    }
+    exports.sort();
+    QStringList expected;
+    for (const char *type :
+         {"AndroidSupport", "BluetoothInfo", "EventsWidgetsModel", "KivInfo",
+          "LocationConfiguration", "MemoryCardFormatter", "ModemFeatures", "QuickActionsModel",
+          "TermsOfUseManager", "TextFileReader", "TitlesView"}) {
+        expected.append(QString::fromLatin1(type) + QStringLiteral(" 1.0"));
+    }
+    QCOMPARE(exports, expected);
 }
 
 void TestPlugin::typesAreCreatable_data()

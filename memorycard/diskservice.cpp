@@ -9,12 +9,12 @@
 
 namespace {
 
-constexpr QLatin1String service("org.freedesktop.UDisks2");
-constexpr QLatin1String objectPath("/org/freedesktop/UDisks2/block_devices/%1");
-constexpr QLatin1String interface("org.freedesktop.UDisks2.Filesystem");
-constexpr QLatin1String mountMethod("Mount");
-constexpr QLatin1String unmountMethod("Unmount");
-constexpr QLatin1String fileSystemTypeOption("fstype");
+const QLatin1String service("org.freedesktop.UDisks2");
+const QLatin1String objectPath("/org/freedesktop/UDisks2/block_devices/%1");
+const QLatin1String interface("org.freedesktop.UDisks2.Filesystem");
+const QLatin1String mountMethod("Mount");
+const QLatin1String unmountMethod("Unmount");
+const QLatin1String fileSystemTypeOption("fstype");
 
 struct ErrorName {
     MemoryCardFormatter::MountError code;

@@ -18,21 +18,21 @@ namespace {
 
 Q_LOGGING_CATEGORY(lcMemoryCardLog, "org.tarnwickos.settings.memorycard", QtWarningMsg)
 
-constexpr QLatin1String helperProgram("/usr/libexec/sdcardhelper");
-constexpr QLatin1String helperFormatVfat("format_vfat");
-constexpr QLatin1String helperFormatExt4("format_ext4");
-constexpr QLatin1String helperProbe("probe");
+const QLatin1String helperProgram("/usr/libexec/sdcardhelper");
+const QLatin1String helperFormatVfat("format_vfat");
+const QLatin1String helperFormatExt4("format_ext4");
+const QLatin1String helperProbe("probe");
 
-constexpr QLatin1String vfat("vfat");
-constexpr QLatin1String ext4("ext4");
-constexpr QLatin1String mkfsVfat("/sbin/mkfs.vfat");
-constexpr QLatin1String mkfsExt4("/sbin/mkfs.ext4");
+const QLatin1String vfat("vfat");
+const QLatin1String ext4("ext4");
+const QLatin1String mkfsVfat("/sbin/mkfs.vfat");
+const QLatin1String mkfsExt4("/sbin/mkfs.ext4");
 
 // Unmounting writes out whatever a slow card has not taken yet.
 constexpr int requestTimeout = 5 * 60 * 1000; // ms
 
-constexpr QLatin1String alreadyMounted("org.freedesktop.UDisks2.Error.AlreadyMounted");
-constexpr QLatin1String alreadyUnmounting("org.freedesktop.UDisks2.Error.AlreadyUnmounting");
+const QLatin1String alreadyMounted("org.freedesktop.UDisks2.Error.AlreadyMounted");
+const QLatin1String alreadyUnmounting("org.freedesktop.UDisks2.Error.AlreadyUnmounting");
 
 // Without a system bus a call would end without an answer.
 QDBusPendingCall send(const QDBusMessage &call)

@@ -39,10 +39,10 @@
 
 namespace {
 
-constexpr QLatin1String service("org.freedesktop.UDisks2");
-constexpr QLatin1String rootPath("/org/freedesktop/UDisks2");
-constexpr QLatin1String errorPrefix("org.freedesktop.UDisks2.Error.");
-constexpr QLatin1String mountPoint("/media/card");
+const QLatin1String service("org.freedesktop.UDisks2");
+const QLatin1String rootPath("/org/freedesktop/UDisks2");
+const QLatin1String errorPrefix("org.freedesktop.UDisks2.Error.");
+const QLatin1String mountPoint("/media/card");
 constexpr int slowness = 1000; // ms
 
 const QStringList methods = {QStringLiteral("Mount"), QStringLiteral("Unmount")};

@@ -21,7 +21,7 @@ struct ErrorName {
     QLatin1String name;
 };
 
-constexpr std::array<ErrorName, 15> errorNames = {{
+const std::array<ErrorName, 15> errorNames = {{
     {MemoryCardFormatter::ErrorFailed, QLatin1String("org.freedesktop.UDisks2.Error.Failed")},
     {MemoryCardFormatter::ErrorCancelled, QLatin1String("org.freedesktop.UDisks2.Error.Cancelled")},
     {MemoryCardFormatter::ErrorAlreadyCancelled,

@@ -87,6 +87,7 @@ Q_SIGNALS:
     void devicePathChanged();
     void filesystemTypeChanged();
     void busyChanged();
+    // Users connect to the signatures as they stand: clazy:exclude=fully-qualified-moc-types
     void mountError(MountError error);
     void unmountError(MountError error);
 

@@ -95,14 +95,14 @@ bool holdsPackedValues(const QByteArray &data)
 bool isPlainIni(const QString &path)
 {
     // Whatever lies there, opening it like this waits for nobody.
-    const int descriptor
-        = open(QFile::encodeName(path).constData(), O_RDONLY | O_NONBLOCK | O_NOCTTY | O_CLOEXEC);
+    const int descriptor =
+        open(QFile::encodeName(path).constData(), O_RDONLY | O_NONBLOCK | O_NOCTTY | O_CLOEXEC);
     if (descriptor < 0) {
         return true;
     }
     struct stat entry = {};
-    bool isPlain = fstat(descriptor, &entry) == 0 && S_ISREG(entry.st_mode)
-        && entry.st_size <= maximumSize;
+    bool isPlain =
+        fstat(descriptor, &entry) == 0 && S_ISREG(entry.st_mode) && entry.st_size <= maximumSize;
     if (isPlain) {
         QByteArray data(int(entry.st_size), Qt::Uninitialized);
         data.truncate(int(qMax(ssize_t(0), read(descriptor, data.data(), size_t(data.size())))));

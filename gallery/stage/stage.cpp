@@ -6,6 +6,7 @@
 #include <QCoreApplication>
 #include <QDBusConnection>
 #include <QEvent>
+#include <QFile>
 #include <QLocale>
 #include <QQmlEngine>
 #include <QQmlError>
@@ -22,6 +23,9 @@ const QLatin1String peerSignal("CallReceived");
 const QString coverIdProperty = QStringLiteral("KIVID");
 const QString coverReadyProperty = QStringLiteral("Ready");
 const QString sampleCover = QStringLiteral("MARLO-COVER-07");
+
+// What the definition of the steps widget (gallery/sample) waits for.
+const QString stepCounterFile = QStringLiteral("/usr/libexec/step-counter");
 
 } // namespace
 
@@ -70,6 +74,23 @@ void Stage::tellOfCover()
     m_coverDaemon.answer(coverIdProperty, {id});
     m_coverDaemon.answer(coverReadyProperty, {ready});
     m_coverDaemon.sendChanges({{coverIdProperty, id}, {coverReadyProperty, ready}});
+}
+
+bool Stage::stepCounterInstalled() const
+{
+    return QFile::exists(stepCounterFile);
+}
+
+void Stage::setStepCounterInstalled(bool installed)
+{
+    if (installed == stepCounterInstalled()) {
+        return;
+    }
+    QFile file(stepCounterFile);
+    if (installed ? !file.open(QIODevice::WriteOnly) : !file.remove()) {
+        qmlWarning(this) << stepCounterFile << ": " << file.errorString();
+    }
+    Q_EMIT stepCounterInstalledChanged();
 }
 
 void Stage::reportWarnings(const QList<QQmlError> &errors)

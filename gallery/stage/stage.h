@@ -14,8 +14,8 @@ class QQmlError;
 
 /*
     Plays the device around the gallery's pages: changes the language as a home screen does, tells
-    which calls the sample services on the session bus receive, and attaches and removes a smart
-    back cover.
+    which calls the sample services on the session bus receive, attaches and removes a smart back
+    cover, and has a step counter or none.
 */
 class Stage : public QObject
 {
@@ -24,6 +24,9 @@ class Stage : public QObject
     Q_PROPERTY(QString language READ language WRITE setLanguage NOTIFY languageChanged)
     Q_PROPERTY(
         bool coverAttached READ coverAttached WRITE setCoverAttached NOTIFY coverAttachedChanged)
+    // Whether there is the file that makes the steps widget available.
+    Q_PROPERTY(bool stepCounterInstalled READ stepCounterInstalled WRITE setStepCounterInstalled
+                   NOTIFY stepCounterInstalledChanged)
 
 public:
     explicit Stage(QQmlEngine *engine);
@@ -32,10 +35,13 @@ public:
     void setLanguage(const QString &language);
     bool coverAttached() const { return m_coverAttached; }
     void setCoverAttached(bool attached);
+    bool stepCounterInstalled() const;
+    void setStepCounterInstalled(bool installed);
 
 Q_SIGNALS:
     void languageChanged();
     void coverAttachedChanged();
+    void stepCounterInstalledChanged();
     void callReceived(const QString &service, const QString &method, const QStringList &arguments);
     // A mistake in QML. What an object of a module reports for information is none.
     void warning(const QString &text);

@@ -59,6 +59,38 @@
         <source></source>
         <translation>Verfügbare Aktionen</translation>
     </message>
+    <message id="gallery-events-widgets">
+        <source></source>
+        <translation>Ereignis-Widgets</translation>
+    </message>
+    <message id="gallery-events-widgets-about">
+        <source></source>
+        <translation>Widgets für die Ereignisansicht wählen und sehen, welche verfügbar sind.</translation>
+    </message>
+    <message id="gallery-events-widgets-available">
+        <source></source>
+        <translation>In der Ereignisansicht</translation>
+    </message>
+    <message id="gallery-events-widgets-unavailable">
+        <source></source>
+        <translation>Auf diesem Gerät nicht verfügbar</translation>
+    </message>
+    <message id="gallery-events-widgets-first-choice">
+        <source></source>
+        <translation>Bis zur ersten Wahl gilt für jedes Widget seine Vorgabe. Die erste Wahl schaltet alle anderen ein.</translation>
+    </message>
+    <message id="gallery-events-widgets-device">
+        <source></source>
+        <translation>Das Gerät</translation>
+    </message>
+    <message id="gallery-events-widgets-step-counter">
+        <source></source>
+        <translation>Schrittzähler</translation>
+    </message>
+    <message id="gallery-events-widgets-step-counter-note">
+        <source></source>
+        <translation>Das Schritte-Widget ist verfügbar, solange es die Datei des Schrittzählers gibt. Der Schalter legt sie an und entfernt sie.</translation>
+    </message>
     <message id="gallery-sample-new-alarm">
         <source></source>
         <translation>Neuer Wecker</translation>

@@ -59,6 +59,38 @@
         <source></source>
         <translation>Saatavilla olevat toiminnot</translation>
     </message>
+    <message id="gallery-events-widgets">
+        <source></source>
+        <translation>Tapahtumawidgetit</translation>
+    </message>
+    <message id="gallery-events-widgets-about">
+        <source></source>
+        <translation>Valitse tapahtumanäkymän widgetit ja katso, mitkä ovat saatavilla.</translation>
+    </message>
+    <message id="gallery-events-widgets-available">
+        <source></source>
+        <translation>Tapahtumanäkymässä</translation>
+    </message>
+    <message id="gallery-events-widgets-unavailable">
+        <source></source>
+        <translation>Ei saatavilla tässä laitteessa</translation>
+    </message>
+    <message id="gallery-events-widgets-first-choice">
+        <source></source>
+        <translation>Ensimmäiseen valintaan asti widgetit noudattavat oletuksiaan. Ensimmäinen valinta ottaa kaikki muut käyttöön.</translation>
+    </message>
+    <message id="gallery-events-widgets-device">
+        <source></source>
+        <translation>Laite</translation>
+    </message>
+    <message id="gallery-events-widgets-step-counter">
+        <source></source>
+        <translation>Askelmittari</translation>
+    </message>
+    <message id="gallery-events-widgets-step-counter-note">
+        <source></source>
+        <translation>Askelwidget on saatavilla, kun askelmittarin tiedosto on olemassa. Kytkin luo ja poistaa tiedoston.</translation>
+    </message>
     <message id="gallery-sample-new-alarm">
         <source></source>
         <translation>Uusi herätys</translation>

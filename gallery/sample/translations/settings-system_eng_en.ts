@@ -59,6 +59,38 @@
         <source></source>
         <translation>Available actions</translation>
     </message>
+    <message id="gallery-events-widgets">
+        <source></source>
+        <translation>Events widgets</translation>
+    </message>
+    <message id="gallery-events-widgets-about">
+        <source></source>
+        <translation>Choose the widgets of the events screen, and see which are available.</translation>
+    </message>
+    <message id="gallery-events-widgets-available">
+        <source></source>
+        <translation>On the events screen</translation>
+    </message>
+    <message id="gallery-events-widgets-unavailable">
+        <source></source>
+        <translation>Not available on this device</translation>
+    </message>
+    <message id="gallery-events-widgets-first-choice">
+        <source></source>
+        <translation>Until the first choice, each widget has its default. The first choice enables all others.</translation>
+    </message>
+    <message id="gallery-events-widgets-device">
+        <source></source>
+        <translation>The device</translation>
+    </message>
+    <message id="gallery-events-widgets-step-counter">
+        <source></source>
+        <translation>Step counter</translation>
+    </message>
+    <message id="gallery-events-widgets-step-counter-note">
+        <source></source>
+        <translation>The steps widget is available while the file of the step counter is there. The switch makes and removes the file.</translation>
+    </message>
     <message id="gallery-sample-new-alarm">
         <source></source>
         <translation>New alarm</translation>

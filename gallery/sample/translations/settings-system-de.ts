@@ -91,6 +91,26 @@
         <source></source>
         <translation>Das Schritte-Widget ist verfügbar, solange es die Datei des Schrittzählers gibt. Der Schalter legt sie an und entfernt sie.</translation>
     </message>
+    <message id="gallery-titles">
+        <source></source>
+        <translation>Titel als Satz</translation>
+    </message>
+    <message id="gallery-titles-about">
+        <source></source>
+        <translation>Was eingeschaltet ist, aufgezählt in der gewählten Sprache.</translation>
+    </message>
+    <message id="gallery-titles-widgets">
+        <source></source>
+        <translation>Eingeschaltete Widgets</translation>
+    </message>
+    <message id="gallery-titles-actions">
+        <source></source>
+        <translation>Eingeschaltete Schnellaktionen</translation>
+    </message>
+    <message id="gallery-titles-none">
+        <source></source>
+        <translation>Nichts ist eingeschaltet.</translation>
+    </message>
     <message id="gallery-sample-new-alarm">
         <source></source>
         <translation>Neuer Wecker</translation>

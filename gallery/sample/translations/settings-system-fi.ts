@@ -91,6 +91,26 @@
         <source></source>
         <translation>Askelwidget on saatavilla, kun askelmittarin tiedosto on olemassa. Kytkin luo ja poistaa tiedoston.</translation>
     </message>
+    <message id="gallery-titles">
+        <source></source>
+        <translation>Nimet lauseena</translation>
+    </message>
+    <message id="gallery-titles-about">
+        <source></source>
+        <translation>Käytössä olevat yhtenä luettelona valitulla kielellä.</translation>
+    </message>
+    <message id="gallery-titles-widgets">
+        <source></source>
+        <translation>Käytössä olevat widgetit</translation>
+    </message>
+    <message id="gallery-titles-actions">
+        <source></source>
+        <translation>Käytössä olevat pikatoiminnot</translation>
+    </message>
+    <message id="gallery-titles-none">
+        <source></source>
+        <translation>Mikään ei ole käytössä.</translation>
+    </message>
     <message id="gallery-sample-new-alarm">
         <source></source>
         <translation>Uusi herätys</translation>

@@ -91,6 +91,26 @@
         <source></source>
         <translation>The steps widget is available while the file of the step counter is there. The switch makes and removes the file.</translation>
     </message>
+    <message id="gallery-titles">
+        <source></source>
+        <translation>Titles in a sentence</translation>
+    </message>
+    <message id="gallery-titles-about">
+        <source></source>
+        <translation>What is enabled, in one sentence of the language.</translation>
+    </message>
+    <message id="gallery-titles-widgets">
+        <source></source>
+        <translation>Enabled events widgets</translation>
+    </message>
+    <message id="gallery-titles-actions">
+        <source></source>
+        <translation>Enabled quick actions</translation>
+    </message>
+    <message id="gallery-titles-none">
+        <source></source>
+        <translation>None is enabled.</translation>
+    </message>
     <message id="gallery-sample-new-alarm">
         <source></source>
         <translation>New alarm</translation>

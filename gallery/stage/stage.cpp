@@ -27,9 +27,13 @@ const QString sampleCover = QStringLiteral("MARLO-COVER-07");
 // What the definition of the steps widget (gallery/sample) waits for.
 const QString stepCounterFile = QStringLiteral("/usr/libexec/step-counter");
 
+const QString diskService = QStringLiteral("org.freedesktop.UDisks2");
+const QLatin1String diskServiceErrorPrefix("org.freedesktop.UDisks2.Error.");
+
 } // namespace
 
-Stage::Stage(QQmlEngine *engine) : m_engine(engine)
+Stage::Stage(QQmlEngine *engine)
+    : m_engine(engine), m_diskService(QDBusConnection::SystemBus, diskService)
 {
     connect(engine, &QQmlEngine::warnings, this, &Stage::reportWarnings);
     if (!QDBusConnection::sessionBus().connect(
@@ -91,6 +95,20 @@ void Stage::setStepCounterInstalled(bool installed)
         qmlWarning(this) << stepCounterFile << ": " << file.errorString();
     }
     Q_EMIT stepCounterInstalledChanged();
+}
+
+void Stage::setDiskServiceError(const QString &error)
+{
+    if (error == m_diskServiceError) {
+        return;
+    }
+    m_diskServiceError = error;
+    if (error.isEmpty()) {
+        m_diskService.setAnswer(RecordingService::Answer::Reply);
+    } else {
+        m_diskService.setAnswer(RecordingService::Answer::Error, diskServiceErrorPrefix + error);
+    }
+    Q_EMIT diskServiceErrorChanged();
 }
 
 void Stage::reportWarnings(const QList<QQmlError> &errors)

@@ -111,6 +111,138 @@
         <source></source>
         <translation>Nichts ist eingeschaltet.</translation>
     </message>
+    <message id="gallery-card">
+        <source></source>
+        <translation>Speicherkarte</translation>
+    </message>
+    <message id="gallery-card-about">
+        <source></source>
+        <translation>Eine Karte formatieren, einhängen und aushängen und die Schritte verfolgen.</translation>
+    </message>
+    <message id="gallery-card-state">
+        <source></source>
+        <translation>Karte</translation>
+    </message>
+    <message id="gallery-card-status">
+        <source></source>
+        <translation>Zustand</translation>
+    </message>
+    <message id="gallery-card-file-system">
+        <source></source>
+        <translation>Dateisystem</translation>
+    </message>
+    <message id="gallery-card-unknown">
+        <source></source>
+        <translation>Noch nicht bekannt</translation>
+    </message>
+    <message id="gallery-card-format">
+        <source></source>
+        <translation>Formatieren: %1</translation>
+    </message>
+    <message id="gallery-card-mount">
+        <source></source>
+        <translation>Einhängen</translation>
+    </message>
+    <message id="gallery-card-unmount">
+        <source></source>
+        <translation>Aushängen</translation>
+    </message>
+    <message id="gallery-card-question">
+        <source></source>
+        <translation>Karte löschen?</translation>
+    </message>
+    <message id="gallery-card-question-text">
+        <source></source>
+        <translation>Alles auf der Karte geht verloren.</translation>
+    </message>
+    <message id="gallery-card-erase">
+        <source></source>
+        <translation>Löschen</translation>
+    </message>
+    <message id="gallery-card-cancel">
+        <source></source>
+        <translation>Abbrechen</translation>
+    </message>
+    <message id="gallery-card-steps">
+        <source></source>
+        <translation>Schritte</translation>
+    </message>
+    <message id="gallery-card-idle">
+        <source></source>
+        <translation>Bereit</translation>
+    </message>
+    <message id="gallery-card-unmounting">
+        <source></source>
+        <translation>Wird ausgehängt</translation>
+    </message>
+    <message id="gallery-card-formatting">
+        <source></source>
+        <translation>Wird formatiert</translation>
+    </message>
+    <message id="gallery-card-removing-files">
+        <source></source>
+        <translation>Dateien werden entfernt</translation>
+    </message>
+    <message id="gallery-card-mounting">
+        <source></source>
+        <translation>Wird eingehängt</translation>
+    </message>
+    <message id="gallery-card-probing">
+        <source></source>
+        <translation>Karte wird untersucht</translation>
+    </message>
+    <message id="gallery-card-error">
+        <source></source>
+        <translation>Fehlgeschlagen</translation>
+    </message>
+    <message id="gallery-card-failed">
+        <source></source>
+        <translation>Die Karte konnte nicht ein- oder ausgehängt werden.</translation>
+    </message>
+    <message id="gallery-card-device-busy">
+        <source></source>
+        <translation>Die Karte wird benutzt. Schließen, was sie benutzt, und noch einmal versuchen.</translation>
+    </message>
+    <message id="gallery-card-already-mounted">
+        <source></source>
+        <translation>Die Karte ist schon eingehängt.</translation>
+    </message>
+    <message id="gallery-card-not-mounted">
+        <source></source>
+        <translation>Die Karte ist nicht eingehängt.</translation>
+    </message>
+    <message id="gallery-card-other-user">
+        <source></source>
+        <translation>Jemand anderes hat die Karte eingehängt.</translation>
+    </message>
+    <message id="gallery-card-not-authorized">
+        <source></source>
+        <translation>Das ist nicht erlaubt.</translation>
+    </message>
+    <message id="gallery-card-not-supported">
+        <source></source>
+        <translation>Die Karte lässt sich auf diesem Gerät nicht einhängen.</translation>
+    </message>
+    <message id="gallery-card-timed-out">
+        <source></source>
+        <translation>Die Karte hat zu lange gebraucht.</translation>
+    </message>
+    <message id="gallery-card-service">
+        <source></source>
+        <translation>Datenträgerdienst</translation>
+    </message>
+    <message id="gallery-card-in-use">
+        <source></source>
+        <translation>Karte wird benutzt</translation>
+    </message>
+    <message id="gallery-card-forbidden">
+        <source></source>
+        <translation>Niemand darf das</translation>
+    </message>
+    <message id="gallery-card-service-note">
+        <source></source>
+        <translation>Das ist keine echte Karte: die Galerie spielt den Datenträgerdienst und das Programm, das formatiert.</translation>
+    </message>
     <message id="gallery-sample-new-alarm">
         <source></source>
         <translation>Neuer Wecker</translation>

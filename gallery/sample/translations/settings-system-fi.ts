@@ -111,6 +111,138 @@
         <source></source>
         <translation>Mikään ei ole käytössä.</translation>
     </message>
+    <message id="gallery-card">
+        <source></source>
+        <translation>Muistikortti</translation>
+    </message>
+    <message id="gallery-card-about">
+        <source></source>
+        <translation>Alusta kortti, liitä ja irrota se ja seuraa vaiheita.</translation>
+    </message>
+    <message id="gallery-card-state">
+        <source></source>
+        <translation>Kortti</translation>
+    </message>
+    <message id="gallery-card-status">
+        <source></source>
+        <translation>Tila</translation>
+    </message>
+    <message id="gallery-card-file-system">
+        <source></source>
+        <translation>Tiedostojärjestelmä</translation>
+    </message>
+    <message id="gallery-card-unknown">
+        <source></source>
+        <translation>Ei vielä tiedossa</translation>
+    </message>
+    <message id="gallery-card-format">
+        <source></source>
+        <translation>Alusta: %1</translation>
+    </message>
+    <message id="gallery-card-mount">
+        <source></source>
+        <translation>Liitä</translation>
+    </message>
+    <message id="gallery-card-unmount">
+        <source></source>
+        <translation>Irrota</translation>
+    </message>
+    <message id="gallery-card-question">
+        <source></source>
+        <translation>Tyhjennetäänkö kortti?</translation>
+    </message>
+    <message id="gallery-card-question-text">
+        <source></source>
+        <translation>Kaikki kortilla oleva katoaa.</translation>
+    </message>
+    <message id="gallery-card-erase">
+        <source></source>
+        <translation>Tyhjennä</translation>
+    </message>
+    <message id="gallery-card-cancel">
+        <source></source>
+        <translation>Peruuta</translation>
+    </message>
+    <message id="gallery-card-steps">
+        <source></source>
+        <translation>Vaiheet</translation>
+    </message>
+    <message id="gallery-card-idle">
+        <source></source>
+        <translation>Valmis</translation>
+    </message>
+    <message id="gallery-card-unmounting">
+        <source></source>
+        <translation>Irrotetaan</translation>
+    </message>
+    <message id="gallery-card-formatting">
+        <source></source>
+        <translation>Alustetaan</translation>
+    </message>
+    <message id="gallery-card-removing-files">
+        <source></source>
+        <translation>Poistetaan tiedostoja</translation>
+    </message>
+    <message id="gallery-card-mounting">
+        <source></source>
+        <translation>Liitetään</translation>
+    </message>
+    <message id="gallery-card-probing">
+        <source></source>
+        <translation>Tutkitaan korttia</translation>
+    </message>
+    <message id="gallery-card-error">
+        <source></source>
+        <translation>Epäonnistui</translation>
+    </message>
+    <message id="gallery-card-failed">
+        <source></source>
+        <translation>Korttia ei voitu liittää tai irrottaa.</translation>
+    </message>
+    <message id="gallery-card-device-busy">
+        <source></source>
+        <translation>Kortti on käytössä. Sulje sitä käyttävät sovellukset ja yritä uudelleen.</translation>
+    </message>
+    <message id="gallery-card-already-mounted">
+        <source></source>
+        <translation>Kortti on jo liitetty.</translation>
+    </message>
+    <message id="gallery-card-not-mounted">
+        <source></source>
+        <translation>Korttia ei ole liitetty.</translation>
+    </message>
+    <message id="gallery-card-other-user">
+        <source></source>
+        <translation>Toinen käyttäjä on liittänyt kortin.</translation>
+    </message>
+    <message id="gallery-card-not-authorized">
+        <source></source>
+        <translation>Tämä ei ole sallittua.</translation>
+    </message>
+    <message id="gallery-card-not-supported">
+        <source></source>
+        <translation>Korttia ei voi liittää tähän laitteeseen.</translation>
+    </message>
+    <message id="gallery-card-timed-out">
+        <source></source>
+        <translation>Kortin käsittely kesti liian kauan.</translation>
+    </message>
+    <message id="gallery-card-service">
+        <source></source>
+        <translation>Levypalvelu</translation>
+    </message>
+    <message id="gallery-card-in-use">
+        <source></source>
+        <translation>Kortti on käytössä</translation>
+    </message>
+    <message id="gallery-card-forbidden">
+        <source></source>
+        <translation>Kukaan ei saa tehdä tätä</translation>
+    </message>
+    <message id="gallery-card-service-note">
+        <source></source>
+        <translation>Tämä ei ole oikea kortti: galleria esittää levypalvelua ja alustusohjelmaa.</translation>
+    </message>
     <message id="gallery-sample-new-alarm">
         <source></source>
         <translation>Uusi herätys</translation>

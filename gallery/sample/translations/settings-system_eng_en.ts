@@ -111,6 +111,138 @@
         <source></source>
         <translation>None is enabled.</translation>
     </message>
+    <message id="gallery-card">
+        <source></source>
+        <translation>Memory card</translation>
+    </message>
+    <message id="gallery-card-about">
+        <source></source>
+        <translation>Format a card, mount and unmount it, and follow the steps.</translation>
+    </message>
+    <message id="gallery-card-state">
+        <source></source>
+        <translation>Card</translation>
+    </message>
+    <message id="gallery-card-status">
+        <source></source>
+        <translation>State</translation>
+    </message>
+    <message id="gallery-card-file-system">
+        <source></source>
+        <translation>File system</translation>
+    </message>
+    <message id="gallery-card-unknown">
+        <source></source>
+        <translation>Not known yet</translation>
+    </message>
+    <message id="gallery-card-format">
+        <source></source>
+        <translation>Format as %1</translation>
+    </message>
+    <message id="gallery-card-mount">
+        <source></source>
+        <translation>Mount</translation>
+    </message>
+    <message id="gallery-card-unmount">
+        <source></source>
+        <translation>Unmount</translation>
+    </message>
+    <message id="gallery-card-question">
+        <source></source>
+        <translation>Erase the card?</translation>
+    </message>
+    <message id="gallery-card-question-text">
+        <source></source>
+        <translation>Everything on the card will be lost.</translation>
+    </message>
+    <message id="gallery-card-erase">
+        <source></source>
+        <translation>Erase</translation>
+    </message>
+    <message id="gallery-card-cancel">
+        <source></source>
+        <translation>Cancel</translation>
+    </message>
+    <message id="gallery-card-steps">
+        <source></source>
+        <translation>Steps</translation>
+    </message>
+    <message id="gallery-card-idle">
+        <source></source>
+        <translation>Ready</translation>
+    </message>
+    <message id="gallery-card-unmounting">
+        <source></source>
+        <translation>Unmounting</translation>
+    </message>
+    <message id="gallery-card-formatting">
+        <source></source>
+        <translation>Formatting</translation>
+    </message>
+    <message id="gallery-card-removing-files">
+        <source></source>
+        <translation>Removing files</translation>
+    </message>
+    <message id="gallery-card-mounting">
+        <source></source>
+        <translation>Mounting</translation>
+    </message>
+    <message id="gallery-card-probing">
+        <source></source>
+        <translation>Looking at the card</translation>
+    </message>
+    <message id="gallery-card-error">
+        <source></source>
+        <translation>Failed</translation>
+    </message>
+    <message id="gallery-card-failed">
+        <source></source>
+        <translation>The card could not be mounted or unmounted.</translation>
+    </message>
+    <message id="gallery-card-device-busy">
+        <source></source>
+        <translation>The card is in use. Close what uses it, and try again.</translation>
+    </message>
+    <message id="gallery-card-already-mounted">
+        <source></source>
+        <translation>The card is mounted already.</translation>
+    </message>
+    <message id="gallery-card-not-mounted">
+        <source></source>
+        <translation>The card is not mounted.</translation>
+    </message>
+    <message id="gallery-card-other-user">
+        <source></source>
+        <translation>Another user has mounted the card.</translation>
+    </message>
+    <message id="gallery-card-not-authorized">
+        <source></source>
+        <translation>This is not allowed.</translation>
+    </message>
+    <message id="gallery-card-not-supported">
+        <source></source>
+        <translation>The card cannot be mounted on this device.</translation>
+    </message>
+    <message id="gallery-card-timed-out">
+        <source></source>
+        <translation>The card took too long.</translation>
+    </message>
+    <message id="gallery-card-service">
+        <source></source>
+        <translation>Disk service</translation>
+    </message>
+    <message id="gallery-card-in-use">
+        <source></source>
+        <translation>The card is in use</translation>
+    </message>
+    <message id="gallery-card-forbidden">
+        <source></source>
+        <translation>Nobody may do that</translation>
+    </message>
+    <message id="gallery-card-service-note">
+        <source></source>
+        <translation>This is not a real card: the gallery plays the disk service and the program that formats.</translation>
+    </message>
     <message id="gallery-sample-new-alarm">
         <source></source>
         <translation>New alarm</translation>

@@ -1,0 +1,36 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+import QtQuick 2.15
+import QtQuick.Controls 2.15
+
+/*
+    Asks before something is done that cannot be undone.
+*/
+Dialog {
+    id: question
+
+    property alias text: label.text
+    property alias yes: yesButton.text
+    property alias no: noButton.text
+
+    parent: Overlay.overlay
+    anchors.centerIn: parent
+    width: Math.min(parent.width - 32, 400)
+    modal: true
+
+    contentItem: Label {
+        id: label
+        wrapMode: Text.Wrap
+    }
+    footer: DialogButtonBox {
+        Button {
+            id: noButton
+            DialogButtonBox.buttonRole: DialogButtonBox.RejectRole
+        }
+        Button {
+            id: yesButton
+            DialogButtonBox.buttonRole: DialogButtonBox.AcceptRole
+        }
+    }
+}

@@ -197,7 +197,7 @@ void EventsWidgetsModel::directoryChanged()
         stale.remove(widget.path);
     }
     mergeWidgets(widgets);
-    removeRows(stale);
+    removeStaleRows(stale);
 }
 
 /*!
@@ -348,7 +348,7 @@ void EventsWidgetsModel::updateWidget(int row, const Widget &widget)
     Q_EMIT dataChanged(index(row), index(row));
 }
 
-void EventsWidgetsModel::removeRows(const QSet<QString> &paths)
+void EventsWidgetsModel::removeStaleRows(const QSet<QString> &paths)
 {
     if (paths.isEmpty()) {
         return;

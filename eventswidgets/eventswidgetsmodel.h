@@ -66,7 +66,7 @@ private:
     void mergeWidgets(const std::vector<Widget> &widgets);
     void insertWidget(int row, const Widget &widget);
     void updateWidget(int row, const Widget &widget);
-    void removeRows(const QSet<QString> &paths);
+    void removeStaleRows(const QSet<QString> &paths);
     void indexRows();
     int highestOrder(int row) const;
     void updateHighestOrders(int row);

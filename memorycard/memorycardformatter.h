@@ -87,9 +87,9 @@ Q_SIGNALS:
     void devicePathChanged();
     void filesystemTypeChanged();
     void busyChanged();
-    // Users connect to the signatures as they stand: clazy:exclude=fully-qualified-moc-types
-    void mountError(MountError error);
-    void unmountError(MountError error);
+    // Users connect to these signatures as they stand.
+    void mountError(MountError error); // clazy:exclude=fully-qualified-moc-types
+    void unmountError(MountError error); // clazy:exclude=fully-qualified-moc-types
 
 private Q_SLOTS:
     void commandError(QProcess::ProcessError error);

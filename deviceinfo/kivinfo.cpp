@@ -51,8 +51,9 @@ QVariantMap changedProperties(const QDBusMessage &message)
     \brief Tells which smart back cover is attached to the device.
 
     Asks the cover daemon, \c com.marlo.kivd on the system bus, when it is created, and follows its
-    \c PropertiesChanged signal from then on, also when the daemon starts only later. Without the
-    daemon, or if it answers with an error, the properties keep their defaults; nothing is logged.
+    \c PropertiesChanged signal from then on, also when the daemon starts only later. (A signal that
+    a daemon sends in the very moment of its start may be missed.) Without the daemon, or if it
+    answers with an error, the properties keep their defaults; nothing is logged.
 */
 
 KivInfo::KivInfo(QObject *parent) : QObject(parent)

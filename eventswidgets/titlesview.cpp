@@ -148,7 +148,8 @@ void TitlesView::setModel(QObject *model)
     \qmlproperty string TitlesView::matchRole
 
     The role path whose value selects the rows. Empty, the default, takes every row, and so does a
-    role that the model does not have.
+    role that the model does not have or has under the number 0, as one of the roles of a QML
+    \c ListModel is.
 */
 QString TitlesView::matchRole() const
 {

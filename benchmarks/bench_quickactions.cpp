@@ -17,6 +17,7 @@
 namespace {
 
 const QString directory = QStringLiteral("/usr/share/glimmera/quickactions");
+const QString blockedKey = QStringLiteral("/desktop/glimmera-marlo-home/blocked_actions");
 const QString enabledKey = QStringLiteral("/desktop/glimmera-marlo-home/events_screen_actions");
 
 QStringList write(int count)
@@ -106,6 +107,11 @@ bool measure(int count, bool enabled, std::vector<double> *modelTimes)
 int main(int argc, char *argv[])
 {
     const QCoreApplication application(argc, argv);
+    // Held by somebody else as well, as where there are several models: the bus is asked once to tell
+    // of the keys' changes, and not for each model anew.
+    const MGConfItem enabledItem(enabledKey);
+    const MGConfItem blockedItem(blockedKey);
+
     bool passed = true;
     for (const bool enabled : {true, false}) {
         std::vector<double> few;

@@ -8,6 +8,7 @@
 #include <QDBusConnection>
 #include <QDBusError>
 #include <QDBusMessage>
+#include <QDir>
 #include <QQmlInfo>
 #include <QScopedValueRollback>
 #include <QSet>
@@ -17,7 +18,7 @@
 namespace {
 
 const QLatin1String definitionDirectory("/usr/share/glimmera/quickactions");
-const QLatin1String definitionFilter("*.conf");
+const QLatin1String definitionSuffix(".conf");
 constexpr int reloadDelay = 1000; // ms
 
 const QLatin1String enabledKey("/desktop/glimmera-marlo-home/events_screen_actions");
@@ -77,9 +78,8 @@ QSet<QString> toSet(const QStringList &list)
 */
 
 QuickActionsModel::QuickActionsModel(QObject *parent)
-    : QAbstractListModel(parent), m_catalogs(this), m_directory(definitionDirectory),
-      m_watcher(definitionDirectory, this), m_reloadTimer(this), m_enabledItem(enabledKey),
-      m_blockedItem(blockedKey)
+    : QAbstractListModel(parent), m_catalogs(this), m_watcher(definitionDirectory, this),
+      m_reloadTimer(this), m_enabledItem(enabledKey), m_blockedItem(blockedKey)
 {
     m_reloadTimer.setSingleShot(true);
     m_reloadTimer.setInterval(reloadDelay);
@@ -335,9 +335,14 @@ void QuickActionsModel::loadActions()
         QStringList offered;
         QSet<QString> selected;
         const QSet<QString> blocked = toSet(m_blockedList);
-        const QStringList names = m_directory.entryList({definitionFilter});
+        // By hand: a name filter of QDir's is a regular expression for every entry, and most of what
+        // is read here are hundreds of small files. Like such a filter it does not look at the case.
+        const QStringList names = QDir(definitionDirectory).entryList();
         for (const QString &name : names) {
-            const QString path = m_directory.absoluteFilePath(name);
+            if (!name.endsWith(definitionSuffix, Qt::CaseInsensitive)) {
+                continue;
+            }
+            const QString path = definitionDirectory + QLatin1Char('/') + name;
             if ((m_showPotential || enabled.contains(path)) && !blocked.contains(path)) {
                 offered.append(path);
                 selected.insert(path);

@@ -9,7 +9,6 @@
 #include "mgconfitem.h"
 
 #include <QAbstractListModel>
-#include <QDir>
 #include <QQmlParserStatus>
 #include <QTimer>
 
@@ -89,7 +88,6 @@ private:
 
     CatalogTable m_catalogs;
     std::vector<std::unique_ptr<Action>> m_rows;
-    const QDir m_directory;
     DirectoryWatcher m_watcher;
     QTimer m_reloadTimer;
     MGConfItem m_enabledItem;

@@ -32,13 +32,6 @@ public:
     void addDefinition(const QString &user, const QString &catalog);
     void removeDefinition(const QString &user, const QString &catalog);
 
-    // Registers a user of one catalog file and, for its first user, loads and installs it: for the
-    // default locale if there is a prefix (what stands between the name and the locale), else the
-    // file of just that name. A file that does not exist counts like any other.
-    void addCatalogTranslator(const QString &user, const QString &catalog, const QString &prefix);
-    // Takes out a user, however often it was added, and with the last one the translator.
-    void removeCatalogTranslator(const QString &user, const QString &catalog);
-
     // Removes every translator from the application.
     void clear();
 
@@ -48,6 +41,13 @@ private:
         // One removal takes a user out however often it was added, so once is enough to know.
         QSet<QString> users;
     };
+
+    // Registers a user of one catalog file and, for its first user, loads and installs it: for the
+    // default locale if there is a prefix (what stands between the name and the locale), else the
+    // file of just that name. A file that does not exist counts like any other.
+    void addCatalogTranslator(const QString &user, const QString &catalog, const QString &prefix);
+    // Takes out a user, however often it was added, and with the last one the translator.
+    void removeCatalogTranslator(const QString &user, const QString &catalog);
 
     QObject *m_owner;
     QHash<QString, Entry> m_entries;

@@ -23,7 +23,9 @@ const QLatin1String pathKey("remote-path");
 const QLatin1String interfaceKey("remote-interface");
 const QLatin1String methodKey("remote-method");
 const QLatin1String argumentsKey("remote-arguments");
-const QLatin1String argumentKey("argument");
+// As an array of QSettings is kept, which counts from 1.
+const QLatin1String argumentsSizeKey("remote-arguments/size");
+const QLatin1String argumentKey("remote-arguments/%1/argument");
 
 // The longest signature that D-Bus knows.
 constexpr int maximumSignature = 255;
@@ -159,11 +161,11 @@ QVariantMap QuickActionsModel::Action::readActionConfig(const QString &path) con
 
     QVariantMap config;
     bool hasArguments = false;
-    const QStringList keys = settings.allKeys();
+    const QStringList keys = settings.allKeys(); // sorted
     for (const QString &key : keys) {
         const int groupLength = key.indexOf(QLatin1Char('/'));
         if (groupLength < 0) {
-            config.insert(key, settings.value(key));
+            config.insert(config.cend(), key, settings.value(key));
         } else if (key.leftRef(groupLength) == argumentsKey) {
             hasArguments = true;
         }
@@ -171,12 +173,10 @@ QVariantMap QuickActionsModel::Action::readActionConfig(const QString &path) con
     // An array without elements is an entry too; no other group is of interest.
     if (hasArguments) {
         QVariantList arguments;
-        const int size = qMin(settings.beginReadArray(argumentsKey), enoughArguments);
-        for (int i = 0; i < size; ++i) {
-            settings.setArrayIndex(i);
-            arguments.append(settings.value(argumentKey));
+        const int size = qMin(settings.value(argumentsSizeKey).toInt(), enoughArguments);
+        for (int i = 1; i <= size; ++i) {
+            arguments.append(settings.value(QString(argumentKey).arg(i)));
         }
-        settings.endArray();
         config.insert(argumentsKey, arguments);
     }
     return config;

@@ -33,6 +33,20 @@ const QLatin1String storePath("/StoreClient");
 const QLatin1String storeInterface("com.marlo.marlostore");
 const QLatin1String storeMethod("showApp");
 
+// By suffix and name, whatever their case, as QDir would filter and sort them. It would make a
+// regular expression and two texts of every entry, though, and what is read here are hundreds of
+// small files.
+QStringList definitionFiles()
+{
+    QStringList names = QDir(definitionDirectory).entryList(QDir::AllEntries, QDir::Unsorted);
+    const auto isOther = [](const QString &name) {
+        return !name.endsWith(definitionSuffix, Qt::CaseInsensitive);
+    };
+    names.erase(std::remove_if(names.begin(), names.end(), isOther), names.end());
+    names.sort(Qt::CaseInsensitive);
+    return names;
+}
+
 QSet<QString> toSet(const QStringList &list)
 {
     return {list.cbegin(), list.cend()};
@@ -335,13 +349,8 @@ void QuickActionsModel::loadActions()
         QStringList offered;
         QSet<QString> selected;
         const QSet<QString> blocked = toSet(m_blockedList);
-        // By hand: a name filter of QDir's is a regular expression for every entry, and most of what
-        // is read here are hundreds of small files. Like such a filter it does not look at the case.
-        const QStringList names = QDir(definitionDirectory).entryList();
+        const QStringList names = definitionFiles();
         for (const QString &name : names) {
-            if (!name.endsWith(definitionSuffix, Qt::CaseInsensitive)) {
-                continue;
-            }
             const QString path = definitionDirectory + QLatin1Char('/') + name;
             if ((m_showPotential || enabled.contains(path)) && !blocked.contains(path)) {
                 offered.append(path);

@@ -154,31 +154,45 @@ void makeBait(const QByteArray &folder)
     }
 }
 
-// Swaps two entries again and again until it is ended, with this program at the latest.
-pid_t startSwapping(const QByteArray &first, const QByteArray &second)
+// Enough for a walk to be met at every turn: a walk by paths lost files in most of 120.
+constexpr int races = 200;
+
+// Does something again and again in a process of its own, until it is ended, with this program at
+// the latest.
+template<typename Work> pid_t startRepeating(Work work)
 {
     const pid_t pid = fork();
     if (pid == 0) {
         prctl(PR_SET_PDEATHSIG, SIGKILL);
         while (true) {
-            renameat2(AT_FDCWD, first.constData(), AT_FDCWD, second.constData(), RENAME_EXCHANGE);
+            work();
         }
     }
     return pid;
 }
 
-// Moves a folder out of a tree and back again until it is ended, with this program at the latest.
+pid_t startSwapping(const QByteArray &first, const QByteArray &second)
+{
+    return startRepeating([=] {
+        renameat2(AT_FDCWD, first.constData(), AT_FDCWD, second.constData(), RENAME_EXCHANGE);
+    });
+}
+
+// Moves a folder out of a tree and back.
 pid_t startMoving(const QByteArray &inside, const QByteArray &outside)
 {
-    const pid_t pid = fork();
-    if (pid == 0) {
-        prctl(PR_SET_PDEATHSIG, SIGKILL);
-        while (true) {
-            ::rename(inside.constData(), outside.constData());
-            ::rename(outside.constData(), inside.constData());
-        }
-    }
-    return pid;
+    return startRepeating([=] {
+        ::rename(inside.constData(), outside.constData());
+        ::rename(outside.constData(), inside.constData());
+    });
+}
+
+pid_t startMounting(const QByteArray &folder, const QByteArray &mountPoint)
+{
+    return startRepeating([=] {
+        mount(folder.constData(), mountPoint.constData(), nullptr, MS_BIND, nullptr);
+        umount2(mountPoint.constData(), MNT_DETACH);
+    });
 }
 
 void stop(pid_t pid)
@@ -227,6 +241,7 @@ private Q_SLOTS:
     void entryVanishes();
     void raceOfFoldersAndLinks();
     void raceOfMovedFolders();
+    void raceOfMounts();
 
 private:
     void checkOutside();
@@ -793,7 +808,7 @@ void tst_DirectoryEmptier::entryVanishes()
 
 void tst_DirectoryEmptier::raceOfFoldersAndLinks()
 {
-    for (int run = 0; run < 20; ++run) {
+    for (int run = 0; run < races; ++run) {
         for (int i = 0; i < 10; ++i) {
             const QByteArray folder = m_top + "/folder" + QByteArray::number(i);
             makeFolder(folder);
@@ -821,7 +836,7 @@ void tst_DirectoryEmptier::raceOfFoldersAndLinks()
 
 void tst_DirectoryEmptier::raceOfMovedFolders()
 {
-    for (int run = 0; run < 20; ++run) {
+    for (int run = 0; run < races; ++run) {
         makeChain(m_top, 90);
         makeFiles(chainPath(m_top, 90), 200);
         const pid_t mover = startMoving(chainPath(m_top, 80), m_outside + "/moved");
@@ -839,6 +854,37 @@ void tst_DirectoryEmptier::raceOfMovedFolders()
                 rmdir((m_outside + name).constData());
             }
         }
+    }
+}
+
+void tst_DirectoryEmptier::raceOfMounts()
+{
+    const ScratchFileSystem otherDevice;
+    const QByteArray other = otherDevice.path("other");
+    makeFolder(other);
+    makeFolder(other + "/folder");
+    makeFiles(other + "/folder", 20);
+    makeFiles(other, 20);
+    const QByteArrayList before = listAll(other);
+    const QByteArrayList mountPoints{m_top + "/folder2", m_top + "/folder7/victim"};
+    for (int run = 0; run < races; ++run) {
+        for (int i = 0; i < 10; ++i) {
+            const QByteArray folder = m_top + "/folder" + QByteArray::number(i);
+            makeFolder(folder);
+            makeFolder(folder + "/victim");
+            makeFiles(folder + "/victim", 20);
+        }
+        const pid_t mounter = startMounting(other, mountPoints[0]);
+        const pid_t mounter2 = startMounting(other, mountPoints[1]);
+        QVERIFY(mounter > 0 && mounter2 > 0);
+        empty(m_top);
+        stop(mounter);
+        stop(mounter2);
+        for (const QByteArray &mountPoint : mountPoints) {
+            while (umount2(mountPoint.constData(), MNT_DETACH) == 0) { }
+        }
+        QCOMPARE(listAll(other), before);
+        QVERIFY(empty(m_top));
     }
 }
 

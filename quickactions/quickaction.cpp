@@ -6,7 +6,6 @@
 #include "inifile.h"
 
 #include <QDBusConnection>
-#include <QDBusError>
 #include <QDBusMessage>
 #include <QQmlInfo>
 #include <QSettings>
@@ -32,32 +31,9 @@ constexpr int maximumSignature = 255;
 // More arguments than a call can have: a file may name any number of them.
 constexpr int enoughArguments = 256;
 
-// What keeps a call from being sent. QtDBus would not notice: it sends a call without a service to
-// the bus itself, and crashes on a signature that is too long.
-QDBusError whyUnsendable(const QuickActionsModel::Action &action)
-{
-    if (action.service().isEmpty()) {
-        return {QDBusError::InvalidService, QStringLiteral("The call names no service")};
-    }
-    if (action.method().isEmpty()) {
-        return {QDBusError::InvalidMember, QStringLiteral("The call names no method")};
-    }
-    int signature = 0;
-    const QVariantList arguments = action.arguments();
-    for (const QVariant &argument : arguments) {
-        if (argument.userType() == QMetaType::QString) {
-            signature += 1; // s
-        } else if (argument.userType() == QMetaType::QStringList) {
-            signature += 2; // as
-        } else {
-            return {QDBusError::InvalidArgs, QStringLiteral("An argument is no text")};
-        }
-    }
-    if (signature > maximumSignature) {
-        return {QDBusError::InvalidArgs, QStringLiteral("The call has too many arguments")};
-    }
-    return {};
-}
+// Libraries keep these to themselves: the bus hangs up on whoever sends a message with one of them.
+const QLatin1String reservedPath("/org/freedesktop/DBus/Local");
+const QLatin1String reservedInterface("org.freedesktop.DBus.Local");
 
 } // namespace
 
@@ -117,11 +93,44 @@ QVariantList QuickActionsModel::Action::arguments() const
     return m_config.value(argumentsKey).toList();
 }
 
+QDBusError QuickActionsModel::Action::whyUnsendable() const
+{
+    // QtDBus would not notice: it sends a call without a service to the bus itself, and on a service
+    // that is a lone word, or a signature that is too long, the process ends.
+    if (service().isEmpty()) {
+        return {QDBusError::InvalidService, QStringLiteral("The call names no service")};
+    }
+    if (!service().startsWith(QLatin1Char(':')) && !service().contains(QLatin1Char('.'))) {
+        return {QDBusError::InvalidService, QStringLiteral("The service is no bus name")};
+    }
+    if (method().isEmpty()) {
+        return {QDBusError::InvalidMember, QStringLiteral("The call names no method")};
+    }
+    if (objectPath() == reservedPath || interface() == reservedInterface) {
+        return {QDBusError::AccessDenied, QStringLiteral("The path or interface is reserved")};
+    }
+    int signature = 0;
+    const QVariantList arguments = this->arguments();
+    for (const QVariant &argument : arguments) {
+        if (argument.userType() == QMetaType::QString) {
+            signature += 1; // s
+        } else if (argument.userType() == QMetaType::QStringList) {
+            signature += 2; // as
+        } else {
+            return {QDBusError::InvalidArgs, QStringLiteral("An argument is no text")};
+        }
+    }
+    if (signature > maximumSignature) {
+        return {QDBusError::InvalidArgs, QStringLiteral("The call has too many arguments")};
+    }
+    return {};
+}
+
 bool QuickActionsModel::Action::trigger(QObject *receiver, const char *returnMethod,
                                         const char *errorMethod) const
 {
     QDBusConnection bus = QDBusConnection::sessionBus();
-    QDBusError error = whyUnsendable(*this);
+    QDBusError error = whyUnsendable();
     if (!error.isValid()) {
         QDBusMessage call =
             QDBusMessage::createMethodCall(service(), objectPath(), interface(), method());

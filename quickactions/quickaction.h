@@ -6,6 +6,7 @@
 
 #include "quickactionsmodel.h"
 
+#include <QDBusError>
 #include <QVariantMap>
 
 #include <optional>
@@ -39,6 +40,9 @@ public:
     QString interface() const;
     QString method() const;
     QVariantList arguments() const;
+    // What keeps the call from being sent at all; no error if nothing does. A name or path that is
+    // wrong in itself passes: it is answered with an error, as by the bus.
+    QDBusError whyUnsendable() const;
 
     // Sends the call on the session bus and returns at once. The receiver's slots get the reply, or
     // the error together with the message that was sent; either may be null. A call that cannot be

@@ -501,6 +501,25 @@ void TestQuickAction::refusesBeforeSending_data()
         << QStringLiteral(
                "service= path=/lamp interface=org.example.Lamp method=toggle. Error was: "
                "org.qtproject.QtDBus.Error.InvalidService The call names no service %6");
+    // These would end the process, or the connection to the bus.
+    QTest::newRow("service of one word")
+        << QByteArray("remote-service=lamp\nremote-path=/lamp\n"
+                      "remote-interface=org.example.Lamp\nremote-method=toggle\n")
+        << QStringLiteral(
+               "service=lamp path=/lamp interface=org.example.Lamp method=toggle. Error was: "
+               "org.qtproject.QtDBus.Error.InvalidService The service is no bus name %6");
+    QTest::newRow("reserved path")
+        << lampCall + "remote-path=/org/freedesktop/DBus/Local\n"
+        << QStringLiteral(
+               "service=org.example.lamp path=/org/freedesktop/DBus/Local "
+               "interface=org.example.Lamp method=toggle. Error was: "
+               "org.freedesktop.DBus.Error.AccessDenied The path or interface is reserved %6");
+    QTest::newRow("reserved interface")
+        << lampCall + "remote-interface=org.freedesktop.DBus.Local\n"
+        << QStringLiteral(
+               "service=org.example.lamp path=/lamp "
+               "interface=org.freedesktop.DBus.Local method=toggle. Error was: "
+               "org.freedesktop.DBus.Error.AccessDenied The path or interface is reserved %6");
     QTest::newRow("no method")
         << QByteArray("remote-service=org.example.lamp\nremote-path=/lamp\n"
                       "remote-interface=org.example.Lamp\n")

@@ -4,15 +4,12 @@
 #include "eventswidgetsfile.h"
 
 #include "jsonreader.h"
+#include "regularfile.h"
 
-#include <QFile>
 #include <QtDebug>
 
 #include <algorithm>
 #include <string_view>
-
-#include <fcntl.h>
-#include <sys/stat.h>
 
 namespace {
 
@@ -30,33 +27,8 @@ constexpr std::string_view availablePathKey("available_path");
 
 constexpr int noOrder = -1;
 
-// A definition takes a few hundred bytes a widget. The main thread reads it, and in memory it may
-// take ten times its size: whatever is larger than this is none.
-constexpr qint64 maximumSize = qint64(32) * 1024 * 1024;
 // The log is written while the main thread waits: no more lines than anybody reads.
 constexpr int maximumWarnings = 1000;
-
-// What a regular file holds, or nothing if it is too large; false if it cannot be opened.
-bool readFile(const QString &path, QByteArray *content)
-{
-    // Whatever has taken the place of a file since it was listed, opening it waits for nobody.
-    const int descriptor =
-        open(QFile::encodeName(path).constData(), O_RDONLY | O_NONBLOCK | O_NOCTTY | O_CLOEXEC);
-    QFile file;
-    if (descriptor < 0
-        || !file.open(descriptor, QIODevice::ReadOnly | QIODevice::Unbuffered,
-                      QFileDevice::AutoCloseHandle)) {
-        return false;
-    }
-    struct stat entry = {};
-    if (fstat(descriptor, &entry) != 0 || !S_ISREG(entry.st_mode)) {
-        return false;
-    }
-    if (entry.st_size <= maximumSize) {
-        *content = file.read(entry.st_size);
-    }
-    return true;
-}
 
 EventsWidgetsModel::Widget readWidget(JsonReader *reader)
 {
@@ -111,13 +83,15 @@ std::vector<EventsWidgetsModel::Widget> readWidgets(JsonReader *reader, int *rej
 
 std::optional<EventsWidgetsFile> readEventsWidgetsFile(const QString &path)
 {
-    QByteArray content;
-    if (!readFile(path, &content)) {
+    const RegularFile text = readRegularFile(path, maximumEventsWidgetsSize);
+    if (text.state == RegularFile::State::NotOpened
+        || text.state == RegularFile::State::NotRegular) {
         qWarning() << "Failed to open" << path;
         return {};
     }
     EventsWidgetsFile file;
-    JsonReader reader(content);
+    // Of a file that is too large there is none.
+    JsonReader reader(text.content);
     int rejected = 0;
     const bool isObject = reader.beginObject();
     std::string_view key;

@@ -9,6 +9,10 @@
 #include <optional>
 #include <vector>
 
+// A definition takes a few hundred bytes a widget. The main thread reads it, and in memory it may
+// take ten times its size: whatever is larger than this is none.
+constexpr qint64 maximumEventsWidgetsSize = qint64(32) * 1024 * 1024;
+
 /*
     A definition file of events widgets: a value that is read once and needs no model.
 */

@@ -3,18 +3,13 @@
 
 #include "inifile.h"
 
+#include "regularfile.h"
+
 #include <QByteArray>
-#include <QFile>
 
 #include <optional>
 
-#include <fcntl.h>
-#include <sys/stat.h>
-#include <unistd.h>
-
 namespace {
-
-constexpr qint64 maximumSize = qint64(1024) * 1024;
 
 int digitOf(char character)
 {
@@ -79,35 +74,22 @@ bool isPacked(const QByteArray &data, int position)
     return word.startsWith("Variant(") || word.startsWith("DateTime(");
 }
 
-bool holdsPackedValues(const QByteArray &data)
-{
-    for (int position = 0; position < data.size(); ++position) {
-        const char character = data.at(position);
-        if ((character == '=' || character == ',') && isPacked(data, position + 1)) {
-            return true;
-        }
-    }
-    return false;
-}
-
 } // namespace
 
 bool isPlainIni(const QString &path)
 {
-    // Whatever lies there, opening it like this waits for nobody.
-    const int descriptor =
-        open(QFile::encodeName(path).constData(), O_RDONLY | O_NONBLOCK | O_NOCTTY | O_CLOEXEC);
-    if (descriptor < 0) {
-        return true;
+    const RegularFile file = readRegularFile(path, maximumIniSize);
+    return file.state == RegularFile::State::NotOpened
+        || (file.state == RegularFile::State::Read && findPackedValue(file.content) < 0);
+}
+
+int findPackedValue(const QByteArray &data)
+{
+    for (int position = 0; position < data.size(); ++position) {
+        const char character = data.at(position);
+        if ((character == '=' || character == ',') && isPacked(data, position + 1)) {
+            return position;
+        }
     }
-    struct stat entry = {};
-    bool isPlain =
-        fstat(descriptor, &entry) == 0 && S_ISREG(entry.st_mode) && entry.st_size <= maximumSize;
-    if (isPlain) {
-        QByteArray data(int(entry.st_size), Qt::Uninitialized);
-        data.truncate(int(qMax(ssize_t(0), read(descriptor, data.data(), size_t(data.size())))));
-        isPlain = !holdsPackedValues(data);
-    }
-    close(descriptor);
-    return isPlain;
+    return -1;
 }

@@ -43,7 +43,7 @@ bool isAscii(char character)
 } // namespace
 
 JsonReader::JsonReader(const QByteArray &text)
-    : m_at(text.constData()), m_end(text.constData() + text.size())
+    : m_start(text.constData()), m_at(m_start), m_end(m_start + text.size())
 {
     takeWord(byteOrderMark);
 }
@@ -159,6 +159,12 @@ bool JsonReader::atEnd()
     return !m_failed && m_at == m_end;
 }
 
+int JsonReader::position()
+{
+    peek();
+    return int((m_failed ? m_failedAt : m_at) - m_start);
+}
+
 bool JsonReader::begin(char token)
 {
     if (!take(token)) {
@@ -207,6 +213,9 @@ bool JsonReader::take(char token)
 // Nothing is left to read: every loop comes to its end.
 void JsonReader::fail()
 {
+    if (!m_failed) {
+        m_failedAt = m_at;
+    }
     m_failed = true;
     m_at = m_end;
 }
@@ -226,6 +235,7 @@ JsonReader::Literal JsonReader::takeLiteral()
         ++m_at;
     }
     if (m_at >= m_end) {
+        m_at = start;
         fail();
         return {{}, true};
     }

@@ -47,6 +47,10 @@ public:
     // Whether the whole text has been passed and was JSON.
     bool atEnd();
 
+    // How many bytes stand before what is read next or, once the text has proved to be no JSON,
+    // before the place where it did.
+    int position();
+
 private:
     // A string as it is written, without its quotes; plain if it stands for itself in ASCII.
     struct Literal {
@@ -65,8 +69,10 @@ private:
     double takeNumber();
     bool takeWord(std::string_view word);
 
+    const char *const m_start;
     const char *m_at;
     const char *const m_end;
+    const char *m_failedAt = nullptr;
     QByteArray m_key;
     int m_depth = 0;
     bool m_isFirst = false;

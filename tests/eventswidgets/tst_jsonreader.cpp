@@ -29,6 +29,9 @@ private Q_SLOTS:
     void agreesOnDepth();
     void nestedValues();
     void passesWhatItIsNotAskedFor();
+    void positionOfAValue();
+    void positionOfAnError_data();
+    void positionOfAnError();
 
 private:
     std::unique_ptr<MessageLog> m_log;
@@ -368,6 +371,44 @@ void TestJsonReader::passesWhatItIsNotAskedFor()
     QCOMPARE(reader.readString(), QString());
     QVERIFY(!reader.nextElement());
     QVERIFY(reader.atEnd());
+}
+
+void TestJsonReader::positionOfAValue()
+{
+    const QByteArray text = "\xef\xbb\xbf {\n \"a\" :\n [ 1 ]} ";
+    JsonReader reader(text);
+    QCOMPARE(reader.position(), text.indexOf('{'));
+    QVERIFY(reader.beginObject());
+    std::string_view key;
+    QVERIFY(reader.nextMember(&key));
+    QCOMPARE(reader.position(), text.indexOf('['));
+    reader.skip();
+    QVERIFY(!reader.nextMember(&key));
+    QVERIFY(reader.atEnd());
+    QCOMPARE(reader.position(), text.size());
+}
+
+void TestJsonReader::positionOfAnError_data()
+{
+    QTest::addColumn<QByteArray>("text");
+    QTest::addColumn<int>("position");
+    QTest::newRow("no comma") << QByteArray(R"({"a":1 "b":2})") << 7;
+    QTest::newRow("no key") << QByteArray(R"({"a":1, b:2})") << 8;
+    QTest::newRow("no value") << QByteArray(R"({"a": })") << 6;
+    QTest::newRow("unknown word") << QByteArray("{\"a\":\n yes}") << 7;
+    QTest::newRow("no end of a string") << QByteArray("{\"a\": \"b\n}\n") << 7;
+    QTest::newRow("no end") << QByteArray(R"({"a":[1)") << 7;
+    QTest::newRow("more behind it") << QByteArray("{}\n{}") << 3;
+    QTest::newRow("too deep") << QByteArray(2000, '[') << 1025;
+}
+
+void TestJsonReader::positionOfAnError()
+{
+    QFETCH(QByteArray, text);
+    JsonReader reader(text);
+    reader.skip();
+    QVERIFY(!reader.atEnd());
+    QTEST(reader.position(), "position");
 }
 
 QTEST_GUILESS_MAIN(TestJsonReader)

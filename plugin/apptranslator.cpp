@@ -3,15 +3,16 @@
 
 #include "apptranslator.h"
 
+#include "catalogfiles.h"
+
 #include <QEvent>
 #include <QLocale>
+
+using namespace CatalogFiles;
 
 namespace {
 
 const QLatin1String catalog("settings-system");
-const QLatin1String engineeringEnglishCatalog("settings-system_eng_en");
-const QLatin1String prefix("-");
-const QLatin1String directory("/usr/share/translations");
 
 } // namespace
 
@@ -21,12 +22,12 @@ AppTranslator::AppTranslator(QObject *parent) : QTranslator(parent)
 
 void AppTranslator::loadEngineeringEnglish()
 {
-    static_cast<void>(load(engineeringEnglishCatalog, directory));
+    static_cast<void>(load(catalog + engineeringEnglishSuffix, directory));
 }
 
 void AppTranslator::loadDefaultLocale()
 {
-    static_cast<void>(load(QLocale(), catalog, prefix, directory));
+    static_cast<void>(load(QLocale(), catalog, localePrefix, directory));
 }
 
 bool AppTranslator::eventFilter(QObject *watched, QEvent *event)

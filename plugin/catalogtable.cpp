@@ -3,17 +3,13 @@
 
 #include "catalogtable.h"
 
+#include "catalogfiles.h"
+
 #include <QCoreApplication>
 #include <QLocale>
 #include <QTranslator>
 
-namespace {
-
-const QLatin1String directory("/usr/share/translations");
-const QLatin1String engineeringEnglishSuffix("_eng_en");
-const QLatin1String localePrefix("-");
-
-} // namespace
+using namespace CatalogFiles;
 
 CatalogTable::CatalogTable(QObject *owner) : m_owner(owner)
 {

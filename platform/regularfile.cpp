@@ -28,9 +28,10 @@ RegularFile readRegularFile(const QString &path, qint64 maximumSize)
         int size = 0;
         ssize_t taken = 0;
         // Some file systems give less at a time than they are asked for.
-        while ((taken = read(descriptor, file.content.data() + size,
-                             size_t(file.content.size() - size)))
-               > 0) {
+        while (size < file.content.size()
+               && (taken = read(descriptor, file.content.data() + size,
+                                size_t(file.content.size() - size)))
+                   > 0) {
             size += int(taken);
         }
         file.content.truncate(size);

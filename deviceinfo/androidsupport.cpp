@@ -15,6 +15,15 @@ const QLatin1String runtimeDaemon("/usr/sbin/apkd");
     \qmltype AndroidSupport
     \inqmlmodule com.marlo.settings.system
     \brief Tells whether the support for Android applications is installed.
+
+    \qml
+    Label {
+        text: "Android folders are shown"
+        visible: android.dataDirectoriesVisible
+
+        AndroidSupport { id: android }
+    }
+    \endqml
 */
 
 AndroidSupport::AndroidSupport(QObject *parent) : QObject(parent)

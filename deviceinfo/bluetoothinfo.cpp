@@ -18,6 +18,14 @@ const QLatin1String addressFile("/var/lib/bluetooth/board-address");
     \qmltype BluetoothInfo
     \inqmlmodule com.marlo.settings.system
     \brief Tells the address of the device's Bluetooth adapter.
+
+    \qml
+    Label {
+        text: bluetooth.adapterAddress || "No Bluetooth"
+
+        BluetoothInfo { id: bluetooth }
+    }
+    \endqml
 */
 
 BluetoothInfo::BluetoothInfo(QObject *parent) : QObject(parent)

@@ -50,10 +50,23 @@ QVariantMap changedProperties(const QDBusMessage &message)
     \inqmlmodule com.marlo.settings.system
     \brief Tells which smart back cover is attached to the device.
 
-    Asks the cover daemon, \c com.marlo.kivd on the system bus, when it is created, and follows its
-    \c PropertiesChanged signal from then on, also when the daemon starts only later. (A signal that
-    a daemon sends in the very moment of its start may be missed.) Without the daemon, or if it
-    answers with an error, the properties keep their defaults; nothing is logged.
+    Asks the cover daemon when it is created, and follows its \c PropertiesChanged signal from then
+    on, also when the daemon starts only later. (A signal that a daemon sends in the very moment of
+    its start may be missed.) Without the daemon, or if it answers with an error, the properties keep
+    their defaults; nothing is logged.
+
+    The daemon is the service \c com.marlo.kivd on the system bus. It is asked with the method
+    \c Get of \c org.freedesktop.DBus.Properties at the path \c /com/marlo/kivd, for properties of
+    the interface \c com.marlo.kivd. Its answers have to be bare values, a string and a 32-bit
+    integer: a value of any other type, wrapped in a D-Bus variant too, counts as an error.
+
+    \qml
+    Label {
+        text: cover.kivReady ? cover.kivId || "No cover" : "The cover is being read"
+
+        KivInfo { id: cover }
+    }
+    \endqml
 */
 
 KivInfo::KivInfo(QObject *parent) : QObject(parent)

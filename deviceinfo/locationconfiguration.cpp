@@ -60,15 +60,22 @@ QString agreementText(QLatin1String base)
     \inqmlmodule com.marlo.settings.system
     \brief Switches the location services, and saves and restores the user's own choice.
 
-    Besides what is described here the type has the switches of the platform's location settings,
-    all of which can be read, written and followed: \c gpsEnabled and \c mlsEnabled (bool), and
-    \c mlsOnlineState and \c hereState, each 0 as long as the user has not agreed to the service's
-    terms, 1 if it is disabled and 2 if it is enabled.
+    The switches themselves, \l gpsEnabled, \l mlsEnabled, \l mlsOnlineState and \l hereState, are
+    those of the platform's location settings; a device's own library decides what stands behind
+    them. Where there is none, they lie in dconf, and every process sees the same.
 
     \qml
-    LocationConfiguration {
-        id: location
-        Component.onCompleted: if (customSettingsEnabled) restoreCustomSettings()
+    Switch {
+        text: "My own choice"
+        checked: location.customSettingsEnabled
+        onToggled: {
+            location.customSettingsEnabled = checked
+            if (checked) {
+                location.restoreCustomSettings()
+            }
+        }
+
+        LocationConfiguration { id: location }
     }
     \endqml
 */
@@ -160,6 +167,68 @@ void LocationConfiguration::restoreCustomSettings()
         setHereState(toState(settings.value(hereEntry)));
     }
 }
+
+/*!
+    \qmlproperty bool LocationConfiguration::gpsEnabled
+
+    Whether the satellite receiver is switched on. Where the module keeps the switches itself:
+    \c /settings/location/gps_enabled (dconf, bool), off if it was never set.
+*/
+
+/*!
+    \qmlproperty bool LocationConfiguration::mlsEnabled
+
+    Whether the MLS network positioning is switched on. Where the module keeps the switches itself:
+    \c /settings/location/mls_enabled (dconf, bool), off if it was never set.
+*/
+
+/*!
+    \qmlproperty enumeration LocationConfiguration::mlsOnlineState
+
+    The state of the online assistance of MLS:
+
+    \value LocationConfiguration.OnlineAGpsNotAgreed The user has not agreed to the terms (0).
+    \value LocationConfiguration.OnlineAGpsDisabled The user has agreed; it is switched off (1).
+    \value LocationConfiguration.OnlineAGpsEnabled It is switched on (2).
+
+    A device's own library may name the states otherwise, only their numbers are settled: pages that
+    are to run on every device use those.
+
+    Where the module keeps the switches itself: \c /settings/location/mls_online_state (dconf, 32-bit
+    integer), not agreed to if it was never set or holds anything else. Writing another number changes
+    nothing and gives a warning.
+*/
+
+/*!
+    \qmlproperty enumeration LocationConfiguration::hereState
+
+    The state of the HERE positioning service, as \l mlsOnlineState tells that of MLS. Where the
+    module keeps the switches itself: \c /settings/location/here_state.
+*/
+
+/*!
+    \qmlsignal LocationConfiguration::gpsEnabledChanged()
+
+    Emitted after \l gpsEnabled has changed, here or in another process.
+*/
+
+/*!
+    \qmlsignal LocationConfiguration::mlsEnabledChanged()
+
+    Emitted after \l mlsEnabled has changed, here or in another process.
+*/
+
+/*!
+    \qmlsignal LocationConfiguration::mlsOnlineStateChanged()
+
+    Emitted after \l mlsOnlineState has changed, here or in another process.
+*/
+
+/*!
+    \qmlsignal LocationConfiguration::hereStateChanged()
+
+    Emitted after \l hereState has changed, here or in another process.
+*/
 
 /*!
     \qmlsignal LocationConfiguration::customSettingsEnabledChanged()

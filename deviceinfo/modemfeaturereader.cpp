@@ -16,9 +16,16 @@ const QLatin1String variantKey("variant");
 
 /*!
     \qmltype ModemFeatures
-    \instantiates ModemFeatureReader
     \inqmlmodule com.marlo.settings.system
     \brief Tells which variant of the modem software the device carries.
+
+    \qml
+    Label {
+        text: modem.variant || "Standard"
+
+        ModemFeatures { id: modem }
+    }
+    \endqml
 */
 
 ModemFeatureReader::ModemFeatureReader(QObject *parent) : QObject(parent)

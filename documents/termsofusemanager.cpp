@@ -85,9 +85,13 @@ QStringList readTerms(const QString &base, const QString &localeName)
     around them.
 
     \qml
-    TermsOfUseManager {
-        readonly property var terms: platformTermsOfUse(Qt.locale().name)
-        readonly property string title: terms.length > 0 ? terms[0] : ""
+    Label {
+        readonly property var terms: manager.platformTermsOfUse(Qt.locale().name)
+
+        text: terms.length > 0 ? terms[1] : "There are no terms"
+        wrapMode: Text.Wrap
+
+        TermsOfUseManager { id: manager }
     }
     \endqml
 */
@@ -136,7 +140,8 @@ QStringList TermsOfUseManager::platformTermsOfUse(const QString &localeName) con
 /*!
     \qmlmethod list<string> TermsOfUseManager::vendorTermsOfUse(string localeName)
 
-    As platformTermsOfUse(), for the vendor's terms in full.
+    Returns title and body of the vendor's terms in full for \a localeName, from the directory
+    \c full below \l vendorPath, as platformTermsOfUse() does.
 */
 QStringList TermsOfUseManager::vendorTermsOfUse(const QString &localeName) const
 {
@@ -146,7 +151,8 @@ QStringList TermsOfUseManager::vendorTermsOfUse(const QString &localeName) const
 /*!
     \qmlmethod list<string> TermsOfUseManager::vendorTermsSummary(string localeName)
 
-    As platformTermsOfUse(), for the summary of the vendor's terms.
+    Returns title and body of the summary of the vendor's terms for \a localeName, from the
+    directory \c summary below \l vendorPath, as platformTermsOfUse() does.
 */
 QStringList TermsOfUseManager::vendorTermsSummary(const QString &localeName) const
 {

@@ -28,7 +28,10 @@ bool isPath(const QString &path)
     A singleton, one for each engine.
 
     \qml
-    Label { text: TextFileReader.collate("file:///usr/share/licenses", "\n", "Licenses:\n") }
+    Label {
+        text: TextFileReader.collate("file:///usr/share/marlo-settings/licenses", "\n",
+                                     "Licenses:\n")
+    }
     \endqml
 */
 

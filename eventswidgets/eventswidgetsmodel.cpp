@@ -42,14 +42,25 @@ QString translation(const QString &id, const QString &fallback)
     \brief Lists the widgets of the events screen.
 
     Packages offer widgets by installing a definition file, \c{*.json}, into
-    \c /usr/share/glimmera/eventswidgets. The model lists all of them and follows the directory and
+    \c /usr/share/glimmera/eventswidgets; \l{marlo-eventswidgets(5)} tells what it holds. The model lists all of them and follows the directory and
     the user's choice, \c /desktop/glimmera-marlo-home/events_screen_widgets (dconf, list of
     strings): the paths of the enabled widgets. While the user has chosen nothing, each widget is
     enabled or not by its own default.
 
-    Roles: \c title and \c description (text in the user's language), \c icon and \c path (as in the
-    definition file; the path is the widget's identity), \c enabled (bool) and \c available (bool,
-    whether the file that the widget needs is there, see updateAvailable()).
+    The roles of a row:
+
+    \table
+    \header \li Role \li Type \li Value
+    \row \li \c title \li string \li The title in the user's language, or the untranslated one.
+    \row \li \c description \li string \li The description in the user's language; empty without a
+         translation.
+    \row \li \c icon \li string \li As in the definition file.
+    \row \li \c path \li string \li As in the definition file: the widget's identity, which
+         enableWidget() and disableWidget() take.
+    \row \li \c enabled \li bool \li Whether the widget is enabled.
+    \row \li \c available \li bool \li Whether the file that the widget needs is there, see
+         updateAvailable().
+    \endtable
 
     A widget takes its place by its order when it is first listed and keeps it. A definition file
     that cannot be read is passed over with a warning, as is each entry that is no widget.

@@ -52,8 +52,8 @@ QDBusPendingCall send(const QDBusMessage &call)
     \inqmlmodule com.marlo.settings.system
     \brief Formats, empties, mounts, unmounts and probes a memory card.
 
-    A card is named twice: \l deviceName is what the disk service (UDisks2 on the system bus) knows
-    it by, \l devicePath is the device node of its partition. Every operation is a sequence of
+    A card is named twice: \l deviceName is what the disk service knows it by, \l devicePath is the
+    device node of its partition. Every operation is a sequence of
     commands that are carried out one after the other, without waiting, while \l status tells which:
 
     \table
@@ -65,6 +65,11 @@ QDBusPendingCall send(const QDBusMessage &call)
     \row \li unmount() \li \c Unmounting, \c Idle
     \endtable
 
+    Mounting and unmounting are done by the disk service: the methods \c Mount and \c Unmount of
+    \c org.freedesktop.UDisks2.Filesystem at \c{/org/freedesktop/UDisks2/block_devices/<deviceName>}
+    of the service \c org.freedesktop.UDisks2 on the system bus. Removing files finds the card by its
+    \l devicePath in \c{/etc/mtab}.
+
     Formatting and probing are done by the program \c /usr/libexec/sdcardhelper. It is run with
     \c format_vfat, \c format_ext4 or \c probe and the name of the partition, such as \c mmcblk1p1,
     has to exit with 0 on success, and writes the type of the file system that it has found to its
@@ -75,12 +80,20 @@ QDBusPendingCall send(const QDBusMessage &call)
     set by the time they run.
 
     \qml
-    MemoryCardFormatter {
-        deviceName: "mmcblk1p1"
-        devicePath: "/dev/mmcblk1p1"
-        onUnmountError: {
-            if (error === MemoryCardFormatter.ErrorDeviceBusy) {
-                console.log("something uses the card")
+    Button {
+        text: "Format"
+        enabled: !card.busy
+        onClicked: card.format("vfat")
+
+        MemoryCardFormatter {
+            id: card
+
+            deviceName: "mmcblk1p1"
+            devicePath: "/dev/mmcblk1p1"
+            onUnmountError: {
+                if (error === MemoryCardFormatter.ErrorDeviceBusy) {
+                    console.log("something uses the card")
+                }
             }
         }
     }
@@ -374,7 +387,8 @@ void MemoryCardFormatter::unmount()
 /*!
     \qmlsignal MemoryCardFormatter::unmountError(enumeration error)
 
-    Emitted when the disk service does not unmount the card, as mountError() is.
+    Emitted when the disk service does not unmount the card, as mountError() is when it does not
+    mount it; the values of \a error are the same.
 */
 
 void MemoryCardFormatter::commandError(QProcess::ProcessError error)

@@ -60,7 +60,7 @@ QSet<QString> toSet(const QStringList &list)
     \brief Lists the quick actions of the events screen.
 
     Packages offer a quick action by installing a definition file, \c{*.conf}, into
-    \c /usr/share/glimmera/quickactions. The model lists those that the user has enabled, in the
+    \c /usr/share/glimmera/quickactions; \l{marlo-quickactions(5)} tells what it holds. The model lists those that the user has enabled, in the
     user's order; with \l showPotential it lists all of them. It follows the directory, about a
     second after a change, and the user's lists. (Rows that stay keep their places, though: what
     another model or process orders anew is seen when the model is created the next time.)
@@ -72,8 +72,17 @@ QSet<QString> toSet(const QStringList &list)
     actions that are never listed.
     \endlist
 
-    Roles: \c title (text in the user's language, undefined if there is none), \c icon (as in the
-    definition file), \c path (of the definition file, the action's identity) and \c enabled (bool).
+    The roles of a row:
+
+    \table
+    \header \li Role \li Type \li Value
+    \row \li \c title \li string \li The title in the user's language, or its identifier without a
+         translation; undefined if the file gives no title.
+    \row \li \c icon \li string \li As in the definition file; undefined if it gives none.
+    \row \li \c path \li string \li The path of the definition file: the action's identity, which
+         enableAction() and disableAction() take.
+    \row \li \c enabled \li bool \li Whether the user has enabled the action.
+    \endtable
 
     A definition file that cannot be read is listed without title and icon, with a warning.
 
@@ -122,8 +131,9 @@ QuickActionsModel::~QuickActionsModel()
     \qmlproperty bool QuickActionsModel::showPotential
 
     Whether every action that is offered is listed, enabled or not, for a page on which the user
-    enables, disables and orders them. The enabled ones come first when the list is first loaded, in
-    the user's order, then the others by the priority that their files give. The default is false.
+    enables, disables and orders them. The enabled ones are placed first, in the user's order, then
+    the others by the priority that their files give, each before the first row of a greater priority
+    or of none, whether that is enabled or not. The default is false.
 */
 bool QuickActionsModel::showPotential() const
 {
@@ -216,8 +226,9 @@ QVariantMap QuickActionsModel::get(int index) const
     answer.
 
     If the call fails because its service does not exist, and the action names a package that it
-    needs, the application store client (\c com.marlo.marlostore on the session bus) is asked to
-    show that package. Every failure but that of a service which does not answer in time gives a
+    needs, the application store client is asked to show that package: by the method \c showApp of
+    \c com.marlo.marlostore at the path \c /StoreClient of the service of that name on the session
+    bus. Every failure but that of a service which does not answer in time gives a
     warning, and so does an index without a row.
 */
 void QuickActionsModel::triggerAction(int index)
@@ -279,9 +290,9 @@ void QuickActionsModel::disableAction(const QString &path)
     Moves the row and the entry of the user's list at \a index to \a newIndex, and notes that the
     user has chosen, as enableAction() does. An index outside the user's list does nothing.
 
-    The rows have to begin with the enabled actions in the user's order, as they do unless an
-    enabled action is missing or blocked, has been enabled while \l showPotential was set, or has
-    been given another place by somebody else.
+    The rows have to begin with the enabled actions in the user's order. Without \l showPotential they
+    do, unless an enabled action is missing or blocked, or has been given another place by somebody
+    else; with it, actions that are not enabled may stand among them.
 */
 void QuickActionsModel::move(int index, int newIndex)
 {

@@ -1,0 +1,266 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+// The examples of the README, the manual pages and the reference work as they stand there.
+
+#include "files.h"
+#include "messagelog.h"
+#include "mgconfitem.h"
+#include "recordingservice.h"
+
+#include <QAbstractItemModel>
+#include <QDir>
+#include <QFile>
+#include <QGuiApplication>
+#include <QLocale>
+#include <QQmlComponent>
+#include <QQmlEngine>
+#include <QQuickItem>
+#include <QQuickWindow>
+#include <QRegularExpression>
+#include <QtTest>
+
+#include <memory>
+
+namespace {
+
+const QString actionPath = QStringLiteral("/usr/share/glimmera/quickactions/torch.conf");
+const QString widgetsPath = QStringLiteral("/usr/share/glimmera/eventswidgets/weather.json");
+const QString programPath = QStringLiteral("/usr/bin/weather");
+const QString enabledKey = QStringLiteral("/desktop/glimmera-marlo-home/events_screen_actions");
+
+QByteArray contentOf(const QString &path)
+{
+    QFile file(QStringLiteral(SOURCE_DIR "/") + path);
+    if (!file.open(QIODevice::ReadOnly)) {
+        qFatal("cannot open %s", qPrintable(file.fileName()));
+    }
+    return file.readAll();
+}
+
+QByteArray example(const QString &name)
+{
+    return contentOf(QStringLiteral("docs/examples/") + name);
+}
+
+QStringList exampleNames()
+{
+    return QDir(QStringLiteral(SOURCE_DIR "/docs/examples")).entryList(QDir::Files);
+}
+
+QVariant valueAt(const QAbstractItemModel &model, int row, const QByteArray &role)
+{
+    return model.data(model.index(row, 0), model.roleNames().key(role, -1));
+}
+
+} // namespace
+
+class TestExamples : public QObject
+{
+    Q_OBJECT
+
+private Q_SLOTS:
+    void initTestCase();
+    void init() { m_log = std::make_unique<MessageLog>(); }
+    void cleanup()
+    {
+        QCOMPARE(m_log->takeReport(), QString());
+        m_log.reset();
+    }
+
+    void definesAQuickAction();
+    void definesAWidget();
+    void listsTheActionOnAPage();
+    void runsThoseOfTheReference_data();
+    void runsThoseOfTheReference();
+    void standInTheReadme_data();
+    void standInTheReadme();
+    void areAllThatTheReadmeShows();
+    void standInTheManualPages_data();
+    void standInTheManualPages();
+
+private:
+    std::unique_ptr<QObject> create(const QByteArray &document);
+
+    QQmlEngine m_engine;
+    std::unique_ptr<MessageLog> m_log;
+};
+
+void TestExamples::initTestCase()
+{
+    QLocale::setDefault(QLocale(QStringLiteral("en_GB")));
+    m_engine.addImportPath(QStringLiteral(QML_BUILD_DIR));
+    Files::write(actionPath, example(QStringLiteral("torch.conf")));
+    Files::write(widgetsPath, example(QStringLiteral("weather.json")));
+    Files::write(QStringLiteral("/var/lib/bluetooth/board-address"), "00:1A:7D:DA:71:13\n");
+    Files::write(
+        QStringLiteral("/usr/share/marlo-settings/platform-eula/tarnwick_termsofuse-en_GB.txt"),
+        "Terms\nBody\n");
+    MGConfItem(enabledKey).set(QStringList(actionPath));
+}
+
+std::unique_ptr<QObject> TestExamples::create(const QByteArray &document)
+{
+    QQmlComponent component(&m_engine);
+    component.setData(document, QUrl(QStringLiteral("file:///example.qml")));
+    std::unique_ptr<QObject> object(component.create());
+    if (object == nullptr) {
+        qWarning("%s", qPrintable(component.errorString()));
+    }
+    return object;
+}
+
+void TestExamples::definesAQuickAction()
+{
+    RecordingService torch(QDBusConnection::SessionBus, QStringLiteral("com.marlo.torch"));
+    const auto object = create("import com.marlo.settings.system 1.0\nQuickActionsModel {}");
+    auto *model = qobject_cast<QAbstractItemModel *>(object.get());
+    QVERIFY(model != nullptr);
+    QTRY_COMPARE(model->rowCount(), 1);
+    // Without its catalog the title is the identifier.
+    QCOMPARE(valueAt(*model, 0, "title"), QVariant(QStringLiteral("torch-quick-action")));
+    QCOMPARE(valueAt(*model, 0, "icon"),
+             QVariant(QStringLiteral("/usr/share/glimmera/icons/torch.svg")));
+
+    QVERIFY(QMetaObject::invokeMethod(model, "triggerAction", Q_ARG(int, 0)));
+    QTRY_COMPARE(torch.calls().size(), 1);
+    const QDBusMessage call = torch.calls().constFirst();
+    QCOMPARE(call.path(), QStringLiteral("/"));
+    QCOMPARE(call.interface(), QStringLiteral("com.marlo.torch"));
+    QCOMPARE(call.member(), QStringLiteral("toggle"));
+    QCOMPARE(call.arguments(), QVariantList{QStringLiteral("bright")});
+}
+
+void TestExamples::definesAWidget()
+{
+    Files::remove(programPath);
+    const auto object = create("import com.marlo.settings.system 1.0\nEventsWidgetsModel {}");
+    auto *model = qobject_cast<QAbstractItemModel *>(object.get());
+    QVERIFY(model != nullptr);
+    QCOMPARE(model->rowCount(), 1);
+    QCOMPARE(valueAt(*model, 0, "title"), QVariant(QStringLiteral("Weather")));
+    QCOMPARE(valueAt(*model, 0, "description"), QVariant(QString()));
+    QCOMPARE(valueAt(*model, 0, "icon"), QVariant(QStringLiteral("image://theme/weather")));
+    QCOMPARE(valueAt(*model, 0, "path"),
+             QVariant(QStringLiteral("/usr/share/weather/EventsWidget.qml")));
+    QCOMPARE(valueAt(*model, 0, "enabled"), QVariant(true));
+    QCOMPARE(valueAt(*model, 0, "available"), QVariant(false));
+
+    Files::write(programPath, "");
+    QVERIFY(QMetaObject::invokeMethod(model, "updateAvailable"));
+    QCOMPARE(valueAt(*model, 0, "available"), QVariant(true));
+}
+
+void TestExamples::listsTheActionOnAPage()
+{
+    const auto object = create(example(QStringLiteral("page.qml")));
+    auto *page = qobject_cast<QQuickItem *>(object.get());
+    QVERIFY(page != nullptr);
+    QQuickWindow window;
+    window.resize(page->size().toSize());
+    page->setParentItem(window.contentItem());
+    window.show();
+    QVERIFY(QTest::qWaitForWindowExposed(&window));
+    QTRY_COMPARE(page->property("count"), QVariant(1));
+
+    QQuickItem *row = nullptr;
+    QTRY_VERIFY((QMetaObject::invokeMethod(page, "itemAtIndex", Q_RETURN_ARG(QQuickItem *, row),
+                                           Q_ARG(int, 0)),
+                 row != nullptr));
+    QCOMPARE(row->property("text"), QVariant(QStringLiteral("torch-quick-action")));
+
+    RecordingService torch(QDBusConnection::SessionBus, QStringLiteral("com.marlo.torch"));
+    QTest::mouseClick(&window, Qt::LeftButton, Qt::NoModifier,
+                      row->mapToScene({row->width() / 2, row->height() / 2}).toPoint());
+    QTRY_COMPARE(torch.calls().size(), 1);
+}
+
+void TestExamples::runsThoseOfTheReference_data()
+{
+    QTest::addColumn<QByteArray>("document");
+    const QStringList folders = {QStringLiteral("deviceinfo"), QStringLiteral("documents"),
+                                 QStringLiteral("eventswidgets"), QStringLiteral("memorycard"),
+                                 QStringLiteral("quickactions")};
+    int found = 0;
+    for (const QString &folder : folders) {
+        const QStringList names = QDir(QStringLiteral(SOURCE_DIR "/") + folder)
+                                      .entryList({QStringLiteral("*.cpp")}, QDir::Files);
+        for (const QString &name : names) {
+            static const QRegularExpression block(QStringLiteral("(?s)\\\\qml\\n(.*?)\\\\endqml"));
+            auto blocks =
+                block.globalMatch(QString::fromUtf8(contentOf(folder + QLatin1Char('/') + name)));
+            while (blocks.hasNext()) {
+                ++found;
+                QTest::addRow("%s %d", qPrintable(name), found)
+                    << "import QtQuick 2.15\nimport QtQuick.Controls 2.15\n"
+                       "import com.marlo.settings.system 1.0\n"
+                        + blocks.next().captured(1).toUtf8();
+            }
+        }
+    }
+    // That each type has one is for the test of the reference to see.
+    QVERIFY(found >= 11);
+}
+
+void TestExamples::runsThoseOfTheReference()
+{
+    QFETCH(const QByteArray, document);
+    const auto object = create(document);
+    QVERIFY(object != nullptr);
+}
+
+void TestExamples::standInTheReadme_data()
+{
+    QTest::addColumn<QByteArray>("text");
+    const QStringList names = exampleNames();
+    for (const QString &name : names) {
+        QTest::newRow(qPrintable(name)) << example(name);
+    }
+}
+
+void TestExamples::standInTheReadme()
+{
+    QFETCH(const QByteArray, text);
+    QVERIFY2(contentOf(QStringLiteral("README.md")).contains("\n" + text + "```\n"),
+             "the README has another text than docs/examples");
+}
+
+void TestExamples::areAllThatTheReadmeShows()
+{
+    static const QRegularExpression block(QStringLiteral("(?s)```(?:qml|ini|json)\\n(.*?)```"));
+    auto blocks = block.globalMatch(QString::fromUtf8(contentOf(QStringLiteral("README.md"))));
+    int found = 0;
+    while (blocks.hasNext()) {
+        ++found;
+        const QByteArray text = blocks.next().captured(1).toUtf8();
+        const QStringList names = exampleNames();
+        QVERIFY2(std::any_of(names.begin(), names.end(),
+                             [&text](const QString &name) { return example(name) == text; }),
+                 text.constData());
+    }
+    QCOMPARE(found, exampleNames().size());
+}
+
+void TestExamples::standInTheManualPages_data()
+{
+    QTest::addColumn<QString>("page");
+    QTest::addColumn<QString>("file");
+    QTest::newRow("quick action") << "docs/man/marlo-quickactions.5"
+                                  << "torch.conf";
+    QTest::newRow("widget") << "docs/man/marlo-eventswidgets.5"
+                            << "weather.json";
+}
+
+void TestExamples::standInTheManualPages()
+{
+    QFETCH(const QString, page);
+    QFETCH(const QString, file);
+    // How a manual page writes a backslash.
+    const QByteArray text = contentOf(page).replace("\\e", "\\");
+    QVERIFY2(text.contains(".Bd -literal -offset indent\n" + example(file) + ".Ed\n"),
+             "the manual page has another text than docs/examples");
+}
+
+QTEST_MAIN(TestExamples)
+
+#include "tst_examples.moc"

@@ -20,6 +20,7 @@
 #include <QRegularExpression>
 #include <QtTest>
 
+#include <algorithm>
 #include <memory>
 
 namespace {
@@ -51,6 +52,13 @@ QStringList exampleNames()
 QVariant valueAt(const QAbstractItemModel &model, int row, const QByteArray &role)
 {
     return model.data(model.index(row, 0), model.roleNames().key(role, -1));
+}
+
+bool isBusy(const QObject &example)
+{
+    const QList<QObject *> parts = example.findChildren<QObject *>();
+    return std::any_of(parts.begin(), parts.end(),
+                       [](const QObject *part) { return part->property("busy").toBool(); });
 }
 
 } // namespace
@@ -207,6 +215,8 @@ void TestExamples::runsThoseOfTheReference()
     QFETCH(const QByteArray, document);
     const auto object = create(document);
     QVERIFY(object != nullptr);
+    // The card of an example is probed: its helper, which is not there, is not to be left behind.
+    QTRY_VERIFY(!isBusy(*object));
 }
 
 void TestExamples::standInTheReadme_data()

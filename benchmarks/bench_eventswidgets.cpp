@@ -1,16 +1,11 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-/*
-    Loading events widgets, by their number and beside the parsing of their files alone, and a
-    titles view beside a bare loop over the data of its rows. Runs in the tests' throw-away root.
-
-    The two sides of a ratio take turns, and a figure is the median of the rounds' ratios, with the
-    lowest and the highest. The exit status is 1 when a bar is clearly missed: by the median and by
-    all rounds but one at most.
-*/
+// Loading and rescanning events widgets, beside the parsing of their files alone, and a titles view
+// beside a bare loop over the data of its rows.
 
 #include "eventswidgetsmodel.h"
+#include "rounds.h"
 #include "titlesview.h"
 
 #include <QCoreApplication>
@@ -21,26 +16,18 @@
 #include <QJsonObject>
 #include <QStringListModel>
 
-#include <algorithm>
-#include <array>
-#include <cstdio>
-#include <ctime>
-#include <functional>
+#include <memory>
 
 namespace {
 
 const QLatin1String directory("/usr/share/glimmera/eventswidgets");
 
-constexpr int rounds = 9;
-constexpr int few = 500;
-constexpr int many = 5000;
-constexpr int titles = 10000;
-// So many times is the shorter side run in a round, for a time that can be measured.
-constexpr int repetitions = many / few;
-
 constexpr double growthBar = 1.5;
 constexpr double parsingBar = 1.5;
 constexpr double titlesBar = 1.3;
+
+constexpr int few = 500;
+constexpr int many = 5000;
 
 enum class Layout { OneFile, OneFileEach };
 
@@ -91,29 +78,6 @@ void writeDefinitions(Layout layout, int count)
     }
 }
 
-// Of processor time, with the kernel's: what else the machine does at the moment is left out.
-double nanoseconds(const std::function<void()> &work)
-{
-    const auto now = [] {
-        timespec time = {};
-        clock_gettime(CLOCK_THREAD_CPUTIME_ID, &time);
-        return double(time.tv_sec) * 1e9 + double(time.tv_nsec);
-    };
-    const double start = now();
-    work();
-    return now() - start;
-}
-
-double loadingTime(int expectedRows)
-{
-    EventsWidgetsModel model;
-    const double time = nanoseconds([&model] { model.componentComplete(); });
-    if (model.rowCount() != expectedRows) {
-        qFatal("%d rows instead of %d", model.rowCount(), expectedRows);
-    }
-    return time;
-}
-
 void parseAll()
 {
     const QDir definitions(directory);
@@ -127,59 +91,82 @@ void parseAll()
     }
 }
 
-struct Row {
-    const char *work;
-    const char *comparedTo;
-    double bar;
-};
-
-// Prints the row; false if its bar is clearly missed.
-bool report(const Row &row, double time, std::array<double, rounds> ratios)
+// Both sides read as many widgets as makes the most in all, so that every count takes about as long.
+Rounds::Work parsing(Layout layout, int count)
 {
-    std::sort(ratios.begin(), ratios.end());
-    const double median = ratios.at(rounds / 2);
-    const auto held = std::count_if(ratios.cbegin(), ratios.cend(),
-                                    [&row](double ratio) { return ratio <= row.bar; });
-    const bool missed = median > row.bar && held <= 1;
-    std::printf("%-46s %8.2f ms  %.2f x %s (%.2f-%.2f, bar %.2f)%s\n", row.work, time / 1e6, median,
-                row.comparedTo, ratios.front(), ratios.back(), row.bar, missed ? " MISSED" : "");
-    std::fflush(stdout);
-    return !missed;
+    return {[=] {
+                for (int i = 0; i < many / count; ++i) {
+                    parseAll();
+                }
+            },
+            [=] { writeDefinitions(layout, count); }};
+}
+
+using Models = std::vector<std::unique_ptr<EventsWidgetsModel>>;
+
+void makeModels(Layout layout, int count, Models *models)
+{
+    models->clear();
+    writeDefinitions(layout, count);
+    for (int i = 0; i < many / count; ++i) {
+        models->push_back(std::make_unique<EventsWidgetsModel>());
+    }
+}
+
+void load(const Models &models, int count)
+{
+    for (const auto &model : models) {
+        model->componentComplete();
+        if (model->rowCount() != count) {
+            qFatal("%d rows instead of %d", model->rowCount(), count);
+        }
+    }
+}
+
+Rounds::Work loading(Layout layout, int count)
+{
+    const auto models = std::make_shared<Models>();
+    return {[=] { load(*models, count); }, [=] { makeModels(layout, count, models.get()); }};
+}
+
+Rounds::Work rescanning(Layout layout, int count)
+{
+    const auto models = std::make_shared<Models>();
+    return {[=] {
+                for (const auto &model : *models) {
+                    model->directoryChanged();
+                }
+            },
+            [=] {
+                makeModels(layout, count, models.get());
+                load(*models, count);
+            }};
 }
 
 bool compareLoading(Layout layout)
 {
-    const bool oneFile = layout == Layout::OneFile;
-    std::array<double, rounds> growth = {};
-    std::array<double, rounds> parsing = {};
-    std::array<double, rounds> times = {};
-    for (int round = -1; round < rounds; ++round) {
-        writeDefinitions(layout, few);
-        double fewTime = 0;
-        for (int i = 0; i < repetitions; ++i) {
-            fewTime += loadingTime(few);
-        }
-        writeDefinitions(layout, many);
-        const double parsingTime = nanoseconds(parseAll);
-        const double manyTime = loadingTime(many);
-        // The first round is for warming up.
-        if (round >= 0) {
-            growth.at(size_t(round)) = manyTime / fewTime;
-            parsing.at(size_t(round)) = manyTime / parsingTime;
-            times.at(size_t(round)) = manyTime;
+    const QString files =
+        layout == Layout::OneFile ? QStringLiteral("one file") : QStringLiteral("one file each");
+    const auto times =
+        Rounds::times({loading(layout, few), rescanning(layout, few), parsing(layout, few),
+                       loading(layout, many), rescanning(layout, many), parsing(layout, many)});
+    bool kept = true;
+    for (const size_t first : {0, 3}) {
+        for (const size_t work : {0, 1}) {
+            const QString text =
+                QStringLiteral("%1 %2 widgets, %3")
+                    .arg(work == 0 ? QStringLiteral("load") : QStringLiteral("rescan"))
+                    .arg(first == 0 ? few : many)
+                    .arg(files);
+            kept &= Rounds::report(qPrintable(text), "QJsonDocument on the same files",
+                                   times[first + work], times[first + 2], parsingBar);
+            if (first > 0) {
+                kept &= Rounds::report(qPrintable(text), "as long for each as 500",
+                                       times[first + work], times[work], growthBar);
+            }
         }
     }
-    std::sort(times.begin(), times.end());
-    const double time = times.at(rounds / 2);
-    const bool growthHeld =
-        report({oneFile ? "load 5,000 widgets, one file" : "load 5,000 widgets, one file each",
-                "as long per widget as 500", growthBar},
-               time, growth);
-    const bool parsingHeld =
-        report({oneFile ? "load 5,000 widgets, one file" : "load 5,000 widgets, one file each",
-                "parsing", parsingBar},
-               time, parsing);
-    return growthHeld && parsingHeld;
+    return kept;
 }
 
 // What a view of these roles has to ask at least: the second one of every row, if there are two,
@@ -195,7 +182,7 @@ void readTitles(const QAbstractListModel &model, const QVector<int> &roles)
     }
 }
 
-bool compareTitles(const char *work, QAbstractListModel *model, const QVector<int> &roles)
+bool compareTitles(const char *kind, QAbstractListModel *model, const QVector<int> &roles)
 {
     const auto roleName = [model, &roles](int i) {
         return QString::fromLatin1(model->roleNames().value(roles.at(i)));
@@ -207,27 +194,28 @@ bool compareTitles(const char *work, QAbstractListModel *model, const QVector<in
         view.setMatchRole(roleName(1));
         view.setMatch(true);
     }
-    const int expected = roles.size() > 1 ? titles / 2 : titles;
+    const int rows = model->rowCount();
+    const int expected = roles.size() > 1 ? rows / 2 : rows;
     if (view.values().size() != expected) {
         qFatal("%d titles instead of %d", view.values().size(), expected);
     }
 
-    std::array<double, rounds> ratios = {};
-    std::array<double, rounds> times = {};
-    for (int round = -1; round < rounds; ++round) {
-        double viewTime = 0;
-        double loopTime = 0;
-        for (int i = 0; i < repetitions; ++i) {
-            viewTime += nanoseconds([&view] { view.update(); });
-            loopTime += nanoseconds([model, &roles] { readTitles(*model, roles); });
-        }
-        if (round >= 0) {
-            ratios.at(size_t(round)) = viewTime / loopTime;
-            times.at(size_t(round)) = viewTime / repetitions;
-        }
-    }
-    std::sort(times.begin(), times.end());
-    return report({work, "a bare loop", titlesBar}, times.at(rounds / 2), ratios);
+    const int repetitions = 100000 / rows; // for a time that can be measured
+    const auto times = Rounds::times({
+        {[&view, repetitions] {
+            for (int i = 0; i < repetitions; ++i) {
+                view.update();
+            }
+        }},
+        {[model, &roles, repetitions] {
+            for (int i = 0; i < repetitions; ++i) {
+                readTitles(*model, roles);
+            }
+        }},
+    });
+    const QString work =
+        QStringLiteral("titles of %1 widgets, %2").arg(rows).arg(QLatin1String(kind));
+    return Rounds::report(qPrintable(work), "a bare loop of data()", times[0], times[1], titlesBar);
 }
 
 } // namespace
@@ -238,16 +226,15 @@ int main(int argc, char *argv[])
         qFatal("runs only in the throw-away root of tests/sandbox");
     }
     const QCoreApplication application(argc, argv);
-    bool held = compareLoading(Layout::OneFile);
-    held = compareLoading(Layout::OneFileEach) && held;
-
-    writeDefinitions(Layout::OneFile, titles);
-    EventsWidgetsModel widgets;
-    widgets.componentComplete();
-    held = compareTitles("titles of 10,000 widgets", &widgets, {EventsWidgetsModel::TitleRole})
-        && held;
-    held = compareTitles("titles of 10,000 widgets, half of them match", &widgets,
-                         {EventsWidgetsModel::TitleRole, EventsWidgetsModel::EnabledRole})
-        && held;
-    return held ? 0 : 1;
+    bool kept = compareLoading(Layout::OneFile);
+    kept &= compareLoading(Layout::OneFileEach);
+    for (const int count : {100, 10000}) {
+        writeDefinitions(Layout::OneFile, count);
+        EventsWidgetsModel widgets;
+        widgets.componentComplete();
+        kept &= compareTitles("all of them", &widgets, {EventsWidgetsModel::TitleRole});
+        kept &= compareTitles("the enabled half", &widgets,
+                              {EventsWidgetsModel::TitleRole, EventsWidgetsModel::EnabledRole});
+    }
+    return kept ? 0 : 1;
 }

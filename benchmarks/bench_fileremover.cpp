@@ -5,34 +5,28 @@
     The removal of all files from a card, side by side with `rm -rf` and with nothing but the
     unlinkat() calls on a tree that was listed beforehand, on tmpfs and (as root) on ext4.
 
-    In every round each of the three removes a tree of its own, fresh and written out, in shuffled
-    order; a figure is the median of the rounds' ratios, with the lowest and the highest, and the
-    same of the processor's time, which a busy machine disturbs less. The time that `rm` takes for
+    Each of the three removes a tree of its own, fresh and written out. The time that `rm` takes for
     an empty folder is taken off its times, so that its start does not count.
-
-    The exit status is 1 when a bar is clearly missed: a count or a size is above it, or a ratio is,
-    in the median and in all rounds but one at most.
 
     All of it happens in a mount namespace of this process: nothing stays mounted and no loop device
     in use when it ends, however it ends.
 */
 
 #include "fileremover.h"
+#include "rounds.h"
 
 #include <QByteArray>
-#include <QElapsedTimer>
 #include <QString>
 #include <QThreadPool>
 #include <QVector>
 
 #include <algorithm>
 #include <cerrno>
-#include <cmath>
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
 #include <functional>
-#include <random>
+#include <memory>
 
 #include <dirent.h>
 #include <fcntl.h>
@@ -57,6 +51,7 @@ constexpr int photoSize = 16 * 1024;
 constexpr double barOfRmOnTmpfs = 1.05;
 constexpr double barOfRmOnExt4 = 1.20;
 constexpr double barOfBareCalls = 1.20;
+constexpr double barOfProcessor = 1.05;
 constexpr double barOfCallsFlat = 1.01;
 constexpr double barOfCallsNested = 1.10;
 constexpr double barOfMemory = 8.0; // MiB
@@ -129,16 +124,16 @@ void makeChain(int top, int levels)
     close(folder);
 }
 
-struct Work {
+struct Tree {
     const char *name;
     int entries;
     double barOfCalls; // into the kernel, per entry; 0 for none
     std::function<void(int)> make;
 };
 
-const QVector<Work> &works()
+const QVector<Tree> &trees()
 {
-    static const QVector<Work> all = {
+    static const QVector<Tree> all = {
         {"100,000 files in one folder", 100000, barOfCallsFlat,
          [](int top) { makeFiles(top, 100000); }},
         {"1,000 folders of 100 files", 101000, barOfCallsNested,
@@ -152,210 +147,152 @@ const QVector<Work> &works()
     return all;
 }
 
-// A fresh tree, written out, so that nothing of its making is left to do while it is removed.
-QByteArray makeTree(const QByteArray &parent, const Work &work)
+QByteArray treePath(const QByteArray &parent)
 {
-    const QByteArray path = parent + "/tree";
+    return parent + "/tree";
+}
+
+// A fresh tree, written out, so that nothing of its making is left to do while it is removed.
+QByteArray makeTree(const QByteArray &parent, const Tree &tree)
+{
     const int folder =
         require(open(parent.constData(), O_RDONLY | O_DIRECTORY | O_CLOEXEC), "open");
     const int top = makeFolder(folder, "tree");
-    work.make(top);
+    tree.make(top);
     syncfs(top);
     close(top);
     close(folder);
-    return path;
+    return treePath(parent);
 }
 
-// What a removal takes, in milliseconds.
-struct Time {
-    double wall = 0;
-    double processor = 0;
-};
-
-double processorTime(const rusage &usage)
+void removeWithRemover(const QByteArray &path)
 {
-    const auto milliseconds = [](const timeval &time) {
-        return static_cast<double>(time.tv_sec) * 1e3 + static_cast<double>(time.tv_usec) / 1e3;
-    };
-    return milliseconds(usage.ru_utime) + milliseconds(usage.ru_stime);
-}
-
-// Times a function, and what it waits for if that is a child process.
-template<typename Function> Time timeOf(int who, Function function)
-{
-    rusage before = {};
-    rusage after = {};
-    getrusage(who, &before);
-    QElapsedTimer timer;
-    timer.start();
-    function();
-    const double wall = static_cast<double>(timer.nsecsElapsed()) / 1e6;
-    getrusage(who, &after);
-    return {wall, processorTime(after) - processorTime(before)};
-}
-
-Time timeOfRemover(const QByteArray &path)
-{
-    bool removed = false;
-    const Time time = timeOf(
-        RUSAGE_SELF, [&] { removed = FileRemover::removeAllEntries(QString::fromUtf8(path)); });
-    if (!removed || rmdir(path.constData()) != 0) {
+    if (!FileRemover::removeAllEntries(QString::fromUtf8(path)) || rmdir(path.constData()) != 0) {
         die("the remover left something");
     }
-    return time;
 }
 
-Time timeOfRm(const QByteArray &path)
+void removeWithRm(const QByteArray &path)
 {
     QByteArray program("rm");
     QByteArray option("-rf");
     QByteArray argument(path);
     char *const arguments[] = {program.data(), option.data(), argument.data(), nullptr};
-    return timeOf(RUSAGE_CHILDREN, [&] {
-        pid_t pid = 0;
-        int status = 0;
-        if (posix_spawnp(&pid, "rm", nullptr, nullptr, arguments, environ) != 0
-            || waitpid(pid, &status, 0) != pid || status != 0) {
-            die("rm");
-        }
-    });
-}
-
-struct Removal {
-    int folder;
-    QByteArray name;
-    int flags;
-};
-
-void list(int folder, QVector<Removal> &removals, QVector<int> &folders)
-{
-    DIR *const entries = fdopendir(require(dup(folder), "dup"));
-    while (const dirent *entry = readdir(entries)) {
-        const QByteArray name(entry->d_name);
-        if (name == "." || name == "..") {
-            continue;
-        }
-        if (entry->d_type != DT_DIR) {
-            removals.append({folder, name, 0});
-            continue;
-        }
-        const int below =
-            require(openat(folder, name.constData(), O_RDONLY | O_DIRECTORY), "openat");
-        folders.append(below);
-        list(below, removals, folders);
-        removals.append({folder, name, AT_REMOVEDIR});
+    pid_t pid = 0;
+    int status = 0;
+    if (posix_spawnp(&pid, "rm", nullptr, nullptr, arguments, environ) != 0
+        || waitpid(pid, &status, 0) != pid || status != 0) {
+        die("rm");
     }
-    closedir(entries);
 }
 
-Time timeOfBareCalls(const QByteArray &path)
+// A tree that was listed: its removal is nothing but calls into the kernel.
+class BareCalls
 {
-    QVector<Removal> removals;
-    QVector<int> folders;
-    folders.append(require(open(path.constData(), O_RDONLY | O_DIRECTORY), "open"));
-    list(folders.first(), removals, folders);
-    const Time time = timeOf(RUSAGE_SELF, [&] {
-        for (const Removal &removal : qAsConst(removals)) {
+public:
+    explicit BareCalls(const QByteArray &path) : m_path(path)
+    {
+        m_folders.append(require(open(path.constData(), O_RDONLY | O_DIRECTORY), "open"));
+        list(m_folders.first());
+    }
+    ~BareCalls()
+    {
+        for (const int folder : qAsConst(m_folders)) {
+            close(folder);
+        }
+    }
+    Q_DISABLE_COPY_MOVE(BareCalls)
+
+    void remove() const
+    {
+        for (const Removal &removal : m_removals) {
             require(unlinkat(removal.folder, removal.name.constData(), removal.flags), "unlinkat");
         }
-    });
-    for (const int folder : qAsConst(folders)) {
-        close(folder);
+        require(rmdir(m_path.constData()), "rmdir");
     }
-    require(rmdir(path.constData()), "rmdir");
-    return time;
-}
 
-double median(QVector<double> values)
-{
-    std::sort(values.begin(), values.end());
-    const int middle = values.size() / 2;
-    return values.size() % 2 != 0 ? values[middle] : (values[middle - 1] + values[middle]) / 2;
-}
+private:
+    struct Removal {
+        int folder;
+        QByteArray name;
+        int flags;
+    };
 
-bool everythingHeld = true;
-
-struct Ratios {
-    QVector<double> wall;
-    QVector<double> processor;
-
-    void append(const Time &time, const Time &reference)
+    void list(int folder)
     {
-        wall.append(time.wall / reference.wall);
-        processor.append(time.processor / reference.processor);
+        DIR *const entries = fdopendir(require(dup(folder), "dup"));
+        while (const dirent *entry = readdir(entries)) {
+            const QByteArray name(entry->d_name);
+            if (name == "." || name == "..") {
+                continue;
+            }
+            if (entry->d_type != DT_DIR) {
+                m_removals.append({folder, name, 0});
+                continue;
+            }
+            const int below =
+                require(openat(folder, name.constData(), O_RDONLY | O_DIRECTORY), "openat");
+            m_folders.append(below);
+            list(below);
+            m_removals.append({folder, name, AT_REMOVEDIR});
+        }
+        closedir(entries);
     }
+
+    QByteArray m_path;
+    QVector<Removal> m_removals;
+    QVector<int> m_folders;
 };
 
-// A figure, and what it says about its bar.
-void printRatios(const char *than, const Ratios &ratios, double bar)
+// Takes what a program takes for nothing off its times.
+void takeOff(const Rounds::Times &start, Rounds::Times *times)
 {
-    const auto [lowest, highest] = std::minmax_element(ratios.wall.begin(), ratios.wall.end());
-    const auto held =
-        std::count_if(ratios.wall.begin(), ratios.wall.end(), [=](double r) { return r <= bar; });
-    const double middle = median(ratios.wall);
-    const char *verdict = "";
-    if (middle > bar && held <= 1) {
-        verdict = " MISSED";
-        everythingHeld = false;
-    } else if (middle > bar) {
-        verdict = " over, not clearly";
+    const auto median = [&start](double Rounds::Time::*clock) {
+        std::vector<double> values;
+        for (const Rounds::Time &time : start) {
+            values.push_back(time.*clock);
+        }
+        std::nth_element(values.begin(), values.begin() + rounds / 2, values.end());
+        return values[rounds / 2];
+    };
+    for (Rounds::Time &time : *times) {
+        time.wall -= median(&Rounds::Time::wall);
+        time.processor -= median(&Rounds::Time::processor);
     }
-    std::printf("  %.2f x %s (%.2f-%.2f, bar %.2f%s; processor %.2f)", middle, than, *lowest,
-                *highest, bar, verdict, median(ratios.processor));
 }
 
-void printCount(const char *format, double value, double bar)
-{
-    std::printf(format, value, bar, value > bar ? " MISSED" : "");
-    everythingHeld = everythingHeld && value <= bar;
-}
-
-void compareTimes(const QByteArray &parent, const char *fileSystem, const Work &work,
+bool compareTimes(const QByteArray &parent, const char *fileSystem, const Tree &tree,
                   double barOfRm)
 {
+    const Tree nothing = {"nothing", 0, 0, [](int) {}};
+    const QByteArray path = treePath(parent);
+    const auto make = [&] { makeTree(parent, tree); };
+    std::vector<Rounds::Work> works = {
+        {[&] { removeWithRemover(path); }, make},
+        {[&] { removeWithRm(path); }, make},
+        {[&] { removeWithRm(path); }, [&] { makeTree(parent, nothing); }},
+    };
     // A chain this long cannot be held open, which the bare calls need.
-    const bool deep = work.entries == depth;
-    const Work nothing = {"nothing", 0, 0, [](int) {}};
-    QVector<double> wallOfStart;
-    QVector<double> processorOfStart;
-    for (int i = 0; i < 2 * rounds; ++i) {
-        const Time time = timeOfRm(makeTree(parent, nothing));
-        wallOfStart.append(time.wall);
-        processorOfStart.append(time.processor);
-    }
-
-    std::mt19937 random(std::random_device{}());
-    QVector<double> times;
-    Ratios overRm;
-    Ratios overBareCalls;
-    for (int round = 0; round < rounds; ++round) {
-        Time remover;
-        Time rm;
-        Time bareCalls;
-        QVector<std::function<void()>> contenders = {
-            [&] { remover = timeOfRemover(makeTree(parent, work)); },
-            [&] { rm = timeOfRm(makeTree(parent, work)); },
-        };
-        if (!deep) {
-            contenders.append([&] { bareCalls = timeOfBareCalls(makeTree(parent, work)); });
-        }
-        std::shuffle(contenders.begin(), contenders.end(), random);
-        for (const auto &contender : qAsConst(contenders)) {
-            contender();
-        }
-        rm.wall -= median(wallOfStart);
-        rm.processor -= median(processorOfStart);
-        times.append(remover.wall);
-        overRm.append(remover, rm);
-        overBareCalls.append(remover, bareCalls);
-    }
-    std::printf("%-29s %-6s %8.1f ms", work.name, fileSystem, median(times));
-    printRatios("rm -rf", overRm, barOfRm);
+    const bool deep = tree.entries == depth;
+    std::unique_ptr<BareCalls> bareCalls;
     if (!deep) {
-        printRatios("bare calls", overBareCalls, barOfBareCalls);
+        works.push_back({[&] { bareCalls->remove(); },
+                         [&] {
+                             bareCalls.reset();
+                             make();
+                             bareCalls = std::make_unique<BareCalls>(path);
+                         }});
     }
-    std::printf("\n");
-    std::fflush(stdout);
+    auto times = Rounds::times(works, rounds);
+    takeOff(times[2], &times[1]);
+    const QByteArray work = QByteArray("remove ") + tree.name + ", " + fileSystem;
+    bool kept = Rounds::report(work, "rm -rf", times[0], times[1], barOfRm, &Rounds::Time::wall);
+    kept &= Rounds::report(work, "rm -rf, processor", times[0], times[1], barOfProcessor);
+    if (!deep) {
+        kept &= Rounds::report(work, "bare calls", times[0], times[3], barOfBareCalls,
+                               &Rounds::Time::wall);
+    }
+    return kept;
 }
 
 // Traces a child while it removes a tree: counts what strace -c counts, and the open files.
@@ -447,26 +384,22 @@ double peakMemory(const QByteArray &path)
     return static_cast<double>(growth) / 1024;
 }
 
-void countAndMeasure(const QByteArray &parent, const Work &work)
+bool countAndMeasure(const QByteArray &parent, const Tree &tree)
 {
     long calls = 0;
     long openFiles = 0;
-    const QByteArray tree = makeTree(parent, work);
-    countCalls(tree, calls, openFiles);
-    require(rmdir(tree.constData()), "rmdir");
-    const double memory = peakMemory(makeTree(parent, work));
-    require(rmdir(tree.constData()), "rmdir");
+    const QByteArray path = makeTree(parent, tree);
+    countCalls(path, calls, openFiles);
+    require(rmdir(path.constData()), "rmdir");
+    const double memory = peakMemory(makeTree(parent, tree));
+    require(rmdir(path.constData()), "rmdir");
 
-    const double callsPerEntry = static_cast<double>(calls) / work.entries;
-    std::printf("%-29s", work.name);
-    if (work.barOfCalls > 0) {
-        printCount("  %.4f calls an entry (bar %.2f%s)", callsPerEntry, work.barOfCalls);
-    } else {
-        std::printf("  %.4f calls an entry", callsPerEntry);
-    }
-    printCount("  %.1f MiB above idle (bar %.0f%s)", memory, barOfMemory);
-    printCount("  %.0f open files (bar %.0f%s)\n", static_cast<double>(openFiles), barOfOpenFiles);
-    std::fflush(stdout);
+    const QByteArray work = QByteArray("remove ") + tree.name;
+    bool kept = Rounds::report(work, "calls into the kernel, per entry",
+                               static_cast<double>(calls) / tree.entries, tree.barOfCalls);
+    kept &= Rounds::report(work, "MiB above the idle process", memory, barOfMemory);
+    kept &= Rounds::report(work, "open files", static_cast<double>(openFiles), barOfOpenFiles);
+    return kept;
 }
 
 void write(const char *path, const QByteArray &text)
@@ -518,23 +451,23 @@ int main(int argc, char **argv)
     const QByteArray tmpfs = base + "/tmpfs";
     require(mkdir(tmpfs.constData(), 0700), "mkdir");
 
-    for (const Work &work : works()) {
-        compareTimes(tmpfs, "tmpfs", work, barOfRmOnTmpfs);
+    bool kept = true;
+    for (const Tree &tree : trees()) {
+        kept &= compareTimes(tmpfs, "tmpfs", tree, barOfRmOnTmpfs);
     }
     if (root) {
         const QByteArray ext4 = base + "/ext4";
         require(mkdir(ext4.constData(), 0700), "mkdir");
         run("truncate -s 2G image && mkfs.ext4 -q -N 400000 image && mount -o loop image ext4");
-        for (const Work &work : works()) {
-            compareTimes(ext4, "ext4", work, barOfRmOnExt4);
+        for (const Tree &tree : trees()) {
+            kept &= compareTimes(ext4, "ext4", tree, barOfRmOnExt4);
         }
         run("umount ext4");
     } else {
-        std::printf("ext4: not measured, only root may mount an image\n");
+        std::fprintf(stderr, "ext4: not measured, only root may mount an image\n");
     }
-    for (const Work &work : works()) {
-        countAndMeasure(tmpfs, work);
+    for (const Tree &tree : trees()) {
+        kept &= countAndMeasure(tmpfs, tree);
     }
-    std::printf(everythingHeld ? "no bar was clearly missed\n" : "a bar was missed\n");
-    return everythingHeld ? 0 : 1;
+    return kept ? 0 : 1;
 }

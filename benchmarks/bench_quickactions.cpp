@@ -12,7 +12,7 @@
 #include <QFile>
 #include <QSettings>
 
-#include <cstdio>
+#include <memory>
 
 namespace {
 
@@ -20,11 +20,14 @@ const QString directory = QStringLiteral("/usr/share/glimmera/quickactions");
 const QString blockedKey = QStringLiteral("/desktop/glimmera-marlo-home/blocked_actions");
 const QString enabledKey = QStringLiteral("/desktop/glimmera-marlo-home/events_screen_actions");
 
+constexpr double settingsBar = 1.5;
+constexpr double growthBar = 1.5;
+
+constexpr int few = 100;
+constexpr int many = 5000;
+
 QStringList write(int count)
 {
-    if (!qEnvironmentVariableIsSet("MARLO_THROW_AWAY_ROOT")) {
-        qFatal("runs only in the throw-away root of tests/sandbox");
-    }
     QDir(directory).removeRecursively();
     QDir().mkpath(directory);
     QStringList paths;
@@ -67,62 +70,101 @@ void readWithSettings(const QStringList &paths)
     }
 }
 
-void load(bool showPotential, int expected)
+// Both sides read as many files as makes the most in all, so that every count takes about as long.
+Rounds::Work reading(int count)
 {
-    QuickActionsModel model;
-    model.setShowPotential(showPotential);
-    model.componentComplete();
-    if (model.count() != expected) {
-        qFatal("%d rows instead of %d", model.count(), expected);
+    const auto paths = std::make_shared<QStringList>();
+    return {[=] {
+                for (int i = 0; i < many / count; ++i) {
+                    readWithSettings(*paths);
+                }
+            },
+            [=] { *paths = write(count); }};
+}
+
+Rounds::Work loading(int count, bool enabled)
+{
+    const auto models = std::make_shared<std::vector<std::unique_ptr<QuickActionsModel>>>();
+    return {[=] {
+                for (const auto &model : *models) {
+                    model->componentComplete();
+                    if (model->count() != count) {
+                        qFatal("%d rows instead of %d", model->count(), count);
+                    }
+                }
+            },
+            [=] {
+                models->clear();
+                const QStringList paths = write(count);
+                MGConfItem(enabledKey).set(enabled ? paths : QStringList());
+                for (int i = 0; i < many / count; ++i) {
+                    models->push_back(std::make_unique<QuickActionsModel>());
+                    models->back()->setShowPotential(!enabled);
+                }
+            }};
+}
+
+// From nothing to nothing again.
+Rounds::Work lifetimes(int count)
+{
+    return {[=] {
+                for (int i = 0; i < many / count; ++i) {
+                    QuickActionsModel model;
+                    model.setShowPotential(true);
+                    model.componentComplete();
+                    if (model.count() != count) {
+                        qFatal("%d rows instead of %d", model.count(), count);
+                    }
+                }
+            },
+            [=] { write(count); }};
+}
+
+bool measureLoading(bool enabled)
+{
+    const std::vector<int> counts{few, 1000, 2000, many};
+    std::vector<Rounds::Work> works;
+    for (const int count : counts) {
+        works.push_back(loading(count, enabled));
+        works.push_back(reading(count));
     }
+    const auto times = Rounds::times(works);
+
+    const QString kind = enabled ? QStringLiteral("enabled") : QStringLiteral("offered");
+    bool kept = true;
+    for (size_t i = 0; i < counts.size(); ++i) {
+        const QString work = QStringLiteral("load %1 quick actions, %2").arg(counts[i]).arg(kind);
+        kept &= Rounds::report(qPrintable(work), "QSettings on the same files", times[2 * i],
+                               times[2 * i + 1], settingsBar);
+    }
+    const QString growth = QStringLiteral("load %1 quick actions, %2").arg(many).arg(kind);
+    kept &= Rounds::report(qPrintable(growth), "as long for each as 100", times[times.size() - 2],
+                           times[0], growthBar);
+    return kept;
 }
 
-// Loads the actions as often as makes 2,000 files in all, so that every count takes about as long.
-std::function<void()> repeatedly(int count, const std::function<void()> &work)
+bool measureLifetime()
 {
-    return [count, work] {
-        for (int i = 0; i < 2000 / count; ++i) {
-            work();
-        }
-    };
-}
-
-// Gives the times of reading with the model and says whether the bar is kept.
-bool measure(int count, bool enabled, std::vector<double> *modelTimes)
-{
-    const QStringList paths = write(count);
-    MGConfItem(enabledKey).set(enabled ? paths : QStringList());
-    const auto times = Rounds::times({repeatedly(count, [&] { readWithSettings(paths); }),
-                                      repeatedly(count, [&] { load(!enabled, count); })});
-    *modelTimes = times[1];
-    const QString work = QStringLiteral("load %1 quick actions, %2, beside QSettings")
-                             .arg(count)
-                             .arg(enabled ? QStringLiteral("enabled") : QStringLiteral("offered"));
-    // A model costs something of its own: with a hundred definitions that shows.
-    return Rounds::report(qPrintable(work), times[1], times[0], count < 1000 ? 2.5 : 1.5);
+    const auto times = Rounds::times({lifetimes(1000), reading(1000)});
+    return Rounds::report("create, load and destroy a model of 1000 quick actions",
+                          "QSettings on the same files", times[0], times[1], settingsBar);
 }
 
 } // namespace
 
 int main(int argc, char *argv[])
 {
+    if (!qEnvironmentVariableIsSet("MARLO_THROW_AWAY_ROOT")) {
+        qFatal("runs only in the throw-away root of tests/sandbox");
+    }
     const QCoreApplication application(argc, argv);
     // Held by somebody else as well, as where there are several models: the bus is asked once to tell
     // of the keys' changes, and not for each model anew.
     const MGConfItem enabledItem(enabledKey);
     const MGConfItem blockedItem(blockedKey);
 
-    bool passed = true;
-    for (const bool enabled : {true, false}) {
-        std::vector<double> few;
-        std::vector<double> many;
-        passed &= measure(100, enabled, &few);
-        passed &= measure(1000, enabled, &many);
-        passed &= measure(2000, enabled, &many);
-        // Both read 2,000 files in all.
-        passed &= Rounds::report(enabled ? "time per definition, 2,000 enabled beside 100"
-                                         : "time per definition, 2,000 offered beside 100",
-                                 many, few, 1.5);
-    }
-    return passed ? 0 : 1;
+    bool kept = measureLoading(true);
+    kept &= measureLoading(false);
+    kept &= measureLifetime();
+    return kept ? 0 : 1;
 }

@@ -3,54 +3,92 @@
 
 #include "rounds.h"
 
+#include <QElapsedTimer>
+#include <QString>
+
 #include <algorithm>
 #include <cstdio>
-#include <ctime>
 #include <numeric>
 #include <random>
 
+#include <sys/resource.h>
+
 namespace {
 
-constexpr size_t rounds = 25;
-
-double processorTime(const std::function<void()> &work)
+double processorTime()
 {
-    const std::clock_t before = std::clock();
-    work();
-    return double(std::clock() - before) / CLOCKS_PER_SEC;
+    double seconds = 0;
+    for (const auto who : {RUSAGE_SELF, RUSAGE_CHILDREN}) {
+        rusage usage = {};
+        getrusage(who, &usage);
+        for (const timeval &time : {usage.ru_utime, usage.ru_stime}) {
+            seconds += double(time.tv_sec) + double(time.tv_usec) / 1e6;
+        }
+    }
+    return seconds;
+}
+
+Rounds::Time timeOf(const Rounds::Work &work)
+{
+    work.prepare();
+    const double processorBefore = processorTime();
+    QElapsedTimer timer;
+    timer.start();
+    work.run();
+    const double wall = double(timer.nsecsElapsed()) / 1e9;
+    return {wall, processorTime() - processorBefore};
+}
+
+void printRow(const char *work, const char *beside, const QString &figure, double bar, bool kept)
+{
+    const QString barText = bar > 0 ? QString::number(bar, 'f', 2) : QStringLiteral("none");
+    std::printf("| %s | %s | %s | %s | %s |\n", work, beside, qPrintable(figure),
+                qPrintable(barText), kept ? "" : "MISSED");
+    std::fflush(stdout);
 }
 
 } // namespace
 
-std::vector<std::vector<double>> Rounds::times(const std::vector<std::function<void()>> &works)
+std::vector<Rounds::Times> Rounds::times(const std::vector<Work> &works, int rounds)
 {
-    std::vector<std::vector<double>> times(works.size());
+    std::vector<Times> times(works.size());
     std::vector<size_t> order(works.size());
     std::iota(order.begin(), order.end(), 0);
     std::mt19937 random(std::random_device{}());
-    for (const auto &work : works) {
-        work();
+    for (const Work &work : works) {
+        timeOf(work);
     }
-    for (size_t round = 0; round < rounds; ++round) {
+    for (int round = 0; round < rounds; ++round) {
         std::shuffle(order.begin(), order.end(), random);
         for (const size_t work : order) {
-            times[work].push_back(processorTime(works[work]));
+            times[work].push_back(timeOf(works[work]));
         }
     }
     return times;
 }
 
-bool Rounds::report(const char *work, const std::vector<double> &times,
-                    const std::vector<double> &referenceTimes, double bar)
+bool Rounds::report(const char *work, const char *beside, const Times &times,
+                    const Times &references, double bar, double Time::*clock)
 {
     std::vector<double> ratios;
     for (size_t round = 0; round < times.size(); ++round) {
-        ratios.push_back(times[round] / referenceTimes[round]);
+        ratios.push_back(times[round].*clock / references[round].*clock);
     }
     std::sort(ratios.begin(), ratios.end());
     const double median = ratios[ratios.size() / 2];
-    const bool missed = median > bar && ratios[1] > bar;
-    std::printf("%-62s %5.2f (%.2f to %.2f), bar %.2f%s\n", work, median, ratios.front(),
-                ratios.back(), bar, missed ? ", MISSED" : "");
-    return !missed;
+    const bool kept = bar <= 0 || median <= bar || ratios[1] <= bar;
+    printRow(work, beside,
+             QStringLiteral("%1 (%2 to %3)")
+                 .arg(median, 0, 'f', 2)
+                 .arg(ratios.front(), 0, 'f', 2)
+                 .arg(ratios.back(), 0, 'f', 2),
+             bar, kept);
+    return kept;
+}
+
+bool Rounds::report(const char *work, const char *unit, double figure, double bar)
+{
+    const bool kept = bar <= 0 || figure <= bar;
+    printRow(work, unit, QString::number(figure, 'g', 5), bar, kept);
+    return kept;
 }

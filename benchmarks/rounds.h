@@ -8,19 +8,38 @@
 #include <vector>
 
 /*
-    Ratios between things that are timed in one run: no time says anything by itself. What is timed
-    is work, not waiting, in processor time, which other users of the machine disturb least.
+    Ratios between things that are timed in one run: no time says anything by itself.
+
+    What is printed are the rows of one table in Markdown; ./dev bench prints its head.
 */
 namespace Rounds {
 
-// Runs everything once for warming up, then in rounds, each in an order of its own. Gives for each
-// work what it took in each round, in seconds.
-std::vector<std::vector<double>> times(const std::vector<std::function<void()>> &works);
+// In seconds. The processor's time, with that of children, is what other users of the machine
+// disturb least; waiting shows on the wall only.
+struct Time {
+    double wall = 0;
+    double processor = 0;
+};
+// A time for each round.
+using Times = std::vector<Time>;
 
-// Prints a line: the median of the rounds' ratios, the lowest and the highest, and the bar. The bar
-// counts as missed only when all rounds but one miss it: a lone round tells of the machine.
-bool report(const char *work, const std::vector<double> &times,
-            const std::vector<double> &referenceTimes, double bar);
+struct Work {
+    std::function<void()> run;
+    // What has to be there, made anew before every run; takes no part in the time.
+    std::function<void()> prepare = [] {};
+};
+
+// Runs everything once for warming up, then in rounds, each in an order of its own.
+std::vector<Times> times(const std::vector<Work> &works, int rounds = 9);
+
+// Prints the median of the rounds' ratios, the lowest and the highest, and the bar; 0 is none. The
+// bar counts as missed only when all rounds but one miss it: a lone round tells of the machine.
+// Gives whether it is kept.
+bool report(const char *work, const char *beside, const Times &times, const Times &references,
+            double bar, double Time::*clock = &Time::processor);
+
+// Prints a figure that is no time, which is missed as soon as it is above its bar; 0 is none.
+bool report(const char *work, const char *unit, double figure, double bar);
 
 } // namespace Rounds
 

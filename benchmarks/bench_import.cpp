@@ -1,0 +1,115 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+/*
+    Importing the module, and creating one object of each of its types, beside importing a module
+    in which there is nothing. Each in a process of its own, which tells how much memory of its own
+    it came to use.
+*/
+
+#include "rounds.h"
+
+#include <QCoreApplication>
+#include <QFile>
+#include <QProcess>
+#include <QQmlComponent>
+#include <QQmlEngine>
+
+#include <algorithm>
+#include <cstdio>
+#include <memory>
+
+namespace {
+
+const QString evaluateOption = QStringLiteral("--evaluate");
+
+const QByteArray nothing = "import QtQml 2.15\nimport benchmarks.empty 1.0\nQtObject {}";
+const QByteArray import = "import QtQml 2.15\nimport com.marlo.settings.system 1.0\nQtObject {}";
+const QByteArray types = R"(
+import QtQml 2.15
+import com.marlo.settings.system 1.0
+QtObject {
+    readonly property QtObject singleton: TextFileReader
+    property list<QtObject> objects: [
+        QuickActionsModel {}, EventsWidgetsModel {}, TitlesView {}, MemoryCardFormatter {},
+        LocationConfiguration {}, KivInfo {}, BluetoothInfo {}, AndroidSupport {},
+        ModemFeatures {}, TermsOfUseManager {}
+    ]
+})";
+
+// In KiB: what this process has written to and shares with nobody.
+int ownMemory()
+{
+    QFile file(QStringLiteral("/proc/self/smaps_rollup"));
+    if (!file.open(QIODevice::ReadOnly)) {
+        qFatal("cannot read smaps_rollup");
+    }
+    const QList<QByteArray> lines = file.readAll().split('\n');
+    for (const QByteArray &line : lines) {
+        if (line.startsWith("Private_Dirty:")) {
+            return line.simplified().split(' ').at(1).toInt();
+        }
+    }
+    qFatal("smaps_rollup tells no memory");
+}
+
+int evaluate(const QByteArray &text)
+{
+    QQmlEngine engine;
+    engine.addImportPath(QStringLiteral(MODULES));
+    engine.addImportPath(QStringLiteral(EMPTY_MODULES));
+    QQmlComponent component(&engine);
+    component.setData(text, QUrl());
+    const std::unique_ptr<QObject> object(component.create());
+    if (object == nullptr) {
+        qFatal("%s", qPrintable(component.errorString()));
+    }
+    std::printf("%d\n", ownMemory());
+    return 0;
+}
+
+int evaluateInProcess(const QByteArray &text)
+{
+    QProcess process;
+    process.start(QCoreApplication::applicationFilePath(),
+                  {evaluateOption, QString::fromLatin1(text)});
+    process.waitForFinished(-1);
+    const int memory = process.readAllStandardOutput().trimmed().toInt();
+    if (memory <= 0) {
+        qFatal("%s", process.readAllStandardError().constData());
+    }
+    return memory;
+}
+
+int median(std::vector<int> values)
+{
+    const auto middle = values.begin() + std::ptrdiff_t(values.size() / 2);
+    std::nth_element(values.begin(), middle, values.end());
+    return *middle;
+}
+
+} // namespace
+
+int main(int argc, char *argv[])
+{
+    const QCoreApplication application(argc, argv);
+    const QStringList arguments = QCoreApplication::arguments();
+    if (arguments.size() == 3 && arguments.at(1) == evaluateOption) {
+        return evaluate(arguments.at(2).toLatin1());
+    }
+
+    std::vector<std::vector<int>> memory(3);
+    const auto work = [&memory](size_t number, const QByteArray &text) {
+        return Rounds::Work{
+            [&memory, number, text] { memory[number].push_back(evaluateInProcess(text)); }};
+    };
+    const auto times = Rounds::times({work(0, nothing), work(1, import), work(2, types)});
+    Rounds::report("import the module", "import of an empty one", times[1], times[0], 0);
+    Rounds::report("import it and create all eleven types", "import of an empty one", times[2],
+                   times[0], 0);
+    Rounds::report("import the module", "KiB more memory than an empty one",
+                   median(memory[1]) - median(memory[0]), 0);
+    Rounds::report("import it and create all eleven types", "KiB more memory than an empty one",
+                   median(memory[2]) - median(memory[0]), 0);
+    return 0;
+}

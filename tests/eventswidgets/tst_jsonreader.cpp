@@ -24,6 +24,7 @@ private Q_SLOTS:
 
     void agreesWithQJsonDocument_data();
     void agreesWithQJsonDocument();
+    void refusesToEscapeBytesOutsideAscii();
     void agreesOnMutilatedTexts();
     void agreesOnDepth_data();
     void agreesOnDepth();
@@ -267,6 +268,15 @@ void TestJsonReader::agreesWithQJsonDocument()
 {
     QFETCH(QByteArray, text);
     QVERIFY(agrees(text));
+}
+
+void TestJsonReader::refusesToEscapeBytesOutsideAscii()
+{
+    // Of these alone QJsonDocument makes characters that nobody wrote.
+    const QByteArray text("\"\\\xc3\xa4\"");
+    JsonReader reader(text);
+    QCOMPARE(reader.readString(), QString());
+    QVERIFY(!reader.atEnd());
 }
 
 void TestJsonReader::agreesOnMutilatedTexts()

@@ -226,6 +226,7 @@ private Q_SLOTS:
     void failureFarDown();
     void folderThatDoesNotOpen();
     void listingThatBreaksOff();
+    void folderOfNoKnownDevice();
     void mountInside();
     void bindMountInside();
     void folderBecomesLink_data();
@@ -584,6 +585,19 @@ void tst_DirectoryEmptier::listingThatBreaksOff()
     };
     QVERIFY(empty(m_top));
     QCOMPARE(listAll(m_top), (QByteArrayList{"unreadable", "unreadable/file"}));
+}
+
+void tst_DirectoryEmptier::folderOfNoKnownDevice()
+{
+    // Without it the walk could not tell where the card ends.
+    makeFiles(m_top, 5);
+    SystemCalls::hooks().fstat = [](int, struct stat *) {
+        errno = EIO;
+        return -1;
+    };
+    QVERIFY(!empty(m_top));
+    SystemCalls::hooks().fstat = nullptr;
+    QCOMPARE(listAll(m_top).size(), 5);
 }
 
 void tst_DirectoryEmptier::mountInside()

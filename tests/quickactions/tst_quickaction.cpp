@@ -40,6 +40,7 @@ private Q_SLOTS:
     void packedValues();
     void atSigns_data();
     void atSigns();
+    void endsInABackslash();
     void hugeFile();
     void vanished();
     void linesThatAreNoKeys();
@@ -367,6 +368,7 @@ void TestQuickAction::atSigns_data()
     QTest::newRow("doubled") << QByteArray("@@Variant(") << QStringLiteral("@Variant(");
     QTest::newRow("short") << QByteArray("@Var") << QStringLiteral("@Var");
     QTest::newRow("alone") << QByteArray("@") << QStringLiteral("@");
+    QTest::newRow("quote") << QByteArray("@\\\"Variant(\\\"") << QStringLiteral("@\"Variant(\"");
     QTest::newRow("escaped letter") << QByteArray("\\xe4iti") << QStringLiteral("\u00e4iti");
 }
 
@@ -376,6 +378,12 @@ void TestQuickAction::atSigns()
     QFETCH(QString, title);
     write("title=" + value + '\n');
     QCOMPARE(Action(m_path, true).title(), title);
+}
+
+void TestQuickAction::endsInABackslash()
+{
+    write("title=@\\");
+    QCOMPARE(Action(m_path, true).title(), QStringLiteral("@"));
 }
 
 void TestQuickAction::hugeFile()

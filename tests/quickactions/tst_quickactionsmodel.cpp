@@ -61,6 +61,7 @@ private Q_SLOTS:
     void moveBeyondTheRows();
     void moveIsNotReloaded();
     void otherChoiceDuringAMove();
+    void choiceOfSomebodyElseDuringAMove();
 
     void reloadsOneSecondAfterAChange();
     void reloadsAccumulate();
@@ -784,6 +785,26 @@ void TestQuickActionsModel::otherChoiceDuringAMove()
     QVERIFY(answered);
     QTRY_COMPARE(enabledInDconf(), list({"a", "c", "b"}));
     QTRY_COMPARE(names(model), list({"a", "c", "b"}));
+}
+
+void TestQuickActionsModel::choiceOfSomebodyElseDuringAMove()
+{
+    const QString a = add("a");
+    const QString b = add("b");
+    setEnabled({a, b});
+    QuickActionsModel *model = loadedModel();
+    const MGConfItem follower(enabledKey);
+    bool answered = false;
+    connect(&follower, &MGConfItem::valueChanged, this, [&] {
+        if (!answered) {
+            answered = true;
+            setEnabled({b});
+        }
+    });
+    model->move(0, 1);
+    QVERIFY(answered);
+    QCOMPARE(names(model), list({"b"}));
+    QCOMPARE(enabledInDconf(), list({"b"}));
 }
 
 void TestQuickActionsModel::reloadsOneSecondAfterAChange()

@@ -20,6 +20,8 @@ private Q_SLOTS:
 
     void languageWinsOverEngineeringEnglish();
     void sharesOneCatalogAmongItsUsers();
+    void prefersTheCatalogOfTheRegion();
+    void fallsBackToCatalogsInstalledBefore();
     void oneRemovalTakesOutEveryUse();
     void emptyNameIsNoCatalog();
     void installsCatalogsThatDoNotExist();
@@ -97,6 +99,33 @@ void TestCatalogTable::sharesOneCatalogAmongItsUsers()
     m_table->removeDefinition(b, maps);
     QCOMPARE(title(), QStringLiteral("maps-title"));
     QCOMPARE(englishOnly(), QStringLiteral("maps-english"));
+}
+
+void TestCatalogTable::prefersTheCatalogOfTheRegion()
+{
+    // Finnish, to be told from the other one.
+    const QString regional = QStringLiteral("/usr/share/translations/maps-de_AT.qm");
+    QVERIFY(QFile::copy(QStringLiteral("/usr/share/translations/maps-fi.qm"), regional));
+    QLocale::setDefault(QLocale(QStringLiteral("de_AT")));
+    m_table->addDefinition(a, maps);
+    QCOMPARE(title(), QStringLiteral("Kartat"));
+    Files::remove(regional);
+}
+
+void TestCatalogTable::fallsBackToCatalogsInstalledBefore()
+{
+    // As that of the settings pages is, which knows the title too.
+    Files::installCatalog(QStringLiteral("settings-system_eng_en"));
+    QTranslator settings;
+    QVERIFY(settings.load(QStringLiteral("settings-system_eng_en"),
+                          QStringLiteral("/usr/share/translations")));
+    QCoreApplication::installTranslator(&settings);
+    m_table->addDefinition(b, QStringLiteral("nowhere"));
+    QCOMPARE(title(), QStringLiteral("Maps, settings"));
+    m_table->addDefinition(a, maps);
+    QCOMPARE(title(), QStringLiteral("Kartat"));
+    m_table->removeDefinition(a, maps);
+    QCOMPARE(title(), QStringLiteral("Maps, settings"));
 }
 
 void TestCatalogTable::oneRemovalTakesOutEveryUse()

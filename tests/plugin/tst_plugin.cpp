@@ -36,6 +36,7 @@ private Q_SLOTS:
     void otherVersionsAreNotThere();
     void languageWinsOverEngineeringEnglish();
     void englishAnswersWithoutACatalog();
+    void importAnnouncesNothingAtOnce();
     void followsLanguageChanges();
     void filtersNoEvent();
     void translatorsGoWithTheirEngine();
@@ -275,6 +276,27 @@ void TestPlugin::englishAnswersWithoutACatalog()
     QQmlEngine engine;
     QVERIFY(create(&engine, "QtObject {}") != nullptr);
     QCOMPARE(both(), QStringLiteral("Both, engineering English"));
+}
+
+void TestPlugin::importAnnouncesNothingAtOnce()
+{
+    class Listener : public QObject
+    {
+    public:
+        bool eventFilter(QObject *watched, QEvent *event) override
+        {
+            count += event->type() == QEvent::LanguageChange ? 1 : 0;
+            return QObject::eventFilter(watched, event);
+        }
+        int count = 0;
+    };
+
+    Listener listener;
+    QCoreApplication::instance()->installEventFilter(&listener);
+    QQmlEngine engine;
+    QVERIFY(create(&engine, "QtObject {}") != nullptr);
+    QCOMPARE(listener.count, 0);
+    QTRY_VERIFY(listener.count > 0);
 }
 
 void TestPlugin::followsLanguageChanges()

@@ -22,6 +22,7 @@ private Q_SLOTS:
     void cleanup();
 
     void callsTheService();
+    void callsWithoutPathOrInterface();
     void invalidIndex();
     void missingServiceLeadsToTheStore();
     void missingServiceWithoutPackage();
@@ -117,6 +118,33 @@ void TestTriggering::callsTheService()
     QCOMPARE(lamp.calls().constFirst().path(), QStringLiteral("/lamp"));
     QCOMPARE(lamp.calls().constFirst().member(), QStringLiteral("toggle"));
     QCOMPARE(lamp.calls().constFirst().arguments(), QVariantList{QStringLiteral("bright")});
+}
+
+void TestTriggering::callsWithoutPathOrInterface()
+{
+    // A call needs no interface, but a path.
+    RecordingService lamp(QDBusConnection::SessionBus, lampName);
+    add("a", "remote-service=org.example.lamp\nremote-path=/lamp\nremote-method=toggle\n");
+    add("b",
+        "remote-service=org.example.lamp\nremote-interface=org.example.Lamp\n"
+        "remote-method=toggle\n");
+    m_model->componentComplete();
+    m_model->triggerAction(0);
+    QTRY_COMPARE(lamp.calls().size(), 1);
+    QCOMPARE(lamp.calls().constFirst().interface(), QString());
+    QCOMPARE(lamp.calls().constFirst().member(), QStringLiteral("toggle"));
+
+    m_model->triggerAction(1);
+    // Qt has a word to say of it too.
+    QTRY_COMPARE(messages().size(), 2);
+    m_expected = messages();
+    QCOMPARE(m_expected.last(),
+             QStringLiteral("info [default] <Unknown File>: QML QuickActionsModel: Failed to send "
+                            "dbus call to: service=org.example.lamp path= "
+                            "interface=org.example.Lamp method=toggle. Error was: "
+                            "org.qtproject.QtDBus.Error.InvalidObjectPath "
+                            "Object path cannot be empty"));
+    QCOMPARE(lamp.calls().size(), 1);
 }
 
 void TestTriggering::invalidIndex()

@@ -106,8 +106,11 @@ QDBusError QuickActionsModel::Action::whyUnsendable() const
     if (method().isEmpty()) {
         return {QDBusError::InvalidMember, QStringLiteral("The call names no method")};
     }
-    if (objectPath() == reservedPath || interface() == reservedInterface) {
-        return {QDBusError::AccessDenied, QStringLiteral("The path or interface is reserved")};
+    if (objectPath() == reservedPath) {
+        return {QDBusError::InvalidObjectPath, QStringLiteral("The path is reserved")};
+    }
+    if (interface() == reservedInterface) {
+        return {QDBusError::InvalidInterface, QStringLiteral("The interface is reserved")};
     }
     int signature = 0;
     const QVariantList arguments = this->arguments();

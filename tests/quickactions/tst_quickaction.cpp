@@ -518,16 +518,15 @@ void TestQuickAction::refusesBeforeSending_data()
                "org.qtproject.QtDBus.Error.InvalidService The service is no bus name %6");
     QTest::newRow("reserved path")
         << lampCall + "remote-path=/org/freedesktop/DBus/Local\n"
-        << QStringLiteral(
-               "service=org.example.lamp path=/org/freedesktop/DBus/Local "
-               "interface=org.example.Lamp method=toggle. Error was: "
-               "org.freedesktop.DBus.Error.AccessDenied The path or interface is reserved %6");
+        << QStringLiteral("service=org.example.lamp path=/org/freedesktop/DBus/Local "
+                          "interface=org.example.Lamp method=toggle. Error was: "
+                          "org.qtproject.QtDBus.Error.InvalidObjectPath The path is reserved %6");
     QTest::newRow("reserved interface")
         << lampCall + "remote-interface=org.freedesktop.DBus.Local\n"
         << QStringLiteral(
                "service=org.example.lamp path=/lamp "
                "interface=org.freedesktop.DBus.Local method=toggle. Error was: "
-               "org.freedesktop.DBus.Error.AccessDenied The path or interface is reserved %6");
+               "org.qtproject.QtDBus.Error.InvalidInterface The interface is reserved %6");
     QTest::newRow("no method")
         << QByteArray("remote-service=org.example.lamp\nremote-path=/lamp\n"
                       "remote-interface=org.example.Lamp\n")

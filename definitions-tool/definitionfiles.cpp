@@ -1,0 +1,40 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "definitionfiles.h"
+
+#include <QDir>
+#include <QFileInfo>
+
+namespace {
+
+const QLatin1String quickActionSuffix(".conf");
+const QLatin1String eventsWidgetsSuffix(".json");
+
+} // namespace
+
+bool DefinitionFiles::isQuickAction(const QString &path)
+{
+    // The models do not look at the case either.
+    return path.endsWith(quickActionSuffix, Qt::CaseInsensitive);
+}
+
+bool DefinitionFiles::isEventsWidgets(const QString &path)
+{
+    return path.endsWith(eventsWidgetsSuffix, Qt::CaseInsensitive);
+}
+
+QStringList DefinitionFiles::inFolder(const QString &path)
+{
+    const QDir folder(path);
+    QStringList files;
+    // The models list in the same way: nothing hidden, no links to nowhere, and widgets in files.
+    const QStringList names = folder.entryList();
+    for (const QString &name : names) {
+        const QString file = folder.filePath(name);
+        if (isQuickAction(name) || (isEventsWidgets(name) && QFileInfo(file).isFile())) {
+            files.append(file);
+        }
+    }
+    return files;
+}

@@ -1,0 +1,27 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#ifndef DEFINITIONFILES_H
+#define DEFINITIONFILES_H
+
+#include <QLatin1String>
+#include <QStringList>
+
+/*
+    Which files the models read.
+*/
+namespace DefinitionFiles {
+
+constexpr QLatin1String quickActionsDirectory("/usr/share/glimmera/quickactions");
+constexpr QLatin1String eventsWidgetsDirectory("/usr/share/glimmera/eventswidgets");
+
+// By their names.
+bool isQuickAction(const QString &path);
+bool isEventsWidgets(const QString &path);
+
+// Those in a folder that a model would read if they were installed, by name.
+QStringList inFolder(const QString &path);
+
+} // namespace DefinitionFiles
+
+#endif

@@ -1,0 +1,72 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "definitionschecker.h"
+
+#include "definitionfiles.h"
+#include "eventswidgetscheck.h"
+#include "quickactioncheck.h"
+
+#include <QDir>
+#include <QFileInfo>
+
+DefinitionsChecker::DefinitionsChecker(const QString &root) : m_root(root), m_context(root)
+{
+}
+
+bool DefinitionsChecker::check(const QString &path)
+{
+    const QFileInfo entry(path);
+    // To the model of quick actions a folder of such a name is an entry like any other.
+    if (entry.isDir() && !DefinitionFiles::isQuickAction(path)) {
+        return checkFolder(path);
+    }
+    if (entry.exists()) {
+        checkFile(path);
+    }
+    return entry.exists();
+}
+
+bool DefinitionsChecker::checkInstalled()
+{
+    using namespace DefinitionFiles;
+    const bool hasQuickActions = checkFolder(QDir::cleanPath(m_root + quickActionsDirectory));
+    const bool hasEventsWidgets = checkFolder(QDir::cleanPath(m_root + eventsWidgetsDirectory));
+    return hasQuickActions || hasEventsWidgets;
+}
+
+bool DefinitionsChecker::checkFolder(const QString &path)
+{
+    if (!QFileInfo(path).isDir()) {
+        return false;
+    }
+    const QStringList files = DefinitionFiles::inFolder(path);
+    for (const QString &file : files) {
+        checkFile(file);
+    }
+    return true;
+}
+
+void DefinitionsChecker::checkFile(const QString &path)
+{
+    // Its widgets would be there twice, and QSettings, which keeps what it has read, would have no
+    // error to tell of.
+    const QString canonicalPath = QFileInfo(path).canonicalFilePath();
+    if (m_checked.contains(canonicalPath)) {
+        return;
+    }
+    m_checked.insert(canonicalPath);
+
+    Findings findings(path);
+    if (DefinitionFiles::isQuickAction(path)) {
+        checkQuickAction(path, &m_context, &findings);
+    } else if (DefinitionFiles::isEventsWidgets(path)) {
+        checkEventsWidgets(path, &m_context, &findings);
+    } else {
+        findings.add(1, Finding::Severity::Error, QLatin1String("file-name"),
+                     QStringLiteral("the name ends neither in \".conf\" nor in \".json\": no model "
+                                    "reads the file"));
+    }
+    const std::vector<Finding> found = findings.take();
+    m_findings.insert(m_findings.end(), found.cbegin(), found.cend());
+}

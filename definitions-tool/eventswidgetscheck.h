@@ -1,0 +1,12 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#ifndef EVENTSWIDGETSCHECK_H
+#define EVENTSWIDGETSCHECK_H
+
+#include "definitionschecker.h"
+
+// Says what is wrong with a definition file of events widgets.
+void checkEventsWidgets(const QString &path, CheckContext *context, Findings *findings);
+
+#endif

@@ -1,0 +1,42 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#ifndef INILINES_H
+#define INILINES_H
+
+#include <QString>
+
+#include <vector>
+
+class QByteArray;
+
+/*
+    What stands in which line of a settings file, for finding the place of what QSettings has read;
+    what the values are only QSettings tells.
+*/
+struct IniLine {
+    enum class Kind {
+        Section, // A header.
+        Key,
+        Neither, // Passed over by QSettings.
+    };
+
+    Kind kind;
+    int number; // From 1.
+    // As QSettings names it: of a section its name, empty for General; of a key also its section's,
+    // as in "remote-arguments/1/argument"; else what stands there.
+    QString name;
+    bool isClosed = true; // A section's header.
+    bool isAscii = true;
+    // Whether the byte-order mark in front of a key has become a part of it.
+    bool isMarked = false;
+    // Whether a semicolon that follows no space ends the value.
+    bool isCut = false;
+};
+
+// QSettings reads the values behind it as UTF-8, and as Latin-1 without.
+constexpr char iniByteOrderMark[] = "\xef\xbb\xbf";
+
+std::vector<IniLine> readIniLines(const QByteArray &text);
+
+#endif

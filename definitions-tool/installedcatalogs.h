@@ -1,0 +1,51 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#ifndef INSTALLEDCATALOGS_H
+#define INSTALLEDCATALOGS_H
+
+#include <QHash>
+#include <QString>
+#include <QStringList>
+
+#include <memory>
+#include <vector>
+
+class QTranslator;
+
+/*
+    The translation catalogs of a system: which of them there are, in which languages, and which text
+    identifiers they hold.
+*/
+class InstalledCatalogs
+{
+public:
+    // Those below a root folder.
+    explicit InstalledCatalogs(const QString &root);
+    ~InstalledCatalogs();
+    Q_DISABLE_COPY_MOVE(InstalledCatalogs)
+
+    QString directory() const { return m_directory; }
+
+    bool hasEngineeringEnglish(const QString &catalog);
+    // As in the file names, "fi" or "pt_BR".
+    QStringList languages(const QString &catalog);
+    // Whether a file of the catalog, in whatever language, has a text for the identifier.
+    bool holds(const QString &catalog, const QString &id);
+
+private:
+    struct Catalog {
+        bool hasEngineeringEnglish = false;
+        QStringList languages;
+        std::vector<std::shared_ptr<QTranslator>> translators;
+    };
+
+    const Catalog &find(const QString &catalog);
+    bool load(Catalog *catalog, const QString &fileName) const;
+
+    QString m_directory;
+    QStringList m_fileNames;
+    QHash<QString, Catalog> m_catalogs;
+};
+
+#endif

@@ -1,0 +1,129 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "listing.h"
+
+#include "apptranslator.h"
+#include "catalogfiles.h"
+#include "definitionfiles.h"
+#include "eventswidgetsfile.h"
+#include "eventswidgetsmodel.h"
+#include "installedcatalogs.h"
+#include "quickaction.h"
+#include "quickactionsmodel.h"
+
+#include <QCoreApplication>
+#include <QLocale>
+#include <QSet>
+#include <QTranslator>
+
+namespace {
+
+const QString none = QStringLiteral("none");
+
+QString enabledText(bool enabled)
+{
+    return enabled ? QStringLiteral("enabled ") : QStringLiteral("disabled");
+}
+
+QString availableText(bool available)
+{
+    return available ? QStringLiteral("available  ") : QStringLiteral("unavailable");
+}
+
+QString listQuickActions()
+{
+    QuickActionsModel model;
+    model.setShowPotential(true);
+    model.componentComplete();
+    QString text = QStringLiteral("quick actions: %1\n").arg(model.count());
+    for (int row = 0; row < model.count(); ++row) {
+        const auto value = [&model, row](int role) { return model.data(model.index(row), role); };
+        text += QStringLiteral("  %1  %2  %3\n")
+                    .arg(enabledText(value(QuickActionsModel::EnabledRole).toBool()),
+                         value(QuickActionsModel::PathRole).toString(),
+                         value(QuickActionsModel::TitleRole).toString());
+    }
+    return text;
+}
+
+QString listEventsWidgets()
+{
+    EventsWidgetsModel model;
+    model.componentComplete();
+    QString text = QStringLiteral("events widgets: %1\n").arg(model.rowCount());
+    for (int row = 0; row < model.rowCount(); ++row) {
+        const auto value = [&model, row](int role) { return model.data(model.index(row), role); };
+        text += QStringLiteral("  %1  %2  %3  %4\n")
+                    .arg(enabledText(value(EventsWidgetsModel::EnabledRole).toBool()),
+                         availableText(value(EventsWidgetsModel::AvailableRole).toBool()),
+                         value(EventsWidgetsModel::PathRole).toString(),
+                         value(EventsWidgetsModel::TitleRole).toString());
+    }
+    return text;
+}
+
+QStringList namedCatalogs()
+{
+    QSet<QString> catalogs;
+    const QStringList files = DefinitionFiles::inFolder(DefinitionFiles::quickActionsDirectory)
+        + DefinitionFiles::inFolder(DefinitionFiles::eventsWidgetsDirectory);
+    for (const QString &file : files) {
+        if (DefinitionFiles::isQuickAction(file)) {
+            catalogs.insert(QuickActionsModel::Action(file, false).translationCatalog());
+        } else if (const auto widgets = readEventsWidgetsFile(file)) {
+            catalogs.insert(widgets->translationCatalog);
+        }
+    }
+    catalogs.remove(QString());
+    QStringList names = catalogs.values();
+    names.sort();
+    return names;
+}
+
+QString fileOf(const QTranslator &translator)
+{
+    return translator.filePath().isEmpty() ? none : translator.filePath();
+}
+
+QString fileFor(const QLocale &locale, const QString &catalog)
+{
+    using namespace CatalogFiles;
+    QTranslator translator;
+    static_cast<void>(translator.load(locale, catalog, localePrefix, directory));
+    return fileOf(translator);
+}
+
+} // namespace
+
+QString listDefinitions()
+{
+    // As the plugin does for its pages: the models' catalogs come before that of the settings.
+    AppTranslator engineeringEnglish(nullptr);
+    engineeringEnglish.loadEngineeringEnglish();
+    QCoreApplication::installTranslator(&engineeringEnglish);
+    AppTranslator language(nullptr);
+    language.loadDefaultLocale();
+    QCoreApplication::installTranslator(&language);
+    return listQuickActions() + listEventsWidgets();
+}
+
+QString listCatalogs()
+{
+    using namespace CatalogFiles;
+    InstalledCatalogs installed{QString()};
+    QString text;
+    const QStringList catalogs = namedCatalogs();
+    for (const QString &catalog : catalogs) {
+        QTranslator engineeringEnglish;
+        static_cast<void>(engineeringEnglish.load(catalog + engineeringEnglishSuffix, directory));
+        text += QStringLiteral("%1\n  engineering English: %2\n  current locale, %3: %4\n")
+                    .arg(catalog, fileOf(engineeringEnglish), QLocale().name(),
+                         fileFor(QLocale(), catalog));
+        const QStringList languages = installed.languages(catalog);
+        for (const QString &language : languages) {
+            text += QStringLiteral("  %1: %2\n").arg(language, fileFor(QLocale(language), catalog));
+        }
+    }
+    return text;
+}

@@ -1,0 +1,399 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "quickactioncheck.h"
+
+#include "commonchecks.h"
+#include "inifile.h"
+#include "inilines.h"
+#include "quickaction.h"
+#include "readerlog.h"
+
+#include <QDBusError>
+#include <QRegularExpression>
+#include <QSet>
+
+#include <algorithm>
+
+using Action = QuickActionsModel::Action;
+using Severity = Finding::Severity;
+
+namespace {
+
+const QLatin1String unreadableRule("unreadable");
+const QLatin1String noKeyRule("no-key");
+const QLatin1String repeatedKeyRule("repeated-key");
+const QLatin1String encodingRule("encoding");
+const QLatin1String semicolonRule("semicolon");
+const QLatin1String commaRule("comma");
+const QLatin1String typeRule("type");
+const QLatin1String argumentsRule("arguments");
+const QLatin1String callRule("call");
+const QLatin1String priorityRule("priority");
+const QLatin1String argumentTypeRule("argument-type");
+
+const QString catalogKey = QStringLiteral("translation-catalog");
+const QString iconKey = QStringLiteral("icon");
+const QString priorityKey = QStringLiteral("priority");
+const QString titleKey = QStringLiteral("title");
+const QString serviceKey = QStringLiteral("remote-service");
+const QString pathKey = QStringLiteral("remote-path");
+const QString interfaceKey = QStringLiteral("remote-interface");
+const QString methodKey = QStringLiteral("remote-method");
+const QString argumentsSection = QStringLiteral("remote-arguments");
+const QString sizeKey = QStringLiteral("remote-arguments/size");
+
+const QStringList knownKeys = {
+    titleKey,   catalogKey, iconKey,      priorityKey, QStringLiteral("requires-package"),
+    serviceKey, pathKey,    interfaceKey, methodKey,
+};
+
+constexpr int maximumName = 255;
+
+// What a call may go out to, by D-Bus's own rules. QtDBus answers other names with an error.
+struct Name {
+    QString key;
+    QString (Action::*value)() const;
+    QString pattern;
+    QString what;
+};
+
+const std::vector<Name> &names()
+{
+    static const std::vector<Name> names = {
+        {serviceKey, &Action::service,
+         QStringLiteral(":[\\w-]+(\\.[\\w-]+)*|[a-zA-Z_-][\\w-]*(\\.[a-zA-Z_-][\\w-]*)+"),
+         QStringLiteral("name of a service")},
+        {pathKey, &Action::objectPath, QStringLiteral("/|(/\\w+)+"),
+         QStringLiteral("path of an object")},
+        // The one thing that a call may do without.
+        {interfaceKey, &Action::interface, QStringLiteral("([a-zA-Z_]\\w*(\\.[a-zA-Z_]\\w*)+)?"),
+         QStringLiteral("name of an interface")},
+        {methodKey, &Action::method, QStringLiteral("[a-zA-Z_]\\w*"),
+         QStringLiteral("name of a method")},
+    };
+    return names;
+}
+
+bool isName(const Name &name, const QString &value)
+{
+    static const auto expressions = [] {
+        std::vector<QRegularExpression> expressions;
+        for (const Name &name : names()) {
+            expressions.emplace_back(QRegularExpression::anchoredPattern(name.pattern));
+        }
+        return expressions;
+    }();
+    const bool isLimited = name.key != pathKey;
+    return (!isLimited || value.size() <= maximumName)
+        && expressions.at(size_t(&name - names().data())).match(value).hasMatch();
+}
+
+// The number of the array's element, from 1, or 0 if the key is no element's.
+int argumentNumber(const QString &key)
+{
+    static const QRegularExpression element(
+        QRegularExpression::anchoredPattern(QStringLiteral("remote-arguments/([0-9]+)/argument")));
+    const QRegularExpressionMatch match = element.match(key);
+    // QSettings writes no zeroes before a number and finds none with them.
+    const bool isNumber = match.hasMatch() && !match.capturedRef(1).startsWith(QLatin1Char('0'));
+    return isNumber ? match.capturedRef(1).toInt() : 0;
+}
+
+QString argumentKey(int number)
+{
+    return QStringLiteral("remote-arguments/%1/argument").arg(number);
+}
+
+bool looksLikeNumberOrBoolean(const QString &text)
+{
+    static const QRegularExpression expression(
+        QRegularExpression::anchoredPattern(
+            QStringLiteral("[+-]?(\\d+\\.?\\d*|\\.\\d+)([eE][+-]?\\d+)?|0[xX][0-9a-fA-F]+"
+                           "|true|false")),
+        QRegularExpression::CaseInsensitiveOption);
+    return expression.match(text).hasMatch();
+}
+
+class QuickActionCheck
+{
+public:
+    QuickActionCheck(const Action &action, std::vector<IniLine> lines, CheckContext *context,
+                     Findings *findings)
+        : m_action(action), m_config(action.config()), m_lines(std::move(lines)),
+          m_context(context), m_findings(findings)
+    {
+        for (const IniLine &line : m_lines) {
+            if (line.kind == IniLine::Kind::Key) {
+                m_lineOf.insert(line.name, line.number);
+            }
+        }
+    }
+
+    void checkLines(bool isLatin1);
+    void checkTexts();
+    void checkPriority();
+    void checkArguments();
+    void checkCall();
+
+private:
+    // The last one counts. What is not in the file concerns the whole of it.
+    int lineOf(const QString &key) const { return m_lineOf.value(key, 1); }
+    void checkKey(const IniLine &line, const QString &section);
+    void checkText(const QString &key, const QVariant &value);
+    void checkArgument(int number, const QVariant &value);
+    void add(int line, Severity severity, QLatin1String rule, const QString &text)
+    {
+        m_findings->add(line, severity, rule, text);
+    }
+
+    const Action &m_action;
+    const QVariantMap m_config;
+    const std::vector<IniLine> m_lines;
+    CheckContext *const m_context;
+    Findings *const m_findings;
+    QHash<QString, int> m_lineOf;
+    // Keys whose value reads as none.
+    QSet<QString> m_misread;
+    bool m_argumentsAreWrong = false;
+};
+
+void QuickActionCheck::checkLines(bool isLatin1)
+{
+    QString section;
+    for (const IniLine &line : m_lines) {
+        switch (line.kind) {
+        case IniLine::Kind::Section:
+            section = line.name;
+            if (!section.isEmpty() && section != argumentsSection) {
+                reportUnknownKey(QStringLiteral("section"), section,
+                                 {argumentsSection, QStringLiteral("General")}, line.number,
+                                 m_findings);
+            }
+            break;
+        case IniLine::Kind::Key:
+            checkKey(line, section);
+            break;
+        case IniLine::Kind::Neither:
+            add(line.number, Severity::Error, noKeyRule,
+                line.name.startsWith(QLatin1Char('#'))
+                    ? QStringLiteral("this line is no key and is passed over; comments begin with "
+                                     "\";\"")
+                    : QStringLiteral("this line is no key and is passed over"));
+            break;
+        }
+        if (!line.isAscii && isLatin1) {
+            add(line.number, Severity::Error, encodingRule,
+                QStringLiteral("bytes outside ASCII are read as Latin-1; write \\x and the "
+                               "character's number"));
+        }
+    }
+}
+
+void QuickActionCheck::checkKey(const IniLine &line, const QString &section)
+{
+    if (line.isMarked) {
+        add(line.number, Severity::Error, encodingRule,
+            QStringLiteral("the byte-order mark becomes a part of the key"));
+        return;
+    }
+    if (m_lineOf.value(line.name) != line.number) {
+        add(line.number, Severity::Error, repeatedKeyRule,
+            QStringLiteral("the key %1 stands again in line %2, and only that counts")
+                .arg(quoted(line.name), QString::number(m_lineOf.value(line.name))));
+    }
+    if (line.isCut) {
+        add(line.number, Severity::Error, semicolonRule,
+            QStringLiteral("an unquoted semicolon ends the value; put it in double quotes"));
+    }
+    if (section.isEmpty()) {
+        if (!knownKeys.contains(line.name) && line.name != sizeKey
+            && argumentNumber(line.name) == 0) {
+            reportUnknownKey(QStringLiteral("key"), line.name, knownKeys, line.number, m_findings);
+        }
+    } else if (section == argumentsSection && line.name != sizeKey
+               && argumentNumber(line.name) == 0) {
+        QString key = line.name.mid(section.size() + 1);
+        const int number = qMax(1, key.section(QLatin1Char('/'), 0, 0).toInt());
+        // As it stands there.
+        key.replace(QLatin1Char('/'), QLatin1Char('\\'));
+        reportUnknownKey(QStringLiteral("key"), key,
+                         {QStringLiteral("size"), QStringLiteral("%1\\argument").arg(number)},
+                         line.number, m_findings);
+    }
+}
+
+void QuickActionCheck::checkTexts()
+{
+    for (const QString &key : knownKeys) {
+        if (key != priorityKey && m_config.contains(key)) {
+            checkText(key, m_config.value(key));
+        }
+    }
+    const QString catalog = m_action.translationCatalog();
+    checkCatalog(catalog, lineOf(catalogKey), m_context, m_findings);
+    checkTextId(m_action.title(), catalog, lineOf(titleKey), m_context, m_findings);
+    checkIcon(m_action.icon().toString(), lineOf(iconKey), m_findings);
+}
+
+void QuickActionCheck::checkText(const QString &key, const QVariant &value)
+{
+    // The icon goes to pages as it is: there a list is no picture, nor is anything else.
+    if (value.userType() == QMetaType::QString || (key != iconKey && !value.toString().isEmpty())) {
+        return;
+    }
+    m_misread.insert(key);
+    if (value.userType() == QMetaType::QStringList) {
+        add(lineOf(key), Severity::Error, commaRule,
+            QStringLiteral("an unquoted comma makes %1 a list, which is no text; put it in double "
+                           "quotes")
+                .arg(quoted(key)));
+    } else {
+        add(lineOf(key), Severity::Error, typeRule,
+            QStringLiteral("%1 reads as no text; write a leading @ twice").arg(quoted(key)));
+    }
+}
+
+void QuickActionCheck::checkPriority()
+{
+    if (!m_config.contains(priorityKey)) {
+        add(1, Severity::Warning, priorityRule,
+            QStringLiteral("without \"priority\" the action comes last"));
+    } else if (!m_action.priority()) {
+        add(lineOf(priorityKey), Severity::Error, typeRule,
+            QStringLiteral("\"priority\" is no integer: the action comes last"));
+    }
+}
+
+void QuickActionCheck::checkArguments()
+{
+    int highest = 0;
+    int highestLine = 1;
+    for (const IniLine &line : m_lines) {
+        const int number = line.kind == IniLine::Kind::Key ? argumentNumber(line.name) : 0;
+        if (number > highest) {
+            highest = number;
+            highestLine = line.number;
+        }
+    }
+    // Under a key of that name QSettings may have something else.
+    const bool hasArray = m_lineOf.contains(sizeKey) || highest > 0;
+    const QVariantList arguments = hasArray ? m_action.arguments() : QVariantList();
+    const int size = arguments.size();
+    if (highest > size) {
+        m_argumentsAreWrong = true;
+        const bool hasSize = m_lineOf.contains(sizeKey);
+        add(hasSize ? lineOf(sizeKey) : highestLine, Severity::Error, argumentsRule,
+            hasSize ? QStringLiteral("\"size\" leaves out argument %1").arg(highest)
+                    : QStringLiteral("without \"size\" the call has no arguments"));
+    }
+    for (int i = 0; i < size; ++i) {
+        if (!arguments.at(i).isValid() && !m_lineOf.contains(argumentKey(i + 1))) {
+            m_argumentsAreWrong = true;
+            add(lineOf(sizeKey), Severity::Error, argumentsRule,
+                QStringLiteral("\"size\" counts argument %1, which is missing").arg(i + 1));
+            break;
+        }
+    }
+    for (int i = 0; i < size; ++i) {
+        if (m_lineOf.contains(argumentKey(i + 1))) {
+            checkArgument(i + 1, arguments.at(i));
+        }
+    }
+}
+
+void QuickActionCheck::checkArgument(int number, const QVariant &value)
+{
+    const int line = lineOf(argumentKey(number));
+    if (value.userType() == QMetaType::QStringList) {
+        add(line, Severity::Note, argumentTypeRule,
+            QStringLiteral("argument %1 goes out as a list of %2 texts")
+                .arg(number)
+                .arg(value.toStringList().size()));
+    } else if (value.userType() != QMetaType::QString) {
+        m_argumentsAreWrong = true;
+        add(line, Severity::Error, argumentsRule,
+            QStringLiteral("argument %1 reads as no text; write a leading @ twice").arg(number));
+    } else if (looksLikeNumberOrBoolean(value.toString())) {
+        add(line, Severity::Note, argumentTypeRule,
+            QStringLiteral("argument %1 goes out as the text %2")
+                .arg(number)
+                .arg(quoted(value.toString())));
+    }
+}
+
+void QuickActionCheck::checkCall()
+{
+    bool isSendable = !m_argumentsAreWrong;
+    for (const Name &name : names()) {
+        const QString value = (m_action.*name.value)();
+        if (isName(name, value)) {
+            continue;
+        }
+        isSendable = false;
+        // Said already, if it is none because it is a list.
+        if (!m_misread.contains(name.key)) {
+            add(lineOf(name.key), Severity::Error, callRule,
+                value.isEmpty()
+                    ? QStringLiteral("the call cannot be sent without %1").arg(quoted(name.key))
+                    : QStringLiteral("the call cannot be sent: %1 is no %2")
+                          .arg(quoted(value), name.what));
+        }
+    }
+    const QDBusError error = m_action.whyUnsendable();
+    if (isSendable && error.isValid()) {
+        const QString key = error.type() == QDBusError::InvalidObjectPath ? pathKey
+            : error.type() == QDBusError::InvalidInterface                ? interfaceKey
+                                                                          : sizeKey;
+        add(lineOf(key), Severity::Error, callRule,
+            QStringLiteral("the call cannot be sent: %1").arg(error.message()));
+    }
+}
+
+// A file that the reader has refused.
+void reportRefused(const QString &path, Findings *findings)
+{
+    QByteArray content;
+    if (reportUnreadable(path, maximumIniSize, &content, findings)) {
+        return;
+    }
+    const int packed = findPackedValue(content);
+    if (packed >= 0) {
+        findings->add(int(content.left(packed).count('\n')) + 1, Severity::Error, unreadableRule,
+                      QStringLiteral("a packed value: nothing of the file is read"));
+        return;
+    }
+    const std::vector<IniLine> lines = readIniLines(content);
+    const auto unclosed = std::find_if(lines.cbegin(), lines.cend(),
+                                       [](const IniLine &line) { return !line.isClosed; });
+    if (unclosed != lines.cend()) {
+        findings->add(unclosed->number, Severity::Error, unreadableRule,
+                      QStringLiteral("the header of a section is not closed: nothing of the file "
+                                     "is read"));
+        return;
+    }
+    findings->add(1, Severity::Error, unreadableRule,
+                  QStringLiteral("QSettings cannot read the file"));
+}
+
+} // namespace
+
+void checkQuickAction(const QString &path, CheckContext *context, Findings *findings)
+{
+    const ReaderLog log;
+    const Action action(path, false);
+    if (log.hasWarnings()) {
+        reportRefused(path, findings);
+        return;
+    }
+    QByteArray content;
+    if (reportUnreadable(path, maximumIniSize, &content, findings)) {
+        return;
+    }
+    QuickActionCheck check(action, readIniLines(content), context, findings);
+    check.checkLines(!content.startsWith(iniByteOrderMark));
+    check.checkTexts();
+    check.checkPriority();
+    check.checkArguments();
+    check.checkCall();
+}

@@ -1,0 +1,12 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#ifndef QUICKACTIONCHECK_H
+#define QUICKACTIONCHECK_H
+
+#include "definitionschecker.h"
+
+// Says what is wrong with the definition file of a quick action.
+void checkQuickAction(const QString &path, CheckContext *context, Findings *findings);
+
+#endif

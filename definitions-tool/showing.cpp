@@ -1,0 +1,136 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "showing.h"
+
+#include "definitionfiles.h"
+#include "eventswidgetsfile.h"
+#include "quickaction.h"
+#include "readerlog.h"
+
+#include <QDBusError>
+#include <QRegularExpression>
+#include <QStringList>
+
+namespace {
+
+QString line(const char *name, const QString &value)
+{
+    return QStringLiteral("%1: %2\n").arg(QLatin1String(name), value);
+}
+
+QString word(bool value)
+{
+    return value ? QStringLiteral("true") : QStringLiteral("false");
+}
+
+QString shellWord(QString text)
+{
+    static const QRegularExpression plain(
+        QRegularExpression::anchoredPattern(QStringLiteral("[\\w.:/,@%+=-]+")));
+    if (plain.match(text).hasMatch()) {
+        return text;
+    }
+    text.replace(QLatin1Char('\''), QLatin1String("'\\''"));
+    return QLatin1Char('\'') + text + QLatin1Char('\'');
+}
+
+// A text goes out up to its first zero.
+QString sentText(const QString &text)
+{
+    return text.section(QChar(), 0, 0);
+}
+
+QString callLine(const QuickActionsModel::Action &action)
+{
+    const QDBusError error = action.whyUnsendable();
+    if (error.isValid()) {
+        return QStringLiteral("# cannot be sent: %1\n").arg(error.message());
+    }
+    if (action.interface().isEmpty()) {
+        return QStringLiteral("# goes out without an interface, which busctl cannot do\n");
+    }
+    QStringList words = {QStringLiteral("busctl"), QStringLiteral("--user"), QStringLiteral("call"),
+                         action.service(),         action.objectPath(),      action.interface(),
+                         action.method()};
+    QString signature;
+    QStringList values;
+    const QVariantList arguments = action.arguments();
+    for (const QVariant &argument : arguments) {
+        if (argument.userType() == QMetaType::QStringList) {
+            const QStringList list = argument.toStringList();
+            signature += QStringLiteral("as");
+            values.append(QString::number(list.size()));
+            for (const QString &text : list) {
+                values.append(sentText(text));
+            }
+        } else {
+            signature += QLatin1Char('s');
+            values.append(sentText(argument.toString()));
+        }
+    }
+    if (!signature.isEmpty()) {
+        words += signature;
+        words += values;
+    }
+    for (QString &each : words) {
+        each = shellWord(each);
+    }
+    return words.join(QLatin1Char(' ')) + QLatin1Char('\n');
+}
+
+QString valueText(const QVariant &value)
+{
+    return value.userType() == QMetaType::QStringList ? QStringLiteral("a list, which is no text: ")
+            + value.toStringList().join(QLatin1String(", "))
+                                                      : value.toString();
+}
+
+std::optional<QString> showQuickAction(const QString &path)
+{
+    const ReaderLog log;
+    const QuickActionsModel::Action action(path, false);
+    if (log.hasWarnings()) {
+        return {};
+    }
+    QString text = line("title", action.title())
+        + line("translation catalog", action.translationCatalog())
+        + line("icon", valueText(action.icon()))
+        + line("priority",
+               action.priority() ? QString::number(*action.priority()) : QStringLiteral("none"))
+        + line("required package", action.requiredPackage());
+    return text + callLine(action);
+}
+
+std::optional<QString> showEventsWidgets(const QString &path)
+{
+    const ReaderLog log;
+    const std::optional<EventsWidgetsFile> file = readEventsWidgetsFile(path);
+    if (!file) {
+        return {};
+    }
+    QString text = line("translation catalog", file->translationCatalog);
+    for (const EventsWidgetsModel::Widget &widget : file->widgets) {
+        text += QLatin1Char('\n') + line("path", widget.path) + line("title", widget.title)
+            + line("title's identifier", widget.translationId)
+            + line("description's identifier", widget.descriptionId) + line("icon", widget.icon)
+            + line("order", QString::number(widget.order))
+            + line("enabled by default", word(widget.defaultEnabled))
+            + line("available path", widget.availablePath)
+            + line("available", word(widget.available));
+    }
+    return text;
+}
+
+} // namespace
+
+std::optional<QString> showDefinition(const QString &path)
+{
+    if (DefinitionFiles::isQuickAction(path)) {
+        return showQuickAction(path);
+    }
+    if (DefinitionFiles::isEventsWidgets(path)) {
+        return showEventsWidgets(path);
+    }
+    return {};
+}

@@ -1,0 +1,416 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+// Good and bad definition files: what the checker finds in each, to the line, and that it finds an
+// error exactly where the model makes something else of a file than what stands there.
+
+#include "definitionschecker.h"
+#include "eventswidgetsfile.h"
+#include "eventswidgetsmodel.h"
+#include "files.h"
+#include "messagelog.h"
+#include "quickaction.h"
+#include "quickactionsmodel.h"
+
+#include <QDir>
+#include <QJsonArray>
+#include <QJsonDocument>
+#include <QJsonObject>
+#include <QRegularExpression>
+#include <QTemporaryDir>
+#include <QtTest>
+
+#include <algorithm>
+
+class TestCorpus : public QObject
+{
+    Q_OBJECT
+
+private Q_SLOTS:
+    void initTestCase();
+    void init();
+    void cleanup();
+
+    void isLarge();
+    void findings_data();
+    void findings();
+    void agreesOnQuickActions_data();
+    void agreesOnQuickActions();
+    void agreesOnEventsWidgets_data();
+    void agreesOnEventsWidgets();
+    void examplesAreClean_data();
+    void examplesAreClean();
+
+private:
+    std::unique_ptr<MessageLog> m_log;
+};
+
+namespace {
+
+const QString quickActionsDirectory = QStringLiteral("/usr/share/glimmera/quickactions");
+const QString eventsWidgetsDirectory = QStringLiteral("/usr/share/glimmera/eventswidgets");
+const QString expectedSuffix = QStringLiteral(".findings");
+
+QByteArray read(const QString &path)
+{
+    QFile file(path);
+    if (!file.open(QIODevice::ReadOnly)) {
+        qFatal("cannot read %s", qPrintable(path));
+    }
+    return file.readAll();
+}
+
+void addRows(const QString &filter, const QString &folder = QStringLiteral(CORPUS_DIR))
+{
+    QTest::addColumn<QString>("path");
+    const QStringList names = QDir(folder).entryList({filter}, QDir::Files);
+    for (const QString &name : names) {
+        QTest::newRow(qPrintable(name)) << folder + QLatin1Char('/') + name;
+    }
+}
+
+std::vector<Finding> check(const QString &path)
+{
+    DefinitionsChecker checker(QStringLiteral("/"));
+    if (!checker.check(path)) {
+        qFatal("nothing at %s", qPrintable(path));
+    }
+    return checker.findings();
+}
+
+// Looks at a copy: what QSettings has read under a name it does not read again.
+bool hasErrors(const QString &path)
+{
+    const QTemporaryDir folder;
+    const QString copy = folder.filePath(QFileInfo(path).fileName());
+    Files::write(copy, read(path));
+    const std::vector<Finding> findings = check(copy);
+    return std::any_of(findings.cbegin(), findings.cend(), [](const Finding &finding) {
+        return finding.severity == Finding::Severity::Error;
+    });
+}
+
+// A file as somebody reads it who knows what an INI file is, but not what QSettings makes of one.
+// Values with a backslash, which only QSettings understands, are left out.
+struct Reading {
+    QVector<QPair<QString, QString>> values; // of the keys outside sections, or in remote-arguments
+    bool hasOtherLines = false;
+};
+
+Reading readPlainly(const QByteArray &content)
+{
+    Reading reading;
+    QString section;
+    bool isContinued = false;
+    bool isQuoted = false;
+    const auto lines = QString::fromUtf8(content).split(QLatin1Char('\n'));
+    for (const QString &written : lines) {
+        const QString line = written.trimmed();
+        const bool goesOn = isContinued || isQuoted;
+        isContinued = line.endsWith(QLatin1Char('\\'));
+        isQuoted = isQuoted != (line.count(QLatin1Char('"')) % 2 == 1);
+        if (goesOn || line.isEmpty() || line.startsWith(QLatin1Char(';'))) {
+            continue;
+        }
+        if (line.startsWith(QLatin1Char('['))) {
+            section = line.mid(1, line.indexOf(QLatin1Char(']')) - 1);
+            continue;
+        }
+        const int equals = line.indexOf(QLatin1Char('='));
+        if (equals < 0) {
+            reading.hasOtherLines = true;
+            continue;
+        }
+        const QString key = line.left(equals).trimmed();
+        QString value = line.mid(equals + 1).section(QStringLiteral(" ;"), 0, 0).trimmed();
+        if (value.contains(QLatin1Char('\\')) || isQuoted) {
+            continue;
+        }
+        if (value.startsWith(QLatin1Char('"')) && value.endsWith(QLatin1Char('"'))) {
+            value = value.mid(1, value.size() - 2);
+        }
+        if (section.isEmpty() || section.toLower() == QStringLiteral("general")) {
+            reading.values.append({key, value});
+        } else if (section == QStringLiteral("remote-arguments")) {
+            reading.values.append({section + QLatin1Char('/') + key, value});
+        }
+    }
+    return reading;
+}
+
+// What the model has for a key, as text; nothing for keys that it does not know.
+std::optional<QString> modelText(const QuickActionsModel &model,
+                                 const QuickActionsModel::Action &action, const QString &key)
+{
+    static const QHash<QString, QString (QuickActionsModel::Action::*)() const> texts = {
+        {QStringLiteral("translation-catalog"), &QuickActionsModel::Action::translationCatalog},
+        {QStringLiteral("requires-package"), &QuickActionsModel::Action::requiredPackage},
+        {QStringLiteral("remote-service"), &QuickActionsModel::Action::service},
+        {QStringLiteral("remote-path"), &QuickActionsModel::Action::objectPath},
+        {QStringLiteral("remote-interface"), &QuickActionsModel::Action::interface},
+        {QStringLiteral("remote-method"), &QuickActionsModel::Action::method},
+    };
+    if (texts.contains(key)) {
+        return (action.*texts.value(key))();
+    }
+    if (key == QStringLiteral("title")) {
+        return model.data(model.index(0), QuickActionsModel::TitleRole).toString();
+    }
+    if (key == QStringLiteral("icon")) {
+        return model.data(model.index(0), QuickActionsModel::IconRole).toString();
+    }
+    if (key == QStringLiteral("priority")) {
+        return action.priority() ? QString::number(*action.priority()) : QStringLiteral("none");
+    }
+    static const QRegularExpression argument(
+        QStringLiteral("^remote-arguments/([1-9][0-9]*)\\\\argument$"));
+    const QRegularExpressionMatch match = argument.match(key);
+    if (match.hasMatch()) {
+        // A list goes out as a list of what stands there.
+        return action.arguments()
+            .value(match.captured(1).toInt() - 1)
+            .toStringList()
+            .join(QStringLiteral(", "));
+    }
+    return {};
+}
+
+// How often a member of one of the names stands in a text.
+int countMembers(const QString &text, const QStringList &names)
+{
+    const QRegularExpression member(
+        QStringLiteral("\"(%1)\"\\s*:").arg(names.join(QLatin1Char('|'))));
+    int count = 0;
+    for (auto it = member.globalMatch(text); it.hasNext(); it.next()) {
+        ++count;
+    }
+    return count;
+}
+
+} // namespace
+
+void TestCorpus::initTestCase()
+{
+    QVERIFY(QDir::setCurrent(QStringLiteral(CORPUS_DIR)));
+    Files::installCatalog(QStringLiteral("maps_eng_en"));
+    Files::installCatalog(QStringLiteral("maps-fi"));
+    // A catalog without engineering English.
+    QVERIFY(QFile::copy(QStringLiteral("/usr/share/translations/maps-fi.qm"),
+                        QStringLiteral("/usr/share/translations/islands-fi.qm")));
+}
+
+void TestCorpus::init()
+{
+    m_log = std::make_unique<MessageLog>();
+    Files::makeFolder(quickActionsDirectory);
+    Files::makeFolder(eventsWidgetsDirectory);
+}
+
+void TestCorpus::cleanup()
+{
+    QCOMPARE(m_log->takeReport(), QString());
+    m_log.reset();
+    Files::remove(quickActionsDirectory);
+    Files::remove(eventsWidgetsDirectory);
+}
+
+void TestCorpus::isLarge()
+{
+    const QDir corpus(QStringLiteral(CORPUS_DIR));
+    const QStringList names =
+        corpus.entryList({QStringLiteral("*.conf"), QStringLiteral("*.json")}, QDir::Files);
+    const auto good = std::count_if(names.cbegin(), names.cend(), [](const QString &name) {
+        return name.startsWith(QStringLiteral("good"));
+    });
+    QVERIFY(good >= 30);
+    QVERIFY(names.size() - good >= 90);
+    QCOMPARE(corpus.entryList({QLatin1Char('*') + expectedSuffix}).size(), names.size());
+}
+
+void TestCorpus::findings_data()
+{
+    addRows(QStringLiteral("*.conf"));
+    const QStringList names =
+        QDir(QStringLiteral(CORPUS_DIR)).entryList({QStringLiteral("*.json")});
+    for (const QString &name : names) {
+        QTest::newRow(qPrintable(name)) << QStringLiteral(CORPUS_DIR "/") + name;
+    }
+}
+
+void TestCorpus::findings()
+{
+    QFETCH(QString, path);
+    const QString name = QFileInfo(path).fileName();
+    QString found;
+    for (const Finding &finding : check(name)) {
+        // Every line of the expected findings begins with the number of a line.
+        found += toText(finding).mid(name.size() + 1) + QLatin1Char('\n');
+    }
+    QCOMPARE(found, QString::fromUtf8(read(path + expectedSuffix)));
+    QCOMPARE(name.startsWith(QStringLiteral("bad")), found.contains(QStringLiteral(": error: ")));
+    QCOMPARE(name.startsWith(QStringLiteral("warn")),
+             !found.contains(QStringLiteral(": error: "))
+                 && found.contains(QStringLiteral(": warning: ")));
+}
+
+void TestCorpus::agreesOnQuickActions_data()
+{
+    addRows(QStringLiteral("*.conf"));
+}
+
+void TestCorpus::agreesOnQuickActions()
+{
+    QFETCH(QString, path);
+    const QByteArray content = read(path);
+    const QString installed = quickActionsDirectory + QLatin1Char('/') + QFileInfo(path).fileName();
+    Files::write(installed, content);
+
+    QuickActionsModel model;
+    model.setShowPotential(true);
+    model.componentComplete();
+    QCOMPARE(model.count(), 1);
+    QStringList differences = m_log->takeTexts();
+
+    const QuickActionsModel::Action action(installed, false);
+    m_log->takeAll();
+    const Reading reading = readPlainly(content);
+    if (reading.hasOtherLines) {
+        differences.append(QStringLiteral("a line is passed over"));
+    }
+    for (const auto &[key, value] : reading.values) {
+        const std::optional<QString> text = modelText(model, action, key);
+        const QString expected = key == QStringLiteral("title") && !value.isEmpty()
+            ? qtTrId(value.toUtf8().constData())
+            : value;
+        if (text && *text != expected) {
+            differences.append(QStringLiteral("%1: %2, not %3").arg(key, *text, expected));
+        }
+    }
+
+    // Nobody has the name: what can be sent at all comes back with just that error.
+    model.triggerAction(0);
+    QString outcome;
+    const auto isAnswered = [this, &outcome] {
+        outcome += m_log->takeTexts().join(QLatin1Char('\n'));
+        return outcome.contains(QStringLiteral("Failed to "));
+    };
+    QTRY_VERIFY(isAnswered());
+    if (!outcome.contains(QStringLiteral("org.freedesktop.DBus.Error.ServiceUnknown"))) {
+        differences.append(outcome);
+    }
+
+    QVERIFY2(hasErrors(installed) == !differences.isEmpty(),
+             qPrintable(differences.join(QLatin1Char('\n'))));
+}
+
+void TestCorpus::agreesOnEventsWidgets_data()
+{
+    addRows(QStringLiteral("*.json"));
+}
+
+void TestCorpus::agreesOnEventsWidgets()
+{
+    QFETCH(QString, path);
+    const QByteArray content = read(path);
+    const QString installed =
+        eventsWidgetsDirectory + QLatin1Char('/') + QFileInfo(path).fileName();
+    Files::write(installed, content);
+
+    EventsWidgetsModel model;
+    model.componentComplete();
+    QStringList differences = m_log->takeTexts();
+
+    // Qt's own reader, as a second opinion.
+    const QJsonObject object = QJsonDocument::fromJson(content).object();
+    const std::optional<EventsWidgetsFile> file = readEventsWidgetsFile(installed);
+    m_log->takeAll();
+    const auto compare = [&differences](const QJsonObject &written, const char *key,
+                                        const QJsonValue &value) {
+        const QJsonValue expected = written.value(QLatin1String(key));
+        if (!expected.isUndefined() && expected != value) {
+            differences.append(QStringLiteral("%1 is another").arg(QLatin1String(key)));
+        }
+    };
+    const QStringList fileKeys = {QStringLiteral("translation_catalog"), QStringLiteral("widgets")};
+    const QStringList widgetKeys = {QStringLiteral("path"),
+                                    QStringLiteral("title"),
+                                    QStringLiteral("translation_id"),
+                                    QStringLiteral("description_id"),
+                                    QStringLiteral("icon"),
+                                    QStringLiteral("order"),
+                                    QStringLiteral("default_enabled"),
+                                    QStringLiteral("available_path")};
+    int members = 0;
+    if (file) {
+        compare(object, "translation_catalog", file->translationCatalog);
+        const QJsonValue widgets = object.value(QStringLiteral("widgets"));
+        if (!widgets.isUndefined() && !widgets.isArray()) {
+            differences.append(QStringLiteral("widgets is another"));
+        }
+        for (const QString &key : fileKeys) {
+            members += object.contains(key) ? 1 : 0;
+        }
+        size_t next = 0;
+        for (const QJsonValue &entry : widgets.toArray()) {
+            const QJsonObject written = entry.toObject();
+            for (const QString &key : widgetKeys) {
+                members += written.contains(key) ? 1 : 0;
+            }
+            if (written.value(QStringLiteral("path")).toString().isEmpty()) {
+                continue; // and the model has said so
+            }
+            QVERIFY(next < file->widgets.size());
+            const EventsWidgetsModel::Widget &widget = file->widgets.at(next++);
+            compare(written, "path", widget.path);
+            compare(written, "title", widget.title);
+            compare(written, "translation_id", widget.translationId);
+            compare(written, "description_id", widget.descriptionId);
+            compare(written, "icon", widget.icon);
+            compare(written, "order", widget.order);
+            compare(written, "default_enabled", widget.defaultEnabled);
+            compare(written, "available_path", widget.availablePath);
+
+            // The last widget of a path is the one that the model lists.
+            const QModelIndex row =
+                model
+                    .match(model.index(0), EventsWidgetsModel::PathRole, widget.path, 1,
+                           Qt::MatchExactly | Qt::MatchCaseSensitive)
+                    .value(0);
+            QVERIFY(row.isValid());
+            if (widget.translationId.isEmpty()) {
+                QCOMPARE(row.data(EventsWidgetsModel::TitleRole).toString(), widget.title);
+            }
+            QCOMPARE(row.data(EventsWidgetsModel::IconRole).toString(), widget.icon);
+            QCOMPARE(row.data(EventsWidgetsModel::EnabledRole).toBool(), widget.defaultEnabled);
+        }
+        QCOMPARE(next, file->widgets.size());
+        if (countMembers(QString::fromUtf8(content), fileKeys + widgetKeys) != members) {
+            differences.append(QStringLiteral("a member is lost"));
+        }
+    } else {
+        QCOMPARE(model.rowCount(), 0);
+    }
+    QVERIFY2(hasErrors(installed) == !differences.isEmpty(),
+             qPrintable(differences.join(QLatin1Char('\n'))));
+}
+
+void TestCorpus::examplesAreClean_data()
+{
+    addRows(QStringLiteral("*.*"), QStringLiteral(EXAMPLES_DIR));
+    QVERIFY(QDir(QStringLiteral(EXAMPLES_DIR)).entryList(QDir::Files).size() >= 2);
+}
+
+void TestCorpus::examplesAreClean()
+{
+    // But for their catalog, which nobody has installed.
+    QFETCH(QString, path);
+    for (const Finding &finding : check(path)) {
+        QVERIFY2(finding.rule == QStringLiteral("catalog")
+                     || finding.severity == Finding::Severity::Note,
+                 qPrintable(toText(finding)));
+    }
+}
+
+QTEST_GUILESS_MAIN(TestCorpus)
+
+#include "tst_corpus.moc"

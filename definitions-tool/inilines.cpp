@@ -19,10 +19,16 @@ bool endsLine(char character)
     return character == '\n' || character == '\r';
 }
 
+// Zeroes and all.
+QString fromLatin1(const QByteArray &text)
+{
+    return QString::fromLatin1(text.constData(), text.size());
+}
+
 // Keys and sections are escaped like in a URL, and a backslash is what parts groups.
 QString unescaped(const QByteArray &name)
 {
-    return QString::fromLatin1(QByteArray::fromPercentEncoding(name.trimmed()).replace('\\', '/'));
+    return fromLatin1(QByteArray::fromPercentEncoding(name.trimmed()).replace('\\', '/'));
 }
 
 // The end of what begins at the position, which may go on over several lines in quotes or behind a
@@ -55,11 +61,11 @@ IniLine readHeader(const QByteArray &content)
 {
     const int end = content.indexOf(']');
     const QByteArray section = content.mid(1, end < 0 ? -1 : end - 1).trimmed();
-    IniLine line = {IniLine::Kind::Section, 0, unescaped(section)};
+    IniLine line = {IniLine::Kind::Section, 0, unescaped(section) + QLatin1Char('/')};
     if (section.compare("general", Qt::CaseInsensitive) == 0) {
         line.name.clear();
     } else if (section.compare("%general", Qt::CaseInsensitive) == 0) {
-        line.name = QString::fromLatin1(section.mid(1));
+        line.name = fromLatin1(section.mid(1)) + QLatin1Char('/');
     }
     line.isClosed = end >= 0;
     return line;
@@ -92,16 +98,17 @@ std::vector<IniLine> readIniLines(const QByteArray &text)
         number += int(std::count(text.cbegin() + counted, text.cbegin() + position, '\n'));
         counted = position;
 
-        IniLine line = {IniLine::Kind::Neither, 0, QString::fromLatin1(content)};
+        IniLine line = {IniLine::Kind::Neither, 0, fromLatin1(content)};
         if (content.startsWith('[')) {
             line = readHeader(content);
             section = line.name;
         } else if (equals >= 0) {
-            const QString key = unescaped(text.mid(position, equals - position));
-            line = {IniLine::Kind::Key, 0,
-                    section.isEmpty() ? key : section + QLatin1Char('/') + key};
-            line.isMarked = start > 0 && text.left(position).trimmed().size() == start
-                && !text.left(position).contains('\n');
+            const bool isMarked = start > 0 && !text.left(position).contains('\n')
+                && !text.left(position).contains('\r');
+            const int keyStart = isMarked ? 0 : position;
+            const QString key = unescaped(text.mid(keyStart, equals - keyStart));
+            line = {IniLine::Kind::Key, 0, section + key};
+            line.isMarked = isMarked;
             line.isCut = end < text.size() && text.at(end) == ';' && !isSpace(text.at(end - 1));
         }
         line.number = number;

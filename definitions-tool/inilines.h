@@ -23,8 +23,8 @@ struct IniLine {
 
     Kind kind;
     int number; // From 1.
-    // As QSettings names it: of a section its name, empty for General; of a key also its section's,
-    // as in "remote-arguments/1/argument"; else what stands there.
+    // As QSettings names it: of a section what its keys begin with, as "remote-arguments/", nothing for
+    // General; a key with its section, as "remote-arguments/1/argument"; else what stands there.
     QString name;
     bool isClosed = true; // A section's header.
     bool isAscii = true;

@@ -1,0 +1,49 @@
+# SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+# SPDX-License-Identifier: BSD-3-Clause
+#
+# bash completion for marlo-definitions
+
+_marlo_definitions() {
+    local current=${COMP_WORDS[COMP_CWORD]} previous=${COMP_WORDS[COMP_CWORD - 1]} command='' word
+    for word in "${COMP_WORDS[@]:1:COMP_CWORD-1}"; do
+        case $word in
+        check | list | show)
+            command=$word
+            break
+            ;;
+        esac
+    done
+
+    local words=''
+    case $previous in
+    --format) words='text json' ;;
+    --root)
+        mapfile -t COMPREPLY < <(compgen -d -- "$current")
+        compopt -o filenames 2>/dev/null
+        return
+        ;;
+    *)
+        case $command:$current in
+        check:-*) words='--format --root --strict' ;;
+        list:*) words='--catalogs' ;;
+        :-*) words='--help --version' ;;
+        :*) words='check list show' ;;
+        *)
+            # What the models read, and the way there.
+            local file
+            COMPREPLY=()
+            while IFS= read -r file; do
+                if [[ -d $file || ${file,,} == *.conf || ${file,,} == *.json ]]; then
+                    COMPREPLY+=("$file")
+                fi
+            done < <(compgen -f -- "$current")
+            compopt -o filenames 2>/dev/null
+            return
+            ;;
+        esac
+        ;;
+    esac
+    mapfile -t COMPREPLY < <(compgen -W "$words" -- "$current")
+}
+
+complete -F _marlo_definitions marlo-definitions

@@ -40,7 +40,7 @@ const QString serviceKey = QStringLiteral("remote-service");
 const QString pathKey = QStringLiteral("remote-path");
 const QString interfaceKey = QStringLiteral("remote-interface");
 const QString methodKey = QStringLiteral("remote-method");
-const QString argumentsSection = QStringLiteral("remote-arguments");
+const QString argumentsSection = QStringLiteral("remote-arguments/");
 const QString sizeKey = QStringLiteral("remote-arguments/size");
 
 const QStringList knownKeys = {
@@ -166,9 +166,9 @@ void QuickActionCheck::checkLines(bool isLatin1)
         case IniLine::Kind::Section:
             section = line.name;
             if (!section.isEmpty() && section != argumentsSection) {
-                reportUnknownKey(QStringLiteral("section"), section,
-                                 {argumentsSection, QStringLiteral("General")}, line.number,
-                                 m_findings);
+                reportUnknownKey(QStringLiteral("section"), section.chopped(1),
+                                 {argumentsSection.chopped(1), QStringLiteral("General")},
+                                 line.number, m_findings);
             }
             break;
         case IniLine::Kind::Key:
@@ -213,7 +213,7 @@ void QuickActionCheck::checkKey(const IniLine &line, const QString &section)
         }
     } else if (section == argumentsSection && line.name != sizeKey
                && argumentNumber(line.name) == 0) {
-        QString key = line.name.mid(section.size() + 1);
+        QString key = line.name.mid(section.size());
         const int number = qMax(1, key.section(QLatin1Char('/'), 0, 0).toInt());
         // As it stands there.
         key.replace(QLatin1Char('/'), QLatin1Char('\\'));

@@ -9,6 +9,7 @@
 #include "readerlog.h"
 
 #include <QDBusError>
+#include <QFileInfo>
 #include <QRegularExpression>
 #include <QStringList>
 
@@ -50,9 +51,10 @@ QString callLine(const QuickActionsModel::Action &action)
     if (action.interface().isEmpty()) {
         return QStringLiteral("# goes out without an interface, which busctl cannot do\n");
     }
-    QStringList words = {QStringLiteral("busctl"), QStringLiteral("--user"), QStringLiteral("call"),
-                         action.service(),         action.objectPath(),      action.interface(),
-                         action.method()};
+    // A value may begin with a dash.
+    QStringList words = {QStringLiteral("busctl"), QStringLiteral("--user"), QStringLiteral("--"),
+                         QStringLiteral("call"),   action.service(),         action.objectPath(),
+                         action.interface(),       action.method()};
     QString signature;
     QStringList values;
     const QVariantList arguments = action.arguments();
@@ -126,6 +128,9 @@ std::optional<QString> showEventsWidgets(const QString &path)
 
 std::optional<QString> showDefinition(const QString &path)
 {
+    if (!QFileInfo::exists(path)) {
+        return {};
+    }
     if (DefinitionFiles::isQuickAction(path)) {
         return showQuickAction(path);
     }

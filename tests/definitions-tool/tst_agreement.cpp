@@ -1,0 +1,283 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+// The checker beside the readers, on files that nobody would write.
+
+#include "definitionschecker.h"
+#include "eventswidgetsfile.h"
+#include "files.h"
+#include "inilines.h"
+#include "messagelog.h"
+#include "quickaction.h"
+
+#include <QDBusError>
+#include <QDBusMessage>
+#include <QDir>
+#include <QTemporaryDir>
+#include <QtTest>
+
+#include <algorithm>
+#include <random>
+
+// Takes the error of a call.
+class Receiver : public QObject
+{
+    Q_OBJECT
+
+public:
+    QDBusError error;
+
+public Q_SLOTS:
+    void fail(const QDBusError &answer, const QDBusMessage &) { error = answer; }
+};
+
+class TestAgreement : public QObject
+{
+    Q_OBJECT
+
+private Q_SLOTS:
+    void init();
+    void cleanup();
+
+    void linesHaveTheKeysOfQSettings();
+    void mutilatedQuickActions();
+    void mutilatedEventsWidgets();
+    void namesThatCanBeSent();
+
+private:
+    QString write(const QByteArray &content, const char *suffix);
+
+    std::unique_ptr<MessageLog> m_log;
+    std::unique_ptr<QTemporaryDir> m_folder;
+    int m_files = 0;
+};
+
+namespace {
+
+using Random = std::mt19937;
+
+int below(int end, Random *random)
+{
+    return int((*random)() % uint(end));
+}
+
+QVector<QByteArray> corpus(const QString &filter)
+{
+    QVector<QByteArray> contents;
+    const QDir folder(QStringLiteral(CORPUS_DIR));
+    const QStringList names = folder.entryList({filter}, QDir::Files);
+    for (const QString &name : names) {
+        QFile file(folder.filePath(name));
+        if (!file.open(QIODevice::ReadOnly)) {
+            qFatal("cannot read %s", qPrintable(name));
+        }
+        contents.append(file.readAll());
+    }
+    return contents;
+}
+
+// Some bytes are taken out, put in or changed; mostly into those that mean something.
+QByteArray mutilated(QByteArray content, const QByteArray &meaningful, Random *random)
+{
+    for (int changes = 1 + below(4, random); changes > 0; --changes) {
+        const int position = below(content.size() + 1, random);
+        const char character = below(4, random) > 0
+            ? meaningful.at(below(meaningful.size(), random))
+            : char(below(256, random));
+        switch (below(4, random)) {
+        case 0:
+            content.remove(position, 1 + below(8, random));
+            break;
+        case 1:
+            content.insert(position, character);
+            break;
+        case 2:
+            content.insert(position,
+                           content.mid(below(content.size() + 1, random), below(30, random)));
+            break;
+        default:
+            if (position < content.size()) {
+                content[position] = character;
+            }
+        }
+    }
+    return content;
+}
+
+std::vector<Finding> check(const QString &path)
+{
+    DefinitionsChecker checker(QStringLiteral("/"));
+    checker.check(path);
+    return checker.findings();
+}
+
+int count(const std::vector<Finding> &findings, std::initializer_list<const char *> rules)
+{
+    return int(std::count_if(findings.cbegin(), findings.cend(), [rules](const Finding &finding) {
+        return std::any_of(rules.begin(), rules.end(), [&finding](const char *rule) {
+            return finding.rule == QLatin1String(rule);
+        });
+    }));
+}
+
+} // namespace
+
+void TestAgreement::init()
+{
+    m_log = std::make_unique<MessageLog>();
+    // In memory: these are many files.
+    m_folder = std::make_unique<QTemporaryDir>(QStringLiteral("/run/agreement-XXXXXX"));
+}
+
+void TestAgreement::cleanup()
+{
+    QCOMPARE(m_log->takeReport(), QString());
+    m_log.reset();
+    m_folder.reset();
+}
+
+// Under a name of its own: QSettings does not read a file anew that looks as it did.
+QString TestAgreement::write(const QByteArray &content, const char *suffix)
+{
+    const QString path =
+        m_folder->filePath(QStringLiteral("%1.%2").arg(++m_files).arg(QLatin1String(suffix)));
+    Files::write(path, content);
+    return path;
+}
+
+void TestAgreement::linesHaveTheKeysOfQSettings()
+{
+    Random random(1);
+    const QVector<QByteArray> contents = corpus(QStringLiteral("*.conf"));
+    int compared = 0;
+    for (int i = 0; i < 4000; ++i) {
+        // What else a percent sign begins, only QSettings knows.
+        const QByteArray content =
+            mutilated(contents.at(below(contents.size(), &random)), "\n\r\\\"=;[] ,/#", &random)
+                .replace('%', 'x')
+                .replace('@', 'x');
+        if (content.size() > 100000) {
+            continue;
+        }
+        const QString path = write(content, "conf");
+        const QSettings settings(path, QSettings::IniFormat);
+        if (settings.status() != QSettings::NoError) {
+            continue; // Then the model asks for none.
+        }
+        const QStringList keys = settings.allKeys();
+        QStringList found;
+        for (const IniLine &line : readIniLines(content)) {
+            if (line.kind == IniLine::Kind::Key && !found.contains(line.name)) {
+                found.append(line.name);
+            }
+        }
+        found.sort();
+        if (found != keys) {
+            qInfo() << content;
+        }
+        QCOMPARE(found, keys);
+        compared += keys.size();
+        Files::remove(path);
+    }
+    QVERIFY(compared > 10000);
+}
+
+void TestAgreement::mutilatedQuickActions()
+{
+    Random random(2);
+    const QVector<QByteArray> contents = corpus(QStringLiteral("*.conf"));
+    int refused = 0;
+    for (int i = 0; i < 4000; ++i) {
+        const QByteArray content = mutilated(contents.at(below(contents.size(), &random)),
+                                             "\n\r\\\"=;[] ,/#@%x1", &random);
+        const QString path = write(content, "conf");
+        const std::vector<Finding> findings = check(path);
+        // To the model it is a file that it has not seen yet.
+        const QString another = write(content, "conf");
+        const QuickActionsModel::Action action(another, false);
+        const bool isRefused = !m_log->takeAll().isEmpty();
+        refused += isRefused ? 1 : 0;
+        QCOMPARE(count(findings, {"unreadable"}), isRefused ? 1 : 0);
+        if (!isRefused && action.whyUnsendable().isValid()) {
+            QVERIFY2(count(findings, {"call", "arguments", "comma", "type"}) > 0,
+                     content.constData());
+        }
+        const int lines = content.count('\n') + 1;
+        for (const Finding &finding : findings) {
+            QVERIFY(finding.line >= 1 && finding.line <= lines);
+        }
+        Files::remove(path);
+        Files::remove(another);
+    }
+    QVERIFY(refused > 10 && refused < 3000);
+}
+
+void TestAgreement::mutilatedEventsWidgets()
+{
+    Random random(3);
+    const QVector<QByteArray> contents = corpus(QStringLiteral("*.json"));
+    int read = 0;
+    for (int i = 0; i < 4000; ++i) {
+        const QByteArray content = mutilated(contents.at(below(contents.size(), &random)),
+                                             "\n\\\"{}[]:, 019.eE-tfnu\xc3\xa4", &random);
+        const QString path = write(content, "json");
+        const std::vector<Finding> findings = check(path);
+        const auto file = readEventsWidgetsFile(path);
+        const int warnings = m_log->takeAll().size();
+        QCOMPARE(count(findings, {"json"}), file ? 0 : 1);
+        if (file) {
+            ++read;
+            QCOMPARE(count(findings, {"path", "widget"}), warnings);
+        }
+        const int lines = content.count('\n') + 1;
+        for (const Finding &finding : findings) {
+            QVERIFY(finding.line >= 1 && finding.line <= lines);
+        }
+        Files::remove(path);
+    }
+    QVERIFY2(read > 300 && read < 3500, qPrintable(QString::number(read)));
+}
+
+void TestAgreement::namesThatCanBeSent()
+{
+    const QStringList keys = {QStringLiteral("remote-service"), QStringLiteral("remote-path"),
+                              QStringLiteral("remote-interface"), QStringLiteral("remote-method")};
+    const QStringList good = {QStringLiteral("org.example.lamp"), QStringLiteral("/lamp"),
+                              QStringLiteral("org.example.Lamp"), QStringLiteral("toggle")};
+    const QByteArray characters = "aZ_-./:1 ";
+    Random random(4);
+    int sent = 0;
+    int refused = 0;
+    for (int i = 0; i < 1500; ++i) {
+        QStringList values = good;
+        QByteArray name = below(2, &random) == 0 ? QByteArray() : values.at(i % 4).toLatin1();
+        for (int length = below(6, &random); length > 0; --length) {
+            name.insert(below(name.size() + 1, &random),
+                        characters.at(below(characters.size(), &random)));
+        }
+        values[i % 4] = QString::fromLatin1(name);
+        QByteArray content;
+        for (int key = 0; key < keys.size(); ++key) {
+            content += keys.at(key).toLatin1() + "=\"" + values.at(key).toLatin1() + "\"\n";
+        }
+        const QString path = write(content, "conf");
+        Receiver receiver;
+        const bool isSent = QuickActionsModel::Action(path, false)
+                                .trigger(&receiver, nullptr, SLOT(fail(QDBusError, QDBusMessage)));
+        if (isSent) {
+            QTRY_VERIFY(receiver.error.isValid());
+        }
+        // Nobody has the name.
+        const bool arrived = receiver.error.type() == QDBusError::ServiceUnknown;
+        (arrived ? sent : refused) += 1;
+        m_log->takeAll();
+        QVERIFY2((count(check(path), {"call"}) == 0) == arrived,
+                 qPrintable(QString::fromUtf8(content) + receiver.error.message()));
+        Files::remove(path);
+    }
+    QVERIFY(sent > 200 && refused > 200);
+}
+
+QTEST_GUILESS_MAIN(TestAgreement)
+
+#include "tst_agreement.moc"

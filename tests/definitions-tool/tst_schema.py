@@ -1,0 +1,53 @@
+#!/usr/bin/python3
+# SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+# SPDX-License-Identifier: BSD-3-Clause
+"""The JSON Schema and the checker judge alike.
+
+usage: tst_schema.py SCHEMA CORPUS EXAMPLES
+"""
+
+import json
+import pathlib
+import re
+import sys
+
+import jsonschema
+
+# What a schema cannot say: what comes twice, and what other files hold.
+BEYOND = {"repeated-key", "duplicate-path", "text-id", "catalog", "relative-path", "order"}
+
+schema = json.loads(pathlib.Path(sys.argv[1]).read_text())
+jsonschema.Draft7Validator.check_schema(schema)
+validator = jsonschema.Draft7Validator(schema)
+compared = {True: 0, False: 0}
+failed = False
+
+
+def fail(text):
+    global failed
+    failed = True
+    print("FAILED:", text)
+
+
+for path in sorted(pathlib.Path(sys.argv[2]).glob("*.json")):
+    findings = pathlib.Path(f"{path}.findings").read_text()
+    rules = set(re.findall(r" \[([a-z-]+)\]$", findings, re.MULTILINE)) - BEYOND
+    try:
+        value = json.loads(path.read_bytes().decode("utf-8-sig"), strict=False)
+    except (ValueError, RecursionError):
+        if rules != {"json"}:
+            fail(f"{path.name} is no JSON")
+        continue
+    valid = validator.is_valid(value)
+    compared[valid] += 1
+    if valid != (not rules):
+        fail(f"{path.name}: valid is {valid}, but the findings are {rules}")
+
+for path in sorted(pathlib.Path(sys.argv[3]).glob("*.json")):
+    for error in validator.iter_errors(json.loads(path.read_text())):
+        fail(f"{path.name}: {error.message}")
+
+print(f"{compared[True]} valid, {compared[False]} not")
+if min(compared.values()) < 15:
+    fail("too few to compare")
+sys.exit(failed)

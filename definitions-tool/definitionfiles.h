@@ -12,8 +12,8 @@
 */
 namespace DefinitionFiles {
 
-constexpr QLatin1String quickActionsDirectory("/usr/share/glimmera/quickactions");
-constexpr QLatin1String eventsWidgetsDirectory("/usr/share/glimmera/eventswidgets");
+const QLatin1String quickActionsDirectory("/usr/share/glimmera/quickactions");
+const QLatin1String eventsWidgetsDirectory("/usr/share/glimmera/eventswidgets");
 
 // By their names.
 bool isQuickAction(const QString &path);

@@ -13,6 +13,7 @@
 #include <algorithm>
 #include <array>
 #include <optional>
+#include <utility>
 
 using Severity = Finding::Severity;
 using Widget = EventsWidgetsModel::Widget;
@@ -90,9 +91,10 @@ QString nameOf(Type type)
 class EventsWidgetsCheck
 {
 public:
-    EventsWidgetsCheck(const QString &path, const QByteArray &content,
-                       const EventsWidgetsFile &file, CheckContext *context, Findings *findings)
-        : m_path(path), m_content(content), m_file(file), m_context(context), m_findings(findings)
+    EventsWidgetsCheck(QString path, QByteArray content, const EventsWidgetsFile &file,
+                       CheckContext *context, Findings *findings)
+        : m_path(std::move(path)), m_content(std::move(content)), m_file(file), m_context(context),
+          m_findings(findings)
     {
     }
 
@@ -301,7 +303,7 @@ void checkEventsWidgets(const QString &path, CheckContext *context, Findings *fi
         return;
     }
     if (file) {
-        EventsWidgetsCheck(path, content, *file, context, findings).check();
+        EventsWidgetsCheck(path, std::move(content), *file, context, findings).check();
     } else {
         reportRefused(content, findings);
     }

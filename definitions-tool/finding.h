@@ -8,6 +8,7 @@
 #include <QString>
 
 #include <array>
+#include <utility>
 #include <vector>
 
 /*
@@ -27,7 +28,7 @@ struct Finding {
 class Findings
 {
 public:
-    explicit Findings(const QString &file) : m_file(file) { }
+    explicit Findings(QString file) : m_file(std::move(file)) { }
 
     // Of each severity, keeps no more than anybody reads, and says so.
     void add(int line, Finding::Severity severity, QLatin1String rule, const QString &text);

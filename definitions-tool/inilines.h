@@ -35,7 +35,7 @@ struct IniLine {
 };
 
 // QSettings reads the values behind it as UTF-8, and as Latin-1 without.
-constexpr char iniByteOrderMark[] = "\xef\xbb\xbf";
+constexpr const char *iniByteOrderMark = "\xef\xbb\xbf";
 
 std::vector<IniLine> readIniLines(const QByteArray &text);
 

@@ -12,9 +12,9 @@
 */
 namespace CatalogFiles {
 
-constexpr QLatin1String directory("/usr/share/translations");
-constexpr QLatin1String engineeringEnglishSuffix("_eng_en");
-constexpr QLatin1String localePrefix("-");
+const QLatin1String directory("/usr/share/translations");
+const QLatin1String engineeringEnglishSuffix("_eng_en");
+const QLatin1String localePrefix("-");
 
 } // namespace CatalogFiles
 

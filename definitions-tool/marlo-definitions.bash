@@ -19,7 +19,6 @@ _marlo_definitions() {
     --format) words='text json' ;;
     --root)
         mapfile -t COMPREPLY < <(compgen -d -- "$current")
-        compopt -o filenames 2>/dev/null
         return
         ;;
     *)
@@ -37,7 +36,6 @@ _marlo_definitions() {
                     COMPREPLY+=("$file")
                 fi
             done < <(compgen -f -- "$current")
-            compopt -o filenames 2>/dev/null
             return
             ;;
         esac
@@ -46,4 +44,4 @@ _marlo_definitions() {
     mapfile -t COMPREPLY < <(compgen -W "$words" -- "$current")
 }
 
-complete -F _marlo_definitions marlo-definitions
+complete -o filenames -F _marlo_definitions marlo-definitions

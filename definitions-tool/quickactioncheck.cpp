@@ -43,10 +43,14 @@ const QString methodKey = QStringLiteral("remote-method");
 const QString argumentsSection = QStringLiteral("remote-arguments/");
 const QString sizeKey = QStringLiteral("remote-arguments/size");
 
-const QStringList knownKeys = {
-    titleKey,   catalogKey, iconKey,      priorityKey, QStringLiteral("requires-package"),
-    serviceKey, pathKey,    interfaceKey, methodKey,
-};
+const QStringList &knownKeys()
+{
+    static const QStringList keys = {
+        titleKey,   catalogKey, iconKey,      priorityKey, QStringLiteral("requires-package"),
+        serviceKey, pathKey,    interfaceKey, methodKey,
+    };
+    return keys;
+}
 
 constexpr int maximumName = 255;
 
@@ -207,9 +211,10 @@ void QuickActionCheck::checkKey(const IniLine &line, const QString &section)
             QStringLiteral("an unquoted semicolon ends the value; put it in double quotes"));
     }
     if (section.isEmpty()) {
-        if (!knownKeys.contains(line.name) && line.name != sizeKey
+        if (!knownKeys().contains(line.name) && line.name != sizeKey
             && argumentNumber(line.name) == 0) {
-            reportUnknownKey(QStringLiteral("key"), line.name, knownKeys, line.number, m_findings);
+            reportUnknownKey(QStringLiteral("key"), line.name, knownKeys(), line.number,
+                             m_findings);
         }
     } else if (section == argumentsSection && line.name != sizeKey
                && argumentNumber(line.name) == 0) {
@@ -225,7 +230,7 @@ void QuickActionCheck::checkKey(const IniLine &line, const QString &section)
 
 void QuickActionCheck::checkTexts()
 {
-    for (const QString &key : knownKeys) {
+    for (const QString &key : knownKeys()) {
         if (key != priorityKey && m_config.contains(key)) {
             checkText(key, m_config.value(key));
         }

@@ -60,9 +60,10 @@ QByteArray read(const QString &path)
     return file.readAll();
 }
 
-void addRows(const QString &filter, const QString &folder = QStringLiteral(CORPUS_DIR))
+void addRows(const QString &filter)
 {
     QTest::addColumn<QString>("path");
+    const QString folder = QStringLiteral(CORPUS_DIR);
     const QStringList names = QDir(folder).entryList({filter}, QDir::Files);
     for (const QString &name : names) {
         QTest::newRow(qPrintable(name)) << folder + QLatin1Char('/') + name;
@@ -396,8 +397,18 @@ void TestCorpus::agreesOnEventsWidgets()
 
 void TestCorpus::examplesAreClean_data()
 {
-    addRows(QStringLiteral("*.*"), QStringLiteral(EXAMPLES_DIR));
-    QVERIFY(QDir(QStringLiteral(EXAMPLES_DIR)).entryList(QDir::Files).size() >= 2);
+    QTest::addColumn<QString>("path");
+    int count = 0;
+    for (const char *folder : {"definitions-tool/examples", "docs/examples"}) {
+        const QDir examples(QStringLiteral(SOURCE_DIR "/") + QLatin1String(folder));
+        const QStringList names =
+            examples.entryList({QStringLiteral("*.conf"), QStringLiteral("*.json")}, QDir::Files);
+        for (const QString &name : names) {
+            QTest::addRow("%s/%s", folder, qPrintable(name)) << examples.filePath(name);
+            ++count;
+        }
+    }
+    QCOMPARE(count, 4);
 }
 
 void TestCorpus::examplesAreClean()

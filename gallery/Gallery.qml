@@ -16,14 +16,22 @@ ApplicationWindow {
 
     readonly property alias pages: pages.list
     readonly property alias currentPage: stack.currentItem
+    // The item that has all that is shown in it, popups too.
+    readonly property Item surface: contentItem.parent
+    property alias logOpen: log.open
 
-    function open(page) {
+    function openPage(name) {
         close();
-        return stack.push("pages/" + page.file, StackView.Immediate);
+        const entry = () => pages.list.find(page => page.name === name);
+        stack.push("PageFrame.qml", { entry: entry() }, StackView.Immediate);
+        currentPage.entry = Qt.binding(entry);
+        currentPage.forceActiveFocus();
+        return currentPage.page;
     }
 
     function close() {
         stack.pop(null, StackView.Immediate);
+        currentPage.forceActiveFocus();
     }
 
     width: 360
@@ -70,10 +78,16 @@ ApplicationWindow {
     StackView {
         id: stack
         anchors.fill: parent
+        focus: true
         initialItem: StartPage {
             pages: window.pages
-            onOpened: window.open(page)
+            onOpened: window.openPage(page.name)
         }
+    }
+
+    footer: LogPane {
+        id: log
+        open: window.width >= 900
     }
 
     Shortcut {

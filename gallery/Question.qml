@@ -19,8 +19,10 @@ Dialog {
     width: Math.min(parent.width - 32, 400)
     modal: true
 
-    contentItem: Label {
+    // Of a width of its own, and so of a height that is known at once.
+    Label {
         id: label
+        width: question.availableWidth
         wrapMode: Text.Wrap
     }
     footer: DialogButtonBox {

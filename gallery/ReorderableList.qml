@@ -6,7 +6,8 @@ import QtQuick.Controls 2.15
 import QtQuick.Controls.impl 2.15
 
 /*
-    A list whose rows are dragged by a handle; its model has the roles title and icon.
+    A list whose rows are dragged by a handle, or moved with Ctrl and the arrow keys; its model has
+    the roles title and icon.
 */
 ListView {
     id: list
@@ -21,12 +22,24 @@ ListView {
 
     delegate: ItemDelegate {
         id: row
+        focusPolicy: Qt.StrongFocus
         width: ListView.view.width
         height: list.rowHeight
+        leftPadding: 0
         rightPadding: handle.width
+        icon.width: 24
+        icon.height: 24
         text: model.title || model.path
         icon.source: model.icon ? "file://" + model.icon : ""
         highlighted: handle.pressed
+        Keys.onPressed: {
+            const to = event.key === Qt.Key_Up ? index - 1
+                     : event.key === Qt.Key_Down ? index + 1 : -1;
+            if (event.modifiers & Qt.ControlModifier && to >= 0 && to < list.count) {
+                event.accepted = true;
+                list.moved(index, to);
+            }
+        }
 
         MouseArea {
             id: handle

@@ -3,96 +3,341 @@
 
 import QtQuick 2.15
 import gallery.stage 1.0
+import "screen.js" as Screen
 
 /*
-    Takes screenshots of every page, without a display:
+    Takes screenshots of every page in each of its states, without a display:
 
         QT_QPA_PLATFORM=offscreen QT_QUICK_BACKEND=software qml Screenshots.qml -- FOLDER
 
-    Prints a line for each page and ends with status 0, or at the first problem with another and a
-    line that names it: a page that does not load or never is ready, any warning of QML, a text
-    without translation, an image that cannot be saved.
+    A page that is longer than the screen is taken in several. Prints a line for each state and ends
+    with status 0, or at the first problem with another and a line that names it: a page that does
+    not load, a state that is not reached, any warning of QML, a text without translation, that is
+    cut off or overlaps another, an image that cannot be saved.
 */
 Gallery {
     id: gallery
 
     readonly property string folder: Qt.application.arguments[Qt.application.arguments.length - 1]
+    // Pages are opened in each language. States that have to be reached are in English; the longest
+    // language follows, only to see that there is room for it.
     readonly property var views: [
         { language: "en", width: 360, height: 640 },
         { language: "en", width: 1280, height: 800 },
-        { language: "fi", width: 360, height: 640 },
         { language: "de", width: 360, height: 640 },
+        { language: "fi", width: 360, height: 640 },
     ]
-    // The start page has a name only.
-    readonly property var shots: [{ name: "start" }].concat(pages)
+    // What a user does, each step until it is true.
+    readonly property var shots: [
+        { page: "start" },
+
+        { page: "quick-actions", steps: [() => shows(qsTrId("camera-take-photo"))] },
+        { page: "quick-actions", state: "called", steps: [
+            () => press(qsTrId("camera-take-photo")),
+            () => press(qsTrId("torch-toggle")),
+            () => press(qsTrId("gallery-sample-new-alarm")),
+            () => press(qsTrId("maps-navigate-home")),
+            () => ["camera", "torch", "alarms", "marlostore"].every(
+                      name => shows("com.marlo." + name))] },
+        { page: "quick-actions", state: "failing", steps: [
+            () => stage(qsTrId("gallery-quick-actions-fail")),
+            () => press(qsTrId("camera-take-photo")),
+            () => Messages.count > 0,
+            () => logOpen = true] },
+        { page: "quick-actions", state: "none", steps: [
+            () => stage(qsTrId("gallery-quick-actions-installed")),
+            () => shows(qsTrId("gallery-quick-actions-none"))] },
+
+        { page: "quick-actions-settings", steps: [() => shows(qsTrId("notes-search"))] },
+        { page: "quick-actions-settings", state: "broken", steps: [
+            () => stage(qsTrId("gallery-quick-actions-broken")),
+            () => shows("/usr/share/glimmera/quickactions/empty.conf")] },
+        { page: "quick-actions-settings", state: "none", steps: [
+            () => stage(qsTrId("gallery-quick-actions-installed")),
+            () => shows(qsTrId("gallery-quick-actions-not-installed"))] },
+
+        { page: "events-widgets", steps: [() => shows(qsTrId("outdoors-steps"))] },
+        { page: "events-widgets", state: "available", steps: [
+            () => stage(qsTrId("gallery-events-widgets-step-counter")),
+            () => press(qsTrId("gallery-events-widgets-check")),
+            () => !shows(qsTrId("gallery-events-widgets-unavailable"))] },
+        { page: "events-widgets", state: "broken", steps: [
+            () => stage(qsTrId("gallery-events-widgets-broken")),
+            () => Messages.count > 0] },
+        { page: "events-widgets", state: "none", steps: [
+            () => stage(qsTrId("gallery-events-widgets-installed")),
+            () => shows(qsTrId("gallery-events-widgets-none"))] },
+
+        { page: "titles", steps: [() => shows(qsTrId("notes-search"))] },
+        { page: "titles", state: "none", steps: [
+            () => stage(qsTrId("gallery-events-widgets-installed")),
+            () => stage(qsTrId("gallery-quick-actions-installed")),
+            () => !shows(qsTrId("notes-search")) && !shows(qsTrId("outdoors-steps")),
+            () => shows(qsTrId("gallery-titles-none"))] },
+
+        { page: "memory-card", steps: [() => probed()] },
+        { page: "memory-card", state: "no-card", steps: [
+            () => probed(),
+            () => stage(qsTrId("gallery-card-inserted")),
+            () => shows(qsTrId("gallery-card-none")) && cardIsIdle()] },
+        { page: "memory-card", state: "asks-to-format", steps: [
+            () => probed(),
+            () => press(qsTrId("gallery-card-format").arg("ext4")),
+            () => shows(qsTrId("gallery-card-question"))] },
+        { page: "memory-card", state: "asks-to-empty", steps: [
+            () => probed(),
+            () => press(qsTrId("gallery-card-empty")),
+            () => shows(qsTrId("gallery-card-empty-question"))] },
+        { page: "memory-card", state: "mounted", steps: [
+            () => probed(),
+            () => press(qsTrId("gallery-card-mount")),
+            () => StagedCard.mounted && shows("2. " + qsTrId("gallery-card-idle")),
+            () => press(qsTrId("gallery-card-fill"))] },
+        { page: "memory-card", state: "in-use", steps: [
+            () => probed(),
+            () => stage(qsTrId("gallery-card-in-use")),
+            () => press(qsTrId("gallery-card-unmount")),
+            () => shows(qsTrId("gallery-card-device-busy"))] },
+        { page: "memory-card", state: "emptied", steps: [
+            () => probed(),
+            () => press(qsTrId("gallery-card-empty")),
+            () => press(qsTrId("gallery-card-remove")),
+            () => StagedCard.fileCount === 0 && shows("2. " + qsTrId("gallery-card-idle"))] },
+        { page: "memory-card", state: "busy", moving: true, steps: [
+            () => probed(),
+            () => stage(qsTrId("gallery-card-helper-waits")),
+            () => press(qsTrId("gallery-card-format").arg("ext4")),
+            () => press(qsTrId("gallery-card-erase")),
+            () => shows("2. " + qsTrId("gallery-card-formatting"))] },
+        { page: "memory-card", state: "formatted", steps: [
+            () => probed(),
+            () => StagedCard.mounted || press(qsTrId("gallery-card-mount")),
+            () => StagedCard.mounted && shows("2. " + qsTrId("gallery-card-idle")),
+            () => press(qsTrId("gallery-card-format").arg("ext4")),
+            () => press(qsTrId("gallery-card-erase")),
+            () => shows("4. " + qsTrId("gallery-card-idle")) && shows("ext4")] },
+        { page: "memory-card", state: "unmounted", steps: [
+            () => probed(),
+            () => press(qsTrId("gallery-card-unmount")),
+            () => !StagedCard.mounted && shows("2. " + qsTrId("gallery-card-idle"))] },
+        { page: "memory-card", state: "not-mounted", steps: [
+            () => probed(),
+            () => press(qsTrId("gallery-card-unmount")),
+            () => shows(qsTrId("gallery-card-not-mounted"))] },
+        { page: "memory-card", state: "forbidden", steps: [
+            () => probed(),
+            () => press(qsTrId("gallery-card-service-forbids")),
+            () => press(qsTrId("gallery-card-mount")),
+            () => shows(qsTrId("gallery-card-not-authorized"))] },
+        { page: "memory-card", state: "silent", steps: [
+            () => probed(),
+            () => press(qsTrId("gallery-card-service-silent")),
+            () => press(qsTrId("gallery-card-mount"))] },
+        { page: "memory-card", state: "absent", steps: [
+            () => probed(),
+            () => press(qsTrId("gallery-card-service-absent")),
+            () => press(qsTrId("gallery-card-mount")),
+            () => shows(qsTrId("gallery-card-failed"))] },
+        { page: "memory-card", state: "without-helper", steps: [
+            () => probed(),
+            () => stage(qsTrId("gallery-card-helper")),
+            () => press(qsTrId("gallery-stage-reload")),
+            () => shows(qsTrId("gallery-card-failed"))] },
+
+        { page: "location", steps: [] },
+        { page: "location", state: "agreed", steps: [
+            () => press(qsTrId("gallery-location-gps")),
+            () => press(qsTrId("gallery-location-agree")),
+            () => press(qsTrId("gallery-location-agree")),
+            () => !shows(qsTrId("gallery-location-agree-first"))] },
+        { page: "location", state: "none", steps: [
+            () => stage(qsTrId("gallery-location-mls-installed")),
+            () => stage(qsTrId("gallery-location-here-installed")),
+            () => press(qsTrId("gallery-stage-reload")),
+            () => shows(qsTrId("settings_location-la-no_agreement_text_found"))] },
+
+        { page: "cover", steps: [() => shows(qsTrId("gallery-cover-none"))] },
+        { page: "cover", state: "attached", steps: [
+            () => press(qsTrId("gallery-cover-attached")),
+            () => shows("MARLO-COVER-07") && shows(qsTrId("gallery-cover-not-ready"))] },
+        { page: "cover", state: "ready", steps: [
+            () => press(qsTrId("gallery-cover-attached-ready")),
+            () => shows("MARLO-COVER-07") && shows(qsTrId("gallery-cover-ready"))] },
+        { page: "cover", state: "absent", steps: [
+            () => press(qsTrId("gallery-cover-no-daemon")),
+            () => press(qsTrId("gallery-stage-reload")),
+            () => shows(qsTrId("gallery-cover-none"))] },
+
+        { page: "bluetooth", steps: [() => !shows(qsTrId("gallery-unknown"))] },
+        { page: "bluetooth", state: "unknown", steps: [
+            () => stage(qsTrId("gallery-bluetooth-installed")),
+            () => press(qsTrId("gallery-stage-reload")),
+            () => shows(qsTrId("gallery-unknown"))] },
+        { page: "android", steps: [() => shows(qsTrId("gallery-android-shown"))] },
+        { page: "android", state: "hidden", steps: [
+            () => stage(qsTrId("gallery-android-installed")),
+            () => press(qsTrId("gallery-stage-reload")),
+            () => shows(qsTrId("gallery-android-hidden"))] },
+        { page: "modem", steps: [() => !shows(qsTrId("gallery-unknown"))] },
+        { page: "modem", state: "unknown", steps: [
+            () => stage(qsTrId("gallery-modem-installed")),
+            () => press(qsTrId("gallery-stage-reload")),
+            () => shows(qsTrId("gallery-unknown"))] },
+
+        { page: "terms", steps: [() => !shows(qsTrId("gallery-terms-none"))] },
+        { page: "terms", state: "none", steps: [
+            () => stage(qsTrId("gallery-terms-platform-installed")),
+            () => stage(qsTrId("gallery-terms-vendor-installed")),
+            () => press(qsTrId("gallery-stage-reload")),
+            () => shows(qsTrId("gallery-terms-none"))] },
+
+        { page: "text-files", steps: [() => !shows(qsTrId("gallery-text-files-none"))] },
+        { page: "text-files", state: "none", steps: [
+            () => stage(qsTrId("gallery-text-files-file-installed")),
+            () => stage(qsTrId("gallery-text-files-folder-installed")),
+            () => press(qsTrId("gallery-stage-reload")),
+            () => shows(qsTrId("gallery-text-files-none"))] },
+    ]
 
     property int shot: -1
-    property int view: views.length - 1
+    property int view: -1
+    property int step: 0
+    property int part: 0
+    property int looks: 0
+    readonly property int enoughLooks: 100
+    property var staged: []
     property var files: []
-    property bool demonstrated: false
     property bool grabbing: true
     property bool failed: false
+    property bool finished: false
 
-    function next() {
-        if (++view === views.length) {
-            view = 0;
-            if (++shot === shots.length) {
-                Qt.quit();
-                return;
-            }
-            files = [];
+    function shows(text) {
+        return Screen.texts(surface).some(item => item.text === text);
+    }
+
+    function press(text) {
+        const control = Screen.control(surface, text);
+        if (!control || !control.enabled) {
+            return false;
         }
+        if (control.checkable) {
+            control.toggle();
+            control.toggled();
+        }
+        control.clicked();
+        return true;
+    }
+
+    // Presses a switch that is pressed again when the screenshot is taken.
+    function stage(text) {
+        if (!press(text)) {
+            return false;
+        }
+        staged.push(text);
+        return true;
+    }
+
+    function probed() {
+        return StagedCard.ready && cardIsIdle() && (shows("ext4") || shows("vfat"));
+    }
+
+    function cardIsIdle() {
+        return !Screen.visibleItems(surface).some(item => item.indeterminate);
+    }
+
+    function nextShot() {
+        Stage.language = views[0].language;
+        staged.reverse().forEach(press);
+        staged = [];
+        if (files.length > 0) {
+            const state = shots[shot].state || "open";
+            console.log("%1 (%2): %3".arg(shots[shot].page).arg(state).arg(files.join(" ")));
+        }
+        files = [];
+        view = 0;
+        if (shot + 1 === shots.length) {
+            finished = true;
+            Qt.quit();
+            return;
+        }
+        ++shot;
+        open();
+    }
+
+    function nextView() {
+        if (++view === views.length || (shots[shot].state && views[view].language === "fi")) {
+            nextShot();
+        } else if (shots[shot].state) {
+            present();
+        } else {
+            open();
+        }
+    }
+
+    function open() {
         close();
-        Stage.language = views[view].language;
-        width = views[view].width;
-        height = views[view].height;
-        if (shots[shot].file && !open(shots[shot])) {
+        StagedCard.diskService = StagedCard.Working;
+        Stage.cover = Stage.NoCover;
+        Messages.clear();
+        present();
+        if (shots[shot].page !== "start" && !openPage(shots[shot].page)) {
             fail("does not load");
             return;
         }
-        demonstrated = false;
+        step = 0;
+    }
+
+    // As it is now.
+    function present() {
+        const shown = views[view];
+        Stage.language = shown.language;
+        width = shown.width;
+        height = shown.height;
+        logOpen = Qt.binding(() => width >= 900);
+        part = 0;
         grabbing = false;
         still.restart();
     }
 
     function grab() {
+        const untranslated = Screen.untranslated(surface);
+        const flaw = untranslated ? "no translation of " + untranslated : Screen.flaw(surface);
+        if (flaw) {
+            // What has just changed may be about to be laid out.
+            if (++looks === enoughLooks) {
+                fail(flaw);
+            }
+            return;
+        }
+        looks = 0;
         grabbing = true;
-        const untranslated = findUntranslated(contentItem.parent);
-        if (untranslated) {
-            fail("no translation of " + untranslated);
+        if (shots[shot].state && view > 1) {
+            nextView();
             return;
         }
         const shown = views[view];
-        const file = "%1-%2x%3-%4.png".arg(shots[shot].name).arg(shown.width).arg(shown.height)
-                                      .arg(shown.language);
-        const begun = contentItem.parent.grabToImage(result => {
-            if (!result.saveToFile(folder + "/" + file)) {
-                fail("cannot save " + folder + "/" + file);
+        const name = [shots[shot].page, shots[shot].state, shown.width + "x" + shown.height,
+                      shown.language, part ? part + 1 : ""].filter(word => word).join("-") + ".png";
+        const begun = surface.grabToImage(result => {
+            if (!result.saveToFile(folder + "/" + name)) {
+                fail("cannot save " + folder + "/" + name);
                 return;
             }
-            files.push(file);
-            if (view === views.length - 1) {
-                console.log(shots[shot].name + ": " + files.join(" "));
+            files.push(name);
+            const seen = currentPage.scrollY + currentPage.height;
+            if (seen < currentPage.scrollHeight - 8) {
+                ++part;
+                currentPage.scrollTo(seen - 16);
+                grabbing = false;
+                still.restart();
+            } else {
+                currentPage.scrollTo(0);
+                nextView();
             }
-            next();
         });
         if (!begun) {
             fail("cannot be grabbed");
         }
-    }
-
-    // A text that the catalogs lack shows as its identifier.
-    function findUntranslated(item) {
-        if (/^gallery-/.test(item.text) || /^gallery-/.test(item.title)) {
-            return item.text || item.title;
-        }
-        for (let i = 0; i < item.children.length; ++i) {
-            const found = findUntranslated(item.children[i]);
-            if (found) {
-                return found;
-            }
-        }
-        return "";
     }
 
     function fail(problem) {
@@ -100,38 +345,45 @@ Gallery {
             return;
         }
         failed = true;
-        const page = shot < 0 ? "gallery" : shots[shot].name;
-        console.error("screenshots: " + page + " (" + views[view].language + "): " + problem);
+        const name = shot < 0 ? "gallery" : shots[shot].page;
+        const state = shots[shot] && shots[shot].state ? " " + shots[shot].state : "";
+        console.error("screenshots: %1%2 (%3): %4".arg(name).arg(state)
+                          .arg(view < 0 ? "" : views[view].language).arg(problem));
         Qt.exit(1);
     }
 
-    Component.onCompleted: next()
+    Component.onCompleted: nextShot()
     // While anything moves there are new frames: an image is taken when nothing does any more.
-    onFrameSwapped: still.restart()
+    onFrameSwapped: {
+        if (step === (shots[shot].steps || []).length && !shots[shot].moving) {
+            still.restart();
+        }
+    }
 
     Timer {
         id: still
-        interval: 100
+        interval: 30
         repeat: true
         onTriggered: {
-            if (gallery.grabbing || gallery.failed) {
+            if (gallery.grabbing || gallery.failed || gallery.finished) {
                 return;
             }
-            // As a user would: once the page is there.
-            if (!gallery.demonstrated) {
-                gallery.demonstrated = true;
-                gallery.currentPage.demonstrate();
-            } else if (gallery.currentPage.ready) {
+            const steps = gallery.shots[gallery.shot].steps || [];
+            if (gallery.step === steps.length) {
                 gallery.grab();
+            } else if (steps[gallery.step]()) {
+                ++gallery.step;
+                watchdog.restart();
             }
         }
     }
 
     Timer {
         id: watchdog
-        interval: 60000
+        interval: 30000
         running: true
-        onTriggered: gallery.fail("not ready in time")
+        onTriggered: gallery.fail("step %1 is not reached, there is %2".arg(gallery.step + 1).arg(
+                                      Screen.texts(gallery.surface).map(item => item.text).join("; ")))
     }
 
     Connections {

@@ -7,15 +7,16 @@ import QtQuick.Controls.Universal 2.15
 import QtQuick.Layouts 1.15
 
 /*
-    Lists the pages with a sentence each.
+    Lists the pages, with the type that each is of and what that is for.
 */
-GalleryPage {
+ScrollingPage {
     id: start
 
     property var pages
     signal opened(var page)
 
     title: qsTrId("gallery-title")
+    columns: Math.max(1, Math.floor(width / 320))
 
     Repeater {
         model: start.pages
@@ -23,26 +24,39 @@ GalleryPage {
         ItemDelegate {
             id: entry
             Layout.fillWidth: true
+            Layout.fillHeight: true
             Layout.preferredWidth: 1
-            Layout.alignment: Qt.AlignTop
+            focusPolicy: Qt.StrongFocus
             text: modelData.title
             onClicked: start.opened(modelData)
+            Keys.onReturnPressed: clicked()
 
             padding: 12
             background: Card {
                 color: entry.down ? "#e0e5e5" : entry.hovered ? "#f8fafa" : "white"
                 border.color: entry.visualFocus ? Universal.accent : "#d5dada"
+                border.width: entry.visualFocus ? 2 : 1
             }
             contentItem: ColumnLayout {
+                spacing: 2
+
                 Label {
                     Layout.fillWidth: true
                     text: entry.text
                     font.pixelSize: 16
                     font.weight: Font.Medium
-                    elide: Text.ElideRight
+                    wrapMode: Text.Wrap
                 }
                 Label {
                     Layout.fillWidth: true
+                    text: modelData.type
+                    color: Universal.accent
+                    font.pixelSize: 12
+                    wrapMode: Text.Wrap
+                }
+                Label {
+                    Layout.fillWidth: true
+                    Layout.fillHeight: true
                     text: modelData.about
                     opacity: 0.7
                     wrapMode: Text.Wrap

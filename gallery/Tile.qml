@@ -12,6 +12,7 @@ import QtQuick.Controls.Universal 2.15
 ItemDelegate {
     id: tile
 
+    focusPolicy: Qt.StrongFocus
     width: 100
     height: 96
     horizontalPadding: 2

@@ -2,22 +2,13 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 import QtQuick 2.15
-import QtQuick.Controls 2.15
 import com.marlo.settings.system 1.0
-import gallery.stage 1.0
 import ".."
 
 /*
     The smart back cover, as the cover daemon tells of it.
 */
 GalleryPage {
-    title: qsTrId("gallery-cover")
-    ready: cover.kivId !== "" && cover.kivReady
-
-    function demonstrate() {
-        Stage.coverAttached = true;
-    }
-
     KivInfo {
         id: cover
     }
@@ -32,19 +23,6 @@ GalleryPage {
         Value {
             name: qsTrId("gallery-cover-daemon")
             value: cover.kivReady ? qsTrId("gallery-cover-ready") : qsTrId("gallery-cover-not-ready")
-        }
-    }
-
-    Section {
-        heading: qsTrId("gallery-cover-device")
-
-        Note {
-            text: qsTrId("gallery-cover-device-note")
-        }
-        Button {
-            text: Stage.coverAttached ? qsTrId("gallery-cover-remove")
-                                      : qsTrId("gallery-cover-attach")
-            onClicked: Stage.coverAttached = !Stage.coverAttached
         }
     }
 }

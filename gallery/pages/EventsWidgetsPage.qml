@@ -3,18 +3,13 @@
 
 import QtQuick 2.15
 import QtQuick.Controls 2.15
-import QtQuick.Layouts 1.15
 import com.marlo.settings.system 1.0
-import gallery.stage 1.0
 import ".."
 
 /*
     The page on which a user chooses the widgets of the events screen.
 */
 GalleryPage {
-    title: qsTrId("gallery-events-widgets")
-    ready: list.count > 0
-
     EventsWidgetsModel {
         id: widgets
     }
@@ -25,7 +20,7 @@ GalleryPage {
         Repeater {
             id: list
             model: widgets
-            DescribedSwitch {
+            TextSwitch {
                 text: model.title
                 icon.source: model.icon ? "file://" + model.icon : ""
                 description: model.description
@@ -42,25 +37,13 @@ GalleryPage {
             }
         }
         Note {
-            text: qsTrId("gallery-events-widgets-first-choice")
+            text: list.count === 0 ? qsTrId("gallery-events-widgets-none")
+                                   : qsTrId("gallery-events-widgets-first-choice")
         }
-    }
-
-    Section {
-        heading: qsTrId("gallery-events-widgets-device")
-
-        SwitchDelegate {
-            Layout.fillWidth: true
-            text: qsTrId("gallery-events-widgets-step-counter")
-            checked: Stage.stepCounterInstalled
-            onToggled: {
-                Stage.stepCounterInstalled = checked;
-                // Nobody else tells the model that a widget's file has come or gone.
-                widgets.updateAvailable();
-            }
-        }
-        Note {
-            text: qsTrId("gallery-events-widgets-step-counter-note")
+        // Nobody else tells the model that what a widget needs has come or gone.
+        Button {
+            text: qsTrId("gallery-events-widgets-check")
+            onClicked: widgets.updateAvailable()
         }
     }
 }

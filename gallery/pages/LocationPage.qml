@@ -18,18 +18,6 @@ GalleryPage {
     readonly property bool mlsAgreed: location.mlsOnlineState !== LocationPage.OnlineState.NotAgreed
     readonly property bool hereAgreed: location.hereState !== LocationPage.OnlineState.NotAgreed
 
-    title: qsTrId("gallery-location")
-    ready: location.gpsEnabled && mlsAgreed && mlsTerms.text !== "" && hereTerms.text !== ""
-
-    function demonstrate() {
-        location.gpsEnabled = true;
-        location.mlsEnabled = true;
-        location.mlsOnlineState = LocationPage.OnlineState.Enabled;
-        location.saveCustomSettings();
-        location.gpsEnabled = false;
-        location.restoreCustomSettings();
-    }
-
     LocationConfiguration {
         id: location
     }
@@ -37,28 +25,24 @@ GalleryPage {
     Section {
         heading: qsTrId("gallery-location-services")
 
-        SwitchDelegate {
-            Layout.fillWidth: true
+        TextSwitch {
             text: qsTrId("gallery-location-gps")
             checked: location.gpsEnabled
             onToggled: location.gpsEnabled = checked
         }
-        SwitchDelegate {
-            Layout.fillWidth: true
+        TextSwitch {
             text: qsTrId("gallery-location-mls")
             checked: location.mlsEnabled
             onToggled: location.mlsEnabled = checked
         }
-        SwitchDelegate {
-            Layout.fillWidth: true
+        TextSwitch {
             text: qsTrId("gallery-location-mls-online")
             enabled: mlsAgreed
             checked: location.mlsOnlineState === LocationPage.OnlineState.Enabled
             onToggled: location.mlsOnlineState = checked ? LocationPage.OnlineState.Enabled
                                                          : LocationPage.OnlineState.Disabled
         }
-        SwitchDelegate {
-            Layout.fillWidth: true
+        TextSwitch {
             text: qsTrId("gallery-location-here")
             enabled: hereAgreed
             checked: location.hereState === LocationPage.OnlineState.Enabled
@@ -74,8 +58,7 @@ GalleryPage {
     Section {
         heading: qsTrId("gallery-location-custom")
 
-        SwitchDelegate {
-            Layout.fillWidth: true
+        TextSwitch {
             text: qsTrId("gallery-location-custom-enabled")
             checked: location.customSettingsEnabled
             onToggled: location.customSettingsEnabled = checked
@@ -103,7 +86,6 @@ GalleryPage {
         heading: qsTrId("gallery-location-mls-terms")
 
         Paragraph {
-            id: mlsTerms
             text: location.mlsOnlineAgreementText
         }
         Button {
@@ -117,7 +99,6 @@ GalleryPage {
         heading: qsTrId("gallery-location-here-terms")
 
         Paragraph {
-            id: hereTerms
             text: location.hereAgreementText
         }
         Button {

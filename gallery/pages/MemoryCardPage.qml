@@ -5,70 +5,36 @@ import QtQuick 2.15
 import QtQuick.Controls 2.15
 import QtQuick.Layouts 1.15
 import com.marlo.settings.system 1.0
-import gallery.stage 1.0
 import ".."
 
 /*
-    A memory card that is formatted, mounted and unmounted. The card is a name alone: the disk
-    service and the program that formats are played.
+    A memory card that is formatted, emptied, mounted and unmounted.
 */
 GalleryPage {
     id: page
 
-    readonly property string cardName: "gallerycard1"
-    readonly property string cardPath: "/dev/" + cardName
-    // The error of the disk service that ended the last operation.
+    // The kernel's name of the card, empty while there is none.
+    property string cardName
+    readonly property string cardPath: cardName ? "/dev/" + cardName : ""
+
+    // The error of the disk service that the last operation met.
     property int error: noError
     readonly property int noError: -1
 
-    title: qsTrId("gallery-card")
-    ready: steps.count === 4 && !card.busy && fileSystem.type === "ext4"
-
-    function demonstrate() {
-        demonstration.enabled = true;
-        demonstration.formatWhenIdle();
-    }
-
     function start(operation) {
-        error = noError;
-        steps.clear();
+        forget();
         operation();
     }
 
-    function statusText(status) {
-        switch (status) {
-        case MemoryCardFormatter.Unmounting: return qsTrId("gallery-card-unmounting");
-        case MemoryCardFormatter.Formatting: return qsTrId("gallery-card-formatting");
-        case MemoryCardFormatter.RemovingFiles: return qsTrId("gallery-card-removing-files");
-        case MemoryCardFormatter.Mounting: return qsTrId("gallery-card-mounting");
-        case MemoryCardFormatter.Probing: return qsTrId("gallery-card-probing");
-        case MemoryCardFormatter.Error: return qsTrId("gallery-card-error");
-        default: return qsTrId("gallery-card-idle");
-        }
+    function forget() {
+        error = noError;
+        steps.clear();
     }
 
-    function errorText(error) {
-        switch (error) {
-        case MemoryCardFormatter.ErrorDeviceBusy:
-            return qsTrId("gallery-card-device-busy");
-        case MemoryCardFormatter.ErrorAlreadyMounted:
-            return qsTrId("gallery-card-already-mounted");
-        case MemoryCardFormatter.ErrorNotMounted:
-            return qsTrId("gallery-card-not-mounted");
-        case MemoryCardFormatter.ErrorMountedByOtherUser:
-            return qsTrId("gallery-card-other-user");
-        case MemoryCardFormatter.ErrorNotAuthorized:
-        case MemoryCardFormatter.ErrorNotAuthorizedCanObtain:
-        case MemoryCardFormatter.ErrorNotAuthorizedDismissed:
-        case MemoryCardFormatter.ErrorOptionNotPermitted:
-            return qsTrId("gallery-card-not-authorized");
-        case MemoryCardFormatter.ErrorNotSupported:
-            return qsTrId("gallery-card-not-supported");
-        case MemoryCardFormatter.ErrorTimedout:
-            return qsTrId("gallery-card-timed-out");
-        default:
-            return qsTrId("gallery-card-failed");
-        }
+    onCardPathChanged: forget()
+
+    MemoryCardTexts {
+        id: texts
     }
 
     MemoryCardFormatter {
@@ -80,23 +46,6 @@ GalleryPage {
         onUnmountError: page.error = error
     }
 
-    Connections {
-        id: demonstration
-        target: card
-        enabled: false
-
-        // The card may still be probed.
-        function formatWhenIdle() {
-            if (!card.busy) {
-                enabled = false;
-                page.start(() => card.format("ext4"));
-            }
-        }
-        function onBusyChanged() {
-            formatWhenIdle();
-        }
-    }
-
     // A path is probed when it is set, and not again after formatting: a formatter that is made
     // whenever the other has ended tells what is on the card then.
     Loader {
@@ -104,7 +53,7 @@ GalleryPage {
         readonly property string type: item ? item.filesystemType : ""
 
         visible: false
-        active: !card.busy
+        active: page.cardPath !== "" && !card.busy
         sourceComponent: MemoryCardFormatter {
             devicePath: page.cardPath
         }
@@ -116,7 +65,7 @@ GalleryPage {
     }
 
     Question {
-        id: question
+        id: formatQuestion
         property string type
 
         title: qsTrId("gallery-card-question")
@@ -126,32 +75,37 @@ GalleryPage {
         onAccepted: page.start(() => card.format(type))
     }
 
+    Question {
+        id: emptyQuestion
+        title: qsTrId("gallery-card-empty-question")
+        text: qsTrId("gallery-card-empty-question-text")
+        yes: qsTrId("gallery-card-remove")
+        no: qsTrId("gallery-card-cancel")
+        onAccepted: page.start(() => card.removeAllFiles())
+    }
+
     Section {
         heading: qsTrId("gallery-card-state")
 
-        Value {
-            name: qsTrId("gallery-card-status")
-            value: page.statusText(card.status)
+        Note {
+            visible: page.cardName === ""
+            text: qsTrId("gallery-card-none")
         }
         Value {
+            visible: page.cardName !== ""
+            name: qsTrId("gallery-card-status")
+            value: texts.status(card.status)
+        }
+        Value {
+            visible: page.cardName !== ""
             name: qsTrId("gallery-card-file-system")
-            value: fileSystem.type || qsTrId("gallery-card-unknown")
+            value: fileSystem.type || qsTrId("gallery-unknown")
         }
         Flow {
             Layout.fillWidth: true
             spacing: 8
-            enabled: !card.busy
+            enabled: page.cardName !== "" && !card.busy
 
-            Repeater {
-                model: card.supportedFormatTypes
-                Button {
-                    text: qsTrId("gallery-card-format").arg(modelData)
-                    onClicked: {
-                        question.type = modelData;
-                        question.open();
-                    }
-                }
-            }
             Button {
                 text: qsTrId("gallery-card-mount")
                 onClicked: page.start(() => card.mount())
@@ -160,16 +114,32 @@ GalleryPage {
                 text: qsTrId("gallery-card-unmount")
                 onClicked: page.start(() => card.unmount())
             }
+            Repeater {
+                model: card.supportedFormatTypes
+                Button {
+                    text: qsTrId("gallery-card-format").arg(modelData)
+                    onClicked: {
+                        formatQuestion.type = modelData;
+                        formatQuestion.open();
+                    }
+                }
+            }
+            Button {
+                text: qsTrId("gallery-card-empty")
+                onClicked: emptyQuestion.open()
+            }
         }
     }
 
     Section {
+        // No path is probed like any other, and fails.
+        visible: page.cardName !== ""
         heading: qsTrId("gallery-card-steps")
 
         Repeater {
             model: steps
             Paragraph {
-                text: (index + 1) + ". " + page.statusText(model.status)
+                text: (index + 1) + ". " + texts.status(model.status)
             }
         }
         ProgressBar {
@@ -178,29 +148,10 @@ GalleryPage {
             indeterminate: visible
         }
         Paragraph {
-            visible: page.error !== page.noError
-            text: page.errorText(page.error)
-            color: "#b00020"
-        }
-    }
-
-    Section {
-        heading: qsTrId("gallery-card-service")
-
-        SwitchDelegate {
-            Layout.fillWidth: true
-            text: qsTrId("gallery-card-in-use")
-            checked: Stage.diskServiceError === "DeviceBusy"
-            onToggled: Stage.diskServiceError = checked ? "DeviceBusy" : ""
-        }
-        SwitchDelegate {
-            Layout.fillWidth: true
-            text: qsTrId("gallery-card-forbidden")
-            checked: Stage.diskServiceError === "NotAuthorized"
-            onToggled: Stage.diskServiceError = checked ? "NotAuthorized" : ""
-        }
-        Note {
-            text: qsTrId("gallery-card-service-note")
+            visible: page.error !== page.noError || card.status === MemoryCardFormatter.Error
+            text: texts.error(page.error)
+            // A card that is mounted already is no obstacle.
+            color: card.status === MemoryCardFormatter.Error ? "#b00020" : "black"
         }
     }
 }

@@ -2,7 +2,6 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 import QtQuick 2.15
-import QtQuick.Controls 2.15
 import QtQuick.Layouts 1.15
 import com.marlo.settings.system 1.0
 import ".."
@@ -11,9 +10,6 @@ import ".."
     The page on which a user chooses quick actions and drags them into order.
 */
 GalleryPage {
-    title: qsTrId("gallery-quick-actions-settings")
-    ready: enabledActions.count > 0 && allActions.count > enabledActions.count
-
     // Its rows are the user's list, entry by entry: what move() works on.
     QuickActionsModel {
         id: enabledActions
@@ -43,8 +39,7 @@ GalleryPage {
 
         Repeater {
             model: allActions
-            SwitchDelegate {
-                Layout.fillWidth: true
+            TextSwitch {
                 text: model.title || model.path
                 icon.source: model.icon ? "file://" + model.icon : ""
                 // An item has an `enabled` of its own, so the role is asked of the model.
@@ -57,6 +52,10 @@ GalleryPage {
                     }
                 }
             }
+        }
+        Note {
+            visible: allActions.count === 0
+            text: qsTrId("gallery-quick-actions-not-installed")
         }
     }
 }

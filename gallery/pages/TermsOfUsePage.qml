@@ -5,7 +5,6 @@ import QtQuick 2.15
 import QtQuick.Controls 2.15
 import QtQuick.Layouts 1.15
 import com.marlo.settings.system 1.0
-import gallery.stage 1.0
 import ".."
 
 /*
@@ -13,15 +12,18 @@ import ".."
 */
 GalleryPage {
     readonly property var localeNames: ["en_GB", "fi_FI.UTF-8", "de_DE.UTF-8"]
-    property string localeName: localeNames.find(name => name.startsWith(Stage.language))
+    readonly property string language: Qt.locale().name.substring(0, 2)
+    property string localeName: localeNames.find(name => name.startsWith(language)) || "en_GB"
 
     // Each a title and a body, or nothing.
     readonly property var platformTerms: manager.platformTermsOfUse(localeName)
-    readonly property var vendorSummary: manager.vendorTermsSummary(localeName)
-    readonly property var vendorTerms: manager.vendorTermsOfUse(localeName)
+    readonly property var vendorSummary: vendorTermsOf(() => manager.vendorTermsSummary(localeName))
+    readonly property var vendorTerms: vendorTermsOf(() => manager.vendorTermsOfUse(localeName))
 
-    title: qsTrId("gallery-terms")
-    ready: platformTerms.length === 2 && vendorSummary.length === 2 && vendorTerms.length === 2
+    // A device whose vendor has none does not look for them.
+    function vendorTermsOf(read) {
+        return manager.hasVendorTermsOfUse ? read() : [];
+    }
 
     TermsOfUseManager {
         id: manager

@@ -9,16 +9,17 @@ import ".."
     A text file, and the files of a folder as one text.
 */
 GalleryPage {
-    title: qsTrId("gallery-text-files")
-    ready: about.text !== "" && licenses.text !== ""
+    readonly property string about: TextFileReader.readContent("/usr/share/marlo-settings/about.html")
+    readonly property string licenses: TextFileReader.collate(
+        "file:///usr/share/marlo-settings/licenses", "\n\n",
+        qsTrId("gallery-text-files-prefix") + "\n\n")
 
     Section {
         heading: qsTrId("gallery-text-files-file")
 
         Paragraph {
-            id: about
             textFormat: Text.StyledText
-            text: TextFileReader.readContent("/usr/share/marlo-settings/about.html")
+            text: about || qsTrId("gallery-text-files-none")
         }
         Note {
             text: qsTrId("gallery-text-files-note")
@@ -29,9 +30,7 @@ GalleryPage {
         heading: qsTrId("gallery-text-files-folder")
 
         Paragraph {
-            id: licenses
-            text: TextFileReader.collate("file:///usr/share/marlo-settings/licenses", "\n\n",
-                                         qsTrId("gallery-text-files-prefix") + "\n\n")
+            text: licenses || qsTrId("gallery-text-files-none")
         }
     }
 }

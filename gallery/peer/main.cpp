@@ -2,12 +2,15 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 // A sample service, started by the session bus: answers every call and tells the gallery of it.
+// While the file /usr/libexec/gallery-services-fail is there it answers with an error.
 //
 // usage: gallery-peer SERVICE
 
 #include "recordingservice.h"
 
 #include <QCoreApplication>
+#include <QDBusError>
+#include <QFile>
 
 namespace {
 
@@ -21,6 +24,23 @@ QStringList texts(const QVariantList &arguments)
     return result;
 }
 
+class SampleService : public RecordingService
+{
+public:
+    explicit SampleService(const QString &name)
+        : RecordingService(QDBusConnection::SessionBus, name)
+    {
+    }
+
+    bool handleMessage(const QDBusMessage &message, const QDBusConnection &connection) override
+    {
+        const bool fail = QFile::exists(QStringLiteral("/usr/libexec/gallery-services-fail"));
+        setAnswer(fail ? Answer::Error : Answer::Reply,
+                  QDBusError::errorString(QDBusError::Failed));
+        return RecordingService::handleMessage(message, connection);
+    }
+};
+
 } // namespace
 
 int main(int argc, char *argv[])
@@ -32,7 +52,7 @@ int main(int argc, char *argv[])
     }
 
     const QString &name = arguments.at(1);
-    RecordingService service(QDBusConnection::SessionBus, name);
+    SampleService service(name);
     QDBusConnection bus = service.connection();
     QObject::connect(&service, &RecordingService::called, [bus, name](const QDBusMessage &call) {
         QDBusMessage signal = QDBusMessage::createSignal(

@@ -6,7 +6,6 @@
 #include <QCoreApplication>
 #include <QDBusConnection>
 #include <QEvent>
-#include <QFile>
 #include <QLocale>
 #include <QQmlEngine>
 #include <QQmlError>
@@ -19,21 +18,21 @@ const QLatin1String peerPath("/");
 const QLatin1String peerInterface("com.marlo.settings.gallery.Peer");
 const QLatin1String peerSignal("CallReceived");
 
+// Texts that are there in English are in British English.
+const QLatin1String english("en");
+const QString britishEnglish = QStringLiteral("en_GB");
+
 // What the cover daemon tells of.
+const QString coverService = QStringLiteral("com.marlo.kivd");
 const QString coverIdProperty = QStringLiteral("KIVID");
 const QString coverReadyProperty = QStringLiteral("Ready");
 const QString sampleCover = QStringLiteral("MARLO-COVER-07");
 
-// What the definition of the steps widget (gallery/sample) waits for.
-const QString stepCounterFile = QStringLiteral("/usr/libexec/step-counter");
-
-const QString diskService = QStringLiteral("org.freedesktop.UDisks2");
-const QLatin1String diskServiceErrorPrefix("org.freedesktop.UDisks2.Error.");
-
 } // namespace
 
 Stage::Stage(QQmlEngine *engine)
-    : m_engine(engine), m_diskService(QDBusConnection::SystemBus, diskService)
+    : m_engine(engine), m_coverDaemonWatcher(coverService, QDBusConnection::systemBus(),
+                                             QDBusServiceWatcher::WatchForRegistration)
 {
     connect(engine, &QQmlEngine::warnings, this, &Stage::reportWarnings);
     if (!QDBusConnection::sessionBus().connect(
@@ -41,12 +40,17 @@ Stage::Stage(QQmlEngine *engine)
             SIGNAL(callReceived(QString, QString, QStringList)))) {
         qmlWarning(this) << "no session bus: received calls will not be shown";
     }
-    tellOfCover();
+    // Of no country yet.
+    QLocale::setDefault(QLocale(britishEnglish));
+    // QtDBus may lose a signal that follows too soon on a new owner of the daemon's name.
+    connect(&m_coverDaemonWatcher, &QDBusServiceWatcher::serviceRegistered, this,
+            &Stage::tellOfCover);
+    startCoverDaemon();
 }
 
 QString Stage::language() const
 {
-    return QLocale().bcp47Name();
+    return QLocale().name().section(QLatin1Char('_'), 0, 0);
 }
 
 void Stage::setLanguage(const QString &language)
@@ -54,61 +58,45 @@ void Stage::setLanguage(const QString &language)
     if (language == this->language()) {
         return;
     }
-    QLocale::setDefault(QLocale(language));
+    QLocale::setDefault(QLocale(language == english ? britishEnglish : language));
     // Translators that follow the language filter this event; the engine retranslates on it.
     QEvent languageChange(QEvent::LanguageChange);
     QCoreApplication::sendEvent(m_engine, &languageChange);
     Q_EMIT languageChanged();
 }
 
-void Stage::setCoverAttached(bool attached)
+void Stage::setCover(Cover cover)
 {
-    if (attached == m_coverAttached) {
+    if (cover == m_cover) {
         return;
     }
-    m_coverAttached = attached;
+    m_cover = cover;
+    if (cover == NoDaemon) {
+        m_coverDaemon.reset();
+    } else if (m_coverDaemon == nullptr) {
+        startCoverDaemon();
+    } else {
+        tellOfCover();
+    }
+    Q_EMIT coverChanged();
+}
+
+void Stage::startCoverDaemon()
+{
+    m_coverDaemon = std::make_unique<CoverDaemon>();
     tellOfCover();
-    Q_EMIT coverAttachedChanged();
 }
 
 void Stage::tellOfCover()
 {
-    const QString id = m_coverAttached ? sampleCover : QString();
-    const int ready = m_coverAttached ? 1 : 0;
-    m_coverDaemon.answer(coverIdProperty, {id});
-    m_coverDaemon.answer(coverReadyProperty, {ready});
-    m_coverDaemon.sendChanges({{coverIdProperty, id}, {coverReadyProperty, ready}});
-}
-
-bool Stage::stepCounterInstalled() const
-{
-    return QFile::exists(stepCounterFile);
-}
-
-void Stage::setStepCounterInstalled(bool installed)
-{
-    if (installed == stepCounterInstalled()) {
+    if (m_coverDaemon == nullptr) {
         return;
     }
-    QFile file(stepCounterFile);
-    if (installed ? !file.open(QIODevice::WriteOnly) : !file.remove()) {
-        qmlWarning(this) << stepCounterFile << ": " << file.errorString();
-    }
-    Q_EMIT stepCounterInstalledChanged();
-}
-
-void Stage::setDiskServiceError(const QString &error)
-{
-    if (error == m_diskServiceError) {
-        return;
-    }
-    m_diskServiceError = error;
-    if (error.isEmpty()) {
-        m_diskService.setAnswer(RecordingService::Answer::Reply);
-    } else {
-        m_diskService.setAnswer(RecordingService::Answer::Error, diskServiceErrorPrefix + error);
-    }
-    Q_EMIT diskServiceErrorChanged();
+    const QString id = m_cover == NoCover ? QString() : sampleCover;
+    const int ready = m_cover == CoverReady ? 1 : 0;
+    m_coverDaemon->answer(coverIdProperty, {id});
+    m_coverDaemon->answer(coverReadyProperty, {ready});
+    m_coverDaemon->sendChanges({{coverIdProperty, id}, {coverReadyProperty, ready}});
 }
 
 void Stage::reportWarnings(const QList<QQmlError> &errors)

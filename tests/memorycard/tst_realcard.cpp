@@ -26,19 +26,6 @@ namespace {
 
 constexpr int patience = 60000; // ms, of a machine that is very busy
 
-const QString helper = QStringLiteral("/usr/libexec/sdcardhelper");
-// The disk service is told of a new file system before anybody asks it to mount that.
-constexpr char helperScript[] = R"(#!/bin/sh
-set -eu
-case $1 in
-format_vfat) mkfs.vfat -I "/dev/$2" ;;
-format_ext4) mkfs.ext4 -q "/dev/$2" ;;
-probe) exec blkid -p -o value -s TYPE "/dev/$2" ;;
-*) exit 2 ;;
-esac
-udevadm trigger --settle --action=change "/sys/class/block/$2"
-)";
-
 const QString ext4 = QStringLiteral("ext4");
 const QString vfat = QStringLiteral("vfat");
 
@@ -109,8 +96,7 @@ void TestRealCard::initTestCase()
         QSKIP(qPrintable(reason));
     }
     m_card = std::make_unique<RealCard>();
-    Files::write(helper, helperScript);
-    QVERIFY(QFile::setPermissions(helper, QFile::ReadOwner | QFile::ExeOwner));
+    RealCard::installHelper();
 }
 
 void TestRealCard::cleanupTestCase()

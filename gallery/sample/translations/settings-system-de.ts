@@ -21,7 +21,7 @@
     </message>
     <message id="gallery-quick-actions-about">
         <source></source>
-        <translation>Eine Aktion antippen wie auf dem Startbildschirm und sehen, welcher Aufruf hinausgeht.</translation>
+        <translation>Zeigt die eingeschalteten Schnellaktionen und löst sie aus wie ein Startbildschirm.</translation>
     </message>
     <message id="gallery-quick-actions-home">
         <source></source>
@@ -49,7 +49,7 @@
     </message>
     <message id="gallery-quick-actions-settings-about">
         <source></source>
-        <translation>Aktionen ein- und ausschalten und durch Ziehen ordnen.</translation>
+        <translation>Listet alle angebotenen Schnellaktionen auf, zum Ein- und Ausschalten und Ordnen.</translation>
     </message>
     <message id="gallery-quick-actions-order">
         <source></source>
@@ -65,7 +65,7 @@
     </message>
     <message id="gallery-events-widgets-about">
         <source></source>
-        <translation>Widgets für die Ereignisansicht wählen und sehen, welche verfügbar sind.</translation>
+        <translation>Listet die Widgets der Ereignisansicht auf, um verfügbare ein- und auszuschalten.</translation>
     </message>
     <message id="gallery-events-widgets-available">
         <source></source>
@@ -79,17 +79,13 @@
         <source></source>
         <translation>Bis zur ersten Wahl gilt für jedes Widget seine Vorgabe. Die erste Wahl schaltet alle anderen ein.</translation>
     </message>
-    <message id="gallery-events-widgets-device">
-        <source></source>
-        <translation>Das Gerät</translation>
-    </message>
     <message id="gallery-events-widgets-step-counter">
         <source></source>
         <translation>Schrittzähler</translation>
     </message>
     <message id="gallery-events-widgets-step-counter-note">
         <source></source>
-        <translation>Das Schritte-Widget ist verfügbar, solange es die Datei des Schrittzählers gibt. Der Schalter legt sie an und entfernt sie.</translation>
+        <translation>Solange er da ist, ist das Schritte-Widget verfügbar, sobald die Seite prüft.</translation>
     </message>
     <message id="gallery-titles">
         <source></source>
@@ -97,7 +93,7 @@
     </message>
     <message id="gallery-titles-about">
         <source></source>
-        <translation>Was eingeschaltet ist, aufgezählt in der gewählten Sprache.</translation>
+        <translation>Verbindet Titel aus den Zeilen eines Modells zu einer Aufzählung in der gewählten Sprache.</translation>
     </message>
     <message id="gallery-titles-widgets">
         <source></source>
@@ -117,7 +113,7 @@
     </message>
     <message id="gallery-card-about">
         <source></source>
-        <translation>Eine Karte formatieren, einhängen und aushängen und die Schritte verfolgen.</translation>
+        <translation>Formatiert, leert, hängt eine Speicherkarte ein und aus und sagt, was auf ihr ist.</translation>
     </message>
     <message id="gallery-card-state">
         <source></source>
@@ -130,10 +126,6 @@
     <message id="gallery-card-file-system">
         <source></source>
         <translation>Dateisystem</translation>
-    </message>
-    <message id="gallery-card-unknown">
-        <source></source>
-        <translation>Noch nicht bekannt</translation>
     </message>
     <message id="gallery-card-format">
         <source></source>
@@ -197,7 +189,7 @@
     </message>
     <message id="gallery-card-failed">
         <source></source>
-        <translation>Die Karte konnte nicht ein- oder ausgehängt werden.</translation>
+        <translation>Das ist nicht gelungen.</translation>
     </message>
     <message id="gallery-card-device-busy">
         <source></source>
@@ -233,15 +225,7 @@
     </message>
     <message id="gallery-card-in-use">
         <source></source>
-        <translation>Karte wird benutzt</translation>
-    </message>
-    <message id="gallery-card-forbidden">
-        <source></source>
-        <translation>Niemand darf das</translation>
-    </message>
-    <message id="gallery-card-service-note">
-        <source></source>
-        <translation>Das ist keine echte Karte: die Galerie spielt den Datenträgerdienst und das Programm, das formatiert.</translation>
+        <translation>Ein Programm hat eine ihrer Dateien offen</translation>
     </message>
     <message id="gallery-sample-new-alarm">
         <source></source>
@@ -257,7 +241,7 @@
     </message>
     <message id="gallery-location-about">
         <source></source>
-        <translation>Ortungsdienste schalten, die Schalter speichern und wiederherstellen, und lesen, welchen Bedingungen zuzustimmen ist.</translation>
+        <translation>Schaltet die Ortungsdienste, sichert die Schalter und kennt die Bedingungen, denen zuzustimmen ist.</translation>
     </message>
     <message id="gallery-location-services">
         <source></source>
@@ -325,7 +309,7 @@
     </message>
     <message id="gallery-cover-about">
         <source></source>
-        <translation>Eine Rückschale anbringen und abnehmen und sehen, wie die Seite dem Rückschalendienst folgt.</translation>
+        <translation>Verfolgt die smarte Rückschale: welche angebracht ist und ob sie bereit ist.</translation>
     </message>
     <message id="gallery-cover-info">
         <source></source>
@@ -351,69 +335,13 @@
         <source></source>
         <translation>Nicht bereit</translation>
     </message>
-    <message id="gallery-cover-device">
-        <source></source>
-        <translation>Am Gerät</translation>
-    </message>
-    <message id="gallery-cover-device-note">
-        <source></source>
-        <translation>Der Dienst am Systembus bemerkt die Rückschale und meldet sie der Seite.</translation>
-    </message>
-    <message id="gallery-cover-attach">
-        <source></source>
-        <translation>Rückschale anbringen</translation>
-    </message>
-    <message id="gallery-cover-remove">
-        <source></source>
-        <translation>Rückschale abnehmen</translation>
-    </message>
-    <message id="gallery-device">
-        <source></source>
-        <translation>Gerät</translation>
-    </message>
-    <message id="gallery-device-about">
-        <source></source>
-        <translation>Bluetooth-Adresse und Modemvariante sehen, und ob Android unterstützt wird.</translation>
-    </message>
-    <message id="gallery-device-radio">
-        <source></source>
-        <translation>Funk</translation>
-    </message>
-    <message id="gallery-device-bluetooth">
-        <source></source>
-        <translation>Bluetooth-Adresse</translation>
-    </message>
-    <message id="gallery-device-modem">
-        <source></source>
-        <translation>Modemvariante</translation>
-    </message>
-    <message id="gallery-device-unknown">
-        <source></source>
-        <translation>Unbekannt</translation>
-    </message>
-    <message id="gallery-device-storage">
-        <source></source>
-        <translation>Speicher</translation>
-    </message>
-    <message id="gallery-device-android">
-        <source></source>
-        <translation>Android-Datenordner</translation>
-    </message>
-    <message id="gallery-device-android-shown">
-        <source></source>
-        <translation>Sichtbar: Android-Unterstützung ist installiert</translation>
-    </message>
-    <message id="gallery-device-android-hidden">
-        <source></source>
-        <translation>Verborgen: keine Android-Unterstützung</translation>
-    </message>
     <message id="gallery-terms">
         <source></source>
         <translation>Nutzungsbedingungen</translation>
     </message>
     <message id="gallery-terms-about">
         <source></source>
-        <translation>Die Bedingungen der Plattform und des Herstellers in einer wählbaren Sprache lesen.</translation>
+        <translation>Liest die Bedingungen der Plattform und des Herstellers in der Sprache des Benutzers.</translation>
     </message>
     <message id="gallery-terms-locale">
         <source></source>
@@ -433,7 +361,7 @@
     </message>
     <message id="gallery-text-files-about">
         <source></source>
-        <translation>Eine Datei lesen, und einen Ordner, dessen Dateien zu einem Text werden.</translation>
+        <translation>Liest eine Textdatei, und die Dateien eines Ordners als einen Text.</translation>
     </message>
     <message id="gallery-text-files-file">
         <source></source>
@@ -450,6 +378,250 @@
     <message id="gallery-text-files-prefix">
         <source></source>
         <translation>Lizenzen der Beispieldateien:</translation>
+    </message>
+    <message id="gallery-bluetooth">
+        <source></source>
+        <translation>Bluetooth</translation>
+    </message>
+    <message id="gallery-bluetooth-about">
+        <source></source>
+        <translation>Nennt die Adresse des Bluetooth-Adapters.</translation>
+    </message>
+    <message id="gallery-bluetooth-address">
+        <source></source>
+        <translation>Adresse des Adapters</translation>
+    </message>
+    <message id="gallery-bluetooth-installed">
+        <source></source>
+        <translation>Die Plattform hat eine Adressdatei</translation>
+    </message>
+    <message id="gallery-android">
+        <source></source>
+        <translation>Android-Unterstützung</translation>
+    </message>
+    <message id="gallery-android-about">
+        <source></source>
+        <translation>Sagt, ob Ordner von Android-Anwendungen zu zeigen sind.</translation>
+    </message>
+    <message id="gallery-android-folders">
+        <source></source>
+        <translation>Android-Datenordner</translation>
+    </message>
+    <message id="gallery-android-shown">
+        <source></source>
+        <translation>Sichtbar: Android-Unterstützung ist installiert</translation>
+    </message>
+    <message id="gallery-android-hidden">
+        <source></source>
+        <translation>Verborgen: keine Android-Unterstützung</translation>
+    </message>
+    <message id="gallery-android-installed">
+        <source></source>
+        <translation>Android-Unterstützung ist installiert</translation>
+    </message>
+    <message id="gallery-modem">
+        <source></source>
+        <translation>Modem</translation>
+    </message>
+    <message id="gallery-modem-about">
+        <source></source>
+        <translation>Sagt, welche Variante der Modemsoftware das Gerät hat.</translation>
+    </message>
+    <message id="gallery-modem-variant">
+        <source></source>
+        <translation>Variante der Software</translation>
+    </message>
+    <message id="gallery-modem-installed">
+        <source></source>
+        <translation>Die Modemsoftware ist installiert</translation>
+    </message>
+    <message id="gallery-unknown">
+        <source></source>
+        <translation>Unbekannt</translation>
+    </message>
+    <message id="gallery-text-files-none">
+        <source></source>
+        <translation>Nichts zu lesen.</translation>
+    </message>
+    <message id="gallery-text-files-file-installed">
+        <source></source>
+        <translation>Die Datei ist da</translation>
+    </message>
+    <message id="gallery-text-files-folder-installed">
+        <source></source>
+        <translation>Der Ordner ist da</translation>
+    </message>
+    <message id="gallery-terms-platform-installed">
+        <source></source>
+        <translation>Die Plattform hat Bedingungen</translation>
+    </message>
+    <message id="gallery-terms-vendor-installed">
+        <source></source>
+        <translation>Der Hersteller hat Bedingungen</translation>
+    </message>
+    <message id="gallery-stage">
+        <source></source>
+        <translation>Die Bühne</translation>
+    </message>
+    <message id="gallery-stage-note">
+        <source></source>
+        <translation>Spielt das Gerät um die Seite. Nichts davon gehört auf eine Seite.</translation>
+    </message>
+    <message id="gallery-stage-reload">
+        <source></source>
+        <translation>Seite neu öffnen</translation>
+    </message>
+    <message id="gallery-stage-constant">
+        <source></source>
+        <translation>Die Seite liest dies, wenn sie geöffnet wird.</translation>
+    </message>
+    <message id="gallery-log">
+        <source></source>
+        <translation>Protokoll: %1</translation>
+    </message>
+    <message id="gallery-log-clear">
+        <source></source>
+        <translation>Leeren</translation>
+    </message>
+    <message id="gallery-quick-actions-installed">
+        <source></source>
+        <translation>Schnellaktionen sind installiert</translation>
+    </message>
+    <message id="gallery-quick-actions-not-installed">
+        <source></source>
+        <translation>Keine Schnellaktion ist installiert.</translation>
+    </message>
+    <message id="gallery-quick-actions-fail">
+        <source></source>
+        <translation>Dienste antworten mit einem Fehler</translation>
+    </message>
+    <message id="gallery-quick-actions-absent">
+        <source></source>
+        <translation>Der Navigationsdienst ist nicht installiert: Seine Aktion fragt im Store nach dem Paket.</translation>
+    </message>
+    <message id="gallery-quick-actions-broken">
+        <source></source>
+        <translation>Eine leere Definitionsdatei ist da</translation>
+    </message>
+    <message id="gallery-quick-actions-keys">
+        <source></source>
+        <translation>Außer durch Ziehen wandert eine Zeile mit Strg und den Pfeiltasten. Geänderte Dateien werden nach einer Sekunde bemerkt.</translation>
+    </message>
+    <message id="gallery-events-widgets-none">
+        <source></source>
+        <translation>Kein Widget ist installiert.</translation>
+    </message>
+    <message id="gallery-events-widgets-check">
+        <source></source>
+        <translation>Verfügbarkeit prüfen</translation>
+    </message>
+    <message id="gallery-events-widgets-installed">
+        <source></source>
+        <translation>Widgets sind installiert</translation>
+    </message>
+    <message id="gallery-events-widgets-broken">
+        <source></source>
+        <translation>Eine kaputte Definitionsdatei ist da</translation>
+    </message>
+    <message id="gallery-titles-language">
+        <source></source>
+        <translation>In einer anderen Sprache sind die Sätze neu, wenn die Seite neu geöffnet wird.</translation>
+    </message>
+    <message id="gallery-card-none">
+        <source></source>
+        <translation>Keine Karte ist eingelegt.</translation>
+    </message>
+    <message id="gallery-card-empty">
+        <source></source>
+        <translation>Alle Dateien entfernen</translation>
+    </message>
+    <message id="gallery-card-empty-question">
+        <source></source>
+        <translation>Alle Dateien entfernen?</translation>
+    </message>
+    <message id="gallery-card-empty-question-text">
+        <source></source>
+        <translation>Alle Dateien und Ordner der Karte gehen verloren. Ihr Dateisystem bleibt.</translation>
+    </message>
+    <message id="gallery-card-remove">
+        <source></source>
+        <translation>Entfernen</translation>
+    </message>
+    <message id="gallery-card-real">
+        <source></source>
+        <translation>Eine echte Karte: %1, ein ext4-Dateisystem im Speicher, und der echte Datenträgerdienst</translation>
+    </message>
+    <message id="gallery-card-played">
+        <source></source>
+        <translation>Karte und Datenträgerdienst sind gespielt. Ausgehängt vergisst die Karte ihre Dateien.</translation>
+    </message>
+    <message id="gallery-card-files">
+        <source></source>
+        <translation>Die Karte ist eingehängt. Dateien und Ordner zuoberst: %1</translation>
+    </message>
+    <message id="gallery-card-is-unmounted">
+        <source></source>
+        <translation>Die Karte ist nicht eingehängt.</translation>
+    </message>
+    <message id="gallery-card-fill">
+        <source></source>
+        <translation>Dateien auf die Karte legen</translation>
+    </message>
+    <message id="gallery-card-inserted">
+        <source></source>
+        <translation>Die Karte ist eingelegt</translation>
+    </message>
+    <message id="gallery-card-helper">
+        <source></source>
+        <translation>Das Hilfsprogramm ist installiert</translation>
+    </message>
+    <message id="gallery-card-helper-waits">
+        <source></source>
+        <translation>Das Hilfsprogramm lässt sich Zeit</translation>
+    </message>
+    <message id="gallery-card-service-works">
+        <source></source>
+        <translation>Arbeitet</translation>
+    </message>
+    <message id="gallery-card-service-forbids">
+        <source></source>
+        <translation>Verbietet alles</translation>
+    </message>
+    <message id="gallery-card-service-silent">
+        <source></source>
+        <translation>Antwortet nicht</translation>
+    </message>
+    <message id="gallery-card-service-absent">
+        <source></source>
+        <translation>Ist nicht da</translation>
+    </message>
+    <message id="gallery-location-mls-installed">
+        <source></source>
+        <translation>Die Bedingungen von MLS sind installiert</translation>
+    </message>
+    <message id="gallery-location-here-installed">
+        <source></source>
+        <translation>Die Bedingungen von HERE sind installiert</translation>
+    </message>
+    <message id="gallery-cover-no-daemon">
+        <source></source>
+        <translation>Kein Dienst</translation>
+    </message>
+    <message id="gallery-cover-removed">
+        <source></source>
+        <translation>Keine Rückschale angebracht</translation>
+    </message>
+    <message id="gallery-cover-attached">
+        <source></source>
+        <translation>Eine Rückschale, die nicht bereit ist</translation>
+    </message>
+    <message id="gallery-cover-attached-ready">
+        <source></source>
+        <translation>Eine Rückschale, die bereit ist</translation>
+    </message>
+    <message id="gallery-cover-note">
+        <source></source>
+        <translation>Geht der Dienst, behält eine offene Seite, was sie wusste.</translation>
     </message>
 </context>
 </TS>

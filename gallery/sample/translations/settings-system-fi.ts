@@ -21,7 +21,7 @@
     </message>
     <message id="gallery-quick-actions-about">
         <source></source>
-        <translation>Napauta toimintoa kuten kotinäkymässä ja katso, mikä kutsu lähtee.</translation>
+        <translation>Näyttää käytössä olevat pikatoiminnot ja käynnistää ne, kuten kotinäkymä.</translation>
     </message>
     <message id="gallery-quick-actions-home">
         <source></source>
@@ -49,7 +49,7 @@
     </message>
     <message id="gallery-quick-actions-settings-about">
         <source></source>
-        <translation>Ota toimintoja käyttöön ja järjestä ne vetämällä.</translation>
+        <translation>Luettelee kaikki tarjolla olevat pikatoiminnot: otettavaksi käyttöön ja järjestettäväksi.</translation>
     </message>
     <message id="gallery-quick-actions-order">
         <source></source>
@@ -65,7 +65,7 @@
     </message>
     <message id="gallery-events-widgets-about">
         <source></source>
-        <translation>Valitse tapahtumanäkymän widgetit ja katso, mitkä ovat saatavilla.</translation>
+        <translation>Luettelee tapahtumanäkymän widgetit: saatavilla olevat voi ottaa käyttöön ja poistaa käytöstä.</translation>
     </message>
     <message id="gallery-events-widgets-available">
         <source></source>
@@ -79,17 +79,13 @@
         <source></source>
         <translation>Ensimmäiseen valintaan asti widgetit noudattavat oletuksiaan. Ensimmäinen valinta ottaa kaikki muut käyttöön.</translation>
     </message>
-    <message id="gallery-events-widgets-device">
-        <source></source>
-        <translation>Laite</translation>
-    </message>
     <message id="gallery-events-widgets-step-counter">
         <source></source>
         <translation>Askelmittari</translation>
     </message>
     <message id="gallery-events-widgets-step-counter-note">
         <source></source>
-        <translation>Askelwidget on saatavilla, kun askelmittarin tiedosto on olemassa. Kytkin luo ja poistaa tiedoston.</translation>
+        <translation>Askelwidget on saatavilla, kun tämä on olemassa ja sivu tarkistaa sen.</translation>
     </message>
     <message id="gallery-titles">
         <source></source>
@@ -97,7 +93,7 @@
     </message>
     <message id="gallery-titles-about">
         <source></source>
-        <translation>Käytössä olevat yhtenä luettelona valitulla kielellä.</translation>
+        <translation>Yhdistää mallin rivien nimet, kuten käytössä olevat, luetteloksi valitulla kielellä.</translation>
     </message>
     <message id="gallery-titles-widgets">
         <source></source>
@@ -117,7 +113,7 @@
     </message>
     <message id="gallery-card-about">
         <source></source>
-        <translation>Alusta kortti, liitä ja irrota se ja seuraa vaiheita.</translation>
+        <translation>Alustaa, tyhjentää, liittää ja irrottaa muistikortin ja kertoo, mitä sillä on.</translation>
     </message>
     <message id="gallery-card-state">
         <source></source>
@@ -130,10 +126,6 @@
     <message id="gallery-card-file-system">
         <source></source>
         <translation>Tiedostojärjestelmä</translation>
-    </message>
-    <message id="gallery-card-unknown">
-        <source></source>
-        <translation>Ei vielä tiedossa</translation>
     </message>
     <message id="gallery-card-format">
         <source></source>
@@ -197,7 +189,7 @@
     </message>
     <message id="gallery-card-failed">
         <source></source>
-        <translation>Korttia ei voitu liittää tai irrottaa.</translation>
+        <translation>Se ei onnistunut.</translation>
     </message>
     <message id="gallery-card-device-busy">
         <source></source>
@@ -233,15 +225,7 @@
     </message>
     <message id="gallery-card-in-use">
         <source></source>
-        <translation>Kortti on käytössä</translation>
-    </message>
-    <message id="gallery-card-forbidden">
-        <source></source>
-        <translation>Kukaan ei saa tehdä tätä</translation>
-    </message>
-    <message id="gallery-card-service-note">
-        <source></source>
-        <translation>Tämä ei ole oikea kortti: galleria esittää levypalvelua ja alustusohjelmaa.</translation>
+        <translation>Ohjelmalla on sen tiedosto auki</translation>
     </message>
     <message id="gallery-sample-new-alarm">
         <source></source>
@@ -257,7 +241,7 @@
     </message>
     <message id="gallery-location-about">
         <source></source>
-        <translation>Kytke paikannuspalveluja, tallenna ja palauta kytkimet ja lue, mitä hyväksytään.</translation>
+        <translation>Kytkee paikannuspalvelut, tallentaa ja palauttaa kytkimet ja sisältää hyväksyttävät ehdot.</translation>
     </message>
     <message id="gallery-location-services">
         <source></source>
@@ -325,7 +309,7 @@
     </message>
     <message id="gallery-cover-about">
         <source></source>
-        <translation>Kiinnitä ja irrota kuori ja katso, miten sivu seuraa kuoripalvelua.</translation>
+        <translation>Seuraa älykuorta: mikä kuori on kiinni ja onko se valmis.</translation>
     </message>
     <message id="gallery-cover-info">
         <source></source>
@@ -351,69 +335,13 @@
         <source></source>
         <translation>Ei valmis</translation>
     </message>
-    <message id="gallery-cover-device">
-        <source></source>
-        <translation>Laitteessa</translation>
-    </message>
-    <message id="gallery-cover-device-note">
-        <source></source>
-        <translation>Järjestelmäväylän palvelu huomaa kuoren ja kertoo siitä sivulle.</translation>
-    </message>
-    <message id="gallery-cover-attach">
-        <source></source>
-        <translation>Kiinnitä kuori</translation>
-    </message>
-    <message id="gallery-cover-remove">
-        <source></source>
-        <translation>Irrota kuori</translation>
-    </message>
-    <message id="gallery-device">
-        <source></source>
-        <translation>Laite</translation>
-    </message>
-    <message id="gallery-device-about">
-        <source></source>
-        <translation>Katso Bluetooth-osoite, modeemin versio ja onko Android-tuki asennettu.</translation>
-    </message>
-    <message id="gallery-device-radio">
-        <source></source>
-        <translation>Radio</translation>
-    </message>
-    <message id="gallery-device-bluetooth">
-        <source></source>
-        <translation>Bluetooth-osoite</translation>
-    </message>
-    <message id="gallery-device-modem">
-        <source></source>
-        <translation>Modeemin versio</translation>
-    </message>
-    <message id="gallery-device-unknown">
-        <source></source>
-        <translation>Ei tiedossa</translation>
-    </message>
-    <message id="gallery-device-storage">
-        <source></source>
-        <translation>Tallennustila</translation>
-    </message>
-    <message id="gallery-device-android">
-        <source></source>
-        <translation>Androidin datakansiot</translation>
-    </message>
-    <message id="gallery-device-android-shown">
-        <source></source>
-        <translation>Näytetään: Android-tuki on asennettu</translation>
-    </message>
-    <message id="gallery-device-android-hidden">
-        <source></source>
-        <translation>Piilotettu: Android-tukea ei ole</translation>
-    </message>
     <message id="gallery-terms">
         <source></source>
         <translation>Käyttöehdot</translation>
     </message>
     <message id="gallery-terms-about">
         <source></source>
-        <translation>Lue alustan ja valmistajan ehdot valitsemallasi kielellä.</translation>
+        <translation>Lukee alustan ja valmistajan ehdot käyttäjän kielellä.</translation>
     </message>
     <message id="gallery-terms-locale">
         <source></source>
@@ -433,7 +361,7 @@
     </message>
     <message id="gallery-text-files-about">
         <source></source>
-        <translation>Lue tiedosto sekä kansio, jonka tiedostoista tulee yksi teksti.</translation>
+        <translation>Lukee tekstitiedoston ja kansion tiedostot yhtenä tekstinä.</translation>
     </message>
     <message id="gallery-text-files-file">
         <source></source>
@@ -450,6 +378,250 @@
     <message id="gallery-text-files-prefix">
         <source></source>
         <translation>Esimerkkitiedostojen lisenssit:</translation>
+    </message>
+    <message id="gallery-bluetooth">
+        <source></source>
+        <translation>Bluetooth</translation>
+    </message>
+    <message id="gallery-bluetooth-about">
+        <source></source>
+        <translation>Kertoo Bluetooth-sovittimen osoitteen.</translation>
+    </message>
+    <message id="gallery-bluetooth-address">
+        <source></source>
+        <translation>Sovittimen osoite</translation>
+    </message>
+    <message id="gallery-bluetooth-installed">
+        <source></source>
+        <translation>Alustalla on osoitetiedosto</translation>
+    </message>
+    <message id="gallery-android">
+        <source></source>
+        <translation>Android-tuki</translation>
+    </message>
+    <message id="gallery-android-about">
+        <source></source>
+        <translation>Kertoo, näytetäänkö Android-sovellusten kansiot.</translation>
+    </message>
+    <message id="gallery-android-folders">
+        <source></source>
+        <translation>Androidin datakansiot</translation>
+    </message>
+    <message id="gallery-android-shown">
+        <source></source>
+        <translation>Näytetään: Android-tuki on asennettu</translation>
+    </message>
+    <message id="gallery-android-hidden">
+        <source></source>
+        <translation>Piilotettu: Android-tukea ei ole</translation>
+    </message>
+    <message id="gallery-android-installed">
+        <source></source>
+        <translation>Android-tuki on asennettu</translation>
+    </message>
+    <message id="gallery-modem">
+        <source></source>
+        <translation>Modeemi</translation>
+    </message>
+    <message id="gallery-modem-about">
+        <source></source>
+        <translation>Kertoo, mikä modeemiohjelmiston versio laitteessa on.</translation>
+    </message>
+    <message id="gallery-modem-variant">
+        <source></source>
+        <translation>Ohjelmiston versio</translation>
+    </message>
+    <message id="gallery-modem-installed">
+        <source></source>
+        <translation>Modeemiohjelmisto on asennettu</translation>
+    </message>
+    <message id="gallery-unknown">
+        <source></source>
+        <translation>Ei tiedossa</translation>
+    </message>
+    <message id="gallery-text-files-none">
+        <source></source>
+        <translation>Ei luettavaa.</translation>
+    </message>
+    <message id="gallery-text-files-file-installed">
+        <source></source>
+        <translation>Tiedosto on olemassa</translation>
+    </message>
+    <message id="gallery-text-files-folder-installed">
+        <source></source>
+        <translation>Kansio on olemassa</translation>
+    </message>
+    <message id="gallery-terms-platform-installed">
+        <source></source>
+        <translation>Alustalla on ehdot</translation>
+    </message>
+    <message id="gallery-terms-vendor-installed">
+        <source></source>
+        <translation>Valmistajalla on ehdot</translation>
+    </message>
+    <message id="gallery-stage">
+        <source></source>
+        <translation>Näyttämö</translation>
+    </message>
+    <message id="gallery-stage-note">
+        <source></source>
+        <translation>Esittää laitetta sivun ympärillä. Mikään tästä ei kuulu sivulle.</translation>
+    </message>
+    <message id="gallery-stage-reload">
+        <source></source>
+        <translation>Avaa sivu uudelleen</translation>
+    </message>
+    <message id="gallery-stage-constant">
+        <source></source>
+        <translation>Sivu lukee tämän, kun se avataan.</translation>
+    </message>
+    <message id="gallery-log">
+        <source></source>
+        <translation>Loki: %1</translation>
+    </message>
+    <message id="gallery-log-clear">
+        <source></source>
+        <translation>Tyhjennä</translation>
+    </message>
+    <message id="gallery-quick-actions-installed">
+        <source></source>
+        <translation>Pikatoimintoja on asennettu</translation>
+    </message>
+    <message id="gallery-quick-actions-not-installed">
+        <source></source>
+        <translation>Yhtään pikatoimintoa ei ole asennettu.</translation>
+    </message>
+    <message id="gallery-quick-actions-fail">
+        <source></source>
+        <translation>Palvelut vastaavat virheellä</translation>
+    </message>
+    <message id="gallery-quick-actions-absent">
+        <source></source>
+        <translation>Navigointipalvelua ei ole asennettu: sen toiminto pyytää pakettia kaupasta.</translation>
+    </message>
+    <message id="gallery-quick-actions-broken">
+        <source></source>
+        <translation>Tyhjä määrittelytiedosto on olemassa</translation>
+    </message>
+    <message id="gallery-quick-actions-keys">
+        <source></source>
+        <translation>Vetämisen lisäksi rivi siirtyy Ctrl- ja nuolinäppäimillä. Muuttuneet tiedostot huomataan sekunnin kuluttua.</translation>
+    </message>
+    <message id="gallery-events-widgets-none">
+        <source></source>
+        <translation>Yhtään widgetiä ei ole asennettu.</translation>
+    </message>
+    <message id="gallery-events-widgets-check">
+        <source></source>
+        <translation>Tarkista saatavuus</translation>
+    </message>
+    <message id="gallery-events-widgets-installed">
+        <source></source>
+        <translation>Widgetejä on asennettu</translation>
+    </message>
+    <message id="gallery-events-widgets-broken">
+        <source></source>
+        <translation>Rikkinäinen määrittelytiedosto on olemassa</translation>
+    </message>
+    <message id="gallery-titles-language">
+        <source></source>
+        <translation>Kielen vaihtuessa lauseet uusiutuvat, kun sivu avataan uudelleen.</translation>
+    </message>
+    <message id="gallery-card-none">
+        <source></source>
+        <translation>Korttia ei ole paikallaan.</translation>
+    </message>
+    <message id="gallery-card-empty">
+        <source></source>
+        <translation>Poista kaikki tiedostot</translation>
+    </message>
+    <message id="gallery-card-empty-question">
+        <source></source>
+        <translation>Poistetaanko kaikki tiedostot?</translation>
+    </message>
+    <message id="gallery-card-empty-question-text">
+        <source></source>
+        <translation>Kaikki kortin tiedostot ja kansiot katoavat. Tiedostojärjestelmä jää.</translation>
+    </message>
+    <message id="gallery-card-remove">
+        <source></source>
+        <translation>Poista</translation>
+    </message>
+    <message id="gallery-card-real">
+        <source></source>
+        <translation>Oikea kortti: %1, ext4-tiedostojärjestelmä muistissa, ja oikea levypalvelu</translation>
+    </message>
+    <message id="gallery-card-played">
+        <source></source>
+        <translation>Esitetty kortti ja levypalvelu. Irrotettu kortti unohtaa tiedostonsa.</translation>
+    </message>
+    <message id="gallery-card-files">
+        <source></source>
+        <translation>Kortti on liitetty. Tiedostoja ja kansioita ylimmällä tasolla: %1</translation>
+    </message>
+    <message id="gallery-card-is-unmounted">
+        <source></source>
+        <translation>Korttia ei ole liitetty.</translation>
+    </message>
+    <message id="gallery-card-fill">
+        <source></source>
+        <translation>Pane kortille tiedostoja</translation>
+    </message>
+    <message id="gallery-card-inserted">
+        <source></source>
+        <translation>Kortti on paikallaan</translation>
+    </message>
+    <message id="gallery-card-helper">
+        <source></source>
+        <translation>Apuohjelma on asennettu</translation>
+    </message>
+    <message id="gallery-card-helper-waits">
+        <source></source>
+        <translation>Apuohjelma vitkastelee</translation>
+    </message>
+    <message id="gallery-card-service-works">
+        <source></source>
+        <translation>Toimii</translation>
+    </message>
+    <message id="gallery-card-service-forbids">
+        <source></source>
+        <translation>Kieltää kaiken</translation>
+    </message>
+    <message id="gallery-card-service-silent">
+        <source></source>
+        <translation>Ei vastaa</translation>
+    </message>
+    <message id="gallery-card-service-absent">
+        <source></source>
+        <translation>Puuttuu</translation>
+    </message>
+    <message id="gallery-location-mls-installed">
+        <source></source>
+        <translation>MLS-ehdot on asennettu</translation>
+    </message>
+    <message id="gallery-location-here-installed">
+        <source></source>
+        <translation>HERE-ehdot on asennettu</translation>
+    </message>
+    <message id="gallery-cover-no-daemon">
+        <source></source>
+        <translation>Ei palvelua</translation>
+    </message>
+    <message id="gallery-cover-removed">
+        <source></source>
+        <translation>Kuorta ei ole kiinnitetty</translation>
+    </message>
+    <message id="gallery-cover-attached">
+        <source></source>
+        <translation>Kuori, joka ei ole valmis</translation>
+    </message>
+    <message id="gallery-cover-attached-ready">
+        <source></source>
+        <translation>Kuori, joka on valmis</translation>
+    </message>
+    <message id="gallery-cover-note">
+        <source></source>
+        <translation>Kun palvelu katoaa, avoin sivu muistaa, mitä tiesi.</translation>
     </message>
 </context>
 </TS>

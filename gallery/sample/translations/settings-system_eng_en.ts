@@ -21,7 +21,7 @@
     </message>
     <message id="gallery-quick-actions-about">
         <source></source>
-        <translation>Tap an action as on the home screen, and see the call that goes out.</translation>
+        <translation>Shows the enabled quick actions and triggers them, as a home screen does.</translation>
     </message>
     <message id="gallery-quick-actions-home">
         <source></source>
@@ -49,7 +49,7 @@
     </message>
     <message id="gallery-quick-actions-settings-about">
         <source></source>
-        <translation>Enable and disable actions, and drag them into order.</translation>
+        <translation>Lists every quick action that is offered: to enable, disable and put in order.</translation>
     </message>
     <message id="gallery-quick-actions-order">
         <source></source>
@@ -65,7 +65,7 @@
     </message>
     <message id="gallery-events-widgets-about">
         <source></source>
-        <translation>Choose the widgets of the events screen, and see which are available.</translation>
+        <translation>Lists the widgets of the events screen: to enable and disable those that are available.</translation>
     </message>
     <message id="gallery-events-widgets-available">
         <source></source>
@@ -79,17 +79,13 @@
         <source></source>
         <translation>Until the first choice, each widget has its default. The first choice enables all others.</translation>
     </message>
-    <message id="gallery-events-widgets-device">
-        <source></source>
-        <translation>The device</translation>
-    </message>
     <message id="gallery-events-widgets-step-counter">
         <source></source>
         <translation>Step counter</translation>
     </message>
     <message id="gallery-events-widgets-step-counter-note">
         <source></source>
-        <translation>The steps widget is available while the file of the step counter is there. The switch makes and removes the file.</translation>
+        <translation>The steps widget is available while this is there, as soon as the page checks.</translation>
     </message>
     <message id="gallery-titles">
         <source></source>
@@ -97,7 +93,7 @@
     </message>
     <message id="gallery-titles-about">
         <source></source>
-        <translation>What is enabled, in one sentence of the language.</translation>
+        <translation>Joins the titles of a model’s rows, such as what is enabled, into a sentence of the language.</translation>
     </message>
     <message id="gallery-titles-widgets">
         <source></source>
@@ -117,7 +113,7 @@
     </message>
     <message id="gallery-card-about">
         <source></source>
-        <translation>Format a card, mount and unmount it, and follow the steps.</translation>
+        <translation>Formats, empties, mounts and unmounts a memory card, and tells what is on it.</translation>
     </message>
     <message id="gallery-card-state">
         <source></source>
@@ -130,10 +126,6 @@
     <message id="gallery-card-file-system">
         <source></source>
         <translation>File system</translation>
-    </message>
-    <message id="gallery-card-unknown">
-        <source></source>
-        <translation>Not known yet</translation>
     </message>
     <message id="gallery-card-format">
         <source></source>
@@ -197,7 +189,7 @@
     </message>
     <message id="gallery-card-failed">
         <source></source>
-        <translation>The card could not be mounted or unmounted.</translation>
+        <translation>That did not succeed.</translation>
     </message>
     <message id="gallery-card-device-busy">
         <source></source>
@@ -233,15 +225,7 @@
     </message>
     <message id="gallery-card-in-use">
         <source></source>
-        <translation>The card is in use</translation>
-    </message>
-    <message id="gallery-card-forbidden">
-        <source></source>
-        <translation>Nobody may do that</translation>
-    </message>
-    <message id="gallery-card-service-note">
-        <source></source>
-        <translation>This is not a real card: the gallery plays the disk service and the program that formats.</translation>
+        <translation>A program has a file on it open</translation>
     </message>
     <message id="gallery-sample-new-alarm">
         <source></source>
@@ -257,7 +241,7 @@
     </message>
     <message id="gallery-location-about">
         <source></source>
-        <translation>Switch the location services, save and restore the switches, and read what to agree to.</translation>
+        <translation>Switches the location services, saves and restores the switches, and has the terms to agree to.</translation>
     </message>
     <message id="gallery-location-services">
         <source></source>
@@ -325,7 +309,7 @@
     </message>
     <message id="gallery-cover-about">
         <source></source>
-        <translation>Attach and remove a cover, and see the page follow the cover daemon.</translation>
+        <translation>Follows the smart back cover: which one is attached, and whether it is ready.</translation>
     </message>
     <message id="gallery-cover-info">
         <source></source>
@@ -351,69 +335,13 @@
         <source></source>
         <translation>Not ready</translation>
     </message>
-    <message id="gallery-cover-device">
-        <source></source>
-        <translation>On the device</translation>
-    </message>
-    <message id="gallery-cover-device-note">
-        <source></source>
-        <translation>The daemon on the system bus sees the cover and tells the page.</translation>
-    </message>
-    <message id="gallery-cover-attach">
-        <source></source>
-        <translation>Attach a cover</translation>
-    </message>
-    <message id="gallery-cover-remove">
-        <source></source>
-        <translation>Remove the cover</translation>
-    </message>
-    <message id="gallery-device">
-        <source></source>
-        <translation>Device</translation>
-    </message>
-    <message id="gallery-device-about">
-        <source></source>
-        <translation>See the Bluetooth address, the modem variant and whether Android is supported.</translation>
-    </message>
-    <message id="gallery-device-radio">
-        <source></source>
-        <translation>Radio</translation>
-    </message>
-    <message id="gallery-device-bluetooth">
-        <source></source>
-        <translation>Bluetooth address</translation>
-    </message>
-    <message id="gallery-device-modem">
-        <source></source>
-        <translation>Modem variant</translation>
-    </message>
-    <message id="gallery-device-unknown">
-        <source></source>
-        <translation>Unknown</translation>
-    </message>
-    <message id="gallery-device-storage">
-        <source></source>
-        <translation>Storage</translation>
-    </message>
-    <message id="gallery-device-android">
-        <source></source>
-        <translation>Android data folders</translation>
-    </message>
-    <message id="gallery-device-android-shown">
-        <source></source>
-        <translation>Shown: Android support is installed</translation>
-    </message>
-    <message id="gallery-device-android-hidden">
-        <source></source>
-        <translation>Hidden: no Android support</translation>
-    </message>
     <message id="gallery-terms">
         <source></source>
         <translation>Terms of use</translation>
     </message>
     <message id="gallery-terms-about">
         <source></source>
-        <translation>Read the terms of the platform and of the vendor in a language of your choice.</translation>
+        <translation>Reads the terms of the platform and of the vendor in the language of the user.</translation>
     </message>
     <message id="gallery-terms-locale">
         <source></source>
@@ -433,7 +361,7 @@
     </message>
     <message id="gallery-text-files-about">
         <source></source>
-        <translation>Read a file, and a folder whose files become one text.</translation>
+        <translation>Reads a text file, and the files of a folder as one text.</translation>
     </message>
     <message id="gallery-text-files-file">
         <source></source>
@@ -450,6 +378,250 @@
     <message id="gallery-text-files-prefix">
         <source></source>
         <translation>Licences of the sample files:</translation>
+    </message>
+    <message id="gallery-bluetooth">
+        <source></source>
+        <translation>Bluetooth</translation>
+    </message>
+    <message id="gallery-bluetooth-about">
+        <source></source>
+        <translation>Tells the address of the Bluetooth adapter.</translation>
+    </message>
+    <message id="gallery-bluetooth-address">
+        <source></source>
+        <translation>Address of the adapter</translation>
+    </message>
+    <message id="gallery-bluetooth-installed">
+        <source></source>
+        <translation>The platform has an address file</translation>
+    </message>
+    <message id="gallery-android">
+        <source></source>
+        <translation>Android support</translation>
+    </message>
+    <message id="gallery-android-about">
+        <source></source>
+        <translation>Tells whether folders of Android applications are to be shown.</translation>
+    </message>
+    <message id="gallery-android-folders">
+        <source></source>
+        <translation>Android data folders</translation>
+    </message>
+    <message id="gallery-android-shown">
+        <source></source>
+        <translation>Shown: Android support is installed</translation>
+    </message>
+    <message id="gallery-android-hidden">
+        <source></source>
+        <translation>Hidden: no Android support</translation>
+    </message>
+    <message id="gallery-android-installed">
+        <source></source>
+        <translation>Android support is installed</translation>
+    </message>
+    <message id="gallery-modem">
+        <source></source>
+        <translation>Modem</translation>
+    </message>
+    <message id="gallery-modem-about">
+        <source></source>
+        <translation>Tells which variant of the modem software the device has.</translation>
+    </message>
+    <message id="gallery-modem-variant">
+        <source></source>
+        <translation>Variant of the software</translation>
+    </message>
+    <message id="gallery-modem-installed">
+        <source></source>
+        <translation>The modem software is installed</translation>
+    </message>
+    <message id="gallery-unknown">
+        <source></source>
+        <translation>Unknown</translation>
+    </message>
+    <message id="gallery-text-files-none">
+        <source></source>
+        <translation>Nothing to read.</translation>
+    </message>
+    <message id="gallery-text-files-file-installed">
+        <source></source>
+        <translation>The file is there</translation>
+    </message>
+    <message id="gallery-text-files-folder-installed">
+        <source></source>
+        <translation>The folder is there</translation>
+    </message>
+    <message id="gallery-terms-platform-installed">
+        <source></source>
+        <translation>The platform has terms</translation>
+    </message>
+    <message id="gallery-terms-vendor-installed">
+        <source></source>
+        <translation>The vendor has terms</translation>
+    </message>
+    <message id="gallery-stage">
+        <source></source>
+        <translation>The stage</translation>
+    </message>
+    <message id="gallery-stage-note">
+        <source></source>
+        <translation>Plays the device around the page. None of it belongs on a page.</translation>
+    </message>
+    <message id="gallery-stage-reload">
+        <source></source>
+        <translation>Open the page anew</translation>
+    </message>
+    <message id="gallery-stage-constant">
+        <source></source>
+        <translation>The page reads this when it is opened.</translation>
+    </message>
+    <message id="gallery-log">
+        <source></source>
+        <translation>Log: %1</translation>
+    </message>
+    <message id="gallery-log-clear">
+        <source></source>
+        <translation>Clear</translation>
+    </message>
+    <message id="gallery-quick-actions-installed">
+        <source></source>
+        <translation>Quick actions are installed</translation>
+    </message>
+    <message id="gallery-quick-actions-not-installed">
+        <source></source>
+        <translation>No quick action is installed.</translation>
+    </message>
+    <message id="gallery-quick-actions-fail">
+        <source></source>
+        <translation>Services answer with an error</translation>
+    </message>
+    <message id="gallery-quick-actions-absent">
+        <source></source>
+        <translation>The navigation service is not installed: its action asks the store for the package.</translation>
+    </message>
+    <message id="gallery-quick-actions-broken">
+        <source></source>
+        <translation>An empty definition file is there</translation>
+    </message>
+    <message id="gallery-quick-actions-keys">
+        <source></source>
+        <translation>Besides dragging, Ctrl and the arrow keys move a row. Changed files are seen after a second.</translation>
+    </message>
+    <message id="gallery-events-widgets-none">
+        <source></source>
+        <translation>No widget is installed.</translation>
+    </message>
+    <message id="gallery-events-widgets-check">
+        <source></source>
+        <translation>Check what is available</translation>
+    </message>
+    <message id="gallery-events-widgets-installed">
+        <source></source>
+        <translation>Widgets are installed</translation>
+    </message>
+    <message id="gallery-events-widgets-broken">
+        <source></source>
+        <translation>A broken definition file is there</translation>
+    </message>
+    <message id="gallery-titles-language">
+        <source></source>
+        <translation>In another language, the sentences are new when the page is opened anew.</translation>
+    </message>
+    <message id="gallery-card-none">
+        <source></source>
+        <translation>No card is inserted.</translation>
+    </message>
+    <message id="gallery-card-empty">
+        <source></source>
+        <translation>Remove all files</translation>
+    </message>
+    <message id="gallery-card-empty-question">
+        <source></source>
+        <translation>Remove all files?</translation>
+    </message>
+    <message id="gallery-card-empty-question-text">
+        <source></source>
+        <translation>All files and folders on the card will be lost. Its file system stays.</translation>
+    </message>
+    <message id="gallery-card-remove">
+        <source></source>
+        <translation>Remove</translation>
+    </message>
+    <message id="gallery-card-real">
+        <source></source>
+        <translation>A real card: %1, an ext4 file system in memory, and the real disk service</translation>
+    </message>
+    <message id="gallery-card-played">
+        <source></source>
+        <translation>A played card and disk service. When unmounted, the card forgets its files.</translation>
+    </message>
+    <message id="gallery-card-files">
+        <source></source>
+        <translation>The card is mounted. Files and folders at its top: %1</translation>
+    </message>
+    <message id="gallery-card-is-unmounted">
+        <source></source>
+        <translation>The card is not mounted.</translation>
+    </message>
+    <message id="gallery-card-fill">
+        <source></source>
+        <translation>Put files on the card</translation>
+    </message>
+    <message id="gallery-card-inserted">
+        <source></source>
+        <translation>The card is inserted</translation>
+    </message>
+    <message id="gallery-card-helper">
+        <source></source>
+        <translation>The helper program is installed</translation>
+    </message>
+    <message id="gallery-card-helper-waits">
+        <source></source>
+        <translation>The helper program takes its time</translation>
+    </message>
+    <message id="gallery-card-service-works">
+        <source></source>
+        <translation>Works</translation>
+    </message>
+    <message id="gallery-card-service-forbids">
+        <source></source>
+        <translation>Forbids everything</translation>
+    </message>
+    <message id="gallery-card-service-silent">
+        <source></source>
+        <translation>Does not answer</translation>
+    </message>
+    <message id="gallery-card-service-absent">
+        <source></source>
+        <translation>Is not there</translation>
+    </message>
+    <message id="gallery-location-mls-installed">
+        <source></source>
+        <translation>The terms of MLS are installed</translation>
+    </message>
+    <message id="gallery-location-here-installed">
+        <source></source>
+        <translation>The terms of HERE are installed</translation>
+    </message>
+    <message id="gallery-cover-no-daemon">
+        <source></source>
+        <translation>No daemon</translation>
+    </message>
+    <message id="gallery-cover-removed">
+        <source></source>
+        <translation>No cover attached</translation>
+    </message>
+    <message id="gallery-cover-attached">
+        <source></source>
+        <translation>A cover that is not ready</translation>
+    </message>
+    <message id="gallery-cover-attached-ready">
+        <source></source>
+        <translation>A cover that is ready</translation>
+    </message>
+    <message id="gallery-cover-note">
+        <source></source>
+        <translation>When the daemon goes, an open page keeps what it knew.</translation>
     </message>
 </context>
 </TS>

@@ -7,7 +7,7 @@ import QtQuick.Controls.impl 2.15
 import QtQuick.Layouts 1.15
 
 /*
-    A switch whose text has a description below it, and a remark if there is one.
+    A switch whose text may be long, with a description below it, and a remark if there is one.
 */
 SwitchDelegate {
     id: control
@@ -16,11 +16,15 @@ SwitchDelegate {
     property string remark
 
     Layout.fillWidth: true
+    // Delegates are made for lists, and have none.
+    focusPolicy: Qt.StrongFocus
+    horizontalPadding: 0
 
     contentItem: RowLayout {
         spacing: control.spacing
 
         IconImage {
+            visible: control.icon.source.toString() !== ""
             source: control.icon.source
             sourceSize: Qt.size(24, 24)
             color: control.icon.color
@@ -33,7 +37,7 @@ SwitchDelegate {
             Label {
                 Layout.fillWidth: true
                 text: control.text
-                elide: Text.ElideRight
+                wrapMode: Text.Wrap
             }
             Label {
                 Layout.fillWidth: true

@@ -28,6 +28,19 @@ namespace {
 const QString udevd = QStringLiteral("/lib/systemd/systemd-udevd");
 const QString udisksd = QStringLiteral("/usr/libexec/udisks2/udisksd");
 const QString loopControl = QStringLiteral("/dev/loop-control");
+const QString helper = QStringLiteral("/usr/libexec/sdcardhelper");
+// The disk service is told of a new file system before anybody asks it to mount that.
+constexpr char helperScript[] = R"(#!/bin/sh
+set -eu
+while [ -e /usr/libexec/sdcardhelper-waits ]; do sleep 0.1; done
+case $1 in
+format_vfat) mkfs.vfat -I "/dev/$2" ;;
+format_ext4) mkfs.ext4 -q "/dev/$2" ;;
+probe) exec blkid -p -o value -s TYPE "/dev/$2" ;;
+*) exit 2 ;;
+esac
+exec nsenter --net=/proc/%1/ns/net udevadm trigger --settle --action=change "/sys/class/block/$2"
+)";
 constexpr qint64 cardSize = qint64(64) * 1024 * 1024;
 constexpr int patience = 60000; // ms, of a machine that is very busy
 
@@ -106,6 +119,15 @@ void RealCard::becomePrivate()
                   "lowerdir=/dev,upperdir=/media/upper,workdir=/media/work")
                 == 0,
             "lay a layer over /dev");
+}
+
+void RealCard::installHelper()
+{
+    QFile file(helper);
+    const QByteArray script = QString::fromLatin1(helperScript).arg(getpid()).toLatin1();
+    require(file.open(QIODevice::WriteOnly) && file.write(script) == script.size()
+                && file.setPermissions(QFile::ReadOwner | QFile::ExeOwner),
+            "install the helper program");
 }
 
 RealCard::RealCard() : m_image(QStringLiteral("/media/card.img"))

@@ -26,6 +26,10 @@ public:
     // Leaves the namespaces that the process shares with others: to be called once, before there is
     // a second thread.
     static void becomePrivate();
+    // Installs a program that formats and probes memory cards for real; it may be run from outside
+    // the network namespace of this process. While the file /usr/libexec/sdcardhelper-waits is there
+    // it takes its time.
+    static void installHelper();
 
     // Ends the program if something is not to be had that has to be there.
     RealCard();

@@ -1,0 +1,52 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+import QtQuick 2.15
+import QtQuick.Layouts 1.15
+
+/*
+    A page of pages/ as it is, and what plays the device around it (a file of the same name in
+    scenes/): beside it where there is room, below it otherwise.
+*/
+ScrollingPage {
+    id: frame
+
+    // Of Pages; another language brings another one.
+    property var entry
+    readonly property Item page: pageLoader.item
+    readonly property Item scene: sceneLoader.item
+
+    function reload() {
+        pageLoader.active = false;
+        pageLoader.active = true;
+    }
+
+    title: entry.title
+    columns: width >= 900 ? 2 : 1
+
+    Loader {
+        id: pageLoader
+        Layout.fillWidth: true
+        Layout.alignment: Qt.AlignTop
+        source: "pages/" + frame.entry.file
+    }
+
+    StagePane {
+        Layout.fillWidth: true
+        Layout.maximumWidth: frame.columns === 2 ? 340 : -1
+        Layout.alignment: Qt.AlignTop
+        onReloadRequested: frame.reload()
+
+        Loader {
+            id: sceneLoader
+            Layout.fillWidth: true
+            source: "scenes/" + frame.entry.file.replace("Page", "Scene")
+            onLoaded: {
+                // Some scenes have something for the page, as the application around it would.
+                if (item.hasOwnProperty("page")) {
+                    item.page = Qt.binding(() => frame.page);
+                }
+            }
+        }
+    }
+}

@@ -1,0 +1,112 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+/*
+    usage: gallery-with-card COMMAND [ARG]...
+
+    Runs a command with a real memory card at hand, where there can be one: a loop device that the
+    distribution's own disk service mounts. GALLERY_CARD is the name of the device then, and
+    GALLERY_CARD_NETWORK the network namespace that its disk service has to run in.
+
+    A second process keeps the card. The kernel ends it with the command, however that ends, and with
+    it go the daemons, the mounts and the loop device.
+*/
+
+#include "realcard.h"
+
+#include <QCoreApplication>
+
+#include <array>
+#include <cerrno>
+#include <csignal>
+#include <cstdio>
+#include <cstring>
+
+#include <fcntl.h>
+#include <sched.h>
+#include <sys/mount.h>
+#include <sys/prctl.h>
+#include <sys/resource.h>
+#include <unistd.h>
+
+namespace {
+
+[[noreturn]] void keepCard(pid_t command, int report, int argc, char **argv)
+{
+    // What cannot be had ends the program, which is no crash to look into.
+    const rlimit noCore = {0, 0};
+    setrlimit(RLIMIT_CORE, &noCore);
+    prctl(PR_SET_PDEATHSIG, SIGKILL);
+    if (getppid() != command) {
+        _exit(1);
+    }
+    RealCard::becomePrivate();
+    const QCoreApplication application(argc, argv);
+    const RealCard card;
+    RealCard::installHelper();
+    const QByteArray name = card.name().toLatin1();
+    if (write(report, name.constData(), size_t(name.size())) == name.size()) {
+        close(report);
+        while (true) {
+            pause();
+        }
+    }
+    _exit(1);
+}
+
+bool enterMounts(const QByteArray &process)
+{
+    const int mounts = open((process + "/ns/mnt").constData(), O_RDONLY | O_CLOEXEC);
+    const int folder = open(".", O_PATH | O_DIRECTORY | O_CLOEXEC);
+    return mounts >= 0 && setns(mounts, CLONE_NEWNS) == 0 && fchdir(folder) == 0;
+}
+
+// Whether there is a card now.
+bool makeCard(int argc, char **argv)
+{
+    const pid_t self = getpid();
+    std::array<int, 2> report = {};
+    if (pipe2(report.data(), O_CLOEXEC) != 0) {
+        return false;
+    }
+    const pid_t keeper = fork();
+    if (keeper == 0) {
+        close(report[0]);
+        keepCard(self, report[1], argc, argv);
+    }
+    close(report[1]);
+    std::array<char, 64> name = {};
+    const ssize_t size = read(report[0], name.data(), name.size() - 1);
+    close(report[0]);
+    const QByteArray process = "/proc/" + QByteArray::number(keeper);
+    if (keeper < 0 || size <= 0 || !enterMounts(process)) {
+        return false;
+    }
+    qputenv("GALLERY_CARD", name.data());
+    qputenv("GALLERY_CARD_NETWORK", process + "/ns/net");
+    return true;
+}
+
+} // namespace
+
+int main(int argc, char *argv[])
+{
+    if (argc < 2) {
+        std::fputs("usage: gallery-with-card COMMAND [ARG]...\n", stderr);
+        return 2;
+    }
+    QString whyNot = RealCard::whyNot();
+    if (whyNot.isEmpty() && !makeCard(argc, argv)) {
+        whyNot = QStringLiteral("none could be set up");
+    }
+    if (!whyNot.isEmpty()) {
+        std::fprintf(stderr, "gallery: the memory card is played: %s\n", qPrintable(whyNot));
+        // What the played one mounts is to go with the command, too.
+        if (unshare(CLONE_NEWNS) == 0) {
+            mount(nullptr, "/", nullptr, MS_REC | MS_PRIVATE, nullptr);
+        }
+    }
+    execvp(argv[1], argv + 1);
+    std::fprintf(stderr, "gallery: cannot run %s: %s\n", argv[1], std::strerror(errno));
+    return 127;
+}

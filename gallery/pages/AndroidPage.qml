@@ -1,0 +1,25 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+import QtQuick 2.15
+import com.marlo.settings.system 1.0
+import ".."
+
+/*
+    Whether there are folders of Android applications to be shown.
+*/
+GalleryPage {
+    AndroidSupport {
+        id: android
+    }
+
+    Section {
+        heading: qsTrId("gallery-android")
+
+        Value {
+            name: qsTrId("gallery-android-folders")
+            value: android.dataDirectoriesVisible ? qsTrId("gallery-android-shown")
+                                                  : qsTrId("gallery-android-hidden")
+        }
+    }
+}

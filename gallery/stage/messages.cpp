@@ -1,0 +1,87 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "messages.h"
+
+#include <QMetaObject>
+
+#include <mutex>
+
+namespace {
+
+constexpr int most = 200;
+
+// A message handler is a plain function and messages come from any thread.
+std::mutex mutex;
+Messages *receiver = nullptr;
+QtMessageHandler previousHandler = nullptr;
+
+void pass(QtMsgType type, const QMessageLogContext &context, const QString &text)
+{
+    previousHandler(type, context, text);
+    if (type == QtDebugMsg) {
+        return;
+    }
+    const std::lock_guard<std::mutex> lock(mutex);
+    if (receiver != nullptr) {
+        QMetaObject::invokeMethod(receiver, "add", Qt::QueuedConnection, Q_ARG(QString, text));
+    }
+}
+
+} // namespace
+
+Messages::Messages(QObject *parent) : QAbstractListModel(parent)
+{
+    const std::lock_guard<std::mutex> lock(mutex);
+    receiver = this;
+    previousHandler = qInstallMessageHandler(pass);
+}
+
+Messages::~Messages()
+{
+    const std::lock_guard<std::mutex> lock(mutex);
+    receiver = nullptr;
+    // Somebody may have come later, and be still there.
+    const QtMessageHandler current = qInstallMessageHandler(previousHandler);
+    if (current != pass) {
+        qInstallMessageHandler(current);
+    }
+}
+
+void Messages::clear()
+{
+    beginResetModel();
+    m_texts.clear();
+    endResetModel();
+    Q_EMIT countChanged();
+}
+
+int Messages::rowCount(const QModelIndex &parent) const
+{
+    return parent.isValid() ? 0 : m_texts.size();
+}
+
+QVariant Messages::data(const QModelIndex &index, int role) const
+{
+    return role == Qt::DisplayRole && checkIndex(index, CheckIndexOption::IndexIsValid)
+        ? m_texts.at(index.row())
+        : QVariant();
+}
+
+QHash<int, QByteArray> Messages::roleNames() const
+{
+    return {{Qt::DisplayRole, QByteArrayLiteral("text")}};
+}
+
+void Messages::add(const QString &text)
+{
+    if (m_texts.size() == most) {
+        beginRemoveRows({}, 0, 0);
+        m_texts.removeFirst();
+        endRemoveRows();
+    }
+    beginInsertRows({}, m_texts.size(), m_texts.size());
+    m_texts.append(text);
+    endInsertRows();
+    Q_EMIT countChanged();
+}

@@ -1,0 +1,636 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+import QtQuick 2.15
+import QtTest 1.15
+import gallery.stage 1.0
+import "../../gallery"
+import "../../gallery/screen.js" as Screen
+
+// Every page of the gallery, driven with the pointer and the keys as a person would, who looks at
+// the screen for what comes of it.
+TestCase {
+    id: test
+
+    readonly property int patience: 20000
+    readonly property var pages: [
+        "quick-actions", "quick-actions-settings", "events-widgets", "titles", "memory-card",
+        "location", "cover", "bluetooth", "android", "modem", "terms", "text-files",
+    ]
+    property var gallery: null
+    readonly property var surface: gallery ? gallery.surface : null
+
+    name: "Gallery"
+
+    Component {
+        id: galleryComponent
+        Gallery {}
+    }
+
+    function initTestCase() {
+        root.recordMessages();
+    }
+
+    function init() {
+        gallery = createTemporaryObject(galleryComponent, null);
+        verify(gallery);
+        Messages.clear();
+        gallery.requestActivate();
+        tryCompare(gallery, "active", true);
+    }
+
+    function cleanup() {
+        Stage.language = "en";
+        Stage.cover = Stage.NoCover;
+        gallery.destroy();
+        gallery = null;
+        wait(0);
+        compare(root.takeMessages(), []);
+    }
+
+    // As tryVerify(), but not with a rest of 50 ms between two looks.
+    function until(condition, otherwise) {
+        const end = Date.now() + patience;
+        while (!condition()) {
+            verify(Date.now() < end, otherwise);
+            wait(10);
+        }
+    }
+
+    // The part of the screen that a finger would be put on.
+    function place(item) {
+        const part = Screen.seenPart(surface, item);
+        return part.width > 4 && part.height > 4
+            ? { x: part.x + part.width / 2, y: part.y + part.height / 2 } : null;
+    }
+
+    // What moves is not to be hit.
+    function waitUntilStill(item) {
+        let before = null;
+        until(() => {
+            const now = item.mapToItem(surface, 0, 0);
+            const still = before !== null && before.x === now.x && before.y === now.y
+                          && !gallery.currentPage.scrolling;
+            before = now;
+            return still;
+        }, "does not stand still: " + item.text);
+    }
+
+    // With the keys for it, until an item can be touched.
+    function scrollTo(item) {
+        const page = gallery.currentPage;
+        const inPage = () => Screen.seenPart(surface, item).height >= Math.min(item.height, 40);
+        waitUntilStill(item);
+        for (let i = 0; i < 50 && !inPage(); ++i) {
+            const step = page.mapFromItem(item, 0, item.height).y > page.height ? 1 : -1;
+            page.forceActiveFocus();
+            keyClick(step > 0 ? Qt.Key_PageDown : Qt.Key_PageUp);
+            waitUntilStill(item);
+        }
+        verify(inPage(), "cannot be scrolled to: " + item.text);
+    }
+
+    function findControl(text) {
+        until(() => Screen.control(surface, text), "no control " + text);
+        return Screen.control(surface, text);
+    }
+
+    function tap(text) {
+        tapItem(findControl(text));
+    }
+
+    function tapItem(item) {
+        until(() => item.enabled, "not enabled: " + item.text);
+        if (!Screen.inPopup(surface, item)) {
+            scrollTo(item);
+        }
+        waitUntilStill(item);
+        until(() => place(item), "not to be seen: " + item.text);
+        const at = place(item);
+        mouseClick(surface, at.x, at.y);
+    }
+
+    function shows(text) {
+        return Screen.texts(surface).some(item => item.text === text);
+    }
+
+    function see(text) {
+        until(() => shows(text), "not on the screen: " + text);
+        const item = Screen.texts(surface).find(item => item.text === text);
+        if (!Screen.inPopup(surface, item)) {
+            scrollTo(item);
+        }
+    }
+
+    function seeNot(text) {
+        until(() => !shows(text), "still on the screen: " + text);
+    }
+
+    function seeSwitch(text, checked) {
+        tryCompare(findControl(text), "checked", checked, patience);
+    }
+
+    // From the start page, as one gets there.
+    function openPage(name) {
+        const page = gallery.pages.find(page => page.name === name);
+        tap(page.title);
+        see(page.title);
+        until(() => gallery.currentPage.page !== undefined);
+    }
+
+    function goBack() {
+        mouseClick(surface, 20, 20);
+        see("Settings gallery");
+    }
+
+    // The messages that the pages have led to, which are in the log of the gallery too.
+    function expectMessages(parts) {
+        const messages = [];
+        until(() => {
+            root.takeMessages().forEach(message => messages.push(message));
+            return messages.length >= parts.length;
+        }, "no message");
+        compare(messages.length, parts.length, messages.join("\n"));
+        parts.forEach((part, i) => verify(messages[i].includes(part), messages[i]));
+        const latest = messages[messages.length - 1];
+        tryCompare(Messages, "latest", latest);
+        see(latest.replace(/^file:\S+ /, ""));
+    }
+
+    function test_startPageTellsOfEachPage() {
+        compare(gallery.pages.map(page => page.name), pages);
+        gallery.pages.forEach(page => {
+            see(page.title);
+            see(page.type);
+            verify(/^[A-Z].*\.$/.test(page.about), page.about);
+            see(page.about);
+        });
+    }
+
+    function test_everyPageFitsEveryScreen_data() {
+        return ["start"].concat(pages).map(name => ({ tag: name }));
+    }
+
+    function test_everyPageFitsEveryScreen(data) {
+        if (data.tag !== "start") {
+            gallery.openPage(data.tag);
+        }
+        for (const size of [[360, 640], [640, 360], [800, 600], [1280, 800], [1920, 1080]]) {
+            for (const language of ["en", "fi", "de"]) {
+                Stage.language = language;
+                gallery.width = size[0];
+                gallery.height = size[1];
+                until(() => Screen.flaw(surface) === "", "a flaw");
+                compare(Screen.untranslated(surface), "");
+                const page = gallery.currentPage;
+                verify(page.height >= 200, "the page has no room");
+            }
+        }
+        // Terms that lack the language.
+        root.takeMessages();
+    }
+
+    // Tab goes through everything there is on a page, and the page goes along.
+    function test_everyPageIsUsedByKeys_data() {
+        return pages.map(name => ({ tag: name }));
+    }
+
+    function test_everyPageIsUsedByKeys(data) {
+        const entry = gallery.pages.findIndex(page => page.name === data.tag);
+        const focused = () => gallery.activeFocusItem;
+        for (let i = 0; i < 20 && focused().text !== gallery.pages[entry].title; ++i) {
+            keyClick(Qt.Key_Tab);
+        }
+        compare(focused().text, gallery.pages[entry].title);
+        keyClick(Qt.Key_Return);
+        tryCompare(gallery.currentPage, "title", gallery.pages[entry].title);
+
+        const reached = [];
+        for (let i = 0; i < 60 && !reached.includes("Open the page anew"); ++i) {
+            keyClick(Qt.Key_Tab);
+            reached.push(focused().text);
+            if (Screen.isText(focused()) || !gallery.currentPage.contains(focused())) {
+                continue;
+            }
+            verify(Screen.seenPart(surface, focused()).height >= Math.min(focused().height, 40),
+                   focused().text);
+        }
+        Screen.visibleItems(gallery.currentPage)
+              .filter(item => typeof item.clicked === "function" && item.text && item.enabled)
+              .forEach(item => verify(reached.includes(item.text), item.text));
+        keyClick(Qt.Key_Escape);
+        tryCompare(gallery.currentPage, "title", "Settings gallery");
+        root.takeMessages();
+    }
+
+    function test_keysScrollAndToggle() {
+        gallery.openPage("titles");
+        const page = gallery.currentPage;
+        keyClick(Qt.Key_PageDown);
+        until(() => page.scrollY > 100);
+        keyClick(Qt.Key_PageUp);
+        tryCompare(page, "scrollY", 0);
+        keyClick(Qt.Key_Down);
+        until(() => page.scrollY > 0);
+
+        seeSwitch("Weather", true);
+        findControl("Weather").forceActiveFocus(Qt.TabFocusReason);
+        keyClick(Qt.Key_Space);
+        seeSwitch("Weather", false);
+        keyClick(Qt.Key_Space);
+        seeSwitch("Weather", true);
+    }
+
+    function test_language() {
+        openPage("bluetooth");
+        tapItem(Screen.visibleItems(surface).find(item => item.text === "EN"));
+        tap("Suomi");
+        see("Sovittimen osoite");
+        tapItem(Screen.visibleItems(surface).find(item => item.text === "FI"));
+        tap("English");
+        see("Address of the adapter");
+    }
+
+    function test_wheelScrollsAPage() {
+        const page = gallery.currentPage;
+        mouseWheel(page, page.width / 2, page.height / 2, 0, -120);
+        until(() => page.scrollY > 10);
+    }
+
+    function test_touchScrollsAPage() {
+        const page = gallery.currentPage;
+        const touch = touchEvent(page);
+        touch.press(0, page, 100, 400).commit();
+        for (let y = 380; y >= 100; y -= 20) {
+            touch.move(0, page, 100, y).commit();
+        }
+        touch.release(0, page, 100, 100).commit();
+        until(() => page.scrollY > 50);
+    }
+
+    function test_quickActions() {
+        openPage("quick-actions");
+        see("Nothing yet: tap an action.");
+        tap("Take a photo");
+        see("showViewfinder()");
+        see("com.marlo.camera");
+        tap("Torch");
+        see("toggle(\"bright\")".replace("\"bright\"", ""));
+        // Nobody has its service: the store is asked.
+        tap("Navigate home");
+        see("showApp(\"marlo-maps\")");
+        see("com.marlo.marlostore");
+        expectMessages(["ServiceUnknown"]);
+
+        tap("Services answer with an error");
+        tap("Take a photo");
+        expectMessages(["com.marlo.camera"]);
+        tap("Services answer with an error");
+
+        tap("Quick actions are installed");
+        see("No quick action is enabled.");
+        seeNot("Take a photo");
+        tap("Quick actions are installed");
+        see("Take a photo");
+    }
+
+    function test_logIsOpenedAndCleared() {
+        openPage("quick-actions");
+        tap("Navigate home");
+        expectMessages(["ServiceUnknown"]);
+        see("▴ Log: 1");
+        tap("Log: 1");
+        see("▾ Log: 1");
+        see(Messages.latest);
+        tap("Clear");
+        see("▾ Log: 0");
+        tap("Log: 0");
+        see("▴ Log: 0");
+    }
+
+    function rowsOf(list) {
+        return Screen.visibleItems(list.contentItem)
+                     .filter(item => typeof item.clicked === "function" && item.text)
+                     .sort((a, b) => a.y - b.y).map(item => item.text);
+    }
+
+    function test_quickActionsSettings() {
+        openPage("quick-actions-settings");
+        see("Take a photo");
+        const list = Screen.visibleItems(surface).find(item => item.rowHeight);
+        const before = ["Take a photo", "Torch", "Navigate home", "New alarm"];
+        until(() => rowsOf(list).join() === before.join(), "rows");
+
+        // By the handle, from the first place to the third.
+        const x = list.width - list.rowHeight / 2;
+        mousePress(list, x, list.rowHeight * 0.5);
+        for (let y = list.rowHeight * 0.5; y <= list.rowHeight * 2.5; y += 8) {
+            mouseMove(list, x, y, -1, Qt.LeftButton);
+        }
+        mouseRelease(list, x, list.rowHeight * 2.5);
+        const after = ["Torch", "Navigate home", "Take a photo", "New alarm"];
+        until(() => rowsOf(list).join() === after.join(), "dragged");
+        until(() => root.key("/desktop/glimmera-marlo-home/events_screen_actions")[2]
+                    === "/usr/share/glimmera/quickactions/camera.conf", "kept");
+
+        // And back by keys.
+        Screen.visibleItems(list.contentItem).find(item => item.text === "Take a photo"
+                                                           && item.forceActiveFocus)
+              .forceActiveFocus(Qt.TabFocusReason);
+        keyClick(Qt.Key_Up, Qt.ControlModifier);
+        keyClick(Qt.Key_Up, Qt.ControlModifier);
+        until(() => rowsOf(list).join() === before.join(), "moved by keys");
+
+        seeSwitch("New note", false);
+        tap("New note");
+        until(() => rowsOf(list).join() === before.concat("New note").join());
+        seeSwitch("New note", true);
+        tapItem(Screen.visibleItems(surface).reverse().find(
+            item => item.text === "New note" && item.checkable));
+        until(() => rowsOf(list).join() === before.join(), "disabled");
+
+        // One that has nothing to show is shown by its path.
+        tap("An empty definition file is there");
+        see("/usr/share/glimmera/quickactions/empty.conf");
+        tap("An empty definition file is there");
+        seeNot("/usr/share/glimmera/quickactions/empty.conf");
+        tap("Quick actions are installed");
+        see("No quick action is installed.");
+        see("No quick action is enabled.");
+        tap("Quick actions are installed");
+        see("Take a photo");
+    }
+
+    function test_eventsWidgets() {
+        openPage("events-widgets");
+        see("Not available on this device");
+        tap("Step counter");
+        see("Not available on this device");
+        tap("Check what is available");
+        seeNot("Not available on this device");
+        tap("Step counter");
+        tap("Check what is available");
+        see("Not available on this device");
+
+        seeSwitch("Birthdays", false);
+        tap("Weather");
+        seeSwitch("Weather", false);
+        seeSwitch("Birthdays", true);
+        tap("Weather");
+        seeSwitch("Weather", true);
+
+        tap("A broken definition file is there");
+        expectMessages(["Invalid Events Widget"]);
+        tap("A broken definition file is there");
+        tap("Widgets are installed");
+        see("No widget is installed.");
+        seeNot("Weather");
+        tap("Widgets are installed");
+        see("Weather");
+        root.takeMessages();
+    }
+
+    function test_titles() {
+        openPage("titles");
+        see("Take a photo, Torch, Navigate home and New alarm");
+        tap("Torch");
+        see("Take a photo, Navigate home and New alarm");
+        tap("Torch");
+        see("Take a photo, Torch, Navigate home and New alarm");
+        tap("Quick actions are installed");
+        see("None is enabled.");
+        tap("Quick actions are installed");
+        see("Take a photo, Navigate home, New alarm and Torch");
+    }
+
+    function waitForCard() {
+        tryCompare(StagedCard, "ready", true, patience);
+        until(() => Screen.control(surface, "Mount").enabled && shows("Ready"));
+    }
+
+    function test_memoryCard() {
+        openPage("memory-card");
+        waitForCard();
+        until(() => shows("ext4") || shows("vfat"), "probed");
+
+        tap("Mount");
+        tryCompare(StagedCard, "mounted", true, patience);
+        see("The card is mounted. Files and folders at its top: " + StagedCard.fileCount);
+        see("2. Ready");
+        tap("Put files on the card");
+        until(() => StagedCard.fileCount >= 2, "filled");
+        tap("Mount");
+        see("The card is mounted already.");
+        expectMessages(["AlreadyMounted"]);
+
+        // Asked first; who declines keeps the files.
+        const files = StagedCard.fileCount;
+        tap("Remove all files");
+        see("Remove all files?");
+        tap("Cancel");
+        seeNot("Remove all files?");
+        compare(StagedCard.fileCount, files);
+        tap("Remove all files");
+        tap("Remove");
+        tryCompare(StagedCard, "fileCount", 0, patience);
+        see("1. Removing files");
+        see("2. Ready");
+        expectMessages(["AlreadyMounted"]);
+
+        tap("A program has a file on it open");
+        tap("Unmount");
+        see("The card is in use. Close what uses it, and try again.");
+        expectMessages(["DeviceBusy"]);
+        tap("A program has a file on it open");
+
+        tap("The helper program takes its time");
+        tap("Format as ext4");
+        see("Everything on the card will be lost.");
+        tap("Erase");
+        see("2. Formatting");
+        verify(Screen.visibleItems(surface).some(item => item.indeterminate));
+        compare(Screen.control(surface, "Mount").enabled, false);
+        tap("The helper program takes its time");
+        see("4. Ready");
+        see("ext4");
+        tap("Unmount");
+        see("2. Ready");
+        see("The card is not mounted.");
+
+        tap("Format as ext4");
+        tap("Erase");
+        see("Failed");
+        expectMessages(["NotMounted"]);
+
+        tap("Forbids everything");
+        tap("Mount");
+        see("This is not allowed.");
+        expectMessages(["NotAuthorized"]);
+        tap("Is not there");
+        tap("Mount");
+        see("That did not succeed.");
+        expectMessages(["ServiceUnknown"]);
+        tap("Does not answer");
+        tap("Mount");
+        tap("Works");
+        expectMessages(["DBus.Error."]);
+        tryCompare(StagedCard, "ready", true, patience);
+        tap("Mount");
+        tryCompare(StagedCard, "mounted", true, patience);
+        tap("Unmount");
+        tryCompare(StagedCard, "mounted", false, patience);
+        waitForCard();
+
+        tap("The helper program is installed");
+        tap("Open the page anew");
+        see("That did not succeed.");
+        see("Unknown");
+        tap("The helper program is installed");
+        tap("The card is inserted");
+        see("No card is inserted.");
+        tap("The card is inserted");
+        waitForCard();
+        until(() => shows("ext4"), "probed again");
+    }
+
+    function test_cardSaysWhetherItIsReal() {
+        openPage("memory-card");
+        see(StagedCard.real ? "A real card: %1, an ext4 file system in memory, and the real disk "
+                              .arg(StagedCard.name) + "service"
+                            : "A played card and disk service. When unmounted, the card forgets "
+                              + "its files.");
+        waitForCard();
+    }
+
+    function test_location() {
+        openPage("location");
+        seeSwitch("Satellite positioning (GPS)", false);
+        tap("Satellite positioning (GPS)");
+        seeSwitch("Satellite positioning (GPS)", true);
+        tap("Network positioning (MLS)");
+        seeSwitch("Network positioning (MLS)", true);
+        compare(findControl("MLS online assistance").enabled, false);
+
+        // The first is that of MLS.
+        tap("I agree");
+        tap("I agree");
+        until(() => shows("Withdraw consent") && !shows("I agree"), "agreed");
+        seeNot("An online service can be switched once its terms are agreed to.");
+        seeSwitch("MLS online assistance", true);
+        tap("MLS online assistance");
+        seeSwitch("MLS online assistance", false);
+
+        tap("Save");
+        tap("Satellite positioning (GPS)");
+        tap("MLS online assistance");
+        seeSwitch("MLS online assistance", true);
+        tap("Restore");
+        seeSwitch("Satellite positioning (GPS)", true);
+        seeSwitch("MLS online assistance", false);
+        tap("Use custom settings");
+        seeSwitch("Use custom settings", true);
+
+        tap("The terms of MLS are installed");
+        tap("Open the page anew");
+        see("The terms of this service could not be found.");
+        expectMessages(["No agreement found"]);
+        tap("The terms of MLS are installed");
+        tap("Open the page anew");
+        seeNot("The terms of this service could not be found.");
+        seeSwitch("Use custom settings", true);
+    }
+
+    function test_cover() {
+        openPage("cover");
+        see("No cover");
+        tap("A cover that is not ready");
+        see("MARLO-COVER-07");
+        see("Not ready");
+        tap("A cover that is ready");
+        see("Ready");
+        tap("No daemon");
+        tap("Open the page anew");
+        see("No cover");
+        see("Not ready");
+        // A daemon that starts while the page is open.
+        tap("A cover that is ready");
+        see("MARLO-COVER-07");
+        see("Ready");
+        tap("No cover attached");
+        see("No cover");
+    }
+
+    function test_bluetooth() {
+        openPage("bluetooth");
+        see("00:1a:7d:da:71:13");
+        tap("The platform has an address file");
+        tap("Open the page anew");
+        see("Unknown");
+        expectMessages(["Unable to open file"]);
+        tap("The platform has an address file");
+        tap("Open the page anew");
+        see("00:1a:7d:da:71:13");
+    }
+
+    function test_android() {
+        openPage("android");
+        see("Shown: Android support is installed");
+        // Its switch has the name that the page says.
+        tap("Android support is installed");
+        tap("Open the page anew");
+        see("Hidden: no Android support");
+        tap("Android support is installed");
+        tap("Open the page anew");
+        see("Shown: Android support is installed");
+    }
+
+    function test_modem() {
+        openPage("modem");
+        seeNot("Unknown");
+        tap("The modem software is installed");
+        tap("Open the page anew");
+        see("Unknown");
+        tap("The modem software is installed");
+        tap("Open the page anew");
+        seeNot("Unknown");
+        goBack();
+    }
+
+    function test_terms() {
+        openPage("terms");
+        see("Platform terms of use");
+        const locale = Screen.visibleItems(surface).find(item => item.displayText === "en_GB");
+        tapItem(locale);
+        tap("fi_FI.UTF-8");
+        see("Alustan käyttöehdot");
+        seeNot("Platform terms of use");
+        tapItem(locale);
+        tap("de_DE.UTF-8");
+        see("Platform terms of use");
+        expectMessages(["de_DE", "de_DE", "de_DE"]);
+
+        tap("The vendor has terms");
+        tap("The platform has terms");
+        tap("Open the page anew");
+        see("No terms");
+        expectMessages(["unable to load"]);
+        tap("The vendor has terms");
+        tap("The platform has terms");
+        tap("Open the page anew");
+        seeNot("No terms");
+    }
+
+    function test_textFiles() {
+        openPage("text-files");
+        seeNot("Nothing to read.");
+        tap("The file is there");
+        tap("The folder is there");
+        tap("Open the page anew");
+        until(() => Screen.texts(surface).filter(item => item.text === "Nothing to read.")
+                                             .length === 2, "both are empty");
+        tap("The file is there");
+        tap("The folder is there");
+        tap("Open the page anew");
+        seeNot("Nothing to read.");
+    }
+}

@@ -74,13 +74,73 @@ bool isPacked(const QByteArray &data, int position)
     return word.startsWith("Variant(") || word.startsWith("DateTime(");
 }
 
+bool isPlain(const RegularFile &file)
+{
+    return file.state == RegularFile::State::NotOpened
+        || (file.state == RegularFile::State::Read && findPackedValue(file.content) < 0);
+}
+
+bool isSpaceAt(const QByteArray &data, int position)
+{
+    return position < data.size() && isSpace(uchar(data.at(position)));
+}
+
+bool isBreakAt(const QByteArray &data, int position)
+{
+    return position < data.size() && (data.at(position) == '\n' || data.at(position) == '\r');
+}
+
+struct Line {
+    int start;
+    int end;
+};
+
+// The next line as QSettings parts a text: quotes and backslashes join what would be several, and a
+// semicolon, which begins a comment, parts what would be one. Empty at the end.
+Line nextLine(const QByteArray &data, int position)
+{
+    while (isSpaceAt(data, position)) {
+        ++position;
+    }
+    int start = position;
+    bool quoted = false;
+    while (position < data.size()) {
+        const char character = data.at(position);
+        if (character == '\\') {
+            ++position;
+            // A break of two characters is passed as one.
+            const bool isPair = isBreakAt(data, position) && isBreakAt(data, position + 1)
+                && data.at(position) != data.at(position + 1);
+            position += isPair ? 2 : 1;
+        } else if (character == ';' && position == start) {
+            while (position < data.size() && !isBreakAt(data, position)) {
+                ++position;
+            }
+            while (isSpaceAt(data, position)) {
+                ++position;
+            }
+            start = position;
+        } else if ((character == ';' || isBreakAt(data, position)) && !quoted) {
+            break;
+        } else {
+            quoted = quoted != (character == '"');
+            ++position;
+        }
+    }
+    return {start, qMin(position, data.size())};
+}
+
 } // namespace
 
 bool isPlainIni(const QString &path)
 {
+    return isPlain(readRegularFile(path, maximumIniSize));
+}
+
+bool isWellFormedIni(const QString &path)
+{
     const RegularFile file = readRegularFile(path, maximumIniSize);
-    return file.state == RegularFile::State::NotOpened
-        || (file.state == RegularFile::State::Read && findPackedValue(file.content) < 0);
+    return isPlain(file) && findBrokenSection(file.content) < 0;
 }
 
 int findPackedValue(const QByteArray &data)
@@ -90,6 +150,22 @@ int findPackedValue(const QByteArray &data)
         if ((character == '=' || character == ',') && isPacked(data, position + 1)) {
             return position;
         }
+    }
+    return -1;
+}
+
+int findBrokenSection(const QByteArray &data)
+{
+    const QByteArray byteOrderMark = QByteArrayLiteral("\xef\xbb\xbf");
+    Line line = nextLine(data, data.startsWith(byteOrderMark) ? byteOrderMark.size() : 0);
+    while (line.start < line.end) {
+        if (data.at(line.start) == '[') {
+            const int end = data.indexOf(']', line.start);
+            if (end < 0 || end >= line.end) {
+                return line.start;
+            }
+        }
+        line = nextLine(data, line.end);
     }
     return -1;
 }

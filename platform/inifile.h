@@ -21,8 +21,20 @@ constexpr qint64 maximumIniSize = qint64(1024) * 1024;
 */
 bool isPlainIni(const QString &path);
 
+/*
+    Whether it is a plain settings file, or none, and each of its sections has a name that ends.
+
+    QSettings has a status for the latter, but only where it has read the file: what it remembers of
+    an unchanged one it takes for good, so that the same file would be an error and then none.
+*/
+bool isWellFormedIni(const QString &path);
+
 // Where in the text of a settings file the first value is that QSettings would unpack; negative if
 // there is none.
 int findPackedValue(const QByteArray &data);
+
+// Where in the text of a settings file the first section begins whose name does not end on its line;
+// negative if there is none.
+int findBrokenSection(const QByteArray &data);
 
 #endif

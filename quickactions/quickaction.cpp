@@ -161,7 +161,7 @@ bool QuickActionsModel::Action::operator==(const Action &other) const
 
 QVariantMap QuickActionsModel::Action::readActionConfig(const QString &path) const
 {
-    if (!isPlainIni(path)) {
+    if (!isWellFormedIni(path)) {
         qWarning("Unable to open action file");
         return {};
     }

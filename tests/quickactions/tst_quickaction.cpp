@@ -36,6 +36,8 @@ private Q_SLOTS:
     void priority();
     void unreadable_data();
     void unreadable();
+    void brokenFilesStayBroken_data();
+    void brokenFilesStayBroken();
     void packedValues_data();
     void packedValues();
     void atSigns_data();
@@ -323,6 +325,39 @@ void TestQuickAction::unreadable()
     QCOMPARE(Action(m_path, true).config(), QVariantMap());
     QCOMPARE(m_log->takeReport(), QString::fromLatin1(unreadableWarning));
     Files::remove(target);
+}
+
+void TestQuickAction::brokenFilesStayBroken_data()
+{
+    QTest::addColumn<QByteArray>("content");
+    QTest::addColumn<bool>("isBroken");
+    QTest::newRow("section at the end") << QByteArray("title=x\n[a") << true;
+    QTest::newRow("section in front") << QByteArray("[a\ntitle=x\n") << true;
+    QTest::newRow("section closed on the next line") << QByteArray("title=x\n[a\n]\n") << true;
+    QTest::newRow("section closed behind a comment") << QByteArray("title=x\n[a;]\n") << true;
+    QTest::newRow("section behind a mark") << QByteArray("\xef\xbb\xbf[a\ntitle=x\n") << true;
+    QTest::newRow("section behind a comment") << QByteArray("title=x\n;b\n \t[a\n") << true;
+    QTest::newRow("section behind a semicolon") << QByteArray("title=x;[a\n[b\n") << true;
+    QTest::newRow("closed section") << QByteArray("title=x\n[a]b\n") << false;
+    QTest::newRow("in a comment") << QByteArray("title=x\n;[a\n") << false;
+    QTest::newRow("in quotes") << QByteArray("b=\"\n[a\n\"\ntitle=x\n") << false;
+    QTest::newRow("behind a backslash") << QByteArray("b=\\\n[a\ntitle=x\n") << false;
+    QTest::newRow("behind a backslash and two") << QByteArray("b=\\\r\n[a\ntitle=x\n") << false;
+    QTest::newRow("section closed over two lines") << QByteArray("title=x\n[\"a\n\"]\n") << false;
+    QTest::newRow("backslash at the end") << QByteArray("title=x\nb=\\") << false;
+}
+
+// QSettings remembers what it has read of an unchanged file, but not that it was an error.
+void TestQuickAction::brokenFilesStayBroken()
+{
+    QFETCH(QByteArray, content);
+    QFETCH(bool, isBroken);
+    write(content);
+    for (int reading = 0; reading < 3; ++reading) {
+        QCOMPARE(Action(m_path, true).title(), isBroken ? QString() : QStringLiteral("x"));
+        QCOMPARE(m_log->takeReport(),
+                 isBroken ? QString::fromLatin1(unreadableWarning) : QString());
+    }
 }
 
 void TestQuickAction::packedValues_data()

@@ -256,8 +256,10 @@ QString TitlesView::joined(const QStringList &list) const
 */
 void TitlesView::update()
 {
+    const uint updates = ++m_updates;
     const QStringList values = collect();
-    if (m_values != values) {
+    // A property that was read may have led back here: what was read since is newer.
+    if (updates == m_updates && m_values != values) {
         m_values = values;
         Q_EMIT valueChanged();
     }

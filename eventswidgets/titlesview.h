@@ -67,6 +67,7 @@ private:
     QVariant m_match;
     QString m_role;
     QStringList m_values;
+    uint m_updates = 0; // begun so far
 };
 
 #endif

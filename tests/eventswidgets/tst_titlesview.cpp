@@ -33,6 +33,7 @@ private Q_SLOTS:
     void anotherModel();
     void destroyedModel();
     void modelDestroyedWhileItIsRead();
+    void roleChangedWhileItIsRead();
 
     // What is collected
     void collectsInRowOrder();
@@ -403,6 +404,22 @@ void TestTitlesView::modelDestroyedWhileItIsRead()
         QCOMPARE(view.model(), nullptr);
         QCOMPARE(view.values(), QStringList());
     }
+}
+
+// A property that is read may lead back to the view: what it shows is of its last role all the same.
+void TestTitlesView::roleChangedWhileItIsRead()
+{
+    Answering object;
+    ListModel model({named("a", {}, QVariant::fromValue<QObject *>(&object))});
+    TitlesView view;
+    view.setModel(&model);
+    QStringList shown;
+    connect(&view, &TitlesView::valueChanged, this, [&] { shown.append(view.value()); });
+    object.answer = [&view] { view.setRole(name); };
+    view.setRole(QStringLiteral("object.text"));
+    QCOMPARE(view.role(), name);
+    QCOMPARE(view.values(), list({"a"}));
+    QCOMPARE(shown, list({"a"}));
 }
 
 void TestTitlesView::collectsInRowOrder()

@@ -130,6 +130,24 @@ Line nextLine(const QByteArray &data, int position)
     return {start, qMin(position, data.size())};
 }
 
+// As in nearly all files, which need no closer look then: their lines end where these end or later.
+bool closesEveryBracket(const QByteArray &data)
+{
+    for (int start = data.indexOf('['); start >= 0; start = data.indexOf('[', start + 1)) {
+        int end = start;
+        while (end < data.size() && data.at(end) != ']') {
+            if (data.at(end) == ';' || isBreakAt(data, end)) {
+                return false;
+            }
+            ++end;
+        }
+        if (end == data.size()) {
+            return false;
+        }
+    }
+    return true;
+}
+
 } // namespace
 
 bool isPlainIni(const QString &path)
@@ -156,6 +174,9 @@ int findPackedValue(const QByteArray &data)
 
 int findBrokenSection(const QByteArray &data)
 {
+    if (closesEveryBracket(data)) {
+        return -1;
+    }
     const QByteArray byteOrderMark = QByteArrayLiteral("\xef\xbb\xbf");
     Line line = nextLine(data, data.startsWith(byteOrderMark) ? byteOrderMark.size() : 0);
     while (line.start < line.end) {

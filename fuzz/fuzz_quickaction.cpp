@@ -1,0 +1,103 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+// A definition file of a quick action: read, asked everything, and sent off.
+
+#include "fuzzing.h"
+#include "inifile.h"
+#include "quickaction.h"
+
+#include <QCoreApplication>
+#include <QDBusConnection>
+#include <QDBusMessage>
+#include <QFile>
+#include <QSettings>
+
+namespace {
+
+class Receiver : public QObject
+{
+    Q_OBJECT
+
+public Q_SLOTS:
+    void failed(const QDBusError &error, const QDBusMessage &call)
+    {
+        Q_UNUSED(call)
+        Fuzzing::require(error.isValid(), "a failure has a name");
+    }
+};
+
+// The bus hangs up on whoever sends it something malformed. It takes longer to answer than all the
+// rest: once many calls went well it is asked after some of them only.
+bool isStillOnTheBus()
+{
+    constexpr int many = 1000;
+    constexpr int some = 100;
+    static int calls = 0;
+    if (++calls > many && calls % some != 0) {
+        return QDBusConnection::sessionBus().isConnected();
+    }
+    const QDBusMessage ping = QDBusMessage::createMethodCall(
+        QStringLiteral("org.freedesktop.DBus"), QStringLiteral("/org/freedesktop/DBus"),
+        QStringLiteral("org.freedesktop.DBus.Peer"), QStringLiteral("Ping"));
+    return QDBusConnection::sessionBus().call(ping).type() == QDBusMessage::ReplyMessage;
+}
+
+// Whatever else a file may hold would have been unpacked from it.
+bool isPlain(const QVariant &value)
+{
+    switch (value.userType()) {
+    case QMetaType::QVariantList: {
+        const QVariantList list = value.toList();
+        return std::all_of(list.cbegin(), list.cend(), isPlain);
+    }
+    case QMetaType::UnknownType:
+    case QMetaType::QString:
+    case QMetaType::QStringList:
+    case QMetaType::QByteArray:
+    case QMetaType::QRect:
+    case QMetaType::QSize:
+    case QMetaType::QPoint:
+        return true;
+    default:
+        return false;
+    }
+}
+
+} // namespace
+
+extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t *data, std::size_t size)
+{
+    // Another name each time: QSettings keeps what it has read of a file a while.
+    static int number = 0;
+    const QByteArray name = QByteArray::number(++number) + ".conf";
+    const QByteArray content(reinterpret_cast<const char *>(data), int(size));
+    const QString path = Fuzzing::writeFile(name.constData(), content);
+    // What QSettings says of a file that it has not read before; it unpacks nothing yet.
+    const bool isWellFormed = findBrokenSection(content) < 0;
+    Fuzzing::require(QSettings(path, QSettings::IniFormat).status()
+                         == (isWellFormed ? QSettings::NoError : QSettings::FormatError),
+                     "broken files are known");
+    const QuickActionsModel::Action action(path, true);
+    const QuickActionsModel::Action again(path, true);
+    QFile::remove(path);
+
+    Fuzzing::require(action == again, "a file reads the same twice");
+    const QVariantMap config = action.config();
+    Fuzzing::require(std::all_of(config.cbegin(), config.cend(), isPlain), "values are plain");
+    action.title();
+    action.icon();
+    action.translationCatalog();
+    action.requiredPackage();
+    action.priority();
+
+    static Receiver receiver;
+    const bool sendable = !action.whyUnsendable().isValid();
+    const bool sent = action.trigger(&receiver, nullptr, SLOT(failed(QDBusError, QDBusMessage)));
+    Fuzzing::require(sendable || !sent, "what cannot be sent is not");
+    Fuzzing::require(!sent || isStillOnTheBus(), "the bus has taken the call");
+    QCoreApplication::sendPostedEvents();
+    return 0;
+}
+
+#include "fuzz_quickaction.moc"

@@ -1,0 +1,54 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+// usage: soak [--seed NUMBER] SECONDS
+
+#include "soak.h"
+
+#include <QCommandLineParser>
+#include <QCoreApplication>
+
+#include <cstdio>
+
+namespace {
+
+// The module complains of much that it meets here.
+void keepQuiet(QtMsgType type, const QMessageLogContext &context, const QString &text)
+{
+    Q_UNUSED(context)
+    if (type == QtFatalMsg) {
+        std::fprintf(stderr, "%s\n", qPrintable(text));
+    }
+}
+
+} // namespace
+
+int main(int argc, char *argv[])
+{
+    if (!qEnvironmentVariableIsSet("MARLO_THROW_AWAY_ROOT")) {
+        qFatal("this program runs only in the throw-away root of tests/sandbox");
+    }
+    const QCoreApplication application(argc, argv);
+    QCommandLineParser parser;
+    const QCommandLineOption seedOption(QStringLiteral("seed"), QStringLiteral("of all chance"),
+                                        QStringLiteral("number"));
+    parser.addOption(seedOption);
+    parser.addPositionalArgument(QStringLiteral("seconds"), QStringLiteral("how long to run"));
+    parser.process(application);
+
+    bool isNumber = false;
+    const int seconds = parser.positionalArguments().value(0).toInt(&isNumber);
+    const quint32 seed = parser.isSet(seedOption) ? parser.value(seedOption).toUInt()
+                                                  : QRandomGenerator::global()->generate();
+    if (!isNumber || seconds <= 0) {
+        parser.showHelp(2);
+    }
+    std::printf("seed: %u\n", seed);
+    std::fflush(stdout);
+    qInstallMessageHandler(keepQuiet);
+    if (!Soak(seed).run(seconds)) {
+        std::fprintf(stderr, "more is held at the end than at the start\n");
+        return 1;
+    }
+    return 0;
+}

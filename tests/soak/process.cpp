@@ -1,0 +1,30 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "process.h"
+
+#include <QByteArray>
+#include <QDir>
+#include <QFile>
+
+#include <malloc.h>
+#include <unistd.h>
+
+qint64 Process::residentMemory()
+{
+    malloc_trim(0);
+    QFile file(QStringLiteral("/proc/self/statm"));
+    if (!file.open(QIODevice::ReadOnly)) {
+        qFatal("cannot read %s", qPrintable(file.fileName()));
+    }
+    constexpr int residentField = 1;
+    return file.readAll().split(' ').value(residentField).toLongLong() * sysconf(_SC_PAGESIZE)
+        / 1024;
+}
+
+int Process::openFiles()
+{
+    const QDir folder(QStringLiteral("/proc/self/fd"));
+    // Not the one that the folder is read with.
+    return int(folder.entryList(QDir::AllEntries | QDir::System | QDir::NoDotAndDotDot).size()) - 1;
+}

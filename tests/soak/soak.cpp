@@ -1,0 +1,259 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "soak.h"
+
+#include "process.h"
+
+#include <QAbstractItemModel>
+#include <QCoreApplication>
+#include <QEvent>
+#include <QLocale>
+#include <QMetaProperty>
+#include <QQmlComponent>
+#include <QThreadPool>
+#include <QUrl>
+
+#include <algorithm>
+#include <array>
+#include <cstdio>
+#include <memory>
+
+namespace {
+
+const std::array<const char *, 10> types = {
+    "AndroidSupport",        "BluetoothInfo",       "EventsWidgetsModel", "KivInfo",
+    "LocationConfiguration", "MemoryCardFormatter", "ModemFeatures",      "QuickActionsModel",
+    "TermsOfUseManager",     "TitlesView",
+};
+const char *const singleton = "TextFileReader";
+const char *const module = "com.marlo.settings.system";
+
+constexpr std::size_t maximumObjects = 24;
+constexpr int eventTime = 10; // ms, for what a step has led to
+constexpr int measurements = 20;
+// What calls that nobody answers and programs that are ended take to be gone, at most.
+constexpr int settleTime = 2000; // ms
+constexpr int quietTime = 300; // ms
+
+#ifdef __SANITIZE_ADDRESS__
+constexpr bool measuresMemory = false; // what is freed is kept a while, to catch who uses it
+#else
+constexpr bool measuresMemory = true;
+#endif
+// Of the heap, whose pieces come to lie differently each time.
+constexpr qint64 memoryTolerance = 2048; // KiB
+// What Qt and GLib open when it is first needed, and keep.
+constexpr int fileTolerance = 2;
+
+void processEvents(int time)
+{
+    QElapsedTimer timer;
+    timer.start();
+    do {
+        QCoreApplication::processEvents(QEventLoop::AllEvents | QEventLoop::WaitForMoreEvents, 1);
+        QCoreApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
+    } while (timer.elapsed() < time);
+}
+
+} // namespace
+
+Soak::Soak(quint32 seed) : m_random(seed), m_world(&m_random)
+{
+    m_engine.addImportPath(QStringLiteral(QML_BUILD_DIR));
+}
+
+Soak::~Soak() = default;
+
+bool Soak::run(int seconds)
+{
+    m_time.start();
+    std::vector<Measurement> all;
+    std::puts("seconds  operations  memory/KiB  open files");
+    for (int i = 1; i <= measurements; ++i) {
+        while (m_time.elapsed() < qint64(seconds) * 1000 * i / measurements) {
+            step();
+        }
+        all.push_back(measure());
+    }
+    // What is made once and stays has been made by then.
+    const auto start = all.begin() + measurements / 4;
+    const auto least = [](auto from, auto to) {
+        return std::min_element(from, to,
+                                [](const Measurement &one, const Measurement &other) {
+                                    return one.memory < other.memory;
+                                })
+            ->memory;
+    };
+    const qint64 growth =
+        least(all.end() - measurements / 4, all.end()) - least(start, start + measurements / 4);
+    const int filesBefore = start->files;
+    const int filesAfter = all.back().files;
+    std::printf("growth: %lld KiB, %d open files\n", growth, filesAfter - filesBefore);
+    return filesAfter - filesBefore <= fileTolerance
+        && (!measuresMemory || growth <= memoryTolerance);
+}
+
+void Soak::step()
+{
+    ++m_steps;
+    const int choice = random(20);
+    if (choice < 5) {
+        m_world.changeSomething();
+    } else if (m_objects.empty() || choice == 5) {
+        makeObject();
+    } else if (choice == 6) {
+        changeLanguage();
+    } else {
+        const std::size_t index = std::size_t(random(int(m_objects.size())));
+        QObject *const object = m_objects[index];
+        if (choice == 7 && m_objects.size() > maximumObjects / 2) {
+            delete object;
+        } else if (object != nullptr && choice < 12) {
+            useProperty(object);
+        } else if (object != nullptr && choice < 17) {
+            callMethod(object);
+        } else if (object != nullptr) {
+            readModel(object);
+        }
+        if (m_objects[index] == nullptr) {
+            m_objects.erase(m_objects.begin() + int(index));
+        }
+    }
+    processEvents(random(4) == 0 ? eventTime : 0);
+}
+
+void Soak::makeObject()
+{
+    if (m_objects.size() >= maximumObjects) {
+        return;
+    }
+    QQmlComponent component(&m_engine);
+    component.setData(QByteArray("import ") + module + " 1.0\n"
+                          + types[std::size_t(random(int(types.size())))] + " { }",
+                      QUrl());
+    QObject *const object = component.create();
+    if (object == nullptr) {
+        qFatal("cannot make an object: %s", qPrintable(component.errorString()));
+    }
+    QQmlEngine::setObjectOwnership(object, QQmlEngine::CppOwnership);
+    m_objects.emplace_back(object);
+}
+
+void Soak::changeLanguage()
+{
+    static const std::array<const char *, 3> locales = {"fi_FI", "de_DE", "en_GB"};
+    QLocale::setDefault(QLocale(QLatin1String(locales[std::size_t(random(3))])));
+    QEvent change(QEvent::LanguageChange);
+    QCoreApplication::sendEvent(&m_engine, &change);
+}
+
+void Soak::useProperty(QObject *object)
+{
+    const QMetaObject *const meta = object->metaObject();
+    const QMetaProperty property = meta->property(random(meta->propertyCount()));
+    property.read(object);
+    if (property.isWritable()) {
+        property.write(object, argumentFor(property.userType()));
+    }
+}
+
+void Soak::callMethod(QObject *object)
+{
+    if (random(8) == 0) {
+        object = m_engine.singletonInstance<QObject *>(qmlTypeId(module, 1, 0, singleton));
+    }
+    const QMetaObject *const meta = object->metaObject();
+    std::vector<QMetaMethod> methods;
+    for (int i = 0; i < meta->methodCount(); ++i) {
+        const QMetaMethod method = meta->method(i);
+        const bool ofQt = QByteArray(method.enclosingMetaObject()->className()).startsWith('Q')
+            && qstrcmp(method.enclosingMetaObject()->className(), "QuickActionsModel") != 0;
+        if (!ofQt && method.methodType() != QMetaMethod::Signal
+            && method.access() == QMetaMethod::Public) {
+            methods.push_back(method);
+        }
+    }
+    if (methods.empty()) {
+        return;
+    }
+    const QMetaMethod method = methods[std::size_t(random(int(methods.size())))];
+    std::array<QVariant, 3> values;
+    std::array<QGenericArgument, 3> arguments;
+    for (int i = 0; i < method.parameterCount(); ++i) {
+        const int type = method.parameterType(i);
+        QVariant &value = values.at(std::size_t(i));
+        value = argumentFor(type);
+        value.convert(type);
+        arguments[std::size_t(i)] = {QMetaType::typeName(type), value.constData()};
+    }
+    method.invoke(object, Qt::DirectConnection, arguments[0], arguments[1], arguments[2]);
+}
+
+void Soak::readModel(QObject *object)
+{
+    const auto *const model = qobject_cast<QAbstractItemModel *>(object);
+    if (model == nullptr) {
+        useProperty(object);
+        return;
+    }
+    const QList<int> roles = model->roleNames().keys();
+    for (int row = 0; row < model->rowCount(); ++row) {
+        for (const int role : roles) {
+            model->index(row, 0).data(role);
+        }
+    }
+}
+
+QVariant Soak::argumentFor(int type)
+{
+    switch (type) {
+    case QMetaType::Bool:
+        return random(2) == 0;
+    case QMetaType::Int:
+        return random(8) - 2;
+    case QMetaType::QString:
+        return m_world.text();
+    case QMetaType::QStringList:
+        return QStringList{m_world.text(), m_world.text()};
+    case QMetaType::QUrl:
+        return QUrl::fromLocalFile(m_world.text());
+    case QMetaType::QObjectStar:
+        return QVariant::fromValue<QObject *>(
+            m_objects[std::size_t(random(int(m_objects.size())))]);
+    case QMetaType::QVariant:
+        return m_world.value();
+    default:
+        return random(3); // an enumeration
+    }
+}
+
+void Soak::settle()
+{
+    for (const QPointer<QObject> &object : m_objects) {
+        delete object;
+    }
+    m_objects.clear();
+    m_world.settle();
+    QThreadPool::globalInstance()->waitForDone();
+    m_engine.collectGarbage();
+    m_engine.clearComponentCache();
+    // Until nothing is closed any more.
+    QElapsedTimer timer;
+    timer.start();
+    int files = 0;
+    do {
+        files = Process::openFiles();
+        processEvents(quietTime);
+    } while (Process::openFiles() != files && timer.elapsed() < settleTime);
+}
+
+Soak::Measurement Soak::measure()
+{
+    settle();
+    const Measurement now = {Process::residentMemory(), Process::openFiles()};
+    std::printf("%7lld  %10lld  %10lld  %10d\n", m_time.elapsed() / 1000, m_steps, now.memory,
+                now.files);
+    std::fflush(stdout);
+    return now;
+}

@@ -1,0 +1,57 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#ifndef SOAK_H
+#define SOAK_H
+
+#include "world.h"
+
+#include <QElapsedTimer>
+#include <QMetaMethod>
+#include <QPointer>
+#include <QQmlEngine>
+#include <QRandomGenerator>
+
+#include <vector>
+
+/*
+    Makes objects of all the module's types, sets their properties and calls their methods, all of
+    it at random, while the world around them changes. From time to time everything goes, and the
+    process is to hold no more than it did before.
+*/
+class Soak
+{
+public:
+    explicit Soak(quint32 seed);
+    ~Soak();
+    Q_DISABLE_COPY_MOVE(Soak)
+
+    // Prints a line for each measurement; whether nothing has grown.
+    bool run(int seconds);
+
+private:
+    struct Measurement {
+        qint64 memory; // KiB
+        int files;
+    };
+
+    int random(int bound) { return int(m_random.bounded(bound)); }
+    void step();
+    void makeObject();
+    void changeLanguage();
+    void useProperty(QObject *object);
+    void callMethod(QObject *object);
+    void readModel(QObject *object);
+    QVariant argumentFor(int type);
+    void settle();
+    Measurement measure();
+
+    QRandomGenerator m_random;
+    World m_world;
+    QQmlEngine m_engine;
+    std::vector<QPointer<QObject>> m_objects;
+    QElapsedTimer m_time;
+    qint64 m_steps = 0;
+};
+
+#endif

@@ -1,0 +1,349 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "world.h"
+
+#include "files.h"
+#include "mgconfitem.h"
+
+#include <QDBusConnection>
+#include <QDBusMessage>
+#include <QDBusReply>
+#include <QFile>
+
+#include <array>
+#include <csignal>
+
+namespace {
+
+const QString actionsFolder = QStringLiteral("/usr/share/glimmera/quickactions");
+const QString widgetsFolder = QStringLiteral("/usr/share/glimmera/eventswidgets");
+const QString elsewhere = QStringLiteral("/usr/share/glimmera/elsewhere");
+const QString availableFile = QStringLiteral("/usr/share/glimmera/available");
+const QString termsFolder = QStringLiteral("/usr/share/marlo-settings/platform-eula");
+const QString mountTable = QStringLiteral("/etc/mtab");
+const QString device = QStringLiteral("/dev/soak-card1");
+const QString session = QStringLiteral("com.marlo.torch");
+
+const QStringList names = {QStringLiteral("a"), QStringLiteral("b"), QStringLiteral("c"),
+                           QStringLiteral("d"), QStringLiteral("e"), QStringLiteral("f")};
+const QStringList catalogs = {QStringLiteral("maps-fi"), QStringLiteral("maps-de"),
+                              QStringLiteral("maps_eng_en"), QStringLiteral("settings-system-fi"),
+                              QStringLiteral("settings-system_eng_en")};
+const QStringList keys = {
+    QStringLiteral("/desktop/glimmera-marlo-home/events_screen_actions"),
+    QStringLiteral("/desktop/glimmera-marlo-home/blocked_actions"),
+    QStringLiteral("/desktop/glimmera-marlo-home/events_screen_widgets"),
+    QStringLiteral("/settings/location/enabled"),
+    QStringLiteral("/settings/location/custom_settings"),
+};
+const QStringList texts = {
+    QStringLiteral("/usr/share/marlo-settings/platform-eula/tarnwick_termsofuse-fi.txt"),
+    QStringLiteral("/usr/share/marlo-settings/platform-eula/tarnwick_termsofuse-en_GB.txt"),
+    QStringLiteral("/var/lib/bluetooth/board-address"),
+    QStringLiteral("/usr/share/modem-software/features.ini"),
+    QStringLiteral("/usr/sbin/apkd"),
+    QStringLiteral("/usr/share/libherepositioning/agreements/here_consent_en_GB.txt"),
+};
+const QStringList words = {
+    QString(),
+    QStringLiteral("title"),
+    QStringLiteral("enabled"),
+    QStringLiteral("path"),
+    QStringLiteral("title.nothing"),
+    QStringLiteral("fi_FI.UTF-8"),
+    QStringLiteral("en_GB"),
+    QStringLiteral("vfat"),
+    QStringLiteral("ext4"),
+    QStringLiteral("soak-card1"),
+    device,
+    QStringLiteral("/dev/soak-card2"),
+    termsFolder,
+    actionsFolder,
+};
+const QStringList diskScenarios = {
+    QStringLiteral("done"),         QStringLiteral("slow"),       QStringLiteral("hung"),
+    QStringLiteral("gone"),         QStringLiteral("DeviceBusy"), QStringLiteral("AlreadyMounted"),
+    QStringLiteral("UnknownError"), QStringLiteral("Mount=done"), QStringLiteral("absent"),
+};
+const QStringList helperScenarios = {
+    QStringLiteral("done"),  QStringLiteral("done"), QStringLiteral("exit=1"),
+    QStringLiteral("crash"), QStringLiteral("slow"), QStringLiteral("held"),
+    QStringLiteral("noisy"),
+};
+const QStringList coverProperties = {QStringLiteral("KIVID"), QStringLiteral("Ready")};
+
+const std::array<QByteArray, 6> actions = {
+    "title=a-title\ntranslation-catalog=maps\npriority=%1\nremote-service=com.marlo.torch\n"
+    "remote-path=/\nremote-interface=com.marlo.torch\nremote-method=toggle\n"
+    "[remote-arguments]\nsize=1\n1\\argument=%1\n",
+    "title=%1\nicon=%1\nremote-service=com.marlo.absent\nremote-path=/\n"
+    "remote-interface=a.b\nremote-method=c\nrequires-package=p\n",
+    "[section without an end\n",
+    "title=@Variant(\\0\\0\\0)\n",
+    "",
+    "translation-catalog=missing\nremote-service=nonsense\n",
+};
+const std::array<QByteArray, 6> widgets = {
+    R"({"translation_catalog": "maps", "widgets": [{"path": "/w/%1", "title": "%1", "order": %1}]})",
+    R"({"widgets": [{"path": "/w/a"}, {"path": "/w/b", "default_enabled": true}, {"path": "/w/c",
+        "available_path": "/usr/share/glimmera/available"}, {"path": "/w/%1"}]})",
+    R"({"widgets": [)",
+    R"([%1])",
+    "",
+    R"({"widgets": [{}, 1, null, {"path": "/w/a", "order": -1}]})",
+};
+
+} // namespace
+
+World::World(QRandomGenerator *random) : m_random(random)
+{
+    // Before anybody may look for cards in the machine's own table.
+    Files::remove(mountTable);
+    Files::write(mountTable, {});
+    settle();
+}
+
+void World::changeSomething()
+{
+    switch (random(12)) {
+    case 0:
+    case 1:
+        return changeQuickActions();
+    case 2:
+    case 3:
+        return changeWidgets();
+    case 4:
+        return changeCatalogs();
+    case 5:
+        return changeTexts();
+    case 6:
+        return random(20) == 0 ? killSettingsService() : changeSettings();
+    case 7:
+        return changeCard();
+    case 8:
+        return random(5) == 0 ? changeDiskService() : changeCard();
+    case 9:
+        return changeHelper();
+    case 10:
+        return changeCover();
+    default:
+        return changeService();
+    }
+}
+
+void World::settle()
+{
+    m_diskService.reset();
+    m_cover.reset();
+    m_service.reset();
+    m_helper.reset();
+    m_helper = std::make_unique<CardHelper>();
+}
+
+QString World::text()
+{
+    switch (random(4)) {
+    case 0:
+        return actionsFolder + QLatin1Char('/') + anyOf(names) + QLatin1String(".conf");
+    case 1:
+        return QLatin1String("/w/") + anyOf(names);
+    case 2:
+        return anyOf(texts);
+    default:
+        return anyOf(words);
+    }
+}
+
+QVariant World::value()
+{
+    switch (random(7)) {
+    case 0:
+        return random(2) == 0;
+    case 1:
+        return random(8) - 2;
+    case 2:
+        return text();
+    case 3:
+        return QStringList{text(), text()};
+    case 4:
+        return QVariantList{random(3), text()};
+    case 5:
+        return QVariantMap{{anyOf(names), random(100)}};
+    default:
+        return {};
+    }
+}
+
+void World::changeQuickActions()
+{
+    if (random(20) == 0) {
+        changeFolder(actionsFolder);
+        return;
+    }
+    const QString path = actionsFolder + QLatin1Char('/') + anyOf(names) + QLatin1String(".conf");
+    if (often()) {
+        Files::write(path, QByteArray(anyOf(actions)).replace("%1", QByteArray::number(random(9))));
+    } else {
+        Files::remove(path);
+    }
+}
+
+void World::changeWidgets()
+{
+    if (random(20) == 0) {
+        changeFolder(widgetsFolder);
+        return;
+    }
+    const QString path = widgetsFolder + QLatin1Char('/') + anyOf(names) + QLatin1String(".json");
+    if (often()) {
+        Files::write(path, QByteArray(anyOf(widgets)).replace("%1", QByteArray::number(random(9))));
+    } else if (random(2) == 0) {
+        Files::remove(path);
+    } else if (QFile::exists(availableFile)) {
+        Files::remove(availableFile);
+    } else {
+        Files::write(availableFile, {});
+    }
+}
+
+void World::changeFolder(const QString &folder)
+{
+    Files::remove(folder);
+    switch (random(3)) {
+    case 0:
+        Files::makeFolder(folder);
+        break;
+    case 1:
+        Files::makeFolder(elsewhere);
+        Files::makeLink(elsewhere, folder);
+        break;
+    default:
+        break; // made with its next file
+    }
+}
+
+void World::changeCatalogs()
+{
+    if (random(2) == 0) {
+        Files::installCatalog(anyOf(catalogs));
+    } else {
+        Files::removeCatalog(anyOf(catalogs));
+    }
+}
+
+void World::changeTexts()
+{
+    const QString path = anyOf(texts);
+    if (often()) {
+        Files::write(path, QByteArray(random(2000), char('a' + random(26))) + "\nvariant=x\n");
+    } else {
+        Files::remove(path);
+    }
+}
+
+void World::changeSettings()
+{
+    const QString key = anyOf(keys);
+    MGConfItem(key).set(often() ? QVariant(QStringList{text(), text(), text()}) : value());
+}
+
+void World::killSettingsService()
+{
+    QDBusMessage question = QDBusMessage::createMethodCall(
+        QStringLiteral("org.freedesktop.DBus"), QStringLiteral("/org/freedesktop/DBus"),
+        QStringLiteral("org.freedesktop.DBus"), QStringLiteral("GetConnectionUnixProcessID"));
+    question.setArguments({QStringLiteral("ca.desrt.dconf")});
+    const QDBusReply<uint> reply = QDBusConnection::sessionBus().call(question);
+    if (!reply.isValid()) {
+        return;
+    }
+    QFile name(QStringLiteral("/proc/%1/comm").arg(reply.value()));
+    if (name.open(QIODevice::ReadOnly) && name.readAll() == "dconf-service\n") {
+        kill(pid_t(reply.value()), SIGKILL);
+    }
+}
+
+void World::changeCard()
+{
+    const QString card = QFile::decodeName(m_card.path("card"));
+    if (random(3) == 0) {
+        Files::write(
+            mountTable,
+            often() ? (device + QLatin1Char(' ') + card + QLatin1String(" vfat rw 0 0\n")).toUtf8()
+                    : QByteArray());
+    }
+    Files::write(card + QLatin1Char('/') + anyOf(names) + QLatin1Char('/') + anyOf(names)
+                     + QLatin1Char('/') + QString::number(random(50)),
+                 {});
+}
+
+void World::changeDiskService()
+{
+    m_diskService.reset(); // one owns the name at a time
+    m_diskService = std::make_unique<DiskServicePeer>(QStringList(anyOf(diskScenarios)));
+}
+
+void World::changeHelper()
+{
+    switch (random(8)) {
+    case 0:
+        m_helper->remove();
+        break;
+    case 1:
+        m_helper->installNotExecutable();
+        break;
+    case 2:
+    case 3:
+        m_helper->release();
+        break;
+    default:
+        m_helper->install(anyOf(helperScenarios), QByteArray(random(40), 'x'));
+    }
+}
+
+void World::changeCover()
+{
+    if (m_cover == nullptr) {
+        m_cover = std::make_unique<CoverDaemon>();
+    }
+    switch (random(8)) {
+    case 0:
+        m_cover.reset();
+        break;
+    case 1:
+        m_cover->answerWithError(anyOf(coverProperties));
+        break;
+    case 2:
+        m_cover->sendPropertiesChanged({text()});
+        break;
+    case 3:
+    case 4:
+        m_cover->sendChanges(
+            {{anyOf(coverProperties), random(2) == 0 ? QVariant(text()) : QVariant(random(3))}});
+        break;
+    default:
+        m_cover->answer(anyOf(coverProperties),
+                        {random(2) == 0 ? QVariant(text()) : QVariant(random(3))});
+    }
+}
+
+void World::changeService()
+{
+    if (m_service == nullptr) {
+        m_service = std::make_unique<RecordingService>(QDBusConnection::SessionBus, session);
+    }
+    switch (random(6)) {
+    case 0:
+        m_service.reset();
+        break;
+    case 1:
+        m_service->setAnswer(RecordingService::Answer::Error, QStringLiteral("com.marlo.Error"));
+        break;
+    case 2:
+        m_service->setAnswer(RecordingService::Answer::Nothing);
+        break;
+    default:
+        m_service->setAnswer(RecordingService::Answer::Reply);
+    }
+}

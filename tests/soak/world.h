@@ -1,0 +1,65 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#ifndef WORLD_H
+#define WORLD_H
+
+#include "cardhelper.h"
+#include "coverdaemon.h"
+#include "diskservicepeer.h"
+#include "recordingservice.h"
+#include "scratchfilesystem.h"
+
+#include <QRandomGenerator>
+#include <QStringList>
+#include <QVariant>
+
+#include <memory>
+
+/*
+    What the module finds in the root that it runs in: definition files, catalogs, texts, settings,
+    a memory card, and the services that it calls, all of which come, go and fail at random.
+*/
+class World
+{
+public:
+    explicit World(QRandomGenerator *random);
+
+    void changeSomething();
+    // Everything that may hold somebody up, and every peer with what it has kept, goes.
+    void settle();
+
+    // Values for properties and arguments, some of them of use.
+    QString text();
+    QVariant value();
+
+private:
+    template<typename List> auto anyOf(const List &list) -> decltype(list[0])
+    {
+        return list[random(int(std::size(list)))];
+    }
+    int random(int bound) { return int(m_random->bounded(bound)); }
+    bool often() { return random(4) != 0; }
+
+    void changeQuickActions();
+    void changeWidgets();
+    void changeFolder(const QString &folder);
+    void changeCatalogs();
+    void changeTexts();
+    void changeSettings();
+    void killSettingsService();
+    void changeCard();
+    void changeDiskService();
+    void changeHelper();
+    void changeCover();
+    void changeService();
+
+    QRandomGenerator *m_random;
+    ScratchFileSystem m_card;
+    std::unique_ptr<CardHelper> m_helper;
+    std::unique_ptr<DiskServicePeer> m_diskService;
+    std::unique_ptr<CoverDaemon> m_cover;
+    std::unique_ptr<RecordingService> m_service;
+};
+
+#endif

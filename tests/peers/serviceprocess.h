@@ -1,0 +1,38 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#ifndef SERVICEPROCESS_H
+#define SERVICEPROCESS_H
+
+#include <QProcess>
+#include <QString>
+#include <QStringList>
+
+/*
+    A D-Bus service in a process of its own, which a test may stop in the middle of anything. It
+    does what its scenario says (see busservice.cpp) for as long as this lives.
+*/
+class ServiceProcess
+{
+public:
+    // Ends the test program if there is no such scenario, or if the name is not to be had.
+    ServiceProcess(const char *bus, const QString &service, const char *scenario);
+    ~ServiceProcess();
+    Q_DISABLE_COPY_MOVE(ServiceProcess)
+
+    // It keeps its name and answers nothing until it goes on.
+    void stop();
+    void goOn();
+    void sendSignals(int count);
+
+    // The members that it was called for so far.
+    QStringList calls();
+
+private:
+    void signal(int number);
+
+    QProcess m_process;
+    QStringList m_calls;
+};
+
+#endif

@@ -1,0 +1,249 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "everytype.h"
+
+#include "files.h"
+
+#include <QAbstractListModel>
+#include <QDebug>
+#include <QFile>
+#include <QMetaMethod>
+#include <QMetaProperty>
+#include <QQmlComponent>
+#include <QUrl>
+
+#include <array>
+
+namespace {
+
+const QStringList typeNames = {
+    QStringLiteral("AndroidSupport"),
+    QStringLiteral("BluetoothInfo"),
+    QStringLiteral("EventsWidgetsModel"),
+    QStringLiteral("KivInfo"),
+    QStringLiteral("LocationConfiguration"),
+    QStringLiteral("MemoryCardFormatter"),
+    QStringLiteral("ModemFeatures"),
+    QStringLiteral("QuickActionsModel"),
+    QStringLiteral("TermsOfUseManager"),
+    QStringLiteral("TextFileReader"),
+    QStringLiteral("TitlesView"),
+};
+const QStringList typesOfFiles = {
+    QStringLiteral("AndroidSupport"), QStringLiteral("BluetoothInfo"),
+    QStringLiteral("ModemFeatures"),  QStringLiteral("TermsOfUseManager"),
+    QStringLiteral("TextFileReader"),
+};
+
+const QString textFile = QStringLiteral("/usr/share/marlo-settings/texts/text.txt");
+
+QString describe(const QVariant &value)
+{
+    QString description;
+    QDebug(&description).nospace() << value;
+    return description;
+}
+
+QByteArray document(const QString &name)
+{
+    QByteArray it = name.toUtf8();
+    if (name == QLatin1String("TextFileReader")) {
+        // A singleton.
+    } else if (name == QLatin1String("QuickActionsModel")) {
+        it += " { showPotential: true }";
+    } else if (name == QLatin1String("TitlesView")) {
+        it += " { model: EventsWidgetsModel { }\nrole: 'title' }";
+    } else if (name == QLatin1String("TermsOfUseManager")) {
+        it += " { vendorPath: '/usr/share/marlo-settings/vendor' }";
+    } else {
+        it += " { }";
+    }
+    return "import QtQml 2.15\nimport com.marlo.settings.system 1.0\n"
+           "QtObject { property QtObject it: "
+        + it + " }\n";
+}
+
+// A value of a type for whoever wants one.
+QVariant anyValue(int type, const QVariant &current)
+{
+    switch (type) {
+    case QMetaType::Bool:
+        return !current.toBool();
+    case QMetaType::Int:
+        return 0;
+    case QMetaType::QString:
+        return QStringLiteral("any");
+    case QMetaType::QStringList:
+        return QStringList{QStringLiteral("any"), QStringLiteral("other")};
+    case QMetaType::QUrl:
+        return QUrl(QStringLiteral("file:///nonexistent"));
+    default:
+        return {};
+    }
+}
+
+void call(QObject *object, const QMetaMethod &method)
+{
+    std::array<QVariant, 3> values;
+    std::array<QGenericArgument, 3> arguments;
+    if (method.parameterCount() > int(values.size())) {
+        qFatal("%s takes too many arguments", method.methodSignature().constData());
+    }
+    const QList<QByteArray> types = method.parameterTypes();
+    for (int i = 0; i < types.size(); ++i) {
+        auto &value = values.at(size_t(i));
+        value = anyValue(method.parameterType(i), {});
+        if (!value.isValid()) {
+            qFatal("no argument for %s", method.methodSignature().constData());
+        }
+        arguments.at(size_t(i)) = QGenericArgument(types.at(i).constData(), value.constData());
+    }
+    if (!method.invoke(object, arguments[0], arguments[1], arguments[2])) {
+        qFatal("cannot call %s", method.methodSignature().constData());
+    }
+}
+
+// From which on properties and methods are the type's own.
+const QMetaObject *base(const QObject *object)
+{
+    return qobject_cast<const QAbstractListModel *>(object) ? &QAbstractListModel::staticMetaObject
+                                                            : &QObject::staticMetaObject;
+}
+
+} // namespace
+
+void EveryType::installFiles()
+{
+    const auto write = [](const char *path, const QByteArray &content) {
+        Files::write(QString::fromLatin1(path), content);
+    };
+    write("/usr/share/glimmera/quickactions/lamp.conf",
+          "title=lamp\nremote-service=org.example.lamp\nremote-path=/lamp\n"
+          "remote-interface=org.example.Lamp\nremote-method=toggle\n");
+    write(
+        "/usr/share/glimmera/eventswidgets/weather.json",
+        R"({ "widgets": [ { "path": "weather", "title": "Weather", "default_enabled": true } ] })");
+    write("/var/lib/bluetooth/board-address", "00:1A:7D:DA:71:13\n");
+    write("/usr/sbin/apkd", "");
+    write("/usr/share/modem-software/features.ini", "variant=europe\n");
+    write("/usr/share/marlo-settings/platform-eula/tarnwick_termsofuse-en_GB.txt",
+          "Terms\nof the platform");
+    write("/usr/share/marlo-settings/vendor/full/en_GB.txt", "Terms\nof the vendor");
+    write("/usr/share/marlo-settings/vendor/summary/en_GB.txt", "Summary\nof the terms");
+    write("/usr/share/geoclue-provider-mlsdb/agreements/mls_consent_en_GB.txt", "mls");
+    write("/usr/share/libherepositioning/agreements/here_consent_en_GB.txt", "here");
+    Files::write(textFile, "text\n");
+    write("/usr/libexec/sdcardhelper", "#!/bin/sh\necho vfat\n");
+    if (!QFile::setPermissions(QStringLiteral("/usr/libexec/sdcardhelper"),
+                               QFile::ReadOwner | QFile::ExeOwner)) {
+        qFatal("cannot make the helper executable");
+    }
+}
+
+EveryType::EveryType()
+{
+    m_engine.addImportPath(QStringLiteral(QML_BUILD_DIR));
+    for (const QString &name : typeNames) {
+        QQmlComponent component(&m_engine);
+        component.setData(document(name), QUrl(QStringLiteral("test.qml")));
+        std::unique_ptr<QObject> created(component.create());
+        if (created == nullptr) {
+            qFatal("%s", qPrintable(component.errorString()));
+        }
+        m_objects.emplace(name, std::move(created));
+    }
+}
+
+QStringList EveryType::names()
+{
+    return typeNames;
+}
+
+QStringList EveryType::state() const
+{
+    QStringList lines;
+    for (const QString &name : typeNames) {
+        lines += state(name);
+    }
+    return lines;
+}
+
+QStringList EveryType::state(const QString &name) const
+{
+    QStringList lines;
+    QObject *it = object(name);
+    const auto note = [&lines, &name](const char *what, const QVariant &value) {
+        lines.append(QStringLiteral("%1.%2 %3").arg(name, QLatin1String(what), describe(value)));
+    };
+    const QMetaObject *meta = it->metaObject();
+    for (int i = base(it)->propertyCount(); i < meta->propertyCount(); ++i) {
+        const QMetaProperty property = meta->property(i);
+        // Where a model lies differs from run to run.
+        if (property.userType() != QMetaType::QObjectStar) {
+            note(property.name(), property.read(it));
+        }
+    }
+    if (const auto *model = qobject_cast<QAbstractListModel *>(it)) {
+        const auto roles = model->roleNames();
+        for (int row = 0; row < model->rowCount(); ++row) {
+            for (auto role = roles.cbegin(); role != roles.cend(); ++role) {
+                note(role->constData(), model->data(model->index(row), role.key()));
+            }
+        }
+    }
+    for (const char *terms : {"platformTermsOfUse", "vendorTermsOfUse", "vendorTermsSummary"}) {
+        QStringList text;
+        if (meta->indexOfMethod(QByteArray(terms) + "(QString)") >= 0) {
+            QMetaObject::invokeMethod(it, terms, Q_RETURN_ARG(QStringList, text),
+                                      Q_ARG(QString, QStringLiteral("en_GB")));
+            note(terms, text);
+        }
+    }
+    if (name == QLatin1String("TextFileReader")) {
+        QString text;
+        QMetaObject::invokeMethod(it, "readContent", Q_RETURN_ARG(QString, text),
+                                  Q_ARG(QString, textFile));
+        note("readContent", text);
+        const QUrl folder = QUrl::fromLocalFile(textFile).adjusted(QUrl::RemoveFilename);
+        QMetaObject::invokeMethod(it, "collate", Q_RETURN_ARG(QString, text), Q_ARG(QUrl, folder),
+                                  Q_ARG(QString, QString()), Q_ARG(QString, QString()));
+        note("collate", text);
+    }
+    return lines;
+}
+
+QStringList EveryType::stateOfFiles() const
+{
+    QStringList lines;
+    for (const QString &name : typesOfFiles) {
+        lines += state(name);
+    }
+    return lines;
+}
+
+void EveryType::useAll() const
+{
+    for (const QString &name : typeNames) {
+        QObject *it = object(name);
+        const QMetaObject *meta = it->metaObject();
+        for (int i = base(it)->propertyCount(); i < meta->propertyCount(); ++i) {
+            const QMetaProperty property = meta->property(i);
+            if (property.isWritable() && !property.isEnumType()) {
+                const QVariant value = anyValue(property.userType(), property.read(it));
+                if (value.isValid()) {
+                    property.write(it, value);
+                }
+            } else if (property.isWritable()) {
+                property.write(it, 1);
+            }
+        }
+        for (int i = base(it)->methodCount(); i < meta->methodCount(); ++i) {
+            const QMetaMethod method = meta->method(i);
+            if (method.access() == QMetaMethod::Public
+                && method.methodType() != QMetaMethod::Signal) {
+                call(it, method);
+            }
+        }
+    }
+}

@@ -1,0 +1,49 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#ifndef EVERYTYPE_H
+#define EVERYTYPE_H
+
+#include <QObject>
+#include <QQmlEngine>
+#include <QString>
+#include <QStringList>
+
+#include <map>
+#include <memory>
+
+/*
+    One object of each type of the built module, as a page has it, in a root that has everything
+    that the types read.
+*/
+class EveryType
+{
+public:
+    // Definition files, texts and all else that is read, in their places.
+    static void installFiles();
+
+    // Ends the test program if the module or a type of it is not to be had.
+    EveryType();
+    Q_DISABLE_COPY_MOVE(EveryType)
+
+    static QStringList names();
+    QObject *object(const QString &name) const
+    {
+        return m_objects.at(name)->property("it").value<QObject *>();
+    }
+
+    // What all of them tell: each property, each row, and the texts that methods give, a line each.
+    QStringList state() const;
+    // That of one, and of those that live of files alone.
+    QStringList state(const QString &name) const;
+    QStringList stateOfFiles() const;
+
+    // Writes every property and calls every method, of each.
+    void useAll() const;
+
+private:
+    QQmlEngine m_engine;
+    std::map<QString, std::unique_ptr<QObject>> m_objects;
+};
+
+#endif

@@ -1,0 +1,207 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+// Every type in a process whose buses are not there, or die.
+
+#include "everytype.h"
+#include "messagelog.h"
+#include "ownprocess.h"
+#include "serviceprocess.h"
+
+#include <QDBusConnection>
+#include <QProcess>
+#include <QtTest>
+
+class TestBusFaults : public QObject
+{
+    Q_OBJECT
+
+private Q_SLOTS:
+    void initTestCase();
+
+    void everyTypeWithoutABus();
+    void everyTypeOutlivesItsBuses();
+    void busesDieBeforeServicesReply();
+    void everyTypeGoesWhenItsBusesHaveDied();
+};
+
+namespace {
+
+constexpr int patience = 60000; // ms, of a machine that is very busy
+
+#define TRY(condition) QTRY_VERIFY_WITH_TIMEOUT(condition, patience)
+#define TRY_COMPARE(actual, expected) QTRY_COMPARE_WITH_TIMEOUT(actual, expected, patience)
+
+const char *const addresses[] = {"DBUS_SESSION_BUS_ADDRESS", "DBUS_SYSTEM_BUS_ADDRESS"};
+
+// Both buses of this process, which must not have met any so far.
+class Buses
+{
+public:
+    Buses()
+    {
+        for (size_t i = 0; i < 2; ++i) {
+            m_daemons[i].start(
+                QStringLiteral("dbus-daemon"),
+                {QStringLiteral("--session"), QStringLiteral("--nofork"),
+                 QStringLiteral("--print-address"),
+                 QStringLiteral("--address=unix:dir=") + qEnvironmentVariable("XDG_RUNTIME_DIR")});
+            if (!m_daemons[i].waitForReadyRead()) {
+                qFatal("no bus daemon");
+            }
+            qputenv(addresses[i], m_daemons[i].readLine().trimmed());
+        }
+    }
+    ~Buses() { kill(); }
+    Q_DISABLE_COPY_MOVE(Buses)
+
+    void kill()
+    {
+        for (QProcess &daemon : m_daemons) {
+            daemon.kill();
+            daemon.waitForFinished();
+        }
+    }
+    static bool areGone()
+    {
+        return !QDBusConnection::sessionBus().isConnected()
+            && !QDBusConnection::systemBus().isConnected();
+    }
+
+private:
+    QProcess m_daemons[2];
+};
+
+// What is there without any service.
+const QStringList someFacts = {
+    QStringLiteral("AndroidSupport.dataDirectoriesVisible QVariant(bool, true)"),
+    QStringLiteral("BluetoothInfo.adapterAddress QVariant(QString, \"00:1a:7d:da:71:13\")"),
+    QStringLiteral("EventsWidgetsModel.path QVariant(QString, \"weather\")"),
+    QStringLiteral("KivInfo.kivReady QVariant(bool, false)"),
+    QStringLiteral("LocationConfiguration.gpsEnabled QVariant(bool, false)"),
+    QStringLiteral("LocationConfiguration.hereAgreementText QVariant(QString, \"here\")"),
+    QStringLiteral("MemoryCardFormatter.busy QVariant(bool, false)"),
+    QStringLiteral("ModemFeatures.variant QVariant(QString, \"europe\")"),
+    QStringLiteral("QuickActionsModel.count QVariant(int, 1)"),
+    QStringLiteral("TermsOfUseManager.vendorTermsSummary QVariant(QStringList, "
+                   "(\"Summary\", \"of the terms\"))"),
+    QStringLiteral("TextFileReader.collate QVariant(QString, \"text\")"),
+    QStringLiteral("TitlesView.value QVariant(QString, \"Weather\")"),
+};
+
+QStringList missing(const QStringList &facts, const QStringList &state)
+{
+    QStringList lines;
+    for (const QString &fact : facts) {
+        if (!state.contains(fact)) {
+            lines.append(fact);
+        }
+    }
+    return lines;
+}
+
+// The formatter is done with whatever useAll() asked of it.
+bool isIdle(const EveryType &types)
+{
+    return !types.object(QStringLiteral("MemoryCardFormatter"))->property("busy").toBool();
+}
+
+} // namespace
+
+void TestBusFaults::initTestCase()
+{
+    EveryType::installFiles();
+    QLocale::setDefault(QLocale(QStringLiteral("en_GB")));
+}
+
+void TestBusFaults::everyTypeWithoutABus()
+{
+    IN_A_PROCESS_OF_ITS_OWN()
+    for (const char *address : addresses) {
+        qputenv(address, "unix:path=/nonexistent");
+    }
+    const EveryType types;
+    QTest::qWait(100);
+    QCOMPARE(missing(someFacts, types.state()), QStringList());
+    const QStringList before = types.stateOfFiles();
+    types.useAll();
+    TRY(isIdle(types));
+    QVERIFY(Buses::areGone());
+    // The path of the vendor's terms was set to another.
+    QCOMPARE(missing(before, types.stateOfFiles())
+                 .filter(QRegularExpression(QStringLiteral("^(?!TermsOfUseManager)"))),
+             QStringList());
+}
+
+void TestBusFaults::everyTypeOutlivesItsBuses()
+{
+    IN_A_PROCESS_OF_ITS_OWN()
+    Buses buses;
+    const EveryType types;
+    QTest::qWait(100);
+    QVERIFY(!Buses::areGone());
+    const QStringList before = types.state();
+    QCOMPARE(missing(someFacts, before), QStringList());
+
+    buses.kill();
+    TRY(Buses::areGone());
+    QTest::qWait(100);
+    QCOMPARE(types.state(), before);
+    types.useAll();
+    TRY(isIdle(types));
+
+    // And so does one that comes only now.
+    const EveryType others;
+    QTest::qWait(100);
+    QCOMPARE(missing(someFacts, others.state()), QStringList());
+}
+
+void TestBusFaults::busesDieBeforeServicesReply()
+{
+    IN_A_PROCESS_OF_ITS_OWN()
+    Buses buses;
+    ServiceProcess cover("system", QStringLiteral("com.marlo.kivd"), "replies");
+    ServiceProcess disk("system", QStringLiteral("org.freedesktop.UDisks2"), "replies");
+    ServiceProcess lamp("session", QStringLiteral("org.example.lamp"), "replies");
+    for (ServiceProcess *service : {&cover, &disk, &lamp}) {
+        service->stop();
+    }
+    const EveryType types;
+    QObject *formatter = types.object(QStringLiteral("MemoryCardFormatter"));
+    formatter->setProperty("deviceName", QStringLiteral("card"));
+    QMetaObject::invokeMethod(formatter, "mount");
+    QMetaObject::invokeMethod(types.object(QStringLiteral("QuickActionsModel")), "triggerAction",
+                              Q_ARG(int, 0));
+    QTest::qWait(100);
+    const QStringList before = types.state(QStringLiteral("KivInfo"));
+
+    const MessageLog log;
+    buses.kill();
+    TRY_COMPARE(formatter->property("status").toInt(), 6); // Error
+    QVERIFY(Buses::areGone());
+    QCOMPARE(types.state(QStringLiteral("KivInfo")), before);
+    for (ServiceProcess *service : {&cover, &disk, &lamp}) {
+        service->goOn();
+    }
+    QMetaObject::invokeMethod(formatter, "mount");
+    TRY_COMPARE(formatter->property("status").toInt(), 6);
+}
+
+void TestBusFaults::everyTypeGoesWhenItsBusesHaveDied()
+{
+    IN_A_PROCESS_OF_ITS_OWN()
+    Buses buses;
+    auto types = std::make_unique<EveryType>();
+    auto others = std::make_unique<EveryType>();
+    types->useAll();
+    buses.kill();
+    // Before anybody has noticed, and after.
+    types.reset();
+    TRY(Buses::areGone());
+    others.reset();
+    QTest::qWait(100);
+}
+
+QTEST_GUILESS_MAIN(TestBusFaults)
+
+#include "tst_busfaults.moc"

@@ -1,0 +1,609 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+// The types that keep something in dconf, while its service hangs, dies or is not there, and with
+// whatever else may be in their keys.
+
+#include "eventswidgetsmodel.h"
+#include "files.h"
+#include "locationconfiguration.h"
+#include "messagelog.h"
+#include "mgconfitem.h"
+#include "quickactionsmodel.h"
+
+#include <QAbstractItemModelTester>
+#include <QDBusConnection>
+#include <QDBusConnectionInterface>
+#include <QDBusMessage>
+#include <QProcess>
+#include <QtTest>
+
+#include <algorithm>
+#include <csignal>
+#include <functional>
+#include <memory>
+
+#include <glib.h>
+
+Q_DECLARE_METATYPE(std::function<std::unique_ptr<class User>()>)
+
+// A type with one choice that it keeps in dconf.
+class User
+{
+public:
+    virtual ~User() = default;
+    virtual void choose(bool on) = 0;
+    virtual bool isOn() const = 0;
+    // The key, and what the dconf tool tells of either choice.
+    virtual QString key() const = 0;
+    virtual QByteArray stored(bool on) const = 0;
+};
+
+class TestDconfFaults : public QObject
+{
+    Q_OBJECT
+
+private Q_SLOTS:
+    void init();
+    void cleanup();
+
+    void serviceHangs_data();
+    void serviceHangs();
+    void goesWhileTheServiceHangs_data();
+    void goesWhileTheServiceHangs();
+    void serviceDiesInTheMiddleOfAWrite_data();
+    void serviceDiesInTheMiddleOfAWrite();
+    void serviceIsAbsent_data();
+    void serviceIsAbsent();
+    void everyOtherType_data();
+    void everyOtherType();
+    void hugeLists_data();
+    void hugeLists();
+    void hugeDatabase_data();
+    void hugeDatabase();
+    void tenThousandNotifications_data();
+    void tenThousandNotifications();
+
+private:
+    void addUsers();
+
+    std::unique_ptr<MessageLog> m_log;
+};
+
+namespace {
+
+constexpr int patience = 60000; // ms, of a machine that is very busy
+constexpr int many = 100000; // entries
+// The service itself takes half a minute for fifty times as many.
+constexpr int manyKeys = 2000;
+constexpr int flood = 10000; // signals
+
+#define TRY(condition) QTRY_VERIFY_WITH_TIMEOUT(condition, patience)
+#define TRY_COMPARE(actual, expected) QTRY_COMPARE_WITH_TIMEOUT(actual, expected, patience)
+
+const QString serviceName = QStringLiteral("ca.desrt.dconf");
+const QString serviceFile = QStringLiteral("/usr/share/dbus-1/services/ca.desrt.dconf.service");
+
+const QString actionsKey = QStringLiteral("/desktop/glimmera-marlo-home/events_screen_actions");
+const QString blockedKey = QStringLiteral("/desktop/glimmera-marlo-home/blocked_actions");
+const QString userKey = QStringLiteral("/desktop/glimmera-marlo-home/events_screen_actions_user");
+const QString widgetsKey = QStringLiteral("/desktop/glimmera-marlo-home/events_screen_widgets");
+const QString gpsKey = QStringLiteral("/settings/location/gps_enabled");
+const QString customKey = QStringLiteral("/settings/location/custom_settings");
+const QStringList allKeys = {
+    actionsKey,
+    blockedKey,
+    userKey,
+    widgetsKey,
+    gpsKey,
+    QStringLiteral("/settings/location/mls_enabled"),
+    QStringLiteral("/settings/location/mls_online_state"),
+    QStringLiteral("/settings/location/here_state"),
+    QStringLiteral("/settings/location/custom_settings_enabled"),
+    customKey,
+};
+
+const QString actionPath = QStringLiteral("/usr/share/glimmera/quickactions/lamp.conf");
+const QString widgetPath = QStringLiteral("weather");
+
+class ActionsUser : public User
+{
+public:
+    ActionsUser()
+    {
+        m_model.setShowPotential(true);
+        m_model.componentComplete();
+    }
+    void choose(bool on) override
+    {
+        if (on) {
+            m_model.enableAction(actionPath);
+        } else {
+            m_model.disableAction(actionPath);
+        }
+    }
+    bool isOn() const override
+    {
+        return m_model.data(m_model.index(0), QuickActionsModel::EnabledRole).toBool();
+    }
+    QString key() const override { return actionsKey; }
+    QByteArray stored(bool on) const override
+    {
+        return on ? "['" + actionPath.toUtf8() + "']" : "@as []";
+    }
+
+private:
+    QuickActionsModel m_model;
+};
+
+class WidgetsUser : public User
+{
+public:
+    WidgetsUser() { m_model.componentComplete(); }
+    void choose(bool on) override
+    {
+        if (on) {
+            m_model.enableWidget(widgetPath);
+        } else {
+            m_model.disableWidget(widgetPath);
+        }
+    }
+    bool isOn() const override
+    {
+        return m_model.data(m_model.index(0), EventsWidgetsModel::EnabledRole).toBool();
+    }
+    QString key() const override { return widgetsKey; }
+    QByteArray stored(bool on) const override
+    {
+        return on ? "['" + widgetPath.toUtf8() + "']" : "@as []";
+    }
+
+private:
+    EventsWidgetsModel m_model;
+    QAbstractItemModelTester m_tester = {&m_model};
+};
+
+class LocationUser : public User
+{
+public:
+    void choose(bool on) override { m_location.setGpsEnabled(on); }
+    bool isOn() const override { return m_location.gpsEnabled(); }
+    QString key() const override { return gpsKey; }
+    QByteArray stored(bool on) const override { return on ? "true" : "false"; }
+
+private:
+    LocationConfiguration m_location;
+};
+
+using MakeUser = std::function<std::unique_ptr<User>()>;
+
+template<typename Type> MakeUser maker()
+{
+    return [] { return std::make_unique<Type>(); };
+}
+
+// What the dconf tool prints, given the input.
+QByteArray dconf(const QStringList &arguments, const QByteArray &input = {})
+{
+    QProcess tool;
+    tool.setProcessChannelMode(QProcess::ForwardedErrorChannel);
+    tool.start(QStringLiteral("dconf"), arguments);
+    tool.write(input);
+    tool.closeWriteChannel();
+    if (!tool.waitForFinished(patience) || tool.exitCode() != 0) {
+        qWarning("dconf failed");
+    }
+    return tool.readAllStandardOutput().trimmed();
+}
+
+QByteArray read(const QString &key)
+{
+    return dconf({QStringLiteral("read"), key});
+}
+
+// Several keys in one write, of whatever size.
+void load(const QStringList &keys, const QByteArray &value)
+{
+    QByteArray file;
+    for (const QString &key : keys) {
+        const int folder = key.lastIndexOf(QLatin1Char('/'));
+        file += '[' + key.mid(1, folder - 1).toUtf8() + "]\n" + key.mid(folder + 1).toUtf8() + '='
+            + value + '\n';
+    }
+    dconf({QStringLiteral("load"), QStringLiteral("/")}, file);
+}
+
+void reset()
+{
+    for (const char *folder : {"/desktop/", "/settings/", "/other/"}) {
+        dconf({QStringLiteral("reset"), QStringLiteral("-f"), QString::fromLatin1(folder)});
+    }
+}
+
+// Follows a key as the types do, to tell when they have been told of a change.
+class Change
+{
+public:
+    explicit Change(const QString &key) : m_item(key), m_spy(&m_item, &MGConfItem::valueChanged) { }
+
+    bool hasCome()
+    {
+        const bool come = !m_spy.isEmpty() || m_spy.wait(patience);
+        m_spy.clear();
+        // And has been to everybody.
+        QCoreApplication::processEvents();
+        return come;
+    }
+
+private:
+    MGConfItem m_item;
+    QSignalSpy m_spy;
+};
+
+// Of dconf-service; 0 if it does not run.
+pid_t servicePid()
+{
+    const QDBusReply<uint> pid = QDBusConnection::sessionBus().interface()->servicePid(serviceName);
+    return static_cast<pid_t>(pid.value());
+}
+
+// Starts it if it does not run.
+void signalService(int number)
+{
+    if (servicePid() == 0) {
+        load({QStringLiteral("/other/start")}, "1");
+    }
+    const pid_t pid = servicePid();
+    if (pid <= 0 || kill(pid, number) != 0) {
+        qFatal("cannot signal the service of dconf");
+    }
+}
+
+// Whether the service has read what was sent to it does not matter: stopped is stopped.
+class StoppedService
+{
+public:
+    StoppedService() { signalService(SIGSTOP); }
+    ~StoppedService() { goOn(); }
+    Q_DISABLE_COPY_MOVE(StoppedService)
+    void goOn()
+    {
+        if (m_stopped) {
+            m_stopped = false;
+            signalService(SIGCONT);
+        }
+    }
+    void kill()
+    {
+        m_stopped = false;
+        signalService(SIGKILL);
+    }
+
+private:
+    bool m_stopped = true;
+};
+
+void reloadBusConfiguration()
+{
+    const QDBusMessage call = QDBusMessage::createMethodCall(
+        QStringLiteral("org.freedesktop.DBus"), QStringLiteral("/org/freedesktop/DBus"),
+        QStringLiteral("org.freedesktop.DBus"), QStringLiteral("ReloadConfig"));
+    QCOMPARE(QDBusConnection::sessionBus().call(call).type(), QDBusMessage::ReplyMessage);
+}
+
+bool isOfNoInterest(const QString &message)
+{
+    return message.contains(QLatin1String("Using cross-namespace EXTERNAL authentication"));
+}
+
+// That a write has failed, GLib's log alone is told.
+GLogWriterOutput intoMessageLog(GLogLevelFlags level, const GLogField *fields, gsize count, void *)
+{
+    for (gsize i = 0; i < count && level <= G_LOG_LEVEL_WARNING; ++i) {
+        if (qstrcmp(fields[i].key, "MESSAGE") == 0) {
+            qWarning("%s", static_cast<const char *>(fields[i].value));
+        }
+    }
+    return G_LOG_WRITER_HANDLED;
+}
+
+} // namespace
+
+void TestDconfFaults::init()
+{
+    Files::write(actionPath, "title=lamp\n");
+    Files::write(QStringLiteral("/usr/share/glimmera/eventswidgets/weather.json"),
+                 R"({ "widgets": [ { "path": "weather" } ] })");
+    reset();
+    // Without a list the first choice would enable all widgets.
+    load({widgetsKey}, "@as []");
+    m_log = std::make_unique<MessageLog>();
+}
+
+void TestDconfFaults::cleanup()
+{
+    // Which GLib says of each connection from a user namespace.
+    QStringList report = m_log->takeReport().split(QLatin1Char('\n'), Qt::SkipEmptyParts);
+    report.erase(std::remove_if(report.begin(), report.end(), isOfNoInterest), report.end());
+    QCOMPARE(report, QStringList());
+    m_log.reset();
+}
+
+void TestDconfFaults::addUsers()
+{
+    QTest::addColumn<MakeUser>("make");
+    QTest::newRow("QuickActionsModel") << maker<ActionsUser>();
+    QTest::newRow("EventsWidgetsModel") << maker<WidgetsUser>();
+    QTest::newRow("LocationConfiguration") << maker<LocationUser>();
+}
+
+void TestDconfFaults::serviceHangs_data()
+{
+    addUsers();
+}
+
+void TestDconfFaults::serviceHangs()
+{
+    QFETCH(MakeUser, make);
+    const auto user = make();
+    user->choose(true);
+    TRY_COMPARE(read(user->key()), user->stored(true));
+
+    StoppedService service;
+    // The process itself sees what it has chosen; others once the service goes on.
+    user->choose(false);
+    TRY(!user->isOn());
+    user->choose(true);
+    user->choose(false);
+    TRY(!user->isOn());
+    QVERIFY(!make()->isOn());
+    QCOMPARE(read(user->key()), user->stored(true));
+    service.goOn();
+    TRY_COMPARE(read(user->key()), user->stored(false));
+    QVERIFY(!user->isOn());
+}
+
+void TestDconfFaults::goesWhileTheServiceHangs_data()
+{
+    addUsers();
+}
+
+void TestDconfFaults::goesWhileTheServiceHangs()
+{
+    QFETCH(MakeUser, make);
+    auto user = make();
+    const QString key = user->key();
+    const QByteArray stored = user->stored(true);
+    StoppedService service;
+    user->choose(true);
+    user.reset();
+    delete make().release();
+    service.goOn();
+    TRY_COMPARE(read(key), stored);
+    QVERIFY(make()->isOn());
+}
+
+void TestDconfFaults::serviceDiesInTheMiddleOfAWrite_data()
+{
+    addUsers();
+}
+
+void TestDconfFaults::serviceDiesInTheMiddleOfAWrite()
+{
+    QFETCH(MakeUser, make);
+    const auto user = make();
+    user->choose(true);
+    TRY_COMPARE(read(user->key()), user->stored(true));
+
+    StoppedService service;
+    user->choose(false);
+    TRY(!user->isOn());
+    // The call has left.
+    QTest::qWait(100);
+    service.kill();
+    // What was not stored is taken back, once all that is under way has failed or been stored.
+    QByteArray log;
+    TRY((log += m_log->takeReport().toUtf8()).contains("failed to commit changes to dconf"));
+    TRY_COMPARE(user->isOn(), true);
+    QCOMPARE(read(user->key()), user->stored(true));
+
+    // The bus starts the service anew.
+    user->choose(false);
+    TRY_COMPARE(read(user->key()), user->stored(false));
+    QVERIFY(!user->isOn());
+}
+
+void TestDconfFaults::serviceIsAbsent_data()
+{
+    addUsers();
+}
+
+void TestDconfFaults::serviceIsAbsent()
+{
+    QFETCH(MakeUser, make);
+    const auto user = make();
+    const QString away = serviceFile + QStringLiteral(".away");
+    QVERIFY(QFile::rename(serviceFile, away));
+    reloadBusConfiguration();
+    const pid_t pid = servicePid();
+    if (pid > 0) {
+        QCOMPARE(kill(pid, SIGKILL), 0);
+    }
+    TRY_COMPARE(servicePid(), 0);
+
+    user->choose(true);
+    QByteArray log;
+    TRY((log += m_log->takeReport().toUtf8()).contains("failed to commit changes to dconf"));
+    TRY_COMPARE(user->isOn(), false);
+    QVERIFY(!make()->isOn());
+
+    QVERIFY(QFile::rename(away, serviceFile));
+    reloadBusConfiguration();
+    user->choose(true);
+    TRY_COMPARE(read(user->key()), user->stored(true));
+    QVERIFY(user->isOn());
+}
+
+void TestDconfFaults::everyOtherType_data()
+{
+    addUsers();
+}
+
+void TestDconfFaults::everyOtherType()
+{
+    QFETCH(MakeUser, make);
+    const char *const values[] = {
+        "true",
+        "byte 0x7f",
+        "int16 -7",
+        "uint16 7",
+        "-7",
+        "uint32 4294967295",
+        "int64 -9223372036854775808",
+        "uint64 18446744073709551615",
+        "handle 7",
+        "1.5",
+        "'text'",
+        "''",
+        "objectpath '/text'",
+        "signature 'as'",
+        "<7>",
+        "<<<<'text'>>>>",
+        "@mi 7",
+        "@mi nothing",
+        "@mmi just nothing",
+        "('text', 7)",
+        "()",
+        "@as []",
+        "['text', '']",
+        "[1, 2]",
+        "[<1>, <'text'>]",
+        "[['text'], ['other']]",
+        "b'bytes'",
+        "[true, false]",
+        "{'key': <true>}",
+        "{'gps/enabled': <'text'>, 'mls/enabled': <{'a': <1>}>}",
+        "{7: 'text'}",
+        "@a{sv} {}",
+        "[{'key': <('a', @mi 7)>}]",
+        "{'key', <7>}",
+    };
+    const auto user = make();
+    Change change(user->key());
+    for (const char *value : values) {
+        load(allKeys, value);
+        QVERIFY2(change.hasCome(), value);
+        // Both what follows and what comes only now.
+        user->isOn();
+        make()->isOn();
+        LocationConfiguration().restoreCustomSettings();
+    }
+    reset();
+    QVERIFY(change.hasCome());
+    load({widgetsKey}, "@as []");
+    QVERIFY(user->key() != widgetsKey || change.hasCome());
+    user->choose(true);
+    TRY_COMPARE(read(user->key()), user->stored(true));
+    QVERIFY(user->isOn());
+}
+
+void TestDconfFaults::hugeLists_data()
+{
+    addUsers();
+}
+
+void TestDconfFaults::hugeLists()
+{
+    QFETCH(MakeUser, make);
+    QByteArray list;
+    QByteArray map;
+    for (int i = 0; i < many; ++i) {
+        const QByteArray number = QByteArray::number(i);
+        list += (i == 0 ? "['/a/" : ", '/a/") + number + '\'';
+        map += (i == 0 ? "{'entry" : ", 'entry") + number + "': <true>";
+    }
+    map += ", 'gps/enabled': <true>}";
+    const auto user = make();
+    Change listChange(actionsKey);
+    Change mapChange(customKey);
+    load({actionsKey, widgetsKey, blockedKey}, list + ']');
+    load({customKey}, map);
+    QVERIFY(listChange.hasCome());
+    QVERIFY(mapChange.hasCome());
+    QCOMPARE(MGConfItem(actionsKey).value().toStringList().size(), many);
+    QCOMPARE(MGConfItem(customKey).value().toMap().size(), many + 1);
+    QVERIFY(!user->isOn());
+    QVERIFY(!make()->isOn());
+    user->choose(true);
+    TRY(user->isOn());
+    QVERIFY(make()->isOn());
+    if (user->key() == gpsKey) {
+        user->choose(false);
+        LocationConfiguration().restoreCustomSettings();
+        TRY(user->isOn());
+    } else {
+        TRY_COMPARE(read(user->key()).count('\''), 2 * (many + 1));
+    }
+    user->choose(false);
+    TRY(!user->isOn());
+}
+
+void TestDconfFaults::hugeDatabase_data()
+{
+    addUsers();
+}
+
+void TestDconfFaults::hugeDatabase()
+{
+    QFETCH(MakeUser, make);
+    const auto user = make();
+    QByteArray file = "[other]\n";
+    for (int i = 0; i < manyKeys; ++i) {
+        file += "key" + QByteArray::number(i) + "=1\n";
+    }
+    // One change of many keys is told to everybody.
+    dconf({QStringLiteral("load"), QStringLiteral("/")}, file);
+    TRY_COMPARE(MGConfItem(QStringLiteral("/other/key%1").arg(manyKeys - 1)).value(), QVariant(1));
+    QVERIFY(!user->isOn());
+    user->choose(true);
+    TRY_COMPARE(read(user->key()), user->stored(true));
+    QVERIFY(user->isOn());
+    QVERIFY(make()->isOn());
+}
+
+void TestDconfFaults::tenThousandNotifications_data()
+{
+    addUsers();
+}
+
+void TestDconfFaults::tenThousandNotifications()
+{
+    QFETCH(MakeUser, make);
+    const auto user = make();
+    user->choose(true);
+    TRY_COMPARE(read(user->key()), user->stored(true));
+    // As the service tells of a change, but there is none.
+    QDBusConnection bus =
+        QDBusConnection::connectToBus(QDBusConnection::SessionBus, QStringLiteral("notifications"));
+    for (int i = 0; i < flood; ++i) {
+        QDBusMessage notify = QDBusMessage::createSignal(
+            QStringLiteral("/ca/desrt/dconf/Writer/user"), QStringLiteral("ca.desrt.dconf.Writer"),
+            QStringLiteral("Notify"));
+        notify.setArguments({user->key(), QStringList{QString()}, QStringLiteral("tag")});
+        QVERIFY(bus.send(notify));
+    }
+    // And then there is.
+    load({user->key()}, user->stored(false));
+    TRY(!user->isOn());
+    QDBusConnection::disconnectFromBus(QStringLiteral("notifications"));
+}
+
+int main(int argc, char *argv[])
+{
+    g_log_set_writer_func(intoMessageLog, nullptr, nullptr);
+    const QCoreApplication application(argc, argv);
+    TestDconfFaults test;
+    return QTest::qExec(&test, argc, argv);
+}
+
+#include "tst_dconffaults.moc"

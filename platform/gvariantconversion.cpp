@@ -256,5 +256,17 @@ QVariant toQVariant(GVariant *value)
 {
     // Data in its normal form is what it says it is: its strings are Unicode, its nesting is
     // bounded, and no part of it overlaps another to unfold into more than was stored.
-    return g_variant_is_normal_form(value) ? convert(value) : QVariant();
+    const GVariantPtr normal = trusted(value);
+    return normal ? convert(normal.get()) : QVariant();
+}
+
+GVariantPtr trusted(GVariant *value)
+{
+    if (!g_variant_is_normal_form(value)) {
+        return nullptr;
+    }
+    GBytes *const data = g_variant_get_data_as_bytes(value);
+    GVariantPtr same = sink(g_variant_new_from_bytes(g_variant_get_type(value), data, TRUE));
+    g_bytes_unref(data);
+    return same;
 }

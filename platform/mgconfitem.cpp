@@ -45,6 +45,13 @@ DConfClient *client()
     return client;
 }
 
+// Null if nothing is stored, or nothing that can be read.
+GVariantPtr read(const QByteArray &path)
+{
+    const GVariantPtr stored(dconf_client_read(client(), path.constData()));
+    return stored ? trusted(stored.get()) : nullptr;
+}
+
 void meetBus(GObject *, GAsyncResult *result, gpointer)
 {
     GError *error = nullptr;
@@ -98,7 +105,7 @@ MGConfItem::MGConfItem(const QString &key, QObject *parent) : QObject(parent), m
     };
     m_handler = g_signal_connect(client(), "changed", G_CALLBACK(+changed), this);
     dconf_client_watch_fast(client(), m_path.constData());
-    m_lastValue.reset(dconf_client_read(client(), m_path.constData()));
+    m_lastValue = read(m_path);
 }
 
 MGConfItem::~MGConfItem()
@@ -119,7 +126,7 @@ QVariant MGConfItem::value() const
     if (m_path.isEmpty()) {
         return {};
     }
-    const GVariantPtr value(dconf_client_read(client(), m_path.constData()));
+    const GVariantPtr value = read(m_path);
     return value ? toQVariant(value.get()) : QVariant();
 }
 
@@ -168,7 +175,7 @@ bool MGConfItem::isAmong(const char *prefix, const char *const *changes) const
 
 void MGConfItem::update()
 {
-    GVariantPtr value(dconf_client_read(client(), m_path.constData()));
+    GVariantPtr value = read(m_path);
     const bool same = value && m_lastValue ? g_variant_equal(value.get(), m_lastValue.get())
                                            : !value && !m_lastValue;
     if (same) {

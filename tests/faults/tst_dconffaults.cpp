@@ -534,18 +534,19 @@ void TestDconfFaults::hugeLists()
     QCOMPARE(MGConfItem(customKey).value().toMap().size(), many + 1);
     QVERIFY(!user->isOn());
     QVERIFY(!make()->isOn());
-    user->choose(true);
-    TRY(user->isOn());
-    QVERIFY(make()->isOn());
-    if (user->key() == gpsKey) {
-        user->choose(false);
-        LocationConfiguration().restoreCustomSettings();
-        TRY(user->isOn());
-    } else {
-        TRY_COMPARE(read(user->key()).count('\''), 2 * (many + 1));
-    }
-    user->choose(false);
+    QCOMPARE(LocationConfiguration().gpsEnabled(), false);
+    LocationConfiguration().restoreCustomSettings();
+    QCOMPARE(LocationConfiguration().gpsEnabled(), true);
+
+    // A choice that replaces such a list takes as long as dconf takes to compare it with the new
+    // one, which is not ours to shorten; so once it is gone.
+    reset();
+    QVERIFY(listChange.hasCome());
+    load({widgetsKey}, "@as []");
+    MGConfItem(gpsKey).set(false);
     TRY(!user->isOn());
+    user->choose(true);
+    TRY_COMPARE(read(user->key()), user->stored(true));
 }
 
 void TestDconfFaults::hugeDatabase_data()

@@ -85,6 +85,7 @@ private Q_SLOTS:
     void damagedDataIsInvalid_data();
     void damagedDataIsInvalid();
     void deepDataIsInvalid();
+    void longListsAreReadOnce();
     void anyBytesAreSafe_data();
     void anyBytesAreSafe();
 
@@ -383,6 +384,34 @@ void TestGVariantConversion::deepDataIsInvalid()
     }
     const GVariantPtr value = untrusted("v", data);
     QCOMPARE(describe(toQVariant(value.get())), describe(QVariant()));
+}
+
+// If each element were looked for from the start, this would take an hour.
+void TestGVariantConversion::longListsAreReadOnce()
+{
+    constexpr int count = 1000000;
+    GVariantBuilder texts;
+    GVariantBuilder numbers;
+    g_variant_builder_init(&texts, G_VARIANT_TYPE("as"));
+    g_variant_builder_init(&numbers, G_VARIANT_TYPE("av"));
+    for (int i = 0; i < count; ++i) {
+        g_variant_builder_add(&texts, "s", QByteArray::number(i).constData());
+        g_variant_builder_add(&numbers, "v", g_variant_new_int32(i));
+    }
+    const auto stored = [](const char *type, GVariant *value) {
+        const GVariantPtr owned(g_variant_ref_sink(value));
+        return untrusted(type,
+                         QByteArray(static_cast<const char *>(g_variant_get_data(value)),
+                                    int(g_variant_get_size(value))));
+    };
+    const GVariantPtr text = stored("as", g_variant_builder_end(&texts));
+    const GVariantPtr number = stored("av", g_variant_builder_end(&numbers));
+    const QStringList readTexts = toQVariant(text.get()).toStringList();
+    QCOMPARE(readTexts.size(), count);
+    QCOMPARE(readTexts.last(), QString::number(count - 1));
+    const QVariantList readNumbers = toQVariant(number.get()).toList();
+    QCOMPARE(readNumbers.size(), count);
+    QCOMPARE(readNumbers.last(), QVariant(count - 1));
 }
 
 void TestGVariantConversion::anyBytesAreSafe_data()

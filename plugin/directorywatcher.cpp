@@ -28,8 +28,10 @@ QString nearestExisting(QString path)
 DirectoryWatcher::DirectoryWatcher(QString directory, QObject *parent)
     : QObject(parent), m_directory(std::move(directory)), m_watcher(this)
 {
+    // Not at once: where there is no inotify, QFileSystemWatcher tells of a change in the midst of
+    // going through its watches, and watchedChanged() takes them off.
     connect(&m_watcher, &QFileSystemWatcher::directoryChanged, this,
-            &DirectoryWatcher::watchedChanged);
+            &DirectoryWatcher::watchedChanged, Qt::QueuedConnection);
     watch();
 }
 

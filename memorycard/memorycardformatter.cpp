@@ -4,6 +4,7 @@
 #include "memorycardformatter.h"
 
 #include "diskservice.h"
+#include "filedescriptor.h"
 #include "fileremover.h"
 
 #include <QDBusConnection>
@@ -13,6 +14,8 @@
 #include <QFileInfo>
 #include <QLoggingCategory>
 #include <QThreadPool>
+
+#include <sys/eventfd.h>
 
 namespace {
 
@@ -43,6 +46,12 @@ QDBusPendingCall send(const QDBusMessage &call)
             {QDBusError::Disconnected, QStringLiteral("Not connected to the system bus")});
     }
     return bus.asyncCall(call, requestTimeout);
+}
+
+// A thread that finds no descriptor left for its event loop ends the process.
+bool canStartThread()
+{
+    return FileDescriptor(eventfd(0, EFD_CLOEXEC)).isOpen();
 }
 
 } // namespace
@@ -590,6 +599,11 @@ void MemoryCardFormatter::mountOperationFinished(Status command, const QString &
 
 void MemoryCardFormatter::startRemovingFiles(const Command &command)
 {
+    if (!canStartThread()) {
+        // Nor could the mount table be read.
+        fileRemoverError();
+        return;
+    }
     m_running = RemovingFiles;
     // The pool deletes it.
     auto *remover = new FileRemover(command.devicePath);

@@ -10,7 +10,6 @@
 #include <QFile>
 #include <QMetaMethod>
 #include <QMetaProperty>
-#include <QQmlComponent>
 #include <QUrl>
 
 #include <array>
@@ -56,6 +55,8 @@ QByteArray document(const QString &name)
         it += " { model: EventsWidgetsModel { }\nrole: 'title' }";
     } else if (name == QLatin1String("TermsOfUseManager")) {
         it += " { vendorPath: '/usr/share/marlo-settings/vendor' }";
+    } else if (name == QLatin1String("MemoryCardFormatter")) {
+        it += " { deviceName: 'card' }";
     } else {
         it += " { }";
     }
@@ -71,7 +72,7 @@ QVariant anyValue(int type, const QVariant &current)
     case QMetaType::Bool:
         return !current.toBool();
     case QMetaType::Int:
-        return 0;
+        return current.isValid() ? 1 : 0;
     case QMetaType::QString:
         return QStringLiteral("any");
     case QMetaType::QStringList:
@@ -145,19 +146,31 @@ EveryType::EveryType()
 {
     m_engine.addImportPath(QStringLiteral(QML_BUILD_DIR));
     for (const QString &name : typeNames) {
-        QQmlComponent component(&m_engine);
-        component.setData(document(name), QUrl(QStringLiteral("test.qml")));
-        std::unique_ptr<QObject> created(component.create());
-        if (created == nullptr) {
-            qFatal("%s", qPrintable(component.errorString()));
-        }
-        m_objects.emplace(name, std::move(created));
+        auto component = std::make_unique<QQmlComponent>(&m_engine);
+        component->setData(document(name), QUrl(QStringLiteral("test.qml")));
+        m_components.emplace(name, std::move(component));
+        m_objects.emplace(name, make(name));
     }
 }
 
 QStringList EveryType::names()
 {
     return typeNames;
+}
+
+QObject *EveryType::object(const QString &name) const
+{
+    return m_objects.at(name)->property("it").value<QObject *>();
+}
+
+std::unique_ptr<QObject> EveryType::make(const QString &name) const
+{
+    QQmlComponent &component = *m_components.at(name);
+    std::unique_ptr<QObject> created(component.create());
+    if (created == nullptr) {
+        qFatal("%s", qPrintable(component.errorString()));
+    }
+    return created;
 }
 
 QStringList EveryType::state() const
@@ -222,28 +235,44 @@ QStringList EveryType::stateOfFiles() const
     return lines;
 }
 
+std::vector<EveryType::Use> EveryType::uses(const QString &name) const
+{
+    std::vector<Use> uses;
+    QObject *it = object(name);
+    const QMetaObject *meta = it->metaObject();
+    const int firstProperty = base(it)->propertyCount();
+    const auto named = [&name](const char *member) {
+        return name + QLatin1Char('.') + QLatin1String(member);
+    };
+    for (int i = firstProperty; i < meta->propertyCount(); ++i) {
+        const QMetaProperty property = meta->property(i);
+        uses.push_back({named(property.name()), [property, it] { property.read(it); }});
+    }
+    // Before the writing, after which the rows are others and the formatter is busy.
+    for (int i = base(it)->methodCount(); i < meta->methodCount(); ++i) {
+        const QMetaMethod method = meta->method(i);
+        if (method.access() == QMetaMethod::Public && method.methodType() != QMetaMethod::Signal) {
+            uses.push_back({named(method.methodSignature()), [method, it] { call(it, method); }});
+        }
+    }
+    for (int i = firstProperty; i < meta->propertyCount(); ++i) {
+        const QMetaProperty property = meta->property(i);
+        const int type = property.isEnumType() ? int(QMetaType::Int) : property.userType();
+        if (property.isWritable() && anyValue(type, {}).isValid()) {
+            uses.push_back({named(property.name()) + QStringLiteral(" ="), [property, type, it] {
+                                property.write(it, anyValue(type, property.read(it)));
+                            }});
+        }
+    }
+    return uses;
+}
+
 void EveryType::useAll() const
 {
     for (const QString &name : typeNames) {
-        QObject *it = object(name);
-        const QMetaObject *meta = it->metaObject();
-        for (int i = base(it)->propertyCount(); i < meta->propertyCount(); ++i) {
-            const QMetaProperty property = meta->property(i);
-            if (property.isWritable() && !property.isEnumType()) {
-                const QVariant value = anyValue(property.userType(), property.read(it));
-                if (value.isValid()) {
-                    property.write(it, value);
-                }
-            } else if (property.isWritable()) {
-                property.write(it, 1);
-            }
-        }
-        for (int i = base(it)->methodCount(); i < meta->methodCount(); ++i) {
-            const QMetaMethod method = meta->method(i);
-            if (method.access() == QMetaMethod::Public
-                && method.methodType() != QMetaMethod::Signal) {
-                call(it, method);
-            }
+        const std::vector<Use> all = uses(name);
+        for (const Use &use : all) {
+            use.run();
         }
     }
 }

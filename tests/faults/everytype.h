@@ -5,12 +5,15 @@
 #define EVERYTYPE_H
 
 #include <QObject>
+#include <QQmlComponent>
 #include <QQmlEngine>
 #include <QString>
 #include <QStringList>
 
+#include <functional>
 #include <map>
 #include <memory>
+#include <vector>
 
 /*
     One object of each type of the built module, as a page has it, in a root that has everything
@@ -27,10 +30,9 @@ public:
     Q_DISABLE_COPY_MOVE(EveryType)
 
     static QStringList names();
-    QObject *object(const QString &name) const
-    {
-        return m_objects.at(name)->property("it").value<QObject *>();
-    }
+    QObject *object(const QString &name) const;
+    // Another object of the type; the singleton again.
+    std::unique_ptr<QObject> make(const QString &name) const;
 
     // What all of them tell: each property, each row, and the texts that methods give, a line each.
     QStringList state() const;
@@ -38,11 +40,17 @@ public:
     QStringList state(const QString &name) const;
     QStringList stateOfFiles() const;
 
-    // Writes every property and calls every method, of each.
+    // The reading and writing of each property of a type's own, and the call of each method.
+    struct Use {
+        QString name;
+        std::function<void()> run;
+    };
+    std::vector<Use> uses(const QString &name) const;
     void useAll() const;
 
 private:
     QQmlEngine m_engine;
+    std::map<QString, std::unique_ptr<QQmlComponent>> m_components;
     std::map<QString, std::unique_ptr<QObject>> m_objects;
 };
 

@@ -1,0 +1,56 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#ifndef FAILINGCARD_H
+#define FAILINGCARD_H
+
+#include <QString>
+#include <QTemporaryDir>
+
+#include <atomic>
+#include <thread>
+#include <vector>
+
+/*
+    A mounted card that fails as it is told: a file system of one folder of files, which a thread of
+    this process plays to the kernel.
+*/
+class FailingCard
+{
+public:
+    // What becomes of the removal of a file, and with Unreadable of the listing.
+    enum class Fault { None, Unreadable, Stuck, Waits, Gone };
+
+    // Ends the program if there is no right to mount; see whyNot().
+    FailingCard(const QString &device, int files);
+    ~FailingCard();
+    Q_DISABLE_COPY_MOVE(FailingCard)
+
+    // Why there can be none here; empty if there can.
+    static QString whyNot();
+
+    void setFault(Fault fault) { m_fault = fault; }
+    int filesLeft() const { return m_left; }
+    // Removals that wait for another fault to be set, or for none.
+    int waiting() const { return m_waiting; }
+
+    QString directory() const { return m_dir.path(); }
+    // Takes the card out of its directory while whoever is in it goes on.
+    void detach();
+
+private:
+    void serve();
+    bool answer(const char *request);
+
+    QTemporaryDir m_dir;
+    const int m_count;
+    int m_fuse = -1;
+    std::atomic<Fault> m_fault = Fault::None;
+    std::atomic<int> m_left;
+    std::atomic<int> m_waiting = 0;
+    std::atomic<bool> m_ends = false;
+    std::vector<bool> m_removed;
+    std::thread m_thread;
+};
+
+#endif

@@ -1,0 +1,203 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+// What the kernel gives out sparingly, used up; and folders that are not what they were.
+
+#include "everytype.h"
+#include "files.h"
+#include "messagelog.h"
+#include "ownprocess.h"
+#include "usedupdescriptors.h"
+
+#include <QAbstractListModel>
+#include <QDir>
+#include <QtTest>
+
+class TestLimits : public QObject
+{
+    Q_OBJECT
+
+private Q_SLOTS:
+    void initTestCase();
+    void init();
+
+    void noInotifyInstances();
+    void noInotifyWatches();
+    void noDescriptors();
+    void folderReplacedByALink_data();
+    void folderReplacedByALink();
+};
+
+namespace {
+
+constexpr int patience = 60000; // ms, of a machine that is very busy
+
+#define TRY_COMPARE(actual, expected) QTRY_COMPARE_WITH_TIMEOUT(actual, expected, patience)
+
+const QString actions = QStringLiteral("QuickActionsModel");
+const QString widgets = QStringLiteral("EventsWidgetsModel");
+const QString actionsFolder = QStringLiteral("/usr/share/glimmera/quickactions");
+const QString widgetsFolder = QStringLiteral("/usr/share/glimmera/eventswidgets");
+
+// A user namespace has limits of its own, below those of the machine.
+const QStringList ownNamespace = {QStringLiteral("unshare"), QStringLiteral("--user"),
+                                  QStringLiteral("--map-root-user")};
+
+void setLimit(const char *name, int value)
+{
+    QFile file(QStringLiteral("/proc/sys/user/") + QLatin1String(name));
+    QVERIFY2(file.open(QIODevice::WriteOnly | QIODevice::Unbuffered), name);
+    const QByteArray text = QByteArray::number(value);
+    QCOMPARE(file.write(text), qint64(text.size()));
+}
+
+void addFiles(const QString &name)
+{
+    Files::write(actionsFolder + QLatin1Char('/') + name + QStringLiteral(".conf"), "title=a\n");
+    Files::write(widgetsFolder + QLatin1Char('/') + name + QStringLiteral(".json"),
+                 R"({ "widgets": [ { "path": ")" + name.toUtf8() + R"(" } ] })");
+}
+
+int rows(QObject *model)
+{
+    return qobject_cast<QAbstractListModel *>(model)->rowCount();
+}
+
+QObject *it(const std::unique_ptr<QObject> &created)
+{
+    return created->property("it").value<QObject *>();
+}
+
+} // namespace
+
+void TestLimits::initTestCase()
+{
+    QLocale::setDefault(QLocale(QStringLiteral("en_GB")));
+}
+
+void TestLimits::init()
+{
+    Files::remove(actionsFolder);
+    Files::remove(widgetsFolder);
+    EveryType::installFiles();
+}
+
+void TestLimits::noInotifyInstances()
+{
+    IN_A_PROCESS_OF_ITS_OWN(ownNamespace)
+    setLimit("max_inotify_instances", 0);
+    const EveryType types;
+    QCOMPARE(rows(types.object(actions)), 1);
+    QCOMPARE(rows(types.object(widgets)), 1);
+    // The folders are looked at once in a while instead; files that are written in place are not.
+    for (int i = 0; i < 3; ++i) {
+        addFiles(QStringLiteral("new%1").arg(i));
+        TRY_COMPARE(rows(types.object(actions)), 2 + i);
+        TRY_COMPARE(rows(types.object(widgets)), 2 + i);
+    }
+
+    setLimit("max_inotify_instances", 128);
+    const auto model = types.make(widgets);
+    Files::write(widgetsFolder + QStringLiteral("/new0.json"), "{ \"widgets\": [ ] }");
+    TRY_COMPARE(rows(it(model)), 3);
+}
+
+void TestLimits::noInotifyWatches()
+{
+    IN_A_PROCESS_OF_ITS_OWN(ownNamespace)
+    setLimit("max_inotify_watches", 0);
+    const EveryType types;
+    QCOMPARE(rows(types.object(actions)), 1);
+    QCOMPARE(rows(types.object(widgets)), 1);
+    addFiles(QStringLiteral("new"));
+    // Not followed, but read by whoever comes, and when asked.
+    QTest::qWait(100);
+    QCOMPARE(rows(types.object(actions)), 1);
+    QCOMPARE(rows(it(types.make(actions))), 2);
+    QCOMPARE(rows(it(types.make(widgets))), 2);
+    QMetaObject::invokeMethod(types.object(widgets), "directoryChanged");
+    QCOMPARE(rows(types.object(widgets)), 2);
+
+    setLimit("max_inotify_watches", 1000);
+    const auto actionsModel = types.make(actions);
+    const auto widgetsModel = types.make(widgets);
+    addFiles(QStringLiteral("newer"));
+    TRY_COMPARE(rows(it(actionsModel)), 3);
+    TRY_COMPARE(rows(it(widgetsModel)), 3);
+}
+
+void TestLimits::noDescriptors()
+{
+    IN_A_PROCESS_OF_ITS_OWN()
+    const EveryType types;
+    QTest::qWait(100);
+    const QStringList before = types.state();
+    std::vector<std::unique_ptr<QObject>> made;
+    {
+        const MessageLog log;
+        const UsedUpDescriptors none;
+        QCOMPARE(types.state().filter(QStringLiteral("TextFileReader.readContent")),
+                 QStringList{QStringLiteral("TextFileReader.readContent QVariant(QString, \"\")")});
+        for (const QString &name : EveryType::names()) {
+            made.push_back(types.make(name));
+        }
+        // The formatter's helper cannot be started.
+        QObject *formatter = types.object(QStringLiteral("MemoryCardFormatter"));
+        formatter->setProperty("devicePath", QStringLiteral("/dev/card"));
+        TRY_COMPARE(formatter->property("status").toInt(), 6); // Error
+        QTest::qWait(100);
+    }
+    // The address is read once, and the formatter has got a path.
+    const QStringList after = types.state();
+    for (const QString &line : before) {
+        QVERIFY2(after.contains(line) || line.startsWith(QLatin1String("MemoryCardFormatter")),
+                 qPrintable(line));
+    }
+    QObject *formatter = types.object(QStringLiteral("MemoryCardFormatter"));
+    formatter->setProperty("devicePath", QStringLiteral("/dev/other"));
+    TRY_COMPARE(formatter->property("filesystemType").toString(), QStringLiteral("vfat"));
+    addFiles(QStringLiteral("new"));
+    TRY_COMPARE(rows(types.object(actions)), 2);
+    TRY_COMPARE(rows(types.object(widgets)), 2);
+}
+
+void TestLimits::folderReplacedByALink_data()
+{
+    QTest::addColumn<QString>("type");
+    QTest::addColumn<QString>("folder");
+    QTest::newRow("QuickActionsModel") << actions << actionsFolder;
+    QTest::newRow("EventsWidgetsModel") << widgets << widgetsFolder;
+}
+
+void TestLimits::folderReplacedByALink()
+{
+    QFETCH(QString, type);
+    QFETCH(QString, folder);
+    const EveryType types;
+    QObject *model = types.object(type);
+    QCOMPARE(rows(model), 1);
+    addFiles(QStringLiteral("other"));
+    TRY_COMPARE(rows(model), 2);
+
+    const QString target = folder + QStringLiteral("-target");
+    Files::remove(target);
+    QVERIFY(QDir().rename(folder, target));
+    TRY_COMPARE(rows(model), 0);
+    Files::makeLink(target, folder);
+    TRY_COMPARE(rows(model), 2);
+    // What happens behind the link is followed.
+    addFiles(QStringLiteral("third"));
+    TRY_COMPARE(rows(model), 3);
+    // The link goes, and with it nothing of what it led to.
+    Files::remove(folder);
+    TRY_COMPARE(rows(model), 0);
+    QCOMPARE(QDir(target).count(), uint(3 + 2)); // with . and ..
+    Files::makeFolder(folder);
+    addFiles(QStringLiteral("last"));
+    TRY_COMPARE(rows(model), 1);
+    Files::remove(target);
+}
+
+QTEST_GUILESS_MAIN(TestLimits)
+
+#include "tst_limits.moc"

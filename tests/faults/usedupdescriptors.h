@@ -1,0 +1,54 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#ifndef USEDUPDESCRIPTORS_H
+#define USEDUPDESCRIPTORS_H
+
+#include <QtGlobal>
+
+#include <vector>
+
+#include <fcntl.h>
+#include <sys/resource.h>
+#include <unistd.h>
+
+/*
+    Every descriptor that this process may have, but for those that it has.
+*/
+class UsedUpDescriptors
+{
+public:
+    UsedUpDescriptors()
+    {
+        // A process may wait for no more than it may have: of what it has, all stay usable.
+        const rlimit few = {256, m_limit.rlim_max};
+        if (setrlimit(RLIMIT_NOFILE, &few) != 0) {
+            qFatal("cannot limit the descriptors");
+        }
+        int descriptor = -1;
+        while ((descriptor = open("/dev/null", O_RDONLY | O_CLOEXEC)) >= 0) {
+            m_descriptors.push_back(descriptor);
+        }
+    }
+    ~UsedUpDescriptors()
+    {
+        for (const int descriptor : m_descriptors) {
+            close(descriptor);
+        }
+        setrlimit(RLIMIT_NOFILE, &m_limit);
+    }
+    Q_DISABLE_COPY_MOVE(UsedUpDescriptors)
+
+private:
+    static rlimit limit()
+    {
+        rlimit limit = {};
+        getrlimit(RLIMIT_NOFILE, &limit);
+        return limit;
+    }
+
+    const rlimit m_limit = limit();
+    std::vector<int> m_descriptors;
+};
+
+#endif

@@ -16,11 +16,15 @@ WriteWatcher::WriteWatcher(QObject *parent)
 {
     if (m_inotify >= 0) {
         auto *notifier = new QSocketNotifier(m_inotify, QSocketNotifier::Read, this);
-        connect(notifier, &QSocketNotifier::activated, this, [this] {
+        // Behind what the watcher of the directory has to tell, which waits in the event loop too:
+        // whoever reads the directory upon that has called watch(), and need not read it again.
+        const auto tell = [this] {
             if (takeEvents()) {
                 Q_EMIT written();
             }
-        });
+        };
+        connect(notifier, &QSocketNotifier::activated, this,
+                [this, tell] { QMetaObject::invokeMethod(this, tell, Qt::QueuedConnection); });
     }
 }
 

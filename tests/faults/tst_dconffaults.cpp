@@ -537,14 +537,18 @@ void TestDconfFaults::hugeLists()
     QCOMPARE(LocationConfiguration().gpsEnabled(), false);
     LocationConfiguration().restoreCustomSettings();
     QCOMPARE(LocationConfiguration().gpsEnabled(), true);
+    TRY_COMPARE(read(gpsKey), QByteArray("true"));
 
     // A choice that replaces such a list takes as long as dconf takes to compare it with the new
     // one, which is not ours to shorten; so once it is gone.
+    Change keyChange(user->key());
     reset();
-    QVERIFY(listChange.hasCome());
-    load({widgetsKey}, "@as []");
-    MGConfItem(gpsKey).set(false);
-    TRY(!user->isOn());
+    QVERIFY(keyChange.hasCome());
+    if (user->key() == widgetsKey) {
+        load({widgetsKey}, "@as []");
+        QVERIFY(keyChange.hasCome());
+    }
+    QVERIFY(!user->isOn());
     user->choose(true);
     TRY_COMPARE(read(user->key()), user->stored(true));
 }

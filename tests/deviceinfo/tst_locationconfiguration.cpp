@@ -1,12 +1,12 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
+#include "dconftool.h"
 #include "files.h"
 #include "locationconfiguration.h"
 #include "messagelog.h"
 #include "mgconfitem.h"
 
-#include <QProcess>
 #include <QTranslator>
 #include <QtTest>
 
@@ -85,16 +85,6 @@ QVariantMap savedMap(bool gps, bool mls, bool mlsOnline, bool here)
             {QStringLiteral("mls/enabled"), mls},
             {QStringLiteral("mls/online_enabled"), mlsOnline},
             {QStringLiteral("here/enabled"), here}};
-}
-
-QByteArray dconf(const QStringList &arguments)
-{
-    QProcess process;
-    process.start(QStringLiteral("dconf"), arguments);
-    if (!process.waitForFinished(60000) || process.exitCode() != 0) {
-        qWarning("dconf failed: %s", process.readAllStandardError().constData());
-    }
-    return process.readAllStandardOutput().trimmed();
 }
 
 QString warning(const char *locale)
@@ -468,13 +458,12 @@ void TestLocationConfiguration::sharesWithAnotherProcess()
     configuration.saveCustomSettings();
     configuration.setCustomSettingsEnabled(true);
     // Stored last.
-    QTRY_COMPARE(dconf({QStringLiteral("read"), flagKey}), QByteArray("true"));
-    QCOMPARE(dconf({QStringLiteral("read"), savedKey}),
+    QTRY_COMPARE(DconfTool::read(flagKey), QByteArray("true"));
+    QCOMPARE(DconfTool::read(savedKey),
              QByteArray("{'gps/enabled': <true>, 'here/enabled': <false>, 'mls/enabled': <false>, "
                         "'mls/online_enabled': <true>}"));
 
-    dconf({QStringLiteral("write"), savedKey,
-           QStringLiteral("{'mls/enabled': <true>, 'here/enabled': <true>}")});
+    DconfTool::write(savedKey, "{'mls/enabled': <true>, 'here/enabled': <true>}");
     MGConfItem saved(savedKey);
     QTRY_COMPARE(saved.value().toMap().size(), 2);
     configuration.restoreCustomSettings();

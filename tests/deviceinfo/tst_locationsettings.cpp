@@ -1,6 +1,7 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
+#include "dconftool.h"
 #include "locationsettings.h"
 #include "messagelog.h"
 #include "mgconfitem.h"
@@ -57,25 +58,6 @@ QVariant stored(const QString &key)
 void store(const QString &key, const QVariant &value)
 {
     MGConfItem(key).set(value);
-}
-
-QByteArray dconf(const QStringList &arguments)
-{
-    QProcess process;
-    process.start(QStringLiteral("dconf"), arguments);
-    if (!process.waitForFinished(60000) || process.exitCode() != 0) {
-        qWarning("dconf failed: %s", process.readAllStandardError().constData());
-    }
-    return process.readAllStandardOutput().trimmed();
-}
-
-// What this process has set is stored one by one in the background: what another one stores next is
-// really the last only after that.
-void waitUntilStored()
-{
-    static int count = 0;
-    store(QStringLiteral("/test/count"), ++count);
-    QTRY_COMPARE(dconf({QStringLiteral("read"), QStringLiteral("/test/count")}).toInt(), count);
 }
 
 // Another process, which says every change on a line and does what it is told by a line.
@@ -350,13 +332,13 @@ void TestLocationSettings::followsAnotherProcess()
 {
     const LocationSettings settings;
     QSignalSpy mlsOnlineChanged(&settings, &LocationSettings::mlsOnlineStateChanged);
-    waitUntilStored();
-    dconf({QStringLiteral("write"), gpsKey, QStringLiteral("true")});
-    dconf({QStringLiteral("write"), mlsOnlineKey, QStringLiteral("2")});
+    DconfTool::waitUntilStored();
+    DconfTool::write(gpsKey, "true");
+    DconfTool::write(mlsOnlineKey, "2");
     QTRY_VERIFY(settings.gpsEnabled());
     QTRY_COMPARE(settings.mlsOnlineState(), State(2));
     QCOMPARE(mlsOnlineChanged.size(), 1);
-    dconf({QStringLiteral("reset"), QStringLiteral("-f"), QStringLiteral("/settings/location/")});
+    DconfTool::reset(QStringLiteral("/settings/location/"));
     QTRY_VERIFY(!settings.gpsEnabled());
     QTRY_COMPARE(settings.mlsOnlineState(), State(0));
     QCOMPARE(mlsOnlineChanged.size(), 2);
@@ -366,7 +348,7 @@ void TestLocationSettings::anotherProcessFollows()
 {
     LocationSettings settings;
     settings.setGpsEnabled(true);
-    waitUntilStored();
+    DconfTool::waitUntilStored();
 
     QProcess process;
     process.setProcessChannelMode(QProcess::ForwardedErrorChannel);

@@ -1,6 +1,7 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
+#include "dconftool.h"
 #include "eventswidgetsmodel.h"
 #include "files.h"
 #include "messagelog.h"
@@ -921,12 +922,10 @@ void TestEventsWidgetsModel::followsTheKey()
     QTRY_COMPARE(enabled(), (QStringList{yes, no}));
 
     // By another program.
-    const auto dconf = [](const QStringList &arguments) {
-        return QProcess::execute(QStringLiteral("dconf"), arguments);
-    };
-    QCOMPARE(dconf({QStringLiteral("write"), keyName, QStringLiteral("['a', 'b']")}), 0);
+    DconfTool::waitUntilStored();
+    DconfTool::write(keyName, "['a', 'b']");
     QTRY_COMPARE(enabled(), (QStringList{yes, yes}));
-    QCOMPARE(dconf({QStringLiteral("reset"), keyName}), 0);
+    DconfTool::reset(keyName);
     QTRY_COMPARE(enabled(), (QStringList{no, yes}));
 }
 

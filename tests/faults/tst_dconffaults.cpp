@@ -4,6 +4,7 @@
 // The types that keep something in dconf, while its service hangs, dies or is not there, and with
 // whatever else may be in their keys.
 
+#include "dconftool.h"
 #include "eventswidgetsmodel.h"
 #include "files.h"
 #include "locationconfiguration.h"
@@ -15,7 +16,6 @@
 #include <QDBusConnection>
 #include <QDBusConnectionInterface>
 #include <QDBusMessage>
-#include <QProcess>
 #include <QtTest>
 
 #include <algorithm>
@@ -66,6 +66,8 @@ private Q_SLOTS:
 
 private:
     void addUsers();
+    QStringList takeMessages();
+    void takeFailedWrites();
 
     std::unique_ptr<MessageLog> m_log;
 };
@@ -182,25 +184,6 @@ template<typename Type> MakeUser maker()
     return [] { return std::make_unique<Type>(); };
 }
 
-// What the dconf tool prints, given the input.
-QByteArray dconf(const QStringList &arguments, const QByteArray &input = {})
-{
-    QProcess tool;
-    tool.setProcessChannelMode(QProcess::ForwardedErrorChannel);
-    tool.start(QStringLiteral("dconf"), arguments);
-    tool.write(input);
-    tool.closeWriteChannel();
-    if (!tool.waitForFinished(patience) || tool.exitCode() != 0) {
-        qWarning("dconf failed");
-    }
-    return tool.readAllStandardOutput().trimmed();
-}
-
-QByteArray read(const QString &key)
-{
-    return dconf({QStringLiteral("read"), key});
-}
-
 // Several keys in one write, of whatever size.
 void load(const QStringList &keys, const QByteArray &value)
 {
@@ -210,13 +193,13 @@ void load(const QStringList &keys, const QByteArray &value)
         file += '[' + key.mid(1, folder - 1).toUtf8() + "]\n" + key.mid(folder + 1).toUtf8() + '='
             + value + '\n';
     }
-    dconf({QStringLiteral("load"), QStringLiteral("/")}, file);
+    DconfTool::run({QStringLiteral("load"), QStringLiteral("/")}, file);
 }
 
 void reset()
 {
     for (const char *folder : {"/desktop/", "/settings/", "/other/"}) {
-        dconf({QStringLiteral("reset"), QStringLiteral("-f"), QString::fromLatin1(folder)});
+        DconfTool::reset(QString::fromLatin1(folder));
     }
 }
 
@@ -291,9 +274,16 @@ void reloadBusConfiguration()
     QCOMPARE(QDBusConnection::sessionBus().call(call).type(), QDBusMessage::ReplyMessage);
 }
 
+// GLib says so of each connection from a user namespace.
 bool isOfNoInterest(const QString &message)
 {
     return message.contains(QLatin1String("Using cross-namespace EXTERNAL authentication"));
+}
+
+// One line for each write that dconf had under way or waiting: as many as it had not joined.
+bool isFailedWrite(const QString &message)
+{
+    return message.contains(QLatin1String("failed to commit changes to dconf"));
 }
 
 // That a write has failed, GLib's log alone is told.
@@ -322,11 +312,23 @@ void TestDconfFaults::init()
 
 void TestDconfFaults::cleanup()
 {
-    // Which GLib says of each connection from a user namespace.
-    QStringList report = m_log->takeReport().split(QLatin1Char('\n'), Qt::SkipEmptyParts);
-    report.erase(std::remove_if(report.begin(), report.end(), isOfNoInterest), report.end());
-    QCOMPARE(report, QStringList());
+    QCOMPARE(takeMessages(), QStringList());
     m_log.reset();
+}
+
+QStringList TestDconfFaults::takeMessages()
+{
+    QStringList messages = m_log->takeReport().split(QLatin1Char('\n'), Qt::SkipEmptyParts);
+    messages.erase(std::remove_if(messages.begin(), messages.end(), isOfNoInterest),
+                   messages.end());
+    return messages;
+}
+
+void TestDconfFaults::takeFailedWrites()
+{
+    const QStringList messages = takeMessages();
+    QVERIFY2(std::all_of(messages.begin(), messages.end(), isFailedWrite),
+             qUtf8Printable(messages.join(QLatin1Char('\n'))));
 }
 
 void TestDconfFaults::addUsers()
@@ -347,7 +349,7 @@ void TestDconfFaults::serviceHangs()
     QFETCH(MakeUser, make);
     const auto user = make();
     user->choose(true);
-    TRY_COMPARE(read(user->key()), user->stored(true));
+    TRY_COMPARE(DconfTool::read(user->key()), user->stored(true));
 
     StoppedService service;
     // The process itself sees what it has chosen; others once the service goes on.
@@ -357,9 +359,9 @@ void TestDconfFaults::serviceHangs()
     user->choose(false);
     TRY(!user->isOn());
     QVERIFY(!make()->isOn());
-    QCOMPARE(read(user->key()), user->stored(true));
+    QCOMPARE(DconfTool::read(user->key()), user->stored(true));
     service.goOn();
-    TRY_COMPARE(read(user->key()), user->stored(false));
+    TRY_COMPARE(DconfTool::read(user->key()), user->stored(false));
     QVERIFY(!user->isOn());
 }
 
@@ -379,7 +381,7 @@ void TestDconfFaults::goesWhileTheServiceHangs()
     user.reset();
     delete make().release();
     service.goOn();
-    TRY_COMPARE(read(key), stored);
+    TRY_COMPARE(DconfTool::read(key), stored);
     QVERIFY(make()->isOn());
 }
 
@@ -393,7 +395,7 @@ void TestDconfFaults::serviceDiesInTheMiddleOfAWrite()
     QFETCH(MakeUser, make);
     const auto user = make();
     user->choose(true);
-    TRY_COMPARE(read(user->key()), user->stored(true));
+    TRY_COMPARE(DconfTool::read(user->key()), user->stored(true));
 
     StoppedService service;
     user->choose(false);
@@ -402,15 +404,17 @@ void TestDconfFaults::serviceDiesInTheMiddleOfAWrite()
     QTest::qWait(100);
     service.kill();
     // What was not stored is taken back, once all that is under way has failed or been stored.
-    QByteArray log;
-    TRY((log += m_log->takeReport().toUtf8()).contains("failed to commit changes to dconf"));
+    QStringList messages;
+    TRY(!(messages += takeMessages()).isEmpty());
+    QVERIFY(isFailedWrite(messages.first()));
     TRY_COMPARE(user->isOn(), true);
-    QCOMPARE(read(user->key()), user->stored(true));
+    QCOMPARE(DconfTool::read(user->key()), user->stored(true));
 
     // The bus starts the service anew.
     user->choose(false);
-    TRY_COMPARE(read(user->key()), user->stored(false));
+    TRY_COMPARE(DconfTool::read(user->key()), user->stored(false));
     QVERIFY(!user->isOn());
+    takeFailedWrites();
 }
 
 void TestDconfFaults::serviceIsAbsent_data()
@@ -432,16 +436,18 @@ void TestDconfFaults::serviceIsAbsent()
     TRY_COMPARE(servicePid(), 0);
 
     user->choose(true);
-    QByteArray log;
-    TRY((log += m_log->takeReport().toUtf8()).contains("failed to commit changes to dconf"));
+    QStringList messages;
+    TRY(!(messages += takeMessages()).isEmpty());
+    QVERIFY(isFailedWrite(messages.first()));
     TRY_COMPARE(user->isOn(), false);
     QVERIFY(!make()->isOn());
 
     QVERIFY(QFile::rename(away, serviceFile));
     reloadBusConfiguration();
     user->choose(true);
-    TRY_COMPARE(read(user->key()), user->stored(true));
+    TRY_COMPARE(DconfTool::read(user->key()), user->stored(true));
     QVERIFY(user->isOn());
+    takeFailedWrites();
 }
 
 void TestDconfFaults::everyOtherType_data()
@@ -503,7 +509,7 @@ void TestDconfFaults::everyOtherType()
     load({widgetsKey}, "@as []");
     QVERIFY(user->key() != widgetsKey || change.hasCome());
     user->choose(true);
-    TRY_COMPARE(read(user->key()), user->stored(true));
+    TRY_COMPARE(DconfTool::read(user->key()), user->stored(true));
     QVERIFY(user->isOn());
 }
 
@@ -537,7 +543,7 @@ void TestDconfFaults::hugeLists()
     QCOMPARE(LocationConfiguration().gpsEnabled(), false);
     LocationConfiguration().restoreCustomSettings();
     QCOMPARE(LocationConfiguration().gpsEnabled(), true);
-    TRY_COMPARE(read(gpsKey), QByteArray("true"));
+    TRY_COMPARE(DconfTool::read(gpsKey), QByteArray("true"));
 
     // A choice that replaces such a list takes as long as dconf takes to compare it with the new
     // one, which is not ours to shorten; so once it is gone.
@@ -550,7 +556,7 @@ void TestDconfFaults::hugeLists()
     }
     QVERIFY(!user->isOn());
     user->choose(true);
-    TRY_COMPARE(read(user->key()), user->stored(true));
+    TRY_COMPARE(DconfTool::read(user->key()), user->stored(true));
 }
 
 void TestDconfFaults::hugeDatabase_data()
@@ -567,11 +573,11 @@ void TestDconfFaults::hugeDatabase()
         file += "key" + QByteArray::number(i) + "=1\n";
     }
     // One change of many keys is told to everybody.
-    dconf({QStringLiteral("load"), QStringLiteral("/")}, file);
+    DconfTool::run({QStringLiteral("load"), QStringLiteral("/")}, file);
     TRY_COMPARE(MGConfItem(QStringLiteral("/other/key%1").arg(manyKeys - 1)).value(), QVariant(1));
     QVERIFY(!user->isOn());
     user->choose(true);
-    TRY_COMPARE(read(user->key()), user->stored(true));
+    TRY_COMPARE(DconfTool::read(user->key()), user->stored(true));
     QVERIFY(user->isOn());
     QVERIFY(make()->isOn());
 }
@@ -586,7 +592,7 @@ void TestDconfFaults::tenThousandNotifications()
     QFETCH(MakeUser, make);
     const auto user = make();
     user->choose(true);
-    TRY_COMPARE(read(user->key()), user->stored(true));
+    TRY_COMPARE(DconfTool::read(user->key()), user->stored(true));
     // As the service tells of a change, but there is none.
     QDBusConnection bus =
         QDBusConnection::connectToBus(QDBusConnection::SessionBus, QStringLiteral("notifications"));

@@ -1,6 +1,7 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
+#include "dconftool.h"
 #include "messagelog.h"
 #include "mgconfitem.h"
 
@@ -231,29 +232,6 @@ private:
     QString m_address;
 };
 
-// What the dconf tool prints; the tool is the other process of these tests.
-QByteArray dconf(const QStringList &arguments, const QByteArray &input = {})
-{
-    QProcess tool;
-    tool.start(QStringLiteral("dconf"), arguments);
-    tool.write(input);
-    tool.closeWriteChannel();
-    if (!tool.waitForFinished(60000) || tool.exitCode() != 0) {
-        qWarning("dconf failed: %s", tool.readAllStandardError().constData());
-    }
-    return tool.readAllStandardOutput().trimmed();
-}
-
-void dconfWrite(const QString &key, const char *value)
-{
-    dconf({QStringLiteral("write"), key, QString::fromUtf8(value)});
-}
-
-QByteArray dconfRead(const QString &key)
-{
-    return dconf({QStringLiteral("read"), key});
-}
-
 // Every test has keys of its own: what one set last may be stored when the next one runs.
 QString newKey()
 {
@@ -281,7 +259,7 @@ private Q_SLOTS:
     {
         QCOMPARE(m_log->takeAll(), QList<MessageLog::Message>());
         m_log.reset();
-        dconf({QStringLiteral("reset"), QStringLiteral("-f"), QStringLiteral("/test/")});
+        DconfTool::reset(QStringLiteral("/test/"));
     }
 
     void startsUnset();
@@ -359,7 +337,7 @@ void TestMGConfItem::setIsSeenByEveryItemBeforeItReturns()
     QCOMPARE(describe(another.value()), describe(2));
 
     // Nor does it come a second time when the value has been stored.
-    QTRY_COMPARE(dconfRead(key), QByteArray("2"));
+    QTRY_COMPARE(DconfTool::read(key), QByteArray("2"));
     QTest::qWait(100);
     QCOMPARE(changed.count(), 2);
     QCOMPARE(anotherChanged.count(), 2);
@@ -387,9 +365,9 @@ void TestMGConfItem::equalValueEmitsNothing()
 
         // Equal to what is stored, too, and stored by somebody else.
         QByteArray printed;
-        QTRY_VERIFY(!(printed = dconfRead(key)).isEmpty());
+        QTRY_VERIFY(!(printed = DconfTool::read(key)).isEmpty());
         item.set(value);
-        dconfWrite(key, printed.constData());
+        DconfTool::write(key, printed.constData());
         QTest::qWait(50);
         QCOMPARE(changed.count(), 0);
         QCOMPARE(describe(item.value()), describe(value));
@@ -415,7 +393,7 @@ void TestMGConfItem::unsetForgetsTheValue()
     const QString key = newKey();
     MGConfItem item(key);
     item.set(1);
-    QTRY_COMPARE(dconfRead(key), QByteArray("1"));
+    QTRY_COMPARE(DconfTool::read(key), QByteArray("1"));
     const MGConfItem fresh(key); // has seen no change yet
     const QSignalSpy changed(&item, &MGConfItem::valueChanged);
     const QSignalSpy freshChanged(&fresh, &MGConfItem::valueChanged);
@@ -425,7 +403,7 @@ void TestMGConfItem::unsetForgetsTheValue()
     QVERIFY(!item.value().isValid());
     item.unset();
     QCOMPARE(changed.count(), 1);
-    QTRY_COMPARE(dconfRead(key), QByteArray());
+    QTRY_COMPARE(DconfTool::read(key), QByteArray());
 }
 
 void TestMGConfItem::invalidValueUnsets()
@@ -433,11 +411,12 @@ void TestMGConfItem::invalidValueUnsets()
     const QString key = newKey();
     MGConfItem item(key);
     item.set(1);
+    QTRY_COMPARE(DconfTool::read(key), QByteArray("1"));
     const QSignalSpy changed(&item, &MGConfItem::valueChanged);
     item.set(QVariant());
     QCOMPARE(changed.count(), 1);
     QVERIFY(!item.value().isValid());
-    QTRY_COMPARE(dconfRead(key), QByteArray());
+    QTRY_COMPARE(DconfTool::read(key), QByteArray());
 }
 
 void TestMGConfItem::temporaryItemStores()
@@ -447,7 +426,7 @@ void TestMGConfItem::temporaryItemStores()
     }
     for (int i = 0; i < 20; ++i) {
         const QString key = QStringLiteral("/test/many/key%1").arg(i);
-        QTRY_COMPARE(dconfRead(key), QByteArray::number(i));
+        QTRY_COMPARE(DconfTool::read(key), QByteArray::number(i));
     }
 }
 
@@ -461,8 +440,8 @@ void TestMGConfItem::deletedItemHearsNothing()
     const QSignalSpy changed(&another, &MGConfItem::valueChanged);
     item.reset();
     MGConfItem(key).set(1);
-    QTRY_COMPARE(dconfRead(key), QByteArray("1"));
-    dconfWrite(key, "2");
+    QTRY_COMPARE(DconfTool::read(key), QByteArray("1"));
+    DconfTool::write(key, "2");
     QTRY_COMPARE(changed.count(), 2); // the other item still follows the key
     QCOMPARE(heard, 0);
 }
@@ -475,12 +454,12 @@ void TestMGConfItem::followsOtherProcesses()
     QSignalSpy changed(&item, &MGConfItem::valueChanged);
     const QSignalSpy anotherChanged(&another, &MGConfItem::valueChanged);
 
-    dconfWrite(key, "'theirs'");
+    DconfTool::write(key, "'theirs'");
     QTRY_COMPARE(changed.count(), 1);
     QTRY_COMPARE(anotherChanged.count(), 1);
     QCOMPARE(describe(item.value()), describe(QStringLiteral("theirs")));
 
-    dconf({QStringLiteral("reset"), key});
+    DconfTool::reset(key);
     QTRY_COMPARE(changed.count(), 2);
     QTRY_COMPARE(anotherChanged.count(), 2);
     QVERIFY(!item.value().isValid());
@@ -494,7 +473,7 @@ void TestMGConfItem::followsSeveralChangesAtOnce()
     const MGConfItem untouched(QStringLiteral("/test/folder/untouched"));
     const MGConfItem neighbour(QStringLiteral("/test/folder2"));
     same.set(3);
-    QTRY_COMPARE(dconfRead(same.key()), QByteArray("3"));
+    QTRY_COMPARE(DconfTool::read(same.key()), QByteArray("3"));
 
     QSignalSpy firstChanged(&first, &MGConfItem::valueChanged);
     QSignalSpy secondChanged(&second, &MGConfItem::valueChanged);
@@ -502,8 +481,8 @@ void TestMGConfItem::followsSeveralChangesAtOnce()
     const QSignalSpy untouchedChanged(&untouched, &MGConfItem::valueChanged);
     const QSignalSpy neighbourChanged(&neighbour, &MGConfItem::valueChanged);
 
-    dconf({QStringLiteral("load"), QStringLiteral("/test/folder/")},
-          "[/]\nfirst=1\nsame=3\n[below]\nsecond=2\n");
+    DconfTool::run({QStringLiteral("load"), QStringLiteral("/test/folder/")},
+                   "[/]\nfirst=1\nsame=3\n[below]\nsecond=2\n");
     QTRY_COMPARE(firstChanged.count(), 1);
     QTRY_COMPARE(secondChanged.count(), 1);
     QCOMPARE(describe(first.value()), describe(1));
@@ -524,12 +503,12 @@ void TestMGConfItem::followsTheResetOfAFolder()
     MGConfItem neighbour(QStringLiteral("/test/folder2"));
     inside.set(1);
     neighbour.set(2);
-    QTRY_COMPARE(dconfRead(neighbour.key()), QByteArray("2"));
+    QTRY_COMPARE(DconfTool::read(neighbour.key()), QByteArray("2"));
 
     QSignalSpy insideChanged(&inside, &MGConfItem::valueChanged);
     const QSignalSpy emptyChanged(&empty, &MGConfItem::valueChanged);
     const QSignalSpy neighbourChanged(&neighbour, &MGConfItem::valueChanged);
-    dconf({QStringLiteral("reset"), QStringLiteral("-f"), QStringLiteral("/test/folder/")});
+    DconfTool::reset(QStringLiteral("/test/folder/"));
     QTRY_COMPARE(insideChanged.count(), 1);
     QVERIFY(!inside.value().isValid());
     QTest::qWait(100);
@@ -549,8 +528,8 @@ void TestMGConfItem::missesNothingWhileTheBusIsSlow()
     Child child({QStringLiteral("watch")},
                 {{QStringLiteral("DBUS_SESSION_BUS_ADDRESS"), bus.address()}});
     QVERIFY(child.says("ready"));
-    dconfWrite(scenarios::followedKey, "'theirs'");
-    QCOMPARE(dconfRead(scenarios::followedKey), QByteArray("'theirs'"));
+    DconfTool::write(scenarios::followedKey, "'theirs'");
+    QCOMPARE(DconfTool::read(scenarios::followedKey), QByteArray("'theirs'"));
     QCOMPARE(child.lines(), QList<QByteArray>{"ready"});
     QCOMPARE(::kill(pid, SIGCONT), 0);
     QVERIFY(child.says("changed"));
@@ -573,7 +552,7 @@ void TestMGConfItem::slotMaySet()
     second.set(1);
     QCOMPARE(seenByFirst, (QVariantList{1, 2, 3}));
     QCOMPARE(seenBySecond, (QVariantList{3}));
-    QTRY_COMPARE(dconfRead(key), QByteArray("3"));
+    QTRY_COMPARE(DconfTool::read(key), QByteArray("3"));
 }
 
 void TestMGConfItem::slotMayDeleteItsItem()
@@ -590,7 +569,7 @@ void TestMGConfItem::slotMayDeleteItsItem()
 
     const QString key = newKey();
     const QPointer<MGConfItem> follows = deleteOnChange(key);
-    dconfWrite(key, "2");
+    DconfTool::write(key, "2");
     QTRY_VERIFY(!follows);
 }
 
@@ -666,7 +645,7 @@ void TestMGConfItem::storesWhatOthersRead()
     MGConfItem item(key);
     item.set(value);
     QCOMPARE(describe(item.value()), describe(value)); // on its way
-    QTRY_COMPARE(dconfRead(key), printed);
+    QTRY_COMPARE(DconfTool::read(key), printed);
     QCOMPARE(describe(item.value()), describe(value)); // from the database
 }
 
@@ -701,7 +680,7 @@ void TestMGConfItem::readsWhatOthersStore()
     const QString key = newKey();
     const MGConfItem item(key);
     QSignalSpy changed(&item, &MGConfItem::valueChanged);
-    dconfWrite(key, QTest::currentDataTag());
+    DconfTool::write(key, QTest::currentDataTag());
     QTRY_COMPARE(changed.count(), 1);
     QCOMPARE(describe(item.value()), describe(value));
     QCOMPARE(describe(item.value(7)), describe(value.isValid() ? value : QVariant(7)));
@@ -731,7 +710,7 @@ void TestMGConfItem::refusesWhatCannotBeHeld()
     const QString key = newKey();
     MGConfItem item(key);
     item.set(1);
-    QTRY_COMPARE(dconfRead(key), QByteArray("1"));
+    QTRY_COMPARE(DconfTool::read(key), QByteArray("1"));
     const QSignalSpy changed(&item, &MGConfItem::valueChanged);
     item.set(value);
     const MessageLog::Message warning{
@@ -741,7 +720,7 @@ void TestMGConfItem::refusesWhatCannotBeHeld()
     QCOMPARE(changed.count(), 0);
     QCOMPARE(describe(item.value()), describe(1));
     QTest::qWait(50);
-    QCOMPARE(dconfRead(key), QByteArray("1"));
+    QCOMPARE(DconfTool::read(key), QByteArray("1"));
 }
 
 void TestMGConfItem::badKeyIsInert_data()
@@ -776,10 +755,11 @@ void TestMGConfItem::badKeyIsInert()
     QCOMPARE(item.key(), key);
     QVERIFY(!item.value().isValid());
     QCOMPARE(describe(item.value(7)), describe(7));
-    dconf({QStringLiteral("write"), QStringLiteral("/test/bad/key"), QStringLiteral("1")});
+    DconfTool::write(QStringLiteral("/test/bad/key"), "1");
     QTest::qWait(50);
     QCOMPARE(changed.count(), 0);
-    QCOMPARE(dconf({QStringLiteral("list"), QStringLiteral("/test/bad/")}), QByteArray("key"));
+    QCOMPARE(DconfTool::run({QStringLiteral("list"), QStringLiteral("/test/bad/")}),
+             QByteArray("key"));
 }
 
 void TestMGConfItem::lockedKeyStays()
@@ -792,8 +772,8 @@ void TestMGConfItem::lockedKeyStays()
     QVERIFY(QDir(dir.path()).mkpath(QStringLiteral("keys/locks")));
     QVERIFY(write("keys/values", "[test]\nlocked='vendor'\n"));
     QVERIFY(write("keys/locks/locks", "/test/locked\n"));
-    dconf({QStringLiteral("compile"), dir.filePath(QStringLiteral("db")),
-           dir.filePath(QStringLiteral("keys"))});
+    DconfTool::run({QStringLiteral("compile"), dir.filePath(QStringLiteral("db")),
+                    dir.filePath(QStringLiteral("keys"))});
     QVERIFY(
         write("profile", "user-db:user\nfile-db:" + dir.filePath(QStringLiteral("db")).toUtf8()));
 
@@ -812,7 +792,7 @@ void TestMGConfItem::failedStoreReverts()
     const QString key = newKey();
     MGConfItem item(key);
     item.set(1);
-    QTRY_COMPARE(dconfRead(key), QByteArray("1"));
+    QTRY_COMPARE(DconfTool::read(key), QByteArray("1"));
     QCOMPARE(describe(item.value()), describe(1)); // opens the database, before it goes
 
     QVariantList seen;
@@ -840,7 +820,7 @@ void TestMGConfItem::failedStoreReverts()
         QTRY_COMPARE(seen, (QVariantList{2, 1}));
     }
     item.set(3);
-    QTRY_COMPARE(dconfRead(key), QByteArray("3"));
+    QTRY_COMPARE(DconfTool::read(key), QByteArray("3"));
     QCOMPARE(seen, (QVariantList{2, 1, 3}));
 }
 
@@ -857,12 +837,12 @@ void TestMGConfItem::exitLosesNothing()
     QFETCH(const int, count);
 
     for (int round = 0; round < 5; ++round) {
-        dconf({QStringLiteral("reset"), QStringLiteral("-f"), QStringLiteral("/test/child/")});
+        DconfTool::reset(QStringLiteral("/test/child/"));
         Child child({QStringLiteral("setAndExit"), QString::number(count)});
         QVERIFY(child.succeeds());
         for (int i = 0; i < count; ++i) {
             const QString key = QStringLiteral("/test/child/key%1").arg(i);
-            QCOMPARE(dconfRead(key), QByteArray::number(i));
+            QCOMPARE(DconfTool::read(key), QByteArray::number(i));
         }
         QCOMPARE(child.warnings(), QList<QByteArray>());
     }
@@ -870,7 +850,7 @@ void TestMGConfItem::exitLosesNothing()
 
 void TestMGConfItem::exitDoesNotHangOnAStoppedService()
 {
-    dconfWrite(QStringLiteral("/test/key"), "1"); // starts the service, if need be
+    DconfTool::write(QStringLiteral("/test/key"), "1"); // starts the service, if need be
     const pid_t pid = servicePid();
     QVERIFY(pid > 0);
     QCOMPARE(::kill(pid, SIGSTOP), 0);
@@ -900,8 +880,8 @@ void TestMGConfItem::withoutGlibWarnsOnce()
 {
     Child child({QStringLiteral("follow")}, {{QStringLiteral("QT_NO_GLIB"), QStringLiteral("1")}});
     QVERIFY(child.says("ready"));
-    QTRY_COMPARE(dconfRead(scenarios::followedKey), QByteArray("'own'"));
-    dconfWrite(scenarios::followedKey, "'theirs'");
+    QTRY_COMPARE(DconfTool::read(scenarios::followedKey), QByteArray("'own'"));
+    DconfTool::write(scenarios::followedKey, "'theirs'");
     QTest::qWait(300);
     child.terminate();
     QVERIFY(child.waitForFinished());
@@ -912,8 +892,8 @@ void TestMGConfItem::withoutGlibWarnsOnce()
     // The same scenario with GLib: the silence above is not the test's.
     Child other({QStringLiteral("follow")});
     QVERIFY(other.says("ready"));
-    QTRY_COMPARE(dconfRead(scenarios::followedKey), QByteArray("'own'"));
-    dconfWrite(scenarios::followedKey, "'theirs'");
+    QTRY_COMPARE(DconfTool::read(scenarios::followedKey), QByteArray("'own'"));
+    DconfTool::write(scenarios::followedKey, "'theirs'");
     QTRY_COMPARE(other.lines(), (QList<QByteArray>{"changed", "ready", "changed"}));
     other.terminate();
     QVERIFY(other.waitForFinished());

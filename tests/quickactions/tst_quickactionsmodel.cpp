@@ -1,13 +1,13 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
+#include "dconftool.h"
 #include "files.h"
 #include "messagelog.h"
 #include "mgconfitem.h"
 #include "quickactionsmodel.h"
 
 #include <QAbstractItemModelTester>
-#include <QProcess>
 #include <QtTest>
 
 class TestQuickActionsModel : public QObject
@@ -353,15 +353,12 @@ void TestQuickActionsModel::followsOtherProcesses()
 {
     const QString a = add("a");
     QuickActionsModel *model = loadedModel();
-    QProcess dconf;
-    dconf.start(QStringLiteral("dconf"),
-                {QStringLiteral("write"), enabledKey, QStringLiteral("['%1']").arg(a)});
+    const QByteArray onlyA = "['" + a.toUtf8() + "']";
+    DconfTool::waitUntilStored();
+    DconfTool::write(enabledKey, onlyA);
     QTRY_COMPARE(names(model), list({"a"}));
-    QVERIFY(dconf.state() == QProcess::NotRunning || dconf.waitForFinished());
-    dconf.start(QStringLiteral("dconf"),
-                {QStringLiteral("write"), blockedKey, QStringLiteral("['%1']").arg(a)});
+    DconfTool::write(blockedKey, onlyA);
     QTRY_COMPARE(model->count(), 0);
-    QVERIFY(dconf.state() == QProcess::NotRunning || dconf.waitForFinished());
 }
 
 void TestQuickActionsModel::rowsFollowTheListWhateverTheOrder()

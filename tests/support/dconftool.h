@@ -1,0 +1,32 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#ifndef DCONFTOOL_H
+#define DCONFTOOL_H
+
+#include <QByteArray>
+#include <QString>
+#include <QStringList>
+
+/*
+    What another program does with dconf: that program is the dconf tool. A warning is logged if it
+    fails.
+*/
+namespace DconfTool {
+
+// What the tool prints, given the input.
+QByteArray run(const QStringList &arguments, const QByteArray &input = {});
+
+// A value in GVariant's text format; empty if nothing is stored.
+QByteArray read(const QString &key);
+void write(const QString &key, const QByteArray &value);
+// Of a key, or with a slash at its end of a whole folder.
+void reset(const QString &path);
+
+// What this process has set is stored one by one in the background: what another one writes next is
+// really the last only after that.
+void waitUntilStored();
+
+} // namespace DconfTool
+
+#endif

@@ -12,6 +12,7 @@
 
 #include <QDBusPendingCallWatcher>
 #include <QPointer>
+#include <QRegularExpression>
 #include <QtTest>
 
 #include <memory>
@@ -74,6 +75,15 @@ void letEverythingArrive()
     QTest::qWait(100);
 }
 
+// QtDBus says so when two changes of an owner overtake each other between its threads, as they do
+// now and then where a service comes and goes as quickly as here. It goes by the later one.
+bool isOfNoInterest(const QString &message)
+{
+    static const QRegularExpression lateOwner(
+        QStringLiteral("QDBusConnection: name '[^']*' had owner '[^']*' but we thought it was"));
+    return message.contains(lateOwner);
+}
+
 bool isSettled(const KivInfo &info)
 {
     return info.findChildren<QDBusPendingCallWatcher *>().isEmpty();
@@ -98,7 +108,9 @@ void TestServiceFaults::init()
 
 void TestServiceFaults::cleanup()
 {
-    QCOMPARE(m_log->takeReport(), QString());
+    QStringList report = m_log->takeReport().split(QLatin1Char('\n'), Qt::SkipEmptyParts);
+    report.erase(std::remove_if(report.begin(), report.end(), isOfNoInterest), report.end());
+    QCOMPARE(report, QStringList());
     m_log.reset();
 }
 

@@ -11,7 +11,6 @@
 #include <QScopedValueRollback>
 
 #include <algorithm>
-#include <limits>
 
 namespace {
 
@@ -346,8 +345,7 @@ void EventsWidgetsModel::insertWidget(int row, const Widget &widget)
     beginInsertRows({}, row, row);
     m_index.insert(widget.path, row);
     m_rows.insert(row, widget);
-    m_highestOrders.insert(row, std::numeric_limits<int>::min());
-    updateHighestOrders(row);
+    m_orders.insert(row, widget.order);
     endInsertRows();
 }
 
@@ -355,7 +353,7 @@ void EventsWidgetsModel::updateWidget(int row, const Widget &widget)
 {
     // Stays where it is, on purpose, even with another order: rows do not jump under the user.
     m_rows[row] = widget;
-    updateHighestOrders(row);
+    m_orders.replace(row, widget.order);
     Q_EMIT dataChanged(index(row), index(row));
 }
 
@@ -382,28 +380,10 @@ void EventsWidgetsModel::removeStaleRows(const QSet<QString> &paths)
 void EventsWidgetsModel::indexRows()
 {
     m_index.clear();
-    m_highestOrders.clear();
+    m_orders.clear();
     for (int row = 0; row < m_rows.size(); ++row) {
         m_index.insert(m_rows.at(row).path, row);
-        m_highestOrders.append(highestOrder(row));
-    }
-}
-
-int EventsWidgetsModel::highestOrder(int row) const
-{
-    const int order = m_rows.at(row).order;
-    return row == 0 ? order : qMax(order, m_highestOrders.at(row - 1));
-}
-
-void EventsWidgetsModel::updateHighestOrders(int row)
-{
-    for (; row < m_rows.size(); ++row) {
-        const int highest = highestOrder(row);
-        if (m_highestOrders.at(row) == highest) {
-            // And so it is for all that follow.
-            return;
-        }
-        m_highestOrders[row] = highest;
+        m_orders.insert(row, m_rows.at(row).order);
     }
 }
 
@@ -427,7 +407,5 @@ int EventsWidgetsModel::insertionIndexForWidget(const Widget &widget) const
     }
     // Before the first row of a higher order. What stands behind that is not looked at: the rows
     // are not sorted, and a place once taken is kept.
-    const auto higher =
-        std::upper_bound(m_highestOrders.cbegin(), m_highestOrders.cend(), widget.order);
-    return int(higher - m_highestOrders.cbegin());
+    return m_orders.firstAbove(widget.order);
 }

@@ -7,6 +7,7 @@
 #include "catalogtable.h"
 #include "directorywatcher.h"
 #include "mgconfitem.h"
+#include "runningmaximum.h"
 #include "writewatcher.h"
 
 #include <QAbstractListModel>
@@ -15,7 +16,6 @@
 #include <QQmlParserStatus>
 #include <QSet>
 #include <QStringList>
-#include <QVector>
 
 #include <vector>
 
@@ -68,8 +68,6 @@ private:
     void updateWidget(int row, const Widget &widget);
     void removeStaleRows(const QSet<QString> &paths);
     void indexRows();
-    int highestOrder(int row) const;
-    void updateHighestOrders(int row);
     int findWidget(const QString &path) const;
     int insertionIndexForWidget(const Widget &widget) const;
 
@@ -77,8 +75,8 @@ private:
     QList<Widget> m_rows;
     // Where to look for the row of a path, from there downwards, while widgets are merged.
     QHash<QString, int> m_index;
-    // The highest order among the rows down to each one.
-    QVector<int> m_highestOrders;
+    // The order of each row, while widgets are merged.
+    RunningMaximum m_orders;
     DirectoryWatcher m_watcher;
     WriteWatcher m_writeWatcher;
     MGConfItem m_enabledItem;

@@ -14,6 +14,7 @@
 #include <QSet>
 
 #include <algorithm>
+#include <limits>
 
 namespace {
 
@@ -50,6 +51,14 @@ QStringList definitionFiles()
 QSet<QString> toSet(const QStringList &list)
 {
     return {list.cbegin(), list.cend()};
+}
+
+// A row without a priority stops every action that has one, wherever that row stands.
+qint64 priorityOfRow(const QuickActionsModel::Action &action)
+{
+    constexpr qint64 none = std::numeric_limits<qint64>::max();
+    const std::optional<int> priority = action.priority();
+    return priority ? *priority : none;
 }
 
 } // namespace
@@ -372,8 +381,11 @@ void QuickActionsModel::loadActions()
         removeRowsExcept(selected);
 
         QHash<QString, const Action *> rows;
-        for (const auto &row : m_rows) {
-            rows.insert(row->path(), row.get());
+        m_priorities.clear();
+        for (int row = 0; row < rowCount(); ++row) {
+            const Action &action = *m_rows[size_t(row)];
+            rows.insert(action.path(), &action);
+            m_priorities.insert(row, priorityOfRow(action));
         }
         const auto addOrUpdate = [this, &rows](const Action &action, auto insertionIndex) {
             const Action *known = rows.value(action.path());
@@ -494,6 +506,7 @@ void QuickActionsModel::addAction(int row, const Action &action)
     beginInsertRows({}, row, row);
     addTranslatorForAction(action);
     m_rows.insert(m_rows.begin() + row, std::make_unique<Action>(action));
+    m_priorities.insert(row, priorityOfRow(action));
     endInsertRows();
 }
 
@@ -502,6 +515,7 @@ void QuickActionsModel::updateAction(int row, const Action &action)
     Action &current = *m_rows[size_t(row)];
     const bool catalogChanged = current.translationCatalog() != action.translationCatalog();
     current = action;
+    m_priorities.replace(row, priorityOfRow(action));
     // The old catalog is not released, on purpose: its texts stay at hand until the model goes.
     if (catalogChanged) {
         addTranslatorForAction(action);
@@ -515,11 +529,7 @@ int QuickActionsModel::insertionIndexByPriority(const Action &action) const
     if (!priority || *priority < 0) {
         return rowCount();
     }
-    // Stops at a row without a priority too, wherever that stands.
-    const auto isBehind = [priority](const auto &row) {
-        return !row->priority() || *row->priority() > *priority;
-    };
-    return int(std::find_if(m_rows.cbegin(), m_rows.cend(), isBehind) - m_rows.cbegin());
+    return m_priorities.firstAbove(*priority);
 }
 
 void QuickActionsModel::addTranslatorForAction(const Action &action)

@@ -7,6 +7,7 @@
 #include "catalogtable.h"
 #include "directorywatcher.h"
 #include "mgconfitem.h"
+#include "runningmaximum.h"
 
 #include <QAbstractListModel>
 #include <QQmlParserStatus>
@@ -88,6 +89,8 @@ private:
 
     CatalogTable m_catalogs;
     std::vector<std::unique_ptr<Action>> m_rows;
+    // The priority of each row, while actions are loaded.
+    RunningMaximum m_priorities;
     DirectoryWatcher m_watcher;
     QTimer m_reloadTimer;
     MGConfItem m_enabledItem;

@@ -335,6 +335,10 @@ QStringList TitlesView::collect() const
 
 bool TitlesView::matches(const QVariant &value) const
 {
+    // Most views match a switch, and two of them compare in a fraction of the time of two variants.
+    if (m_match.userType() == QMetaType::Bool && value.userType() == QMetaType::Bool) {
+        return m_match.toBool() == value.toBool();
+    }
     if (m_match.userType() == QMetaType::QStringList && value.canConvert<QString>()
         && m_match.toStringList().contains(value.toString())) {
         return true;

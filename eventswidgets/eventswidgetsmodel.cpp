@@ -33,6 +33,12 @@ QString translation(const QString &id, const QString &fallback)
     return text == id ? fallback : text;
 }
 
+// A row without an order is no higher than any that has one.
+uint orderOfRow(const EventsWidgetsModel::Widget &widget)
+{
+    return uint(qMax(widget.order, 0));
+}
+
 } // namespace
 
 /*!
@@ -345,7 +351,7 @@ void EventsWidgetsModel::insertWidget(int row, const Widget &widget)
     beginInsertRows({}, row, row);
     m_index.insert(widget.path, row);
     m_rows.insert(row, widget);
-    m_orders.insert(row, widget.order);
+    m_orders.insert(row, orderOfRow(widget));
     endInsertRows();
 }
 
@@ -353,7 +359,7 @@ void EventsWidgetsModel::updateWidget(int row, const Widget &widget)
 {
     // Stays where it is, on purpose, even with another order: rows do not jump under the user.
     m_rows[row] = widget;
-    m_orders.replace(row, widget.order);
+    m_orders.replace(row, orderOfRow(widget));
     Q_EMIT dataChanged(index(row), index(row));
 }
 
@@ -383,7 +389,7 @@ void EventsWidgetsModel::indexRows()
     m_orders.clear();
     for (int row = 0; row < m_rows.size(); ++row) {
         m_index.insert(m_rows.at(row).path, row);
-        m_orders.insert(row, m_rows.at(row).order);
+        m_orders.insert(row, orderOfRow(m_rows.at(row)));
     }
 }
 
@@ -407,5 +413,5 @@ int EventsWidgetsModel::insertionIndexForWidget(const Widget &widget) const
     }
     // Before the first row of a higher order. What stands behind that is not looked at: the rows
     // are not sorted, and a place once taken is kept.
-    return m_orders.firstAbove(widget.order);
+    return m_orders.firstAbove(uint(widget.order));
 }

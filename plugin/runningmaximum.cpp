@@ -11,22 +11,22 @@ void RunningMaximum::clear()
     m_highest.clear();
 }
 
-void RunningMaximum::insert(int row, qint64 number)
+void RunningMaximum::insert(int row, uint number)
 {
     const auto index = std::size_t(row);
-    const qint64 before = index == 0 ? number : m_highest[index - 1];
+    const uint before = index == 0 ? number : m_highest[index - 1];
     m_numbers.insert(m_numbers.begin() + row, number);
     m_highest.insert(m_highest.begin() + row, std::max(before, number));
     update(index + 1);
 }
 
-void RunningMaximum::replace(int row, qint64 number)
+void RunningMaximum::replace(int row, uint number)
 {
     m_numbers[std::size_t(row)] = number;
     update(std::size_t(row));
 }
 
-int RunningMaximum::firstAbove(qint64 number) const
+int RunningMaximum::firstAbove(uint number) const
 {
     return int(std::upper_bound(m_highest.cbegin(), m_highest.cend(), number) - m_highest.cbegin());
 }
@@ -34,8 +34,8 @@ int RunningMaximum::firstAbove(qint64 number) const
 void RunningMaximum::update(std::size_t row)
 {
     for (; row < m_numbers.size(); ++row) {
-        const qint64 number = m_numbers[row];
-        const qint64 highest = row == 0 ? number : std::max(number, m_highest[row - 1]);
+        const uint number = m_numbers[row];
+        const uint highest = row == 0 ? number : std::max(number, m_highest[row - 1]);
         if (m_highest[row] == highest) {
             return; // and so it is for all that follow
         }

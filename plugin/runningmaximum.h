@@ -17,17 +17,17 @@ class RunningMaximum
 {
 public:
     void clear();
-    void insert(int row, qint64 number);
-    void replace(int row, qint64 number);
+    void insert(int row, uint number);
+    void replace(int row, uint number);
     // The number of rows if there is none.
-    int firstAbove(qint64 number) const;
+    int firstAbove(uint number) const;
 
 private:
     void update(std::size_t row);
 
-    std::vector<qint64> m_numbers;
+    std::vector<uint> m_numbers;
     // The highest of the numbers down to each row.
-    std::vector<qint64> m_highest;
+    std::vector<uint> m_highest;
 };
 
 #endif

@@ -53,12 +53,12 @@ QSet<QString> toSet(const QStringList &list)
     return {list.cbegin(), list.cend()};
 }
 
-// A row without a priority stops every action that has one, wherever that row stands.
-qint64 priorityOfRow(const QuickActionsModel::Action &action)
+// A row without a priority stops every action that has one, wherever that row stands; one of a
+// negative priority stops none.
+uint priorityOfRow(const QuickActionsModel::Action &action)
 {
-    constexpr qint64 none = std::numeric_limits<qint64>::max();
     const std::optional<int> priority = action.priority();
-    return priority ? *priority : none;
+    return priority ? uint(qMax(*priority, 0)) : std::numeric_limits<uint>::max();
 }
 
 } // namespace
@@ -529,7 +529,7 @@ int QuickActionsModel::insertionIndexByPriority(const Action &action) const
     if (!priority || *priority < 0) {
         return rowCount();
     }
-    return m_priorities.firstAbove(*priority);
+    return m_priorities.firstAbove(uint(*priority));
 }
 
 void QuickActionsModel::addTranslatorForAction(const Action &action)

@@ -3,6 +3,8 @@
 
 #include "inilines.h"
 
+#include "inifile.h"
+
 #include <QByteArray>
 
 #include <algorithm>
@@ -12,11 +14,6 @@ namespace {
 bool isSpace(char character)
 {
     return character == ' ' || character == '\t' || character == '\r' || character == '\n';
-}
-
-bool endsLine(char character)
-{
-    return character == '\n' || character == '\r';
 }
 
 // Zeroes and all.
@@ -31,30 +28,21 @@ QString unescaped(const QByteArray &name)
     return fromLatin1(QByteArray::fromPercentEncoding(name.trimmed()).replace('\\', '/'));
 }
 
-// The end of what begins at the position, which may go on over several lines in quotes or behind a
-// backslash. Tells where its first equals sign is, or -1.
-int findEnd(const QByteArray &text, int position, int *equals)
+// Of a line, the first one outside quotes; negative if there is none.
+int findEquals(const QByteArray &text, IniSpan line)
 {
-    *equals = -1;
     bool inQuotes = false;
-    for (; position < text.size(); ++position) {
+    for (int position = line.start; position < line.end; ++position) {
         const char character = text.at(position);
         if (character == '\\') {
             ++position;
-            // A line may end in two characters.
-            if (position + 1 < text.size() && endsLine(text.at(position))
-                && endsLine(text.at(position + 1)) && text.at(position) != text.at(position + 1)) {
-                ++position;
-            }
         } else if (character == '"') {
             inQuotes = !inQuotes;
-        } else if (!inQuotes && (endsLine(character) || character == ';')) {
-            break;
-        } else if (!inQuotes && character == '=' && *equals < 0) {
-            *equals = position;
+        } else if (character == '=' && !inQuotes) {
+            return position;
         }
     }
-    return qMin(position, text.size());
+    return -1;
 }
 
 IniLine readHeader(const QByteArray &content)
@@ -80,43 +68,31 @@ std::vector<IniLine> readIniLines(const QByteArray &text)
     int number = 1;
     int counted = 0;
     const int start = text.startsWith(iniByteOrderMark) ? int(qstrlen(iniByteOrderMark)) : 0;
-    int position = start;
-    while (position < text.size()) {
-        if (isSpace(text.at(position))) {
-            ++position;
-            continue;
-        }
-        if (text.at(position) == ';') {
-            while (position < text.size() && !endsLine(text.at(position))) {
-                ++position;
-            }
-            continue;
-        }
-        int equals = -1;
-        const int end = findEnd(text, position, &equals);
-        const QByteArray content = text.mid(position, end - position);
-        number += int(std::count(text.cbegin() + counted, text.cbegin() + position, '\n'));
-        counted = position;
+    for (IniSpan span = nextIniLine(text, start); span.start < span.end;
+         span = nextIniLine(text, span.end)) {
+        const QByteArray content = text.mid(span.start, span.end - span.start);
+        number += int(std::count(text.cbegin() + counted, text.cbegin() + span.start, '\n'));
+        counted = span.start;
 
         IniLine line = {IniLine::Kind::Neither, 0, fromLatin1(content)};
         if (content.startsWith('[')) {
             line = readHeader(content);
             section = line.name;
-        } else if (equals >= 0) {
-            const bool isMarked = start > 0 && !text.left(position).contains('\n')
-                && !text.left(position).contains('\r');
-            const int keyStart = isMarked ? 0 : position;
+        } else if (const int equals = findEquals(text, span); equals >= 0) {
+            const bool isMarked = start > 0 && !text.left(span.start).contains('\n')
+                && !text.left(span.start).contains('\r');
+            const int keyStart = isMarked ? 0 : span.start;
             const QString key = unescaped(text.mid(keyStart, equals - keyStart));
             line = {IniLine::Kind::Key, 0, section + key};
             line.isMarked = isMarked;
-            line.isCut = end < text.size() && text.at(end) == ';' && !isSpace(text.at(end - 1));
+            line.isCut = span.end < text.size() && text.at(span.end) == ';'
+                && !isSpace(text.at(span.end - 1));
         }
         line.number = number;
         line.isAscii = std::all_of(content.cbegin(), content.cend(), [](char character) {
             return static_cast<signed char>(character) >= 0;
         });
         lines.push_back(line);
-        position = qMax(end, position + 1);
     }
     return lines;
 }

@@ -34,9 +34,6 @@ struct IniLine {
     bool isCut = false;
 };
 
-// QSettings reads the values behind it as UTF-8, and as Latin-1 without.
-constexpr const char *iniByteOrderMark = "\xef\xbb\xbf";
-
 std::vector<IniLine> readIniLines(const QByteArray &text);
 
 #endif

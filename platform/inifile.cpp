@@ -90,14 +90,38 @@ bool isBreakAt(const QByteArray &data, int position)
     return position < data.size() && (data.at(position) == '\n' || data.at(position) == '\r');
 }
 
-struct Line {
-    int start;
-    int end;
-};
+// As in nearly all files, which need no closer look then: their lines end where these end or later.
+bool closesEveryBracket(const QByteArray &data)
+{
+    for (int start = data.indexOf('['); start >= 0; start = data.indexOf('[', start + 1)) {
+        int end = start;
+        while (end < data.size() && data.at(end) != ']') {
+            if (data.at(end) == ';' || isBreakAt(data, end)) {
+                return false;
+            }
+            ++end;
+        }
+        if (end == data.size()) {
+            return false;
+        }
+    }
+    return true;
+}
 
-// The next line as QSettings parts a text: quotes and backslashes join what would be several, and a
-// semicolon, which begins a comment, parts what would be one. Empty at the end.
-Line nextLine(const QByteArray &data, int position)
+} // namespace
+
+bool isPlainIni(const QString &path)
+{
+    return isPlain(readRegularFile(path, maximumIniSize));
+}
+
+bool isWellFormedIni(const QString &path)
+{
+    const RegularFile file = readRegularFile(path, maximumIniSize);
+    return isPlain(file) && findBrokenSection(file.content) < 0;
+}
+
+IniSpan nextIniLine(const QByteArray &data, int position)
 {
     while (isSpaceAt(data, position)) {
         ++position;
@@ -130,37 +154,6 @@ Line nextLine(const QByteArray &data, int position)
     return {start, qMin(position, data.size())};
 }
 
-// As in nearly all files, which need no closer look then: their lines end where these end or later.
-bool closesEveryBracket(const QByteArray &data)
-{
-    for (int start = data.indexOf('['); start >= 0; start = data.indexOf('[', start + 1)) {
-        int end = start;
-        while (end < data.size() && data.at(end) != ']') {
-            if (data.at(end) == ';' || isBreakAt(data, end)) {
-                return false;
-            }
-            ++end;
-        }
-        if (end == data.size()) {
-            return false;
-        }
-    }
-    return true;
-}
-
-} // namespace
-
-bool isPlainIni(const QString &path)
-{
-    return isPlain(readRegularFile(path, maximumIniSize));
-}
-
-bool isWellFormedIni(const QString &path)
-{
-    const RegularFile file = readRegularFile(path, maximumIniSize);
-    return isPlain(file) && findBrokenSection(file.content) < 0;
-}
-
 int findPackedValue(const QByteArray &data)
 {
     for (int position = 0; position < data.size(); ++position) {
@@ -177,8 +170,8 @@ int findBrokenSection(const QByteArray &data)
     if (closesEveryBracket(data)) {
         return -1;
     }
-    const QByteArray byteOrderMark = QByteArrayLiteral("\xef\xbb\xbf");
-    Line line = nextLine(data, data.startsWith(byteOrderMark) ? byteOrderMark.size() : 0);
+    const bool isMarked = data.startsWith(iniByteOrderMark);
+    IniSpan line = nextIniLine(data, isMarked ? int(qstrlen(iniByteOrderMark)) : 0);
     while (line.start < line.end) {
         if (data.at(line.start) == '[') {
             const int end = data.indexOf(']', line.start);
@@ -186,7 +179,7 @@ int findBrokenSection(const QByteArray &data)
                 return line.start;
             }
         }
-        line = nextLine(data, line.end);
+        line = nextIniLine(data, line.end);
     }
     return -1;
 }

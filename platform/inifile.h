@@ -11,6 +11,9 @@ class QString;
 
 constexpr qint64 maximumIniSize = qint64(1024) * 1024;
 
+// QSettings reads the values behind it as UTF-8, and as Latin-1 without.
+constexpr const char *iniByteOrderMark = "\xef\xbb\xbf";
+
 /*
     Whether QSettings may be let loose on what lies at the path. Of a pipe it waits for somebody to
     write, and a value such as @Variant(...) it unpacks whatever is in there: a few bytes make it
@@ -28,6 +31,16 @@ bool isPlainIni(const QString &path);
     an unchanged one it takes for good, so that the same file would be an error and then none.
 */
 bool isWellFormedIni(const QString &path);
+
+struct IniSpan {
+    int start;
+    int end;
+};
+
+// The next line from a position, as QSettings parts the text of a settings file: quotes and
+// backslashes join what would be several, and a semicolon, which begins a comment, parts what would
+// be one. Empty at the end.
+IniSpan nextIniLine(const QByteArray &data, int position);
 
 // Where in the text of a settings file the first value is that QSettings would unpack; negative if
 // there is none.

@@ -47,10 +47,11 @@ uint orderOfRow(const EventsWidgetsModel::Widget &widget)
     \brief Lists the widgets of the events screen.
 
     Packages offer widgets by installing a definition file, \c{*.json}, into
-    \c /usr/share/glimmera/eventswidgets; \l{marlo-eventswidgets(5)} tells what it holds. The model lists all of them and follows the directory and
-    the user's choice, \c /desktop/glimmera-marlo-home/events_screen_widgets (dconf, list of
-    strings): the paths of the enabled widgets. While the user has chosen nothing, each widget is
-    enabled or not by its own default.
+    \c /usr/share/glimmera/eventswidgets; \l{marlo-eventswidgets(5)} tells what it
+    holds. The model lists all of them and follows the directory and the user's choice,
+    \c /desktop/glimmera-marlo-home/events_screen_widgets (dconf, list of strings): the paths of the
+    enabled widgets. While the user has chosen nothing, each widget is enabled or not by its own
+    default.
 
     The roles of a row:
 

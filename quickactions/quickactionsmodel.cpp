@@ -69,10 +69,11 @@ uint priorityOfRow(const QuickActionsModel::Action &action)
     \brief Lists the quick actions of the events screen.
 
     Packages offer a quick action by installing a definition file, \c{*.conf}, into
-    \c /usr/share/glimmera/quickactions; \l{marlo-quickactions(5)} tells what it holds. The model lists those that the user has enabled, in the
-    user's order; with \l showPotential it lists all of them. It follows the directory, about a
-    second after a change, and the user's lists. (Rows that stay keep their places, though: what
-    another model or process orders anew is seen when the model is created the next time.)
+    \c /usr/share/glimmera/quickactions; \l{marlo-quickactions(5)} tells what it holds.
+    The model lists those that the user has enabled, in the user's order; with \l showPotential it
+    lists all of them. It follows the directory, about a second after a change, and the user's lists.
+    (Rows that stay keep their places, though: what another model or process orders anew is seen when
+    the model is created the next time.)
 
     \list
     \li \c /desktop/glimmera-marlo-home/events_screen_actions (dconf, list of strings): the paths of

@@ -7,6 +7,7 @@
 #include "formatterevents.h"
 #include "memorycardformatter.h"
 #include "messagelog.h"
+#include "usedupdescriptors.h"
 
 #include <QDBusConnection>
 #include <QLoggingCategory>
@@ -142,6 +143,7 @@ private Q_SLOTS:
     void removeAllFiles();
     void removeAllFilesNeedsAPath();
     void removeAllFilesFromACardThatIsNotMounted();
+    void removeAllFilesNeedsADescriptor();
     void mount();
     void unmount();
     void operationsWhileBusy();
@@ -824,6 +826,29 @@ void TestMemoryCardFormatter::removeAllFilesFromACardThatIsNotMounted()
     m_events->clear();
     m_formatter->mount();
     TRY_EVENTS("not busy, Mounting, busy, Idle, not busy");
+}
+
+void TestMemoryCardFormatter::removeAllFilesNeedsADescriptor()
+{
+    startDiskService("done");
+    const MountedCard mounted(card);
+    Files::write(mounted.file("file"), "x");
+    setCard(cardName, card);
+    // A first connection to a bus cannot be had without descriptors: QtDBus ends the process.
+    m_formatter->mount();
+    TRY_EVENTS("not busy, Mounting, busy, Idle, not busy");
+    m_events->clear();
+    {
+        const UsedUpDescriptors none;
+        m_formatter->removeAllFiles();
+        // It does not begin: a thread without descriptors would be the end of the process.
+        TRY_EVENTS("not busy, Mounting, busy, Error, not busy");
+    }
+    QCOMPARE(mounted.files(), words("file"));
+    m_events->clear();
+    m_formatter->removeAllFiles();
+    TRY_EVENTS("not busy, Mounting, busy, RemovingFiles, Idle, not busy");
+    QCOMPARE(mounted.files(), QStringList());
 }
 
 void TestMemoryCardFormatter::mount()

@@ -124,7 +124,6 @@ MemoryCardFormatter::~MemoryCardFormatter()
     // As a child the process would be killed here and waited for. A card that is half formatted is
     // of no use to anybody, and that it be formatted has been agreed to: the helper may finish. Its
     // process object goes when it has; should the application end before, the helper goes on.
-    m_process->disconnect(this);
     m_process->setParent(nullptr);
     connect(m_process, &QProcess::stateChanged, m_process, [process = m_process](auto state) {
         if (state == QProcess::NotRunning) {

@@ -60,6 +60,7 @@ private Q_SLOTS:
     void moveToItsOwnPlace();
     void moveBeyondTheRows();
     void moveIsNotReloaded();
+    void moveDuringAMove();
     void otherChoiceDuringAMove();
     void choiceOfSomebodyElseDuringAMove();
 
@@ -759,6 +760,25 @@ void TestQuickActionsModel::moveIsNotReloaded()
     QCOMPARE(changed.size(), 0);
     setEnabled({b, a, a});
     QCOMPARE(changed.size(), 1);
+}
+
+void TestQuickActionsModel::moveDuringAMove()
+{
+    setEnabled({add("a"), add("b"), add("c")});
+    QuickActionsModel *model = loadedModel();
+    bool answered = false;
+    connect(model, &QAbstractItemModel::rowsAboutToBeMoved, this, [&] {
+        if (!answered) {
+            answered = true;
+            model->move(1, 2);
+        }
+    });
+    // One after the other, and each of them once.
+    model->move(0, 1);
+    QVERIFY(answered);
+    QCOMPARE(names(model), list({"b", "a", "c"}));
+    QTRY_COMPARE(names(model), list({"b", "c", "a"}));
+    QCOMPARE(enabledInDconf(), list({"b", "c", "a"}));
 }
 
 void TestQuickActionsModel::otherChoiceDuringAMove()

@@ -229,7 +229,7 @@ void TestQuickAction::hugeArraysEnd()
 
 void TestQuickAction::ignoresOtherGroups()
 {
-    write("icon=i\n[extra]\ntitle=x\n[Remote-Arguments]\nsize=1\n1\\argument=a\n");
+    write("icon=i\n\\of-no-group=x\n[extra]\ntitle=x\n[Remote-Arguments]\nsize=1\n1\\argument=a\n");
     QCOMPARE(Action(m_path, false).config(),
              (QVariantMap{{QStringLiteral("icon"), QStringLiteral("i")}}));
 }

@@ -79,6 +79,7 @@ private Q_SLOTS:
 
     // Called back
     void handlersMayCallBack();
+    void changesWaitForOneAnother();
     void choicesMadeInTheMiddleOfAScan();
     void languageChangesInTheMiddleOfAScan();
     void languageChangesOfADyingModel();
@@ -1002,6 +1003,30 @@ void TestEventsWidgetsModel::handlersMayCallBack()
     m_key->set(QStringList{a});
     QTRY_COMPARE(column(model, EventsWidgetsModel::EnabledRole),
                  (QStringList{QStringLiteral("true"), QStringLiteral("false")}));
+}
+
+void TestEventsWidgetsModel::changesWaitForOneAnother()
+{
+    const QString needed = QStringLiteral("/usr/share/glimmera/needed");
+    Files::remove(needed);
+    const QByteArray widget = R"({ "path": "a", "available_path": "/usr/share/glimmera/needed" })";
+    writeFile("test.json", widget);
+    m_key->set(QStringList());
+    Model model;
+    QByteArrayList events;
+    const QObject context;
+    connect(&model, &Model::rowsAboutToBeInserted, &context, [&] {
+        events.append("begin");
+        m_key->set(QStringList{a});
+        Files::write(needed, "");
+        model.updateAvailable();
+    });
+    connect(&model, &Model::rowsInserted, &context, [&] { events.append("end"); });
+    connect(&model, &Model::dataChanged, &context, [&] { events.append("change"); });
+    writeFile("test.json", widget + R"(, { "path": "b" })");
+    model.directoryChanged();
+    QTRY_COMPARE(events, (QByteArrayList{"begin", "end", "change", "change"}));
+    Files::remove(needed);
 }
 
 void TestEventsWidgetsModel::choicesMadeInTheMiddleOfAScan()

@@ -17,6 +17,7 @@
 #include <QTest>
 #include <QTimer>
 #include <QUrl>
+#include <atomic>
 #include <csignal>
 #include <cstdio>
 #include <gio/gio.h>
@@ -270,6 +271,7 @@ private Q_SLOTS:
     void invalidValueUnsets();
     void temporaryItemStores();
     void deletedItemHearsNothing();
+    void deletedItemIsWatchedNoMore();
 
     void followsOtherProcesses();
     void followsSeveralChangesAtOnce();
@@ -444,6 +446,37 @@ void TestMGConfItem::deletedItemHearsNothing()
     DconfTool::write(key, "2");
     QTRY_COMPARE(changed.count(), 2); // the other item still follows the key
     QCOMPARE(heard, 0);
+}
+
+void TestMGConfItem::deletedItemIsWatchedNoMore()
+{
+    // What goes out over the connection that dconf uses, seen in a thread of GLib's.
+    static std::atomic<int> watches{0};
+    static const QString key = newKey();
+    GDBusConnection *const bus = g_bus_get_sync(G_BUS_TYPE_SESSION, nullptr, nullptr);
+    QVERIFY(bus != nullptr);
+    const auto count = [](GDBusConnection *, GDBusMessage *message, gboolean incoming, gpointer) {
+        const char *const rule = g_dbus_message_get_arg0(message);
+        const QByteArray path = "arg0path='" + key.toUtf8() + '\'';
+        if (incoming == FALSE && QByteArray(rule).contains(path)) {
+            const QByteArray member = g_dbus_message_get_member(message);
+            watches += member == "AddMatch" ? 1 : member == "RemoveMatch" ? -1 : 0;
+        }
+        return message;
+    };
+    const guint filter = g_dbus_connection_add_filter(bus, +count, nullptr, nullptr);
+
+    auto item = std::make_unique<MGConfItem>(key);
+    auto another = std::make_unique<MGConfItem>(key);
+    QTRY_COMPARE(watches.load(), 1);
+    item.reset();
+    QTest::qWait(100);
+    QCOMPARE(watches.load(), 1);
+    another.reset();
+    QTRY_COMPARE(watches.load(), 0);
+
+    g_dbus_connection_remove_filter(bus, filter);
+    g_object_unref(bus);
 }
 
 void TestMGConfItem::followsOtherProcesses()

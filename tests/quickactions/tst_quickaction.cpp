@@ -382,6 +382,7 @@ void TestQuickAction::packedValues_data()
     QTest::newRow("escaped letter") << "title=@V\\x61" + huge.mid(3) + '\n';
     QTest::newRow("continued line") << "title=\\\n" + huge + '\n';
     QTest::newRow("backslashes for nothing") << "title=\\q@\\zVa\\wriant(" + huge.mid(9) + '\n';
+    QTest::newRow("without a key, as the first byte") << '=' + huge + '\n';
     QTest::newRow("date and time") << QByteArray("title=@DateTime(\\0\\0\\0\\x10)\n");
 }
 

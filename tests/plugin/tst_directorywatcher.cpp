@@ -8,6 +8,29 @@
 #include <QTemporaryDir>
 #include <QtTest>
 
+#include <functional>
+#include <utility>
+
+#include <dlfcn.h>
+
+namespace {
+
+// Called once, before the next watch is made.
+std::function<void()> beforeNextWatch;
+
+} // namespace
+
+// Takes the place of the C library's own, in which there is no time to do anything in between.
+extern "C" Q_DECL_EXPORT int inotify_add_watch(int inotify, const char *path, uint32_t events)
+{
+    using Function = int (*)(int, const char *, uint32_t);
+    static const auto original = reinterpret_cast<Function>(dlsym(RTLD_NEXT, "inotify_add_watch"));
+    if (const auto function = std::exchange(beforeNextWatch, nullptr)) {
+        function();
+    }
+    return original(inotify, path, events);
+}
+
 class TestDirectoryWatcher : public QObject
 {
     Q_OBJECT
@@ -19,6 +42,8 @@ private Q_SLOTS:
     void reportsEntries();
     void reportsDirectoryMadeLater();
     void reportsDirectoryMadeAndFilledAtOnce();
+    void reportsDirectoryWhosePathIsMadeMeanwhile_data();
+    void reportsDirectoryWhosePathIsMadeMeanwhile();
     void reportsDirectoryMadeAgain();
     void reportsDirectoryReplacedAtOnce();
     void reportsDirectoryRenamedAway();
@@ -87,6 +112,26 @@ void TestDirectoryWatcher::reportsDirectoryMadeAndFilledAtOnce()
 
     spy.clear();
     Files::write(m_directory + QStringLiteral("/another"), "x");
+    QVERIFY(spy.wait());
+}
+
+void TestDirectoryWatcher::reportsDirectoryWhosePathIsMadeMeanwhile_data()
+{
+    QTest::addColumn<QString>("made");
+    QTest::newRow("first folder") << QStringLiteral("a");
+    QTest::newRow("parent") << QStringLiteral("a/b");
+    QTest::newRow("directory") << QStringLiteral("a/b/c");
+}
+
+void TestDirectoryWatcher::reportsDirectoryWhosePathIsMadeMeanwhile()
+{
+    QFETCH(QString, made);
+    // Between looking for the nearest folder that there is, and watching that.
+    beforeNextWatch = [this, &made] { Files::makeFolder(m_root->filePath(made)); };
+    const DirectoryWatcher watcher(m_directory);
+    QVERIFY(!beforeNextWatch);
+    QSignalSpy spy(&watcher, &DirectoryWatcher::directoryChanged);
+    Files::write(m_directory + QStringLiteral("/file"), "x");
     QVERIFY(spy.wait());
 }
 

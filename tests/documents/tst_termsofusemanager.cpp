@@ -176,6 +176,7 @@ void TestTermsOfUseManager::findsTheBestFile_data()
     row("fi_FI.UTF-8", "fi fi_FI en_GB", "fi"); // the language alone comes first, on purpose
     row("fi_FI.UTF-8", "fi", "fi");
     row("fi_FI.UTF-8", "fi_FI en_GB", "fi_FI");
+    row("C.UTF-8", "C en_GB", "C");
     row("fi_FI", "fi_FI fi en_GB", "fi_FI");
     row("fi_FI", "fi en_GB", "fi");
     row("fi", "fi en_GB", "fi");

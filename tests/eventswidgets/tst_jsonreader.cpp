@@ -31,6 +31,7 @@ private Q_SLOTS:
     void nestedValues();
     void passesWhatItIsNotAskedFor();
     void positionOfAValue();
+    void memberWithoutAKey();
     void positionOfAnError_data();
     void positionOfAnError();
 
@@ -381,6 +382,19 @@ void TestJsonReader::passesWhatItIsNotAskedFor()
     QCOMPARE(reader.readString(), QString());
     QVERIFY(!reader.nextElement());
     QVERIFY(reader.atEnd());
+}
+
+void TestJsonReader::memberWithoutAKey()
+{
+    const QByteArray text = R"({ "a": 1, 2 })";
+    JsonReader reader(text);
+    QVERIFY(reader.beginObject());
+    std::string_view key;
+    QVERIFY(reader.nextMember(&key));
+    QCOMPARE(reader.readInt(-1), 1);
+    // Nobody takes the key of the member before for this one's.
+    QVERIFY(!reader.nextMember(&key));
+    QVERIFY(!reader.atEnd());
 }
 
 void TestJsonReader::positionOfAValue()

@@ -8,7 +8,11 @@
 #include <QTemporaryDir>
 #include <QtTest>
 
+#include <memory>
+
+#include <fcntl.h>
 #include <sys/resource.h>
+#include <unistd.h>
 
 class TestWriteWatcher : public QObject
 {
@@ -26,6 +30,7 @@ private Q_SLOTS:
     void followsTheNameNotTheDirectory();
     void missingDirectory();
     void withoutWatches();
+    void withoutAStandardInput();
 
 private:
     QString file(int number = 0) const
@@ -171,6 +176,23 @@ void TestWriteWatcher::withoutWatches()
     watcher.watch(m_directory);
     rewrite(file());
     QVERIFY(!spy.wait(100));
+}
+
+void TestWriteWatcher::withoutAStandardInput()
+{
+    // The lowest descriptor is as good as any other.
+    const int input = dup(STDIN_FILENO);
+    close(STDIN_FILENO);
+    auto watcher = std::make_unique<WriteWatcher>();
+    QVERIFY(fcntl(STDIN_FILENO, F_GETFD) != -1);
+    QSignalSpy spy(watcher.get(), &WriteWatcher::written);
+    watcher->watch(m_directory);
+    rewrite(file());
+    QVERIFY(spy.wait());
+    watcher.reset();
+    QCOMPARE(fcntl(STDIN_FILENO, F_GETFD), -1);
+    dup2(input, STDIN_FILENO);
+    close(input);
 }
 
 QTEST_GUILESS_MAIN(TestWriteWatcher)

@@ -53,6 +53,8 @@ const QStringList &knownKeys()
 }
 
 constexpr int maximumName = 255;
+// Of a call, whose signature has no more letters. What is beyond is not read.
+constexpr int maximumArguments = 255;
 
 // What a call may go out to, by D-Bus's own rules. QtDBus answers other names with an error.
 struct Name {
@@ -285,8 +287,7 @@ void QuickActionCheck::checkArguments()
     const bool hasArray = m_lineOf.contains(sizeKey) || highest > 0;
     const QVariantList arguments = hasArray ? m_action.arguments() : QVariantList();
     const int size = arguments.size();
-    if (highest > size) {
-        m_argumentsAreWrong = true;
+    if (highest > size && size <= maximumArguments) {
         const bool hasSize = m_lineOf.contains(sizeKey);
         add(hasSize ? lineOf(sizeKey) : highestLine, Severity::Error, argumentsRule,
             hasSize ? QStringLiteral("\"size\" leaves out argument %1").arg(highest)

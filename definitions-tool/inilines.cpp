@@ -25,7 +25,7 @@ QString fromLatin1(const QByteArray &text)
 // Keys and sections are escaped like in a URL, and a backslash is what parts groups.
 QString unescaped(const QByteArray &name)
 {
-    return fromLatin1(QByteArray::fromPercentEncoding(name.trimmed()).replace('\\', '/'));
+    return fromLatin1(QByteArray::fromPercentEncoding(name).replace('\\', '/'));
 }
 
 // Of a line, the first one outside quotes; negative if there is none.
@@ -82,7 +82,13 @@ std::vector<IniLine> readIniLines(const QByteArray &text)
             const bool isMarked = start > 0 && !text.left(span.start).contains('\n')
                 && !text.left(span.start).contains('\r');
             const int keyStart = isMarked ? 0 : span.start;
-            const QString key = unescaped(text.mid(keyStart, equals - keyStart));
+            int keyEnd = equals;
+            // No other white space is taken off.
+            while (keyEnd > keyStart
+                   && (text.at(keyEnd - 1) == ' ' || text.at(keyEnd - 1) == '\t')) {
+                --keyEnd;
+            }
+            const QString key = unescaped(text.mid(keyStart, keyEnd - keyStart));
             line = {IniLine::Kind::Key, 0, section + key};
             line.isMarked = isMarked;
             line.isCut = span.end < text.size() && text.at(span.end) == ';'

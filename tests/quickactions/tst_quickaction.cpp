@@ -7,6 +7,7 @@
 #include "messagelog.h"
 #include "quickaction.h"
 #include "recordingservice.h"
+#include "usedupdescriptors.h"
 
 #include <QtTest>
 
@@ -36,6 +37,7 @@ private Q_SLOTS:
     void priority();
     void unreadable_data();
     void unreadable();
+    void cannotBeOpened();
     void brokenFilesStayBroken_data();
     void brokenFilesStayBroken();
     void packedValues_data();
@@ -325,6 +327,17 @@ void TestQuickAction::unreadable()
     QCOMPARE(Action(m_path, true).config(), QVariantMap());
     QCOMPARE(m_log->takeReport(), QString::fromLatin1(unreadableWarning));
     Files::remove(target);
+}
+
+void TestQuickAction::cannotBeOpened()
+{
+    write("title=x\n");
+    {
+        const UsedUpDescriptors none;
+        QCOMPARE(Action(m_path, true).config(), QVariantMap());
+    }
+    QCOMPARE(m_log->takeReport(), QString::fromLatin1(unreadableWarning));
+    QCOMPARE(Action(m_path, true).title(), QStringLiteral("x"));
 }
 
 void TestQuickAction::brokenFilesStayBroken_data()

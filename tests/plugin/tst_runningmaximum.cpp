@@ -51,6 +51,7 @@ void TestRunningMaximum::empty()
     QCOMPARE(maximum.firstAbove(7), 1);
     maximum.clear();
     QCOMPARE(maximum.firstAbove(0), 0);
+    QCOMPARE(maximum.firstAbove(7), 0);
 }
 
 void TestRunningMaximum::sortedRows()

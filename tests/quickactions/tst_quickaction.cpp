@@ -11,6 +11,8 @@
 
 #include <QtTest>
 
+#include <unistd.h>
+
 using Action = QuickActionsModel::Action;
 using Answer = RecordingService::Answer;
 
@@ -38,6 +40,7 @@ private Q_SLOTS:
     void unreadable_data();
     void unreadable();
     void cannotBeOpened();
+    void withoutAStandardInput();
     void brokenFilesStayBroken_data();
     void brokenFilesStayBroken();
     void packedValues_data();
@@ -338,6 +341,19 @@ void TestQuickAction::cannotBeOpened()
     }
     QCOMPARE(m_log->takeReport(), QString::fromLatin1(unreadableWarning));
     QCOMPARE(Action(m_path, true).title(), QStringLiteral("x"));
+}
+
+void TestQuickAction::withoutAStandardInput()
+{
+    // The lowest descriptor is as good as any other to look for what is packed.
+    write("title=@DateTime(\\0\\0\\0\\x10)\n");
+    const int input = dup(STDIN_FILENO);
+    close(STDIN_FILENO);
+    const Action action(m_path, true);
+    dup2(input, STDIN_FILENO);
+    close(input);
+    QCOMPARE(action.config(), QVariantMap());
+    QCOMPARE(m_log->takeReport(), QString::fromLatin1(unreadableWarning));
 }
 
 void TestQuickAction::brokenFilesStayBroken_data()

@@ -41,6 +41,8 @@ private Q_SLOTS:
     void unreadable();
     void cannotBeOpened();
     void withoutAStandardInput();
+    void leavesNothingOpen();
+    void shorterThanItSays();
     void brokenFilesStayBroken_data();
     void brokenFilesStayBroken();
     void packedValues_data();
@@ -354,6 +356,32 @@ void TestQuickAction::withoutAStandardInput()
     close(input);
     QCOMPARE(action.config(), QVariantMap());
     QCOMPARE(m_log->takeReport(), QString::fromLatin1(unreadableWarning));
+}
+
+void TestQuickAction::leavesNothingOpen()
+{
+    const auto openFiles = [] { return QDir(QStringLiteral("/proc/self/fd")).count(); };
+    write("title=x\n");
+    const uint before = openFiles();
+    QCOMPARE(Action(m_path, true).title(), QStringLiteral("x"));
+    QCOMPARE(openFiles(), before);
+}
+
+void TestQuickAction::shorterThanItSays()
+{
+    QFile number(QStringLiteral("/sys/kernel/uevent_seqnum"));
+    QVERIFY(number.open(QIODevice::ReadOnly));
+    const QByteArray content = number.readAll();
+    if (number.size() <= content.size()) {
+        QSKIP("the kernel tells the size of its files as it is");
+    }
+    Files::makeLink(number.fileName(), m_path);
+    const QVariantMap config = Action(m_path, true).config();
+    const QString report = m_log->takeReport();
+    Files::remove(m_path);
+    write(content);
+    QCOMPARE(config, Action(m_path, true).config());
+    QCOMPARE(report, m_log->takeReport());
 }
 
 void TestQuickAction::brokenFilesStayBroken_data()

@@ -387,7 +387,7 @@ Gallery {
     }
 
     Connections {
-        target: Stage
+        target: (Stage) // qmllint crashes at a singleton here, in parentheses it does not
         function onWarning(text) {
             gallery.fail(text);
         }

@@ -46,7 +46,7 @@ ColumnLayout {
     }
 
     Connections {
-        target: Stage
+        target: (Stage) // qmllint crashes at a singleton here, in parentheses it does not
         function onCallReceived(service, method, args) {
             const list = args.map(argument => '"' + argument + '"').join(", ");
             calls.insert(0, { service: service, call: method + "(" + list + ")" });

@@ -62,7 +62,7 @@ QVariantMap changedProperties(const QDBusMessage &message)
 
     \qml
     Label {
-        text: cover.kivReady ? cover.kivId || "No cover" : "The cover is being read"
+        text: cover.kivReady ? cover.kivId || "No cover" : "Not ready"
 
         KivInfo { id: cover }
     }
@@ -91,7 +91,8 @@ KivInfo::KivInfo(QObject *parent) : QObject(parent)
     \qmlproperty bool KivInfo::kivReady
     \readonly
 
-    Whether the daemon is ready: its property \c Ready is 1.
+    Whether the daemon is ready: its property \c Ready is 1. False until it has answered, and without
+    a daemon.
 */
 
 /*!

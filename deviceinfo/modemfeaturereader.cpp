@@ -38,7 +38,8 @@ ModemFeatureReader::ModemFeatureReader(QObject *parent) : QObject(parent)
 
     The key \c variant of \c /usr/share/modem-software/features.ini, which stands before the first
     section or in the section \c General. Read from the file on every read. Empty if there is no
-    such file or key, and if the value is a list: an unquoted comma makes it one.
+    such file or key, if the value is a list, which an unquoted comma makes it, and if the file is
+    larger than 1 MiB or has values that QSettings would unpack.
 */
 QString ModemFeatureReader::variant() const
 {

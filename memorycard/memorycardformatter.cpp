@@ -86,7 +86,8 @@ bool canStartThread()
 
     A failed command ends the sequence and leads to the status \c Error, from which every operation
     is accepted again. Commands act on the card that was set when they were asked for, whatever is
-    set by the time they run.
+    set by the time they run; one that was asked for without a \l deviceName mounts or unmounts by
+    the one that is set when it runs.
 
     \qml
     Button {
@@ -160,7 +161,8 @@ MemoryCardFormatter::Status MemoryCardFormatter::status() const
     \qmlproperty string MemoryCardFormatter::deviceName
 
     The kernel name of the block device, such as \c mmcblk1p1, by which the disk service is asked to
-    mount and unmount it. It may be set at any time, for what is asked for from then on.
+    mount and unmount it. It may be set at any time; it counts for what is asked for from then on, and
+    for what was asked for without a name.
 */
 QString MemoryCardFormatter::deviceName() const
 {
@@ -208,8 +210,9 @@ void MemoryCardFormatter::setDevicePath(const QString &path)
     \readonly
 
     The type of the file system on the card, such as \c vfat, as the helper program reported it when
-    it was last run to probe; a failed probe usually leaves it empty. The text is what the helper
-    writes to its standard output, without white space around it.
+    it was last run to probe: what it wrote to its standard output, without white space around it. A
+    helper that exits with an error usually leaves it empty; one that crashes or cannot be started
+    leaves it as it was.
 */
 QString MemoryCardFormatter::filesystemType() const
 {
@@ -255,6 +258,10 @@ bool MemoryCardFormatter::busy() const
     \b {Everything on the card is lost.} The helper program is run for any other type too, without a
     command word, and decides. An empty type or \l devicePath leads to \c Error with a warning, and
     so does a card that is not mounted, with unmountError().
+
+    \b {Set \l deviceName before.} Without it nothing happens at first but a critical message. The
+    formatting stays in the queue and is done before whatever is asked for next, even if that is only
+    unmount() or a new \l devicePath.
 */
 void MemoryCardFormatter::format(const QString &type)
 {
@@ -283,7 +290,8 @@ void MemoryCardFormatter::format(const QString &type)
 
     Mounts the card, unless it is mounted, and removes all files and folders on it. What cannot be
     removed stays and leads to \c Error once all else is gone. An empty \l devicePath leads to
-    \c Error with a warning.
+    \c Error with a warning. Without a \l deviceName the removal stays in the queue, as a
+    formatting does: see format().
 */
 void MemoryCardFormatter::removeAllFiles()
 {

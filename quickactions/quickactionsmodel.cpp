@@ -72,8 +72,9 @@ uint priorityOfRow(const QuickActionsModel::Action &action)
     \c /usr/share/glimmera/quickactions; \l{marlo-quickactions(5)} tells what it holds.
     The model lists those that the user has enabled, in the user's order; with \l showPotential it
     lists all of them. It follows the directory, about a second after a change, and the user's lists.
-    (Rows that stay keep their places, though: what another model or process orders anew is seen when
-    the model is created the next time.)
+    (Rows that stay keep their places, though: with \l showPotential an action that is enabled or
+    disabled, one whose file gives another priority, and what another model or process orders anew
+    take their new places when the model is created the next time.)
 
     \list
     \li \c /desktop/glimmera-marlo-home/events_screen_actions (dconf, list of strings): the paths of
@@ -141,8 +142,8 @@ QuickActionsModel::~QuickActionsModel()
     \qmlproperty bool QuickActionsModel::showPotential
 
     Whether every action that is offered is listed, enabled or not, for a page on which the user
-    enables, disables and orders them. The enabled ones are placed first, in the user's order, then
-    the others by the priority that their files give, each before the first row of a greater priority
+    enables, disables and orders them. As the model loads, the enabled ones are placed first, in the
+    user's order, then the others by the priority that their files give, each before the first row of a greater priority
     or of none, whether that is enabled or not. The default is false.
 */
 bool QuickActionsModel::showPotential() const

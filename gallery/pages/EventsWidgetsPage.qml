@@ -22,7 +22,7 @@ GalleryPage {
             model: widgets
             TextSwitch {
                 text: model.title
-                icon.source: model.icon ? "file://" + model.icon : ""
+                icon.source: /^\//.test(model.icon) ? "file://" + model.icon : model.icon || ""
                 description: model.description
                 remark: model.available ? "" : qsTrId("gallery-events-widgets-unavailable")
                 // An item has an `enabled` of its own, so the role is asked of the model.

@@ -132,7 +132,7 @@ GalleryPage {
     }
 
     Section {
-        // No path is probed like any other, and fails.
+        // An empty path is probed like any other, and that fails.
         visible: page.cardName !== ""
         heading: qsTrId("gallery-card-steps")
 

@@ -25,7 +25,7 @@ GalleryPage {
                 model: actions
                 Tile {
                     text: model.title || model.path
-                    icon.source: model.icon ? "file://" + model.icon : ""
+                    icon.source: /^\//.test(model.icon) ? "file://" + model.icon : model.icon || ""
                     onClicked: actions.triggerAction(index)
                 }
             }

@@ -41,7 +41,7 @@ GalleryPage {
             model: allActions
             TextSwitch {
                 text: model.title || model.path
-                icon.source: model.icon ? "file://" + model.icon : ""
+                icon.source: /^\//.test(model.icon) ? "file://" + model.icon : model.icon || ""
                 // An item has an `enabled` of its own, so the role is asked of the model.
                 checked: model.enabled
                 onToggled: {

@@ -103,12 +103,6 @@ Gallery {
             () => press(qsTrId("gallery-card-empty")),
             () => press(qsTrId("gallery-card-remove")),
             () => StagedCard.fileCount === 0 && shows("2. " + qsTrId("gallery-card-idle"))] },
-        { page: "memory-card", state: "busy", moving: true, steps: [
-            () => probed(),
-            () => stage(qsTrId("gallery-card-helper-waits")),
-            () => press(qsTrId("gallery-card-format").arg("ext4")),
-            () => press(qsTrId("gallery-card-erase")),
-            () => shows("2. " + qsTrId("gallery-card-formatting"))] },
         { page: "memory-card", state: "formatted", steps: [
             () => probed(),
             () => StagedCard.mounted || press(qsTrId("gallery-card-mount")),
@@ -143,6 +137,15 @@ Gallery {
             () => stage(qsTrId("gallery-card-helper")),
             () => press(qsTrId("gallery-stage-reload")),
             () => shows(qsTrId("gallery-card-failed"))] },
+        // The last: the helper goes on when its page has gone, and nothing may mount the card then.
+        { page: "memory-card", state: "busy", moving: true, steps: [
+            () => probed(),
+            () => StagedCard.mounted || press(qsTrId("gallery-card-mount")),
+            () => StagedCard.mounted && shows(qsTrId("gallery-card-idle")),
+            () => stage(qsTrId("gallery-card-helper-waits")),
+            () => press(qsTrId("gallery-card-format").arg("ext4")),
+            () => press(qsTrId("gallery-card-erase")),
+            () => shows("2. " + qsTrId("gallery-card-formatting"))] },
 
         { page: "location", steps: [] },
         { page: "location", state: "agreed", steps: [

@@ -42,10 +42,10 @@ TextFileReader::TextFileReader(QObject *parent) : QObject(parent)
 /*!
     \qmlmethod string TextFileReader::readContent(string filePath)
 
-    Returns the text of the file \a filePath, a local path and no URL, without its line breaks: the lines follow each other
-    with nothing in between. The text is empty if the file cannot be opened, as pipes, sockets and
-    devices cannot; nothing is logged. It is read in the encoding of the system's locale, or in the
-    one that a byte-order mark tells.
+    Returns the text of the file \a filePath, a local path and no URL, without its line breaks: the
+    lines follow each other with nothing in between. The text is empty if the file cannot be opened,
+    as pipes, sockets and devices cannot; nothing is logged. It is read in the encoding of the
+    system's locale, or in the one that a byte-order mark tells.
 */
 QString TextFileReader::readContent(const QString &filePath) const
 {

@@ -143,8 +143,8 @@ QuickActionsModel::~QuickActionsModel()
 
     Whether every action that is offered is listed, enabled or not, for a page on which the user
     enables, disables and orders them. As the model loads, the enabled ones are placed first, in the
-    user's order, then the others by the priority that their files give, each before the first row of a greater priority
-    or of none, whether that is enabled or not. The default is false.
+    user's order, then the others by the priority that their files give, each before the first row of
+    a greater priority or of none, whether that is enabled or not. The default is false.
 */
 bool QuickActionsModel::showPotential() const
 {

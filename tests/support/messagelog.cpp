@@ -5,7 +5,10 @@
 
 #include <QMutex>
 #include <QMutexLocker>
+#include <QRegularExpression>
 #include <QStringList>
+
+#include <algorithm>
 
 namespace {
 
@@ -69,4 +72,12 @@ QString MessageLog::takeReport()
                          .arg(QLatin1String(types[message.type]), message.category, message.text));
     }
     return lines.join(QLatin1Char('\n'));
+}
+
+QStringList MessageLog::takeLinesWithout(const QRegularExpression &ignored)
+{
+    QStringList lines = takeReport().split(QLatin1Char('\n'), Qt::SkipEmptyParts);
+    const auto isIgnored = [&ignored](const QString &line) { return line.contains(ignored); };
+    lines.erase(std::remove_if(lines.begin(), lines.end(), isIgnored), lines.end());
+    return lines;
 }

@@ -9,6 +9,8 @@
 #include <QStringList>
 #include <QtGlobal>
 
+class QRegularExpression;
+
 /*
     Takes every message that is logged while it lives. A test asks for the messages that it expects,
     in their order; whatever is left is unexpected and should fail it:
@@ -41,6 +43,8 @@ public:
     QStringList takeTexts();
     // takeAll() as a text of a line each.
     QString takeReport();
+    // The lines of takeReport() but for those that match: what others log and no test has a say in.
+    QStringList takeLinesWithout(const QRegularExpression &ignored);
 };
 
 #endif

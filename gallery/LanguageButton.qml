@@ -4,7 +4,7 @@
 import QtQuick 2.15
 import QtQuick.Controls 2.15
 import QtQuick.Controls.Universal 2.15
-import gallery.stage 1.0
+import gallery.simulation 1.0
 
 /*
     Shows the language and lets the user choose another.
@@ -12,9 +12,9 @@ import gallery.stage 1.0
 ToolButton {
     id: button
 
-    readonly property var languages: ({ "en": "English", "fi": "Suomi", "de": "Deutsch" })
+    readonly property var languages: ({ "en": "English", "fi": "Suomi" })
 
-    text: Stage.language.toUpperCase()
+    text: Simulation.language.toUpperCase()
     icon.source: "icons/language.svg"
     Accessible.name: qsTrId("gallery-language")
     onClicked: menu.open()
@@ -29,8 +29,8 @@ ToolButton {
             MenuItem {
                 text: button.languages[modelData]
                 checkable: true
-                checked: Stage.language === modelData
-                onTriggered: Stage.language = modelData
+                checked: Simulation.language === modelData
+                onTriggered: Simulation.language = modelData
             }
         }
     }

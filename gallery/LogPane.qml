@@ -4,7 +4,7 @@
 import QtQuick 2.15
 import QtQuick.Controls 2.15
 import QtQuick.Layouts 1.15
-import gallery.stage 1.0
+import gallery.simulation 1.0
 
 /*
     What the module and QML report, as it comes: the latest in a line, or all of it.

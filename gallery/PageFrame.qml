@@ -5,8 +5,8 @@ import QtQuick 2.15
 import QtQuick.Layouts 1.15
 
 /*
-    A page of pages/ as it is, and what plays the device around it (a file of the same name in
-    scenes/): beside it where there is room, below it otherwise.
+    A page of pages/, unchanged, and the panel that simulates the device around it (the file of the same name in
+    simulations/): beside it where there is room, below it otherwise.
 */
 ScrollingPage {
     id: frame
@@ -14,7 +14,7 @@ ScrollingPage {
     // Of Pages; another language brings another one.
     property var entry
     readonly property Item page: pageLoader.item
-    readonly property Item scene: sceneLoader.item
+    readonly property Item simulation: simulationLoader.item
 
     function reload() {
         pageLoader.active = false;
@@ -31,18 +31,18 @@ ScrollingPage {
         source: "pages/" + frame.entry.file
     }
 
-    StagePane {
+    SimulationPanel {
         Layout.fillWidth: true
         Layout.maximumWidth: frame.columns === 2 ? 340 : -1
         Layout.alignment: Qt.AlignTop
         onReloadRequested: frame.reload()
 
         Loader {
-            id: sceneLoader
+            id: simulationLoader
             Layout.fillWidth: true
-            source: "scenes/" + frame.entry.file.replace("Page", "Scene")
+            source: "simulations/" + frame.entry.file.replace("Page", "Simulation")
             onLoaded: {
-                // Some scenes have something for the page, as the application around it would.
+                // Some simulations have something for the page, as the application around it would.
                 if (item.hasOwnProperty("page")) {
                     item.page = Qt.binding(() => frame.page);
                 }

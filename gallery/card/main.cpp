@@ -100,8 +100,8 @@ int main(int argc, char *argv[])
         whyNot = QStringLiteral("none could be set up");
     }
     if (!whyNot.isEmpty()) {
-        std::fprintf(stderr, "gallery: the memory card is played: %s\n", qPrintable(whyNot));
-        // What the played one mounts is to go with the command, too.
+        std::fprintf(stderr, "gallery: the memory card is simulated: %s\n", qPrintable(whyNot));
+        // What the simulated one mounts must be unmounted with the command, too.
         if (unshare(CLONE_NEWNS) == 0) {
             mount(nullptr, "/", nullptr, MS_REC | MS_PRIVATE, nullptr);
         }

@@ -3,9 +3,9 @@
 
 import QtQuick 2.15
 import QtTest 1.15
-import gallery.stage 1.0
+import gallery.simulation 1.0
 import "../../gallery"
-import "../../gallery/screen.js" as Screen
+import "screen.js" as Screen
 
 // Every page of the gallery, driven with the pointer and the keys as a person would, who looks at
 // the screen for what comes of it.
@@ -40,8 +40,8 @@ TestCase {
     }
 
     function cleanup() {
-        Stage.language = "en";
-        Stage.cover = Stage.NoCover;
+        Simulation.language = "en";
+        Simulation.cover = Simulation.NoCover;
         gallery.destroy();
         gallery = null;
         wait(0);
@@ -177,7 +177,7 @@ TestCase {
         }
         for (const size of [[360, 640], [640, 360], [800, 600], [1280, 800], [1920, 1080]]) {
             for (const language of ["en", "fi", "de"]) {
-                Stage.language = language;
+                Simulation.language = language;
                 gallery.width = size[0];
                 gallery.height = size[1];
                 until(() => Screen.flaw(surface) === "", "a flaw");
@@ -206,7 +206,7 @@ TestCase {
         tryCompare(gallery.currentPage, "title", gallery.pages[entry].title);
 
         const reached = [];
-        for (let i = 0; i < 60 && !reached.includes("Open the page anew"); ++i) {
+        for (let i = 0; i < 60 && !reached.includes("Open the page again"); ++i) {
             keyClick(Qt.Key_Tab);
             reached.push(focused().text);
             if (Screen.isText(focused()) || !gallery.currentPage.contains(focused())) {
@@ -404,7 +404,7 @@ TestCase {
     }
 
     function waitForCard() {
-        tryCompare(StagedCard, "ready", true, patience);
+        tryCompare(SimulatedCard, "ready", true, patience);
         until(() => Screen.control(surface, "Mount").enabled && shows("Ready"));
     }
 
@@ -414,25 +414,25 @@ TestCase {
         until(() => shows("ext4") || shows("vfat"), "probed");
 
         tap("Mount");
-        tryCompare(StagedCard, "mounted", true, patience);
-        see("The card is mounted. Files and folders at its top: " + StagedCard.fileCount);
+        tryCompare(SimulatedCard, "mounted", true, patience);
+        see("The card is mounted. Files and folders at its top: " + SimulatedCard.fileCount);
         see("2. Ready");
         tap("Put files on the card");
-        until(() => StagedCard.fileCount >= 2, "filled");
+        until(() => SimulatedCard.fileCount >= 2, "filled");
         tap("Mount");
         see("The card is mounted already.");
         expectMessages(["AlreadyMounted"]);
 
         // Asked first; who declines keeps the files.
-        const files = StagedCard.fileCount;
+        const files = SimulatedCard.fileCount;
         tap("Remove all files");
         see("Remove all files?");
         tap("Cancel");
         seeNot("Remove all files?");
-        compare(StagedCard.fileCount, files);
+        compare(SimulatedCard.fileCount, files);
         tap("Remove all files");
         tap("Remove");
-        tryCompare(StagedCard, "fileCount", 0, patience);
+        tryCompare(SimulatedCard, "fileCount", 0, patience);
         see("1. Removing files");
         see("2. Ready");
         expectMessages(["AlreadyMounted"]);
@@ -474,15 +474,15 @@ TestCase {
         tap("Mount");
         tap("Works");
         expectMessages(["DBus.Error."]);
-        tryCompare(StagedCard, "ready", true, patience);
+        tryCompare(SimulatedCard, "ready", true, patience);
         tap("Mount");
-        tryCompare(StagedCard, "mounted", true, patience);
+        tryCompare(SimulatedCard, "mounted", true, patience);
         tap("Unmount");
-        tryCompare(StagedCard, "mounted", false, patience);
+        tryCompare(SimulatedCard, "mounted", false, patience);
         waitForCard();
 
         tap("The helper program is installed");
-        tap("Open the page anew");
+        tap("Open the page again");
         see("That did not succeed.");
         see("Unknown");
         tap("The helper program is installed");
@@ -495,10 +495,10 @@ TestCase {
 
     function test_cardSaysWhetherItIsReal() {
         openPage("memory-card");
-        see(StagedCard.real ? "A real card: %1, an ext4 file system in memory, and the real disk "
-                              .arg(StagedCard.name) + "service"
-                            : "A played card and disk service. When unmounted, the card forgets "
-                              + "its files.");
+        see(SimulatedCard.real ? "A real card: %1, an ext4 file system in memory, and the real disk "
+                              .arg(SimulatedCard.name) + "service"
+                            : "The card and the disk service are simulated. Unmounting the card "
+                              + "removes its files.");
         waitForCard();
     }
 
@@ -531,11 +531,11 @@ TestCase {
         seeSwitch("Use custom settings", true);
 
         tap("The terms of MLS are installed");
-        tap("Open the page anew");
+        tap("Open the page again");
         see("The terms of this service could not be found.");
         expectMessages(["No agreement found"]);
         tap("The terms of MLS are installed");
-        tap("Open the page anew");
+        tap("Open the page again");
         seeNot("The terms of this service could not be found.");
         seeSwitch("Use custom settings", true);
     }
@@ -549,7 +549,7 @@ TestCase {
         tap("A cover that is ready");
         see("Ready");
         tap("No daemon");
-        tap("Open the page anew");
+        tap("Open the page again");
         see("No cover");
         see("Not ready");
         // A daemon that starts while the page is open.
@@ -564,11 +564,11 @@ TestCase {
         openPage("bluetooth");
         see("00:1a:7d:da:71:13");
         tap("The platform has an address file");
-        tap("Open the page anew");
+        tap("Open the page again");
         see("Unknown");
         expectMessages(["Unable to open file"]);
         tap("The platform has an address file");
-        tap("Open the page anew");
+        tap("Open the page again");
         see("00:1a:7d:da:71:13");
     }
 
@@ -577,10 +577,10 @@ TestCase {
         see("Shown: Android support is installed");
         // Its switch has the name that the page says.
         tap("Android support is installed");
-        tap("Open the page anew");
+        tap("Open the page again");
         see("Hidden: no Android support");
         tap("Android support is installed");
-        tap("Open the page anew");
+        tap("Open the page again");
         see("Shown: Android support is installed");
     }
 
@@ -588,10 +588,10 @@ TestCase {
         openPage("modem");
         seeNot("Unknown");
         tap("The modem software is installed");
-        tap("Open the page anew");
+        tap("Open the page again");
         see("Unknown");
         tap("The modem software is installed");
-        tap("Open the page anew");
+        tap("Open the page again");
         seeNot("Unknown");
         goBack();
     }
@@ -611,12 +611,12 @@ TestCase {
 
         tap("The vendor has terms");
         tap("The platform has terms");
-        tap("Open the page anew");
+        tap("Open the page again");
         see("No terms");
         expectMessages(["unable to load"]);
         tap("The vendor has terms");
         tap("The platform has terms");
-        tap("Open the page anew");
+        tap("Open the page again");
         seeNot("No terms");
     }
 
@@ -625,12 +625,12 @@ TestCase {
         seeNot("Nothing to read.");
         tap("The file is there");
         tap("The folder is there");
-        tap("Open the page anew");
+        tap("Open the page again");
         until(() => Screen.texts(surface).filter(item => item.text === "Nothing to read.")
                                              .length === 2, "both are empty");
         tap("The file is there");
         tap("The folder is there");
-        tap("Open the page anew");
+        tap("Open the page again");
         seeNot("Nothing to read.");
     }
 }

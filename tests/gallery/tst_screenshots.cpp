@@ -14,7 +14,7 @@
 
 namespace {
 
-const QLatin1String gallery(GALLERY_DIR);
+const QLatin1String source(SOURCE_DIR);
 // A page without content is of one colour below the header; smooth text and icons bring many.
 constexpr int headerHeight = 48;
 constexpr int enoughColours = 20;
@@ -25,12 +25,13 @@ struct Result {
     QString output;
 };
 
-Result takeScreenshots(const QString &program, const QString &folder)
+Result takeScreenshots(const QString &source, const QString &folder)
 {
     QProcess process;
     process.setProcessChannelMode(QProcess::MergedChannels);
-    process.start(QStringLiteral(QML_PROGRAM),
-                  {program + QStringLiteral("/Screenshots.qml"), QStringLiteral("--"), folder});
+    process.start(
+        QStringLiteral(QML_PROGRAM),
+        {source + QStringLiteral("/tests/gallery/Screenshots.qml"), QStringLiteral("--"), folder});
     Result result;
     if (process.waitForFinished(patience) && process.exitStatus() == QProcess::NormalExit) {
         result.exitCode = process.exitCode();
@@ -51,14 +52,14 @@ int countColours(const QImage &image)
     return colours.size();
 }
 
-void copyFolder(const QString &from, const QString &to)
+void copyDirectory(const QString &from, const QString &to)
 {
     QVERIFY(QDir().mkpath(to));
     const QFileInfoList entries = QDir(from).entryInfoList(QDir::AllEntries | QDir::NoDotAndDotDot);
     for (const QFileInfo &entry : entries) {
         const QString target = to + QLatin1Char('/') + entry.fileName();
         if (entry.isDir()) {
-            copyFolder(entry.filePath(), target);
+            copyDirectory(entry.filePath(), target);
         } else {
             QVERIFY2(QFile::copy(entry.filePath(), target), qPrintable(target));
         }
@@ -81,7 +82,7 @@ private Q_SLOTS:
 void ScreenshotsTest::everyPageIsShown()
 {
     const QTemporaryDir folder;
-    const Result result = takeScreenshots(gallery, folder.path());
+    const Result result = takeScreenshots(source, folder.path());
     // The problem comes last.
     QVERIFY2(result.exitCode == 0, qPrintable(result.output.right(800)));
 
@@ -105,9 +106,11 @@ void ScreenshotsTest::everyPageIsShown()
         }
     }
     // The start page, and every file of a page: none may be missing in the list.
-    QCOMPARE(
-        pages.size(),
-        1 + QDir(gallery + QStringLiteral("/pages")).entryList({QStringLiteral("*.qml")}).size());
+    QCOMPARE(pages.size(),
+             1
+                 + QDir(source + QStringLiteral("/gallery/pages"))
+                       .entryList({QStringLiteral("*.qml")})
+                       .size());
 }
 
 void ScreenshotsTest::problemsAreReported_data()
@@ -137,9 +140,11 @@ void ScreenshotsTest::problemsAreReported()
     QFETCH(const QString, report);
 
     const QTemporaryDir folder;
-    const QString copy = folder.filePath(QStringLiteral("gallery"));
-    copyFolder(gallery, copy);
-    QFile page(copy + QStringLiteral("/pages/QuickActionsPage.qml"));
+    const QString copy = folder.filePath(QStringLiteral("copy"));
+    for (const char *directory : {"/gallery", "/tests/gallery"}) {
+        copyDirectory(source + QLatin1String(directory), copy + QLatin1String(directory));
+    }
+    QFile page(copy + QStringLiteral("/gallery/pages/QuickActionsPage.qml"));
     QVERIFY(page.open(QIODevice::ReadWrite));
     QByteArray content = page.readAll();
     QVERIFY(content.contains(old));
@@ -158,7 +163,7 @@ void ScreenshotsTest::problemsAreReported()
 
 void ScreenshotsTest::unwritableFolderIsReported()
 {
-    const Result result = takeScreenshots(gallery, QStringLiteral("/nonexistent"));
+    const Result result = takeScreenshots(source, QStringLiteral("/nonexistent"));
     QCOMPARE(result.exitCode, 1);
     QVERIFY2(result.output.contains(QStringLiteral("cannot save /nonexistent/start-")),
              qPrintable(result.output));

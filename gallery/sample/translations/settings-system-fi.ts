@@ -459,19 +459,19 @@
         <source></source>
         <translation>Valmistajalla on ehdot</translation>
     </message>
-    <message id="gallery-stage">
+    <message id="gallery-simulation">
         <source></source>
-        <translation>Näyttämö</translation>
+        <translation>Simulointi</translation>
     </message>
-    <message id="gallery-stage-note">
+    <message id="gallery-simulation-note">
         <source></source>
-        <translation>Esittää laitetta sivun ympärillä. Mikään tästä ei kuulu sivulle.</translation>
+        <translation>Simuloi sivun ympärillä olevaa laitetta. Oma sivusi ei tarvitse näitä.</translation>
     </message>
-    <message id="gallery-stage-reload">
+    <message id="gallery-simulation-reload">
         <source></source>
         <translation>Avaa sivu uudelleen</translation>
     </message>
-    <message id="gallery-stage-constant">
+    <message id="gallery-simulation-constant">
         <source></source>
         <translation>Sivu lukee tämän, kun se avataan.</translation>
     </message>
@@ -551,9 +551,9 @@
         <source></source>
         <translation>Oikea kortti: %1, ext4-tiedostojärjestelmä muistissa, ja oikea levypalvelu</translation>
     </message>
-    <message id="gallery-card-played">
+    <message id="gallery-card-simulated">
         <source></source>
-        <translation>Esitetty kortti ja levypalvelu. Irrotettu kortti unohtaa tiedostonsa.</translation>
+        <translation>Kortti ja levypalvelu on simuloitu. Kortin irrottaminen poistaa sen tiedostot.</translation>
     </message>
     <message id="gallery-card-files">
         <source></source>

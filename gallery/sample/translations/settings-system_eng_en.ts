@@ -459,19 +459,19 @@
         <source></source>
         <translation>The vendor has terms</translation>
     </message>
-    <message id="gallery-stage">
+    <message id="gallery-simulation">
         <source></source>
-        <translation>The stage</translation>
+        <translation>Simulation</translation>
     </message>
-    <message id="gallery-stage-note">
+    <message id="gallery-simulation-note">
         <source></source>
-        <translation>Plays the device around the page. None of it belongs on a page.</translation>
+        <translation>Simulates the device around the page. A page of your own needs none of this.</translation>
     </message>
-    <message id="gallery-stage-reload">
+    <message id="gallery-simulation-reload">
         <source></source>
-        <translation>Open the page anew</translation>
+        <translation>Open the page again</translation>
     </message>
-    <message id="gallery-stage-constant">
+    <message id="gallery-simulation-constant">
         <source></source>
         <translation>The page reads this when it is opened.</translation>
     </message>
@@ -551,9 +551,9 @@
         <source></source>
         <translation>A real card: %1, an ext4 file system in memory, and the real disk service</translation>
     </message>
-    <message id="gallery-card-played">
+    <message id="gallery-card-simulated">
         <source></source>
-        <translation>A played card and disk service. When unmounted, the card forgets its files.</translation>
+        <translation>The card and the disk service are simulated. Unmounting the card removes its files.</translation>
     </message>
     <message id="gallery-card-files">
         <source></source>

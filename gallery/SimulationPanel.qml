@@ -1,0 +1,46 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+import QtQuick 2.15
+import QtQuick.Controls 2.15
+import QtQuick.Layouts 1.15
+
+/*
+    The panel of a simulation. It looks different from the page: nothing of it is for pages.
+*/
+Pane {
+    id: pane
+
+    default property alias content: column.data
+    signal reloadRequested()
+
+    padding: 12
+    background: Rectangle {
+        radius: 8
+        color: "#fff6e0"
+        border.color: "#e0b050"
+    }
+
+    contentItem: ColumnLayout {
+        spacing: 4
+
+        Label {
+            Layout.fillWidth: true
+            text: qsTrId("gallery-simulation")
+            color: "#8a5a00"
+            font.weight: Font.Medium
+            wrapMode: Text.Wrap
+        }
+        Note {
+            text: qsTrId("gallery-simulation-note")
+        }
+        ColumnLayout {
+            id: column
+            spacing: 4
+        }
+        Button {
+            text: qsTrId("gallery-simulation-reload")
+            onClicked: pane.reloadRequested()
+        }
+    }
+}

@@ -1,0 +1,109 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "simulation.h"
+
+#include <QCoreApplication>
+#include <QDBusConnection>
+#include <QEvent>
+#include <QLocale>
+#include <QQmlEngine>
+#include <QQmlError>
+#include <QQmlInfo>
+
+namespace {
+
+// The signal of the sample services (gallery/peer).
+const QLatin1String peerPath("/");
+const QLatin1String peerInterface("com.marlo.settings.gallery.Peer");
+const QLatin1String peerSignal("CallReceived");
+
+// Texts that are there in English are in British English.
+const QLatin1String english("en");
+const QString britishEnglish = QStringLiteral("en_GB");
+
+// What the cover daemon tells of.
+const QString coverService = QStringLiteral("com.marlo.kivd");
+const QString coverIdProperty = QStringLiteral("KIVID");
+const QString coverReadyProperty = QStringLiteral("Ready");
+const QString sampleCover = QStringLiteral("MARLO-COVER-07");
+
+} // namespace
+
+Simulation::Simulation(QQmlEngine *engine)
+    : m_engine(engine), m_coverDaemonWatcher(coverService, QDBusConnection::systemBus(),
+                                             QDBusServiceWatcher::WatchForRegistration)
+{
+    connect(engine, &QQmlEngine::warnings, this, &Simulation::reportWarnings);
+    if (!QDBusConnection::sessionBus().connect(
+            QString(), peerPath, peerInterface, peerSignal, this,
+            SIGNAL(callReceived(QString, QString, QStringList)))) {
+        qmlWarning(this) << "no session bus: received calls will not be shown";
+    }
+    // Of no country yet.
+    QLocale::setDefault(QLocale(britishEnglish));
+    // QtDBus may lose a signal that follows too soon on a new owner of the daemon's name.
+    connect(&m_coverDaemonWatcher, &QDBusServiceWatcher::serviceRegistered, this,
+            &Simulation::tellOfCover);
+    startCoverDaemon();
+}
+
+QString Simulation::language() const
+{
+    return QLocale().name().section(QLatin1Char('_'), 0, 0);
+}
+
+void Simulation::setLanguage(const QString &language)
+{
+    if (language == this->language()) {
+        return;
+    }
+    QLocale::setDefault(QLocale(language == english ? britishEnglish : language));
+    // Translators that follow the language filter this event; the engine retranslates on it.
+    QEvent languageChange(QEvent::LanguageChange);
+    QCoreApplication::sendEvent(m_engine, &languageChange);
+    Q_EMIT languageChanged();
+}
+
+void Simulation::setCover(Cover cover)
+{
+    if (cover == m_cover) {
+        return;
+    }
+    m_cover = cover;
+    if (cover == NoDaemon) {
+        m_coverDaemon.reset();
+    } else if (m_coverDaemon == nullptr) {
+        startCoverDaemon();
+    } else {
+        tellOfCover();
+    }
+    Q_EMIT coverChanged();
+}
+
+void Simulation::startCoverDaemon()
+{
+    m_coverDaemon = std::make_unique<CoverDaemon>();
+    tellOfCover();
+}
+
+void Simulation::tellOfCover()
+{
+    if (m_coverDaemon == nullptr) {
+        return;
+    }
+    const QString id = m_cover == NoCover ? QString() : sampleCover;
+    const int ready = m_cover == CoverReady ? 1 : 0;
+    m_coverDaemon->answer(coverIdProperty, {id});
+    m_coverDaemon->answer(coverReadyProperty, {ready});
+    m_coverDaemon->sendChanges({{coverIdProperty, id}, {coverReadyProperty, ready}});
+}
+
+void Simulation::reportWarnings(const QList<QQmlError> &errors)
+{
+    for (const QQmlError &error : errors) {
+        if (error.messageType() != QtInfoMsg) {
+            Q_EMIT warning(error.toString());
+        }
+    }
+}

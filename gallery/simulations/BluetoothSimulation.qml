@@ -1,0 +1,19 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+import QtQuick 2.15
+import QtQuick.Layouts 1.15
+import ".."
+
+/*
+    The file that the platform keeps the address in.
+*/
+ColumnLayout {
+    SimulatedFilesSwitch {
+        text: qsTrId("gallery-bluetooth-installed")
+        path: "/var/lib/bluetooth/board-address"
+    }
+    Note {
+        text: qsTrId("gallery-simulation-constant")
+    }
+}

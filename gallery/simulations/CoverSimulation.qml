@@ -1,0 +1,33 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+import QtQuick 2.15
+import QtQuick.Controls 2.15
+import QtQuick.Layouts 1.15
+import gallery.simulation 1.0
+import ".."
+
+/*
+    The cover daemon on the system bus, and the cover that it sees.
+*/
+ColumnLayout {
+    Repeater {
+        model: [
+            { cover: Simulation.NoDaemon, text: qsTrId("gallery-cover-no-daemon") },
+            { cover: Simulation.NoCover, text: qsTrId("gallery-cover-removed") },
+            { cover: Simulation.CoverStarting, text: qsTrId("gallery-cover-attached") },
+            { cover: Simulation.CoverReady, text: qsTrId("gallery-cover-attached-ready") },
+        ]
+        RadioDelegate {
+            Layout.fillWidth: true
+            focusPolicy: Qt.StrongFocus
+            horizontalPadding: 0
+            text: modelData.text
+            checked: Simulation.cover === modelData.cover
+            onToggled: Simulation.cover = modelData.cover
+        }
+    }
+    Note {
+        text: qsTrId("gallery-cover-note")
+    }
+}

@@ -1,0 +1,27 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+import QtQuick 2.15
+import QtQuick.Layouts 1.15
+import ".."
+
+/*
+    The packages that offer widgets, and what one of them needs.
+*/
+ColumnLayout {
+    SimulatedFilesSwitch {
+        text: qsTrId("gallery-events-widgets-installed")
+        path: "/usr/share/glimmera/eventswidgets/*.json"
+    }
+    SimulatedFilesSwitch {
+        text: qsTrId("gallery-events-widgets-broken")
+        path: "/usr/share/glimmera/eventswidgets/broken.json"
+        content: "{ \"widgets\": [ {} ]"
+    }
+    SimulatedFilesSwitch {
+        text: qsTrId("gallery-events-widgets-step-counter")
+        description: qsTrId("gallery-events-widgets-step-counter-note")
+        path: "/usr/libexec/step-counter"
+        content: "\n"
+    }
+}

@@ -1,0 +1,55 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+import QtQuick 2.15
+import QtQuick.Layouts 1.15
+import gallery.simulation 1.0
+import ".."
+
+/*
+    The packages that offer quick actions, and the services that these call.
+*/
+ColumnLayout {
+    SimulatedFilesSwitch {
+        text: qsTrId("gallery-quick-actions-installed")
+        path: "/usr/share/glimmera/quickactions/*.conf"
+    }
+    SimulatedFilesSwitch {
+        text: qsTrId("gallery-quick-actions-fail")
+        path: "/usr/libexec/gallery-services-fail"
+        content: "\n"
+    }
+    Note {
+        text: qsTrId("gallery-quick-actions-absent")
+    }
+    Note {
+        text: qsTrId("gallery-quick-actions-language")
+    }
+    Paragraph {
+        text: qsTrId("gallery-received-calls")
+        font.weight: Font.Medium
+    }
+    Note {
+        visible: calls.count === 0
+        text: qsTrId("gallery-received-calls-none")
+    }
+    Repeater {
+        model: calls
+        Value {
+            name: model.service
+            value: model.call
+        }
+    }
+
+    ListModel {
+        id: calls
+    }
+
+    Connections {
+        target: (Simulation) // qmllint crashes at a singleton here, in parentheses it does not
+        function onCallReceived(service, method, args) {
+            const list = args.map(argument => '"' + argument + '"').join(", ");
+            calls.insert(0, { service: service, call: method + "(" + list + ")" });
+        }
+    }
+}

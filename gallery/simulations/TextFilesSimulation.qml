@@ -1,0 +1,23 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+import QtQuick 2.15
+import QtQuick.Layouts 1.15
+import ".."
+
+/*
+    The file and the folder.
+*/
+ColumnLayout {
+    SimulatedFilesSwitch {
+        text: qsTrId("gallery-text-files-file-installed")
+        path: "/usr/share/marlo-settings/about.html"
+    }
+    SimulatedFilesSwitch {
+        text: qsTrId("gallery-text-files-folder-installed")
+        path: "/usr/share/marlo-settings/licenses"
+    }
+    Note {
+        text: qsTrId("gallery-simulation-constant")
+    }
+}

@@ -3,9 +3,9 @@
 
 // Checking definition files, beside loading the same files with their models.
 
-#include "definitionschecker.h"
-#include "eventswidgetsmodel.h"
-#include "quickactionsmodel.h"
+#include "definitions-tool/definitionschecker.h"
+#include "eventswidgets/eventswidgetsmodel.h"
+#include "quickactions/quickactionsmodel.h"
 #include "rounds.h"
 
 #include <QCoreApplication>
@@ -86,7 +86,7 @@ void check()
 int main(int argc, char *argv[])
 {
     if (!qEnvironmentVariableIsSet("MARLO_THROW_AWAY_ROOT")) {
-        qFatal("runs only in the throw-away root of tests/sandbox");
+        qFatal("runs only in the throw-away root of simulator");
     }
     const QCoreApplication application(argc, argv);
     writeDefinitions();

@@ -4,9 +4,9 @@
 // Loading and rescanning events widgets, beside the parsing of their files alone, and a titles view
 // beside a bare loop over the data of its rows.
 
-#include "eventswidgetsmodel.h"
+#include "eventswidgets/eventswidgetsmodel.h"
+#include "eventswidgets/titlesview.h"
 #include "rounds.h"
-#include "titlesview.h"
 
 #include <QCoreApplication>
 #include <QDir>
@@ -223,7 +223,7 @@ bool compareTitles(const char *kind, QAbstractListModel *model, const QVector<in
 int main(int argc, char *argv[])
 {
     if (!qEnvironmentVariableIsSet("MARLO_THROW_AWAY_ROOT")) {
-        qFatal("runs only in the throw-away root of tests/sandbox");
+        qFatal("runs only in the throw-away root of simulator");
     }
     const QCoreApplication application(argc, argv);
     bool kept = compareLoading(Layout::OneFile);

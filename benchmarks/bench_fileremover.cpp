@@ -12,7 +12,7 @@
     in use when it ends, however it ends.
 */
 
-#include "fileremover.h"
+#include "memorycard/fileremover.h"
 #include "rounds.h"
 
 #include <QByteArray>

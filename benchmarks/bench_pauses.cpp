@@ -8,7 +8,7 @@
 // object, which is measured too: the kernel lets go of a model's inotify watches in its own time.
 
 #include "everytype.h"
-#include "serviceprocess.h"
+#include "simulator/serviceprocess.h"
 
 #include <QCoreApplication>
 #include <QDBusConnection>
@@ -122,7 +122,7 @@ int main(int argc, char *argv[])
 {
     const QCoreApplication application(argc, argv);
     if (!qEnvironmentVariableIsSet("MARLO_THROW_AWAY_ROOT")) {
-        qFatal("runs only in the throw-away root of tests/sandbox");
+        qFatal("runs only in the throw-away root of simulator");
     }
     // The arguments are any, and the messages about that many.
     qInstallMessageHandler(dropMessage);

@@ -4,7 +4,7 @@
 // Loading quick actions, beside reading the same files with QSettings and doing nothing more.
 
 #include "mgconfitem.h"
-#include "quickactionsmodel.h"
+#include "quickactions/quickactionsmodel.h"
 #include "rounds.h"
 
 #include <QCoreApplication>
@@ -155,7 +155,7 @@ bool measureLifetime()
 int main(int argc, char *argv[])
 {
     if (!qEnvironmentVariableIsSet("MARLO_THROW_AWAY_ROOT")) {
-        qFatal("runs only in the throw-away root of tests/sandbox");
+        qFatal("runs only in the throw-away root of simulator");
     }
     const QCoreApplication application(argc, argv);
     // Held by somebody else as well, as where there are several models: the bus is asked once to tell

@@ -3,14 +3,14 @@
 
 # add_subsystem(<name> SOURCES <file>... LINK <target>...)
 #
-# A folder of the module: a static library whose header folder and dependencies its users inherit.
-# A static library resolves no symbols, so what a folder takes from another without declaring it
-# would go unnoticed in the plugin, which links them all. <name>-links is the same objects linked
-# with nothing but the declared dependencies: it fails there and then.
+# A directory of the module: a static library whose dependencies its users inherit. A static library
+# resolves no symbols, so a dependency that a directory uses without declaring it would go unnoticed
+# in the plugin, which links them all. <name>-links links the same objects with the declared
+# dependencies only, and fails to link if one is missing.
 function(add_subsystem name)
     cmake_parse_arguments(PARSE_ARGV 1 arg "" "" "SOURCES;LINK")
     add_library(${name} STATIC ${arg_SOURCES})
-    target_include_directories(${name} PUBLIC ${CMAKE_CURRENT_SOURCE_DIR})
+    target_include_directories(${name} PUBLIC ${PROJECT_SOURCE_DIR})
     target_link_libraries(${name} PUBLIC ${arg_LINK})
 
     add_library(${name}-links MODULE $<TARGET_OBJECTS:${name}>)

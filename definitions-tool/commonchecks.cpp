@@ -3,8 +3,8 @@
 
 #include "commonchecks.h"
 
-#include "catalogfiles.h"
-#include "regularfile.h"
+#include "files/regularfile.h"
+#include "plugin/translations/catalogfiles.h"
 
 #include <QRegularExpression>
 

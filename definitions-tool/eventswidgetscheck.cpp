@@ -4,8 +4,8 @@
 #include "eventswidgetscheck.h"
 
 #include "commonchecks.h"
-#include "eventswidgetsfile.h"
-#include "jsonreader.h"
+#include "eventswidgets/eventswidgetsfile.h"
+#include "eventswidgets/jsonreader.h"
 #include "readerlog.h"
 
 #include <QStringList>

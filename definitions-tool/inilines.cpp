@@ -3,7 +3,7 @@
 
 #include "inilines.h"
 
-#include "inifile.h"
+#include "files/inifile.h"
 
 #include <QByteArray>
 

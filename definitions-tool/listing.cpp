@@ -3,14 +3,14 @@
 
 #include "listing.h"
 
-#include "apptranslator.h"
-#include "catalogfiles.h"
 #include "definitionfiles.h"
-#include "eventswidgetsfile.h"
-#include "eventswidgetsmodel.h"
+#include "eventswidgets/eventswidgetsfile.h"
+#include "eventswidgets/eventswidgetsmodel.h"
 #include "installedcatalogs.h"
-#include "quickaction.h"
-#include "quickactionsmodel.h"
+#include "plugin/translations/apptranslator.h"
+#include "plugin/translations/catalogfiles.h"
+#include "quickactions/quickaction.h"
+#include "quickactions/quickactionsmodel.h"
 
 #include <QCoreApplication>
 #include <QLocale>

@@ -4,9 +4,9 @@
 #include "quickactioncheck.h"
 
 #include "commonchecks.h"
-#include "inifile.h"
+#include "files/inifile.h"
 #include "inilines.h"
-#include "quickaction.h"
+#include "quickactions/quickaction.h"
 #include "readerlog.h"
 
 #include <QDBusError>

@@ -4,8 +4,8 @@
 #include "showing.h"
 
 #include "definitionfiles.h"
-#include "eventswidgetsfile.h"
-#include "quickaction.h"
+#include "eventswidgets/eventswidgetsfile.h"
+#include "quickactions/quickaction.h"
 #include "readerlog.h"
 
 #include <QDBusError>

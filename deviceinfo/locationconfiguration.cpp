@@ -3,7 +3,7 @@
 
 #include "locationconfiguration.h"
 
-#include "endlessfile.h"
+#include "files/endlessfile.h"
 #include "mgconfitem.h"
 
 #include <QFile>

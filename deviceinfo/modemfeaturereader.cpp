@@ -3,7 +3,7 @@
 
 #include "modemfeaturereader.h"
 
-#include "inifile.h"
+#include "files/inifile.h"
 
 #include <QSettings>
 

@@ -3,7 +3,7 @@
 
 #include "termsofusemanager.h"
 
-#include "endlessfile.h"
+#include "files/endlessfile.h"
 
 #include <QFile>
 #include <QtDebug>

@@ -3,7 +3,7 @@
 
 #include "textfilereader.h"
 
-#include "endlessfile.h"
+#include "files/endlessfile.h"
 
 #include <QDir>
 #include <QFile>

@@ -3,8 +3,8 @@
 
 #include "eventswidgetsfile.h"
 
+#include "files/regularfile.h"
 #include "jsonreader.h"
-#include "regularfile.h"
 
 #include <QtDebug>
 

@@ -3,10 +3,10 @@
 
 // A tree, and what happens to it while it is removed.
 
-#include "directoryemptier.h"
-#include "filedescriptor.h"
 #include "fuzzing.h"
 #include "jail.h"
+#include "memorycard/directoryemptier.h"
+#include "memorycard/filedescriptor.h"
 #include "systemcalls.h"
 
 #include <algorithm>

@@ -3,9 +3,9 @@
 
 // The name of a locale, on the first line, and the text of terms of use.
 
+#include "documents/termsofusemanager.h"
+#include "documents/textfilereader.h"
 #include "fuzzing.h"
-#include "termsofusemanager.h"
-#include "textfilereader.h"
 
 #include <QDir>
 #include <QUrl>

@@ -3,9 +3,9 @@
 
 // A definition file of events widgets, against what QJsonDocument makes of it.
 
-#include "eventswidgetsfile.h"
+#include "eventswidgets/eventswidgetsfile.h"
+#include "eventswidgets/jsonreader.h"
 #include "fuzzing.h"
-#include "jsonreader.h"
 
 #include <QJsonArray>
 #include <QJsonDocument>

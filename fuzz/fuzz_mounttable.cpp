@@ -3,9 +3,9 @@
 
 // The path of a card's device, on the first line, and a mount table.
 
-#include "fileremover.h"
 #include "fuzzing.h"
 #include "jail.h"
+#include "memorycard/fileremover.h"
 
 #include <QFile>
 

@@ -3,9 +3,9 @@
 
 // A definition file of a quick action: read, asked everything, and sent off.
 
+#include "files/inifile.h"
 #include "fuzzing.h"
-#include "inifile.h"
-#include "quickaction.h"
+#include "quickactions/quickaction.h"
 
 #include <QCoreApplication>
 #include <QDBusConnection>

@@ -3,8 +3,8 @@
 
 // Two role paths and a value to match, over rows that hold everything.
 
+#include "eventswidgets/titlesview.h"
 #include "fuzzing.h"
-#include "titlesview.h"
 
 #include <QPointer>
 

@@ -31,7 +31,7 @@ int LLVMFuzzerInitialize(int *argc, char ***argv)
 {
     // Inputs name files and services: nothing of the machine's own is to be reached with them.
     if (!qEnvironmentVariableIsSet("MARLO_THROW_AWAY_ROOT")) {
-        qFatal("this program runs only in the throw-away root of tests/sandbox");
+        qFatal("this program runs only in the throw-away root of simulator");
     }
     static const QCoreApplication application(*argc, *argv);
     qInstallMessageHandler(keepQuiet);

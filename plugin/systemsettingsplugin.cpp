@@ -3,18 +3,18 @@
 
 #include "systemsettingsplugin.h"
 
-#include "androidsupport.h"
-#include "apptranslator.h"
-#include "bluetoothinfo.h"
-#include "eventswidgetsmodel.h"
-#include "kivinfo.h"
-#include "locationconfiguration.h"
-#include "memorycardformatter.h"
-#include "modemfeaturereader.h"
-#include "quickactionsmodel.h"
-#include "termsofusemanager.h"
-#include "textfilereader.h"
-#include "titlesview.h"
+#include "deviceinfo/androidsupport.h"
+#include "deviceinfo/bluetoothinfo.h"
+#include "deviceinfo/kivinfo.h"
+#include "deviceinfo/locationconfiguration.h"
+#include "deviceinfo/modemfeaturereader.h"
+#include "documents/termsofusemanager.h"
+#include "documents/textfilereader.h"
+#include "eventswidgets/eventswidgetsmodel.h"
+#include "eventswidgets/titlesview.h"
+#include "memorycard/memorycardformatter.h"
+#include "plugin/translations/apptranslator.h"
+#include "quickactions/quickactionsmodel.h"
 
 #include <QCoreApplication>
 #include <QQmlEngine>

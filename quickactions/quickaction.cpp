@@ -3,7 +3,7 @@
 
 #include "quickaction.h"
 
-#include "inifile.h"
+#include "files/inifile.h"
 
 #include <QDBusConnection>
 #include <QDBusMessage>

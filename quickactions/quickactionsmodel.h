@@ -4,10 +4,10 @@
 #ifndef QUICKACTIONSMODEL_H
 #define QUICKACTIONSMODEL_H
 
-#include "catalogtable.h"
-#include "directorywatcher.h"
+#include "files/directorywatcher.h"
 #include "mgconfitem.h"
-#include "runningmaximum.h"
+#include "plugin/runningmaximum.h"
+#include "plugin/translations/catalogtable.h"
 
 #include <QAbstractListModel>
 #include <QQmlParserStatus>

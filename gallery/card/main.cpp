@@ -12,7 +12,7 @@
     it go the daemons, the mounts and the loop device.
 */
 
-#include "realcard.h"
+#include "simulator/realcard.h"
 
 #include <QCoreApplication>
 

@@ -6,7 +6,7 @@
 //
 // usage: gallery-peer SERVICE
 
-#include "recordingservice.h"
+#include "simulator/recordingservice.h"
 
 #include <QCoreApplication>
 #include <QDBusError>

@@ -4,7 +4,7 @@
 #ifndef SIMULATION_H
 #define SIMULATION_H
 
-#include "coverdaemon.h"
+#include "simulator/coverdaemon.h"
 
 #include <QDBusServiceWatcher>
 #include <QObject>

@@ -3,12 +3,12 @@
 
 // The checker beside the readers, on files that nobody would write.
 
-#include "definitionschecker.h"
-#include "eventswidgetsfile.h"
+#include "definitions-tool/definitionschecker.h"
+#include "definitions-tool/inilines.h"
+#include "eventswidgets/eventswidgetsfile.h"
 #include "files.h"
-#include "inilines.h"
 #include "messagelog.h"
-#include "quickaction.h"
+#include "quickactions/quickaction.h"
 
 #include <QDBusError>
 #include <QDBusMessage>

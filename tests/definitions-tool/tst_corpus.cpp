@@ -4,13 +4,13 @@
 // Good and bad definition files: what the checker finds in each, to the line, and that it finds an
 // error exactly where the model makes something else of a file than what stands there.
 
-#include "definitionschecker.h"
-#include "eventswidgetsfile.h"
-#include "eventswidgetsmodel.h"
+#include "definitions-tool/definitionschecker.h"
+#include "eventswidgets/eventswidgetsfile.h"
+#include "eventswidgets/eventswidgetsmodel.h"
 #include "files.h"
 #include "messagelog.h"
-#include "quickaction.h"
-#include "quickactionsmodel.h"
+#include "quickactions/quickaction.h"
+#include "quickactions/quickactionsmodel.h"
 
 #include <QDir>
 #include <QJsonArray>

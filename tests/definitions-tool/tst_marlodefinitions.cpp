@@ -6,7 +6,7 @@
 #include "files.h"
 #include "messagelog.h"
 #include "mgconfitem.h"
-#include "recordingservice.h"
+#include "simulator/recordingservice.h"
 
 #include <QDir>
 #include <QJsonArray>

@@ -1,7 +1,7 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-#include "androidsupport.h"
+#include "deviceinfo/androidsupport.h"
 #include "files.h"
 #include "messagelog.h"
 

@@ -1,9 +1,9 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-#include "coverdaemon.h"
-#include "kivinfo.h"
+#include "deviceinfo/kivinfo.h"
 #include "messagelog.h"
+#include "simulator/coverdaemon.h"
 
 #include <QDBusArgument>
 #include <QDBusConnectionInterface>

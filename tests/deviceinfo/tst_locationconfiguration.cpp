@@ -2,8 +2,8 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 #include "dconftool.h"
+#include "deviceinfo/locationconfiguration.h"
 #include "files.h"
-#include "locationconfiguration.h"
 #include "messagelog.h"
 #include "mgconfitem.h"
 

@@ -1,9 +1,9 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
+#include "documents/textfilereader.h"
 #include "files.h"
 #include "messagelog.h"
-#include "textfilereader.h"
 
 #include <QTemporaryDir>
 #include <QtTest>

@@ -3,7 +3,7 @@
 
 // The reader of definition files, without a model.
 
-#include "eventswidgetsfile.h"
+#include "eventswidgets/eventswidgetsfile.h"
 #include "files.h"
 #include "messagelog.h"
 

@@ -2,7 +2,7 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 #include "dconftool.h"
-#include "eventswidgetsmodel.h"
+#include "eventswidgets/eventswidgetsmodel.h"
 #include "files.h"
 #include "messagelog.h"
 

@@ -3,7 +3,7 @@
 
 // The reader beside QJsonDocument: both have to see the same in every text.
 
-#include "jsonreader.h"
+#include "eventswidgets/jsonreader.h"
 #include "messagelog.h"
 
 #include <QJsonDocument>

@@ -1,8 +1,8 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
+#include "eventswidgets/titlesview.h"
 #include "messagelog.h"
-#include "titlesview.h"
 
 #include <QAbstractItemModelTester>
 #include <QIdentityProxyModel>

@@ -6,7 +6,7 @@
 #include "everytype.h"
 #include "messagelog.h"
 #include "ownprocess.h"
-#include "serviceprocess.h"
+#include "simulator/serviceprocess.h"
 
 #include <QDBusConnection>
 #include <QProcess>

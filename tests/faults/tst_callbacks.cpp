@@ -4,11 +4,11 @@
 // QML that answers each signal of each type by reading and writing all of its properties and
 // calling all of its methods.
 
-#include "diskservicepeer.h"
 #include "everytype.h"
 #include "files.h"
 #include "messagelog.h"
-#include "serviceprocess.h"
+#include "simulator/diskservicepeer.h"
+#include "simulator/serviceprocess.h"
 
 #include <QAbstractListModel>
 #include <QMetaMethod>

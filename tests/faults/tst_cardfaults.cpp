@@ -5,10 +5,10 @@
 
 #include "failingcard.h"
 #include "files.h"
-#include "memorycardformatter.h"
+#include "memorycard/memorycardformatter.h"
 #include "messagelog.h"
 #include "ownprocess.h"
-#include "serviceprocess.h"
+#include "simulator/serviceprocess.h"
 #include "usedupdescriptors.h"
 
 #include <QDir>

@@ -5,12 +5,12 @@
 // whatever else may be in their keys.
 
 #include "dconftool.h"
-#include "eventswidgetsmodel.h"
+#include "deviceinfo/locationconfiguration.h"
+#include "eventswidgets/eventswidgetsmodel.h"
 #include "files.h"
-#include "locationconfiguration.h"
 #include "messagelog.h"
 #include "mgconfitem.h"
-#include "quickactionsmodel.h"
+#include "quickactions/quickactionsmodel.h"
 
 #include <QAbstractItemModelTester>
 #include <QDBusConnection>

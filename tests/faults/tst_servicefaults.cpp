@@ -3,12 +3,12 @@
 
 // The types that speak to a D-Bus service, while that service is stopped, dies or floods them.
 
+#include "deviceinfo/kivinfo.h"
 #include "files.h"
-#include "kivinfo.h"
-#include "memorycardformatter.h"
+#include "memorycard/memorycardformatter.h"
 #include "messagelog.h"
-#include "quickactionsmodel.h"
-#include "serviceprocess.h"
+#include "quickactions/quickactionsmodel.h"
+#include "simulator/serviceprocess.h"
 
 #include <QDBusPendingCallWatcher>
 #include <QPointer>

@@ -4,7 +4,7 @@
 #ifndef FORMATTEREVENTS_H
 #define FORMATTEREVENTS_H
 
-#include "memorycardformatter.h"
+#include "memorycard/memorycardformatter.h"
 
 #include <QByteArrayList>
 #include <QMetaEnum>

@@ -1,9 +1,9 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-#include "directoryemptier.h"
-#include "filedescriptor.h"
 #include "filetree.h"
+#include "memorycard/directoryemptier.h"
+#include "memorycard/filedescriptor.h"
 #include "messagelog.h"
 #include "scratchfilesystem.h"
 #include "systemcalls.h"

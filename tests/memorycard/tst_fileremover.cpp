@@ -1,8 +1,8 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-#include "fileremover.h"
 #include "filetree.h"
+#include "memorycard/fileremover.h"
 #include "messagelog.h"
 #include "scratchfilesystem.h"
 

@@ -2,11 +2,11 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 #include "cardhelper.h"
-#include "diskservicepeer.h"
 #include "files.h"
 #include "formatterevents.h"
-#include "memorycardformatter.h"
+#include "memorycard/memorycardformatter.h"
 #include "messagelog.h"
+#include "simulator/diskservicepeer.h"
 #include "usedupdescriptors.h"
 
 #include <QDBusConnection>

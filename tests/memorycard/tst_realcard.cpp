@@ -6,9 +6,9 @@
 
 #include "files.h"
 #include "formatterevents.h"
-#include "memorycardformatter.h"
+#include "memorycard/memorycardformatter.h"
 #include "messagelog.h"
-#include "realcard.h"
+#include "simulator/realcard.h"
 
 #include <QDir>
 #include <QFile>

@@ -1,9 +1,9 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-#include "apptranslator.h"
 #include "files.h"
 #include "messagelog.h"
+#include "plugin/translations/apptranslator.h"
 
 #include <QtTest>
 

@@ -5,7 +5,7 @@
 #define THROWAWAYROOT_H
 
 #include "messagelog.h"
-#include "recordingservice.h"
+#include "simulator/recordingservice.h"
 
 #include <QObject>
 #include <QVariant>

@@ -5,7 +5,7 @@
 
 #include "files.h"
 #include "messagelog.h"
-#include "quickactionsmodel.h"
+#include "quickactions/quickactionsmodel.h"
 
 #include <QtTest>
 

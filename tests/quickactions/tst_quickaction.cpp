@@ -5,8 +5,8 @@
 
 #include "files.h"
 #include "messagelog.h"
-#include "quickaction.h"
-#include "recordingservice.h"
+#include "quickactions/quickaction.h"
+#include "simulator/recordingservice.h"
 #include "usedupdescriptors.h"
 
 #include <QtTest>

@@ -6,8 +6,8 @@
 #include "files.h"
 #include "messagelog.h"
 #include "mgconfitem.h"
-#include "quickactionsmodel.h"
-#include "recordingservice.h"
+#include "quickactions/quickactionsmodel.h"
+#include "simulator/recordingservice.h"
 
 #include <QtTest>
 

@@ -26,7 +26,7 @@ void keepQuiet(QtMsgType type, const QMessageLogContext &context, const QString 
 int main(int argc, char *argv[])
 {
     if (!qEnvironmentVariableIsSet("MARLO_THROW_AWAY_ROOT")) {
-        qFatal("this program runs only in the throw-away root of tests/sandbox");
+        qFatal("this program runs only in the throw-away root of simulator");
     }
     const QCoreApplication application(argc, argv);
     QCommandLineParser parser;

@@ -5,10 +5,10 @@
 #define WORLD_H
 
 #include "cardhelper.h"
-#include "coverdaemon.h"
-#include "diskservicepeer.h"
-#include "recordingservice.h"
 #include "scratchfilesystem.h"
+#include "simulator/coverdaemon.h"
+#include "simulator/diskservicepeer.h"
+#include "simulator/recordingservice.h"
 
 #include <QRandomGenerator>
 #include <QStringList>

@@ -28,7 +28,7 @@ QString catalogPath(const QString &name)
 void requireThrowAwayRoot(const QString &path)
 {
     require(qEnvironmentVariableIsSet("MARLO_THROW_AWAY_ROOT"),
-            "run outside the throw-away root of tests/sandbox and touch", path);
+            "run outside the throw-away root of simulator and touch", path);
 }
 
 } // namespace

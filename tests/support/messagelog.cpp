@@ -33,7 +33,7 @@ MessageLog::MessageLog()
 {
     // Every test has one, and none may run where what it does to files, keys and services stays.
     if (!qEnvironmentVariableIsSet("MARLO_THROW_AWAY_ROOT")) {
-        qFatal("this test runs only in the throw-away root of tests/sandbox");
+        qFatal("this test runs only in the throw-away root of simulator");
     }
     messages.clear();
     previousHandler = qInstallMessageHandler(record);

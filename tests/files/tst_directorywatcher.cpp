@@ -1,8 +1,8 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-#include "directorywatcher.h"
 #include "files.h"
+#include "files/directorywatcher.h"
 #include "messagelog.h"
 
 #include <QTemporaryDir>

@@ -85,9 +85,10 @@ bool canStartThread()
     standard output.
 
     A failed command ends the sequence and leads to the status \c Error, from which every operation
-    is accepted again. Commands act on the card that was set when they were asked for, whatever is
-    set by the time they run; one that was asked for without a \l deviceName mounts or unmounts by
-    the one that is set when it runs.
+    is accepted again. Formatting, removing files and probing use the \l devicePath, and the type, of
+    their request, even if the properties change before they start: two formats that are requested one
+    after the other each make their own type. Mounting and unmounting use the \l deviceName that is set
+    when the step starts.
 
     \qml
     Button {
@@ -160,9 +161,14 @@ MemoryCardFormatter::Status MemoryCardFormatter::status() const
 /*!
     \qmlproperty string MemoryCardFormatter::deviceName
 
-    The kernel name of the block device, such as \c mmcblk1p1, by which the disk service is asked to
-    mount and unmount it. It may be set at any time; it counts for what is asked for from then on, and
-    for what was asked for without a name.
+    The kernel name of the block device, such as \c mmcblk1p1, which the disk service mounts and
+    unmounts. It may be set at any time, even while the formatter is \l busy, and is used by every
+    step that starts afterwards.
+
+    If the name is empty when a step of mounting or unmounting starts, the formatter only logs a
+    critical message. The status stays, and so does the rest of the queue; the next operation that is
+    accepted runs it first. In the middle of a sequence the formatter then stays \l busy and refuses
+    every operation: only a new MemoryCardFormatter helps.
 */
 QString MemoryCardFormatter::deviceName() const
 {
@@ -259,9 +265,10 @@ bool MemoryCardFormatter::busy() const
     command word, and decides. An empty type or \l devicePath leads to \c Error with a warning, and
     so does a card that is not mounted, with unmountError().
 
-    \b {Set \l deviceName before.} Without it nothing happens at first but a critical message. The
-    formatting stays in the queue and is done before whatever is asked for next, even if that is only
-    unmount() or a new \l devicePath.
+    \b {Set \l deviceName before.} Without it the formatter only logs a critical message. The
+    formatting stays in the queue and runs before the next operation, even if that is only unmount()
+    or a new \l devicePath. The \l deviceName must not be empty before the card is mounted again,
+    either: the formatter would stay \l busy for ever.
 */
 void MemoryCardFormatter::format(const QString &type)
 {
@@ -473,7 +480,7 @@ void MemoryCardFormatter::setStatus(Status status)
 void MemoryCardFormatter::enqueue(std::initializer_list<Status> commands, const QString &formatType)
 {
     for (const Status command : commands) {
-        m_commands.enqueue({command, m_deviceName, m_devicePath, formatType});
+        m_commands.enqueue({command, m_devicePath, formatType});
     }
 }
 
@@ -501,7 +508,7 @@ void MemoryCardFormatter::doNextCommand()
     switch (command.command) {
     case Unmounting:
     case Mounting:
-        startMountOperation(command);
+        startMountOperation(command.command);
         break;
     case Formatting:
         startFormatting(command);
@@ -549,25 +556,23 @@ void MemoryCardFormatter::runHelper(Status command, const QStringList &arguments
     }
 }
 
-void MemoryCardFormatter::startMountOperation(const Command &command)
+void MemoryCardFormatter::startMountOperation(Status command)
 {
-    // A sequence that was asked for before the card had a name takes the one that it has got since.
-    const QString name = command.deviceName.isEmpty() ? m_deviceName : command.deviceName;
-    const bool mounts = command.command == Mounting;
-    if (name.isEmpty()) {
-        // The words are crossed, on purpose: log readers know the lines in just this form. The rest
-        // of the queue stays, and runs before what is asked for next.
+    const bool mounts = command == Mounting;
+    if (m_deviceName.isEmpty()) {
+        // The verbs are crossed on purpose: programs that read logs expect exactly these lines.
+        // The status and the rest of the queue stay as they are, which is intended, too.
         qCCritical(lcMemoryCardLog)
             << "Cannot" << (mounts ? "unmount" : "mount") << "without device name";
         return;
     }
-    m_running = command.command;
+    m_running = command;
     const QDBusMessage call =
-        mounts ? DiskService::mountCall(name) : DiskService::unmountCall(name);
+        mounts ? DiskService::mountCall(m_deviceName) : DiskService::unmountCall(m_deviceName);
     auto *reply = new QDBusPendingCallWatcher(send(call), this);
     connect(reply, &QDBusPendingCallWatcher::finished, this,
-            [this, running = command.command, method = call.member()](auto *finished) {
-                mountOperationFinished(running, method, finished);
+            [this, command, method = call.member()](auto *finished) {
+                mountOperationFinished(command, method, finished);
             });
 }
 

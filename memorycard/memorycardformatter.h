@@ -98,11 +98,10 @@ private Q_SLOTS:
     void fileRemoverError();
 
 private:
-    // A command and what it was asked for: the properties may change before its turn comes, and
-    // another card than the one that was asked for must never be formatted or emptied.
+    // A command with the card and the type that it was requested for. devicePath may change before
+    // the command starts, and no card may be formatted or emptied in place of another.
     struct Command {
         Status command;
-        QString deviceName;
         QString devicePath;
         QString formatType;
     };
@@ -114,7 +113,7 @@ private:
     void startFormatting(const Command &command);
     void startProbing(const Command &command);
     void runHelper(Status command, const QStringList &arguments);
-    void startMountOperation(const Command &command);
+    void startMountOperation(Status command);
     void mountOperationFinished(Status command, const QString &method,
                                 QDBusPendingCallWatcher *reply);
     void startRemovingFiles(const Command &command);

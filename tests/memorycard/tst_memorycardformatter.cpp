@@ -171,8 +171,10 @@ private Q_SLOTS:
     void formatsOneAfterTheOther();
     void probeWaitsForTheRequest();
     void requestKeepsTheResultOfAProbe();
-    void commandsKeepTheirCard();
-    void leftCommandsKeepTheirCard();
+    void commandsKeepTheirPath();
+    void nameIsReadWhenAStepStarts();
+    void nameThatIsEmptyInTheMiddleOfASequence();
+    void leftCommandsKeepTheirPath();
     void emptiesTheCardThatWasAskedFor();
     void retriesWhenToldOfAnError_data();
     void retriesWhenToldOfAnError();
@@ -1298,38 +1300,84 @@ void TestMemoryCardFormatter::requestKeepsTheResultOfAProbe()
     takeLog();
 }
 
-void TestMemoryCardFormatter::commandsKeepTheirCard()
+void TestMemoryCardFormatter::commandsKeepTheirPath()
 {
     startDiskService("hung");
     setCard(cardName, card);
     m_formatter->format(vfat);
-    // QML goes on to another card before the first one is unmounted.
-    m_formatter->setDeviceName(otherCardName);
+    // QML moves on to another card before the first one is unmounted.
     m_formatter->setDevicePath(otherCard);
     QCOMPARE(m_formatter->devicePath(), otherCard);
     TRY_COMPARE(m_diskService->members(), words("Unmount"));
     m_diskService->replyToKept();
     TRY_COMPARE(m_diskService->members(), words("Unmount Mount"));
     m_diskService->replyToKept();
-    TRY_EVENTS("not busy, name testcard2, path /dev/testcard2, Unmounting, busy, Formatting, "
-               "Mounting, Probing, Idle, not busy");
+    TRY_EVENTS("not busy, path /dev/testcard2, Unmounting, busy, Formatting, Mounting, Probing, "
+               "Idle, not busy");
     QCOMPARE(m_helper->runs(),
              (QList<QStringList>{words("probe testcard1"), words("format_vfat testcard1"),
                                  words("probe testcard2")}));
-    for (const auto &call : m_diskService->calls()) {
-        QCOMPARE(call.path, objectPath(cardName));
-    }
-
-    // And the new one is meant from then on.
-    m_events->clear();
-    m_formatter->mount();
-    TRY_COMPARE(m_diskService->members(), words("Unmount Mount Mount"));
-    QCOMPARE(m_diskService->calls().last().path, objectPath(otherCardName));
-    m_diskService->replyToKept();
-    TRY_EVENTS("not busy, Mounting, busy, Idle, not busy");
 }
 
-void TestMemoryCardFormatter::leftCommandsKeepTheirCard()
+void TestMemoryCardFormatter::nameIsReadWhenAStepStarts()
+{
+    startDiskService("hung");
+    setCard(cardName, card);
+    m_formatter->format(vfat);
+    TRY_COMPARE(m_diskService->members(), words("Unmount"));
+    m_formatter->setDeviceName(otherCardName);
+    m_diskService->replyToKept();
+    TRY_COMPARE(m_diskService->members(), words("Unmount Mount"));
+    m_diskService->replyToKept();
+    TRY_EVENTS("not busy, name testcard2, Unmounting, busy, Formatting, Mounting, Idle, not busy");
+    QCOMPARE(m_diskService->calls().first().path, objectPath(cardName));
+    QCOMPARE(m_diskService->calls().last().path, objectPath(otherCardName));
+
+    // The same for a request that waits behind another one.
+    m_formatter->unmount();
+    m_formatter->mount();
+    m_formatter->setDeviceName(cardName);
+    TRY_COMPARE(m_diskService->members(), words("Unmount Mount Unmount"));
+    m_diskService->replyToKept();
+    TRY_COMPARE(m_diskService->members(), words("Unmount Mount Unmount Mount"));
+    QCOMPARE(m_diskService->calls().at(2).path, objectPath(otherCardName));
+    QCOMPARE(m_diskService->calls().at(3).path, objectPath(cardName));
+    m_diskService->replyToKept();
+    TRY(m_formatter->status() == Formatter::Idle);
+}
+
+void TestMemoryCardFormatter::nameThatIsEmptyInTheMiddleOfASequence()
+{
+    startDiskService("hung");
+    setCard(cardName, card);
+    m_formatter->format(vfat);
+    TRY_COMPARE(m_diskService->members(), words("Unmount"));
+    m_formatter->setDeviceName(QString());
+    m_diskService->replyToKept();
+    QByteArray log;
+    TRY((log += takeLog()) == critical + "Cannot unmount without device name");
+    const QByteArray events = "not busy, name , Unmounting, busy, Formatting";
+    QCOMPARE(m_events->line(), events);
+
+    // The formatter stays as it is, whatever is set or requested afterwards.
+    m_formatter->setDeviceName(cardName);
+    m_formatter->mount();
+    QCOMPARE(takeLog(),
+             warning + "mount() called when not idle. Status is MemoryCardFormatter::Formatting");
+    QTest::qWait(100);
+    QCOMPARE(m_events->line(), events + ", name testcard1");
+    QCOMPARE(m_diskService->members(), words("Unmount"));
+
+    // A new one works.
+    makeFormatter();
+    m_formatter->setDeviceName(cardName);
+    m_formatter->mount();
+    TRY_COMPARE(m_diskService->members(), words("Unmount Mount"));
+    m_diskService->replyToKept();
+    TRY_EVENTS("name testcard1, not busy, Mounting, busy, Idle, not busy");
+}
+
+void TestMemoryCardFormatter::leftCommandsKeepTheirPath()
 {
     startDiskService("done");
     setCard(QString(), card);

@@ -3,6 +3,8 @@
 
 #include "diskservice.h"
 
+#include <QDBusConnection>
+#include <QDBusError>
 #include <QVariantMap>
 
 #include <array>
@@ -15,6 +17,12 @@ const QLatin1String interface("org.freedesktop.UDisks2.Filesystem");
 const QLatin1String mountMethod("Mount");
 const QLatin1String unmountMethod("Unmount");
 const QLatin1String fileSystemTypeOption("fstype");
+
+// The service writes out all cached data before it replies, which takes long on a slow card.
+constexpr int requestTimeout = 5 * 60 * 1000; // ms
+
+const QLatin1String alreadyMounted("org.freedesktop.UDisks2.Error.AlreadyMounted");
+const QLatin1String alreadyUnmounting("org.freedesktop.UDisks2.Error.AlreadyUnmounting");
 
 struct ErrorName {
     MemoryCardFormatter::MountError code;
@@ -32,16 +40,14 @@ const std::array<ErrorName, 15> errorNames = {{
      QLatin1String("org.freedesktop.UDisks2.Error.NotAuthorizedCanObtain")},
     {MemoryCardFormatter::ErrorNotAuthorizedDismissed,
      QLatin1String("org.freedesktop.UDisks2.Error.NotAuthorizedDismissed")},
-    {MemoryCardFormatter::ErrorAlreadyMounted,
-     QLatin1String("org.freedesktop.UDisks2.Error.AlreadyMounted")},
+    {MemoryCardFormatter::ErrorAlreadyMounted, alreadyMounted},
     {MemoryCardFormatter::ErrorNotMounted,
      QLatin1String("org.freedesktop.UDisks2.Error.NotMounted")},
     {MemoryCardFormatter::ErrorOptionNotPermitted,
      QLatin1String("org.freedesktop.UDisks2.Error.OptionNotPermitted")},
     {MemoryCardFormatter::ErrorMountedByOtherUser,
      QLatin1String("org.freedesktop.UDisks2.Error.MountedByOtherUser")},
-    {MemoryCardFormatter::ErrorAlreadyUnmounting,
-     QLatin1String("org.freedesktop.UDisks2.Error.AlreadyUnmounting")},
+    {MemoryCardFormatter::ErrorAlreadyUnmounting, alreadyUnmounting},
     {MemoryCardFormatter::ErrorNotSupported,
      QLatin1String("org.freedesktop.UDisks2.Error.NotSupported")},
     {MemoryCardFormatter::ErrorTimedout, QLatin1String("org.freedesktop.UDisks2.Error.Timedout")},
@@ -63,15 +69,30 @@ QDBusMessage createCall(const QString &deviceName, QLatin1String method, const Q
 
 QDBusMessage DiskService::mountCall(const QString &deviceName)
 {
-    // An empty type has the service find out what is on the card.
+    // With an empty type the service finds out the file system by itself.
     return createCall(deviceName, mountMethod, fileSystemTypeOption);
 }
 
 QDBusMessage DiskService::unmountCall(const QString &deviceName)
 {
-    // The option without a name is on purpose, and so sent for as long as cards are unmounted; the
-    // service passes it over.
+    // The option with an empty name is intended. The service ignores it.
     return createCall(deviceName, unmountMethod, QString());
+}
+
+QDBusPendingCall DiskService::send(const QDBusMessage &call)
+{
+    const QDBusConnection bus = QDBusConnection::systemBus();
+    if (!bus.isConnected()) {
+        // Qt would never report the end of such a call.
+        return QDBusPendingCall::fromError(
+            {QDBusError::Disconnected, QStringLiteral("Not connected to the system bus")});
+    }
+    return bus.asyncCall(call, requestTimeout);
+}
+
+bool DiskService::isForgiven(const QString &errorName)
+{
+    return errorName == alreadyMounted || errorName == alreadyUnmounting;
 }
 
 std::optional<MemoryCardFormatter::MountError> DiskService::errorCode(const QString &errorName)

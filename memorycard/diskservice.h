@@ -7,17 +7,24 @@
 #include "memorycardformatter.h"
 
 #include <QDBusMessage>
+#include <QDBusPendingCall>
 
 #include <optional>
 
 /*
-    The language of the disk service, UDisks2 on the system bus.
+    The calls to the disk service, UDisks2 on the system bus, and the errors that it replies with.
 */
 namespace DiskService {
 
 // The calls that mount and unmount a block device, given by its kernel name.
 QDBusMessage mountCall(const QString &deviceName);
 QDBusMessage unmountCall(const QString &deviceName);
+
+// Sends a call without waiting. There is always a reply: an error without a system bus, too.
+QDBusPendingCall send(const QDBusMessage &call);
+
+// Whether an error says that the card is in the requested state, or about to be.
+bool isForgiven(const QString &errorName);
 
 // Nothing for an error that is not the disk service's own.
 std::optional<MemoryCardFormatter::MountError> errorCode(const QString &errorName);

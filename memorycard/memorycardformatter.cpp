@@ -7,13 +7,14 @@
 #include "filedescriptor.h"
 #include "fileremover.h"
 
-#include <QDBusConnection>
 #include <QDBusError>
 #include <QDBusPendingCall>
 #include <QDBusPendingCallWatcher>
 #include <QFileInfo>
 #include <QLoggingCategory>
 #include <QThreadPool>
+
+#include <algorithm>
 
 #include <sys/eventfd.h>
 
@@ -30,23 +31,6 @@ const QLatin1String vfat("vfat");
 const QLatin1String ext4("ext4");
 const QLatin1String mkfsVfat("/sbin/mkfs.vfat");
 const QLatin1String mkfsExt4("/sbin/mkfs.ext4");
-
-// Unmounting writes out whatever a slow card has not taken yet.
-constexpr int requestTimeout = 5 * 60 * 1000; // ms
-
-const QLatin1String alreadyMounted("org.freedesktop.UDisks2.Error.AlreadyMounted");
-const QLatin1String alreadyUnmounting("org.freedesktop.UDisks2.Error.AlreadyUnmounting");
-
-// Without a system bus a call would end without an answer.
-QDBusPendingCall send(const QDBusMessage &call)
-{
-    const QDBusConnection bus = QDBusConnection::systemBus();
-    if (!bus.isConnected()) {
-        return QDBusPendingCall::fromError(
-            {QDBusError::Disconnected, QStringLiteral("Not connected to the system bus")});
-    }
-    return bus.asyncCall(call, requestTimeout);
-}
 
 // A thread that finds no descriptor left for its event loop ends the process.
 bool canStartThread()
@@ -188,7 +172,8 @@ void MemoryCardFormatter::setDeviceName(const QString &name)
     \qmlproperty string MemoryCardFormatter::devicePath
 
     The device node of the card's partition, such as \c /dev/mmcblk1p1. A new path is probed at
-    once. While the formatter is \l busy the path cannot be changed; that gives a warning.
+    once, or when a request to the disk service that is under way has ended, well or not. While the
+    formatter is \l busy the path cannot be changed; that gives a warning.
 */
 QString MemoryCardFormatter::devicePath() const
 {
@@ -249,8 +234,9 @@ QStringList MemoryCardFormatter::supportedFormatTypes() const
     \readonly
 
     Whether \l status is neither \c Idle nor \c Error. The operations are refused then, with a
-    warning. It is false while the disk service is asked for the first step of a sequence: what is
-    asked for meanwhile is done afterwards.
+    warning. It is false while the disk service carries out the first step of a sequence: operations
+    that are requested meanwhile are queued. If the running one fails, they are dropped; only the probe
+    of a new \l devicePath still runs.
 */
 bool MemoryCardFormatter::busy() const
 {
@@ -295,10 +281,17 @@ void MemoryCardFormatter::format(const QString &type)
 /*!
     \qmlmethod void MemoryCardFormatter::removeAllFiles()
 
-    Mounts the card, unless it is mounted, and removes all files and folders on it. What cannot be
-    removed stays and leads to \c Error once all else is gone. An empty \l devicePath leads to
+    Mounts the card, unless it is mounted, and removes all files and directories on it. What cannot
+    be removed stays and leads to \c Error once all else is gone. An empty \l devicePath leads to
     \c Error with a warning. Without a \l deviceName the removal stays in the queue, as a
     formatting does: see format().
+
+    A mount directory that is a symbolic link, that is the root directory, or that lies on another
+    device than \l devicePath is not the card. Nothing is removed there, which leads to \c Error
+    unless the card is mounted elsewhere, too.
+
+    The files are removed on a thread of the application's global thread pool. Destroying the formatter
+    does not wait for the removal, but the process does when it ends.
 */
 void MemoryCardFormatter::removeAllFiles()
 {
@@ -416,24 +409,18 @@ void MemoryCardFormatter::unmount()
 
 void MemoryCardFormatter::commandError(QProcess::ProcessError error)
 {
-    Q_UNUSED(error)
-    dropSequence();
-    // A helper that crashes is still running when it is reported, and what has ended is seen by
-    // commandFinished(). One that could not be started has gone without that.
-    if (m_process == nullptr || m_process->state() == QProcess::NotRunning) {
-        clearAwayLater();
+    // The end of a helper that has started, by a crash too, is left to commandFinished(). Qt reports
+    // some failed starts twice: the second report must not hit the command that follows.
+    const bool startsHelper = m_running == Formatting || m_running == Probing;
+    if (error == QProcess::FailedToStart && startsHelper
+        && m_process->state() == QProcess::NotRunning) {
+        fail();
     }
-    setStatus(Error);
 }
 
 void MemoryCardFormatter::commandFinished(int code, QProcess::ExitStatus status)
 {
-    if (m_running == Error) {
-        // The end of what commandError() has been told about.
-        clearAway();
-        return;
-    }
-    if (m_running == Probing) {
+    if (m_running == Probing && status == QProcess::NormalExit) {
         const QByteArray output = m_process->readAllStandardOutput().trimmed();
         const QString filesystemType = QString::fromLatin1(output);
         if (m_filesystemType != filesystemType) {
@@ -441,26 +428,21 @@ void MemoryCardFormatter::commandFinished(int code, QProcess::ExitStatus status)
             Q_EMIT filesystemTypeChanged();
         }
     }
-    m_running = Idle;
     if (code != 0 || status != QProcess::NormalExit) {
-        m_commands.clear();
-        setStatus(Error);
-        return;
+        fail();
+    } else {
+        finishCommand();
     }
-    doNextCommand();
 }
 
 void MemoryCardFormatter::fileRemoverFinished()
 {
-    m_running = Idle;
-    doNextCommand();
+    finishCommand();
 }
 
 void MemoryCardFormatter::fileRemoverError()
 {
-    m_running = Idle;
-    m_commands.clear();
-    setStatus(Error);
+    fail();
 }
 
 void MemoryCardFormatter::setStatus(Status status)
@@ -501,7 +483,9 @@ void MemoryCardFormatter::doNextCommand()
     if (m_process == nullptr && !isMountCommand(command.command)) {
         m_process = new QProcess(this);
         m_process->setStandardErrorFile(QProcess::nullDevice());
-        connect(m_process, &QProcess::errorOccurred, this, &MemoryCardFormatter::commandError);
+        // Queued: a process cannot be started again from the signal that it did not start.
+        connect(m_process, &QProcess::errorOccurred, this, &MemoryCardFormatter::commandError,
+                Qt::QueuedConnection);
         connect(m_process, QOverload<int, QProcess::ExitStatus>::of(&QProcess::finished), this,
                 &MemoryCardFormatter::commandFinished);
     }
@@ -569,43 +553,40 @@ void MemoryCardFormatter::startMountOperation(Status command)
     m_running = command;
     const QDBusMessage call =
         mounts ? DiskService::mountCall(m_deviceName) : DiskService::unmountCall(m_deviceName);
-    auto *reply = new QDBusPendingCallWatcher(send(call), this);
+    auto *reply = new QDBusPendingCallWatcher(DiskService::send(call), this);
     connect(reply, &QDBusPendingCallWatcher::finished, this,
-            [this, command, method = call.member()](auto *finished) {
-                mountOperationFinished(command, method, finished);
+            [this, method = call.member()](auto *finished) {
+                mountOperationFinished(method, finished);
             });
 }
 
-void MemoryCardFormatter::mountOperationFinished(Status command, const QString &method,
+void MemoryCardFormatter::mountOperationFinished(const QString &method,
                                                  QDBusPendingCallWatcher *reply)
 {
     reply->deleteLater();
     if (!reply->isError()) {
-        setStatus(command);
-        commandFinished(0, QProcess::NormalExit);
+        setStatus(m_running);
+        finishCommand();
         return;
     }
-
     const QString name = reply->error().name();
     qCWarning(lcMemoryCardLog) << method << "error:" << name.toLatin1().constData();
-    // What was to be done is done, or about to be.
-    const bool forgiven = name == alreadyMounted || name == alreadyUnmounting;
-    if (!forgiven) {
-        // Before anybody is told: what is asked for in answer is not part of what has failed.
-        dropSequence();
-        clearAwayLater();
+    if (DiskService::isForgiven(name)) {
+        reportDiskServiceError(name);
+        finishCommand();
+    } else {
+        fail(name);
     }
+}
+
+void MemoryCardFormatter::reportDiskServiceError(const QString &name)
+{
     if (const auto code = DiskService::errorCode(name)) {
-        if (command == Mounting) {
+        if (m_running == Mounting) {
             Q_EMIT mountError(*code);
         } else {
             Q_EMIT unmountError(*code);
         }
-    }
-    if (forgiven) {
-        commandFinished(0, QProcess::NormalExit);
-    } else {
-        setStatus(Error);
     }
 }
 
@@ -625,24 +606,28 @@ void MemoryCardFormatter::startRemovingFiles(const Command &command)
     setStatus(RemovingFiles);
 }
 
-void MemoryCardFormatter::dropSequence()
-{
-    m_commands.clear();
-    m_running = Error;
-}
-
-void MemoryCardFormatter::clearAwayLater()
-{
-    // Not at once: a process cannot be started again from within the report that it did not start.
-    QMetaObject::invokeMethod(this, &MemoryCardFormatter::clearAway, Qt::QueuedConnection);
-}
-
-void MemoryCardFormatter::clearAway()
+void MemoryCardFormatter::finishCommand()
 {
     m_running = Idle;
-    // What was asked for since the failure.
+    doNextCommand();
+}
+
+void MemoryCardFormatter::fail(const QString &diskServiceError)
+{
+    // Dropped before any signal is emitted: requests made from handlers start a new sequence.
+    if (diskServiceError.isEmpty()) {
+        m_commands.clear();
+    } else {
+        // A new path can be set while the request is under way, and is probed in any case.
+        const auto isNoProbe = [](const Command &command) { return command.command != Probing; };
+        m_commands.erase(std::remove_if(m_commands.begin(), m_commands.end(), isNoProbe),
+                         m_commands.end());
+    }
+    reportDiskServiceError(diskServiceError);
+    m_running = Idle;
+    setStatus(Error);
     if (!m_commands.isEmpty()) {
-        doNextCommand();
+        startIfNothingRuns();
     }
 }
 

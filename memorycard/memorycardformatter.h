@@ -114,19 +114,18 @@ private:
     void startProbing(const Command &command);
     void runHelper(Status command, const QStringList &arguments);
     void startMountOperation(Status command);
-    void mountOperationFinished(Status command, const QString &method,
-                                QDBusPendingCallWatcher *reply);
+    void mountOperationFinished(const QString &method, QDBusPendingCallWatcher *reply);
+    void reportDiskServiceError(const QString &name);
     void startRemovingFiles(const Command &command);
-    void dropSequence();
-    void clearAwayLater();
-    void clearAway();
+    void finishCommand();
+    void fail(const QString &diskServiceError = QString());
     static bool isMountCommand(Status command);
 
     QProcess *m_process = nullptr;
     QQueue<Command> m_commands;
     Status m_status = Idle;
-    // The command that is under way; the status follows it only once the disk service has answered.
-    // Idle: none, the next may start. Error: one that has failed and is not out of the way yet.
+    // The command that is under way, or Idle. The status follows a request to the disk service only
+    // when that has succeeded.
     Status m_running = Idle;
     QString m_deviceName;
     QString m_devicePath;

@@ -170,6 +170,9 @@ private Q_SLOTS:
     void oneRequestAtATime();
     void formatsOneAfterTheOther();
     void probeWaitsForTheRequest();
+    void probeSurvivesAFailedRequest_data();
+    void probeSurvivesAFailedRequest();
+    void errorsOfARunningHelper();
     void requestKeepsTheResultOfAProbe();
     void commandsKeepTheirPath();
     void nameIsReadWhenAStepStarts();
@@ -1274,6 +1277,64 @@ void TestMemoryCardFormatter::probeWaitsForTheRequest()
                "not busy");
 }
 
+void TestMemoryCardFormatter::probeSurvivesAFailedRequest_data()
+{
+    QTest::addColumn<bool>("mounts");
+    QTest::newRow("mount") << true;
+    QTest::newRow("unmount") << false;
+}
+
+void TestMemoryCardFormatter::probeSurvivesAFailedRequest()
+{
+    QFETCH(bool, mounts);
+    startDiskService("DeviceBusy");
+    setCard(cardName, card);
+    m_helper->install(QStringLiteral("done"), "ext4\n");
+    // The next card is set before the request for this one fails.
+    if (mounts) {
+        m_formatter->mount();
+    } else {
+        m_formatter->unmount();
+    }
+    m_formatter->format(vfat);
+    m_formatter->setDevicePath(otherCard);
+    const QByteArray error = mounts ? "mount ErrorDeviceBusy" : "unmount ErrorDeviceBusy";
+    TRY_EVENTS("not busy, not busy, path /dev/testcard2, " + error
+               + ", Error, Probing, busy, type ext4, Idle, not busy");
+    // The format is dropped.
+    QCOMPARE(m_helper->runs().mid(1), QList<QStringList>{words("probe testcard2")});
+    QCOMPARE(m_diskService->members().size(), 1);
+    takeLog();
+}
+
+void TestMemoryCardFormatter::errorsOfARunningHelper()
+{
+    // Only a failed start is an end that the process does not report otherwise.
+    const auto report = [this](QProcess::ProcessError error) {
+        return QMetaObject::invokeMethod(m_formatter.get(), "commandError",
+                                         Q_ARG(QProcess::ProcessError, error));
+    };
+    m_helper->install(QStringLiteral("held"), "ext4\n");
+    m_formatter->setDevicePath(card);
+    TRY(m_helper->running().size() == 1);
+    for (const auto error : {QProcess::FailedToStart, QProcess::Crashed, QProcess::Timedout,
+                             QProcess::ReadError, QProcess::WriteError, QProcess::UnknownError}) {
+        QVERIFY(report(error));
+    }
+    m_helper->release();
+    TRY_EVENTS("path /dev/testcard1, Probing, busy, type ext4, Idle, not busy");
+
+    // A second report of a failed start comes while the next command runs.
+    startDiskService("hung");
+    m_formatter->setDeviceName(cardName);
+    m_events->clear();
+    m_formatter->mount();
+    QVERIFY(report(QProcess::FailedToStart));
+    TRY_COMPARE(m_diskService->members(), words("Mount"));
+    m_diskService->replyToKept();
+    TRY_EVENTS("not busy, Mounting, busy, Idle, not busy");
+}
+
 void TestMemoryCardFormatter::requestKeepsTheResultOfAProbe()
 {
     startDiskService("hung");
@@ -1285,8 +1346,9 @@ void TestMemoryCardFormatter::requestKeepsTheResultOfAProbe()
     m_formatter->unmount();
     TRY_COMPARE(m_diskService->members(), words("Mount"));
     startDiskService("AlreadyUnmounting");
-    // The first request ends with the service, and with it what waits behind it.
-    TRY_EVENTS("not busy, path /dev/testcard1, not busy, Error");
+    // The first request ends with the service. The probe behind it runs, the unmounting is dropped.
+    TRY_EVENTS("not busy, path /dev/testcard1, not busy, Error, Probing, busy, type vfat, Idle, "
+               "not busy");
     QCOMPARE(takeLog(), warning + "\"Mount\" error: org.freedesktop.DBus.Error.NoReply");
 
     // Here the probe is over when the request begins, and the status still says that it runs.

@@ -15,6 +15,7 @@
 #include <QThreadPool>
 
 #include <algorithm>
+#include <array>
 
 #include <sys/eventfd.h>
 
@@ -32,10 +33,16 @@ const QLatin1String ext4("ext4");
 const QLatin1String mkfsVfat("/sbin/mkfs.vfat");
 const QLatin1String mkfsExt4("/sbin/mkfs.ext4");
 
-// A thread that finds no descriptor left for its event loop ends the process.
-bool canStartThread()
+// Whether the process may open enough files to start a helper or a thread. With too few left, a thread
+// that lacks one for its event loop ends the process, and Qt 5.15 may take a helper for running that
+// never started. That one has the process id -1, and killing it would kill all processes of the user.
+bool hasDescriptorsLeft()
 {
-    return FileDescriptor(eventfd(0, EFD_CLOEXEC)).isOpen();
+    std::array<FileDescriptor, 16> spare; // a helper takes up to 8
+    for (FileDescriptor &descriptor : spare) {
+        descriptor = FileDescriptor(eventfd(0, EFD_CLOEXEC));
+    }
+    return spare.back().isOpen();
 }
 
 } // namespace
@@ -533,6 +540,12 @@ void MemoryCardFormatter::startProbing(const Command &command)
 void MemoryCardFormatter::runHelper(Status command, const QStringList &arguments)
 {
     m_running = command;
+    if (!hasDescriptorsLeft()) {
+        // Reported later, as when the process itself finds that it cannot start.
+        QMetaObject::invokeMethod(
+            this, [this] { commandError(QProcess::FailedToStart); }, Qt::QueuedConnection);
+        return;
+    }
     m_process->start(helperProgram, arguments);
     // A program that is not there is reported later; until then it is being started.
     if (m_process->state() != QProcess::NotRunning) {
@@ -592,8 +605,7 @@ void MemoryCardFormatter::reportDiskServiceError(const QString &name)
 
 void MemoryCardFormatter::startRemovingFiles(const Command &command)
 {
-    if (!canStartThread()) {
-        // Nor could the mount table be read.
+    if (!hasDescriptorsLeft()) {
         fileRemoverError();
         return;
     }

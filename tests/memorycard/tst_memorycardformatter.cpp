@@ -19,12 +19,15 @@
 #include <QThreadPool>
 #include <QtTest>
 
+#include <cerrno>
 #include <functional>
 #include <memory>
 
 #include <dlfcn.h>
 #include <sys/mount.h>
 #include <sys/stat.h>
+#include <sys/syscall.h>
+#include <unistd.h>
 
 using Formatter = MemoryCardFormatter;
 
@@ -46,6 +49,7 @@ const QByteArray debug = QByteArrayLiteral("debug [org.tarnwickos.settings.memor
 
 // Of the last call that was sent and waits for its reply, in milliseconds.
 int lastTimeout = 0;
+bool signalledAllProcesses = false;
 
 QString objectPath(const QString &name)
 {
@@ -96,6 +100,17 @@ extern "C" Q_DECL_EXPORT unsigned dbus_connection_send_with_reply(void *connecti
     return original(connection, message, reply, timeout);
 }
 
+// Takes the place of the C library's own: this process must never signal all processes there are.
+extern "C" Q_DECL_EXPORT int kill(pid_t pid, int signal) noexcept
+{
+    if (pid <= 0) {
+        signalledAllProcesses = true;
+        errno = EPERM;
+        return -1;
+    }
+    return int(syscall(SYS_kill, pid, signal));
+}
+
 class TestMemoryCardFormatter : public QObject
 {
     Q_OBJECT
@@ -126,6 +141,7 @@ private Q_SLOTS:
     void crashedProbe();
     void helperThatCannotRun_data();
     void helperThatCannotRun();
+    void helperWithFewDescriptors();
     void retriesWhenTheStatusIsError_data();
     void retriesWhenTheStatusIsError();
     void retriesWhenTheStatusIsErrorAgainAndAgain();
@@ -610,6 +626,35 @@ void TestMemoryCardFormatter::helperThatCannotRun()
     m_events->clear();
     m_formatter->setDevicePath(card);
     TRY_EVENTS("path /dev/testcard1, Probing, busy, type ext4, Idle, not busy");
+}
+
+void TestMemoryCardFormatter::helperWithFewDescriptors()
+{
+    startDiskService("done");
+    m_formatter->setDeviceName(cardName);
+    m_formatter->unmount();
+    TRY(m_events->line().endsWith("Unmounting, busy, Idle, not busy"));
+    bool started = false;
+    bool failed = false;
+    for (int left = 0; left < 24; ++left) {
+        const UsedUpDescriptors used(left);
+        makeFormatter();
+        m_formatter->setDeviceName(cardName);
+        m_formatter->setDevicePath(card);
+        TRY(m_events->line().contains("Error") || m_events->line().endsWith("Idle, not busy"));
+        const bool probed = m_formatter->status() == Formatter::Idle;
+        m_events->clear();
+        m_formatter->format(vfat);
+        TRY(m_events->line().endsWith(probed ? "Mounting, Idle, not busy" : "Error, not busy"));
+        started = started || probed;
+        failed = failed || !probed;
+
+        // Its destruction ends a probe, and nothing else.
+        Formatter another;
+        another.setDevicePath(card);
+    }
+    QVERIFY(started && failed);
+    QVERIFY(!signalledAllProcesses);
 }
 
 void TestMemoryCardFormatter::retriesWhenTheStatusIsError_data()

@@ -13,12 +13,12 @@
 #include <unistd.h>
 
 /*
-    Every descriptor that this process may have, but for those that it has.
+    Takes every descriptor that this process may still open, except as many as are to be left.
 */
 class UsedUpDescriptors
 {
 public:
-    UsedUpDescriptors()
+    explicit UsedUpDescriptors(int left = 0)
     {
         // A process may wait for no more than it may have: of what it has, all stay usable.
         const rlimit few = {256, m_limit.rlim_max};
@@ -28,6 +28,10 @@ public:
         int descriptor = -1;
         while ((descriptor = open("/dev/null", O_RDONLY | O_CLOEXEC)) >= 0) {
             m_descriptors.push_back(descriptor);
+        }
+        for (; left > 0 && !m_descriptors.empty(); --left) {
+            close(m_descriptors.back());
+            m_descriptors.pop_back();
         }
     }
     ~UsedUpDescriptors()

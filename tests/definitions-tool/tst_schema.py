@@ -29,8 +29,9 @@ def fail(text):
     print("FAILED:", text)
 
 
-for path in sorted(pathlib.Path(sys.argv[2]).glob("*.json")):
-    findings = pathlib.Path(f"{path}.findings").read_text()
+corpus = pathlib.Path(sys.argv[2])
+for path in sorted((corpus / "eventswidgetsfile").iterdir()):
+    findings = (corpus / "findings" / path.name).read_text()
     rules = set(re.findall(r" \[([a-z-]+)\]$", findings, re.MULTILINE)) - BEYOND
     try:
         value = json.loads(path.read_bytes().decode("utf-8-sig"), strict=False)

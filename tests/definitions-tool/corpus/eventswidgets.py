@@ -1,0 +1,226 @@
+# SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+# SPDX-License-Identifier: BSD-3-Clause
+"""Definition files of events widgets, each with what marlo-definitions finds in it."""
+
+from write import Corpus
+
+corpus = Corpus("eventswidgetsfile", ".json")
+case = corpus.case
+
+GOOD = {
+    "path": '"/usr/share/lamp.qml"',
+    "title": '"Lamp"',
+    "translation_id": '"maps-title"',
+    "description_id": '"maps-english"',
+    "icon": '"image://theme/icon-m-lamp"',
+    "order": "10",
+    "default_enabled": "true",
+    "available_path": '"/usr/bin/lamp"',
+}
+
+
+def widget(**changes):
+    """A good widget on ten lines, in which some members have another value."""
+    members = (GOOD | changes).items()
+    return "{\n" + ",\n".join(f'"{key}": {value}' for key, value in members) + "\n}"
+
+
+def short(name="a"):
+    """A good widget on one line."""
+    return f'{{ "path": "/usr/share/{name}.qml", "order": 1 }}'
+
+
+def file(*widgets):
+    """A good file, whose first widget begins in line 4."""
+    return '{\n"translation_catalog": "maps",\n"widgets": [\n' + ",\n".join(widgets) + "\n]\n}\n"
+
+
+def no_json(line):
+    return f"{line}: error: from here on this is no JSON: nothing of the file is read [json]"
+
+
+def no_object(line):
+    return f"{line}: error: this is no object: nothing of the file is read [json]"
+
+
+def no_widget(line):
+    return f"{line}: error: this is no object and passed over [widget]"
+
+
+def wrong_type(line, key, what):
+    return f'{line}: error: the value of "{key}" is not {what} and is passed over [type]'
+
+
+INTEGER = "an integer of 32 bits"
+BOOLEAN = "true or false"
+
+# What is no JSON.
+case("bad-empty", "", no_json(1))
+case("bad-binary", bytes(range(256)), no_json(1))
+case("bad-utf16", '{ "widgets": [] }'.encode("utf-16"), no_json(1))
+case("bad-utf8", '{ "widgets": [ %s,\n { "path": "\udcff" } ] }' % short(), no_json(2))
+case("bad-comma", file(widget()).replace('Lamp",', 'Lamp"'), no_json(7))
+case("bad-trailing-comma", file(widget(available_path='"/usr/bin/lamp",')), no_json(13))
+case("bad-comment", '{\n// The lamp.\n"widgets": []\n}', no_json(2))
+case("bad-quotes", "{\n'widgets': []\n}", no_json(2))
+case("bad-cut-off", '{\n"widgets": [\n{ "path": "a" }\n', no_json(3))
+case("bad-unclosed-text", '{\n"widgets": [ {\n"path": "a,\n"order": 1 } ]\n}', no_json(4))
+case("bad-behind", '{ "widgets": [] }\n}\n', no_json(2))
+case("bad-deep", "[" * 2000 + "]" * 2000, no_json(1))
+case("bad-deep-objects", '{"a":' * 2000, no_json(1))
+
+# What is no object.
+case("bad-null", "null", no_object(1))
+case("bad-text", '"widgets"', no_object(1))
+case("bad-array", '\n[ { "path": "a" } ]\n', no_object(2))
+
+# What stands in a file.
+case("good", file(widget()))
+case("good-crlf", file(widget()).replace("\n", "\r\n"))
+case("good-mark", "\ufeff" + file(short("maßä")))
+case("good-no-catalog", '{ "widgets": [ { "path": "a", "order": -1, "default_enabled": false } ] }')
+case("good-no-widgets", '{ "translation_catalog": "maps" }\n')
+case("good-empty-array", '{ "widgets": [] }')
+case("good-schema-key", file(short()).replace("{\n", '{\n"$schema": "x.json",\n', 1))
+case(
+    "bad-catalog-type",
+    '{ "translation_catalog": [ "maps" ],\n"widgets": [ %s ] }' % short(),
+    wrong_type(1, "translation_catalog", "a text"),
+)
+case(
+    "bad-widgets-type",
+    '{ "widgets": {\n"path": "a" } }',
+    wrong_type(1, "widgets", "an array"),
+)
+case(
+    "bad-repeated-widgets",
+    '{ "widgets": "none",\n"widgets": [ %s, 5 ] }' % short(),
+    wrong_type(1, "widgets", "an array"),
+    '1: error: the key "widgets" stands again in line 2, and only that counts [repeated-key]',
+    no_widget(2),
+)
+case(
+    "bad-entries",
+    file("1", short(), "[]", "null", '"b"', "true"),
+    *(no_widget(line) for line in (4, 6, 7, 8, 9)),
+)
+
+# What stands in a widget.
+case("good-empty-texts", file(widget(title='""', translation_id='""', available_path='""')))
+case("good-escapes", file(widget(title=r'"L\u00e4mp \"x\" \ud83d\ude00 \/"')))
+case("good-utf8", file(widget(title='"Lämpchen ☀"')))
+case(
+    "good-integers",
+    file(
+        *(
+            '{ "path": "/usr/share/%d.qml", "order": %s }' % numbered
+            for numbered in enumerate(["5.0", "5e2", "2147483647", "-2147483648"])
+        )
+    ),
+)
+case(
+    "bad-types",
+    file(
+        widget(
+            title="5",
+            translation_id="null",
+            description_id='[ "x" ]',
+            icon='{ "source": "x" }',
+            order='"10"',
+            default_enabled='"true"',
+            available_path="false",
+        )
+    ),
+    wrong_type(6, "title", "a text"),
+    wrong_type(7, "translation_id", "a text"),
+    wrong_type(8, "description_id", "a text"),
+    wrong_type(9, "icon", "a text"),
+    wrong_type(10, "order", INTEGER),
+    wrong_type(11, "default_enabled", BOOLEAN),
+    wrong_type(12, "available_path", "a text"),
+)
+case("bad-enabled-number", file(widget(default_enabled="1")), wrong_type(11, "default_enabled", BOOLEAN))
+for name, order in {"fraction": "5.5", "large": "2147483648", "huge": "1e300"}.items():
+    case(f"bad-order-{name}", file(widget(order=order)), wrong_type(10, "order", INTEGER))
+case(
+    "bad-no-path",
+    file(short("a"), '{\n"order": 1 }', short("b")),
+    '5: error: there is no "path": the widget is passed over [path]',
+)
+case(
+    "bad-empty-path",
+    file(short("a"), '{ "order": 1,\n"path": "" }', short("b")),
+    '6: error: "path" is empty: the widget is passed over [path]',
+)
+case(
+    "bad-path-type",
+    file(short("a"), '{ "order": 1,\n"path": 7 }', short("b")),
+    '6: error: "path" is not a text: the widget is passed over [path]',
+)
+case(
+    "bad-repeated-key",
+    file(widget(order='10,\n"title": "Torch"')),
+    '6: error: the key "title" stands again in line 11, and only that counts [repeated-key]',
+)
+case(
+    "bad-several",
+    file('{ "title": 3, "order": "x" }', widget(default_enabled='"yes"'), "7"),
+    wrong_type(4, "title", "a text"),
+    wrong_type(4, "order", INTEGER),
+    '4: error: there is no "path": the widget is passed over [path]',
+    wrong_type(12, "default_enabled", BOOLEAN),
+    no_widget(15),
+)
+case(
+    "warn-no-order",
+    file(short(), '{ "path": "/usr/share/b.qml" }'),
+    '5: warning: without "order" the widget comes last [order]',
+)
+case(
+    "warn-duplicate-path",
+    file(short("a"), short("b"), short("a")),
+    '6: warning: the path "/usr/share/a.qml" stands in warn-duplicate-path.json:4 too, and one of '
+    "the two widgets is lost [duplicate-path]",
+)
+case(
+    "warn-relative",
+    file(widget(icon='"icons/lamp.svg"', available_path='"bin/lamp"')),
+    '9: warning: the icon "icons/lamp.svg" is a relative path [relative-path]',
+    '12: warning: the available path "bin/lamp" is a relative path [relative-path]',
+)
+case(
+    "warn-unknown-key",
+    """{
+"translation-catalog": "maps",
+"widget": [],
+"widgets": [ {
+  "path": "a", "order": 1,
+  "defaultEnabled": true,
+  "tilte": "x",
+  "colour": "red"
+} ]
+}""",
+    '2: warning: unknown key "translation-catalog"; is "translation_catalog" meant? [unknown-key]',
+    '3: warning: unknown key "widget"; is "widgets" meant? [unknown-key]',
+    '6: warning: unknown key "defaultEnabled"; is "default_enabled" meant? [unknown-key]',
+    '7: warning: unknown key "tilte"; is "title" meant? [unknown-key]',
+    '8: warning: unknown key "colour" [unknown-key]',
+)
+case(
+    "warn-escaped-unknown-key",
+    file('{ "path": "a", "order": 1,\n "a\\nb\\u001b[31m": 2 }'),
+    r'5: warning: unknown key "a\u000ab\u001b[31m" [unknown-key]',
+)
+
+# Catalogs.
+case(
+    "warn-catalog",
+    file(short()).replace("maps", "nowhere"),
+    '2: warning: the catalog "nowhere" is not installed in /usr/share/translations [catalog]',
+)
+case(
+    "warn-text-id",
+    file(widget(translation_id='"maps-titel"', description_id='"maps-nothing"')),
+    '7: warning: the catalog "maps" does not hold the text "maps-titel" [text-id]',
+    '8: warning: the catalog "maps" does not hold the text "maps-nothing" [text-id]',
+)

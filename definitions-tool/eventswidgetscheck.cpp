@@ -16,7 +16,7 @@
 #include <utility>
 
 using Severity = Finding::Severity;
-using Widget = EventsWidgetsModel::Widget;
+using Widget = EventsWidget;
 
 namespace {
 

@@ -70,7 +70,7 @@ QStringList namedCatalogs()
         + DefinitionFiles::inFolder(DefinitionFiles::eventsWidgetsDirectory);
     for (const QString &file : files) {
         if (DefinitionFiles::isQuickAction(file)) {
-            catalogs.insert(QuickActionsModel::Action(file, false).translationCatalog());
+            catalogs.insert(QuickAction(file, false).translationCatalog());
         } else if (const auto widgets = readEventsWidgetsFile(file)) {
             catalogs.insert(widgets->translationCatalog);
         }

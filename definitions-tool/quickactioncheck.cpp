@@ -15,7 +15,7 @@
 
 #include <algorithm>
 
-using Action = QuickActionsModel::Action;
+using Action = QuickAction;
 using Severity = Finding::Severity;
 
 namespace {

@@ -42,7 +42,7 @@ QString sentText(const QString &text)
     return text.section(QChar(), 0, 0);
 }
 
-QString callLine(const QuickActionsModel::Action &action)
+QString callLine(const QuickAction &action)
 {
     const QDBusError error = action.whyUnsendable();
     if (error.isValid()) {
@@ -91,7 +91,7 @@ QString valueText(const QVariant &value)
 std::optional<QString> showQuickAction(const QString &path)
 {
     const ReaderLog log;
-    const QuickActionsModel::Action action(path, false);
+    const QuickAction action(path, false);
     if (log.hasWarnings()) {
         return {};
     }
@@ -112,7 +112,7 @@ std::optional<QString> showEventsWidgets(const QString &path)
         return {};
     }
     QString text = line("translation catalog", file->translationCatalog);
-    for (const EventsWidgetsModel::Widget &widget : file->widgets) {
+    for (const EventsWidget &widget : file->widgets) {
         text += QLatin1Char('\n') + line("path", widget.path) + line("title", widget.title)
             + line("title's identifier", widget.translationId)
             + line("description's identifier", widget.descriptionId) + line("icon", widget.icon)

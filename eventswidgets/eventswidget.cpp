@@ -5,12 +5,12 @@
 
 #include <QFileInfo>
 
-bool EventsWidgetsModel::Widget::isAvailable() const
+bool EventsWidget::isAvailable() const
 {
     return availablePath.isEmpty() || QFileInfo::exists(availablePath);
 }
 
-bool EventsWidgetsModel::Widget::operator!=(const Widget &other) const
+bool EventsWidget::operator!=(const EventsWidget &other) const
 {
     return title != other.title || translationId != other.translationId
         || descriptionId != other.descriptionId || icon != other.icon || path != other.path

@@ -4,13 +4,13 @@
 #ifndef EVENTSWIDGET_H
 #define EVENTSWIDGET_H
 
-#include "eventswidgetsmodel.h"
+#include <QString>
 
 /*
     An events widget as a definition file describes it, and how it stands with the user and the
     device. Its path is its identity.
 */
-struct EventsWidgetsModel::Widget {
+struct EventsWidget {
     QString file; // The definition file, absolute.
     QString title; // Shown where translationId has no translation.
     QString translationId; // Of the title.
@@ -29,7 +29,7 @@ struct EventsWidgetsModel::Widget {
 
     // Leaves out file and translationCatalog on purpose: a widget that moves to another file, or
     // whose file changes its catalog, is the same to whoever shows it and not reported as changed.
-    bool operator!=(const Widget &other) const;
+    bool operator!=(const EventsWidget &other) const;
 };
 
 #endif

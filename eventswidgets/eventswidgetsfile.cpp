@@ -30,9 +30,9 @@ constexpr int noOrder = -1;
 // The log is written while the main thread waits: no more lines than anybody reads.
 constexpr int maximumWarnings = 1000;
 
-EventsWidgetsModel::Widget readWidget(JsonReader *reader)
+EventsWidget readWidget(JsonReader *reader)
 {
-    EventsWidgetsModel::Widget widget;
+    EventsWidget widget;
     if (!reader->beginObject()) {
         return widget;
     }
@@ -62,13 +62,13 @@ EventsWidgetsModel::Widget readWidget(JsonReader *reader)
 }
 
 // Counts the entries that are no widgets.
-std::vector<EventsWidgetsModel::Widget> readWidgets(JsonReader *reader, int *rejected)
+std::vector<EventsWidget> readWidgets(JsonReader *reader, int *rejected)
 {
-    std::vector<EventsWidgetsModel::Widget> widgets;
+    std::vector<EventsWidget> widgets;
     *rejected = 0;
     if (reader->beginArray()) {
         while (reader->nextElement()) {
-            EventsWidgetsModel::Widget widget = readWidget(reader);
+            EventsWidget widget = readWidget(reader);
             if (widget.path.isEmpty()) {
                 ++*rejected;
             } else {
@@ -112,7 +112,7 @@ std::optional<EventsWidgetsFile> readEventsWidgetsFile(const QString &path)
     for (int i = 0; i < std::min(rejected, maximumWarnings); ++i) {
         qWarning() << "Invalid widget defined in" << path;
     }
-    for (EventsWidgetsModel::Widget &widget : file.widgets) {
+    for (EventsWidget &widget : file.widgets) {
         widget.file = path;
         widget.translationCatalog = file.translationCatalog;
         widget.available = widget.isAvailable();

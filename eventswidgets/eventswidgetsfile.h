@@ -19,7 +19,7 @@ constexpr qint64 maximumEventsWidgetsSize = qint64(32) * 1024 * 1024;
 struct EventsWidgetsFile {
     QString translationCatalog; // Empty for none.
     // In the order of the file. Which of them are enabled only a model can tell.
-    std::vector<EventsWidgetsModel::Widget> widgets;
+    std::vector<EventsWidget> widgets;
 };
 
 // Nothing if the file cannot be read or is no definition. That, and every entry of the file that is

@@ -34,7 +34,7 @@ QString translation(const QString &id, const QString &fallback)
 }
 
 // A row without an order is no higher than any that has one.
-uint orderOfRow(const EventsWidgetsModel::Widget &widget)
+uint orderOfRow(const EventsWidget &widget)
 {
     return uint(qMax(widget.order, 0));
 }
@@ -291,7 +291,7 @@ void EventsWidgetsModel::readEnabledList()
     }
 }
 
-std::vector<EventsWidgetsModel::Widget> EventsWidgetsModel::readWidgets()
+std::vector<EventsWidget> EventsWidgetsModel::readWidgets()
 {
     m_writeWatcher.watch(definitionDirectory);
 

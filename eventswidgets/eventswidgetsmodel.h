@@ -19,6 +19,8 @@
 
 #include <vector>
 
+struct EventsWidget;
+
 /*
     The widgets that packages offer for the events screen, and which of them the user has enabled.
 
@@ -31,7 +33,7 @@ class EventsWidgetsModel : public QAbstractListModel, public QQmlParserStatus
     Q_INTERFACES(QQmlParserStatus)
 
 public:
-    struct Widget;
+    using Widget = EventsWidget;
 
     enum Role {
         TitleRole = Qt::UserRole,

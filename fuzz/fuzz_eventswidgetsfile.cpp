@@ -45,7 +45,7 @@ bool mayDiffer(const QByteArray &text)
     return text.lastIndexOf(byteOrderMark) > 0;
 }
 
-bool isSame(const EventsWidgetsModel::Widget &widget, const QJsonObject &object)
+bool isSame(const EventsWidget &widget, const QJsonObject &object)
 {
     const auto text = [&object](const char *key) {
         return object.value(QLatin1String(key)).toString();

@@ -74,8 +74,8 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t *data, std::size_t size
     const QByteArray content(reinterpret_cast<const char *>(data), int(size));
     const QString path =
         Fuzzing::writeFile((QByteArray::number(number) + ".conf").constData(), content);
-    const QuickActionsModel::Action action(path, true);
-    const QuickActionsModel::Action again(path, true);
+    const QuickAction action(path, true);
+    const QuickAction again(path, true);
     QFile::remove(path);
     Fuzzing::require(action == again, "a file reads the same twice");
 

@@ -37,7 +37,7 @@ const QLatin1String reservedInterface("org.freedesktop.DBus.Local");
 
 } // namespace
 
-QuickActionsModel::Action::Action(const QString &path, bool enabled)
+QuickAction::QuickAction(const QString &path, bool enabled)
     : m_path(path), m_config(readActionConfig(path)), m_enabled(enabled)
 {
     // Read as text: as a variant, a number that is too large for an integer would wrap around.
@@ -48,52 +48,52 @@ QuickActionsModel::Action::Action(const QString &path, bool enabled)
     }
 }
 
-QString QuickActionsModel::Action::title() const
+QString QuickAction::title() const
 {
     return text(titleKey);
 }
 
-QVariant QuickActionsModel::Action::icon() const
+QVariant QuickAction::icon() const
 {
     return m_config.value(iconKey);
 }
 
-QString QuickActionsModel::Action::translationCatalog() const
+QString QuickAction::translationCatalog() const
 {
     return text(translationCatalogKey);
 }
 
-QString QuickActionsModel::Action::requiredPackage() const
+QString QuickAction::requiredPackage() const
 {
     return text(requiresPackageKey);
 }
 
-QString QuickActionsModel::Action::service() const
+QString QuickAction::service() const
 {
     return text(serviceKey);
 }
 
-QString QuickActionsModel::Action::objectPath() const
+QString QuickAction::objectPath() const
 {
     return text(pathKey);
 }
 
-QString QuickActionsModel::Action::interface() const
+QString QuickAction::interface() const
 {
     return text(interfaceKey);
 }
 
-QString QuickActionsModel::Action::method() const
+QString QuickAction::method() const
 {
     return text(methodKey);
 }
 
-QVariantList QuickActionsModel::Action::arguments() const
+QVariantList QuickAction::arguments() const
 {
     return m_config.value(argumentsKey).toList();
 }
 
-QDBusError QuickActionsModel::Action::whyUnsendable() const
+QDBusError QuickAction::whyUnsendable() const
 {
     // QtDBus would not notice: it sends a call without a service to the bus itself, and on a service
     // that is a lone word, or a signature that is too long, the process ends.
@@ -129,8 +129,8 @@ QDBusError QuickActionsModel::Action::whyUnsendable() const
     return {};
 }
 
-bool QuickActionsModel::Action::trigger(QObject *receiver, const char *returnMethod,
-                                        const char *errorMethod) const
+bool QuickAction::trigger(QObject *receiver, const char *returnMethod,
+                          const char *errorMethod) const
 {
     QDBusConnection bus = QDBusConnection::sessionBus();
     QDBusError error = whyUnsendable();
@@ -154,12 +154,12 @@ bool QuickActionsModel::Action::trigger(QObject *receiver, const char *returnMet
     return false;
 }
 
-bool QuickActionsModel::Action::operator==(const Action &other) const
+bool QuickAction::operator==(const QuickAction &other) const
 {
     return m_path == other.m_path && m_config == other.m_config && m_enabled == other.m_enabled;
 }
 
-QVariantMap QuickActionsModel::Action::readActionConfig(const QString &path) const
+QVariantMap QuickAction::readActionConfig(const QString &path) const
 {
     if (!isWellFormedIni(path)) {
         qWarning("Unable to open action file");
@@ -194,7 +194,7 @@ QVariantMap QuickActionsModel::Action::readActionConfig(const QString &path) con
     return config;
 }
 
-QString QuickActionsModel::Action::text(QLatin1String key) const
+QString QuickAction::text(QLatin1String key) const
 {
     return m_config.value(key).toString();
 }

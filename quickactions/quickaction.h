@@ -4,10 +4,9 @@
 #ifndef QUICKACTION_H
 #define QUICKACTION_H
 
-#include "quickactionsmodel.h"
-
 #include <QDBusError>
-#include <QVariantMap>
+#include <QString>
+#include <QVariant>
 
 #include <optional>
 
@@ -15,10 +14,10 @@
     A quick action as its definition file describes it: a value that is read once and needs no
     model. The path of the file is the action's identity.
 */
-class QuickActionsModel::Action
+class QuickAction
 {
 public:
-    Action(const QString &path, bool enabled);
+    QuickAction(const QString &path, bool enabled);
 
     QString path() const { return m_path; }
     // Whether the user has enabled the action.
@@ -49,8 +48,8 @@ public:
     // sent is reported on the receiver's QML warning channel; the result tells.
     bool trigger(QObject *receiver, const char *returnMethod, const char *errorMethod) const;
 
-    bool operator==(const Action &other) const;
-    bool operator!=(const Action &other) const { return !(*this == other); }
+    bool operator==(const QuickAction &other) const;
+    bool operator!=(const QuickAction &other) const { return !(*this == other); }
 
     // An empty map if the file cannot be read.
     QVariantMap readActionConfig(const QString &path) const;

@@ -55,7 +55,7 @@ QSet<QString> toSet(const QStringList &list)
 
 // A row without a priority stops every action that has one, wherever that row stands; one of a
 // negative priority stops none.
-uint priorityOfRow(const QuickActionsModel::Action &action)
+uint priorityOfRow(const QuickAction &action)
 {
     const std::optional<int> priority = action.priority();
     return priority ? uint(qMax(*priority, 0)) : std::numeric_limits<uint>::max();

@@ -19,6 +19,7 @@
 
 class QDBusError;
 class QDBusMessage;
+class QuickAction;
 
 /*
     The quick actions that packages offer and the user has enabled, for the events screen; with
@@ -36,7 +37,7 @@ class QuickActionsModel : public QAbstractListModel, public QQmlParserStatus
     Q_PROPERTY(int count READ count NOTIFY countChanged)
 
 public:
-    class Action;
+    using Action = QuickAction;
 
     // The numbers coincide with those of Qt's display, decoration, edit and tool tip roles: views
     // that know nothing of this model show the title and the icon.

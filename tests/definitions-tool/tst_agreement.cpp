@@ -197,7 +197,7 @@ void TestAgreement::mutilatedQuickActions()
         const std::vector<Finding> findings = check(path);
         // To the model it is a file that it has not seen yet.
         const QString another = write(content, "conf");
-        const QuickActionsModel::Action action(another, false);
+        const QuickAction action(another, false);
         const bool isRefused = !m_log->takeAll().isEmpty();
         refused += isRefused ? 1 : 0;
         QCOMPARE(count(findings, {"unreadable"}), isRefused ? 1 : 0);
@@ -265,7 +265,7 @@ void TestAgreement::namesThatCanBeSent()
         }
         const QString path = write(content, "conf");
         Receiver receiver;
-        const bool isSent = QuickActionsModel::Action(path, false)
+        const bool isSent = QuickAction(path, false)
                                 .trigger(&receiver, nullptr, SLOT(fail(QDBusError, QDBusMessage)));
         if (isSent) {
             QTRY_VERIFY(receiver.error.isValid());

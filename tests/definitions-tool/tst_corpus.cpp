@@ -145,16 +145,16 @@ Reading readPlainly(const QByteArray &content)
 }
 
 // What the model has for a key, as text; nothing for keys that it does not know.
-std::optional<QString> modelText(const QuickActionsModel &model,
-                                 const QuickActionsModel::Action &action, const QString &key)
+std::optional<QString> modelText(const QuickActionsModel &model, const QuickAction &action,
+                                 const QString &key)
 {
-    static const QHash<QString, QString (QuickActionsModel::Action::*)() const> texts = {
-        {QStringLiteral("translation-catalog"), &QuickActionsModel::Action::translationCatalog},
-        {QStringLiteral("requires-package"), &QuickActionsModel::Action::requiredPackage},
-        {QStringLiteral("remote-service"), &QuickActionsModel::Action::service},
-        {QStringLiteral("remote-path"), &QuickActionsModel::Action::objectPath},
-        {QStringLiteral("remote-interface"), &QuickActionsModel::Action::interface},
-        {QStringLiteral("remote-method"), &QuickActionsModel::Action::method},
+    static const QHash<QString, QString (QuickAction::*)() const> texts = {
+        {QStringLiteral("translation-catalog"), &QuickAction::translationCatalog},
+        {QStringLiteral("requires-package"), &QuickAction::requiredPackage},
+        {QStringLiteral("remote-service"), &QuickAction::service},
+        {QStringLiteral("remote-path"), &QuickAction::objectPath},
+        {QStringLiteral("remote-interface"), &QuickAction::interface},
+        {QStringLiteral("remote-method"), &QuickAction::method},
     };
     if (texts.contains(key)) {
         return (action.*texts.value(key))();
@@ -260,7 +260,7 @@ void TestCorpus::agreesOnQuickActions()
     QCOMPARE(model.count(), 1);
     QStringList differences = m_log->takeTexts();
 
-    const QuickActionsModel::Action action(installed, false);
+    const QuickAction action(installed, false);
     m_log->takeAll();
     const Reading reading = readPlainly(content);
     if (reading.hasOtherLines) {
@@ -349,7 +349,7 @@ void TestCorpus::agreesOnEventsWidgets()
                 continue; // and the model has said so
             }
             QVERIFY(next < file->widgets.size());
-            const EventsWidgetsModel::Widget &widget = file->widgets.at(next++);
+            const EventsWidget &widget = file->widgets.at(next++);
             compare(written, "path", widget.path);
             compare(written, "title", widget.title);
             compare(written, "translation_id", widget.translationId);

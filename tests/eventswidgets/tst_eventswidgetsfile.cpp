@@ -12,9 +12,9 @@
 
 #include <functional>
 
-using Widget = EventsWidgetsModel::Widget;
+using Widget = EventsWidget;
 
-Q_DECLARE_METATYPE(std::function<void(EventsWidgetsModel::Widget *)>)
+Q_DECLARE_METATYPE(std::function<void(EventsWidget *)>)
 
 class TestEventsWidgetsFile : public QObject
 {

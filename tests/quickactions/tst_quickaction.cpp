@@ -13,7 +13,7 @@
 
 #include <unistd.h>
 
-using Action = QuickActionsModel::Action;
+using Action = QuickAction;
 using Answer = RecordingService::Answer;
 
 class TestQuickAction : public QObject

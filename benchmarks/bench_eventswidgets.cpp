@@ -24,7 +24,7 @@ const QLatin1String directory("/usr/share/glimmera/eventswidgets");
 
 constexpr double growthBar = 1.5;
 constexpr double parsingBar = 1.5;
-constexpr double titlesBar = 1.3;
+constexpr double titlesBar = 1.4;
 
 constexpr int few = 500;
 constexpr int many = 5000;

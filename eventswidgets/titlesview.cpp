@@ -305,10 +305,7 @@ QStringList TitlesView::collect() const
     const RolePath matchRole(m_matchRole, roleNames);
     const RolePath role(m_role, roleNames);
 
-    // Shares the old list until something in it is different, which most changes of a model are
-    // not.
-    QStringList values = m_values;
-    int size = 0;
+    QStringList values;
     const int count = m_model->rowCount();
     // Whose property is read may end the model.
     for (int row = 0; row < count && m_model != nullptr; ++row) {
@@ -316,29 +313,13 @@ QStringList TitlesView::collect() const
         if (matchRole.isKnown() && (!matches(matchRole.value(index)) || m_model == nullptr)) {
             continue;
         }
-        const QString text = role.value(index).toString();
-        if (size == values.size()) {
-            values.append(text);
-        } else if (values.at(size) != text) {
-            values[size] = text;
-        }
-        ++size;
+        values.append(role.value(index).toString());
     }
-    if (m_model == nullptr) {
-        return {};
-    }
-    if (size < values.size()) {
-        values.erase(values.begin() + size, values.end());
-    }
-    return values;
+    return m_model == nullptr ? QStringList() : values;
 }
 
 bool TitlesView::matches(const QVariant &value) const
 {
-    // Most views match a switch, and two of them compare in a fraction of the time of two variants.
-    if (m_match.userType() == QMetaType::Bool && value.userType() == QMetaType::Bool) {
-        return m_match.toBool() == value.toBool();
-    }
     if (m_match.userType() == QMetaType::QStringList && value.canConvert<QString>()
         && m_match.toStringList().contains(value.toString())) {
         return true;

@@ -5,10 +5,11 @@
 
 #include "eventswidget.h"
 #include "eventswidgetsfile.h"
+#include "models/insertionindex.h"
 
 #include <QDirIterator>
 #include <QFileInfo>
-#include <QScopedValueRollback>
+#include <QHash>
 
 #include <algorithm>
 
@@ -19,24 +20,13 @@ const QLatin1String definitionFilter("*.json");
 
 const QLatin1String enabledKey("/desktop/glimmera-marlo-home/events_screen_widgets");
 
-QSet<QString> toSet(const QStringList &list)
-{
-    return {list.cbegin(), list.cend()};
-}
-
 QString translation(const QString &id, const QString &fallback)
 {
     if (id.isEmpty()) {
         return fallback;
     }
-    const QString text = qtTrId(id.toLocal8Bit().constData());
+    const QString text = CatalogTable::text(id);
     return text == id ? fallback : text;
-}
-
-// A row without an order is no higher than any that has one.
-uint orderOfRow(const EventsWidget &widget)
-{
-    return uint(qMax(widget.order, 0));
 }
 
 } // namespace
@@ -83,8 +73,9 @@ uint orderOfRow(const EventsWidget &widget)
     }
     \endqml
 
-    \note What a handler of one of the model's signals asks of the model while rows are being
-    changed is done as soon as control returns to the event loop.
+    \note Handlers may call any method of the model. While rows are being changed, requests wait until
+    control returns to the event loop. The model then runs each kind of update at most once and
+    applies the choices (enableWidget(), disableWidget()) in the order of the calls.
 */
 
 EventsWidgetsModel::EventsWidgetsModel(QObject *parent)
@@ -167,8 +158,8 @@ void EventsWidgetsModel::componentComplete()
 */
 void EventsWidgetsModel::enableWidget(const QString &path)
 {
-    // Not looked for first, on purpose: disableWidget() takes out whatever has gathered.
-    m_enabledItem.set(enabledList() + QStringList(path));
+    // A path may be listed twice, on purpose: disableWidget() removes every occurrence.
+    m_requests.choose([this, path] { m_enabledItem.set(enabledList() + QStringList(path)); });
 }
 
 /*!
@@ -182,9 +173,11 @@ void EventsWidgetsModel::enableWidget(const QString &path)
 */
 void EventsWidgetsModel::disableWidget(const QString &path)
 {
-    QStringList list = enabledList();
-    list.removeAll(path);
-    m_enabledItem.set(list);
+    m_requests.choose([this, path] {
+        QStringList list = enabledList();
+        list.removeAll(path);
+        m_enabledItem.set(list);
+    });
 }
 
 /*!
@@ -195,15 +188,10 @@ void EventsWidgetsModel::disableWidget(const QString &path)
 */
 void EventsWidgetsModel::directoryChanged()
 {
-    if (!m_complete) {
+    if (!m_complete || m_requests.defer(&EventsWidgetsModel::directoryChanged)) {
         return;
     }
-    if (m_changing) {
-        QMetaObject::invokeMethod(this, &EventsWidgetsModel::directoryChanged,
-                                  Qt::QueuedConnection);
-        return;
-    }
-    const QScopedValueRollback<bool> changing(m_changing, true);
+    const Change change(&m_requests);
 
     QSet<QString> stale;
     for (const Widget &widget : qAsConst(m_rows)) {
@@ -224,23 +212,22 @@ void EventsWidgetsModel::directoryChanged()
 */
 void EventsWidgetsModel::enabledWidgetsChanged()
 {
-    if (!m_complete) {
+    if (!m_complete || m_requests.defer(&EventsWidgetsModel::enabledWidgetsChanged)) {
         return;
     }
-    // Even in the middle of a change: the next choice starts from this list.
-    readEnabledList();
-    if (m_changing) {
-        QMetaObject::invokeMethod(this, &EventsWidgetsModel::enabledWidgetsChanged,
-                                  Qt::QueuedConnection);
-        return;
-    }
-    const QScopedValueRollback<bool> changing(m_changing, true);
+    const Change change(&m_requests);
 
-    const bool defaults = m_defaults;
-    const QSet<QString> enabledPaths = toSet(m_enabledList);
+    const QVariant stored = m_enabledItem.value();
+    m_defaults = !stored.isValid();
+    m_enabledList = stored.toStringList();
+    const QSet<QString> enabledPaths(m_enabledList.cbegin(), m_enabledList.cend());
     for (int row = 0; row < m_rows.size(); ++row) {
         Widget &widget = m_rows[row];
-        const bool enabled = defaults ? widget.defaultEnabled : enabledPaths.contains(widget.path);
+        if (m_defaults) {
+            m_enabledList.append(widget.path);
+        }
+        const bool enabled =
+            m_defaults ? widget.defaultEnabled : enabledPaths.contains(widget.path);
         if (widget.enabled != enabled) {
             widget.enabled = enabled;
             Q_EMIT dataChanged(index(row), index(row));
@@ -257,11 +244,10 @@ void EventsWidgetsModel::enabledWidgetsChanged()
 */
 void EventsWidgetsModel::updateAvailable()
 {
-    if (m_changing) {
-        QMetaObject::invokeMethod(this, &EventsWidgetsModel::updateAvailable, Qt::QueuedConnection);
+    if (m_requests.defer(&EventsWidgetsModel::updateAvailable)) {
         return;
     }
-    const QScopedValueRollback<bool> changing(m_changing, true);
+    const Change change(&m_requests);
 
     for (int row = 0; row < m_rows.size(); ++row) {
         Widget &widget = m_rows[row];
@@ -279,27 +265,10 @@ QStringList EventsWidgetsModel::enabledList() const
     return m_complete ? m_enabledList : m_enabledItem.value().toStringList();
 }
 
-void EventsWidgetsModel::readEnabledList()
-{
-    const QVariant value = m_enabledItem.value();
-    m_defaults = !value.isValid();
-    m_enabledList = value.toStringList();
-    if (m_defaults) {
-        for (const Widget &widget : qAsConst(m_rows)) {
-            m_enabledList.append(widget.path);
-        }
-    }
-}
-
 std::vector<EventsWidget> EventsWidgetsModel::readWidgets()
 {
     m_writeWatcher.watch(definitionDirectory);
 
-    struct Catalog {
-        QString user;
-        QString name;
-    };
-    std::vector<Catalog> catalogs;
     std::vector<Widget> widgets;
     QDirIterator entries(definitionDirectory, {definitionFilter}, QDir::Files);
     while (entries.hasNext()) {
@@ -310,7 +279,7 @@ std::vector<EventsWidget> EventsWidgetsModel::readWidgets()
         }
         std::optional<EventsWidgetsFile> file = readEventsWidgetsFile(path);
         if (file) {
-            catalogs.push_back({entries.fileName(), file->translationCatalog});
+            m_catalogs.addDefinition(entries.fileName(), file->translationCatalog);
             std::move(file->widgets.begin(), file->widgets.end(), std::back_inserter(widgets));
         }
     }
@@ -321,27 +290,37 @@ std::vector<EventsWidget> EventsWidgetsModel::readWidgets()
             m_enabledList.append(widget.path);
         }
     }
-    const QSet<QString> enabledPaths = m_defaults ? QSet<QString>() : toSet(m_enabledList);
+    const QSet<QString> enabledPaths(m_enabledList.cbegin(), m_enabledList.cend());
     for (Widget &widget : widgets) {
         widget.enabled = m_defaults ? widget.defaultEnabled : enabledPaths.contains(widget.path);
-    }
-
-    // Announces language changes, which may lead back here: everything is known by now.
-    for (const Catalog &catalog : catalogs) {
-        m_catalogs.addDefinition(catalog.user, catalog.name);
     }
     return widgets;
 }
 
 void EventsWidgetsModel::mergeWidgets(const std::vector<Widget> &widgets)
 {
-    indexRows();
-    m_index.reserve(m_index.size() + int(widgets.size()));
+    // Where to look for the row of a path, from there downwards: insertions only push rows down.
+    QHash<QString, int> firstRows;
+    firstRows.reserve(m_rows.size() + int(widgets.size()));
+    std::vector<qint64> orders;
+    for (int row = 0; row < m_rows.size(); ++row) {
+        firstRows.insert(m_rows.at(row).path, row);
+        orders.push_back(m_rows.at(row).order);
+    }
     for (const Widget &widget : widgets) {
-        const int row = findWidget(widget.path);
+        int row = firstRows.value(widget.path, -1);
         if (row < 0) {
-            insertWidget(insertionIndexForWidget(widget), widget);
-        } else if (m_rows.at(row) != widget) {
+            row = insertionIndex(orders, widget.order);
+            firstRows.insert(widget.path, row);
+            orders.insert(orders.begin() + row, widget.order);
+            insertWidget(row, widget);
+            continue;
+        }
+        while (m_rows.at(row).path != widget.path) {
+            ++row;
+        }
+        if (m_rows.at(row) != widget) {
+            orders[std::size_t(row)] = widget.order;
             updateWidget(row, widget);
         }
     }
@@ -350,9 +329,7 @@ void EventsWidgetsModel::mergeWidgets(const std::vector<Widget> &widgets)
 void EventsWidgetsModel::insertWidget(int row, const Widget &widget)
 {
     beginInsertRows({}, row, row);
-    m_index.insert(widget.path, row);
     m_rows.insert(row, widget);
-    m_orders.insert(row, orderOfRow(widget));
     endInsertRows();
 }
 
@@ -360,7 +337,6 @@ void EventsWidgetsModel::updateWidget(int row, const Widget &widget)
 {
     // Stays where it is, on purpose, even with another order: rows do not jump under the user.
     m_rows[row] = widget;
-    m_orders.replace(row, orderOfRow(widget));
     Q_EMIT dataChanged(index(row), index(row));
 }
 
@@ -382,37 +358,4 @@ void EventsWidgetsModel::removeStaleRows(const QSet<QString> &paths)
         m_rows.removeAt(row);
         endRemoveRows();
     }
-}
-
-void EventsWidgetsModel::indexRows()
-{
-    m_index.clear();
-    m_orders.clear();
-    for (int row = 0; row < m_rows.size(); ++row) {
-        m_index.insert(m_rows.at(row).path, row);
-        m_orders.insert(row, orderOfRow(m_rows.at(row)));
-    }
-}
-
-int EventsWidgetsModel::findWidget(const QString &path) const
-{
-    const auto known = m_index.constFind(path);
-    if (known == m_index.constEnd()) {
-        return -1;
-    }
-    int row = *known;
-    while (m_rows.at(row).path != path) {
-        ++row;
-    }
-    return row;
-}
-
-int EventsWidgetsModel::insertionIndexForWidget(const Widget &widget) const
-{
-    if (widget.order < 0) {
-        return m_rows.size();
-    }
-    // Before the first row of a higher order. What stands behind that is not looked at: the rows
-    // are not sorted, and a place once taken is kept.
-    return m_orders.firstAbove(uint(widget.order));
 }

@@ -6,12 +6,11 @@
 
 #include "files/directorywatcher.h"
 #include "mgconfitem.h"
-#include "plugin/runningmaximum.h"
+#include "models/requestqueue.h"
 #include "plugin/translations/catalogtable.h"
 #include "writewatcher.h"
 
 #include <QAbstractListModel>
-#include <QHash>
 #include <QList>
 #include <QQmlParserStatus>
 #include <QSet>
@@ -62,23 +61,18 @@ public Q_SLOTS:
     void updateAvailable();
 
 private:
+    using Change = RequestQueue<EventsWidgetsModel>::Change;
+
     QStringList enabledList() const;
-    void readEnabledList();
     std::vector<Widget> readWidgets();
     void mergeWidgets(const std::vector<Widget> &widgets);
     void insertWidget(int row, const Widget &widget);
     void updateWidget(int row, const Widget &widget);
     void removeStaleRows(const QSet<QString> &paths);
-    void indexRows();
-    int findWidget(const QString &path) const;
-    int insertionIndexForWidget(const Widget &widget) const;
 
     CatalogTable m_catalogs;
     QList<Widget> m_rows;
-    // Where to look for the row of a path, from there downwards, while widgets are merged.
-    QHash<QString, int> m_index;
-    // The order of each row, while widgets are merged.
-    RunningMaximum m_orders;
+    RequestQueue<EventsWidgetsModel> m_requests{this};
     DirectoryWatcher m_watcher;
     WriteWatcher m_writeWatcher;
     MGConfItem m_enabledItem;
@@ -89,8 +83,6 @@ private:
     // While the key holds nothing at all; an empty list is a choice.
     bool m_defaults = false;
     bool m_complete = false;
-    // While rows are announced and changed: whoever follows the model may call back into it.
-    bool m_changing = false;
 };
 
 #endif

@@ -3,6 +3,7 @@
 
 #include "quickactionsmodel.h"
 
+#include "models/insertionindex.h"
 #include "quickaction.h"
 
 #include <QDBusConnection>
@@ -13,13 +14,13 @@
 #include <QScopedValueRollback>
 #include <QSet>
 
-#include <algorithm>
 #include <limits>
+#include <vector>
 
 namespace {
 
 const QLatin1String definitionDirectory("/usr/share/glimmera/quickactions");
-const QLatin1String definitionSuffix(".conf");
+const QLatin1String definitionFilter("*.conf");
 constexpr int reloadDelay = 1000; // ms
 
 const QLatin1String enabledKey("/desktop/glimmera-marlo-home/events_screen_actions");
@@ -34,31 +35,10 @@ const QLatin1String storePath("/StoreClient");
 const QLatin1String storeInterface("com.marlo.marlostore");
 const QLatin1String storeMethod("showApp");
 
-// By suffix and name, whatever their case, as QDir would filter and sort them. It would make a
-// regular expression and two texts of every entry, though, and what is read here are hundreds of
-// small files.
-QStringList definitionFiles()
+// A row without a priority stops the search for a place, wherever it stands.
+qint64 priorityOfRow(const QuickAction &action)
 {
-    QStringList names = QDir(definitionDirectory).entryList(QDir::AllEntries, QDir::Unsorted);
-    const auto isOther = [](const QString &name) {
-        return !name.endsWith(definitionSuffix, Qt::CaseInsensitive);
-    };
-    names.erase(std::remove_if(names.begin(), names.end(), isOther), names.end());
-    names.sort(Qt::CaseInsensitive);
-    return names;
-}
-
-QSet<QString> toSet(const QStringList &list)
-{
-    return {list.cbegin(), list.cend()};
-}
-
-// A row without a priority stops every action that has one, wherever that row stands; one of a
-// negative priority stops none.
-uint priorityOfRow(const QuickAction &action)
-{
-    const std::optional<int> priority = action.priority();
-    return priority ? uint(qMax(*priority, 0)) : std::numeric_limits<uint>::max();
+    return action.priority() ? *action.priority() : std::numeric_limits<qint64>::max();
 }
 
 } // namespace
@@ -107,8 +87,9 @@ uint priorityOfRow(const QuickAction &action)
     }
     \endqml
 
-    \note What a handler of one of the model's signals asks of the model while rows are being
-    changed is done as soon as control returns to the event loop.
+    \note Handlers may call any method of the model. While rows are being changed, requests wait until
+    control returns to the event loop. The model then reloads at most once and applies the choices
+    (enableAction(), disableAction(), move()) in the order of the calls.
 */
 
 QuickActionsModel::QuickActionsModel(QObject *parent)
@@ -155,8 +136,7 @@ void QuickActionsModel::setShowPotential(bool showPotential)
 {
     if (m_showPotential != showPotential) {
         m_showPotential = showPotential;
-        loadActions();
-        Q_EMIT showPotentialChanged();
+        applyShowPotential();
     }
 }
 
@@ -175,7 +155,7 @@ int QuickActionsModel::rowCount(const QModelIndex &parent) const
 {
     // The same for every parent, on purpose: a list has but one, and pages need not name it.
     Q_UNUSED(parent)
-    return int(m_rows.size());
+    return m_rows.size();
 }
 
 QVariant QuickActionsModel::data(const QModelIndex &index, int role) const
@@ -183,11 +163,11 @@ QVariant QuickActionsModel::data(const QModelIndex &index, int role) const
     if (!hasRow(index.row())) {
         return {};
     }
-    const Action &action = *m_rows[size_t(index.row())];
+    const Action &action = m_rows.at(index.row());
     switch (role) {
     case TitleRole: {
         const QString title = action.title();
-        return title.isEmpty() ? QVariant() : qtTrId(title.toLocal8Bit().constData());
+        return title.isEmpty() ? QVariant() : CatalogTable::text(title);
     }
     case IconRole:
         return action.icon();
@@ -248,8 +228,7 @@ void QuickActionsModel::triggerAction(int index)
         qmlInfo(this) << "triggerAction() called with invalid index: " << index;
         return;
     }
-    m_rows[size_t(index)]->trigger(this, nullptr,
-                                   SLOT(triggerActionError(QDBusError, QDBusMessage)));
+    m_rows.at(index).trigger(this, nullptr, SLOT(triggerActionError(QDBusError, QDBusMessage)));
 }
 
 void QuickActionsModel::classBegin()
@@ -272,10 +251,7 @@ void QuickActionsModel::componentComplete()
 */
 void QuickActionsModel::enableAction(const QString &path)
 {
-    if (putOff([this, path] { enableAction(path); })) {
-        return;
-    }
-    writeEnabledList(m_enabledList + QStringList(path));
+    m_requests.choose([this, path] { writeEnabledList(m_enabledList + QStringList(path)); });
 }
 
 /*!
@@ -287,12 +263,11 @@ void QuickActionsModel::enableAction(const QString &path)
 */
 void QuickActionsModel::disableAction(const QString &path)
 {
-    if (putOff([this, path] { disableAction(path); })) {
-        return;
-    }
-    QStringList list = m_enabledList;
-    list.removeAll(path);
-    writeEnabledList(list);
+    m_requests.choose([this, path] {
+        QStringList list = m_enabledList;
+        list.removeAll(path);
+        writeEnabledList(list);
+    });
 }
 
 /*!
@@ -307,42 +282,7 @@ void QuickActionsModel::disableAction(const QString &path)
 */
 void QuickActionsModel::move(int index, int newIndex)
 {
-    if (putOff([this, index, newIndex] { move(index, newIndex); })) {
-        return;
-    }
-    if (index < 0 || newIndex < 0 || index >= m_enabledList.size()
-        || newIndex >= m_enabledList.size()) {
-        return;
-    }
-
-    {
-        const QScopedValueRollback<bool> changing(m_changing, true);
-        // An entry of the list need not have a row.
-        const bool movesRow = index != newIndex && hasRow(index) && hasRow(newIndex);
-        if (movesRow) {
-            const int destination = newIndex > index ? newIndex + 1 : newIndex;
-            beginMoveRows({}, index, index, {}, destination);
-            const auto from = m_rows.begin() + index;
-            const auto to = m_rows.begin() + newIndex;
-            if (index < newIndex) {
-                std::rotate(from, from + 1, to + 1);
-            } else {
-                std::rotate(to, from, from + 1);
-            }
-        }
-        m_enabledList.move(index, newIndex);
-        {
-            const QScopedValueRollback<bool> moving(m_moving, true);
-            writeEnabledList(m_enabledList);
-        }
-        if (movesRow) {
-            endMoveRows();
-        }
-    }
-    // Whoever was told of the write may have enabled or disabled an action in answer.
-    if (m_enabledItem.value().toStringList() != m_enabledList) {
-        updateEnabledActions();
-    }
+    m_requests.choose([this, index, newIndex] { moveAction(index, newIndex); });
 }
 
 /*!
@@ -359,60 +299,49 @@ void QuickActionsModel::move(int index, int newIndex)
 
 void QuickActionsModel::loadActions()
 {
-    if (!m_complete || putOff([this] { loadActions(); })) {
+    if (!m_complete || m_requests.defer(&QuickActionsModel::loadActions)) {
         return;
     }
-
     const int countBefore = count();
     {
-        const QScopedValueRollback<bool> changing(m_changing, true);
-        const QSet<QString> enabled = toSet(m_enabledList);
+        const Change change(&m_requests);
+        const QSet<QString> enabled(m_enabledList.cbegin(), m_enabledList.cend());
+        const QStringList selected = selectedPaths(enabled);
+        const QSet<QString> listed(selected.cbegin(), selected.cend());
 
-        QStringList offered;
-        QSet<QString> selected;
-        const QSet<QString> blocked = toSet(m_blockedList);
-        const QStringList names = definitionFiles();
-        for (const QString &name : names) {
-            const QString path = definitionDirectory + QLatin1Char('/') + name;
-            if ((m_showPotential || enabled.contains(path)) && !blocked.contains(path)) {
-                offered.append(path);
-                selected.insert(path);
+        removeRowsExcept(listed);
+        QSet<QString> missing = listed;
+        for (int row = 0; row < m_rows.size(); ++row) {
+            const QString path = m_rows.at(row).path();
+            missing.remove(path);
+            const Action action(path, enabled.contains(path));
+            if (m_rows.at(row) != action) {
+                updateAction(row, action);
             }
         }
 
-        removeRowsExcept(selected);
-
-        QHash<QString, const Action *> rows;
-        m_priorities.clear();
-        for (int row = 0; row < rowCount(); ++row) {
-            const Action &action = *m_rows[size_t(row)];
-            rows.insert(action.path(), &action);
-            m_priorities.insert(row, priorityOfRow(action));
-        }
-        const auto addOrUpdate = [this, &rows](const Action &action, auto insertionIndex) {
-            const Action *known = rows.value(action.path());
-            if (known == nullptr) {
-                addAction(insertionIndex(), action);
-            } else if (*known != action) {
-                const auto isKnown = [known](const auto &row) { return row.get() == known; };
-                const auto row = std::find_if(m_rows.cbegin(), m_rows.cend(), isKnown);
-                updateAction(int(row - m_rows.cbegin()), action);
-            }
-        };
-
-        // The enabled ones first, in the order of the list: each goes behind those before it that
-        // have a row, which are just those that have been met. A repeated entry is met once.
-        QSet<QString> met;
+        // The enabled ones in the order of the list, each behind those before it that have a row. A
+        // repeated entry counts once.
+        QSet<QString> placed;
         for (const QString &path : qAsConst(m_enabledList)) {
-            if (selected.contains(path) && !met.contains(path)) {
-                addOrUpdate(Action(path, true), [&met] { return met.size(); });
-                met.insert(path);
+            if (listed.contains(path) && !placed.contains(path)) {
+                if (missing.remove(path)) {
+                    insertAction(placed.size(), Action(path, true));
+                }
+                placed.insert(path);
             }
         }
-        for (const QString &path : qAsConst(offered)) {
-            if (!enabled.contains(path)) {
+
+        std::vector<qint64> priorities;
+        for (const Action &action : qAsConst(m_rows)) {
+            priorities.push_back(priorityOfRow(action));
+        }
+        for (const QString &path : selected) {
+            if (missing.contains(path)) {
                 const Action action(path, false);
-                addOrUpdate(action, [this, &action] { return insertionIndexByPriority(action); });
+                const int row = insertionIndex(priorities, action.priority().value_or(-1));
+                priorities.insert(priorities.begin() + row, priorityOfRow(action));
+                insertAction(row, action);
             }
         }
     }
@@ -423,7 +352,7 @@ void QuickActionsModel::loadActions()
 
 void QuickActionsModel::updateEnabledActions()
 {
-    if (m_moving || putOff([this] { updateEnabledActions(); })) {
+    if (m_moving || m_requests.defer(&QuickActionsModel::updateEnabledActions)) {
         return;
     }
     m_enabledList = m_enabledItem.value().toStringList();
@@ -455,11 +384,11 @@ void QuickActionsModel::triggerActionError(const QDBusError &error, const QDBusM
     }
 
     // Several actions may make the same call, and not every one need name the package.
-    for (const auto &row : m_rows) {
-        const bool sent = row->service() == msg.service() && row->objectPath() == msg.path()
-            && row->interface() == msg.interface() && row->method() == msg.member();
-        if (sent && !row->requiredPackage().isEmpty()) {
-            showStorePackage(row->requiredPackage());
+    for (const Action &action : qAsConst(m_rows)) {
+        const bool sent = action.service() == msg.service() && action.objectPath() == msg.path()
+            && action.interface() == msg.interface() && action.method() == msg.member();
+        if (sent && !action.requiredPackage().isEmpty()) {
+            showStorePackage(action.requiredPackage());
             return;
         }
     }
@@ -477,71 +406,108 @@ void QuickActionsModel::showStorePackage(const QString &packageName)
     }
 }
 
-bool QuickActionsModel::putOff(const std::function<void()> &request)
-{
-    return m_changing && QMetaObject::invokeMethod(this, request, Qt::QueuedConnection);
-}
-
 bool QuickActionsModel::hasRow(int index) const
 {
     return index >= 0 && index < rowCount();
 }
 
-void QuickActionsModel::removeRowsExcept(const QSet<QString> &paths)
+void QuickActionsModel::applyShowPotential()
 {
-    int row = 0;
-    while (row < rowCount()) {
-        const Action &action = *m_rows[size_t(row)];
-        if (paths.contains(action.path())) {
-            ++row;
-        } else {
-            beginRemoveRows({}, row, row);
-            removeTranslatorForAction(action);
-            m_rows.erase(m_rows.begin() + row);
-            endRemoveRows();
-        }
+    if (!m_requests.defer(&QuickActionsModel::applyShowPotential)) {
+        loadActions();
+        Q_EMIT showPotentialChanged();
     }
 }
 
-void QuickActionsModel::addAction(int row, const Action &action)
+// In the order of their names.
+QStringList QuickActionsModel::selectedPaths(const QSet<QString> &enabled) const
+{
+    const QSet<QString> blocked(m_blockedList.cbegin(), m_blockedList.cend());
+    QStringList paths;
+    const QStringList names = QDir(definitionDirectory).entryList({definitionFilter});
+    for (const QString &name : names) {
+        const QString path = definitionDirectory + QLatin1Char('/') + name;
+        if ((m_showPotential || enabled.contains(path)) && !blocked.contains(path)) {
+            paths.append(path);
+        }
+    }
+    return paths;
+}
+
+void QuickActionsModel::removeRowsExcept(const QSet<QString> &paths)
+{
+    int row = 0;
+    while (row < m_rows.size()) {
+        const Action &action = m_rows.at(row);
+        if (paths.contains(action.path())) {
+            ++row;
+            continue;
+        }
+        beginRemoveRows({}, row, row);
+        m_catalogs.removeDefinition(action.path(), action.translationCatalog());
+        m_rows.removeAt(row);
+        endRemoveRows();
+    }
+}
+
+void QuickActionsModel::insertAction(int row, const Action &action)
 {
     beginInsertRows({}, row, row);
-    addTranslatorForAction(action);
-    m_rows.insert(m_rows.begin() + row, std::make_unique<Action>(action));
-    m_priorities.insert(row, priorityOfRow(action));
+    m_catalogs.addDefinition(action.path(), action.translationCatalog());
+    m_rows.insert(row, action);
     endInsertRows();
 }
 
 void QuickActionsModel::updateAction(int row, const Action &action)
 {
-    Action &current = *m_rows[size_t(row)];
-    const bool catalogChanged = current.translationCatalog() != action.translationCatalog();
-    current = action;
-    m_priorities.replace(row, priorityOfRow(action));
-    // The old catalog is not released, on purpose: its texts stay at hand until the model goes.
-    if (catalogChanged) {
-        addTranslatorForAction(action);
+    const QString oldCatalog = m_rows.at(row).translationCatalog();
+    m_rows[row] = action;
+    // The old catalog is not released, on purpose: its texts stay available until the model goes.
+    if (action.translationCatalog() != oldCatalog) {
+        m_catalogs.addDefinition(action.path(), action.translationCatalog());
     }
     Q_EMIT dataChanged(index(row), index(row));
 }
 
-int QuickActionsModel::insertionIndexByPriority(const Action &action) const
+void QuickActionsModel::moveAction(int index, int newIndex)
 {
-    const std::optional<int> priority = action.priority();
-    if (!priority || *priority < 0) {
-        return rowCount();
+    if (index < 0 || newIndex < 0 || index >= m_enabledList.size()
+        || newIndex >= m_enabledList.size()) {
+        return;
     }
-    return m_priorities.firstAbove(uint(*priority));
+    {
+        const Change change(&m_requests);
+        // An entry of the list need not have a row.
+        const bool movesRow = index != newIndex && hasRow(index) && hasRow(newIndex);
+        if (movesRow) {
+            beginMoveAction(index, newIndex);
+        }
+        m_enabledList.move(index, newIndex);
+        {
+            const QScopedValueRollback<bool> moving(m_moving, true);
+            writeEnabledList(m_enabledList);
+        }
+        if (movesRow) {
+            endMoveRows();
+        }
+        if (m_enabledItem.value().toStringList() == m_enabledList) {
+            return;
+        }
+        // The key is locked, or another list was stored in answer. That list counts, and the rows
+        // have to agree with it.
+        if (movesRow) {
+            beginMoveAction(newIndex, index);
+            endMoveRows();
+        }
+    }
+    updateEnabledActions();
 }
 
-void QuickActionsModel::addTranslatorForAction(const Action &action)
+// The caller ends the move.
+void QuickActionsModel::beginMoveAction(int index, int newIndex)
 {
-    m_catalogs.addDefinition(action.path(), action.translationCatalog());
-}
-
-void QuickActionsModel::removeTranslatorForAction(const Action &action)
-{
-    m_catalogs.removeDefinition(action.path(), action.translationCatalog());
+    beginMoveRows({}, index, index, {}, newIndex > index ? newIndex + 1 : newIndex);
+    m_rows.move(index, newIndex);
 }
 
 void QuickActionsModel::writeEnabledList(const QStringList &list)

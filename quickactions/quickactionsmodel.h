@@ -6,16 +6,14 @@
 
 #include "files/directorywatcher.h"
 #include "mgconfitem.h"
-#include "plugin/runningmaximum.h"
+#include "models/requestqueue.h"
 #include "plugin/translations/catalogtable.h"
 
 #include <QAbstractListModel>
+#include <QList>
 #include <QQmlParserStatus>
+#include <QStringList>
 #include <QTimer>
-
-#include <functional>
-#include <memory>
-#include <vector>
 
 class QDBusError;
 class QDBusMessage;
@@ -77,21 +75,21 @@ private Q_SLOTS:
     void showStorePackage(const QString &packageName);
 
 private:
-    // While rows are changed, whatever would change them again waits for the event loop: true then.
-    bool putOff(const std::function<void()> &request);
+    using Change = RequestQueue<QuickActionsModel>::Change;
+
     bool hasRow(int index) const;
+    void applyShowPotential();
+    QStringList selectedPaths(const QSet<QString> &enabled) const;
     void removeRowsExcept(const QSet<QString> &paths);
-    void addAction(int row, const Action &action);
+    void insertAction(int row, const Action &action);
     void updateAction(int row, const Action &action);
-    int insertionIndexByPriority(const Action &action) const;
-    void addTranslatorForAction(const Action &action);
-    void removeTranslatorForAction(const Action &action);
+    void moveAction(int index, int newIndex);
+    void beginMoveAction(int index, int newIndex);
     void writeEnabledList(const QStringList &list);
 
     CatalogTable m_catalogs;
-    std::vector<std::unique_ptr<Action>> m_rows;
-    // The priority of each row, while actions are loaded.
-    RunningMaximum m_priorities;
+    QList<Action> m_rows;
+    RequestQueue<QuickActionsModel> m_requests{this};
     DirectoryWatcher m_watcher;
     QTimer m_reloadTimer;
     MGConfItem m_enabledItem;
@@ -102,8 +100,6 @@ private:
     bool m_complete = false;
     // While move() writes the enabled list: the change that dconf reports is the model's own.
     bool m_moving = false;
-    // While rows are announced and changed: whoever follows the model may call back into it.
-    bool m_changing = false;
 };
 
 #endif

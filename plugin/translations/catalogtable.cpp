@@ -80,3 +80,8 @@ void CatalogTable::clear()
         QCoreApplication::removeTranslator(entry.translator);
     }
 }
+
+QString CatalogTable::text(const QString &id)
+{
+    return qtTrId(id.toLocal8Bit().constData());
+}

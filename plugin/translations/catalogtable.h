@@ -35,6 +35,9 @@ public:
     // Removes every translator from the application.
     void clear();
 
+    // The text of an identifier in the installed catalogs; the identifier itself without one.
+    static QString text(const QString &id);
+
 private:
     struct Entry {
         QTranslator *translator;

@@ -87,6 +87,9 @@ private Q_SLOTS:
 
     void handlersMayCallBack_data();
     void handlersMayCallBack();
+    void showPotentialSetInAHandler();
+    void requestsInHandlersLoadOnce();
+    void choicesInHandlersKeepTheirOrder();
     void listsOfOtherTypes_data();
     void listsOfOtherTypes();
 
@@ -1076,7 +1079,9 @@ void TestQuickActionsModel::handlersMayCallBack()
         if (++answers > 3) {
             return;
         }
-        model->get(0);
+        if (model->count() > 0) {
+            model->get(0);
+        }
         model->disableAction(a);
         model->enableAction(c);
         model->setShowPotential(!model->showPotential());
@@ -1119,6 +1124,85 @@ void TestQuickActionsModel::handlersMayCallBack()
         return listed == expected;
     };
     QTRY_VERIFY(settled());
+}
+
+void TestQuickActionsModel::showPotentialSetInAHandler()
+{
+    const QString a = add("a");
+    const QString b = add("b");
+    add("c");
+    setEnabled({a});
+    QuickActionsModel *model = loadedModel();
+    QSignalSpy changed(model, &QuickActionsModel::showPotentialChanged);
+    QVector<int> rowsThen;
+    connect(model, &QuickActionsModel::showPotentialChanged, this,
+            [&] { rowsThen.append(model->count()); });
+    connect(model, &QAbstractItemModel::rowsInserted, this, [&] {
+        model->setShowPotential(true);
+        // Read back, it is what was set.
+        QVERIFY(model->showPotential());
+    });
+    setEnabled({a, b});
+    QCOMPARE(model->count(), 2);
+    QCOMPARE(changed.size(), 0);
+    // Announced together with its rows, and once.
+    QTRY_COMPARE(changed.size(), 1);
+    QCOMPARE(rowsThen, QVector<int>{3});
+    QCOMPARE(names(model), list({"a", "b", "c"}));
+}
+
+void TestQuickActionsModel::requestsInHandlersLoadOnce()
+{
+    // Each load of a definition that cannot be read gives a warning.
+    constexpr int count = 50;
+    Files::makeFolder(path("broken"));
+    for (int i = 0; i < count; ++i) {
+        add(QByteArray::number(i).constData());
+    }
+    QuickActionsModel *model = makeModel(true);
+    QSignalSpy inserted(model, &QAbstractItemModel::rowsInserted);
+    QSignalSpy changed(model, &QuickActionsModel::showPotentialChanged);
+    connect(model, &QAbstractItemModel::rowsInserted, this, [&] {
+        for (int i = 0; i < 2; ++i) {
+            model->setShowPotential(!model->showPotential());
+            setBlocked({path("unknown")});
+            setBlocked({});
+            setEnabled({path("unknown")});
+            setEnabled({});
+        }
+    });
+    model->componentComplete();
+    QCOMPARE(inserted.size(), count + 1);
+    QTRY_COMPARE(changed.size(), 1);
+    QTest::qWait(50);
+    QCOMPARE(inserted.size(), count + 1);
+    QCOMPARE(changed.size(), 1);
+    // One load of each kind: for the blocked list, for the enabled list and for the property.
+    QCOMPARE(takeMessages().size(), 1 + 3);
+}
+
+void TestQuickActionsModel::choicesInHandlersKeepTheirOrder()
+{
+    const QString a = add("a");
+    const QString b = add("b");
+    const QString c = add("c");
+    const QString d = add("d");
+    setEnabled({a});
+    QuickActionsModel *model = loadedModel();
+    QMetaObject::Connection connection;
+    connection = connect(model, &QAbstractItemModel::rowsInserted, this, [&] {
+        disconnect(connection);
+        model->enableAction(c);
+        model->move(0, 2);
+        model->disableAction(c);
+        model->enableAction(c);
+        model->enableAction(c);
+        // Stored by somebody else, later than the requests: nothing of it is lost.
+        setEnabled({a, b, d});
+    });
+    setEnabled({a, b});
+    QTRY_COMPARE(enabledInDconf(), list({"b", "d", "a", "c", "c"}));
+    QCOMPARE(names(model), list({"b", "d", "a", "c"}));
 }
 
 void TestQuickActionsModel::listsOfOtherTypes_data()

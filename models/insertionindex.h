@@ -1,0 +1,22 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#ifndef INSERTIONINDEX_H
+#define INSERTIONINDEX_H
+
+#include <QtGlobal>
+
+#include <algorithm>
+#include <vector>
+
+// Where to insert a row by its number: before the first row with a higher number, or at the end if
+// there is none or the number is negative. The rows need not be sorted.
+inline int insertionIndex(const std::vector<qint64> &rows, qint64 number)
+{
+    const auto isHigher = [number](qint64 row) { return row > number; };
+    const auto place =
+        number < 0 ? rows.cend() : std::find_if(rows.cbegin(), rows.cend(), isHigher);
+    return int(place - rows.cbegin());
+}
+
+#endif

@@ -1,0 +1,84 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+// A device may lock the list of enabled actions by a dconf profile: nobody can change it then.
+
+#include "files.h"
+#include "messagelog.h"
+#include "mgconfitem.h"
+#include "quickactionsmodel.h"
+
+#include <QProcess>
+#include <QtTest>
+
+namespace {
+
+const QString directory = QStringLiteral("/usr/share/glimmera/quickactions");
+const QString enabledKey = QStringLiteral("/desktop/glimmera-marlo-home/events_screen_actions");
+
+QStringList names(const QuickActionsModel &model)
+{
+    QStringList names;
+    for (int row = 0; row < model.count(); ++row) {
+        const QString path = model.data(model.index(row), QuickActionsModel::PathRole).toString();
+        names.append(QFileInfo(path).completeBaseName());
+    }
+    return names;
+}
+
+} // namespace
+
+class TestLockedList : public QObject
+{
+    Q_OBJECT
+
+private Q_SLOTS:
+    void initTestCase();
+    void moveChangesNothing();
+};
+
+void TestLockedList::initTestCase()
+{
+    // Before dconf is used for the first time in this process.
+    const QString source = QStringLiteral("/etc/dconf/db/device.d");
+    QByteArray paths;
+    for (const char *name : {"a", "b", "c"}) {
+        const QString path = QStringLiteral("%1/%2.conf").arg(directory, QLatin1String(name));
+        Files::write(path, "title=x\n");
+        paths += (paths.isEmpty() ? "'" : ", '") + path.toUtf8() + '\'';
+    }
+    Files::write(source + QStringLiteral("/actions"),
+                 "[desktop/glimmera-marlo-home]\nevents_screen_actions=[" + paths + "]\n");
+    Files::write(source + QStringLiteral("/locks/actions"), enabledKey.toUtf8() + '\n');
+    Files::write(QStringLiteral("/etc/dconf/profile/user"), "user-db:user\nsystem-db:device\n");
+    QCOMPARE(QProcess::execute(
+                 QStringLiteral("dconf"),
+                 {QStringLiteral("compile"), QStringLiteral("/etc/dconf/db/device"), source}),
+             0);
+}
+
+void TestLockedList::moveChangesNothing()
+{
+    MessageLog log;
+    QuickActionsModel model;
+    model.componentComplete();
+    const QStringList listed{QStringLiteral("a"), QStringLiteral("b"), QStringLiteral("c")};
+    QCOMPARE(names(model), listed);
+
+    // Twice: the second call must find the rows and the list as they were.
+    for (int i = 0; i < 2; ++i) {
+        model.move(0, 2);
+        QCOMPARE(names(model), listed);
+        QCOMPARE(MGConfItem(enabledKey).value().toStringList().size(), 3);
+        const QStringList messages = log.takeTexts();
+        QCOMPARE(messages.size(), 1);
+        QVERIFY2(messages.first().contains(enabledKey), qPrintable(messages.first()));
+        QCoreApplication::processEvents();
+        QCOMPARE(names(model), listed);
+    }
+    QCOMPARE(log.takeReport(), QString());
+}
+
+QTEST_GUILESS_MAIN(TestLockedList)
+
+#include "tst_lockedlist.moc"

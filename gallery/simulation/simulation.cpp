@@ -3,6 +3,8 @@
 
 #include "simulation.h"
 
+#include "languageforwarder.h"
+
 #include <QCoreApplication>
 #include <QDBusConnection>
 #include <QEvent>
@@ -31,8 +33,8 @@ const QString sampleCover = QStringLiteral("MARLO-COVER-07");
 } // namespace
 
 Simulation::Simulation(QQmlEngine *engine)
-    : m_engine(engine), m_coverDaemonWatcher(coverService, QDBusConnection::systemBus(),
-                                             QDBusServiceWatcher::WatchForRegistration)
+    : m_coverDaemonWatcher(coverService, QDBusConnection::systemBus(),
+                           QDBusServiceWatcher::WatchForRegistration)
 {
     connect(engine, &QQmlEngine::warnings, this, &Simulation::reportWarnings);
     if (!QDBusConnection::sessionBus().connect(
@@ -40,6 +42,7 @@ Simulation::Simulation(QQmlEngine *engine)
             SIGNAL(callReceived(QString, QString, QStringList)))) {
         qmlWarning(this) << "no session bus: received calls will not be shown";
     }
+    new LanguageForwarder(engine);
     // Of no country yet.
     QLocale::setDefault(QLocale(britishEnglish));
     // QtDBus may lose a signal that follows too soon on a new owner of the daemon's name.
@@ -59,9 +62,9 @@ void Simulation::setLanguage(const QString &language)
         return;
     }
     QLocale::setDefault(QLocale(language == english ? britishEnglish : language));
-    // Translators that follow the language filter this event; the engine retranslates on it.
+    // As the home screen does. The engine gets it from the forwarder.
     QEvent languageChange(QEvent::LanguageChange);
-    QCoreApplication::sendEvent(m_engine, &languageChange);
+    QCoreApplication::sendEvent(QCoreApplication::instance(), &languageChange);
     Q_EMIT languageChanged();
 }
 

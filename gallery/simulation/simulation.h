@@ -49,7 +49,6 @@ private:
     void tellOfCover();
     void reportWarnings(const QList<QQmlError> &errors);
 
-    QQmlEngine *m_engine;
     // The pages meet it on the system bus alone.
     std::unique_ptr<CoverDaemon> m_coverDaemon;
     QDBusServiceWatcher m_coverDaemonWatcher;

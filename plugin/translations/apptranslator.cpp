@@ -5,7 +5,9 @@
 
 #include "catalogfiles.h"
 
+#include <QCryptographicHash>
 #include <QEvent>
+#include <QFile>
 #include <QLocale>
 
 using namespace CatalogFiles;
@@ -13,6 +15,23 @@ using namespace CatalogFiles;
 namespace {
 
 const QLatin1String catalog("settings-system");
+
+bool loadForDefaultLocale(QTranslator *translator)
+{
+    return translator->load(QLocale(), catalog, localePrefix, directory);
+}
+
+// A digest of the file that would be loaded now; empty if there is none.
+QByteArray digestForDefaultLocale()
+{
+    QTranslator translator;
+    QCryptographicHash digest(QCryptographicHash::Sha1);
+    if (!loadForDefaultLocale(&translator)) {
+        return {};
+    }
+    QFile file(translator.filePath());
+    return file.open(QIODevice::ReadOnly) && digest.addData(&file) ? digest.result() : QByteArray();
+}
 
 } // namespace
 
@@ -27,12 +46,17 @@ void AppTranslator::loadEngineeringEnglish()
 
 void AppTranslator::loadDefaultLocale()
 {
-    static_cast<void>(load(QLocale(), catalog, localePrefix, directory));
+    // Before the file is loaded: if it is replaced in between, the next language change loads it.
+    m_loaded = digestForDefaultLocale();
+    static_cast<void>(loadForDefaultLocale(this));
 }
 
 bool AppTranslator::eventFilter(QObject *watched, QEvent *event)
 {
-    if (event->type() == QEvent::LanguageChange) {
+    // An installed translator that loads a file posts a language change to the application, even if
+    // it is the same file. A host that passes those on to the watched object would never come to
+    // rest, so only what is new is loaded.
+    if (event->type() == QEvent::LanguageChange && digestForDefaultLocale() != m_loaded) {
         loadDefaultLocale();
     }
     return QTranslator::eventFilter(watched, event);

@@ -4,13 +4,14 @@
 #ifndef APPTRANSLATOR_H
 #define APPTRANSLATOR_H
 
+#include <QByteArray>
 #include <QTranslator>
 
 /*
     A translator of the settings pages' catalog, "settings-system" in /usr/share/translations.
 
-    Installed as an event filter on an object, it loads the catalog anew whenever a language change
-    reaches that object, so that pages follow the language of the system without a restart.
+    Installed as an event filter on an object, it reloads the catalog when a language change reaches
+    that object, so that pages follow the language of the system without a restart.
 */
 class AppTranslator : public QTranslator
 {
@@ -19,12 +20,16 @@ class AppTranslator : public QTranslator
 public:
     explicit AppTranslator(QObject *parent);
 
-    // Both load in place of what was loaded before. A catalog that does not exist is no error: the
-    // translator is then empty, and look-ups fall through to those installed before it.
+    // Both replace what was loaded before. A catalog that does not exist is not an error: the
+    // translator is then empty, and the translators installed before it are asked.
     void loadEngineeringEnglish();
     void loadDefaultLocale();
 
     bool eventFilter(QObject *watched, QEvent *event) override;
+
+private:
+    // The digest of the file that loadDefaultLocale() loaded, as far as it is known.
+    QByteArray m_loaded;
 };
 
 #endif

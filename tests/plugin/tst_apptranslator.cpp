@@ -18,6 +18,7 @@ private Q_SLOTS:
     void loadsForTheDefaultLocale();
     void loadsEngineeringEnglish();
     void followsLanguageChanges();
+    void loadsWhatIsNew();
     void isEmptyForLanguageWithoutCatalog();
     void passesEveryEventOn();
     void otherEventsReadNothing();
@@ -96,6 +97,35 @@ void TestAppTranslator::followsLanguageChanges()
     QCOMPARE(text(translator), QStringLiteral("Molemmat"));
     send(&engine, QEvent::LanguageChange);
     QCOMPARE(text(translator), QStringLiteral("Beide"));
+}
+
+void TestAppTranslator::loadsWhatIsNew()
+{
+    const QString path = QStringLiteral("/usr/share/translations/settings-system-fi.qm");
+    const auto contentOf = [](const QString &path) {
+        QFile file(path);
+        return file.open(QIODevice::ReadOnly) ? file.readAll() : QByteArray();
+    };
+    const QByteArray finnish = contentOf(path);
+    const QByteArray german =
+        contentOf(QStringLiteral("/usr/share/translations/settings-system-de.qm"));
+    QObject engine;
+    AppTranslator translator(&engine);
+    translator.loadDefaultLocale();
+    engine.installEventFilter(&translator);
+
+    Files::write(path, german);
+    QCOMPARE(text(translator), QStringLiteral("Molemmat"));
+    send(&engine, QEvent::LanguageChange);
+    QCOMPARE(text(translator), QStringLiteral("Beide"));
+
+    // A catalog that appears.
+    Files::remove(path);
+    send(&engine, QEvent::LanguageChange);
+    QVERIFY(translator.isEmpty());
+    Files::write(path, finnish);
+    send(&engine, QEvent::LanguageChange);
+    QCOMPARE(text(translator), QStringLiteral("Molemmat"));
 }
 
 void TestAppTranslator::isEmptyForLanguageWithoutCatalog()

@@ -4,6 +4,7 @@
 // The module as a QML engine meets it, loaded from the build tree.
 
 #include "files.h"
+#include "gallery/simulation/languageforwarder.h"
 #include "messagelog.h"
 
 #include <QJsonObject>
@@ -38,6 +39,7 @@ private Q_SLOTS:
     void englishAnswersWithoutACatalog();
     void importAnnouncesNothingAtOnce();
     void followsLanguageChanges();
+    void restsAfterEachLanguageChange();
     void filtersNoEvent();
     void translatorsGoWithTheirEngine();
 
@@ -61,6 +63,32 @@ QString englishOnly()
 {
     return qtTrId("settings-test-english");
 }
+
+QString catalogPath(const char *name)
+{
+    return QStringLiteral("/usr/share/translations/%1.qm").arg(QLatin1String(name));
+}
+
+void changeLanguage(const QString &locale)
+{
+    QLocale::setDefault(QLocale(locale));
+    QEvent change(QEvent::LanguageChange);
+    QCoreApplication::sendEvent(QCoreApplication::instance(), &change);
+}
+
+// Counts the language changes of the application.
+class LanguageChanges : public QObject
+{
+public:
+    LanguageChanges() { QCoreApplication::instance()->installEventFilter(this); }
+    bool eventFilter(QObject *watched, QEvent *event) override
+    {
+        const bool counts = watched == QCoreApplication::instance();
+        count += counts && event->type() == QEvent::LanguageChange ? 1 : 0;
+        return QObject::eventFilter(watched, event);
+    }
+    int count = 0;
+};
 
 } // namespace
 
@@ -280,23 +308,11 @@ void TestPlugin::englishAnswersWithoutACatalog()
 
 void TestPlugin::importAnnouncesNothingAtOnce()
 {
-    class Listener : public QObject
-    {
-    public:
-        bool eventFilter(QObject *watched, QEvent *event) override
-        {
-            count += event->type() == QEvent::LanguageChange ? 1 : 0;
-            return QObject::eventFilter(watched, event);
-        }
-        int count = 0;
-    };
-
-    Listener listener;
-    QCoreApplication::instance()->installEventFilter(&listener);
+    const LanguageChanges changes;
     QQmlEngine engine;
     QVERIFY(create(&engine, "QtObject {}") != nullptr);
-    QCOMPARE(listener.count, 0);
-    QTRY_VERIFY(listener.count > 0);
+    QCOMPARE(changes.count, 0);
+    QTRY_VERIFY(changes.count > 0);
 }
 
 void TestPlugin::followsLanguageChanges()
@@ -316,6 +332,47 @@ void TestPlugin::followsLanguageChanges()
     QLocale::setDefault(QLocale(QStringLiteral("sv_SE")));
     QCoreApplication::sendEvent(&engine, &change);
     QCOMPARE(both(), QStringLiteral("Both, engineering English"));
+}
+
+void TestPlugin::restsAfterEachLanguageChange()
+{
+    QCoreApplication::sendPostedEvents(); // what other tests left
+    const QByteArray document = "QtObject { property string both: qsTrId('settings-test-both') }";
+    QQmlEngine engine;
+    LanguageChanges changes;
+    new LanguageForwarder(&engine);
+    const auto object = create(&engine, document);
+    QVERIFY(object != nullptr);
+    // Checks that there were so many changes, and that no more follow.
+    const auto restsAfter = [&changes](int count) {
+        QTRY_COMPARE(changes.count, count);
+        QTest::qWait(100);
+        QCOMPARE(changes.count, count);
+        changes.count = 0;
+    };
+    // Each of the two translators announces the catalog that it has loaded.
+    restsAfter(2);
+
+    // The one that is sent here, and the one that announces what was loaded.
+    changeLanguage(QStringLiteral("de_DE"));
+    restsAfter(2);
+    QCOMPARE(object->property("both").toString(), QStringLiteral("Beide"));
+
+    // The same locale and the same file.
+    changeLanguage(QStringLiteral("de_DE"));
+    restsAfter(1);
+
+    // A package replaces the file.
+    QVERIFY(QFile::remove(catalogPath("settings-system-de")));
+    QVERIFY(QFile::rename(catalogPath("settings-system-fi"), catalogPath("settings-system-de")));
+    changeLanguage(QStringLiteral("de_DE"));
+    restsAfter(2);
+    QCOMPARE(object->property("both").toString(), QStringLiteral("Molemmat"));
+
+    // A locale without a catalog.
+    changeLanguage(QStringLiteral("sv_SE"));
+    restsAfter(2);
+    QCOMPARE(object->property("both").toString(), QStringLiteral("Both, engineering English"));
 }
 
 void TestPlugin::filtersNoEvent()

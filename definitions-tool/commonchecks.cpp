@@ -104,8 +104,16 @@ void reportUnknownKey(const QString &what, const QString &name, const QStringLis
 
 void checkCatalog(const QString &catalog, int line, CheckContext *context, Findings *findings)
 {
+    const QLatin1String suffix = CatalogFiles::engineeringEnglishSuffix;
+    if (catalog.endsWith(suffix)) {
+        findings->add(line, Severity::Warning, catalogRule,
+                      QStringLiteral("the catalog %1 is named with the suffix of its engineering "
+                                     "English; only with %2 are other languages shown")
+                          .arg(quoted(catalog), quoted(catalog.chopped(suffix.size()))));
+        return;
+    }
     InstalledCatalogs &catalogs = context->catalogs;
-    if (catalog.isEmpty() || catalogs.hasEngineeringEnglish(catalog)) {
+    if (catalog.isEmpty() || context->ignoresCatalogs || catalogs.hasEngineeringEnglish(catalog)) {
         return;
     }
     const QString file =
@@ -123,7 +131,7 @@ void checkTextId(const QString &id, const QString &catalog, int line, CheckConte
                  Findings *findings)
 {
     InstalledCatalogs &catalogs = context->catalogs;
-    const bool isInstalled = !catalog.isEmpty()
+    const bool isInstalled = !catalog.isEmpty() && !context->ignoresCatalogs
         && (catalogs.hasEngineeringEnglish(catalog) || !catalogs.languages(catalog).isEmpty());
     if (!id.isEmpty() && isInstalled && !catalogs.holds(catalog, id)) {
         findings->add(line, Severity::Warning, textIdRule,

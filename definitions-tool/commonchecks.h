@@ -18,7 +18,7 @@ bool reportUnreadable(const QString &path, qint64 maximumSize, QByteArray *conte
 void reportUnknownKey(const QString &what, const QString &name, const QStringList &known, int line,
                       Findings *findings);
 
-// Warns of a catalog that is not there, or not for everybody.
+// Warns of a catalog that is not installed, that lacks engineering English, or whose name is wrong.
 void checkCatalog(const QString &catalog, int line, CheckContext *context, Findings *findings);
 
 // Warns of a text that the catalog does not hold; no identifier or no catalog has none.

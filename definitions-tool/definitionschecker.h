@@ -23,6 +23,8 @@ struct CheckContext {
     explicit CheckContext(const QString &root) : catalogs(root) { }
 
     InstalledCatalogs catalogs;
+    // Whether it does not matter which catalogs are installed.
+    bool ignoresCatalogs = false;
     // Where the widgets are defined that were met.
     QHash<QString, Place> widgets;
 };
@@ -36,6 +38,9 @@ class DefinitionsChecker
 public:
     // Catalogs and installed definitions are looked for below the root folder.
     explicit DefinitionsChecker(const QString &root);
+
+    // For sources, whose catalogs are not compiled yet.
+    void ignoreCatalogs() { m_context.ignoresCatalogs = true; }
 
     // A file, or all definition files in a folder; a name that is no definition file's is a finding.
     // What was checked is not checked again. False if there is nothing there.

@@ -24,7 +24,7 @@ const char *const description =
     "Checks, lists and shows the definition files of quick actions (*.conf) and\n"
     "events widgets (*.json), by the readers of the models themselves.\n"
     "\n"
-    "  check [--strict] [--format json] [--root DIR] [FILE|FOLDER...]\n"
+    "  check [--strict] [--no-catalogs] [--format json] [--root DIR] [FILE|FOLDER...]\n"
     "  list [--catalogs]\n"
     "  show FILE";
 
@@ -65,6 +65,8 @@ int Command::run(const QStringList &arguments)
     const QCommandLineOption version = m_parser.addVersionOption();
     m_parser.addOptions({
         {QStringLiteral("strict"), QStringLiteral("check: warnings count like errors.")},
+        {QStringLiteral("no-catalogs"),
+         QStringLiteral("check: ignore which catalogs are installed, and what they hold.")},
         {QStringLiteral("format"), QStringLiteral("check: text, the default, or json."),
          QStringLiteral("format"), QStringLiteral("text")},
         {QStringLiteral("root"),
@@ -97,7 +99,8 @@ int Command::run(const QStringList &arguments)
     const QString command = operands.isEmpty() ? QString() : operands.takeFirst();
     static const QHash<QString, QStringList> options = {
         {QStringLiteral("check"),
-         {QStringLiteral("strict"), QStringLiteral("format"), QStringLiteral("root")}},
+         {QStringLiteral("strict"), QStringLiteral("no-catalogs"), QStringLiteral("format"),
+          QStringLiteral("root")}},
         {QStringLiteral("list"), {QStringLiteral("catalogs")}},
         {QStringLiteral("show"), {}},
     };
@@ -130,6 +133,9 @@ int Command::check(const QStringList &paths)
     }
 
     DefinitionsChecker checker(root);
+    if (m_parser.isSet(QStringLiteral("no-catalogs"))) {
+        checker.ignoreCatalogs();
+    }
     int failure = Clean;
     if (paths.isEmpty() && !checker.checkInstalled()) {
         failure =

@@ -23,7 +23,7 @@ _marlo_definitions() {
         ;;
     *)
         case $command:$current in
-        check:-*) words='--format --root --strict' ;;
+        check:-*) words='--format --no-catalogs --root --strict' ;;
         list:*) words='--catalogs' ;;
         :-*) words='--help --version' ;;
         :*) words='check list show' ;;

@@ -30,6 +30,8 @@ const QLatin1String typeRule("type");
 const QLatin1String argumentsRule("arguments");
 const QLatin1String callRule("call");
 const QLatin1String priorityRule("priority");
+const QLatin1String titleRule("title");
+const QLatin1String catalogRule("catalog");
 const QLatin1String argumentTypeRule("argument-type");
 
 const QString catalogKey = QStringLiteral("translation-catalog");
@@ -238,8 +240,18 @@ void QuickActionCheck::checkTexts()
         }
     }
     const QString catalog = m_action.translationCatalog();
+    const QString title = m_action.title();
+    if (title.isEmpty() && !m_misread.contains(titleKey)) {
+        add(lineOf(titleKey), Severity::Warning, titleRule,
+            QStringLiteral("without \"title\" the action shows no text"));
+    }
+    if (!title.isEmpty() && catalog.isEmpty() && !m_misread.contains(catalogKey)) {
+        add(lineOf(titleKey), Severity::Warning, catalogRule,
+            QStringLiteral("without \"translation-catalog\" the title is only looked up in "
+                           "catalogs that happen to be loaded"));
+    }
     checkCatalog(catalog, lineOf(catalogKey), m_context, m_findings);
-    checkTextId(m_action.title(), catalog, lineOf(titleKey), m_context, m_findings);
+    checkTextId(title, catalog, lineOf(titleKey), m_context, m_findings);
     checkIcon(m_action.icon().toString(), lineOf(iconKey), m_findings);
 }
 
@@ -269,6 +281,9 @@ void QuickActionCheck::checkPriority()
     } else if (!m_action.priority()) {
         add(lineOf(priorityKey), Severity::Error, typeRule,
             QStringLiteral("\"priority\" is no integer: the action comes last"));
+    } else if (*m_action.priority() < 0) {
+        add(lineOf(priorityKey), Severity::Warning, priorityRule,
+            QStringLiteral("\"priority\" is negative: the action comes last"));
     }
 }
 

@@ -36,6 +36,7 @@ private Q_SLOTS:
     void folder();
     void installedDefinitions();
     void root();
+    void catalogsOfSources();
     void pathsAcrossFiles();
     void sameFileTwice();
     void hostileNames();
@@ -75,7 +76,7 @@ constexpr int timeout = 60000; // ms
 
 const QByteArray call = "remote-service=org.example.lamp\nremote-path=/lamp\n"
                         "remote-interface=org.example.Lamp\nremote-method=toggle\n";
-const QByteArray goodAction = "title=Lamp\npriority=1\n" + call;
+const QByteArray goodAction = "title=maps-title\ntranslation-catalog=maps\npriority=1\n" + call;
 const QByteArray goodWidget = R"({ "widgets": [ { "path": "/a.qml", "order": 1 } ] })";
 
 QString lines(const QStringList &lines)
@@ -90,6 +91,7 @@ void TestMarloDefinitions::init()
     m_log = std::make_unique<MessageLog>();
     m_folder = std::make_unique<QTemporaryDir>();
     QVERIFY(QDir::setCurrent(m_folder->path()));
+    Files::installCatalog(QStringLiteral("maps_eng_en"));
 }
 
 void TestMarloDefinitions::cleanup()
@@ -187,7 +189,7 @@ void TestMarloDefinitions::jsonFormat()
     const Result result = run(arguments);
     QCOMPARE(result.status, 1);
     const QJsonArray findings = QJsonDocument::fromJson(result.output.toUtf8()).array();
-    QCOMPARE(findings.size(), 3);
+    QCOMPARE(findings.size(), 4);
     QCOMPARE(findings.at(0).toObject(),
              (QJsonObject{{QStringLiteral("file"), QStringLiteral("lamp.conf")},
                           {QStringLiteral("line"), 1},
@@ -253,7 +255,7 @@ void TestMarloDefinitions::root()
     Files::installCatalog(QStringLiteral("atlas_eng_en"));
     Files::write(quickActions + QStringLiteral("bad.conf"), "x\n");
     Files::write(QStringLiteral("root/usr/share/glimmera/quickactions/lamp.conf"),
-                 "translation-catalog=atlas\n" + goodAction);
+                 "translation-catalog=atlas\ntitle=Lamp\npriority=1\n" + call);
     const QStringList arguments = {QStringLiteral("check"), QStringLiteral("--strict"),
                                    QStringLiteral("--root"), QStringLiteral("root")};
     const Result missing = run(arguments);
@@ -275,10 +277,34 @@ void TestMarloDefinitions::root()
                        "\"atlas\" does not hold the text \"Lamp\" [text-id]\n"));
 
     // Named files are looked for where their names say.
+    QVERIFY(QFile::copy(QStringLiteral("/usr/share/translations/maps_eng_en.qm"),
+                        QStringLiteral("root/usr/share/translations/maps_eng_en.qm")));
     Files::write(QStringLiteral("other.conf"), goodAction);
     const Result named = run(arguments + QStringList(QStringLiteral("other.conf")));
     QCOMPARE(named.status, 0);
     QCOMPARE(named.output, QString());
+}
+
+// The catalogs of a package are not compiled yet where its sources are checked.
+void TestMarloDefinitions::catalogsOfSources()
+{
+    Files::removeCatalog(QStringLiteral("maps_eng_en"));
+    Files::write(QStringLiteral("lamp.conf"), goodAction);
+    QStringList arguments = {QStringLiteral("check"), QStringLiteral("--strict"),
+                             QStringLiteral("lamp.conf")};
+    QCOMPARE(run(arguments).status, 1);
+    arguments.append(QStringLiteral("--no-catalogs"));
+    QCOMPARE(run(arguments).output, QString());
+    QCOMPARE(run(arguments).status, 0);
+
+    // Nor do installed ones count, which may be older.
+    Files::installCatalog(QStringLiteral("maps_eng_en"));
+    Files::write(QStringLiteral("lamp.conf"), goodAction + "[General]\ntitle=maps-new\n");
+    QVERIFY(!run(arguments).output.contains(QStringLiteral("[text-id]")));
+
+    Files::write(QStringLiteral("lamp.conf"),
+                 "title=maps-title\ntranslation-catalog=maps_eng_en\npriority=1\n" + call);
+    QCOMPARE(run(arguments).status, 1);
 }
 
 void TestMarloDefinitions::pathsAcrossFiles()

@@ -32,6 +32,11 @@ def arguments(*values, size=None):
 
 
 NO_PRIORITY = '1: warning: without "priority" the action comes last [priority]'
+NO_TITLE = '1: warning: without "title" the action shows no text [title]'
+NO_CATALOG = (
+    '1: warning: without "translation-catalog" the title is only looked up in catalogs that happen '
+    "to be loaded [catalog]"
+)
 NO_CALL = [
     '1: error: the call cannot be sent without "remote-service" [call]',
     '1: error: the call cannot be sent without "remote-path" [call]',
@@ -69,8 +74,9 @@ case("good-quoted", action(icon='"/usr/share/icons/a,b.svg"') + 'requires-packag
 case("good-continued", action() + "requires-package=lamp\\\n-tools\n")
 case("good-comment-behind", action(priority="10 ; in the middle"))
 case(
-    "good-zero",
+    "warn-zero",
     action(title="La\0mp", translation_catalog=None, icon="/usr/share/x.png", priority="1"),
+    NO_CATALOG,
 )
 case("bad-title-comma", action(title="Lamp, bright"), comma(1, "title"))
 case("bad-catalog-comma", action(translation_catalog="maps, atlas"), comma(2, "translation-catalog"))
@@ -97,15 +103,21 @@ case("good-comment-utf8", "; äöü\n" + action())
 case("good-utf8-mark-section", "\ufeff[General]\n" + action())
 case("good-utf8-mark-comment", "\ufeff; A lamp.\n" + action() + arguments("café"))
 case("good-crlf", action().replace("\n", "\r\n"))
-case("bad-utf8", action(title="Lampe für alle", translation_catalog=None), f"1: {LATIN1}")
+case(
+    "bad-utf8",
+    action(title="Lampe für alle", translation_catalog=None),
+    f"1: {LATIN1}",
+    NO_CATALOG,
+)
 case("bad-utf8-argument", action() + arguments("ä"), f"11: {LATIN1}")
 case("bad-latin1", action() + "requires-package=l\udce4mp\n", f"9: {LATIN1}")
-case("bad-utf8-mark", "\ufeff" + action() + arguments("café"), MARKED)
-case("bad-utf8-mark-space", "\ufeff  " + action(), MARKED)
+case("bad-utf8-mark", "\ufeff" + action() + arguments("café"), MARKED, NO_TITLE)
+case("bad-utf8-mark-space", "\ufeff  " + action(), MARKED, NO_TITLE)
 case(
     "bad-binary",
     bytes(range(1, 256)) + b"\n" + bytes(range(255, 0, -1)),
     f"1: {NO_KEY} [no-key]",
+    NO_TITLE,
     NO_PRIORITY,
     *NO_CALL,
     f"2: {NO_KEY} [no-key]",
@@ -120,10 +132,10 @@ case("good-general", "; A comment.\n[General]\n" + action())
 case("good-no-newline", action().rstrip())
 case(
     "good-spaces",
-    "\n\n  title = maps-title  \n\ticon=icon-m-lamp\n priority =10\n"
-    + action(title=None, translation_catalog=None, icon=None, priority=None),
+    "\n\n  title = maps-title  \n\ttranslation-catalog=maps\n priority =10\n"
+    + action(title=None, translation_catalog=None, priority=None),
 )
-case("bad-empty", "", NO_PRIORITY, *NO_CALL)
+case("bad-empty", "", NO_TITLE, NO_PRIORITY, *NO_CALL)
 case("bad-no-key", action() + "requires-package\n", f"9: {NO_KEY} [no-key]")
 case(
     "bad-hash-comment",
@@ -150,6 +162,7 @@ case(
     "bad-desktop-entry",
     "[Quick Action]\n" + action(),
     '1: warning: unknown section "Quick Action" [unknown-key]',
+    NO_TITLE,
     NO_PRIORITY,
     *NO_CALL,
 )
@@ -189,9 +202,22 @@ case(
     r'10: warning: unknown key "shape\u000c" [unknown-key]',
 )
 
-# Catalog, icon and priority.
+# Title, catalog, icon and priority.
 case("good-url-icon", action(icon="image://theme/icon-m-lamp"))
-case("good-negative-priority", action(priority="-1"))
+case(
+    "warn-negative-priority",
+    action(priority="-1"),
+    '4: warning: "priority" is negative: the action comes last [priority]',
+)
+case("warn-no-title", action(title=None), NO_TITLE)
+case("warn-empty-title", action(title=""), NO_TITLE)
+case("warn-no-catalog", action(translation_catalog=None), NO_CATALOG)
+case(
+    "warn-catalog-suffix",
+    action(translation_catalog="maps_eng_en"),
+    '2: warning: the catalog "maps_eng_en" is named with the suffix of its engineering English; only '
+    'with "maps" are other languages shown [catalog]',
+)
 case(
     "warn-catalog",
     action(translation_catalog="nowhere"),

@@ -10,6 +10,8 @@
 #include <QQmlInfo>
 #include <QSettings>
 
+#include <algorithm>
+
 namespace {
 
 const QLatin1String titleKey("title");
@@ -34,6 +36,19 @@ constexpr int enoughArguments = 256;
 // Libraries keep these to themselves: the bus hangs up on whoever sends a message with one of them.
 const QLatin1String reservedPath("/org/freedesktop/DBus/Local");
 const QLatin1String reservedInterface("org.freedesktop.DBus.Local");
+
+// QSettings gives a list of variants, not of strings, if an element begins with "@".
+QVariant withStringList(const QVariant &value)
+{
+    if (value.userType() != QMetaType::QVariantList) {
+        return value;
+    }
+    const QVariantList list = value.toList();
+    const bool isStringList = std::all_of(list.cbegin(), list.cend(), [](const QVariant &element) {
+        return element.userType() == QMetaType::QString;
+    });
+    return isStringList ? value.toStringList() : value;
+}
 
 } // namespace
 
@@ -177,7 +192,7 @@ QVariantMap QuickAction::readActionConfig(const QString &path) const
     for (const QString &key : keys) {
         const int groupLength = key.indexOf(QLatin1Char('/'));
         if (groupLength < 0) {
-            config.insert(config.cend(), key, settings.value(key));
+            config.insert(config.cend(), key, withStringList(settings.value(key)));
         } else if (key.leftRef(groupLength) == argumentsKey) {
             hasArguments = true;
         }
@@ -187,7 +202,7 @@ QVariantMap QuickAction::readActionConfig(const QString &path) const
         QVariantList arguments;
         const int size = qMin(settings.value(argumentsSizeKey).toInt(), enoughArguments);
         for (int i = 1; i <= size; ++i) {
-            arguments.append(settings.value(QString(argumentKey).arg(i)));
+            arguments.append(withStringList(settings.value(QString(argumentKey).arg(i))));
         }
         config.insert(argumentsKey, arguments);
     }

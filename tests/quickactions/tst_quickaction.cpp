@@ -161,6 +161,9 @@ void TestQuickAction::readsKeys_data()
     QTest::newRow("empty value") << QByteArray("title=\n") << map("title", QString());
     QTest::newRow("list") << QByteArray("title=a, b\n")
                           << map("title", QStringList{QStringLiteral("a"), QStringLiteral("b")});
+    QTest::newRow("list with an at sign")
+        << QByteArray("title=@a, b\n")
+        << map("title", QStringList{QStringLiteral("@a"), QStringLiteral("b")});
     QTest::newRow("quoted comma") << QByteArray("title=\"a, b\"\n")
                                   << map("title", QStringLiteral("a, b"));
     QTest::newRow("comment") << QByteArray("; title=x\n") << QVariantMap();
@@ -195,6 +198,18 @@ void TestQuickAction::readsArguments_data()
     QTest::newRow("list among them")
         << QByteArray("[remote-arguments]\nsize=1\n1\\argument=a, b\n")
         << list({QStringList{QStringLiteral("a"), QStringLiteral("b")}});
+    const QString me = QStringLiteral("me");
+    const QString atMe = QStringLiteral("@me");
+    const QString atHome = QStringLiteral("@home");
+    QTest::newRow("lists with an at sign")
+        << QByteArray("[remote-arguments]\nsize=5\n1\\argument=me, @home\n"
+                      "2\\argument=@me, home\n3\\argument=\"me\", \"@home\"\n"
+                      "4\\argument=@@me, @home\n5\\argument=\"me, @home\"\n")
+        << list({QStringList{me, atHome}, QStringList{atMe, QStringLiteral("home")},
+                 QStringList{me, atHome}, QStringList{atMe, atHome}, QStringLiteral("me, @home")});
+    QTest::newRow("list with another type")
+        << QByteArray("[remote-arguments]\nsize=1\n1\\argument=me, @Point(1 2)\n")
+        << list({QVariant(QVariantList{me, QPoint(1, 2)})});
     QTest::newRow("size 0") << QByteArray("[remote-arguments]\nsize=0\n1\\argument=a\n")
                             << list(empty);
     QTest::newRow("no size") << QByteArray("[remote-arguments]\n1\\argument=a\n") << list(empty);
@@ -557,16 +572,18 @@ void TestQuickAction::argumentsStayAsRead()
 {
     RecordingService lamp(QDBusConnection::SessionBus, QStringLiteral("org.example.lamp"));
     write(lampCall
-          + "[remote-arguments]\nsize=3\n1\\argument=1\n2\\argument=true\n3\\argument=a, b\n");
+          + "[remote-arguments]\nsize=4\n1\\argument=1\n2\\argument=true\n3\\argument=a, b\n"
+            "4\\argument=me, @home\n");
     Receiver receiver;
     QVERIFY(Action(m_path, true).trigger(&receiver, SLOT(reply()), nullptr));
     QTRY_COMPARE(receiver.replies, 1);
     QCOMPARE(lamp.calls().size(), 1);
     const QDBusMessage call = lamp.calls().constFirst();
-    QCOMPARE(call.signature(), QStringLiteral("ssas"));
+    QCOMPARE(call.signature(), QStringLiteral("ssasas"));
     QCOMPARE(call.arguments(),
              (QVariantList{QStringLiteral("1"), QStringLiteral("true"),
-                           QStringList{QStringLiteral("a"), QStringLiteral("b")}}));
+                           QStringList{QStringLiteral("a"), QStringLiteral("b")},
+                           QStringList{QStringLiteral("me"), QStringLiteral("@home")}}));
 }
 
 void TestQuickAction::noArguments_data()

@@ -4,29 +4,21 @@
 #ifndef INILINES_H
 #define INILINES_H
 
+#include "files/inifile.h"
+
 #include <QString>
 
 #include <vector>
 
-class QByteArray;
-
 /*
-    What stands in which line of a settings file, for finding the place of what QSettings has read;
-    what the values are only QSettings tells.
+    The lines of a settings file, with the names that QSettings gives to keys, for finding the line
+    of a key that QSettings has read.
 */
-struct IniLine {
-    enum class Kind {
-        Section, // A header.
-        Key,
-        Neither, // Passed over by QSettings.
-    };
-
-    Kind kind;
-    int number; // From 1.
-    // As QSettings names it: of a section what its keys begin with, as "remote-arguments/", nothing for
-    // General; a key with its section, as "remote-arguments/1/argument"; else what stands there.
+struct NamedIniLine : IniLine {
+    int number = 0; // From 1.
+    // Of a section, the prefix of its keys such as "remote-arguments/", empty for General; of a key,
+    // the name with that prefix, such as "remote-arguments/1/argument"; otherwise the line itself.
     QString name;
-    bool isClosed = true; // A section's header.
     bool isAscii = true;
     // Whether the byte-order mark in front of a key has become a part of it.
     bool isMarked = false;
@@ -34,6 +26,6 @@ struct IniLine {
     bool isCut = false;
 };
 
-std::vector<IniLine> readIniLines(const QByteArray &text);
+std::vector<NamedIniLine> readIniLines(const QByteArray &text);
 
 #endif

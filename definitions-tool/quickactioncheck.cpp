@@ -126,12 +126,12 @@ bool looksLikeNumberOrBoolean(const QString &text)
 class QuickActionCheck
 {
 public:
-    QuickActionCheck(const Action &action, std::vector<IniLine> lines, CheckContext *context,
+    QuickActionCheck(const Action &action, std::vector<NamedIniLine> lines, CheckContext *context,
                      Findings *findings)
         : m_action(action), m_config(action.config()), m_lines(std::move(lines)),
           m_context(context), m_findings(findings)
     {
-        for (const IniLine &line : m_lines) {
+        for (const NamedIniLine &line : m_lines) {
             if (line.kind == IniLine::Kind::Key) {
                 m_lineOf.insert(line.name, line.number);
             }
@@ -147,7 +147,7 @@ public:
 private:
     // The last one counts. What is not in the file concerns the whole of it.
     int lineOf(const QString &key) const { return m_lineOf.value(key, 1); }
-    void checkKey(const IniLine &line, const QString &section);
+    void checkKey(const NamedIniLine &line, const QString &section);
     void checkText(const QString &key, const QVariant &value);
     void checkArgument(int number, const QVariant &value);
     void add(int line, Severity severity, QLatin1String rule, const QString &text)
@@ -157,7 +157,7 @@ private:
 
     const Action &m_action;
     const QVariantMap m_config;
-    const std::vector<IniLine> m_lines;
+    const std::vector<NamedIniLine> m_lines;
     CheckContext *const m_context;
     Findings *const m_findings;
     QHash<QString, int> m_lineOf;
@@ -169,7 +169,7 @@ private:
 void QuickActionCheck::checkLines(bool isLatin1)
 {
     QString section;
-    for (const IniLine &line : m_lines) {
+    for (const NamedIniLine &line : m_lines) {
         switch (line.kind) {
         case IniLine::Kind::Section:
             section = line.name;
@@ -182,7 +182,7 @@ void QuickActionCheck::checkLines(bool isLatin1)
         case IniLine::Kind::Key:
             checkKey(line, section);
             break;
-        case IniLine::Kind::Neither:
+        default:
             add(line.number, Severity::Error, noKeyRule,
                 line.name.startsWith(QLatin1Char('#'))
                     ? QStringLiteral("this line is no key and is passed over; comments begin with "
@@ -198,7 +198,7 @@ void QuickActionCheck::checkLines(bool isLatin1)
     }
 }
 
-void QuickActionCheck::checkKey(const IniLine &line, const QString &section)
+void QuickActionCheck::checkKey(const NamedIniLine &line, const QString &section)
 {
     if (line.isMarked) {
         add(line.number, Severity::Error, encodingRule,
@@ -291,7 +291,7 @@ void QuickActionCheck::checkArguments()
 {
     int highest = 0;
     int highestLine = 1;
-    for (const IniLine &line : m_lines) {
+    for (const NamedIniLine &line : m_lines) {
         const int number = line.kind == IniLine::Kind::Key ? argumentNumber(line.name) : 0;
         if (number > highest) {
             highest = number;
@@ -378,20 +378,15 @@ void reportRefused(const QString &path, Findings *findings)
     if (reportUnreadable(path, maximumIniSize, &content, findings)) {
         return;
     }
-    const int packed = findPackedValue(content);
-    if (packed >= 0) {
-        findings->add(int(content.left(packed).count('\n')) + 1, Severity::Error, unreadableRule,
-                      QStringLiteral("a packed value: nothing of the file is read"));
-        return;
-    }
-    const std::vector<IniLine> lines = readIniLines(content);
-    const auto unclosed = std::find_if(lines.cbegin(), lines.cend(),
-                                       [](const IniLine &line) { return !line.isClosed; });
-    if (unclosed != lines.cend()) {
-        findings->add(unclosed->number, Severity::Error, unreadableRule,
-                      QStringLiteral("the header of a section is not closed: nothing of the file "
-                                     "is read"));
-        return;
+    for (const NamedIniLine &line : readIniLines(content)) {
+        if (line.isPacked || !line.isClosed) {
+            findings->add(line.number, Severity::Error, unreadableRule,
+                          line.isPacked
+                              ? QStringLiteral("a packed value: nothing of the file is read")
+                              : QStringLiteral("the header of a section is not closed: nothing of "
+                                               "the file is read"));
+            return;
+        }
     }
     findings->add(1, Severity::Error, unreadableRule,
                   QStringLiteral("QSettings cannot read the file"));

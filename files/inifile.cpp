@@ -3,16 +3,171 @@
 
 #include "inifile.h"
 
-#include "regularfile.h"
+#include "files/regularfile.h"
 
 #include <QByteArray>
+#include <QTextCodec>
 
-#include <optional>
+#include <algorithm>
+#include <cstring>
 
 namespace {
 
-int digitOf(char character)
+bool isBlank(char character)
 {
+    return character == ' ' || character == '\t';
+}
+
+bool isBreak(char character)
+{
+    return character == '\n' || character == '\r';
+}
+
+// Two different characters at the position break one line.
+bool isBreakOfTwo(const QByteArray &text, int position, int end)
+{
+    return position + 1 < end && isBreak(text.at(position)) && isBreak(text.at(position + 1))
+        && text.at(position) != text.at(position + 1);
+}
+
+int skipSpaces(const QByteArray &text, int position)
+{
+    while (position < text.size() && (isBlank(text.at(position)) || isBreak(text.at(position)))) {
+        ++position;
+    }
+    return position;
+}
+
+int skipComment(const QByteArray &text, int position)
+{
+    while (position < text.size() && !isBreak(text.at(position))) {
+        ++position;
+    }
+    return skipSpaces(text, position);
+}
+
+// One value, or the elements of a list one after the other, decoded as by QSettings.
+class ValueReader
+{
+public:
+    ValueReader(const QByteArray &text, int start, int end, bool isUtf8)
+        : m_text(text), m_position(start), m_end(end), m_isUtf8(isUtf8)
+    {
+    }
+
+    bool atEnd() const { return m_position >= m_end; }
+    QString readElement();
+
+private:
+    void skipBlanks();
+    QString readPlain();
+    QString readEscape();
+    QChar readNumber(int base);
+    // The value of a digit, or 16.
+    int digit() const;
+
+    const QByteArray &m_text;
+    int m_position;
+    const int m_end;
+    const bool m_isUtf8;
+};
+
+QString ValueReader::readElement()
+{
+    QString element;
+    bool hasQuotes = false;
+    bool isQuoted = false;
+    int escaped = 0; // The end of the last escape, up to which blanks are kept.
+    skipBlanks();
+    while (!atEnd()) {
+        const char character = m_text.at(m_position);
+        if (character == ',' && !isQuoted) {
+            ++m_position;
+            break;
+        }
+        if (character == '"') {
+            ++m_position;
+            hasQuotes = true;
+            isQuoted = !isQuoted;
+            if (!isQuoted) {
+                skipBlanks();
+            }
+        } else if (character == '\\') {
+            ++m_position;
+            element += readEscape();
+            escaped = element.size();
+        } else {
+            element += readPlain();
+        }
+    }
+    int size = element.size();
+    while (!hasQuotes && size > escaped
+           && (element.at(size - 1) == QLatin1Char(' ')
+               || element.at(size - 1) == QLatin1Char('\t'))) {
+        --size;
+    }
+    element.truncate(size);
+    return element;
+}
+
+void ValueReader::skipBlanks()
+{
+    while (!atEnd() && isBlank(m_text.at(m_position))) {
+        ++m_position;
+    }
+}
+
+QString ValueReader::readPlain()
+{
+    const auto text = m_text.cbegin();
+    const auto start = text + m_position;
+    const auto end = std::find_if(start + 1, text + m_end, [](char character) {
+        return character == '\\' || character == '"' || character == ',';
+    });
+    m_position = int(end - text);
+    const int size = int(end - start);
+    // The codec also removes a byte-order mark from each piece of text.
+    return m_isUtf8 ? QTextCodec::codecForName("UTF-8")->toUnicode(start, size)
+                    : QString::fromLatin1(start, size);
+}
+
+QString ValueReader::readEscape()
+{
+    if (atEnd()) {
+        return {};
+    }
+    const char character = m_text.at(m_position);
+    if (isBreak(character)) {
+        m_position += isBreakOfTwo(m_text, m_position, m_end) ? 2 : 1;
+        return {};
+    }
+    if (digit() < 8) {
+        return readNumber(8);
+    }
+    ++m_position;
+    if (character == 'x') {
+        return digit() < 16 ? QString(readNumber(16)) : QString();
+    }
+    // QSettings ignores a backslash before any other character, together with that character.
+    constexpr char letters[] = "abfnrtv\"?'\\";
+    constexpr char meanings[] = "\a\b\f\n\r\t\v\"?'\\";
+    const char *letter = std::strchr(letters, character);
+    return letter && character ? QString(QLatin1Char(meanings[letter - letters])) : QString();
+}
+
+QChar ValueReader::readNumber(int base)
+{
+    uint number = 0;
+    for (; digit() < base; ++m_position) {
+        number = number * uint(base) + uint(digit());
+    }
+    // QSettings drops the upper bits.
+    return QChar(ushort(number));
+}
+
+int ValueReader::digit() const
+{
+    const char character = atEnd() ? ' ' : m_text.at(m_position);
     if (character >= '0' && character <= '9') {
         return character - '0';
     }
@@ -20,166 +175,96 @@ int digitOf(char character)
     return lower >= 'a' && lower <= 'f' ? lower - 'a' + 10 : 16;
 }
 
-// The next character of a value as QSettings understands it: quotes are not part of it, a character
-// may be escaped by its number, and a backslash before most others stands for nothing at all.
-std::optional<uint> nextCharacter(const QByteArray &data, int *position)
+bool isPackedElement(const QString &element)
 {
-    while (*position < data.size()) {
-        const char character = data.at((*position)++);
-        if (character == '"') {
-            continue;
-        }
-        if (character != '\\') {
-            return uchar(character);
-        }
-        if (*position == data.size()) {
-            break;
-        }
-        const char escaped = data.at((*position)++);
-        const uint base = escaped == 'x' ? 16 : 8;
-        if (escaped == '\\' || escaped == '"') {
-            return uchar(escaped);
-        }
-        if (escaped != 'x' && digitOf(escaped) >= 8) {
-            continue;
-        }
-        uint number = escaped == 'x' ? 0 : uint(digitOf(escaped));
-        while (*position < data.size() && uint(digitOf(data.at(*position))) < base) {
-            number = number * base + uint(digitOf(data.at((*position)++)));
-        }
-        return number;
-    }
-    return {};
+    return element.endsWith(QLatin1Char(')'))
+        && (element.startsWith(QLatin1String("@Variant("))
+            || element.startsWith(QLatin1String("@DateTime(")));
 }
 
-bool isSpace(uint character)
+bool isPackedValue(const QByteArray &text, int start, int end)
 {
-    return character == ' ' || character == '\t' || character == '\r' || character == '\n';
-}
-
-// Whether a value that begins at the position, or the element of a list, is one to unpack.
-bool isPacked(const QByteArray &data, int position)
-{
-    std::optional<uint> character;
-    do {
-        character = nextCharacter(data, &position);
-    } while (character && isSpace(*character));
-    if (character != uint('@')) {
+    // Nearly every value has no "@", not even a hidden one.
+    const auto value = text.cbegin();
+    if (std::none_of(value + start, value + end,
+                     [](char character) { return character == '@' || character == '\\'; })) {
         return false;
     }
-    QByteArray word;
-    while (word.size() < 9 && (character = nextCharacter(data, &position))) {
-        word += char(*character);
+    ValueReader reader(text, start, end, text.startsWith(iniByteOrderMark));
+    bool isPacked = false;
+    while (!isPacked && !reader.atEnd()) {
+        isPacked = isPackedElement(reader.readElement());
     }
-    return word.startsWith("Variant(") || word.startsWith("DateTime(");
+    return isPacked;
 }
 
-bool isPlain(const RegularFile &file)
+bool isPlain(const RegularFile &file, bool needsClosedSections)
 {
-    return file.state == RegularFile::State::NotOpened
-        || (file.state == RegularFile::State::Read && findPackedValue(file.content) < 0);
-}
-
-bool isSpaceAt(const QByteArray &data, int position)
-{
-    return position < data.size() && isSpace(uchar(data.at(position)));
-}
-
-bool isBreakAt(const QByteArray &data, int position)
-{
-    return position < data.size() && (data.at(position) == '\n' || data.at(position) == '\r');
-}
-
-// As in nearly all files, which need no closer look then: their lines end where these end or later.
-bool closesEveryBracket(const QByteArray &data)
-{
-    for (int start = data.indexOf('['); start >= 0; start = data.indexOf('[', start + 1)) {
-        int end = start;
-        while (end < data.size() && data.at(end) != ']') {
-            if (data.at(end) == ';' || isBreakAt(data, end)) {
-                return false;
-            }
-            ++end;
-        }
-        if (end == data.size()) {
-            return false;
-        }
+    if (file.state != RegularFile::State::Read) {
+        return file.state == RegularFile::State::NotOpened;
     }
-    return true;
+    IniLine line = nextIniLine(file.content, 0);
+    while (line.kind != IniLine::Kind::None && !line.isPacked
+           && (line.isClosed || !needsClosedSections)) {
+        line = nextIniLine(file.content, line.end);
+    }
+    return line.kind == IniLine::Kind::None;
 }
 
 } // namespace
 
 bool isPlainIni(const QString &path)
 {
-    return isPlain(readRegularFile(path, maximumIniSize));
+    return isPlain(readRegularFile(path, maximumIniSize), false);
 }
 
 bool isWellFormedIni(const QString &path)
 {
-    const RegularFile file = readRegularFile(path, maximumIniSize);
-    return isPlain(file) && findBrokenSection(file.content) < 0;
+    return isPlain(readRegularFile(path, maximumIniSize), true);
 }
 
-IniSpan nextIniLine(const QByteArray &data, int position)
+IniLine nextIniLine(const QByteArray &text, int position)
 {
-    while (isSpaceAt(data, position)) {
-        ++position;
+    if (position == 0 && text.startsWith(iniByteOrderMark)) {
+        position = int(qstrlen(iniByteOrderMark));
     }
-    int start = position;
-    bool quoted = false;
-    while (position < data.size()) {
-        const char character = data.at(position);
-        if (character == '\\') {
-            ++position;
-            // A break of two characters is passed as one.
-            const bool isPair = isBreakAt(data, position) && isBreakAt(data, position + 1)
-                && data.at(position) != data.at(position + 1);
-            position += isPair ? 2 : 1;
-        } else if (character == ';' && position == start) {
-            while (position < data.size() && !isBreakAt(data, position)) {
-                ++position;
-            }
-            while (isSpaceAt(data, position)) {
-                ++position;
-            }
-            start = position;
-        } else if ((character == ';' || isBreakAt(data, position)) && !quoted) {
+    position = skipSpaces(text, position);
+    while (position < text.size() && text.at(position) == ';') {
+        position = skipComment(text, position);
+    }
+
+    IniLine line;
+    line.start = position;
+    int equals = -1;
+    for (bool isQuoted = false; position < text.size(); ++position) {
+        const char character = text.at(position);
+        if (!isQuoted && (character == ';' || isBreak(character))) {
             break;
-        } else {
-            quoted = quoted != (character == '"');
-            ++position;
+        }
+        if (character == '\\') {
+            position += isBreakOfTwo(text, position + 1, text.size()) ? 2 : 1;
+        } else if (character == '"') {
+            isQuoted = !isQuoted;
+        } else if (character == '=' && !isQuoted && equals < 0) {
+            equals = position;
         }
     }
-    return {start, qMin(position, data.size())};
-}
-
-int findPackedValue(const QByteArray &data)
-{
-    for (int position = 0; position < data.size(); ++position) {
-        const char character = data.at(position);
-        if ((character == '=' || character == ',') && isPacked(data, position + 1)) {
-            return position;
-        }
+    line.end = qMin(position, text.size());
+    if (line.start == line.end) {
+        return line;
     }
-    return -1;
-}
-
-int findBrokenSection(const QByteArray &data)
-{
-    if (closesEveryBracket(data)) {
-        return -1;
+    if (text.at(line.start) == '[') {
+        line.kind = IniLine::Kind::Section;
+        const auto lineEnd = text.cbegin() + line.end;
+        const auto nameEnd = std::find(text.cbegin() + line.start, lineEnd, ']');
+        line.isClosed = nameEnd != lineEnd;
+        line.nameEnd = int(nameEnd - text.cbegin());
+    } else if (equals >= 0) {
+        line.kind = IniLine::Kind::Key;
+        line.nameEnd = equals;
+        line.isPacked = isPackedValue(text, equals + 1, line.end);
+    } else {
+        line.kind = IniLine::Kind::Other;
     }
-    const bool isMarked = data.startsWith(iniByteOrderMark);
-    IniSpan line = nextIniLine(data, isMarked ? int(qstrlen(iniByteOrderMark)) : 0);
-    while (line.start < line.end) {
-        if (data.at(line.start) == '[') {
-            const int end = data.indexOf(']', line.start);
-            if (end < 0 || end >= line.end) {
-                return line.start;
-            }
-        }
-        line = nextIniLine(data, line.end);
-    }
-    return -1;
+    return line;
 }

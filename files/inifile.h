@@ -15,39 +15,45 @@ constexpr qint64 maximumIniSize = qint64(1024) * 1024;
 constexpr const char *iniByteOrderMark = "\xef\xbb\xbf";
 
 /*
-    Whether QSettings may be let loose on what lies at the path. Of a pipe it waits for somebody to
-    write, and a value such as @Variant(...) it unpacks whatever is in there: a few bytes make it
-    ask for all memory, or nest until the stack is full, and end the process. A file of more than a
-    mebibyte is no settings file either.
+    Whether QSettings may read the file. It must never read a file with a value that it would unpack:
+    a few bytes of @Variant(...) or @DateTime(...) make it allocate all memory, or recurse until the
+    stack is full, and end the process. Nor may it open a pipe, which blocks. A file of more than a
+    mebibyte is no settings file.
 
-    True also where there is nothing, or nothing that may be opened: QSettings can tell.
+    True also if there is no such file, or if it cannot be opened: QSettings reports that.
 */
 bool isPlainIni(const QString &path);
 
 /*
-    Whether it is a plain settings file, or none, and each of its sections has a name that ends.
+    Whether the file is plain, and each of its sections has a name that ends.
 
-    QSettings has a status for the latter, but only where it has read the file: what it remembers of
-    an unchanged one it takes for good, so that the same file would be an error and then none.
+    QSettings has an error status for the latter, but only the first time that it reads the file:
+    an unchanged file comes from a cache, without the error.
 */
 bool isWellFormedIni(const QString &path);
 
-struct IniSpan {
-    int start;
-    int end;
+// A line of a settings file as QSettings reads it: quotes and backslashes may join several lines of
+// the text, and a semicolon ends one. Comments and empty lines are left out.
+struct IniLine {
+    enum class Kind {
+        None, // The end of the text.
+        Section,
+        Key,
+        Other, // Ignored by QSettings.
+    };
+
+    Kind kind = Kind::None;
+    int start = 0;
+    int end = 0;
+    // Where the name of a section or of a key ends.
+    int nameEnd = 0;
+    // Whether the name of a section ends on its line. If not, QSettings calls the file broken.
+    bool isClosed = true;
+    // Whether QSettings would unpack the value of a key, or an element of a list.
+    bool isPacked = false;
 };
 
-// The next line from a position, as QSettings parts the text of a settings file: quotes and
-// backslashes join what would be several, and a semicolon, which begins a comment, parts what would
-// be one. Empty at the end.
-IniSpan nextIniLine(const QByteArray &data, int position);
-
-// Where in the text of a settings file the first value is that QSettings would unpack; negative if
-// there is none.
-int findPackedValue(const QByteArray &data);
-
-// Where in the text of a settings file the first section begins whose name does not end on its line;
-// negative if there is none.
-int findBrokenSection(const QByteArray &data);
+// Starts at the end of the previous line, or at 0.
+IniLine nextIniLine(const QByteArray &text, int position);
 
 #endif

@@ -169,7 +169,7 @@ void TestAgreement::linesHaveTheKeysOfQSettings()
         }
         const QStringList keys = settings.allKeys();
         QStringList found;
-        for (const IniLine &line : readIniLines(content)) {
+        for (const NamedIniLine &line : readIniLines(content)) {
             if (line.kind == IniLine::Kind::Key && !found.contains(line.name)) {
                 found.append(line.name);
             }

@@ -456,6 +456,11 @@ void TestQuickAction::packedValues_data()
     QTest::newRow("backslashes for nothing") << "title=\\q@\\zVa\\wriant(" + huge.mid(9) + '\n';
     QTest::newRow("without a key, as the first byte") << '=' + huge + '\n';
     QTest::newRow("date and time") << QByteArray("title=@DateTime(\\0\\0\\0\\x10)\n");
+    QTest::newRow("at sign with upper bits") << "title=\\x10040" + huge.mid(1) + '\n';
+    QTest::newRow("behind a byte-order mark") << "\xef\xbb\xbf\ntitle=\xef\xbb\xbf" + huge + '\n';
+    QTest::newRow("quoted, in a list") << "title=\"a\", \"" + huge + "\"\n";
+    QTest::newRow("in a section without an end") << "[a\ntitle=" + huge + '\n';
+    QTest::newRow("repeated key") << "title=" + huge + "\ntitle=x\n";
 }
 
 // Each of these would end the process, or might.
@@ -478,6 +483,19 @@ void TestQuickAction::atSigns_data()
     QTest::newRow("alone") << QByteArray("@") << QStringLiteral("@");
     QTest::newRow("quote") << QByteArray("@\\\"Variant(\\\"") << QStringLiteral("@\"Variant(\"");
     QTest::newRow("escaped letter") << QByteArray("\\xe4iti") << QStringLiteral("\u00e4iti");
+    // QSettings unpacks none of these.
+    const QString name = QStringLiteral("x");
+    QTest::newRow("in a comment") << QByteArray("x\n; an example: x=@Variant(y)") << name;
+    QTest::newRow("behind a comma in quotes")
+        << QByteArray("\"Hello, @DateTime(now)\"") << QStringLiteral("Hello, @DateTime(now)");
+    QTest::newRow("behind an equals sign")
+        << QByteArray("see x=@Variant(y)") << QStringLiteral("see x=@Variant(y)");
+    QTest::newRow("behind a semicolon") << QByteArray("x;=@Variant(y)") << name;
+    QTest::newRow("in a line that is no key") << QByteArray("x\n@Variant(y)") << name;
+    QTest::newRow("in the name of a section") << QByteArray("x\n[@Variant(y)]") << name;
+    QTest::newRow("without an end") << QByteArray("@Variant(y") << QStringLiteral("@Variant(y");
+    QTest::newRow("with a blank behind the end")
+        << QByteArray("\"@Variant(y) \"") << QStringLiteral("@Variant(y) ");
 }
 
 void TestQuickAction::atSigns()

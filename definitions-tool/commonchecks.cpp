@@ -77,6 +77,7 @@ bool reportUnreadable(const QString &path, qint64 maximumSize, QByteArray *conte
         *content = file.content;
         return false;
     case RegularFile::State::NotOpened:
+    case RegularFile::State::Failed:
         text = QStringLiteral("the file cannot be opened");
         break;
     case RegularFile::State::NotRegular:

@@ -3,9 +3,8 @@
 
 #include "bluetoothinfo.h"
 
-#include "files/endlessfile.h"
+#include "files/regularfile.h"
 
-#include <QFile>
 #include <QtDebug>
 
 namespace {
@@ -39,17 +38,17 @@ BluetoothInfo::BluetoothInfo(QObject *parent) : QObject(parent)
 
     The address of the Bluetooth adapter in lower case, such as \c{00:1a:7d:da:71:13}: the first
     line of \c /var/lib/bluetooth/board-address, whatever it holds, read when the object is created.
-    Empty, with a warning, if the file cannot be read.
+    Empty, with a warning, if the file cannot be read or is larger than 16 MiB.
 */
 
 void BluetoothInfo::initAdapterAddress()
 {
-    QFile file(addressFile);
-    if (isEndless(addressFile) || !file.open(QIODevice::ReadOnly)) {
-        qWarning() << "Unable to open file:" << file.fileName();
+    const RegularFile file = readRegularFile(addressFile, maximumTextSize);
+    if (file.state != RegularFile::State::Read) {
+        qWarning() << "Unable to open file:" << QString(addressFile);
         return;
     }
-    // As a C string: what follows a NUL is no address.
-    const QByteArray line = file.readLine();
+    // Only the first line, and of that only what precedes a NUL.
+    const QByteArray line = file.content.mid(0, file.content.indexOf('\n'));
     m_adapterAddress = QString::fromLatin1(line.constData()).toLower().trimmed();
 }

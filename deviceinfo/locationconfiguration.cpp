@@ -3,9 +3,10 @@
 
 #include "locationconfiguration.h"
 
-#include "files/endlessfile.h"
+#include "files/regularfile.h"
 #include "mgconfitem.h"
 
+#include <QBuffer>
 #include <QFile>
 #include <QLocale>
 #include <QtDebug>
@@ -45,12 +46,14 @@ QString agreementText(QLatin1String base)
         qWarning() << "No agreement found for" << locale << ", falling back to english";
         path = base + englishSuffix;
     }
-    QFile file(path);
-    if (isEndless(path) || !file.open(QIODevice::ReadOnly | QIODevice::Text)) {
+    RegularFile file = readRegularFile(path, maximumTextSize);
+    if (file.state != RegularFile::State::Read) {
         return qtTrId("settings_location-la-no_agreement_text_found");
     }
-    // As a C string: the text ends at the first NUL.
-    return QString::fromUtf8(file.readAll().constData());
+    QBuffer text(&file.content);
+    text.open(QIODevice::ReadOnly | QIODevice::Text);
+    // The text ends at the first NUL.
+    return QString::fromUtf8(text.readAll().constData());
 }
 
 } // namespace
@@ -93,7 +96,7 @@ LocationConfiguration::LocationConfiguration(QObject *parent)
     The text that the user agrees to before HERE positioning is used: the file
     \c{/usr/share/libherepositioning/agreements/here_consent_<locale>.txt} of the default locale,
     such as \c fi_FI. Without such a file it is that of \c en_GB, with a warning, and if the file
-    cannot be opened the translation of \c settings_location-la-no_agreement_text_found. Read from
+    cannot be read or is larger than 16 MiB the translation of \c settings_location-la-no_agreement_text_found. Read from
     the file on every read.
 */
 QString LocationConfiguration::hereAgreementText() const

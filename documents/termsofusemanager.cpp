@@ -3,8 +3,9 @@
 
 #include "termsofusemanager.h"
 
-#include "files/endlessfile.h"
+#include "files/regularfile.h"
 
+#include <QBuffer>
 #include <QFile>
 #include <QtDebug>
 
@@ -58,14 +59,16 @@ QStringList readTerms(const QString &base, const QString &localeName)
                       "English terms";
         return {};
     }
-    QFile file(path);
-    if (isEndless(path) || !file.open(QIODevice::ReadOnly | QIODevice::Text)) {
+    RegularFile file = readRegularFile(path, maximumTextSize);
+    if (file.state != RegularFile::State::Read) {
         qWarning() << "TermsOfUseManager: unable to load terms from file" << path;
-        qWarning() << file.errorString();
+        qWarning() << file.error;
         return {};
     }
-    const QString title = toText(file.readLine());
-    const QString body = toText(file.readAll());
+    QBuffer text(&file.content);
+    text.open(QIODevice::ReadOnly | QIODevice::Text);
+    const QString title = toText(text.readLine());
+    const QString body = toText(text.readAll());
     return {title, body};
 }
 
@@ -82,7 +85,7 @@ QStringList readTerms(const QString &base, const QString &localeName)
     \c{en_GB.txt} or \c{en.txt}.
 
     The first line of a file is the title and everything after it the body, both without white space
-    around them.
+    around them. A file of more than 16 MiB counts as unreadable.
 
     \qml
     Label {

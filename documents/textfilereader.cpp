@@ -3,19 +3,32 @@
 
 #include "textfilereader.h"
 
-#include "files/endlessfile.h"
+#include "files/regularfile.h"
 
 #include <QDir>
-#include <QFile>
 #include <QTextStream>
 #include <QUrl>
 
 namespace {
 
-// Qt warns of paths like these, and takes what precedes a NUL for a path of its own.
-bool isPath(const QString &path)
+// The text of a file without its line breaks; null if the file cannot be read or is larger than
+// allowed. Subtracts its size from what is allowed.
+QString readText(const QString &path, qint64 *maximumSize)
 {
-    return !path.isEmpty() && !path.contains(QChar::Null);
+    const RegularFile file = readRegularFile(path, *maximumSize);
+    if (file.state != RegularFile::State::Read) {
+        return {};
+    }
+    *maximumSize -= file.content.size();
+    // Not null: an empty file is one that can be read.
+    QString content = QLatin1String("");
+    QTextStream stream(file.content);
+    QString line;
+    while (!(line = stream.readLine()).isNull()) {
+        // Nothing between the lines, on purpose: pages wrap the text to their own width.
+        content += line;
+    }
+    return content;
 }
 
 } // namespace
@@ -43,47 +56,38 @@ TextFileReader::TextFileReader(QObject *parent) : QObject(parent)
     \qmlmethod string TextFileReader::readContent(string filePath)
 
     Returns the text of the file \a filePath, a local path and no URL, without its line breaks: the
-    lines follow each other with nothing in between. The text is empty if the file cannot be opened,
-    as pipes, sockets and devices cannot; nothing is logged. It is read in the encoding of the
-    system's locale, or in the one that a byte-order mark tells.
+    lines follow each other with nothing in between. The text is empty if the file cannot be read, is
+    no regular file or is larger than 16 MiB; nothing is logged. The encoding is that of the system's
+    locale, unless a byte-order mark says otherwise.
 */
 QString TextFileReader::readContent(const QString &filePath) const
 {
-    QFile file(filePath);
-    if (!isPath(filePath) || isEndless(filePath) || !file.open(QIODevice::ReadOnly)) {
-        return {};
-    }
-    // Not null from the start: this file can be read, however little is in it.
-    QString content = QLatin1String("");
-    QTextStream stream(&file);
-    QString line;
-    while (!(line = stream.readLine()).isNull()) {
-        // Nothing between the lines, on purpose: pages wrap the text to their own width.
-        content += line;
-    }
-    return content;
+    qint64 maximumSize = maximumTextSize;
+    return readText(filePath, &maximumSize);
 }
 
 /*!
     \qmlmethod string TextFileReader::collate(url directory, string separator, string prefix)
 
-    Returns \a prefix and after it the texts of all files of the local folder \a directory, as
+    Returns \a prefix and after it the texts of all files of the local directory \a directory, as
     readContent() gives them, with \a separator between each two. The files are taken in the order
-    of their names, upper case before lower case; hidden files, folders and files without text are
-    left out. The text is empty if no file has any, or if \a directory is no local folder.
+    of their names, upper case before lower case. Left out are hidden files, directories, files without
+    text, and each file with which all would be larger than 16 MiB together. The text is empty if no
+    file has any, or if \a directory is no local directory.
 */
 QString TextFileReader::collate(const QUrl &directory, const QString &separator,
                                 const QString &prefix) const
 {
-    // Empty for what is no local file; and of no path at all QDir would make the current folder.
+    // Without a path QDir would list the current directory, and of a NUL Qt warns.
     const QString path = directory.toLocalFile();
-    if (!isPath(path)) {
+    if (path.isEmpty() || path.contains(QChar::Null)) {
         return {};
     }
     QStringList contents;
+    qint64 maximumSize = maximumTextSize;
     const QFileInfoList files = QDir(path).entryInfoList(QDir::Files, QDir::Name);
     for (const QFileInfo &file : files) {
-        const QString content = readContent(file.absoluteFilePath());
+        const QString content = readText(file.absoluteFilePath(), &maximumSize);
         if (!content.isEmpty()) {
             contents.append(content);
         }

@@ -5,23 +5,27 @@
 #define REGULARFILE_H
 
 #include <QByteArray>
+#include <QString>
 
-class QString;
+// The limit of texts that pages show: agreements, terms of use, licences.
+constexpr qint64 maximumTextSize = qint64(16) * 1024 * 1024;
 
 /*
-    What a file that somebody else put there holds, if it is one to be read: whatever has taken its
-    place, opening it waits for nobody, and no more than a given size is taken into memory.
+    The content of a file that somebody else has installed. Reading it neither blocks nor takes more
+    memory than allowed, whatever is there instead: a pipe, a device, a file without end.
 */
 struct RegularFile {
     enum class State {
         Read,
         NotOpened, // There is nothing, or nothing that may be opened.
-        NotRegular, // A folder, a pipe, a device.
+        NotRegular, // A directory, a pipe, a device.
+        Failed, // While it was read.
         TooLarge,
     };
 
     State state = State::NotOpened;
-    QByteArray content; // Once read.
+    QByteArray content; // Empty unless the file was read.
+    QString error; // Empty if the file was read.
 };
 
 RegularFile readRegularFile(const QString &path, qint64 maximumSize);

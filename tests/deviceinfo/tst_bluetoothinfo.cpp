@@ -110,6 +110,8 @@ void TestBluetoothInfo::warnsOfWhatCannotBeOpened_data()
     QTest::newRow("pipe") << Make([] { Files::makePipe(addressPath); });
     QTest::newRow("device") << Make(
         [] { Files::makeLink(QStringLiteral("/dev/zero"), addressPath); });
+    QTest::newRow("larger than memory")
+        << Make([] { Files::makeSparse(addressPath, qint64(1) << 40); });
 }
 
 void TestBluetoothInfo::warnsOfWhatCannotBeOpened()

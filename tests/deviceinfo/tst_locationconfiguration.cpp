@@ -4,6 +4,7 @@
 #include "dconftool.h"
 #include "deviceinfo/locationconfiguration.h"
 #include "files.h"
+#include "files/regularfile.h"
 #include "messagelog.h"
 #include "mgconfitem.h"
 
@@ -567,6 +568,11 @@ void TestLocationConfiguration::anAgreementThatCannotBeOpened()
     Files::remove(path);
     Files::makeLink(QStringLiteral("/dev/zero"), path);
     QCOMPARE(configuration.property(property).toString(), noTextId);
+    Files::remove(path);
+    Files::makeSparse(path, maximumTextSize + 1);
+    QCOMPARE(configuration.property(property).toString(), noTextId);
+    Files::makeSparse(path, maximumTextSize);
+    QCOMPARE(configuration.property(property).toString(), QString());
 }
 
 void TestLocationConfiguration::englishThatCannotBeOpened_data()

@@ -3,6 +3,7 @@
 
 #include "documents/termsofusemanager.h"
 #include "files.h"
+#include "files/regularfile.h"
 #include "messagelog.h"
 
 #include <QtTest>
@@ -313,10 +314,16 @@ void TestTermsOfUseManager::whatCannotBeOpened_data()
     QTest::newRow("folder") << Make([](const QString &path) { Files::makeFolder(path); })
                             << QStringLiteral("file to open is a directory");
     QTest::newRow("pipe") << Make([](const QString &path) { Files::makePipe(path); })
-                          << QStringLiteral("Unknown error");
+                          << QStringLiteral("file to open is no regular file");
     QTest::newRow("device") << Make([](const QString &path) {
         Files::makeLink(QStringLiteral("/dev/zero"), path);
-    }) << QStringLiteral("Unknown error");
+    }) << QStringLiteral("file to open is no regular file");
+    QTest::newRow("too large") << Make([](const QString &path) {
+        Files::makeSparse(path, maximumTextSize + 1);
+    }) << QStringLiteral("file to open is larger than 16777216 bytes");
+    QTest::newRow("larger than memory")
+        << Make([](const QString &path) { Files::makeSparse(path, qint64(1) << 40); })
+        << QStringLiteral("file to open is larger than 16777216 bytes");
 }
 
 void TestTermsOfUseManager::whatCannotBeOpened()

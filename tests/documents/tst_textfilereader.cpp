@@ -3,6 +3,7 @@
 
 #include "documents/textfilereader.h"
 #include "files.h"
+#include "files/regularfile.h"
 #include "messagelog.h"
 
 #include <QTemporaryDir>
@@ -27,6 +28,7 @@ private Q_SLOTS:
     void readContent();
     void readContentOfNothing_data();
     void readContentOfNothing();
+    void readContentOfLargeFiles();
     void readContentFollowsLinks();
     void readContentReadsOnEveryCall();
 
@@ -34,6 +36,7 @@ private Q_SLOTS:
     void collateSortsByCase();
     void collateTakesFilesOnly();
     void collateLeavesOutEmptyFiles();
+    void collateLeavesOutWhatIsTooLarge();
     void collateOfNothing();
     void collateOfNoLocalFolder_data();
     void collateOfNoLocalFolder();
@@ -152,6 +155,7 @@ void TestTextFileReader::readContentOfNothing_data()
     QTest::newRow("link to itself") << QStringLiteral("%1/loop");
     QTest::newRow("endless device") << QStringLiteral("/dev/zero");
     QTest::newRow("device") << QStringLiteral("/dev/null");
+    QTest::newRow("memory, which cannot be read") << QStringLiteral("/proc/self/mem");
     QTest::newRow("URL") << QStringLiteral("file://%1/file");
     QTest::newRow("NUL") << QStringLiteral("%1/file") + QChar(0) + QLatin1Char('x');
     QTest::newRow("NUL first") << QString(QChar(0)) + QStringLiteral("%1/file");
@@ -169,6 +173,18 @@ void TestTextFileReader::readContentOfNothing()
     const TextFileReader reader;
     name.replace(QStringLiteral("%1"), m_folder->path());
     QVERIFY(reader.readContent(name).isNull());
+}
+
+void TestTextFileReader::readContentOfLargeFiles()
+{
+    const TextFileReader reader;
+    Files::makeSparse(path("file"), maximumTextSize);
+    QCOMPARE(reader.readContent(path("file")).size(), int(maximumTextSize));
+    Files::makeSparse(path("file"), maximumTextSize + 1);
+    QVERIFY(reader.readContent(path("file")).isNull());
+    // More than memory has.
+    Files::makeSparse(path("file"), qint64(1) << 40);
+    QVERIFY(reader.readContent(path("file")).isNull());
 }
 
 void TestTextFileReader::readContentFollowsLinks()
@@ -235,6 +251,21 @@ void TestTextFileReader::collateLeavesOutEmptyFiles()
     Files::write(path("5"), "");
     const TextFileReader reader;
     QCOMPARE(reader.collate(folder(), comma, colon), QStringLiteral(":A, "));
+}
+
+void TestTextFileReader::collateLeavesOutWhatIsTooLarge()
+{
+    Files::write(path("1"), "A");
+    Files::makeSparse(path("2"), maximumTextSize);
+    Files::makeSparse(path("3"), maximumTextSize - 2);
+    Files::write(path("4"), "B");
+    Files::write(path("5"), "C");
+    const TextFileReader reader;
+    // The limit is one of all files together.
+    const QString text = reader.collate(folder(), comma, QString());
+    QCOMPARE(text.size(), int(maximumTextSize) + 2);
+    QVERIFY(text.startsWith(QStringLiteral("A,")));
+    QVERIFY(text.endsWith(QStringLiteral(",B")));
 }
 
 void TestTextFileReader::collateOfNothing()

@@ -65,6 +65,12 @@ void Files::makePipe(const QString &path)
     require(mkfifo(QFile::encodeName(path).constData(), 0600) == 0, "make", path);
 }
 
+void Files::makeSparse(const QString &path, qint64 size)
+{
+    write(path, {});
+    require(QFile::resize(path, size), "enlarge", path);
+}
+
 void Files::makeLink(const QString &target, const QString &path)
 {
     requireThrowAwayRoot(path);

@@ -18,6 +18,8 @@ void write(const QString &path, const QByteArray &content);
 void remove(const QString &path);
 void makeFolder(const QString &path);
 void makePipe(const QString &path);
+// Makes a file of a size, which takes no room on the disk.
+void makeSparse(const QString &path, qint64 size);
 void makeLink(const QString &target, const QString &path);
 
 // Installs a compiled catalog of tests/catalogs in /usr/share/translations, or removes it.

@@ -5,19 +5,19 @@
 #include "deviceinfo/locationconfiguration.h"
 #include "files.h"
 #include "files/regularfile.h"
-#include "messagelog.h"
+#include "interfaceof.h"
+#include "loggedtest.h"
 #include "mgconfitem.h"
 
 #include <QTranslator>
 #include <QtTest>
 
-class TestLocationConfiguration : public QObject
+class TestLocationConfiguration : public LoggedTest
 {
     Q_OBJECT
 
 private Q_SLOTS:
     void init();
-    void cleanup();
 
     void propertiesAndMethods();
     void hasTheSwitchesOfThePlatform();
@@ -58,8 +58,6 @@ private Q_SLOTS:
 private:
     void setSwitches(bool gps, bool mls, int mlsOnline, int here);
     void addAgreements();
-
-    std::unique_ptr<MessageLog> m_log;
 };
 
 using State = LocationSettings::OnlineAGpsState;
@@ -122,13 +120,7 @@ void TestLocationConfiguration::init()
         Files::remove(QString::fromLatin1(folder));
     }
     QLocale::setDefault(QLocale(QStringLiteral("fi_FI")));
-    m_log = std::make_unique<MessageLog>();
-}
-
-void TestLocationConfiguration::cleanup()
-{
-    QCOMPARE(m_log->takeReport(), QString());
-    m_log.reset();
+    LoggedTest::init();
 }
 
 void TestLocationConfiguration::setSwitches(bool gps, bool mls, int mlsOnline, int here)
@@ -142,34 +134,16 @@ void TestLocationConfiguration::setSwitches(bool gps, bool mls, int mlsOnline, i
 
 void TestLocationConfiguration::propertiesAndMethods()
 {
-    const QMetaObject &type = LocationConfiguration::staticMetaObject;
-    QCOMPARE(type.superClass()->className(), "LocationSettings");
-    QCOMPARE(type.propertyCount() - type.propertyOffset(), 3);
-    const QMetaProperty here = type.property(type.propertyOffset());
-    QCOMPARE(here.name(), "hereAgreementText");
-    const QMetaProperty mls = type.property(type.propertyOffset() + 1);
-    QCOMPARE(mls.name(), "mlsOnlineAgreementText");
-    for (const QMetaProperty &text : {here, mls}) {
-        QCOMPARE(text.userType(), int(QMetaType::QString));
-        QVERIFY(text.isConstant());
-        QVERIFY(!text.isWritable());
-        QVERIFY(!text.hasNotifySignal());
-    }
-    const QMetaProperty flag = type.property(type.propertyOffset() + 2);
-    QCOMPARE(flag.name(), "customSettingsEnabled");
-    QCOMPARE(flag.userType(), int(QMetaType::Bool));
-    QVERIFY(flag.isWritable());
-    QVERIFY(!flag.isConstant());
-
-    QList<QByteArray> methods;
-    for (int i = type.methodOffset(); i < type.methodCount(); ++i) {
-        methods.append(type.method(i).methodSignature());
-        QCOMPARE(type.method(i).returnType(), int(QMetaType::Void));
-    }
-    const QList<QByteArray> expected = {"customSettingsEnabledChanged()", "saveCustomSettings()",
-                                        "restoreCustomSettings()"};
-    QCOMPARE(methods, expected);
-    QCOMPARE(flag.notifySignal().methodSignature(), expected.constFirst());
+    QCOMPARE(LocationConfiguration::staticMetaObject.superClass()->className(), "LocationSettings");
+    const QStringList expected = {
+        QStringLiteral("QString hereAgreementText readonly constant"),
+        QStringLiteral("QString mlsOnlineAgreementText readonly constant"),
+        QStringLiteral("bool customSettingsEnabled customSettingsEnabledChanged()"),
+        QStringLiteral("signal void customSettingsEnabledChanged()"),
+        QStringLiteral("void saveCustomSettings()"),
+        QStringLiteral("void restoreCustomSettings()"),
+    };
+    QCOMPARE(interfaceOf(LocationConfiguration::staticMetaObject), expected);
 }
 
 void TestLocationConfiguration::hasTheSwitchesOfThePlatform()

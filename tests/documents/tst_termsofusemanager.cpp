@@ -4,17 +4,17 @@
 #include "documents/termsofusemanager.h"
 #include "files.h"
 #include "files/regularfile.h"
-#include "messagelog.h"
+#include "interfaceof.h"
+#include "loggedtest.h"
 
 #include <QtTest>
 
-class TestTermsOfUseManager : public QObject
+class TestTermsOfUseManager : public LoggedTest
 {
     Q_OBJECT
 
 private Q_SLOTS:
     void init();
-    void cleanup();
 
     void propertiesAndMethods();
     void vendorPath();
@@ -23,11 +23,6 @@ private Q_SLOTS:
 
     void findsTheBestFile_data();
     void findsTheBestFile();
-    void fallsBackToEnglish_data();
-    void fallsBackToEnglish();
-    void aDotAtTheBeginningEndsNoLocale();
-    void withoutEnglish_data();
-    void withoutEnglish();
 
     void readsTitleAndBody_data();
     void readsTitleAndBody();
@@ -37,9 +32,6 @@ private Q_SLOTS:
     void vendorTermsAndSummary();
     void vendorTermsWithoutAPath();
     void readsOnEveryCall();
-
-private:
-    std::unique_ptr<MessageLog> m_log;
 };
 
 using Make = void (*)(const QString &);
@@ -58,19 +50,6 @@ QString platformFile(const QString &locale)
     return platformFolder + QStringLiteral("/tarnwick_termsofuse-%1.txt").arg(locale);
 }
 
-// Each file's title is its locale.
-void installPlatformTerms(const QStringList &locales)
-{
-    for (const QString &locale : locales) {
-        Files::write(platformFile(locale), locale.toUtf8() + "\nbody");
-    }
-}
-
-QStringList split(const char *names)
-{
-    return QString::fromLatin1(names).split(QLatin1Char(' '), Qt::SkipEmptyParts);
-}
-
 QString noLocalTerms(const QString &locale)
 {
     return QStringLiteral("warning [default] TermsOfUseManager: unable to load locale-specific "
@@ -84,39 +63,20 @@ void TestTermsOfUseManager::init()
 {
     Files::remove(platformFolder);
     Files::remove(vendorFolder);
-    m_log = std::make_unique<MessageLog>();
-}
-
-void TestTermsOfUseManager::cleanup()
-{
-    QCOMPARE(m_log->takeReport(), QString());
-    m_log.reset();
+    LoggedTest::init();
 }
 
 void TestTermsOfUseManager::propertiesAndMethods()
 {
-    const QMetaObject &type = TermsOfUseManager::staticMetaObject;
-    QCOMPARE(type.propertyCount() - type.propertyOffset(), 2);
-    const QMetaProperty has = type.property(type.propertyOffset());
-    QCOMPARE(has.name(), "hasVendorTermsOfUse");
-    QCOMPARE(has.userType(), int(QMetaType::Bool));
-    QVERIFY(!has.isWritable());
-    QCOMPARE(has.notifySignal().methodSignature(), QByteArray("vendorPathChanged()"));
-    const QMetaProperty path = type.property(type.propertyOffset() + 1);
-    QCOMPARE(path.name(), "vendorPath");
-    QCOMPARE(path.userType(), int(QMetaType::QString));
-    QVERIFY(path.isWritable());
-    QCOMPARE(path.notifySignal().methodSignature(), QByteArray("vendorPathChanged()"));
-
-    QList<QByteArray> methods;
-    for (int i = type.methodOffset(); i < type.methodCount(); ++i) {
-        methods.append(type.method(i).methodSignature());
-        QCOMPARE(type.method(i).returnType(),
-                 i == type.methodOffset() ? int(QMetaType::Void) : int(QMetaType::QStringList));
-    }
-    const QList<QByteArray> expected = {"vendorPathChanged()", "platformTermsOfUse(QString)",
-                                        "vendorTermsOfUse(QString)", "vendorTermsSummary(QString)"};
-    QCOMPARE(methods, expected);
+    const QStringList expected = {
+        QStringLiteral("bool hasVendorTermsOfUse readonly vendorPathChanged()"),
+        QStringLiteral("QString vendorPath vendorPathChanged()"),
+        QStringLiteral("signal void vendorPathChanged()"),
+        QStringLiteral("QStringList platformTermsOfUse(QString)"),
+        QStringLiteral("QStringList vendorTermsOfUse(QString)"),
+        QStringLiteral("QStringList vendorTermsSummary(QString)"),
+    };
+    QCOMPARE(interfaceOf(TermsOfUseManager::staticMetaObject), expected);
 }
 
 void TestTermsOfUseManager::vendorPath()
@@ -167,29 +127,46 @@ void TestTermsOfUseManager::findsTheBestFile_data()
     QTest::addColumn<QString>("locale");
     QTest::addColumn<QStringList>("files");
     QTest::addColumn<QString>("found");
+    QTest::addColumn<bool>("isWarned");
 
-    const auto row = [](const char *locale, const char *files, const char *found) {
-        QTest::newRow(
-            qPrintable(QStringLiteral("%1 of %2").arg(QLatin1String(locale), QLatin1String(files))))
-            << QString::fromLatin1(locale) << split(files) << QString::fromLatin1(found);
+    const auto row = [](const char *locale, const char *files, const char *found, bool isWarned) {
+        QTest::addRow("%s of %s", locale, files)
+            << QString::fromLatin1(locale) << QString::fromLatin1(files).split(QLatin1Char(','))
+            << QString::fromLatin1(found) << isWarned;
     };
-    row("fi_FI.UTF-8", "fi_FI.UTF-8 fi fi_FI en_GB", "fi_FI.UTF-8");
-    row("fi_FI.UTF-8", "fi fi_FI en_GB", "fi"); // the language alone comes first, on purpose
-    row("fi_FI.UTF-8", "fi", "fi");
-    row("fi_FI.UTF-8", "fi_FI en_GB", "fi_FI");
-    row("C.UTF-8", "C en_GB", "C");
-    row("fi_FI", "fi_FI fi en_GB", "fi_FI");
-    row("fi_FI", "fi en_GB", "fi");
-    row("fi", "fi en_GB", "fi");
-    row("fil_PH", "fi fil en_GB", "fi"); // the first two characters, whatever they are
-    row("fil_PH.UTF-8", "fil_PH en_GB", "fil_PH");
-    row("sr_RS.UTF-8@latin", "sr_RS en_GB", "sr_RS");
-    row("sr_RS.a.b", "sr_RS.a sr_RS", "sr_RS");
-    row("x", "x en_GB", "x");
-    row("en_GB", "en_GB en", "en_GB");
-    row("en_GB", "en", "en");
-    row("en_US", "en en_GB", "en");
-    row("en_GB.UTF-8", "en_GB", "en_GB");
+    row("fi_FI.UTF-8", "fi_FI.UTF-8,fi,fi_FI,en_GB", "fi_FI.UTF-8", false);
+    row("fi_FI.UTF-8", "fi,fi_FI,en_GB", "fi", false); // the language alone comes first, on purpose
+    row("fi_FI.UTF-8", "fi", "fi", false);
+    row("fi_FI.UTF-8", "fi_FI,en_GB", "fi_FI", false);
+    row("C.UTF-8", "C,en_GB", "C", false);
+    row("fi_FI", "fi_FI,fi,en_GB", "fi_FI", false);
+    row("fi_FI", "fi,en_GB", "fi", false);
+    row("fi", "fi,en_GB", "fi", false);
+    row("fil_PH", "fi,fil,en_GB", "fi", false); // the first two characters, whatever they are
+    row("fil_PH.UTF-8", "fil_PH,en_GB", "fil_PH", false);
+    row("sr_RS.UTF-8@latin", "sr_RS,en_GB", "sr_RS", false);
+    row("sr_RS.a.b", "sr_RS.a,sr_RS", "sr_RS", false);
+    row("x", "x,en_GB", "x", false);
+    row("en_GB", "en_GB,en", "en_GB", false);
+    row("en_GB", "en", "en", false);
+    row("en_US", "en,en_GB", "en", false);
+    row("en_GB.UTF-8", "en_GB", "en_GB", false);
+    // English, with a warning.
+    row("de_DE", "en_GB", "en_GB", true);
+    row("de_DE", "en", "en", true);
+    row("de_DE", "en_GB,en,fi,de_AT", "en_GB", true);
+    row("de_DE.UTF-8", "en_GB", "en_GB", true);
+    // Without an encoding, language and country are looked for only as the whole name.
+    row("de_DE@euro", "de_DE,en_GB", "en_GB", true);
+    row(".UTF-8", "en_GB", "en_GB", true);
+    row(".UTF-8", ",en_GB", "en_GB", true); // a dot at the beginning ends no locale
+    row("", "en_GB", "en_GB", true);
+    row("d", "de,en_GB", "en_GB", true);
+    row("../de", "de,en_GB", "en_GB", true);
+    // Nothing, not even in English.
+    row("de_DE", "fi,en_US,de_AT", "", true);
+    row("en_GB.UTF-8", "fi,en_US,de_AT", "", true);
+    row("en_GB", "fi,en_US,de_AT", "", false);
 }
 
 void TestTermsOfUseManager::findsTheBestFile()
@@ -197,75 +174,21 @@ void TestTermsOfUseManager::findsTheBestFile()
     QFETCH(QString, locale);
     QFETCH(QStringList, files);
     QFETCH(QString, found);
-    installPlatformTerms(files);
-    const TermsOfUseManager manager;
-    QCOMPARE(manager.platformTermsOfUse(locale), QStringList({found, QStringLiteral("body")}));
-}
-
-void TestTermsOfUseManager::fallsBackToEnglish_data()
-{
-    QTest::addColumn<QString>("locale");
-    QTest::addColumn<QStringList>("files");
-    QTest::addColumn<QString>("found");
-
-    const auto row = [](const char *locale, const char *files, const char *found) {
-        QTest::newRow(
-            qPrintable(QStringLiteral("%1 of %2").arg(QLatin1String(locale), QLatin1String(files))))
-            << QString::fromLatin1(locale) << split(files) << QString::fromLatin1(found);
-    };
-    row("de_DE", "en_GB", "en_GB");
-    row("de_DE", "en", "en");
-    row("de_DE", "en_GB en fi de_AT", "en_GB");
-    row("de_DE.UTF-8", "en_GB", "en_GB");
-    // Without an encoding, language and country are looked for only as the whole name.
-    row("de_DE@euro", "de_DE en_GB", "en_GB");
-    row(".UTF-8", "en_GB", "en_GB");
-    row("", "en_GB", "en_GB");
-    row("d", "de en_GB", "en_GB");
-    row("../de", "de en_GB", "en_GB");
-}
-
-void TestTermsOfUseManager::fallsBackToEnglish()
-{
-    QFETCH(QString, locale);
-    QFETCH(QStringList, files);
-    QFETCH(QString, found);
-    installPlatformTerms(files);
-    const TermsOfUseManager manager;
-    QCOMPARE(manager.platformTermsOfUse(locale), QStringList({found, QStringLiteral("body")}));
-    QCOMPARE(m_log->takeReport(), noLocalTerms(locale));
-}
-
-void TestTermsOfUseManager::aDotAtTheBeginningEndsNoLocale()
-{
-    installPlatformTerms({QString(), QStringLiteral("en_GB")});
-    const TermsOfUseManager manager;
-    const QString locale = QStringLiteral(".UTF-8");
-    QCOMPARE(manager.platformTermsOfUse(locale),
-             QStringList({QStringLiteral("en_GB"), QStringLiteral("body")}));
-    QCOMPARE(m_log->takeReport(), noLocalTerms(locale));
-}
-
-void TestTermsOfUseManager::withoutEnglish_data()
-{
-    QTest::addColumn<QString>("locale");
-    QTest::addColumn<QString>("warnings");
-    const QString de = QStringLiteral("de_DE");
-    const QString enUtf8 = QStringLiteral("en_GB.UTF-8");
-    const QString en = QStringLiteral("en_GB");
-    QTest::newRow("de_DE") << de << noLocalTerms(de) + QLatin1Char('\n') + noTerms;
-    QTest::newRow("en_GB.UTF-8") << enUtf8 << noLocalTerms(enUtf8) + QLatin1Char('\n') + noTerms;
-    QTest::newRow("en_GB") << en << noTerms;
-}
-
-void TestTermsOfUseManager::withoutEnglish()
-{
-    QFETCH(QString, locale);
-    QFETCH(QString, warnings);
-    installPlatformTerms({QStringLiteral("fi"), QStringLiteral("en_US"), QStringLiteral("de_AT")});
-    const TermsOfUseManager manager;
-    QCOMPARE(manager.platformTermsOfUse(locale), QStringList());
-    QCOMPARE(m_log->takeReport(), warnings);
+    QFETCH(bool, isWarned);
+    // The title of each file is its locale.
+    for (const QString &file : files) {
+        Files::write(platformFile(file), file.toUtf8() + "\nbody");
+    }
+    const QStringList terms = TermsOfUseManager().platformTermsOfUse(locale);
+    QCOMPARE(terms, found.isEmpty() ? QStringList() : QStringList({found, QStringLiteral("body")}));
+    QStringList warnings;
+    if (isWarned) {
+        warnings.append(noLocalTerms(locale));
+    }
+    if (found.isEmpty()) {
+        warnings.append(noTerms);
+    }
+    QCOMPARE(m_log->takeReport(), warnings.join(QLatin1Char('\n')));
 }
 
 void TestTermsOfUseManager::readsTitleAndBody_data()
@@ -331,7 +254,8 @@ void TestTermsOfUseManager::whatCannotBeOpened()
     QFETCH(Make, make);
     QFETCH(QString, error);
     // It exists, and so nothing else is tried.
-    installPlatformTerms({QStringLiteral("fi"), QStringLiteral("en_GB")});
+    Files::write(platformFile(QStringLiteral("fi")), "fi\nbody");
+    Files::write(platformFile(QStringLiteral("en_GB")), "en_GB\nbody");
     const QString path = platformFile(QStringLiteral("fi_FI"));
     make(path);
     const TermsOfUseManager manager;
@@ -346,7 +270,7 @@ void TestTermsOfUseManager::whatCannotBeOpened()
 
 void TestTermsOfUseManager::vendorTermsAndSummary()
 {
-    installPlatformTerms({QStringLiteral("fi"), QStringLiteral("en_GB")});
+    Files::write(platformFile(QStringLiteral("fi")), "fi\nbody");
     Files::write(vendorFolder + QStringLiteral("/full/fi.txt"), "Full\nfull body\n");
     Files::write(vendorFolder + QStringLiteral("/full/en_GB.txt"), "English\n");
     Files::write(vendorFolder + QStringLiteral("/summary/fi.txt"), "Summary\nsummary body\n");

@@ -4,7 +4,8 @@
 #include "documents/textfilereader.h"
 #include "files.h"
 #include "files/regularfile.h"
-#include "messagelog.h"
+#include "interfaceof.h"
+#include "loggedtest.h"
 
 #include <QTemporaryDir>
 #include <QtTest>
@@ -14,7 +15,7 @@
 
 #include <unistd.h>
 
-class TestTextFileReader : public QObject
+class TestTextFileReader : public LoggedTest
 {
     Q_OBJECT
 
@@ -47,7 +48,6 @@ private:
     QString path(const char *name) const;
     QUrl folder() const { return QUrl::fromLocalFile(m_folder->path()); }
 
-    std::unique_ptr<MessageLog> m_log;
     std::unique_ptr<QTemporaryDir> m_folder;
 };
 
@@ -79,27 +79,22 @@ void TestTextFileReader::init()
 {
     m_folder = std::make_unique<QTemporaryDir>();
     QVERIFY(m_folder->isValid());
-    m_log = std::make_unique<MessageLog>();
+    LoggedTest::init();
 }
 
 void TestTextFileReader::cleanup()
 {
-    QCOMPARE(m_log->takeReport(), QString());
-    m_log.reset();
+    LoggedTest::cleanup();
     m_folder.reset();
 }
 
 void TestTextFileReader::hasTwoMethods()
 {
-    const QMetaObject &type = TextFileReader::staticMetaObject;
-    QCOMPARE(type.propertyCount() - type.propertyOffset(), 0);
-    QList<QByteArray> methods;
-    for (int i = type.methodOffset(); i < type.methodCount(); ++i) {
-        methods.append(type.method(i).methodSignature());
-        QCOMPARE(type.method(i).returnType(), int(QMetaType::QString));
-    }
-    const QList<QByteArray> expected = {"readContent(QString)", "collate(QUrl,QString,QString)"};
-    QCOMPARE(methods, expected);
+    const QStringList expected = {
+        QStringLiteral("QString readContent(QString)"),
+        QStringLiteral("QString collate(QUrl,QString,QString)"),
+    };
+    QCOMPARE(interfaceOf(TextFileReader::staticMetaObject), expected);
 }
 
 void TestTextFileReader::readContent_data()

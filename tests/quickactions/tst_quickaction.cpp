@@ -4,7 +4,7 @@
 // The reader of definition files and the calls that they describe.
 
 #include "files.h"
-#include "messagelog.h"
+#include "loggedtest.h"
 #include "quickactions/quickaction.h"
 #include "simulator/recordingservice.h"
 #include "usedupdescriptors.h"
@@ -16,7 +16,7 @@
 using Action = QuickAction;
 using Answer = RecordingService::Answer;
 
-class TestQuickAction : public QObject
+class TestQuickAction : public LoggedTest
 {
     Q_OBJECT
 
@@ -64,13 +64,12 @@ private Q_SLOTS:
     void refusesBeforeSending();
     void valuesMayLookLikePlaceholders();
     void mostArgumentsThatCanBeSent();
-    void deliversTheReply();
     void deliversTheError();
 
 private:
     QString write(const QByteArray &content) const;
+    QDBusMessage send(const QByteArray &content) const;
 
-    std::unique_ptr<MessageLog> m_log;
     QString m_path;
 };
 
@@ -118,6 +117,26 @@ QString TestQuickAction::write(const QByteArray &content) const
     return m_path;
 }
 
+// The one call that a definition sends. Sending does not wait for the reply.
+QDBusMessage TestQuickAction::send(const QByteArray &content) const
+{
+    const RecordingService lamp(QDBusConnection::SessionBus, QStringLiteral("org.example.lamp"));
+    write(content);
+    Receiver receiver;
+    const bool isSent =
+        Action(m_path, true)
+            .trigger(&receiver, SLOT(reply()), SLOT(error(QDBusError, QDBusMessage)));
+    const auto compare = [&] {
+        QVERIFY(isSent);
+        QCOMPARE(lamp.calls().size(), 0);
+        QTRY_COMPARE(receiver.replies, 1);
+        QCOMPARE(lamp.calls().size(), 1);
+        QCOMPARE(receiver.errors.size(), 0);
+    };
+    compare();
+    return lamp.calls().value(0);
+}
+
 void TestQuickAction::init()
 {
     // A name for each row of test data: QSettings remembers a file by its name, size and time, and
@@ -126,13 +145,12 @@ void TestQuickAction::init()
     m_path = QStringLiteral("/usr/share/glimmera/quickactions/%1.conf").arg(++count);
     Files::makeFolder(QFileInfo(m_path).path());
     Files::remove(m_path);
-    m_log = std::make_unique<MessageLog>();
+    LoggedTest::init();
 }
 
 void TestQuickAction::cleanup()
 {
-    QCOMPARE(m_log->takeReport(), QString());
-    m_log.reset();
+    LoggedTest::cleanup();
     Files::remove(m_path);
 }
 
@@ -566,15 +584,7 @@ void TestQuickAction::copies()
 
 void TestQuickAction::sendsTheCall()
 {
-    RecordingService lamp(QDBusConnection::SessionBus, QStringLiteral("org.example.lamp"));
-    write(lampCall + arguments(2));
-    Receiver receiver;
-    QVERIFY(Action(m_path, true).trigger(&receiver, SLOT(reply()), nullptr));
-    QCOMPARE(lamp.calls().size(), 0); // nobody waited
-
-    QTRY_COMPARE(receiver.replies, 1);
-    QCOMPARE(lamp.calls().size(), 1);
-    const QDBusMessage call = lamp.calls().constFirst();
+    const QDBusMessage call = send(lampCall + arguments(2));
     QCOMPARE(call.type(), QDBusMessage::MethodCallMessage);
     QCOMPARE(call.path(), QStringLiteral("/lamp"));
     QCOMPARE(call.interface(), QStringLiteral("org.example.Lamp"));
@@ -586,15 +596,10 @@ void TestQuickAction::sendsTheCall()
 
 void TestQuickAction::argumentsStayAsRead()
 {
-    RecordingService lamp(QDBusConnection::SessionBus, QStringLiteral("org.example.lamp"));
-    write(lampCall
-          + "[remote-arguments]\nsize=4\n1\\argument=1\n2\\argument=true\n3\\argument=a, b\n"
-            "4\\argument=me, @home\n");
-    Receiver receiver;
-    QVERIFY(Action(m_path, true).trigger(&receiver, SLOT(reply()), nullptr));
-    QTRY_COMPARE(receiver.replies, 1);
-    QCOMPARE(lamp.calls().size(), 1);
-    const QDBusMessage call = lamp.calls().constFirst();
+    const QDBusMessage call =
+        send(lampCall
+             + "[remote-arguments]\nsize=4\n1\\argument=1\n2\\argument=true\n3\\argument=a, b\n"
+               "4\\argument=me, @home\n");
     QCOMPARE(call.signature(), QStringLiteral("ssasas"));
     QCOMPARE(call.arguments(),
              (QVariantList{QStringLiteral("1"), QStringLiteral("true"),
@@ -613,90 +618,71 @@ void TestQuickAction::noArguments_data()
 void TestQuickAction::noArguments()
 {
     QFETCH(QByteArray, section);
-    RecordingService lamp(QDBusConnection::SessionBus, QStringLiteral("org.example.lamp"));
-    write(lampCall + section);
-    Receiver receiver;
-    QVERIFY(Action(m_path, true).trigger(&receiver, SLOT(reply()), nullptr));
-    QTRY_COMPARE(receiver.replies, 1);
-    QCOMPARE(lamp.calls().size(), 1);
-    QCOMPARE(lamp.calls().constFirst().signature(), QString());
+    const QDBusMessage call = send(lampCall + section);
+    QCOMPARE(call.type(), QDBusMessage::MethodCallMessage);
+    QCOMPARE(call.signature(), QString());
 }
 
 void TestQuickAction::refusesBeforeSending_data()
 {
     QTest::addColumn<QByteArray>("content");
-    QTest::addColumn<QString>("expected");
+    QTest::addColumn<QString>("call"); // as in the warning
+    QTest::addColumn<QString>("error");
 
-    const QString lamp = QStringLiteral("service=org.example.lamp path=/lamp "
-                                        "interface=org.example.Lamp method=toggle. Error was: ");
-    QTest::newRow("no service")
-        << QByteArray(
-               "remote-path=/lamp\nremote-interface=org.example.Lamp\nremote-method=toggle\n")
-        << QStringLiteral(
-               "service= path=/lamp interface=org.example.Lamp method=toggle. Error was: "
-               "org.qtproject.QtDBus.Error.InvalidService The call names no service %6");
+    const auto row = [](const char *name, const QByteArray &content, const char *call,
+                        const char *error) {
+        QTest::newRow(name) << content << QString::fromLatin1(call) << QString::fromLatin1(error);
+    };
+    row("no service", lampCall + "remote-service=\n",
+        "service= path=/lamp interface=org.example.Lamp method=toggle",
+        "org.qtproject.QtDBus.Error.InvalidService The call names no service");
+    row("empty file", "", "service= path= interface= method=",
+        "org.qtproject.QtDBus.Error.InvalidService The call names no service");
     // These would end the process, or the connection to the bus.
-    QTest::newRow("service of one word")
-        << QByteArray("remote-service=lamp\nremote-path=/lamp\n"
-                      "remote-interface=org.example.Lamp\nremote-method=toggle\n")
-        << QStringLiteral(
-               "service=lamp path=/lamp interface=org.example.Lamp method=toggle. Error was: "
-               "org.qtproject.QtDBus.Error.InvalidService The service is no bus name %6");
-    QTest::newRow("reserved path")
-        << lampCall + "remote-path=/org/freedesktop/DBus/Local\n"
-        << QStringLiteral("service=org.example.lamp path=/org/freedesktop/DBus/Local "
-                          "interface=org.example.Lamp method=toggle. Error was: "
-                          "org.qtproject.QtDBus.Error.InvalidObjectPath The path is reserved %6");
-    QTest::newRow("reserved interface")
-        << lampCall + "remote-interface=org.freedesktop.DBus.Local\n"
-        << QStringLiteral(
-               "service=org.example.lamp path=/lamp "
-               "interface=org.freedesktop.DBus.Local method=toggle. Error was: "
-               "org.qtproject.QtDBus.Error.InvalidInterface The interface is reserved %6");
-    QTest::newRow("no method")
-        << QByteArray("remote-service=org.example.lamp\nremote-path=/lamp\n"
-                      "remote-interface=org.example.Lamp\n")
-        << QStringLiteral(
-               "service=org.example.lamp path=/lamp interface=org.example.Lamp method=. Error was: "
-               "org.qtproject.QtDBus.Error.InvalidMember The call names no method %6");
-    QTest::newRow("empty file")
-        << QByteArray()
-        << QStringLiteral("service= path= interface= method=. Error was: "
-                          "org.qtproject.QtDBus.Error.InvalidService The call names no service %6");
-    QTest::newRow("too many arguments") << lampCall + arguments(256)
-                                        << lamp
-            + QStringLiteral("org.freedesktop.DBus.Error.InvalidArgs "
-                             "The call has too many arguments %6");
-    QTest::newRow("too long a signature")
-        << lampCall + arguments(254) + "255\\argument=a, b\nsize=255\n"
-        << lamp
-            + QStringLiteral("org.freedesktop.DBus.Error.InvalidArgs "
-                             "The call has too many arguments %6");
-    QTest::newRow("argument of another type")
-        << lampCall + "[remote-arguments]\nsize=1\n1\\argument=@Rect(1 2 3 4)\n"
-        << lamp
-            + QStringLiteral("org.freedesktop.DBus.Error.InvalidArgs "
-                             "An argument is no text %6");
-    QTest::newRow("missing argument") << lampCall + "[remote-arguments]\nsize=1\n"
-                                      << lamp
-            + QStringLiteral("org.freedesktop.DBus.Error.InvalidArgs "
-                             "An argument is no text %6");
+    row("service of one word", lampCall + "remote-service=lamp\n",
+        "service=lamp path=/lamp interface=org.example.Lamp method=toggle",
+        "org.qtproject.QtDBus.Error.InvalidService The service is no bus name");
+    row("reserved path", lampCall + "remote-path=/org/freedesktop/DBus/Local\n",
+        "service=org.example.lamp path=/org/freedesktop/DBus/Local interface=org.example.Lamp "
+        "method=toggle",
+        "org.qtproject.QtDBus.Error.InvalidObjectPath The path is reserved");
+    row("reserved interface", lampCall + "remote-interface=org.freedesktop.DBus.Local\n",
+        "service=org.example.lamp path=/lamp interface=org.freedesktop.DBus.Local method=toggle",
+        "org.qtproject.QtDBus.Error.InvalidInterface The interface is reserved");
+    row("no method", lampCall + "remote-method=\n",
+        "service=org.example.lamp path=/lamp interface=org.example.Lamp method=",
+        "org.qtproject.QtDBus.Error.InvalidMember The call names no method");
+
+    const char *lamp =
+        "service=org.example.lamp path=/lamp interface=org.example.Lamp method=toggle";
+    const char *tooMany = "org.freedesktop.DBus.Error.InvalidArgs The call has too many arguments";
+    const char *noText = "org.freedesktop.DBus.Error.InvalidArgs An argument is no text";
+    row("too many arguments", lampCall + arguments(256), lamp, tooMany);
+    row("too long a signature", lampCall + arguments(254) + "255\\argument=a, b\nsize=255\n", lamp,
+        tooMany);
+    row("argument of another type",
+        lampCall + "[remote-arguments]\nsize=1\n1\\argument=@Rect(1 2 3 4)\n", lamp, noText);
+    row("list with another type",
+        lampCall + "[remote-arguments]\nsize=1\n1\\argument=me, @Rect(1 2 3 4)\n", lamp, noText);
+    row("missing argument", lampCall + "[remote-arguments]\nsize=1\n", lamp, noText);
 }
 
 void TestQuickAction::refusesBeforeSending()
 {
     QFETCH(QByteArray, content);
-    QFETCH(QString, expected);
-    RecordingService lamp(QDBusConnection::SessionBus, QStringLiteral("org.example.lamp"));
+    QFETCH(QString, call);
+    QFETCH(QString, error);
+    const RecordingService lamp(QDBusConnection::SessionBus, QStringLiteral("org.example.lamp"));
     write(content);
     Receiver receiver;
     QVERIFY(
         !Action(m_path, true).trigger(&receiver, nullptr, SLOT(error(QDBusError, QDBusMessage))));
-    // Said once, on the channel of the receiver; nothing goes out and nothing comes later.
-    QCOMPARE(m_log->takeReport(),
-             QStringLiteral("info [default] <Unknown File>: QML Receiver: "
-                            "Failed to initialize dbus call to: ")
-                 + expected);
+    // Reported once, on the channel of the receiver; nothing is sent and nothing comes later.
+    QCOMPARE(
+        m_log->takeReport(),
+        QStringLiteral("info [default] <Unknown File>: QML Receiver: Failed to initialize dbus "
+                       "call to: ")
+            + call + QStringLiteral(". Error was: ") + error + QStringLiteral(" %6"));
     QTest::qWait(50);
     QCOMPARE(lamp.calls().size(), 0);
     QCOMPARE(receiver.errors.size(), 0);
@@ -714,24 +700,7 @@ void TestQuickAction::valuesMayLookLikePlaceholders()
 
 void TestQuickAction::mostArgumentsThatCanBeSent()
 {
-    RecordingService lamp(QDBusConnection::SessionBus, QStringLiteral("org.example.lamp"));
-    write(lampCall + arguments(255));
-    Receiver receiver;
-    QVERIFY(Action(m_path, true).trigger(&receiver, SLOT(reply()), nullptr));
-    QTRY_COMPARE(receiver.replies, 1);
-    QCOMPARE(lamp.calls().size(), 1);
-    QCOMPARE(lamp.calls().constFirst().arguments().size(), 255);
-}
-
-void TestQuickAction::deliversTheReply()
-{
-    RecordingService lamp(QDBusConnection::SessionBus, QStringLiteral("org.example.lamp"));
-    write(lampCall);
-    Receiver receiver;
-    QVERIFY(Action(m_path, true)
-                .trigger(&receiver, SLOT(reply()), SLOT(error(QDBusError, QDBusMessage))));
-    QTRY_COMPARE(receiver.replies, 1);
-    QCOMPARE(receiver.errors.size(), 0);
+    QCOMPARE(send(lampCall + arguments(255)).arguments().size(), 255);
 }
 
 void TestQuickAction::deliversTheError()

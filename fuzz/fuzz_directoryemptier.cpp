@@ -272,12 +272,11 @@ private:
                                       int flags) {
             return happens() ? -1 : real.fstatat(directory, name, info, flags);
         };
-        hooks.getdents64 = [this, &real](int directory, void *buffer, size_t size) -> ssize_t {
+        hooks.readdir = [this, &real](DIR *directory) -> dirent * {
             if (happens()) {
-                return -1;
+                return nullptr;
             }
-            return disguise(static_cast<char *>(buffer), real.getdents64(directory, buffer, size),
-                            size);
+            return disguise(real.readdir(directory));
         };
     }
 
@@ -361,25 +360,19 @@ private:
         }
     }
 
-    // File systems need not tell what an entry is, and bad ones list anything.
-    ssize_t disguise(char *buffer, ssize_t filled, size_t size)
+    // File systems need not say what an entry is, and broken ones list anything.
+    dirent *disguise(dirent *entry)
     {
-        for (ssize_t at = 0; m_untyped && at < filled;) {
-            auto *const record = reinterpret_cast<dirent64 *>(buffer + at);
-            record->d_type = DT_UNKNOWN;
-            at += record->d_reclen;
+        if (entry && m_untyped) {
+            entry->d_type = DT_UNKNOWN;
         }
-        constexpr size_t length = 48;
-        if (m_listed != nullptr && filled > 0 && size_t(filled) + length <= size) {
-            auto *const record = reinterpret_cast<dirent64 *>(buffer + filled);
-            std::memset(buffer + filled, 0, length);
-            record->d_reclen = length;
-            record->d_type = m_calls % 2 == 0 ? DT_DIR : m_calls % 3 == 0 ? DT_REG : DT_UNKNOWN;
-            std::strcpy(record->d_name, m_listed);
+        if (entry && m_listed != nullptr) {
+            // In place of the real entry, which is then not removed.
+            entry->d_type = m_calls % 2 == 0 ? DT_DIR : m_calls % 3 == 0 ? DT_REG : DT_UNKNOWN;
+            std::strcpy(entry->d_name, m_listed);
             m_listed = nullptr;
-            filled += ssize_t(length);
         }
-        return filled;
+        return entry;
     }
 
     Bytes m_input;

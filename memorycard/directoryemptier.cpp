@@ -6,7 +6,6 @@
 #include "filedescriptor.h"
 
 #include <algorithm>
-#include <array>
 #include <cstring>
 #include <deque>
 #include <memory>
@@ -19,38 +18,56 @@
 
 namespace {
 
-// Besides the folder to empty and the one being opened. A process has 1024 descriptors at least,
-// and few trees on a card are half as deep.
-constexpr std::size_t maxOpenFolders = 55;
+// Besides the directory to empty and the one being opened. A process may have 1024 descriptors at
+// least, and few trees on a card are half as deep.
+constexpr std::size_t maxOpenDirectories = 55;
 
-// The size that the C library reads folders with; larger ones make nothing faster.
-struct ReadBuffer {
-    alignas(dirent64) std::array<char, 32768> bytes;
+// In bytes. Larger blocks gain nothing.
+constexpr std::size_t blockSize = 32768;
+
+struct CloseDirectory {
+    void operator()(DIR *directory) const { closedir(directory); }
 };
+using OpenDirectory = std::unique_ptr<DIR, CloseDirectory>;
+
+// Null if the descriptor is not open, or not one of a directory.
+OpenDirectory openStream(FileDescriptor fd)
+{
+    OpenDirectory directory(fd.isOpen() ? fdopendir(fd.get()) : nullptr);
+    if (directory) {
+        fd.release();
+    }
+    return directory;
+}
 
 struct Entry {
     const char *name;
     unsigned char type; // a DT_ constant
 };
 
-// The entries of a folder in directory order, as packed as they come: a folder of 100,000 files is
-// held in a few MiB. Names are bytes and never pass through an encoding.
+// The entries of a directory in directory order, each as a type byte and a terminated name: 100,000
+// files take a few MiB. Names are bytes and never pass through an encoding.
 class Listing
 {
 public:
-    void read(int directory, ReadBuffer &buffer)
+    void read(DIR *directory, std::string *buffer)
     {
-        // An error ends the listing like the end of the folder does: the removal of the folder
-        // tells whether anything was left in it.
-        while (true) {
-            const auto size = getdents64(directory, buffer.bytes.data(), buffer.bytes.size());
-            if (size <= 0) {
-                return;
+        buffer->clear();
+        // An error ends the listing as the end of the directory does: what is left in the directory
+        // makes its removal fail.
+        while (const dirent *entry = readdir(directory)) {
+            if (std::strcmp(entry->d_name, ".") == 0 || std::strcmp(entry->d_name, "..") == 0) {
+                continue;
             }
-            const std::size_t packed = pack(buffer, static_cast<std::size_t>(size));
-            if (packed > 0) {
-                m_blocks.emplace_back(buffer.bytes.data(), packed);
+            buffer->push_back(static_cast<char>(entry->d_type));
+            buffer->append(entry->d_name, std::strlen(entry->d_name) + 1);
+            if (buffer->size() >= blockSize) {
+                m_blocks.push_back(*buffer);
+                buffer->clear();
             }
+        }
+        if (!buffer->empty()) {
+            m_blocks.push_back(*buffer);
         }
     }
 
@@ -75,36 +92,17 @@ public:
     }
 
 private:
-    // Turns the kernel's records at the front of the buffer into a type byte and a terminated name
-    // each, without "." and "..". An entry only shrinks, so that this can be done in place.
-    static std::size_t pack(ReadBuffer &buffer, std::size_t size)
-    {
-        char *out = buffer.bytes.data();
-        for (std::size_t offset = 0; offset < size;) {
-            const auto *record = reinterpret_cast<const dirent64 *>(buffer.bytes.data() + offset);
-            offset += record->d_reclen;
-            const char *name = record->d_name;
-            if (std::strcmp(name, ".") == 0 || std::strcmp(name, "..") == 0) {
-                continue;
-            }
-            const std::size_t length = std::strlen(name) + 1;
-            *out++ = static_cast<char>(record->d_type);
-            std::memmove(out, name, length);
-            out += length;
-        }
-        return static_cast<std::size_t>(out - buffer.bytes.data());
-    }
-
     std::vector<std::string> m_blocks;
     std::size_t m_block = 0;
     std::size_t m_offset = 0;
 };
 
-// A folder on the way from the one to empty down to the one that is worked on.
-struct Folder {
-    FileDescriptor fd; // closed while the way below is long
+struct Directory {
+    int fd() const { return dirfd(stream.get()); }
+
+    OpenDirectory stream; // null while closed
     ino_t inode = 0;
-    Listing entries; // the current one is the next folder on the way
+    Listing entries; // the current one is the next directory of the path
     bool emptied = true;
 };
 
@@ -113,139 +111,146 @@ class Walk
 public:
     bool run(FileDescriptor top)
     {
+        OpenDirectory stream = openStream(std::move(top));
         struct stat info = {};
-        if (fstat(top.get(), &info) != 0) {
+        if (!stream || fstat(dirfd(stream.get()), &info) != 0) {
             return false;
         }
         m_device = info.st_dev;
-        enter(std::move(top), info.st_ino);
+        enter(std::move(stream), info.st_ino);
         while (true) {
-            if (!m_way.back().entries.atEnd()) {
+            if (!m_path.back().entries.atEnd()) {
                 handleEntry();
-            } else if (m_way.size() > 1) {
+            } else if (m_path.size() > 1) {
                 leave();
             } else {
-                return m_way.back().emptied;
+                return m_path.back().emptied;
             }
         }
     }
 
 private:
-    static FileDescriptor openFolder(const Folder &parent, const char *name)
+    static OpenDirectory openIn(const Directory &parent, const char *name)
     {
-        return FileDescriptor(
-            openat(parent.fd.get(), name, O_RDONLY | O_DIRECTORY | O_NOFOLLOW | O_CLOEXEC));
+        return openStream(FileDescriptor(
+            openat(parent.fd(), name, O_RDONLY | O_DIRECTORY | O_NOFOLLOW | O_CLOEXEC)));
     }
 
-    static bool isFolder(const Folder &parent, const Entry &entry)
+    static bool isDirectory(const Directory &parent, const Entry &entry)
     {
         if (entry.type != DT_UNKNOWN) {
             return entry.type == DT_DIR;
         }
         struct stat info = {};
-        return fstatat(parent.fd.get(), entry.name, &info, AT_SYMLINK_NOFOLLOW) == 0
+        return fstatat(parent.fd(), entry.name, &info, AT_SYMLINK_NOFOLLOW) == 0
             && S_ISDIR(info.st_mode);
     }
 
     void handleEntry()
     {
-        const Folder &folder = m_way.back();
-        const Entry entry = folder.entries.current();
-        // A name is one step, or it leads out of the folder: not every kernel refuses to list such
-        // an entry of a card that was made with intent.
+        const Directory &directory = m_path.back();
+        const Entry entry = directory.entries.current();
+        // Such a name leads out of the directory. Not every kernel refuses to list it when a card
+        // was made to contain it.
         if (std::strchr(entry.name, '/')) {
             finishEntry(false);
             return;
         }
-        if (!isFolder(folder, entry)) {
-            finishEntry(unlinkat(folder.fd.get(), entry.name, 0) == 0);
+        if (!isDirectory(directory, entry)) {
+            finishEntry(unlinkat(directory.fd(), entry.name, 0) == 0);
             return;
         }
-        FileDescriptor fd = openFolder(folder, entry.name);
-        if (!fd.isOpen()) {
-            finishEntry(unlinkat(folder.fd.get(), entry.name, AT_REMOVEDIR) == 0);
+        OpenDirectory stream = openIn(directory, entry.name);
+        if (!stream) {
+            finishEntry(unlinkat(directory.fd(), entry.name, AT_REMOVEDIR) == 0);
             return;
         }
         struct stat info = {};
-        if (fstat(fd.get(), &info) != 0 || info.st_dev != m_device) {
+        if (fstat(dirfd(stream.get()), &info) != 0 || info.st_dev != m_device) {
             finishEntry(false);
             return;
         }
-        enter(std::move(fd), info.st_ino);
+        enter(std::move(stream), info.st_ino);
     }
 
     void finishEntry(bool removed)
     {
-        Folder &folder = m_way.back();
-        folder.emptied = folder.emptied && removed;
-        folder.entries.next();
+        Directory &directory = m_path.back();
+        directory.emptied = directory.emptied && removed;
+        directory.entries.next();
     }
 
-    void enter(FileDescriptor fd, ino_t inode)
+    void enter(OpenDirectory stream, ino_t inode)
     {
-        m_way.push_back({std::move(fd), inode, {}, true});
-        Folder &folder = m_way.back();
-        folder.entries.read(folder.fd.get(), *m_buffer);
-        if (m_way.size() - m_firstOpen > maxOpenFolders) {
-            m_way[m_firstOpen++].fd.close();
+        m_path.push_back({std::move(stream), inode, {}, true});
+        Directory &directory = m_path.back();
+        directory.entries.read(directory.stream.get(), &m_buffer);
+        if (m_path.size() - m_firstOpen > maxOpenDirectories) {
+            m_path[m_firstOpen++].stream.reset();
         }
     }
 
-    // Back in the parent, or above it when that is no longer there.
+    // Goes back to the parent, or to a directory above if the parent was moved away.
     void leave()
     {
-        const Folder child = std::move(m_way.back());
-        m_way.pop_back();
-        const std::size_t length = m_way.size();
-        if (!m_way.back().fd.isOpen()) {
-            reopen(child);
+        const Directory child = std::move(m_path.back());
+        m_path.pop_back();
+        const std::size_t length = m_path.size();
+        if (!m_path.back().stream && !openParentOf(child)) {
+            openFromTop();
         }
-        const Folder &parent = m_way.back();
-        finishEntry(child.emptied && m_way.size() == length
-                    && unlinkat(parent.fd.get(), parent.entries.current().name, AT_REMOVEDIR) == 0);
+        const Directory &parent = m_path.back();
+        finishEntry(child.emptied && m_path.size() == length
+                    && unlinkat(parent.fd(), parent.entries.current().name, AT_REMOVEDIR) == 0);
     }
 
-    // Opens the last folder again. Whatever was moved meanwhile, no folder is taken for another: a
-    // recycled inode aside, device and inode tell. When ".." leads elsewhere, the child was moved;
-    // the way is then gone anew from the top, and shortened to where it now ends.
-    void reopen(const Folder &child)
+    // Opens the last directory of the path through its child. Fails if the child was moved.
+    bool openParentOf(const Directory &child)
     {
-        FileDescriptor fd = openFolder(child, "..");
-        if (isSame(fd, m_way.back())) {
-            m_firstOpen = m_way.size() - 1;
-            m_way.back().fd = std::move(fd);
-            return;
+        OpenDirectory stream = openIn(child, "..");
+        if (!isSame(stream, m_path.back())) {
+            return false;
         }
+        m_path.back().stream = std::move(stream);
+        m_firstOpen = m_path.size() - 1;
+        return true;
+    }
+
+    // Follows the path from the top and shortens it to the last directory that is still there.
+    void openFromTop()
+    {
         std::size_t reached = 0;
-        while (reached + 1 < m_way.size()) {
-            Folder &folder = m_way[reached];
-            fd = openFolder(folder, folder.entries.current().name);
-            if (!isSame(fd, m_way[reached + 1])) {
+        while (reached + 1 < m_path.size()) {
+            Directory &directory = m_path[reached];
+            OpenDirectory next = openIn(directory, directory.entries.current().name);
+            if (!isSame(next, m_path[reached + 1])) {
                 break;
             }
             if (reached > 0) {
-                folder.fd.close();
+                directory.stream.reset();
             }
             ++reached;
-            m_way[reached].fd = std::move(fd);
+            m_path[reached].stream = std::move(next);
         }
-        m_way.resize(reached + 1);
+        m_path.resize(reached + 1);
         m_firstOpen = std::max<std::size_t>(reached, 1);
     }
 
-    bool isSame(const FileDescriptor &fd, const Folder &folder) const
+    // Device and inode identify a directory, whatever was moved meanwhile, unless the inode was
+    // freed and used again.
+    bool isSame(const OpenDirectory &stream, const Directory &directory) const
     {
         struct stat info = {};
-        return fd.isOpen() && fstat(fd.get(), &info) == 0 && info.st_dev == m_device
-            && info.st_ino == folder.inode;
+        return stream && fstat(dirfd(stream.get()), &info) == 0 && info.st_dev == m_device
+            && info.st_ino == directory.inode;
     }
 
     dev_t m_device = 0;
-    // The first is the folder to empty, which stays open.
-    std::deque<Folder> m_way;
-    // The open ones are the first, and from this index on all.
+    // From the directory to empty to the one that is worked on. Open are the first one, always, and
+    // those from m_firstOpen on, the last one included.
+    std::deque<Directory> m_path;
     std::size_t m_firstOpen = 1;
-    const std::unique_ptr<ReadBuffer> m_buffer = std::make_unique<ReadBuffer>();
+    std::string m_buffer;
 };
 
 } // namespace

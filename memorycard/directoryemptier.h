@@ -7,13 +7,13 @@
 class FileDescriptor;
 
 /*
-    Removes everything below a folder that was just opened for reading; the folder itself stays.
+    Removes everything below a directory that was just opened for reading; the directory itself stays.
 
-    Nothing stops it: every entry is attempted, and the result tells whether all of them went. What
-    cannot be read counts as empty. Links are removed, never followed; a folder on another device is
-    left as it is, which is a failure. Other processes may change the tree meanwhile: what they put
-    in the place of a folder is not entered. The depth of the tree and the size of the thread's
-    stack do not matter, and at most 57 descriptors are open at a time.
+    A failure never stops the walk: it attempts every entry, and returns whether all of them were
+    removed. A directory that cannot be read counts as empty. Links are removed, never followed; a
+    directory on another device stays, which is a failure. Other processes may change the tree
+    meanwhile: the walk never enters what they put in the place of a directory. The depth of the tree
+    and the size of the thread's stack do not matter, and at most 57 descriptors are open at a time.
 */
 bool emptyDirectory(FileDescriptor directory);
 

@@ -26,10 +26,13 @@ public:
     bool isOpen() const { return m_fd >= 0; }
     int get() const { return m_fd; }
 
+    // Leaves closing to the caller.
+    int release() { return std::exchange(m_fd, -1); }
+
     void close()
     {
         if (m_fd >= 0) {
-            ::close(std::exchange(m_fd, -1));
+            ::close(release());
         }
     }
 

@@ -32,7 +32,7 @@ const SystemCalls &SystemCalls::real()
         find<int(int, const char *, int)>("unlinkat"),
         find<int(int, struct stat *)>("fstat64"),
         find<int(int, const char *, struct stat *, int)>("fstatat64"),
-        find<ssize_t(int, void *, size_t)>("getdents64"),
+        find<dirent *(DIR *)>("readdir64"),
     };
     return calls;
 }
@@ -74,10 +74,9 @@ int fstatat(int directory, const char *path, struct stat *info, int flags) noexc
                 : SystemCalls::real().fstatat(directory, path, info, flags);
 }
 
-ssize_t getdents64(int directory, void *buffer, size_t size) noexcept
+dirent *readdir(DIR *directory)
 {
-    const auto &hook = SystemCalls::hooks().getdents64;
-    return hook ? hook(directory, buffer, size)
-                : SystemCalls::real().getdents64(directory, buffer, size);
+    const auto &hook = SystemCalls::hooks().readdir;
+    return hook ? hook(directory) : SystemCalls::real().readdir(directory);
 }
 }

@@ -6,20 +6,20 @@
 
 #include <functional>
 
+#include <dirent.h>
 #include <sys/stat.h>
-#include <sys/types.h>
 
 /*
-    The calls into the kernel that the walk over a card makes, taken over by this program: a test
-    counts them, changes the tree between two of them, or makes one fail. A hook that is set stands
-    in for the call and may pass it on to the real one.
+    The calls of the walk over a card, which this program takes over: a test counts them, changes the
+    tree between two of them, or makes one fail. A hook that is set replaces the call and may forward
+    to the real one.
 */
 struct SystemCalls {
     std::function<int(int, const char *, int)> openat;
     std::function<int(int, const char *, int)> unlinkat;
     std::function<int(int, struct stat *)> fstat;
     std::function<int(int, const char *, struct stat *, int)> fstatat;
-    std::function<ssize_t(int, void *, size_t)> getdents64;
+    std::function<dirent *(DIR *)> readdir;
 
     // Those of the calling thread.
     static SystemCalls &hooks();

@@ -2,20 +2,25 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 /*
-    The removal of all files from a card, side by side with `rm -rf` and with nothing but the
-    unlinkat() calls on a tree that was listed beforehand, on tmpfs and (as root) on ext4.
+    Removes all files from a card, and compares that with `rm -rf` and with nothing but the unlinkat()
+    calls on a tree that was listed beforehand, on tmpfs and (as root) on ext4.
 
-    Each of the three removes a tree of its own, fresh and written out. The time that `rm` takes for
-    an empty folder is taken off its times, so that its start does not count.
+    rm sorts directories of more than 10,000 entries by inode, which spares ext4 much work; the remover
+    keeps directory order. On ext4 such a directory is therefore compared with what keeps that order,
+    too, and rm is there for information only.
 
-    All of it happens in a mount namespace of this process: nothing stays mounted and no loop device
-    in use when it ends, however it ends.
+    Each program removes a tree of its own, fresh and written out. The time that a program takes for
+    an empty directory is subtracted from its times, so that its start does not count.
+
+    All of this happens in a mount namespace of this process: nothing stays mounted and no loop device
+    in use when it ends, in whatever way.
 */
 
 #include "memorycard/fileremover.h"
 #include "rounds.h"
 
 #include <QByteArray>
+#include <QDir>
 #include <QString>
 #include <QThreadPool>
 #include <QVector>
@@ -25,6 +30,7 @@
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
+#include <filesystem>
 #include <functional>
 #include <memory>
 
@@ -51,6 +57,9 @@ constexpr int photoSize = 16 * 1024;
 constexpr double barOfRmOnTmpfs = 1.05;
 constexpr double barOfRmOnExt4 = 1.20;
 constexpr double barOfBareCalls = 1.20;
+constexpr double barOfBareCallsInLargeDirectory = 1.05;
+constexpr double barOfDirectoryOrder = 1.00;
+constexpr double none = 0;
 constexpr double barOfProcessor = 1.05;
 constexpr double barOfCallsFlat = 1.01;
 constexpr double barOfCallsNested = 1.10;
@@ -73,7 +82,7 @@ int require(int result, const char *what)
     return result;
 }
 
-int makeFolder(int parent, const QByteArray &name)
+int makeDirectory(int parent, const QByteArray &name)
 {
     require(mkdirat(parent, name.constData(), 0700), "mkdirat");
     return require(openat(parent, name.constData(), O_RDONLY | O_DIRECTORY | O_CLOEXEC), "openat");
@@ -84,44 +93,45 @@ QByteArray photoName(int index)
     return "IMG_20260712_" + QByteArray::number(index).rightJustified(6, '0') + ".jpg";
 }
 
-void makeFiles(int folder, int count, int size = 0)
+void makeFiles(int directory, int count, int size = 0)
 {
     const QByteArray content(size, 'p');
     for (int i = 0; i < count; ++i) {
-        const int fd = require(
-            openat(folder, photoName(i).constData(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, 0600),
-            "openat");
+        const int fd = require(openat(directory, photoName(i).constData(),
+                                      O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, 0600),
+                               "openat");
         require(static_cast<int>(write(fd, content.constData(), static_cast<size_t>(size))),
                 "write");
         close(fd);
     }
 }
 
-void makeFolders(int top, int folders, int files, int size = 0)
+void makeDirectories(int top, int directories, int files, int size = 0)
 {
-    for (int i = 0; i < folders; ++i) {
-        const int folder = makeFolder(top, QByteArray::number(100 + i) + "MEDIA");
-        makeFiles(folder, files, size);
-        close(folder);
+    for (int i = 0; i < directories; ++i) {
+        const int directory = makeDirectory(top, QByteArray::number(100 + i) + "MEDIA");
+        makeFiles(directory, files, size);
+        close(directory);
     }
 }
 
-void makeLinks(int folder, int count)
+void makeLinks(int directory, int count)
 {
     for (int i = 0; i < count; ++i) {
-        require(symlinkat("../elsewhere/photo.jpg", folder, photoName(i).constData()), "symlinkat");
+        require(symlinkat("../elsewhere/photo.jpg", directory, photoName(i).constData()),
+                "symlinkat");
     }
 }
 
 void makeChain(int top, int levels)
 {
-    int folder = dup(top);
+    int directory = dup(top);
     for (int i = 0; i < levels; ++i) {
-        const int below = makeFolder(folder, "d");
-        close(folder);
-        folder = below;
+        const int below = makeDirectory(directory, "d");
+        close(directory);
+        directory = below;
     }
-    close(folder);
+    close(directory);
 }
 
 struct Tree {
@@ -129,20 +139,21 @@ struct Tree {
     int entries;
     double barOfCalls; // into the kernel, per entry; 0 for none
     std::function<void(int)> make;
+    bool isLarge = false; // for rm: more than 10,000 entries in one directory
 };
 
 const QVector<Tree> &trees()
 {
     static const QVector<Tree> all = {
-        {"100,000 files in one folder", 100000, barOfCallsFlat,
-         [](int top) { makeFiles(top, 100000); }},
-        {"1,000 folders of 100 files", 101000, barOfCallsNested,
-         [](int top) { makeFolders(top, 1000, 100); }},
-        {"5,000 photos in 20 folders", 5020, barOfCallsNested,
-         [](int top) { makeFolders(top, 20, 250, photoSize); }},
-        {"200,000 links in one folder", 200000, barOfCallsFlat,
-         [](int top) { makeLinks(top, 200000); }},
-        {"50,000 folders in each other", depth, 0, [](int top) { makeChain(top, depth); }},
+        {"100,000 files in one directory", 100000, barOfCallsFlat,
+         [](int top) { makeFiles(top, 100000); }, true},
+        {"1,000 directories of 100 files", 101000, barOfCallsNested,
+         [](int top) { makeDirectories(top, 1000, 100); }},
+        {"5,000 photos in 20 directories", 5020, barOfCallsNested,
+         [](int top) { makeDirectories(top, 20, 250, photoSize); }},
+        {"200,000 links in one directory", 200000, barOfCallsFlat,
+         [](int top) { makeLinks(top, 200000); }, true},
+        {"50,000 directories in each other", depth, 0, [](int top) { makeChain(top, depth); }},
     };
     return all;
 }
@@ -155,13 +166,13 @@ QByteArray treePath(const QByteArray &parent)
 // A fresh tree, written out, so that nothing of its making is left to do while it is removed.
 QByteArray makeTree(const QByteArray &parent, const Tree &tree)
 {
-    const int folder =
+    const int directory =
         require(open(parent.constData(), O_RDONLY | O_DIRECTORY | O_CLOEXEC), "open");
-    const int top = makeFolder(folder, "tree");
+    const int top = makeDirectory(directory, "tree");
     tree.make(top);
     syncfs(top);
     close(top);
-    close(folder);
+    close(directory);
     return treePath(parent);
 }
 
@@ -172,18 +183,32 @@ void removeWithRemover(const QByteArray &path)
     }
 }
 
-void removeWithRm(const QByteArray &path)
+void removeWith(QVector<QByteArray> command, const QByteArray &path)
 {
-    QByteArray program("rm");
-    QByteArray option("-rf");
-    QByteArray argument(path);
-    char *const arguments[] = {program.data(), option.data(), argument.data(), nullptr};
+    command.append(path);
+    std::vector<char *> arguments;
+    for (QByteArray &argument : command) {
+        arguments.push_back(argument.data());
+    }
+    arguments.push_back(nullptr);
     pid_t pid = 0;
     int status = 0;
-    if (posix_spawnp(&pid, "rm", nullptr, nullptr, arguments, environ) != 0
+    if (posix_spawnp(&pid, arguments[0], nullptr, nullptr, arguments.data(), environ) != 0
         || waitpid(pid, &status, 0) != pid || status != 0) {
-        die("rm");
+        die(arguments[0]);
     }
+}
+
+void removeWithQDir(const QByteArray &path)
+{
+    if (!QDir(QString::fromUtf8(path)).removeRecursively()) {
+        die("QDir left something");
+    }
+}
+
+void removeWithStandardLibrary(const QByteArray &path)
+{
+    std::filesystem::remove_all(path.constData());
 }
 
 // A tree that was listed: its removal is nothing but calls into the kernel.
@@ -192,13 +217,13 @@ class BareCalls
 public:
     explicit BareCalls(const QByteArray &path) : m_path(path)
     {
-        m_folders.append(require(open(path.constData(), O_RDONLY | O_DIRECTORY), "open"));
-        list(m_folders.first());
+        m_directories.append(require(open(path.constData(), O_RDONLY | O_DIRECTORY), "open"));
+        list(m_directories.first());
     }
     ~BareCalls()
     {
-        for (const int folder : qAsConst(m_folders)) {
-            close(folder);
+        for (const int directory : qAsConst(m_directories)) {
+            close(directory);
         }
     }
     Q_DISABLE_COPY_MOVE(BareCalls)
@@ -206,46 +231,47 @@ public:
     void remove() const
     {
         for (const Removal &removal : m_removals) {
-            require(unlinkat(removal.folder, removal.name.constData(), removal.flags), "unlinkat");
+            require(unlinkat(removal.directory, removal.name.constData(), removal.flags),
+                    "unlinkat");
         }
         require(rmdir(m_path.constData()), "rmdir");
     }
 
 private:
     struct Removal {
-        int folder;
+        int directory;
         QByteArray name;
         int flags;
     };
 
-    void list(int folder)
+    void list(int directory)
     {
-        DIR *const entries = fdopendir(require(dup(folder), "dup"));
+        DIR *const entries = fdopendir(require(dup(directory), "dup"));
         while (const dirent *entry = readdir(entries)) {
             const QByteArray name(entry->d_name);
             if (name == "." || name == "..") {
                 continue;
             }
             if (entry->d_type != DT_DIR) {
-                m_removals.append({folder, name, 0});
+                m_removals.append({directory, name, 0});
                 continue;
             }
             const int below =
-                require(openat(folder, name.constData(), O_RDONLY | O_DIRECTORY), "openat");
-            m_folders.append(below);
+                require(openat(directory, name.constData(), O_RDONLY | O_DIRECTORY), "openat");
+            m_directories.append(below);
             list(below);
-            m_removals.append({folder, name, AT_REMOVEDIR});
+            m_removals.append({directory, name, AT_REMOVEDIR});
         }
         closedir(entries);
     }
 
     QByteArray m_path;
     QVector<Removal> m_removals;
-    QVector<int> m_folders;
+    QVector<int> m_directories;
 };
 
-// Takes what a program takes for nothing off its times.
-void takeOff(const Rounds::Times &start, Rounds::Times *times)
+// Subtracts what a program takes for nothing from its times.
+void subtract(const Rounds::Times &start, Rounds::Times *times)
 {
     const auto median = [&start](double Rounds::Time::*clock) {
         std::vector<double> values;
@@ -262,18 +288,21 @@ void takeOff(const Rounds::Times &start, Rounds::Times *times)
 }
 
 bool compareTimes(const QByteArray &parent, const char *fileSystem, const Tree &tree,
-                  double barOfRm)
+                  double barOfRm, bool sortingHelps)
 {
-    const Tree nothing = {"nothing", 0, 0, [](int) {}};
+    const bool deep = tree.entries == depth;
+    const bool sorted = sortingHelps && tree.isLarge;
     const QByteArray path = treePath(parent);
     const auto make = [&] { makeTree(parent, tree); };
+    const auto makeNothing = [&] { makeTree(parent, {"nothing", 0, 0, [](int) {}}); };
+    const auto removeWithRm = [&] { removeWith({"rm", "-rf"}, path); };
+    const auto removeWithBusybox = [&] { removeWith({"busybox", "rm", "-rf"}, path); };
     std::vector<Rounds::Work> works = {
         {[&] { removeWithRemover(path); }, make},
-        {[&] { removeWithRm(path); }, make},
-        {[&] { removeWithRm(path); }, [&] { makeTree(parent, nothing); }},
+        {removeWithRm, make},
+        {removeWithRm, makeNothing},
     };
     // A chain this long cannot be held open, which the bare calls need.
-    const bool deep = tree.entries == depth;
     std::unique_ptr<BareCalls> bareCalls;
     if (!deep) {
         works.push_back({[&] { bareCalls->remove(); },
@@ -283,14 +312,31 @@ bool compareTimes(const QByteArray &parent, const char *fileSystem, const Tree &
                              bareCalls = std::make_unique<BareCalls>(path);
                          }});
     }
+    if (sorted) {
+        works.push_back({removeWithBusybox, make});
+        works.push_back({removeWithBusybox, makeNothing});
+        works.push_back({[&] { removeWithQDir(path); }, make});
+        works.push_back({[&] { removeWithStandardLibrary(path); }, make});
+    }
     auto times = Rounds::times(works, rounds);
-    takeOff(times[2], &times[1]);
+    subtract(times[2], &times[1]);
+
     const QByteArray work = QByteArray("remove ") + tree.name + ", " + fileSystem;
-    bool kept = Rounds::report(work, "rm -rf", times[0], times[1], barOfRm, &Rounds::Time::wall);
-    kept &= Rounds::report(work, "rm -rf, processor", times[0], times[1], barOfProcessor);
+    const auto report = [&](const char *beside, std::size_t index, double bar,
+                            double Rounds::Time::*clock = &Rounds::Time::wall) {
+        return Rounds::report(work, beside, times[0], times[index], bar, clock);
+    };
+    bool kept = report("rm -rf", 1, sorted ? none : barOfRm);
+    kept &=
+        report("rm -rf, processor", 1, sorted ? none : barOfProcessor, &Rounds::Time::processor);
     if (!deep) {
-        kept &= Rounds::report(work, "bare calls", times[0], times[3], barOfBareCalls,
-                               &Rounds::Time::wall);
+        kept &= report("bare calls", 3, sorted ? barOfBareCallsInLargeDirectory : barOfBareCalls);
+    }
+    if (sorted) {
+        subtract(times[5], &times[4]);
+        kept &= report("busybox rm -rf", 4, barOfDirectoryOrder);
+        kept &= report("QDir::removeRecursively", 6, barOfDirectoryOrder);
+        kept &= report("std::filesystem::remove_all", 7, barOfDirectoryOrder);
     }
     return kept;
 }
@@ -352,7 +398,7 @@ long statusValue(const char *key)
     return value;
 }
 
-// In a process of its own: removes a tree on a pool thread with a small stack, and says by how many
+// In a process of its own: removes a tree on a pool thread with a small stack, and prints by how many
 // KiB the memory in use grew at most.
 int measure(const QByteArray &path)
 {
@@ -453,14 +499,14 @@ int main(int argc, char **argv)
 
     bool kept = true;
     for (const Tree &tree : trees()) {
-        kept &= compareTimes(tmpfs, "tmpfs", tree, barOfRmOnTmpfs);
+        kept &= compareTimes(tmpfs, "tmpfs", tree, barOfRmOnTmpfs, false);
     }
     if (root) {
         const QByteArray ext4 = base + "/ext4";
         require(mkdir(ext4.constData(), 0700), "mkdir");
         run("truncate -s 2G image && mkfs.ext4 -q -N 400000 image && mount -o loop image ext4");
         for (const Tree &tree : trees()) {
-            kept &= compareTimes(ext4, "ext4", tree, barOfRmOnExt4);
+            kept &= compareTimes(ext4, "ext4", tree, barOfRmOnExt4, true);
         }
         run("umount ext4");
     } else {

@@ -81,25 +81,44 @@ bool hasDescriptorsLeft()
     after the other each make their own type. Mounting and unmounting use the \l deviceName that is set
     when the step starts.
 
+    A label that shows the file system of a card:
+
     \qml
-    Button {
-        text: "Format"
-        enabled: !card.busy
-        onClicked: card.format("vfat")
+    Label {
+        text: card.filesystemType
 
         MemoryCardFormatter {
             id: card
 
-            deviceName: "mmcblk1p1"
             devicePath: "/dev/mmcblk1p1"
-            onUnmountError: {
-                if (error === MemoryCardFormatter.ErrorDeviceBusy) {
-                    console.log("something uses the card")
-                }
-            }
         }
     }
     \endqml
+
+    \section1 When an operation has ended
+
+    The signals of a formatter that already had an operation do not always show that the next one has
+    ended. The status \c Error does not change when another operation fails, and the status \c Idle
+    does not change when mount() finds the card mounted. A page therefore creates a formatter for each
+    operation, in a Loader, and starts the operation in the handler of devicePathChanged(), before the
+    probe of the new path is queued. The probe then follows the operation. The status leaves \c Idle
+    and always arrives at \c Idle or \c Error. There the operation has ended, and after \c Idle
+    \l filesystemType is that of the card as it is now.
+
+    \list
+    \li Until the disk service answers the first request, the status is still \c Idle and \l busy is
+        \c false. The page knows that it has started an operation: it shows that it waits for the disk
+        service and disables its buttons.
+    \li \c ErrorAlreadyMounted and \c ErrorAlreadyUnmounting do not stop an operation. The card is
+        already in the requested state, or about to be: the page shows a note, and the status goes on.
+    \li Any other error of mountError() and unmountError() is followed by \c Error. Failures that have
+        no code, such as those of the helper program, change only the status. The step before it shows
+        what failed.
+    \endlist
+
+    A complete page:
+
+    \quotefile memory-card.qml
 
     Warnings are logged in the category \c org.tarnwickos.settings.memorycard, whose debug messages
     are off by default.

@@ -1,0 +1,239 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+// The example docs/examples/memory-card.qml always learns that an operation has ended, and says why
+// it failed.
+
+#include "cardhelper.h"
+#include "messagelog.h"
+#include "simulator/diskservicepeer.h"
+
+#include <QQmlComponent>
+#include <QQmlEngine>
+#include <QQuickItem>
+#include <QQuickWindow>
+#include <QtTest>
+
+#include <memory>
+
+namespace {
+
+const QString waiting = QStringLiteral("Waiting for the disk service…");
+const QString hasVfat = QStringLiteral("File system: vfat");
+
+QQuickItem *findItem(QQuickItem *item, const QString &text)
+{
+    if (item->isVisible() && item->property("text") == text) {
+        return item;
+    }
+    const auto children = item->childItems();
+    for (QQuickItem *child : children) {
+        if (QQuickItem *found = findItem(child, text)) {
+            return found;
+        }
+    }
+    return nullptr;
+}
+
+} // namespace
+
+class TestCardPage : public QObject
+{
+    Q_OBJECT
+
+private Q_SLOTS:
+    void initTestCase() { m_engine.addImportPath(QStringLiteral(QML_BUILD_DIR)); }
+    void init();
+    void cleanup();
+
+    void showsThatTheDiskServiceHasNotAnswered();
+    void endsAfterEachFailure_data();
+    void endsAfterEachFailure();
+    void showsAForgivenError_data();
+    void showsAForgivenError();
+    void formatsAfterAQuestion();
+    void namesWhatFailed_data();
+    void namesWhatFailed();
+    void probesEachCard();
+
+private:
+    bool shows(const QString &text) { return findItem(m_window->contentItem(), text) != nullptr; }
+    void press(const QString &text);
+    void openPage();
+
+    QQmlEngine m_engine;
+    std::unique_ptr<MessageLog> m_log;
+    std::unique_ptr<CardHelper> m_helper;
+    std::unique_ptr<QQuickWindow> m_window;
+    std::unique_ptr<QObject> m_page;
+};
+
+void TestCardPage::init()
+{
+    m_log = std::make_unique<MessageLog>();
+    m_helper = std::make_unique<CardHelper>();
+    m_helper->install(QStringLiteral("done"), "vfat\n");
+}
+
+void TestCardPage::cleanup()
+{
+    m_page.reset();
+    m_window.reset();
+    m_helper.reset();
+    QCOMPARE(m_log->takeReport(), QString());
+    m_log.reset();
+}
+
+// Returns when the first probe has ended.
+void TestCardPage::openPage()
+{
+    QQmlComponent component(&m_engine, QStringLiteral(SOURCE_DIR "/docs/examples/memory-card.qml"));
+    m_page.reset(component.create());
+    QVERIFY2(m_page != nullptr, qPrintable(component.errorString()));
+    m_window = std::make_unique<QQuickWindow>();
+    m_window->resize(360, 640);
+    auto *page = qobject_cast<QQuickItem *>(m_page.get());
+    page->setSize(m_window->size());
+    page->setParentItem(m_window->contentItem());
+    m_window->show();
+    QVERIFY(QTest::qWaitForWindowExposed(m_window.get()));
+    QTRY_VERIFY(!m_page->property("running").toBool());
+}
+
+void TestCardPage::press(const QString &text)
+{
+    QQuickItem *button = nullptr;
+    QTRY_VERIFY((button = findItem(m_window->contentItem(), text)) != nullptr);
+    QVERIFY2(button->isEnabled(), qPrintable(text));
+    QVERIFY(QMetaObject::invokeMethod(button, "clicked"));
+}
+
+void TestCardPage::showsThatTheDiskServiceHasNotAnswered()
+{
+    DiskServicePeer service({QStringLiteral("hung")});
+    openPage();
+    QVERIFY(shows(hasVfat));
+    press(QStringLiteral("Mount"));
+    QTRY_COMPARE(service.calls().size(), 1);
+    QVERIFY(shows(waiting));
+    QVERIFY(!findItem(m_window->contentItem(), QStringLiteral("Unmount"))->isEnabled());
+    service.replyToKept();
+    QTRY_VERIFY(shows(hasVfat));
+    QVERIFY(findItem(m_window->contentItem(), QStringLiteral("Unmount"))->isEnabled());
+}
+
+void TestCardPage::endsAfterEachFailure_data()
+{
+    QTest::addColumn<QString>("scenario");
+    QTest::addColumn<QString>("problem");
+    QTest::newRow("an error with a code") << "DeviceBusy"
+                                          << "A program uses the card.";
+    QTest::newRow("an error without a code") << "UnknownError"
+                                             << "The disk service did not answer.";
+    QTest::newRow("no disk service") << "absent"
+                                     << "The disk service did not answer.";
+}
+
+// The second failure changes no status of a formatter that is in Error already.
+void TestCardPage::endsAfterEachFailure()
+{
+    QFETCH(const QString, scenario);
+    QFETCH(const QString, problem);
+    const DiskServicePeer service({scenario});
+    openPage();
+    for (int i = 0; i < 2; ++i) {
+        press(QStringLiteral("Unmount"));
+        QVERIFY(shows(waiting));
+        QTRY_VERIFY(shows(problem));
+        QCOMPARE(m_log->takeTexts().size(), 1);
+    }
+}
+
+void TestCardPage::showsAForgivenError_data()
+{
+    QTest::addColumn<QString>("button");
+    QTest::addColumn<QString>("scenario");
+    QTest::addColumn<QString>("note");
+    QTest::newRow("mount") << "Mount"
+                           << "AlreadyMounted"
+                           << "The card was mounted already.";
+    QTest::newRow("unmount") << "Unmount"
+                             << "AlreadyUnmounting"
+                             << "The card is already being unmounted.";
+}
+
+void TestCardPage::showsAForgivenError()
+{
+    QFETCH(const QString, button);
+    QFETCH(const QString, scenario);
+    QFETCH(const QString, note);
+    const DiskServicePeer service({scenario});
+    openPage();
+    press(button);
+    QTRY_VERIFY(shows(note));
+    QTRY_VERIFY(shows(hasVfat));
+    QCOMPARE(m_log->takeTexts().size(), 1);
+}
+
+void TestCardPage::formatsAfterAQuestion()
+{
+    DiskServicePeer service({QStringLiteral("done")});
+    openPage();
+    m_helper->install(QStringLiteral("held"), "ext4\n");
+    press(QStringLiteral("Format as ext4"));
+    QTRY_VERIFY(shows(QStringLiteral("All files are lost. The card gets the file system ext4.")));
+    QCOMPARE(m_helper->runs().size(), 1); // the probe
+    press(QStringLiteral("Erase"));
+    QTRY_VERIFY(shows(QStringLiteral("Formatting…")));
+    m_helper->release();
+    QTRY_VERIFY(shows(QStringLiteral("Detecting the file system…")));
+    m_helper->release();
+    QTRY_VERIFY(shows(QStringLiteral("File system: ext4")));
+    const QString card = QStringLiteral("mmcblk1p1");
+    const QStringList probe = {QStringLiteral("probe"), card};
+    QCOMPARE(m_helper->runs(),
+             QList<QStringList>({probe, {QStringLiteral("format_ext4"), card}, probe}));
+    QCOMPARE(service.members(), QStringList({QStringLiteral("Unmount"), QStringLiteral("Mount")}));
+}
+
+void TestCardPage::namesWhatFailed_data()
+{
+    QTest::addColumn<QString>("service");
+    QTest::addColumn<QString>("problem");
+    QTest::addColumn<int>("messages");
+    QTest::newRow("the helper") << "done"
+                                << "Formatting failed." << 0;
+    QTest::newRow("the disk service") << "NotMounted"
+                                      << "The card is not mounted." << 1;
+}
+
+void TestCardPage::namesWhatFailed()
+{
+    QFETCH(const QString, service);
+    QFETCH(const QString, problem);
+    QFETCH(const int, messages);
+    m_helper->install(QStringLiteral("exit=1"));
+    const DiskServicePeer peer({service});
+    openPage();
+    QVERIFY(shows(QStringLiteral("The file system could not be detected.")));
+    press(QStringLiteral("Format as ext4"));
+    press(QStringLiteral("Erase"));
+    QTRY_VERIFY(shows(problem));
+    QCOMPARE(m_log->takeTexts().size(), messages);
+}
+
+void TestCardPage::probesEachCard()
+{
+    openPage();
+    QVERIFY(shows(hasVfat));
+    m_page->setProperty("cardName", QString());
+    QVERIFY(shows(QStringLiteral("File system: unknown")));
+    QVERIFY(!findItem(m_window->contentItem(), QStringLiteral("Mount"))->isEnabled());
+    m_helper->install(QStringLiteral("done"), "ext4\n");
+    m_page->setProperty("cardName", QStringLiteral("mmcblk2p1"));
+    QTRY_VERIFY(shows(QStringLiteral("File system: ext4")));
+}
+
+QTEST_MAIN(TestCardPage)
+
+#include "tst_cardpage.moc"

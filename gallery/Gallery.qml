@@ -7,6 +7,7 @@ import QtQuick.Controls.Universal 2.15
 import QtQuick.Layouts 1.15
 // Importing the module brings the texts of the settings pages.
 import com.marlo.settings.system 1.0
+import gallery.simulation 1.0
 
 /*
     The gallery: a start page that lists the pages, and a page for each of the module's types.
@@ -19,14 +20,24 @@ ApplicationWindow {
     // The item that has all that is shown in it, popups too.
     readonly property Item surface: contentItem.parent
     property alias logOpen: log.open
+    readonly property bool popupOpen: Overlay.overlay.visible
 
     function openPage(name) {
         close();
+        Messages.clear();
         const entry = () => pages.list.find(page => page.name === name);
         stack.push("PageFrame.qml", { entry: entry() }, StackView.Immediate);
         currentPage.entry = Qt.binding(entry);
         currentPage.forceActiveFocus();
         return currentPage.page;
+    }
+
+    function press(button) {
+        if (button.checkable && !(button.autoExclusive && button.checked)) {
+            button.toggle();
+            button.toggled();
+        }
+        button.clicked();
     }
 
     function close() {
@@ -87,11 +98,21 @@ ApplicationWindow {
 
     footer: LogPane {
         id: log
-        open: window.width >= 900
+        open: window.width >= 900 && Messages.count > 0
+    }
+
+    // The return key presses what has the focus, as the space bar does.
+    Shortcut {
+        sequences: ["Return", "Enter"]
+        enabled: window.activeFocusItem instanceof AbstractButton
+        onActivated: window.press(window.activeFocusItem)
     }
 
     Shortcut {
         sequences: ["Esc", StandardKey.Back]
+        enabled: !window.popupOpen
         onActivated: window.close()
     }
+
+    Component.onCompleted: currentPage.forceActiveFocus()
 }

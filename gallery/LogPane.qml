@@ -28,6 +28,7 @@ Rectangle {
             ItemDelegate {
                 id: bar
                 focusPolicy: Qt.StrongFocus
+                Accessible.description: pane.open ? "" : Messages.latest
                 Layout.fillWidth: true
                 implicitHeight: 40
                 padding: 10
@@ -52,7 +53,8 @@ Rectangle {
                         textFormat: Text.PlainText
                         color: "#ffd180"
                         font.pixelSize: 13
-                        elide: Text.ElideRight
+                        // The name of the error is at the end.
+                        elide: Text.ElideMiddle
                         maximumLineCount: 1
                     }
                 }

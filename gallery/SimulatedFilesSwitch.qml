@@ -3,6 +3,7 @@
 
 import QtQuick 2.15
 import gallery.simulation 1.0
+import "pages/controls"
 
 /*
     Puts sample files away and brings them back.

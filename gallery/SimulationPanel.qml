@@ -4,6 +4,7 @@
 import QtQuick 2.15
 import QtQuick.Controls 2.15
 import QtQuick.Layouts 1.15
+import "pages/controls"
 
 /*
     The panel of a simulation. It looks different from the page: nothing of it is for pages.
@@ -22,7 +23,7 @@ Pane {
     }
 
     contentItem: ColumnLayout {
-        spacing: 4
+        spacing: 8
 
         Label {
             Layout.fillWidth: true
@@ -36,7 +37,7 @@ Pane {
         }
         ColumnLayout {
             id: column
-            spacing: 4
+            spacing: 8
         }
         Button {
             text: qsTrId("gallery-simulation-reload")

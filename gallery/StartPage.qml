@@ -5,6 +5,7 @@ import QtQuick 2.15
 import QtQuick.Controls 2.15
 import QtQuick.Controls.Universal 2.15
 import QtQuick.Layouts 1.15
+import "pages/controls"
 
 /*
     Lists the pages, with the type that each is of and what that is for.

@@ -29,10 +29,14 @@ const QString udevd = QStringLiteral("/lib/systemd/systemd-udevd");
 const QString udisksd = QStringLiteral("/usr/libexec/udisks2/udisksd");
 const QString loopControl = QStringLiteral("/dev/loop-control");
 const QString helper = QStringLiteral("/usr/libexec/sdcardhelper");
+// A helper that waits ends when the program that runs it has ended.
 // The disk service is told of a new file system before anybody asks it to mount that.
 constexpr char helperScript[] = R"(#!/bin/sh
 set -eu
-while [ -e /usr/libexec/sdcardhelper-waits ]; do sleep 0.1; done
+while [ -e /usr/libexec/sdcardhelper-waits ]; do
+    kill -0 "$PPID" 2>/dev/null || exit 1
+    sleep 0.1
+done
 case $1 in
 format_vfat) mkfs.vfat -I "/dev/$2" ;;
 format_ext4) mkfs.ext4 -q "/dev/$2" ;;

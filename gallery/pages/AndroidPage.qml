@@ -3,7 +3,7 @@
 
 import QtQuick 2.15
 import com.marlo.settings.system 1.0
-import ".."
+import "controls"
 
 /*
     Whether there are folders of Android applications to be shown.

@@ -4,7 +4,8 @@
 import QtQuick 2.15
 import QtQuick.Controls 2.15
 import com.marlo.settings.system 1.0
-import ".."
+import "controls"
+import "controls/display.js" as Display
 
 /*
     The page on which a user chooses the widgets of the events screen.
@@ -21,11 +22,11 @@ GalleryPage {
             id: list
             model: widgets
             TextSwitch {
-                text: model.title
-                icon.source: /^\//.test(model.icon) ? "file://" + model.icon : model.icon || ""
+                text: Display.title(model.title, model.path)
+                icon.source: Display.icon(model.icon)
                 description: model.description
                 remark: model.available ? "" : qsTrId("gallery-events-widgets-unavailable")
-                // An item has an `enabled` of its own, so the role is asked of the model.
+                // Through the model: an item has a property `enabled` of its own.
                 checked: model.enabled
                 onToggled: {
                     if (checked) {

@@ -5,7 +5,7 @@ import QtQuick 2.15
 import QtQuick.Controls 2.15
 import QtQuick.Layouts 1.15
 import com.marlo.settings.system 1.0
-import ".."
+import "controls"
 
 /*
     The location services: their switches, a set of them that is saved and restored, and the terms
@@ -17,6 +17,12 @@ GalleryPage {
 
     readonly property bool mlsAgreed: location.mlsOnlineState !== LocationPage.OnlineState.NotAgreed
     readonly property bool hereAgreed: location.hereState !== LocationPage.OnlineState.NotAgreed
+
+    // Read once: each read looks for the file.
+    readonly property string mlsTerms: location.mlsOnlineAgreementText
+    readonly property string hereTerms: location.hereAgreementText
+    // The text of a service whose terms are not installed.
+    readonly property string noTerms: qsTrId("settings_location-la-no_agreement_text_found")
 
     LocationConfiguration {
         id: location
@@ -86,9 +92,10 @@ GalleryPage {
         heading: qsTrId("gallery-location-mls-terms")
 
         Paragraph {
-            text: location.mlsOnlineAgreementText
+            text: mlsTerms
         }
         Button {
+            visible: mlsTerms !== noTerms
             text: mlsAgreed ? qsTrId("gallery-location-withdraw") : qsTrId("gallery-location-agree")
             onClicked: location.mlsOnlineState = mlsAgreed ? LocationPage.OnlineState.NotAgreed
                                                            : LocationPage.OnlineState.Enabled
@@ -99,9 +106,10 @@ GalleryPage {
         heading: qsTrId("gallery-location-here-terms")
 
         Paragraph {
-            text: location.hereAgreementText
+            text: hereTerms
         }
         Button {
+            visible: hereTerms !== noTerms
             text: hereAgreed ? qsTrId("gallery-location-withdraw") : qsTrId("gallery-location-agree")
             onClicked: location.hereState = hereAgreed ? LocationPage.OnlineState.NotAgreed
                                                        : LocationPage.OnlineState.Enabled

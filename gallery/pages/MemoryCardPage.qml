@@ -5,7 +5,7 @@ import QtQuick 2.15
 import QtQuick.Controls 2.15
 import QtQuick.Layouts 1.15
 import com.marlo.settings.system 1.0
-import ".."
+import "controls"
 
 /*
     A memory card that is formatted, emptied, mounted and unmounted.
@@ -15,51 +15,140 @@ GalleryPage {
 
     // The kernel's name of the card, empty while there is none.
     property string cardName
-    readonly property string cardPath: cardName ? "/dev/" + cardName : ""
+    readonly property bool running: operation.active
+    property string fileSystem
+    property string note
+    property string problem
+    // How many steps the operation has when it succeeds.
+    property int stepCount
 
-    // The error of the disk service that the last operation met.
-    property int error: noError
-    readonly property int noError: -1
-
-    function start(operation) {
-        forget();
-        operation();
-    }
-
-    function forget() {
-        error = noError;
+    // A formatter serves one operation. The operation starts when the path has been set, so the
+    // formatter probes the card afterwards, and its status always changes to Idle or Error.
+    function run(count, start) {
+        note = "";
+        problem = "";
         steps.clear();
+        stepCount = count + 1;
+        operation.active = true;
+        operation.item.devicePathChanged.connect(() => start(operation.item));
+        operation.item.devicePath = "/dev/" + cardName;
     }
 
-    onCardPathChanged: forget()
-
-    MemoryCardTexts {
-        id: texts
+    function follow(card) {
+        if (card.status === MemoryCardFormatter.Idle) {
+            fileSystem = card.filesystemType;
+        } else if (card.status === MemoryCardFormatter.Error) {
+            if (step() !== MemoryCardFormatter.Idle) {
+                fileSystem = "";
+            }
+            problem = problem || causeText(step());
+        } else {
+            steps.append({ status: card.status });
+            return;
+        }
+        operation.active = false;
     }
 
-    MemoryCardFormatter {
-        id: card
-        deviceName: page.cardName
-        devicePath: page.cardPath
-        onStatusChanged: steps.append({ status: status })
-        onMountError: page.error = error
-        onUnmountError: page.error = error
+    // The latest step. Idle until the disk service has answered the first request.
+    function step() {
+        return steps.count > 0 ? steps.get(steps.count - 1).status : MemoryCardFormatter.Idle;
     }
 
-    // A path is probed when it is set, and not again after formatting: a formatter that is made
-    // whenever the other has ended tells what is on the card then.
-    Loader {
-        id: fileSystem
-        readonly property string type: item ? item.filesystemType : ""
-
-        visible: false
-        active: page.cardPath !== "" && !card.busy
-        sourceComponent: MemoryCardFormatter {
-            devicePath: page.cardPath
+    function stepText(step) {
+        switch (step) {
+        case MemoryCardFormatter.Unmounting:
+            return qsTrId("gallery-card-unmounting");
+        case MemoryCardFormatter.Formatting:
+            return qsTrId("gallery-card-formatting");
+        case MemoryCardFormatter.RemovingFiles:
+            return qsTrId("gallery-card-removing-files");
+        case MemoryCardFormatter.Mounting:
+            return qsTrId("gallery-card-mounting");
+        case MemoryCardFormatter.Probing:
+            return qsTrId("gallery-card-probing");
+        default:
+            return qsTrId("gallery-card-waiting");
         }
     }
 
-    // The steps of what the user asked for last.
+    // For failures without a code: what failed is the step that was being done.
+    function causeText(step) {
+        switch (step) {
+        case MemoryCardFormatter.Formatting:
+            return qsTrId("gallery-card-formatting-failed");
+        case MemoryCardFormatter.RemovingFiles:
+            return qsTrId("gallery-card-removing-failed");
+        case MemoryCardFormatter.Mounting:
+            return qsTrId("gallery-card-mounting-failed");
+        case MemoryCardFormatter.Probing:
+            return qsTrId("gallery-card-probing-failed");
+        default:
+            return qsTrId("gallery-card-no-answer");
+        }
+    }
+
+    function fail(error) {
+        switch (error) {
+        // These two do not stop the operation.
+        case MemoryCardFormatter.ErrorAlreadyMounted:
+            note = qsTrId("gallery-card-already-mounted");
+            break;
+        case MemoryCardFormatter.ErrorAlreadyUnmounting:
+            note = qsTrId("gallery-card-already-unmounting");
+            break;
+        case MemoryCardFormatter.ErrorDeviceBusy:
+            problem = qsTrId("gallery-card-device-busy");
+            break;
+        case MemoryCardFormatter.ErrorNotMounted:
+            problem = qsTrId("gallery-card-not-mounted");
+            break;
+        case MemoryCardFormatter.ErrorMountedByOtherUser:
+            problem = qsTrId("gallery-card-other-user");
+            break;
+        case MemoryCardFormatter.ErrorNotAuthorized:
+        case MemoryCardFormatter.ErrorNotAuthorizedCanObtain:
+        case MemoryCardFormatter.ErrorNotAuthorizedDismissed:
+        case MemoryCardFormatter.ErrorOptionNotPermitted:
+            problem = qsTrId("gallery-card-not-authorized");
+            break;
+        case MemoryCardFormatter.ErrorNotSupported:
+            problem = qsTrId("gallery-card-not-supported");
+            break;
+        case MemoryCardFormatter.ErrorTimedout:
+            problem = qsTrId("gallery-card-timed-out");
+            break;
+        default:
+            problem = qsTrId("gallery-card-failed");
+        }
+    }
+
+    // A new card is probed only.
+    onCardNameChanged: {
+        operation.active = false;
+        fileSystem = "";
+        if (cardName) {
+            run(0, card => {});
+        }
+    }
+
+    Loader {
+        id: operation
+        visible: false
+        active: false
+        sourceComponent: MemoryCardFormatter {
+            deviceName: page.cardName
+            onStatusChanged: page.follow(this)
+            onMountError: page.fail(error)
+            onUnmountError: page.fail(error)
+        }
+    }
+
+    // Lists the types; without a path it does nothing else.
+    MemoryCardFormatter {
+        id: types
+    }
+
+    // The steps of the latest operation.
     ListModel {
         id: steps
     }
@@ -69,10 +158,10 @@ GalleryPage {
         property string type
 
         title: qsTrId("gallery-card-question")
-        text: qsTrId("gallery-card-question-text")
+        text: qsTrId("gallery-card-question-text").arg(type)
         yes: qsTrId("gallery-card-erase")
         no: qsTrId("gallery-card-cancel")
-        onAccepted: page.start(() => card.format(type))
+        onAccepted: page.run(3, card => card.format(type))
     }
 
     Question {
@@ -81,7 +170,7 @@ GalleryPage {
         text: qsTrId("gallery-card-empty-question-text")
         yes: qsTrId("gallery-card-remove")
         no: qsTrId("gallery-card-cancel")
-        onAccepted: page.start(() => card.removeAllFiles())
+        onAccepted: page.run(2, card => card.removeAllFiles())
     }
 
     Section {
@@ -94,28 +183,29 @@ GalleryPage {
         Value {
             visible: page.cardName !== ""
             name: qsTrId("gallery-card-status")
-            value: texts.status(card.status)
+            value: page.running ? stepText(step())
+                 : page.problem ? qsTrId("gallery-card-error") : qsTrId("gallery-card-idle")
         }
         Value {
             visible: page.cardName !== ""
             name: qsTrId("gallery-card-file-system")
-            value: fileSystem.type || qsTrId("gallery-unknown")
+            value: page.fileSystem || qsTrId("gallery-unknown")
         }
         Flow {
             Layout.fillWidth: true
             spacing: 8
-            enabled: page.cardName !== "" && !card.busy
+            enabled: page.cardName !== "" && !page.running
 
             Button {
                 text: qsTrId("gallery-card-mount")
-                onClicked: page.start(() => card.mount())
+                onClicked: page.run(1, card => card.mount())
             }
             Button {
                 text: qsTrId("gallery-card-unmount")
-                onClicked: page.start(() => card.unmount())
+                onClicked: page.run(1, card => card.unmount())
             }
             Repeater {
-                model: card.supportedFormatTypes
+                model: types.supportedFormatTypes
                 Button {
                     text: qsTrId("gallery-card-format").arg(modelData)
                     onClicked: {
@@ -132,26 +222,31 @@ GalleryPage {
     }
 
     Section {
-        // An empty path is probed like any other, and that fails.
         visible: page.cardName !== ""
         heading: qsTrId("gallery-card-steps")
 
         Repeater {
             model: steps
             Paragraph {
-                text: (index + 1) + ". " + texts.status(model.status)
+                text: (index + 1) + ". " + stepText(model.status)
             }
         }
+        // Of as many steps as the operation has, so that it does not only show that something goes on.
         ProgressBar {
             Layout.fillWidth: true
-            visible: card.busy
-            indeterminate: visible
+            visible: page.running
+            to: page.stepCount
+            value: steps.count
+            Accessible.name: qsTrId("gallery-card-progress")
+        }
+        Note {
+            visible: text !== ""
+            text: page.note
         }
         Paragraph {
-            visible: page.error !== page.noError || card.status === MemoryCardFormatter.Error
-            text: texts.error(page.error)
-            // A card that is mounted already is no obstacle.
-            color: card.status === MemoryCardFormatter.Error ? "#b00020" : "black"
+            visible: text !== ""
+            text: page.problem
+            color: "#b00020"
         }
     }
 }

@@ -3,7 +3,7 @@
 
 import QtQuick 2.15
 import com.marlo.settings.system 1.0
-import ".."
+import "controls"
 
 /*
     The variant of the modem software.

@@ -4,7 +4,8 @@
 import QtQuick 2.15
 import QtQuick.Layouts 1.15
 import com.marlo.settings.system 1.0
-import ".."
+import "controls"
+import "controls/display.js" as Display
 
 /*
     The quick actions as a home screen shows them: the enabled ones, in the user's order.
@@ -24,8 +25,8 @@ GalleryPage {
             Repeater {
                 model: actions
                 Tile {
-                    text: model.title || model.path
-                    icon.source: /^\//.test(model.icon) ? "file://" + model.icon : model.icon || ""
+                    text: Display.title(model.title, model.path)
+                    icon.source: Display.icon(model.icon)
                     onClicked: actions.triggerAction(index)
                 }
             }

@@ -4,13 +4,15 @@
 import QtQuick 2.15
 import QtQuick.Layouts 1.15
 import com.marlo.settings.system 1.0
-import ".."
+import "controls"
+import "controls/display.js" as Display
 
 /*
-    The page on which a user chooses quick actions and drags them into order.
+    The page on which a user chooses quick actions and puts them in order.
 */
 GalleryPage {
-    // Its rows are the user's list, entry by entry: what move() works on.
+    // Ordering takes a model of its own: move() expects that the rows are the user's list. With
+    // showPotential, they are not.
     QuickActionsModel {
         id: enabledActions
     }
@@ -26,6 +28,8 @@ GalleryPage {
         ReorderableList {
             Layout.fillWidth: true
             model: enabledActions
+            upText: qsTrId("gallery-move-up")
+            downText: qsTrId("gallery-move-down")
             onMoved: enabledActions.move(from, to)
         }
         Note {
@@ -40,9 +44,10 @@ GalleryPage {
         Repeater {
             model: allActions
             TextSwitch {
-                text: model.title || model.path
-                icon.source: /^\//.test(model.icon) ? "file://" + model.icon : model.icon || ""
-                // An item has an `enabled` of its own, so the role is asked of the model.
+                text: Display.title(model.title, model.path)
+                description: model.title ? "" : qsTrId("gallery-untitled")
+                icon.source: Display.icon(model.icon)
+                // Through the model: an item has a property `enabled` of its own.
                 checked: model.enabled
                 onToggled: {
                     if (checked) {

@@ -5,7 +5,7 @@ import QtQuick 2.15
 import QtQuick.Controls 2.15
 import QtQuick.Layouts 1.15
 import com.marlo.settings.system 1.0
-import ".."
+import "controls"
 
 /*
     The terms of use of the platform and of the vendor, in a language that can be chosen.
@@ -36,6 +36,7 @@ GalleryPage {
         ComboBox {
             Layout.fillWidth: true
             model: localeNames
+            Accessible.name: qsTrId("gallery-terms-locale")
             currentIndex: localeNames.indexOf(localeName)
             onActivated: localeName = localeNames[index]
         }

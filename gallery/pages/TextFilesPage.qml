@@ -3,7 +3,7 @@
 
 import QtQuick 2.15
 import com.marlo.settings.system 1.0
-import ".."
+import "controls"
 
 /*
     A text file, and the files of a folder as one text.

@@ -3,7 +3,8 @@
 
 import QtQuick 2.15
 import com.marlo.settings.system 1.0
-import ".."
+import "controls"
+import "controls/display.js" as Display
 
 /*
     Sentences of the titles of what is enabled, which follow the switches.
@@ -41,7 +42,7 @@ GalleryPage {
         Repeater {
             model: widgets
             TextSwitch {
-                text: model.title
+                text: Display.title(model.title, model.path)
                 checked: model.enabled
                 onToggled: {
                     if (checked) {
@@ -63,7 +64,7 @@ GalleryPage {
         Repeater {
             model: actions
             TextSwitch {
-                text: model.title || model.path
+                text: Display.title(model.title, model.path)
                 checked: model.enabled
                 onToggled: {
                     if (checked) {

@@ -3,6 +3,8 @@
 
 #include "messages.h"
 
+#include <QCoreApplication>
+#include <QEvent>
 #include <QMetaObject>
 
 #include <mutex>
@@ -50,6 +52,8 @@ Messages::~Messages()
 
 void Messages::clear()
 {
+    // What was logged before may still be in the event queue.
+    QCoreApplication::removePostedEvents(this, QEvent::MetaCall);
     beginResetModel();
     m_texts.clear();
     endResetModel();

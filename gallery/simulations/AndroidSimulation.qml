@@ -4,11 +4,14 @@
 import QtQuick 2.15
 import QtQuick.Layouts 1.15
 import ".."
+import "../pages/controls"
 
 /*
     The daemon of the Android runtime.
 */
 ColumnLayout {
+    spacing: 8
+
     SimulatedFilesSwitch {
         text: qsTrId("gallery-android-installed")
         path: "/usr/sbin/apkd"

@@ -4,11 +4,14 @@
 import QtQuick 2.15
 import QtQuick.Layouts 1.15
 import ".."
+import "../pages/controls"
 
 /*
     The file that the platform keeps the address in.
 */
 ColumnLayout {
+    spacing: 8
+
     SimulatedFilesSwitch {
         text: qsTrId("gallery-bluetooth-installed")
         path: "/var/lib/bluetooth/board-address"

@@ -6,11 +6,14 @@ import QtQuick.Controls 2.15
 import QtQuick.Layouts 1.15
 import gallery.simulation 1.0
 import ".."
+import "../pages/controls"
 
 /*
     The cover daemon on the system bus, and the cover that it sees.
 */
 ColumnLayout {
+    spacing: 8
+
     Repeater {
         model: [
             { cover: Simulation.NoDaemon, text: qsTrId("gallery-cover-no-daemon") },

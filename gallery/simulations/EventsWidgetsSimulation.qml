@@ -4,11 +4,14 @@
 import QtQuick 2.15
 import QtQuick.Layouts 1.15
 import ".."
+import "../pages/controls"
 
 /*
     The packages that offer widgets, and what one of them needs.
 */
 ColumnLayout {
+    spacing: 8
+
     SimulatedFilesSwitch {
         text: qsTrId("gallery-events-widgets-installed")
         path: "/usr/share/glimmera/eventswidgets/*.json"

@@ -4,11 +4,14 @@
 import QtQuick 2.15
 import QtQuick.Layouts 1.15
 import ".."
+import "../pages/controls"
 
 /*
     The packages of the online services, with their terms.
 */
 ColumnLayout {
+    spacing: 8
+
     SimulatedFilesSwitch {
         text: qsTrId("gallery-location-mls-installed")
         path: "/usr/share/geoclue-provider-mlsdb/agreements/*.txt"

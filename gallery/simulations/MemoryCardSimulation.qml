@@ -6,11 +6,14 @@ import QtQuick.Controls 2.15
 import QtQuick.Layouts 1.15
 import gallery.simulation 1.0
 import ".."
+import "../pages/controls"
 
 /*
     The card, its disk service and the program that formats.
 */
 ColumnLayout {
+    spacing: 8
+
     property var page
 
     Binding {

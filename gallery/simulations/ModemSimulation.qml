@@ -4,11 +4,14 @@
 import QtQuick 2.15
 import QtQuick.Layouts 1.15
 import ".."
+import "../pages/controls"
 
 /*
     The file that is installed with the modem software.
 */
 ColumnLayout {
+    spacing: 8
+
     SimulatedFilesSwitch {
         text: qsTrId("gallery-modem-installed")
         path: "/usr/share/modem-software/features.ini"

@@ -5,11 +5,14 @@ import QtQuick 2.15
 import QtQuick.Layouts 1.15
 import gallery.simulation 1.0
 import ".."
+import "../pages/controls"
 
 /*
     The packages that offer quick actions, and the services that these call.
 */
 ColumnLayout {
+    spacing: 8
+
     SimulatedFilesSwitch {
         text: qsTrId("gallery-quick-actions-installed")
         path: "/usr/share/glimmera/quickactions/*.conf"

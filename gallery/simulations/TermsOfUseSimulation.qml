@@ -4,11 +4,14 @@
 import QtQuick 2.15
 import QtQuick.Layouts 1.15
 import ".."
+import "../pages/controls"
 
 /*
     The packages of the platform's and of the vendor's terms.
 */
 ColumnLayout {
+    spacing: 8
+
     SimulatedFilesSwitch {
         text: qsTrId("gallery-terms-platform-installed")
         path: "/usr/share/marlo-settings/platform-eula/*.txt"

@@ -51,7 +51,7 @@ Gallery {
         { page: "quick-actions-settings", steps: [() => shows(qsTrId("notes-search"))] },
         { page: "quick-actions-settings", state: "broken", steps: [
             () => simulate(qsTrId("gallery-quick-actions-broken")),
-            () => shows("/usr/share/glimmera/quickactions/empty.conf")] },
+            () => shows("empty.conf")] },
         { page: "quick-actions-settings", state: "none", steps: [
             () => simulate(qsTrId("gallery-quick-actions-installed")),
             () => shows(qsTrId("gallery-quick-actions-not-installed"))] },
@@ -91,7 +91,7 @@ Gallery {
         { page: "memory-card", state: "mounted", steps: [
             () => probed(),
             () => press(qsTrId("gallery-card-mount")),
-            () => SimulatedCard.mounted && shows("2. " + qsTrId("gallery-card-idle")),
+            () => SimulatedCard.mounted && succeeded(),
             () => press(qsTrId("gallery-card-fill"))] },
         { page: "memory-card", state: "in-use", steps: [
             () => probed(),
@@ -102,18 +102,18 @@ Gallery {
             () => probed(),
             () => press(qsTrId("gallery-card-empty")),
             () => press(qsTrId("gallery-card-remove")),
-            () => SimulatedCard.fileCount === 0 && shows("2. " + qsTrId("gallery-card-idle"))] },
+            () => SimulatedCard.fileCount === 0 && succeeded()] },
         { page: "memory-card", state: "formatted", steps: [
             () => probed(),
             () => SimulatedCard.mounted || press(qsTrId("gallery-card-mount")),
-            () => SimulatedCard.mounted && shows("2. " + qsTrId("gallery-card-idle")),
+            () => SimulatedCard.mounted && succeeded(),
             () => press(qsTrId("gallery-card-format").arg("ext4")),
             () => press(qsTrId("gallery-card-erase")),
-            () => shows("4. " + qsTrId("gallery-card-idle")) && shows("ext4")] },
+            () => succeeded() && shows("ext4")] },
         { page: "memory-card", state: "unmounted", steps: [
             () => probed(),
             () => press(qsTrId("gallery-card-unmount")),
-            () => !SimulatedCard.mounted && shows("2. " + qsTrId("gallery-card-idle"))] },
+            () => !SimulatedCard.mounted && succeeded()] },
         { page: "memory-card", state: "not-mounted", steps: [
             () => probed(),
             () => press(qsTrId("gallery-card-unmount")),
@@ -126,22 +126,23 @@ Gallery {
         { page: "memory-card", state: "silent", steps: [
             () => probed(),
             () => press(qsTrId("gallery-card-service-silent")),
-            () => press(qsTrId("gallery-card-mount"))] },
+            () => press(qsTrId("gallery-card-mount")),
+            () => shows(qsTrId("gallery-card-waiting"))] },
         { page: "memory-card", state: "absent", steps: [
             () => probed(),
             () => press(qsTrId("gallery-card-service-absent")),
             () => press(qsTrId("gallery-card-mount")),
-            () => shows(qsTrId("gallery-card-failed"))] },
+            () => shows(qsTrId("gallery-card-no-answer"))] },
         { page: "memory-card", state: "without-helper", steps: [
             () => probed(),
             () => simulate(qsTrId("gallery-card-helper")),
             () => press(qsTrId("gallery-simulation-reload")),
-            () => shows(qsTrId("gallery-card-failed"))] },
+            () => shows(qsTrId("gallery-card-probing-failed"))] },
         // The last: the helper goes on when its page has gone, and nothing may mount the card then.
         { page: "memory-card", state: "busy", moving: true, steps: [
             () => probed(),
             () => SimulatedCard.mounted || press(qsTrId("gallery-card-mount")),
-            () => SimulatedCard.mounted && shows(qsTrId("gallery-card-idle")),
+            () => SimulatedCard.mounted && succeeded(),
             () => simulate(qsTrId("gallery-card-helper-waits")),
             () => press(qsTrId("gallery-card-format").arg("ext4")),
             () => press(qsTrId("gallery-card-erase")),
@@ -245,7 +246,11 @@ Gallery {
     }
 
     function cardIsIdle() {
-        return !Screen.visibleItems(surface).some(item => item.indeterminate);
+        return !currentPage.page.running;
+    }
+
+    function succeeded() {
+        return cardIsIdle() && shows(qsTrId("gallery-card-idle"));
     }
 
     function nextShot() {
@@ -296,7 +301,7 @@ Gallery {
         Simulation.language = shown.language;
         width = shown.width;
         height = shown.height;
-        logOpen = Qt.binding(() => width >= 900);
+        logOpen = Qt.binding(() => width >= 900 && Messages.count > 0);
         part = 0;
         grabbing = false;
         still.restart();

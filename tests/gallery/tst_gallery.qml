@@ -176,7 +176,7 @@ TestCase {
             gallery.openPage(data.tag);
         }
         for (const size of [[360, 640], [640, 360], [800, 600], [1280, 800], [1920, 1080]]) {
-            for (const language of ["en", "fi", "de"]) {
+            for (const language of ["en", "fi"]) {
                 Simulation.language = language;
                 gallery.width = size[0];
                 gallery.height = size[1];
@@ -205,6 +205,10 @@ TestCase {
         keyClick(Qt.Key_Return);
         tryCompare(gallery.currentPage, "title", gallery.pages[entry].title);
 
+        if (data.tag === "memory-card") {
+            // The probe disables the buttons.
+            waitForCard();
+        }
         const reached = [];
         for (let i = 0; i < 60 && !reached.includes("Open the page again"); ++i) {
             keyClick(Qt.Key_Tab);
@@ -351,9 +355,9 @@ TestCase {
 
         // One that has nothing to show is shown by its path.
         tap("An empty definition file is there");
-        see("/usr/share/glimmera/quickactions/empty.conf");
+        see("empty.conf");
         tap("An empty definition file is there");
-        seeNot("/usr/share/glimmera/quickactions/empty.conf");
+        seeNot("empty.conf");
         tap("Quick actions are installed");
         see("No quick action is installed.");
         see("No quick action is enabled.");
@@ -416,11 +420,13 @@ TestCase {
         tap("Mount");
         tryCompare(SimulatedCard, "mounted", true, patience);
         see("The card is mounted. Files and folders at its top: " + SimulatedCard.fileCount);
-        see("2. Ready");
+        see("Ready");
         tap("Put files on the card");
         until(() => SimulatedCard.fileCount >= 2, "filled");
         tap("Mount");
-        see("The card is mounted already.");
+        see("Note: the card was already mounted.");
+        see("1. Detecting the file system");
+        see("Ready");
         expectMessages(["AlreadyMounted"]);
 
         // Asked first; who declines keeps the files.
@@ -434,7 +440,7 @@ TestCase {
         tap("Remove");
         tryCompare(SimulatedCard, "fileCount", 0, patience);
         see("1. Removing files");
-        see("2. Ready");
+        see("Ready");
         expectMessages(["AlreadyMounted"]);
 
         tap("A program has a file on it open");
@@ -445,17 +451,19 @@ TestCase {
 
         tap("The helper program takes its time");
         tap("Format as ext4");
-        see("Everything on the card will be lost.");
+        see("Everything on the card will be lost. It will have an empty ext4 file system.");
         tap("Erase");
         see("2. Formatting");
-        verify(Screen.visibleItems(surface).some(item => item.indeterminate));
+        verify(Screen.visibleItems(surface).some(item => item.visualPosition > 0
+                                                         && item.to === 4));
         compare(Screen.control(surface, "Mount").enabled, false);
         tap("The helper program takes its time");
-        see("4. Ready");
+        see("4. Detecting the file system");
+        see("Ready");
         see("ext4");
         tap("Unmount");
-        see("2. Ready");
         see("The card is not mounted.");
+        see("Ready");
 
         tap("Format as ext4");
         tap("Erase");
@@ -467,11 +475,16 @@ TestCase {
         see("This is not allowed.");
         expectMessages(["NotAuthorized"]);
         tap("Is not there");
-        tap("Mount");
-        see("That did not succeed.");
-        expectMessages(["ServiceUnknown"]);
+        // The second failure is a failure, too.
+        for (let i = 0; i < 2; ++i) {
+            tap("Mount");
+            see("The disk service is missing or gave no valid answer.");
+            expectMessages(["ServiceUnknown"]);
+        }
         tap("Does not answer");
         tap("Mount");
+        see("Waiting for the disk service");
+        compare(Screen.control(surface, "Unmount").enabled, false);
         tap("Works");
         expectMessages(["DBus.Error."]);
         tryCompare(SimulatedCard, "ready", true, patience);
@@ -483,7 +496,7 @@ TestCase {
 
         tap("The helper program is installed");
         tap("Open the page again");
-        see("That did not succeed.");
+        see("The helper program could not detect a file system.");
         see("Unknown");
         tap("The helper program is installed");
         tap("The card is inserted");
@@ -533,6 +546,7 @@ TestCase {
         tap("The terms of MLS are installed");
         tap("Open the page again");
         see("The terms of this service could not be found.");
+        compare(Screen.texts(surface).filter(item => item.text === "Withdraw consent").length, 1);
         expectMessages(["No agreement found"]);
         tap("The terms of MLS are installed");
         tap("Open the page again");

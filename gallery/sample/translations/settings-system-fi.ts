@@ -113,7 +113,7 @@
     </message>
     <message id="gallery-card-about">
         <source></source>
-        <translation>Alustaa, tyhjentää, liittää ja irrottaa muistikortin ja kertoo, mitä sillä on.</translation>
+        <translation>Alustaa, tyhjentää, ottaa käyttöön ja irrottaa muistikortin ja näyttää sen tiedostojärjestelmän.</translation>
     </message>
     <message id="gallery-card-state">
         <source></source>
@@ -145,7 +145,7 @@
     </message>
     <message id="gallery-card-question-text">
         <source></source>
-        <translation>Kaikki kortilla oleva katoaa.</translation>
+        <translation>Kaikki kortilla oleva häviää. Kortille luodaan tyhjä %1-tiedostojärjestelmä.</translation>
     </message>
     <message id="gallery-card-erase">
         <source></source>
@@ -181,7 +181,7 @@
     </message>
     <message id="gallery-card-probing">
         <source></source>
-        <translation>Tutkitaan korttia</translation>
+        <translation>Tunnistetaan tiedostojärjestelmää</translation>
     </message>
     <message id="gallery-card-error">
         <source></source>
@@ -189,7 +189,7 @@
     </message>
     <message id="gallery-card-failed">
         <source></source>
-        <translation>Se ei onnistunut.</translation>
+        <translation>Levypalvelu ilmoitti virheestä.</translation>
     </message>
     <message id="gallery-card-device-busy">
         <source></source>
@@ -197,7 +197,7 @@
     </message>
     <message id="gallery-card-already-mounted">
         <source></source>
-        <translation>Kortti on jo liitetty.</translation>
+        <translation>Huomaa: kortti oli jo käytössä.</translation>
     </message>
     <message id="gallery-card-not-mounted">
         <source></source>
@@ -505,7 +505,7 @@
     </message>
     <message id="gallery-quick-actions-keys">
         <source></source>
-        <translation>Vetämisen lisäksi rivi siirtyy Ctrl- ja nuolinäppäimillä. Muuttuneet tiedostot huomataan sekunnin kuluttua.</translation>
+        <translation>Myös Ctrl ja nuolinäppäimet siirtävät riviä. Muuttuneet tiedostot näkyvät sekunnin kuluttua.</translation>
     </message>
     <message id="gallery-events-widgets-none">
         <source></source>
@@ -525,7 +525,7 @@
     </message>
     <message id="gallery-titles-language">
         <source></source>
-        <translation>Kielen vaihtuessa lauseet uusiutuvat, kun sivu avataan uudelleen.</translation>
+        <translation>Kielen vaihtuessa lauseet muuttuvat, kun sivu avataan uudelleen.</translation>
     </message>
     <message id="gallery-card-none">
         <source></source>
@@ -622,6 +622,50 @@
     <message id="gallery-cover-note">
         <source></source>
         <translation>Kun palvelu katoaa, avoin sivu muistaa, mitä tiesi.</translation>
+    </message>
+    <message id="gallery-card-waiting">
+        <source></source>
+        <translation>Odotetaan levypalvelua</translation>
+    </message>
+    <message id="gallery-card-progress">
+        <source></source>
+        <translation>Edistyminen</translation>
+    </message>
+    <message id="gallery-card-no-answer">
+        <source></source>
+        <translation>Levypalvelu puuttuu tai ei vastannut oikein.</translation>
+    </message>
+    <message id="gallery-card-probing-failed">
+        <source></source>
+        <translation>Apuohjelma ei tunnistanut tiedostojärjestelmää.</translation>
+    </message>
+    <message id="gallery-card-formatting-failed">
+        <source></source>
+        <translation>Apuohjelma ei voinut alustaa korttia.</translation>
+    </message>
+    <message id="gallery-card-removing-failed">
+        <source></source>
+        <translation>Kaikkia tiedostoja ei voitu poistaa.</translation>
+    </message>
+    <message id="gallery-card-mounting-failed">
+        <source></source>
+        <translation>Kortin tiedostoja ei löytynyt.</translation>
+    </message>
+    <message id="gallery-card-already-unmounting">
+        <source></source>
+        <translation>Huomaa: korttia irrotetaan jo.</translation>
+    </message>
+    <message id="gallery-move-up">
+        <source></source>
+        <translation>Siirrä ylös: %1</translation>
+    </message>
+    <message id="gallery-move-down">
+        <source></source>
+        <translation>Siirrä alas: %1</translation>
+    </message>
+    <message id="gallery-untitled">
+        <source></source>
+        <translation>Tässä määrittelytiedostossa ei ole otsikkoa.</translation>
     </message>
 </context>
 </TS>

@@ -33,7 +33,7 @@
     </message>
     <message id="gallery-quick-actions-language">
         <source></source>
-        <translation>In another language, actions with a catalog of their own keep their titles until the page is opened anew.</translation>
+        <translation>In another language, actions with a catalog of their own keep their titles until the page is opened again.</translation>
     </message>
     <message id="gallery-received-calls">
         <source></source>
@@ -113,7 +113,7 @@
     </message>
     <message id="gallery-card-about">
         <source></source>
-        <translation>Formats, empties, mounts and unmounts a memory card, and tells what is on it.</translation>
+        <translation>Formats, empties, mounts and unmounts a memory card, and shows its file system.</translation>
     </message>
     <message id="gallery-card-state">
         <source></source>
@@ -145,7 +145,7 @@
     </message>
     <message id="gallery-card-question-text">
         <source></source>
-        <translation>Everything on the card will be lost.</translation>
+        <translation>Everything on the card will be lost. It will have an empty %1 file system.</translation>
     </message>
     <message id="gallery-card-erase">
         <source></source>
@@ -181,7 +181,7 @@
     </message>
     <message id="gallery-card-probing">
         <source></source>
-        <translation>Looking at the card</translation>
+        <translation>Detecting the file system</translation>
     </message>
     <message id="gallery-card-error">
         <source></source>
@@ -189,7 +189,7 @@
     </message>
     <message id="gallery-card-failed">
         <source></source>
-        <translation>That did not succeed.</translation>
+        <translation>The disk service reported an error.</translation>
     </message>
     <message id="gallery-card-device-busy">
         <source></source>
@@ -197,7 +197,7 @@
     </message>
     <message id="gallery-card-already-mounted">
         <source></source>
-        <translation>The card is mounted already.</translation>
+        <translation>Note: the card was already mounted.</translation>
     </message>
     <message id="gallery-card-not-mounted">
         <source></source>
@@ -505,7 +505,7 @@
     </message>
     <message id="gallery-quick-actions-keys">
         <source></source>
-        <translation>Besides dragging, Ctrl and the arrow keys move a row. Changed files are seen after a second.</translation>
+        <translation>Ctrl and the arrow keys move a row, too. The page shows changed files after a second.</translation>
     </message>
     <message id="gallery-events-widgets-none">
         <source></source>
@@ -525,7 +525,7 @@
     </message>
     <message id="gallery-titles-language">
         <source></source>
-        <translation>In another language, the sentences are new when the page is opened anew.</translation>
+        <translation>In another language, the sentences change when the page is opened again.</translation>
     </message>
     <message id="gallery-card-none">
         <source></source>
@@ -622,6 +622,50 @@
     <message id="gallery-cover-note">
         <source></source>
         <translation>When the daemon goes, an open page keeps what it knew.</translation>
+    </message>
+    <message id="gallery-card-waiting">
+        <source></source>
+        <translation>Waiting for the disk service</translation>
+    </message>
+    <message id="gallery-card-progress">
+        <source></source>
+        <translation>Progress</translation>
+    </message>
+    <message id="gallery-card-no-answer">
+        <source></source>
+        <translation>The disk service is missing or gave no valid answer.</translation>
+    </message>
+    <message id="gallery-card-probing-failed">
+        <source></source>
+        <translation>The helper program could not detect a file system.</translation>
+    </message>
+    <message id="gallery-card-formatting-failed">
+        <source></source>
+        <translation>The helper program could not format the card.</translation>
+    </message>
+    <message id="gallery-card-removing-failed">
+        <source></source>
+        <translation>Some files could not be removed.</translation>
+    </message>
+    <message id="gallery-card-mounting-failed">
+        <source></source>
+        <translation>The files on the card could not be found.</translation>
+    </message>
+    <message id="gallery-card-already-unmounting">
+        <source></source>
+        <translation>Note: the card is already being unmounted.</translation>
+    </message>
+    <message id="gallery-move-up">
+        <source></source>
+        <translation>Move up: %1</translation>
+    </message>
+    <message id="gallery-move-down">
+        <source></source>
+        <translation>Move down: %1</translation>
+    </message>
+    <message id="gallery-untitled">
+        <source></source>
+        <translation>This definition file has no title.</translation>
     </message>
 </context>
 </TS>

@@ -7,7 +7,8 @@ import QtQuick.Controls.Universal 2.15
 import QtQuick.Layouts 1.15
 
 /*
-    A part of a page, under a title. All sections of a page are of the same width.
+    A part of a page, under a title. All sections of a page have the same width, and on a wide
+    window not more than is easy to read.
 */
 Pane {
     property alias heading: heading.text
@@ -15,13 +16,14 @@ Pane {
 
     Layout.fillWidth: true
     Layout.preferredWidth: 1
-    Layout.alignment: Qt.AlignTop
+    Layout.maximumWidth: parent.columns > 1 ? 520 : -1
+    Layout.alignment: Qt.AlignTop | Qt.AlignLeft
     padding: 12
     background: Card {}
 
     contentItem: ColumnLayout {
         id: column
-        spacing: 4
+        spacing: 8
 
         Label {
             id: heading

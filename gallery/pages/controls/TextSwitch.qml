@@ -16,7 +16,8 @@ SwitchDelegate {
     property string remark
 
     Layout.fillWidth: true
-    // Delegates are made for lists, and have none.
+    Accessible.description: [description, remark].filter(text => text).join(" ")
+    // Delegates are made for lists and get no focus by default.
     focusPolicy: Qt.StrongFocus
     horizontalPadding: 0
 

@@ -3,6 +3,7 @@
 
 import QtQuick 2.15
 import QtQuick.Controls 2.15
+import QtQuick.Controls.Universal 2.15
 
 /*
     Asks before something is done that cannot be undone.
@@ -18,8 +19,12 @@ Dialog {
     anchors.centerIn: parent
     width: Math.min(parent.width - 32, 400)
     modal: true
+    // Without it, keys reach the page behind the dialog.
+    focus: true
+    // The button that changes nothing.
+    onOpened: noButton.forceActiveFocus(Qt.TabFocusReason)
 
-    // Of a width of its own, and so of a height that is known at once.
+    // A label with a width of its own has its final height at once.
     Label {
         id: label
         width: question.availableWidth
@@ -29,10 +34,17 @@ Dialog {
         Button {
             id: noButton
             DialogButtonBox.buttonRole: DialogButtonBox.RejectRole
+            Keys.onReturnPressed: clicked()
+            Keys.onEnterPressed: clicked()
         }
         Button {
             id: yesButton
             DialogButtonBox.buttonRole: DialogButtonBox.AcceptRole
+            highlighted: true
+            Universal.theme: Universal.Dark
+            Universal.accent: "#b00020"
+            Keys.onReturnPressed: clicked()
+            Keys.onEnterPressed: clicked()
         }
     }
 }

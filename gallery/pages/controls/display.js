@@ -1,0 +1,16 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+.pragma library
+
+// How pages show the rows of the models.
+
+// The URL of an icon. A definition file names its icon by a path or by a URL such as image://theme/name.
+function icon(value) {
+    return /^\//.test(value) ? "file://" + encodeURI(value).replace(/[?#]/g, encodeURIComponent)
+                             : value || "";
+}
+
+// The title of a row. A definition that has none is shown by the name of its file.
+function title(title, path) {
+    return title || path.replace(/^.*\//, "");
+}

@@ -5,13 +5,16 @@
 
 #include "commonchecks.h"
 #include "eventswidgets/eventswidgetsfile.h"
-#include "eventswidgets/jsonreader.h"
+#include "jsonwalker.h"
 #include "readerlog.h"
 
+#include <QJsonArray>
+#include <QJsonDocument>
 #include <QStringList>
 
 #include <algorithm>
 #include <array>
+#include <cctype>
 #include <optional>
 #include <utility>
 
@@ -20,6 +23,7 @@ using Widget = EventsWidget;
 
 namespace {
 
+const QLatin1String unreadableRule("unreadable");
 const QLatin1String jsonRule("json");
 const QLatin1String repeatedKeyRule("repeated-key");
 const QLatin1String typeRule("type");
@@ -29,10 +33,12 @@ const QLatin1String orderRule("order");
 const QLatin1String duplicatePathRule("duplicate-path");
 const QLatin1String relativePathRule("relative-path");
 
+const QByteArray byteOrderMark = QByteArrayLiteral("\xef\xbb\xbf");
+
 enum class Type { Text, Integer, Boolean, Array, Any };
 
 struct Key {
-    std::string_view name;
+    const char *name;
     Type type;
 };
 
@@ -66,11 +72,6 @@ constexpr std::array<Key, WidgetKeyCount> widgetKeys = {{
     {"available_path", Type::Text},
 }};
 
-QString toString(std::string_view text)
-{
-    return QString::fromUtf8(text.data(), int(text.size()));
-}
-
 QString nameOf(Type type)
 {
     switch (type) {
@@ -88,6 +89,24 @@ QString nameOf(Type type)
     return QStringLiteral("anything");
 }
 
+bool isOf(Type type, const QJsonValue &value)
+{
+    switch (type) {
+    case Type::Text:
+        return value.isString();
+    case Type::Integer:
+        // Of any other value, toInt() returns what it is given.
+        return value.toInt(0) == value.toInt(-1);
+    case Type::Boolean:
+        return value.isBool();
+    case Type::Array:
+        return value.isArray();
+    case Type::Any:
+        break;
+    }
+    return true;
+}
+
 class EventsWidgetsCheck
 {
 public:
@@ -101,15 +120,19 @@ public:
     void check();
 
 private:
-    // The lines of the known keys of an object, 0 for those that it lacks.
-    template<size_t count> using Lines = std::array<int, count>;
+    // Of a known key of an object; of a key that is repeated, the last one. Line 0 if there is none.
+    struct Member {
+        int line = 0;
+        int position = 0; // Of the value.
+        QJsonValue value = QJsonValue::Undefined;
+    };
+    template<size_t count> using Members = std::array<Member, count>;
 
-    template<size_t count, typename Visit>
-    Lines<count> checkMembers(const std::array<Key, count> &keys, JsonReader *reader,
-                              const Visit &visit);
-    bool isOf(Type type, const JsonReader &reader) const;
-    void checkEntry(JsonReader *reader);
-    void checkWidget(const Widget &widget, const Lines<WidgetKeyCount> &lines, int line);
+    template<size_t count>
+    Members<count> checkMembers(const std::array<Key, count> &keys, int position);
+    void checkEntry(int position);
+    void checkWidget(const Widget &widget, const Members<WidgetKeyCount> &members, int line);
+    void checkTexts(const Widget &widget, const Members<WidgetKeyCount> &members);
     int lineOf(int position);
     void add(int line, Severity severity, QLatin1String rule, const QString &text)
     {
@@ -123,144 +146,113 @@ private:
     Findings *const m_findings;
     // The next of the widgets that the reader has found.
     size_t m_next = 0;
-    // The lines are counted while the text is passed.
+    // Lines are counted from the last position that was asked for.
     int m_counted = 0;
     int m_line = 1;
 };
 
 void EventsWidgetsCheck::check()
 {
-    JsonReader reader(m_content);
-    if (!reader.beginObject()) {
-        return;
-    }
-    std::optional<JsonReader> widgets;
-    const auto lines =
-        checkMembers(fileKeys, &reader, [&widgets](size_t key, const JsonReader &value) {
-            if (key == WidgetsKey) {
-                // Of several the last one counts.
-                widgets.emplace(value);
-            }
-        });
-    checkCatalog(m_file.translationCatalog, lines[CatalogKey], m_context, m_findings);
-    if (widgets && widgets->beginArray()) {
-        while (widgets->nextElement()) {
-            checkEntry(&*widgets);
+    const int start = m_content.indexOf('{');
+    const auto members = checkMembers(fileKeys, start);
+    checkCatalog(m_file.translationCatalog, members[CatalogKey].line, m_context, m_findings);
+    const Member &widgets = members[WidgetsKey];
+    if (widgets.value.isArray()) {
+        JsonWalker entries(m_content, widgets.position);
+        while (entries.next()) {
+            checkEntry(entries.position());
         }
     }
 }
 
-template<size_t count, typename Visit>
-EventsWidgetsCheck::Lines<count>
-EventsWidgetsCheck::checkMembers(const std::array<Key, count> &keys, JsonReader *reader,
-                                 const Visit &visit)
+template<size_t count>
+EventsWidgetsCheck::Members<count>
+EventsWidgetsCheck::checkMembers(const std::array<Key, count> &keys, int position)
 {
-    Lines<count> lines = {};
-    std::string_view name;
-    while (reader->nextMember(&name)) {
-        const int line = lineOf(reader->position());
-        const auto key = std::find_if(keys.cbegin(), keys.cend(),
-                                      [name](const Key &k) { return k.name == name; });
+    Members<count> members;
+    JsonWalker walker(m_content, position);
+    while (walker.next()) {
+        const QString name = walker.key();
+        const int line = lineOf(walker.position());
+        const auto key = std::find_if(keys.cbegin(), keys.cend(), [&name](const Key &k) {
+            return name == QLatin1String(k.name);
+        });
         if (key == keys.cend()) {
             QStringList known;
             for (const Key &k : keys) {
-                known.append(toString(k.name));
+                known.append(QLatin1String(k.name));
             }
-            reportUnknownKey(QStringLiteral("key"), toString(name), known, line, m_findings);
-        } else {
-            const auto index = size_t(key - keys.cbegin());
-            if (lines.at(index) > 0) {
-                add(lines.at(index), Severity::Error, repeatedKeyRule,
-                    QStringLiteral("the key %1 stands again in line %2, and only that counts")
-                        .arg(quoted(toString(name)), QString::number(line)));
-            }
-            lines.at(index) = line;
-            if (!isOf(key->type, *reader)) {
-                add(line, Severity::Error, typeRule,
-                    QStringLiteral("the value of %1 is not %2 and is passed over")
-                        .arg(quoted(toString(name)), nameOf(key->type)));
-            }
-            visit(index, *reader);
+            reportUnknownKey(QStringLiteral("key"), name, known, line, m_findings);
+            continue;
         }
-        reader->skip();
+        Member &member = members.at(size_t(key - keys.cbegin()));
+        if (member.line > 0) {
+            add(member.line, Severity::Error, repeatedKeyRule,
+                QStringLiteral("the key %1 stands again in line %2, and only that counts")
+                    .arg(quoted(name), QString::number(line)));
+        }
+        member = {line, walker.position(), walker.value()};
+        if (!isOf(key->type, member.value)) {
+            add(line, Severity::Error, typeRule,
+                QStringLiteral("the value of %1 is not %2 and is passed over")
+                    .arg(quoted(name), nameOf(key->type)));
+        }
     }
-    return lines;
+    return members;
 }
 
-// The reader judges: of another type, it gives what it was told to give instead.
-bool EventsWidgetsCheck::isOf(Type type, const JsonReader &reader) const
+void EventsWidgetsCheck::checkEntry(int position)
 {
-    JsonReader copy(reader);
-    const char first = *(m_content.constData() + copy.position()); // Zero at the end.
-    switch (type) {
-    case Type::Text:
-        return first == '"';
-    case Type::Integer: {
-        JsonReader another(reader);
-        return copy.readInt(0) == another.readInt(-1);
-    }
-    case Type::Boolean:
-        return first == 't' || first == 'f';
-    case Type::Array:
-        return first == '[';
-    case Type::Any:
-        break;
-    }
-    return true;
-}
-
-void EventsWidgetsCheck::checkEntry(JsonReader *reader)
-{
-    const int line = lineOf(reader->position());
-    if (!reader->beginObject()) {
+    const int line = lineOf(position);
+    if (m_content.at(position) != '{') {
         add(line, Severity::Error, widgetRule, QStringLiteral("this is no object and passed over"));
         return;
     }
-    QString path;
-    bool isText = false;
-    const auto lines =
-        checkMembers(widgetKeys, reader, [this, &path, &isText](size_t key, JsonReader value) {
-            if (key == PathKey) {
-                isText = isOf(Type::Text, value);
-                path = value.readString();
-            }
-        });
-    // What the reader has rejected is not among what it gave.
-    if (m_next < m_file.widgets.size() && m_file.widgets.at(m_next).path == path) {
-        checkWidget(m_file.widgets.at(m_next), lines, line);
+    const auto members = checkMembers(widgetKeys, position);
+    const Member &path = members[PathKey];
+    // What the reader has rejected is not among what it returned.
+    if (m_next < m_file.widgets.size() && m_file.widgets.at(m_next).path == path.value.toString()) {
+        checkWidget(m_file.widgets.at(m_next), members, line);
         ++m_next;
     } else {
-        add(lines[PathKey] > 0 ? lines[PathKey] : line, Severity::Error, pathRule,
-            lines[PathKey] == 0 ? QStringLiteral("there is no \"path\": the widget is passed over")
-                : isText        ? QStringLiteral("\"path\" is empty: the widget is passed over")
-                         : QStringLiteral("\"path\" is not a text: the widget is passed over"));
+        add(path.line > 0 ? path.line : line, Severity::Error, pathRule,
+            path.line == 0 ? QStringLiteral("there is no \"path\": the widget is passed over")
+                : path.value.isString()
+                ? QStringLiteral("\"path\" is empty: the widget is passed over")
+                : QStringLiteral("\"path\" is not a text: the widget is passed over"));
     }
 }
 
-void EventsWidgetsCheck::checkWidget(const Widget &widget, const Lines<WidgetKeyCount> &lines,
+void EventsWidgetsCheck::checkWidget(const Widget &widget, const Members<WidgetKeyCount> &members,
                                      int line)
 {
     const auto known = m_context->widgets.constFind(widget.path);
     if (known == m_context->widgets.constEnd()) {
-        m_context->widgets.insert(widget.path, {m_path, lines[PathKey]});
+        m_context->widgets.insert(widget.path, {m_path, members[PathKey].line});
     } else {
-        add(lines[PathKey], Severity::Warning, duplicatePathRule,
+        add(members[PathKey].line, Severity::Warning, duplicatePathRule,
             QStringLiteral("the path %1 stands in %2:%3 too, and one of the two widgets is lost")
                 .arg(quoted(widget.path), known->file, QString::number(known->line)));
     }
-    if (lines[OrderKey] == 0) {
+    if (members[OrderKey].line == 0) {
         add(line, Severity::Warning, orderRule,
             QStringLiteral("without \"order\" the widget comes last"));
     }
-    checkTextId(widget.translationId, widget.translationCatalog, lines[TranslationIdKey], m_context,
-                m_findings);
-    checkTextId(widget.descriptionId, widget.translationCatalog, lines[DescriptionIdKey], m_context,
-                m_findings);
-    checkIcon(widget.icon, lines[IconKey], m_findings);
+    checkTexts(widget, members);
+    checkIcon(widget.icon, members[IconKey].line, m_findings);
     if (!widget.availablePath.isEmpty() && !widget.availablePath.startsWith(QLatin1Char('/'))) {
-        add(lines[AvailablePathKey], Severity::Warning, relativePathRule,
+        add(members[AvailablePathKey].line, Severity::Warning, relativePathRule,
             QStringLiteral("the available path %1 is a relative path")
                 .arg(quoted(widget.availablePath)));
+    }
+}
+
+// The title and the description.
+void EventsWidgetsCheck::checkTexts(const Widget &widget, const Members<WidgetKeyCount> &members)
+{
+    for (const auto &[id, key] : {std::pair(widget.translationId, TranslationIdKey),
+                                  std::pair(widget.descriptionId, DescriptionIdKey)}) {
+        checkTextId(id, widget.translationCatalog, members.at(key).line, m_context, m_findings);
     }
 }
 
@@ -275,21 +267,44 @@ int EventsWidgetsCheck::lineOf(int position)
     return m_line;
 }
 
+bool isSpace(char character)
+{
+    return std::isspace(static_cast<unsigned char>(character)) != 0;
+}
+
+// Whether a text is JSON that QJsonDocument refuses because it is neither an object nor an array.
+bool isScalar(const QByteArray &text)
+{
+    return QJsonDocument::fromJson('[' + text + ']').array().size() == 1;
+}
+
 // A file that the reader has refused.
 void reportRefused(const QByteArray &content, Findings *findings)
 {
-    JsonReader reader(content);
-    const int start = reader.position();
-    reader.skip();
-    const bool isJson = reader.atEnd();
-    const int position = isJson ? start : reader.position();
-    // What ends too early does so where it ends, not in an empty line behind that.
-    const QByteArray before =
-        position < content.size() ? content.left(position) : content.trimmed();
-    findings->add(int(before.count('\n')) + 1, Severity::Error, jsonRule,
-                  isJson ? QStringLiteral("this is no object: nothing of the file is read")
-                         : QStringLiteral("from here on this is no JSON: nothing of the file is "
-                                          "read"));
+    const auto report = [&content, findings](int position, QLatin1String rule, const char *text) {
+        findings->add(int(content.left(position).count('\n')) + 1, Severity::Error, rule,
+                      QStringLiteral("%1: nothing of the file is read").arg(QLatin1String(text)));
+    };
+    if (isTooComplex(content)) {
+        report(0, unreadableRule, "there are more than a million objects and arrays");
+        return;
+    }
+    QJsonParseError error = {};
+    const QJsonDocument document = QJsonDocument::fromJson(content, &error);
+    int start = content.startsWith(byteOrderMark) ? byteOrderMark.size() : 0;
+    while (start < content.size() && isSpace(content.at(start))) {
+        ++start;
+    }
+    if (document.isArray() || isScalar(content.mid(start))) {
+        report(start, jsonRule, "this is no object");
+        return;
+    }
+    // A file that ends too early is wrong where it ends, not in an empty line after that.
+    int end = content.size();
+    while (end > 0 && isSpace(content.at(end - 1))) {
+        --end;
+    }
+    report(std::min(error.offset, end), jsonRule, "from here on this is no JSON");
 }
 
 } // namespace
@@ -302,7 +317,8 @@ void checkEventsWidgets(const QString &path, CheckContext *context, Findings *fi
     if (reportUnreadable(path, maximumEventsWidgetsSize, &content, findings)) {
         return;
     }
-    if (file) {
+    // The walker relies on what QJsonDocument accepts, and the file may have changed since it was read.
+    if (file && !isTooComplex(content) && QJsonDocument::fromJson(content).isObject()) {
         EventsWidgetsCheck(path, std::move(content), *file, context, findings).check();
     } else {
         reportRefused(content, findings);

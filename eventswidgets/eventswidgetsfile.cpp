@@ -4,82 +4,55 @@
 #include "eventswidgetsfile.h"
 
 #include "files/regularfile.h"
-#include "jsonreader.h"
 
+#include <QJsonArray>
+#include <QJsonDocument>
+#include <QJsonObject>
 #include <QtDebug>
 
 #include <algorithm>
-#include <string_view>
 
 namespace {
 
-constexpr std::string_view translationCatalogKey("translation_catalog");
-constexpr std::string_view widgetsKey("widgets");
+const QLatin1String translationCatalogKey("translation_catalog");
+const QLatin1String widgetsKey("widgets");
 
-constexpr std::string_view pathKey("path");
-constexpr std::string_view titleKey("title");
-constexpr std::string_view translationIdKey("translation_id");
-constexpr std::string_view descriptionIdKey("description_id");
-constexpr std::string_view iconKey("icon");
-constexpr std::string_view orderKey("order");
-constexpr std::string_view defaultEnabledKey("default_enabled");
-constexpr std::string_view availablePathKey("available_path");
+const QLatin1String pathKey("path");
+const QLatin1String titleKey("title");
+const QLatin1String translationIdKey("translation_id");
+const QLatin1String descriptionIdKey("description_id");
+const QLatin1String iconKey("icon");
+const QLatin1String orderKey("order");
+const QLatin1String defaultEnabledKey("default_enabled");
+const QLatin1String availablePathKey("available_path");
 
 constexpr int noOrder = -1;
 
-// The log is written while the main thread waits: no more lines than anybody reads.
+// The main thread waits while the log is written: no more lines than anybody reads.
 constexpr int maximumWarnings = 1000;
 
-EventsWidget readWidget(JsonReader *reader)
+EventsWidget readWidget(const QJsonObject &object)
 {
     EventsWidget widget;
-    if (!reader->beginObject()) {
-        return widget;
-    }
-    std::string_view key;
-    while (reader->nextMember(&key)) {
-        if (key == pathKey) {
-            widget.path = reader->readString();
-        } else if (key == titleKey) {
-            widget.title = reader->readString();
-        } else if (key == translationIdKey) {
-            widget.translationId = reader->readString();
-        } else if (key == descriptionIdKey) {
-            widget.descriptionId = reader->readString();
-        } else if (key == iconKey) {
-            widget.icon = reader->readString();
-        } else if (key == orderKey) {
-            widget.order = reader->readInt(noOrder);
-        } else if (key == defaultEnabledKey) {
-            widget.defaultEnabled = reader->readBool();
-        } else if (key == availablePathKey) {
-            widget.availablePath = reader->readString();
-        } else {
-            reader->skip();
-        }
-    }
+    widget.path = object.value(pathKey).toString();
+    widget.title = object.value(titleKey).toString();
+    widget.translationId = object.value(translationIdKey).toString();
+    widget.descriptionId = object.value(descriptionIdKey).toString();
+    widget.icon = object.value(iconKey).toString();
+    widget.order = object.value(orderKey).toInt(noOrder);
+    widget.defaultEnabled = object.value(defaultEnabledKey).toBool();
+    widget.availablePath = object.value(availablePathKey).toString();
     return widget;
 }
 
-// Counts the entries that are no widgets.
-std::vector<EventsWidget> readWidgets(JsonReader *reader, int *rejected)
-{
-    std::vector<EventsWidget> widgets;
-    *rejected = 0;
-    if (reader->beginArray()) {
-        while (reader->nextElement()) {
-            EventsWidget widget = readWidget(reader);
-            if (widget.path.isEmpty()) {
-                ++*rejected;
-            } else {
-                widgets.push_back(std::move(widget));
-            }
-        }
-    }
-    return widgets;
-}
-
 } // namespace
+
+bool isTooComplex(const QByteArray &json)
+{
+    return std::count_if(json.cbegin(), json.cend(),
+                         [](char character) { return character == '{' || character == '['; })
+        > maximumContainers;
+}
 
 std::optional<EventsWidgetsFile> readEventsWidgetsFile(const QString &path)
 {
@@ -89,33 +62,30 @@ std::optional<EventsWidgetsFile> readEventsWidgetsFile(const QString &path)
         qWarning() << "Failed to open" << path;
         return {};
     }
-    EventsWidgetsFile file;
-    // Of a file that is too large there is none.
-    JsonReader reader(text.content);
-    int rejected = 0;
-    const bool isObject = reader.beginObject();
-    std::string_view key;
-    while (isObject && reader.nextMember(&key)) {
-        if (key == translationCatalogKey) {
-            file.translationCatalog = reader.readString();
-        } else if (key == widgetsKey) {
-            file.widgets = readWidgets(&reader, &rejected);
-        } else {
-            reader.skip();
-        }
-    }
-    if (!isObject || !reader.atEnd()) {
+    // The content of a file that is too large is empty.
+    const QJsonDocument document =
+        isTooComplex(text.content) ? QJsonDocument() : QJsonDocument::fromJson(text.content);
+    if (!document.isObject()) {
         qWarning() << "Invalid Events Widget" << path;
         return {};
     }
 
-    for (int i = 0; i < std::min(rejected, maximumWarnings); ++i) {
-        qWarning() << "Invalid widget defined in" << path;
-    }
-    for (EventsWidget &widget : file.widgets) {
+    EventsWidgetsFile file;
+    file.translationCatalog = document[translationCatalogKey].toString();
+    int rejected = 0;
+    const QJsonArray entries = document[widgetsKey].toArray();
+    for (const QJsonValue &entry : entries) {
+        EventsWidget widget = readWidget(entry.toObject());
+        if (widget.path.isEmpty()) {
+            if (++rejected <= maximumWarnings) {
+                qWarning() << "Invalid widget defined in" << path;
+            }
+            continue;
+        }
         widget.file = path;
         widget.translationCatalog = file.translationCatalog;
         widget.available = widget.isAvailable();
+        file.widgets.push_back(std::move(widget));
     }
     return file;
 }

@@ -9,9 +9,14 @@
 #include <optional>
 #include <vector>
 
-// A definition takes a few hundred bytes a widget. The main thread reads it, and in memory it may
-// take ten times its size: whatever is larger than this is none.
+// A widget takes a few hundred bytes of a file, and two containers are enough for a file of one. The
+// main thread reads the file, and QJsonDocument takes up to 16 bytes per byte of it and 160 per
+// container: files with more than this are invalid.
 constexpr qint64 maximumEventsWidgetsSize = qint64(32) * 1024 * 1024;
+constexpr int maximumContainers = 1000000;
+
+// Whether a text has more objects and arrays than that; brackets in its strings count as well.
+bool isTooComplex(const QByteArray &json);
 
 /*
     A definition file of events widgets: a value that is read once and needs no model.

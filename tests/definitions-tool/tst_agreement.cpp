@@ -5,6 +5,7 @@
 
 #include "definitions-tool/definitionschecker.h"
 #include "definitions-tool/inilines.h"
+#include "definitions-tool/jsonwalker.h"
 #include "eventswidgets/eventswidgetsfile.h"
 #include "files.h"
 #include "messagelog.h"
@@ -13,6 +14,10 @@
 #include <QDBusError>
 #include <QDBusMessage>
 #include <QDir>
+#include <QJsonArray>
+#include <QJsonDocument>
+#include <QJsonObject>
+#include <QRegularExpression>
 #include <QTemporaryDir>
 #include <QtTest>
 
@@ -42,6 +47,7 @@ private Q_SLOTS:
     void linesHaveTheKeysOfQSettings();
     void mutilatedQuickActions();
     void mutilatedEventsWidgets();
+    void walkerReadsWhatQJsonDocumentReads();
     void namesThatCanBeSent();
 
 private:
@@ -112,6 +118,25 @@ std::vector<Finding> check(const QString &path)
     DefinitionsChecker checker(QStringLiteral("/"));
     checker.check(path);
     return checker.findings();
+}
+
+// Everything that begins at a position, as the walker finds it.
+QJsonValue walk(const QByteArray &text, int position)
+{
+    JsonWalker walker(text, position);
+    QJsonObject object;
+    QJsonArray array;
+    const bool isObject = text.at(position) == '{';
+    while (walker.next()) {
+        const bool isNested = walker.value().isObject() || walker.value().isArray();
+        const QJsonValue value = isNested ? walk(text, walker.position()) : walker.value();
+        if (isObject) {
+            object.insert(walker.key(), value);
+        } else {
+            array.append(value);
+        }
+    }
+    return isObject ? QJsonValue(object) : QJsonValue(array);
 }
 
 int count(const std::vector<Finding> &findings, std::initializer_list<const char *> rules)
@@ -239,6 +264,29 @@ void TestAgreement::mutilatedEventsWidgets()
         Files::remove(path);
     }
     QVERIFY2(read > 300 && read < 3500, qPrintable(QString::number(read)));
+}
+
+void TestAgreement::walkerReadsWhatQJsonDocumentReads()
+{
+    QVector<QByteArray> contents = corpus("eventswidgetsfile");
+    contents.append(
+        R"( { "a\"]" : [ -1.5e3 ,true, null,{ } , [ ] ,"\\" ] ,"\u0061": {"b\\":"}" }, "a":[{"":0}] } )");
+    // Of these, QJsonDocument makes halves of surrogate pairs, which equal nothing.
+    static const QRegularExpression escapedBytes(QStringLiteral("\\\\[\\x80-\\xff]"));
+    Random random(5);
+    int accepted = 0;
+    for (int i = 0; i < 8000; ++i) {
+        const QByteArray &content = contents.at(i % contents.size());
+        const QByteArray text = i < contents.size()
+            ? content
+            : mutilated(content, "\n\\\"{}[]:, 019.eE-tfnu\xc3\xa4", &random);
+        const QJsonDocument document = QJsonDocument::fromJson(text);
+        if (document.isObject() && !QString::fromLatin1(text).contains(escapedBytes)) {
+            ++accepted;
+            QCOMPARE(walk(text, text.indexOf('{')).toObject(), document.object());
+        }
+    }
+    QVERIFY2(accepted > 500, qPrintable(QString::number(accepted)));
 }
 
 void TestAgreement::namesThatCanBeSent()

@@ -358,8 +358,9 @@ void TestMarloDefinitions::hostileFiles_data()
 {
     QTest::addColumn<QString>("kind");
     QTest::addColumn<QString>("suffix");
-    for (const char *kind : {"pipe", "link to a pipe", "endless device", "folder", "huge",
-                             "one long line", "many entries", "no text", "zeroes", "deep"}) {
+    for (const char *kind :
+         {"pipe", "link to a pipe", "endless device", "folder", "huge", "one long line",
+          "many entries", "many objects", "no text", "zeroes", "deep"}) {
         for (const char *suffix : {"conf", "json"}) {
             QTest::addRow("%s.%s", kind, suffix)
                 << QString::fromLatin1(kind) << QString::fromLatin1(suffix);
@@ -389,6 +390,8 @@ void TestMarloDefinitions::hostileFiles()
         Files::write(name, QByteArray(large, 'x'));
     } else if (kind == QStringLiteral("many entries")) {
         Files::write(name, R"({"widgets":[)" + QByteArray("0,").repeated(large / 2) + "0]}");
+    } else if (kind == QStringLiteral("many objects")) {
+        Files::write(name, R"({"widgets":[)" + QByteArray("{},").repeated(large) + "0]}");
     } else if (kind == QStringLiteral("no text")) {
         QByteArray content;
         for (int i = 0; i < 100000; ++i) {

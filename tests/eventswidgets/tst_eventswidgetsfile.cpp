@@ -47,6 +47,8 @@ private Q_SLOTS:
     void notARegularFile();
     void largeFile();
     void tooLargeFile();
+    void tooManyContainers();
+    void deepFile();
     void availability();
     void comparison_data();
     void comparison();
@@ -325,6 +327,8 @@ void TestEventsWidgetsFile::noDefinition_data()
     QTest::newRow("not UTF-8") << QByteArray("{ \"widgets\": [ { \"path\": \"\xff\" } ] }");
     QTest::newRow("UTF-16") << QByteArray("\xff\xfe{\0}\0", 6);
     QTest::newRow("zeroes") << QByteArray(4096, '\0');
+    QTest::newRow("one level too deep")
+        << R"({ "x": )" + QByteArray(1024, '[') + QByteArray(1024, ']') + "}";
     QTest::newRow("deep arrays") << QByteArray(100000, '[') + QByteArray(100000, ']');
     QByteArray deep;
     for (int i = 0; i < 100000; ++i) {
@@ -391,6 +395,25 @@ void TestEventsWidgetsFile::tooLargeFile()
     file.close();
     QVERIFY(!readEventsWidgetsFile(m_path));
     QCOMPARE(m_log->takeReport(), warning("Invalid Events Widget"));
+}
+
+void TestEventsWidgetsFile::tooManyContainers()
+{
+    // QJsonDocument takes about 50 times the size of such a text.
+    const QByteArray entries = QByteArray("[{}],").repeated(499999);
+    QVERIFY(!isTooComplex("[{" + entries));
+    QVERIFY(isTooComplex("[{[" + entries));
+    QVERIFY(!read(R"({ "x": [ )" + entries + R"([] ], "widgets": [] })"));
+    QCOMPARE(m_log->takeReport(), warning("Invalid Events Widget"));
+}
+
+void TestEventsWidgetsFile::deepFile()
+{
+    // As deep as QJsonDocument reads; deeper files are in noDefinition().
+    const auto file = read(R"({ "widgets": [ { "path": "a" } ], "x": )" + QByteArray(1023, '[')
+                           + QByteArray(1023, ']') + "}");
+    QVERIFY(file);
+    QCOMPARE(file->widgets.size(), size_t(1));
 }
 
 void TestEventsWidgetsFile::availability()

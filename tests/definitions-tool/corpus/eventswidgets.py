@@ -65,6 +65,8 @@ case("bad-comment", '{\n// The lamp.\n"widgets": []\n}', no_json(2))
 case("bad-quotes", "{\n'widgets': []\n}", no_json(2))
 case("bad-cut-off", '{\n"widgets": [\n{ "path": "a" }\n', no_json(3))
 case("bad-unclosed-text", '{\n"widgets": [ {\n"path": "a,\n"order": 1 } ]\n}', no_json(4))
+case("bad-line-breaks-around", "\n\n{\n\n", no_json(3))
+case("bad-no-value", '{ "widgets":\n}', no_json(2))
 case("bad-behind", '{ "widgets": [] }\n}\n', no_json(2))
 case("bad-deep", "[" * 2000 + "]" * 2000, no_json(1))
 case("bad-deep-objects", '{"a":' * 2000, no_json(1))
@@ -72,6 +74,7 @@ case("bad-deep-objects", '{"a":' * 2000, no_json(1))
 # What is no object.
 case("bad-null", "null", no_object(1))
 case("bad-text", '"widgets"', no_object(1))
+case("bad-number", "\ufeff\n 7", no_object(2))
 case("bad-array", '\n[ { "path": "a" } ]\n', no_object(2))
 
 # What stands in a file.

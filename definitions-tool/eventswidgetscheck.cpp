@@ -10,6 +10,7 @@
 
 #include <QJsonArray>
 #include <QJsonDocument>
+#include <QRegularExpression>
 #include <QStringList>
 
 #include <algorithm>
@@ -25,6 +26,7 @@ namespace {
 
 const QLatin1String unreadableRule("unreadable");
 const QLatin1String jsonRule("json");
+const QLatin1String noWidgetRule("no-widget");
 const QLatin1String repeatedKeyRule("repeated-key");
 const QLatin1String typeRule("type");
 const QLatin1String widgetRule("widget");
@@ -32,6 +34,8 @@ const QLatin1String pathRule("path");
 const QLatin1String orderRule("order");
 const QLatin1String duplicatePathRule("duplicate-path");
 const QLatin1String relativePathRule("relative-path");
+const QLatin1String titleRule("title");
+const QLatin1String catalogRule("catalog");
 
 const QByteArray byteOrderMark = QByteArrayLiteral("\xef\xbb\xbf");
 
@@ -157,10 +161,19 @@ void EventsWidgetsCheck::check()
     const auto members = checkMembers(fileKeys, start);
     checkCatalog(m_file.translationCatalog, members[CatalogKey].line, m_context, m_findings);
     const Member &widgets = members[WidgetsKey];
-    if (widgets.value.isArray()) {
+    if (widgets.line == 0) {
+        add(lineOf(start), Severity::Error, noWidgetRule,
+            QStringLiteral("there is no \"widgets\": no widget is listed"));
+    } else if (widgets.value.isArray()) {
         JsonWalker entries(m_content, widgets.position);
+        bool isEmpty = true;
         while (entries.next()) {
+            isEmpty = false;
             checkEntry(entries.position());
+        }
+        if (isEmpty) {
+            add(widgets.line, Severity::Warning, noWidgetRule,
+                QStringLiteral("\"widgets\" is empty: no widget is listed"));
         }
     }
 }
@@ -234,9 +247,21 @@ void EventsWidgetsCheck::checkWidget(const Widget &widget, const Members<WidgetK
             QStringLiteral("the path %1 stands in %2:%3 too, and one of the two widgets is lost")
                 .arg(quoted(widget.path), known->file, QString::number(known->line)));
     }
+    static const QRegularExpression absolute(QStringLiteral("^(/|[a-zA-Z][a-zA-Z0-9+.-]*:)"));
+    if (!absolute.match(widget.path).hasMatch()) {
+        add(members[PathKey].line, Severity::Warning, relativePathRule,
+            QStringLiteral("the path %1 is a relative path").arg(quoted(widget.path)));
+    }
     if (members[OrderKey].line == 0) {
         add(line, Severity::Warning, orderRule,
             QStringLiteral("without \"order\" the widget comes last"));
+    } else if (members[OrderKey].value.toInt() < 0) {
+        add(members[OrderKey].line, Severity::Warning, orderRule,
+            QStringLiteral("with a negative \"order\" the widget comes last"));
+    }
+    if (widget.title.isEmpty() && widget.translationId.isEmpty()) {
+        add(line, Severity::Warning, titleRule,
+            QStringLiteral("without \"title\" and \"translation_id\" the widget has no title"));
     }
     checkTexts(widget, members);
     checkIcon(widget.icon, members[IconKey].line, m_findings);
@@ -253,6 +278,15 @@ void EventsWidgetsCheck::checkTexts(const Widget &widget, const Members<WidgetKe
     for (const auto &[id, key] : {std::pair(widget.translationId, TranslationIdKey),
                                   std::pair(widget.descriptionId, DescriptionIdKey)}) {
         checkTextId(id, widget.translationCatalog, members.at(key).line, m_context, m_findings);
+    }
+    if (widget.translationCatalog.isEmpty()) {
+        for (const WidgetKey key : {TitleKey, TranslationIdKey, DescriptionIdKey}) {
+            if (!members.at(key).value.toString().isEmpty()) {
+                add(members.at(key).line, Severity::Warning, catalogRule,
+                    QStringLiteral("without \"translation_catalog\" this text is not translated"));
+                break;
+            }
+        }
     }
 }
 
@@ -278,6 +312,16 @@ bool isScalar(const QByteArray &text)
     return QJsonDocument::fromJson('[' + text + ']').array().size() == 1;
 }
 
+// If QJsonDocument stopped at a bracket after a comma: the position of the comma, or -1.
+int trailingComma(const QByteArray &text, const QJsonParseError &error)
+{
+    if (error.error != QJsonParseError::MissingObject) {
+        return -1;
+    }
+    const QByteArray before = text.left(error.offset - 1).trimmed();
+    return before.endsWith(',') ? text.lastIndexOf(',', error.offset - 1) : -1;
+}
+
 // A file that the reader has refused.
 void reportRefused(const QByteArray &content, Findings *findings)
 {
@@ -297,6 +341,11 @@ void reportRefused(const QByteArray &content, Findings *findings)
     }
     if (document.isArray() || isScalar(content.mid(start))) {
         report(start, jsonRule, "this is no object");
+        return;
+    }
+    const int comma = trailingComma(content, error);
+    if (comma >= 0) {
+        report(comma, jsonRule, "no value follows this comma");
         return;
     }
     // A file that ends too early is wrong where it ends, not in an empty line after that.

@@ -77,7 +77,9 @@ constexpr int timeout = 60000; // ms
 const QByteArray call = "remote-service=org.example.lamp\nremote-path=/lamp\n"
                         "remote-interface=org.example.Lamp\nremote-method=toggle\n";
 const QByteArray goodAction = "title=maps-title\ntranslation-catalog=maps\npriority=1\n" + call;
-const QByteArray goodWidget = R"({ "widgets": [ { "path": "/a.qml", "order": 1 } ] })";
+const QByteArray goodWidget =
+    R"({ "translation_catalog": "maps", "widgets": [ { "path": "/a.qml", )"
+    R"("title": "A", "order": 1 } ] })";
 
 QString lines(const QStringList &lines)
 {

@@ -27,7 +27,7 @@ def widget(**changes):
 
 def short(name="a"):
     """A good widget on one line."""
-    return f'{{ "path": "/usr/share/{name}.qml", "order": 1 }}'
+    return f'{{ "path": "/usr/share/{name}.qml", "title": "Lamp", "order": 1 }}'
 
 
 def file(*widgets):
@@ -47,6 +47,30 @@ def no_widget(line):
     return f"{line}: error: this is no object and passed over [widget]"
 
 
+def no_value(line):
+    return f"{line}: error: no value follows this comma: nothing of the file is read [json]"
+
+
+def missing_widgets(line):
+    return f'{line}: error: there is no "widgets": no widget is listed [no-widget]'
+
+
+def no_title(line):
+    return (
+        f'{line}: warning: without "title" and "translation_id" the widget has no title [title]'
+    )
+
+
+def no_catalog(line):
+    return (
+        f'{line}: warning: without "translation_catalog" this text is not translated [catalog]'
+    )
+
+
+def relative(line, path):
+    return f'{line}: warning: the path "{path}" is a relative path [relative-path]'
+
+
 def wrong_type(line, key, what):
     return f'{line}: error: the value of "{key}" is not {what} and is passed over [type]'
 
@@ -60,13 +84,15 @@ case("bad-binary", bytes(range(256)), no_json(1))
 case("bad-utf16", '{ "widgets": [] }'.encode("utf-16"), no_json(1))
 case("bad-utf8", '{ "widgets": [ %s,\n { "path": "\udcff" } ] }' % short(), no_json(2))
 case("bad-comma", file(widget()).replace('Lamp",', 'Lamp"'), no_json(7))
-case("bad-trailing-comma", file(widget(available_path='"/usr/bin/lamp",')), no_json(13))
+case("bad-trailing-comma", file(widget(available_path='"/usr/bin/lamp",')), no_value(12))
+case("bad-trailing-comma-of-entries", file(short(), ""), no_value(4))
+case("bad-no-value", '{ "widgets":\n}', no_json(2))
+case("bad-comma-in-unclosed-text", '{ "widgets": [],\n"x": "a,\n}', no_json(3))
 case("bad-comment", '{\n// The lamp.\n"widgets": []\n}', no_json(2))
 case("bad-quotes", "{\n'widgets': []\n}", no_json(2))
 case("bad-cut-off", '{\n"widgets": [\n{ "path": "a" }\n', no_json(3))
 case("bad-unclosed-text", '{\n"widgets": [ {\n"path": "a,\n"order": 1 } ]\n}', no_json(4))
 case("bad-line-breaks-around", "\n\n{\n\n", no_json(3))
-case("bad-no-value", '{ "widgets":\n}', no_json(2))
 case("bad-behind", '{ "widgets": [] }\n}\n', no_json(2))
 case("bad-deep", "[" * 2000 + "]" * 2000, no_json(1))
 case("bad-deep-objects", '{"a":' * 2000, no_json(1))
@@ -81,14 +107,19 @@ case("bad-array", '\n[ { "path": "a" } ]\n', no_object(2))
 case("good", file(widget()))
 case("good-crlf", file(widget()).replace("\n", "\r\n"))
 case("good-mark", "\ufeff" + file(short("maßä")))
-case("good-no-catalog", '{ "widgets": [ { "path": "a", "order": -1, "default_enabled": false } ] }')
-case("good-no-widgets", '{ "translation_catalog": "maps" }\n')
-case("good-empty-array", '{ "widgets": [] }')
+case("bad-no-widgets", '\n{ "translation_catalog": "maps" }\n', missing_widgets(2))
+case("bad-nothing", "{}", missing_widgets(1))
+case(
+    "warn-empty-array",
+    file(""),
+    '3: warning: "widgets" is empty: no widget is listed [no-widget]',
+)
 case("good-schema-key", file(short()).replace("{\n", '{\n"$schema": "x.json",\n', 1))
 case(
     "bad-catalog-type",
     '{ "translation_catalog": [ "maps" ],\n"widgets": [ %s ] }' % short(),
     wrong_type(1, "translation_catalog", "a text"),
+    no_catalog(2),
 )
 case(
     "bad-widgets-type",
@@ -97,7 +128,7 @@ case(
 )
 case(
     "bad-repeated-widgets",
-    '{ "widgets": "none",\n"widgets": [ %s, 5 ] }' % short(),
+    '{ "widgets": "none",\n"widgets": [ %s, 5 ], "translation_catalog": "maps" }' % short(),
     wrong_type(1, "widgets", "an array"),
     '1: error: the key "widgets" stands again in line 2, and only that counts [repeated-key]',
     no_widget(2),
@@ -109,15 +140,15 @@ case(
 )
 
 # What stands in a widget.
-case("good-empty-texts", file(widget(title='""', translation_id='""', available_path='""')))
+case("good-empty-texts", file(widget(description_id='""', icon='""', available_path='""')))
 case("good-escapes", file(widget(title=r'"L\u00e4mp \"x\" \ud83d\ude00 \/"')))
 case("good-utf8", file(widget(title='"Lämpchen ☀"')))
 case(
     "good-integers",
     file(
         *(
-            '{ "path": "/usr/share/%d.qml", "order": %s }' % numbered
-            for numbered in enumerate(["5.0", "5e2", "2147483647", "-2147483648"])
+            '{ "path": "/usr/share/%d.qml", "title": "A", "order": %s }' % numbered
+            for numbered in enumerate(["0", "5.0", "5e2", "2147483647"])
         )
     ),
 )
@@ -134,6 +165,7 @@ case(
             available_path="false",
         )
     ),
+    no_title(4),
     wrong_type(6, "title", "a text"),
     wrong_type(7, "translation_id", "a text"),
     wrong_type(8, "description_id", "a text"),
@@ -176,9 +208,20 @@ case(
 )
 case(
     "warn-no-order",
-    file(short(), '{ "path": "/usr/share/b.qml" }'),
+    file(short(), '{ "path": "/usr/share/b.qml", "title": "B" }'),
     '5: warning: without "order" the widget comes last [order]',
 )
+for order in "-1", "-2147483648":
+    case(
+        f"warn-order{order}",
+        file(widget(order=order)),
+        '10: warning: with a negative "order" the widget comes last [order]',
+    )
+case("warn-no-title", file(short(), '{ "path": "/b", "order": 1 }'), no_title(5))
+case("warn-empty-title", file(widget(title='""', translation_id='""')), no_title(4))
+case("good-identifier-only", file(widget(title='""')))
+case("good-title-only", file(widget(translation_id='""', description_id='""')))
+case("good-path-url", file(widget(path='"qrc:/lamp.qml"')))
 case(
     "warn-duplicate-path",
     file(short("a"), short("b"), short("a")),
@@ -187,7 +230,8 @@ case(
 )
 case(
     "warn-relative",
-    file(widget(icon='"icons/lamp.svg"', available_path='"bin/lamp"')),
+    file(widget(path='"lamp.qml"', icon='"icons/lamp.svg"', available_path='"bin/lamp"')),
+    relative(5, "lamp.qml"),
     '9: warning: the icon "icons/lamp.svg" is a relative path [relative-path]',
     '12: warning: the available path "bin/lamp" is a relative path [relative-path]',
 )
@@ -197,7 +241,7 @@ case(
 "translation-catalog": "maps",
 "widget": [],
 "widgets": [ {
-  "path": "a", "order": 1,
+  "path": "/a", "title": "A", "order": 1,
   "defaultEnabled": true,
   "tilte": "x",
   "colour": "red"
@@ -205,13 +249,14 @@ case(
 }""",
     '2: warning: unknown key "translation-catalog"; is "translation_catalog" meant? [unknown-key]',
     '3: warning: unknown key "widget"; is "widgets" meant? [unknown-key]',
+    no_catalog(5),
     '6: warning: unknown key "defaultEnabled"; is "default_enabled" meant? [unknown-key]',
     '7: warning: unknown key "tilte"; is "title" meant? [unknown-key]',
     '8: warning: unknown key "colour" [unknown-key]',
 )
 case(
     "warn-escaped-unknown-key",
-    file('{ "path": "a", "order": 1,\n "a\\nb\\u001b[31m": 2 }'),
+    file('{ "path": "/a", "title": "A", "order": 1,\n "a\\nb\\u001b[31m": 2 }'),
     r'5: warning: unknown key "a\u000ab\u001b[31m" [unknown-key]',
 )
 
@@ -222,8 +267,28 @@ case(
     '2: warning: the catalog "nowhere" is not installed in /usr/share/translations [catalog]',
 )
 case(
+    "warn-catalog-suffix",
+    file(short()).replace("maps", "maps_eng_en"),
+    '2: warning: the catalog "maps_eng_en" is named with the suffix of its engineering English; only '
+    'with "maps" are other languages shown [catalog]',
+)
+case(
     "warn-text-id",
     file(widget(translation_id='"maps-titel"', description_id='"maps-nothing"')),
     '7: warning: the catalog "maps" does not hold the text "maps-titel" [text-id]',
     '8: warning: the catalog "maps" does not hold the text "maps-nothing" [text-id]',
+)
+NO_CATALOG = '{\n"widgets": [\n%s\n]\n}\n'
+case("warn-title-without-catalog", NO_CATALOG % widget(), no_catalog(5))
+case(
+    "warn-identifier-without-catalog",
+    NO_CATALOG % '{ "path": "/a", "order": 1,\n"translation_id": "a",\n"description_id": "b" }',
+    no_catalog(4),
+)
+case(
+    "warn-description-without-catalog",
+    '{ "translation_catalog": "", "widgets": [\n'
+    '{ "path": "/a", "order": 1, "title": "",\n"description_id": "b" }]}',
+    no_title(2),
+    no_catalog(3),
 )

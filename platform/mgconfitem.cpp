@@ -7,6 +7,7 @@
 #include <QSemaphore>
 #include <QtDebug>
 #include <cstdlib>
+#include <cstring>
 #include <dconf.h>
 
 namespace {
@@ -45,10 +46,36 @@ DConfClient *client()
     return client;
 }
 
+bool sameData(GVariant *one, GVariant *other)
+{
+    if (!one || !other) {
+        return !one && !other;
+    }
+    const gsize size = g_variant_get_size(one);
+    return g_variant_type_equal(g_variant_get_type(one), g_variant_get_type(other))
+        && size == g_variant_get_size(other)
+        && (size == 0
+            || std::memcmp(g_variant_get_data(one), g_variant_get_data(other), size) == 0);
+}
+
+// dconf_client_read() opens the database before it searches the queue of writes. A write that
+// completes between these two steps is in neither of them, and the read returns the value from
+// before that write. This cannot happen again until this thread writes the key again. So at most
+// one of several reads in a row is wrong: if the first two differ, the third one is right.
+GVariantPtr readStored(const QByteArray &path)
+{
+    const auto readOnce = [&path] {
+        return GVariantPtr(dconf_client_read(client(), path.constData()));
+    };
+    GVariantPtr first = readOnce();
+    const GVariantPtr second = readOnce();
+    return sameData(first.get(), second.get()) ? std::move(first) : readOnce();
+}
+
 // Null if nothing is stored, or nothing that can be read.
 GVariantPtr read(const QByteArray &path)
 {
-    const GVariantPtr stored(dconf_client_read(client(), path.constData()));
+    const GVariantPtr stored = readStored(path);
     return stored ? trusted(stored.get()) : nullptr;
 }
 
@@ -193,5 +220,10 @@ void MGConfItem::write(GVariant *value)
     if (!dconf_client_write_fast(client(), path.constData(), value, &error)) {
         qWarning("MGConfItem: %s cannot be written: %s", path.constData(), error->message);
         g_error_free(error);
+        return;
     }
+    // dconf reports the change itself, unless it compares the new value with the result of a wrong
+    // read, as described above, and takes the two for equal. Items that know the value ignore this.
+    const char *const changes[] = {"", nullptr};
+    g_signal_emit_by_name(client(), "changed", path.constData(), changes, "");
 }

@@ -34,71 +34,88 @@ LocationSettings::OnlineAGpsState toState(const QVariant &stored)
                            : LocationSettings::OnlineAGpsNotAgreed;
 }
 
-void store(QLatin1String key, LocationSettings::OnlineAGpsState state)
+void store(MGConfItem *item, LocationSettings::OnlineAGpsState state)
 {
-    if (isState(state)) {
-        MGConfItem(key).set(int(state));
-    } else {
+    if (!isState(state)) {
         qWarning("LocationSettings: %d is no state of an online service", int(state));
+    } else if (toState(item->value()) != state) {
+        item->set(int(state));
+    }
+}
+
+void store(MGConfItem *item, bool enabled)
+{
+    if (toSwitch(item->value()) != enabled) {
+        item->set(enabled);
     }
 }
 
 } // namespace
 
-LocationSettings::LocationSettings(QObject *parent) : QObject(parent)
+LocationSettings::LocationSettings(QObject *parent)
+    : QObject(parent),
+      m_gpsEnabled(follow(gpsEnabledKey, toSwitch, &LocationSettings::gpsEnabledChanged)),
+      m_mlsEnabled(follow(mlsEnabledKey, toSwitch, &LocationSettings::mlsEnabledChanged)),
+      m_mlsOnlineState(
+          follow(mlsOnlineStateKey, toState, &LocationSettings::mlsOnlineStateChanged)),
+      m_hereState(follow(hereStateKey, toState, &LocationSettings::hereStateChanged))
 {
-    follow(gpsEnabledKey, &LocationSettings::m_gpsEnabled, toSwitch,
-           &LocationSettings::gpsEnabledChanged);
-    follow(mlsEnabledKey, &LocationSettings::m_mlsEnabled, toSwitch,
-           &LocationSettings::mlsEnabledChanged);
-    follow(mlsOnlineStateKey, &LocationSettings::m_mlsOnlineState, toState,
-           &LocationSettings::mlsOnlineStateChanged);
-    follow(hereStateKey, &LocationSettings::m_hereState, toState,
-           &LocationSettings::hereStateChanged);
 }
 
-// The setters only store: what this object holds is what dconf says, whoever wrote it.
+// All of these work on what is stored now. Another process may have changed it a moment ago, before
+// this one is notified: a switch must not stay on because it looked off.
+
+bool LocationSettings::gpsEnabled() const
+{
+    return toSwitch(m_gpsEnabled->value());
+}
 
 void LocationSettings::setGpsEnabled(bool enabled)
 {
-    if (m_gpsEnabled != enabled) {
-        MGConfItem(gpsEnabledKey).set(enabled);
-    }
+    store(m_gpsEnabled, enabled);
+}
+
+bool LocationSettings::mlsEnabled() const
+{
+    return toSwitch(m_mlsEnabled->value());
 }
 
 void LocationSettings::setMlsEnabled(bool enabled)
 {
-    if (m_mlsEnabled != enabled) {
-        MGConfItem(mlsEnabledKey).set(enabled);
-    }
+    store(m_mlsEnabled, enabled);
+}
+
+LocationSettings::OnlineAGpsState LocationSettings::mlsOnlineState() const
+{
+    return toState(m_mlsOnlineState->value());
 }
 
 void LocationSettings::setMlsOnlineState(OnlineAGpsState state)
 {
-    if (m_mlsOnlineState != state) {
-        store(mlsOnlineStateKey, state);
-    }
+    store(m_mlsOnlineState, state);
+}
+
+LocationSettings::OnlineAGpsState LocationSettings::hereState() const
+{
+    return toState(m_hereState->value());
 }
 
 void LocationSettings::setHereState(OnlineAGpsState state)
 {
-    if (m_hereState != state) {
-        store(hereStateKey, state);
-    }
+    store(m_hereState, state);
 }
 
 template<typename Value>
-void LocationSettings::follow(const QString &key, Value LocationSettings::*member,
-                              Value (*fromStored)(const QVariant &),
-                              void (LocationSettings::*changed)())
+MGConfItem *LocationSettings::follow(const QString &key, Value (*fromStored)(const QVariant &),
+                                     void (LocationSettings::*changed)())
 {
-    auto *item = new MGConfItem(key, this);
-    connect(item, &MGConfItem::valueChanged, this, [=] {
+    auto *const item = new MGConfItem(key, this);
+    connect(item, &MGConfItem::valueChanged, this, [=, last = fromStored(item->value())]() mutable {
         const Value value = fromStored(item->value());
-        if (this->*member != value) {
-            this->*member = value;
-            Q_EMIT(this->*changed)();
+        if (last != value) {
+            last = value;
+            Q_EMIT(this->*changed)(); // the last step: a slot may delete this object
         }
     });
-    this->*member = fromStored(item->value());
+    return item;
 }

@@ -6,6 +6,7 @@
 
 #include <QObject>
 
+class MGConfItem;
 class QVariant;
 
 /*
@@ -36,13 +37,14 @@ public:
 
     explicit LocationSettings(QObject *parent = nullptr);
 
-    bool gpsEnabled() const { return m_gpsEnabled; }
-    bool mlsEnabled() const { return m_mlsEnabled; }
-    OnlineAGpsState mlsOnlineState() const { return m_mlsOnlineState; }
-    OnlineAGpsState hereState() const { return m_hereState; }
+    // What is stored at this moment, also when the signal of the change is still to come.
+    bool gpsEnabled() const;
+    bool mlsEnabled() const;
+    OnlineAGpsState mlsOnlineState() const;
+    OnlineAGpsState hereState() const;
 
-    // A change is seen, and its signal emitted, before these return. A number that is no state is
-    // refused with a warning.
+    // A change is seen, and its signal emitted, before these return. The value that is stored
+    // already is not written again. A number that is no state is refused with a warning.
     void setGpsEnabled(bool enabled);
     void setMlsEnabled(bool enabled);
     void setMlsOnlineState(OnlineAGpsState state);
@@ -56,13 +58,13 @@ Q_SIGNALS:
 
 private:
     template<typename Value>
-    void follow(const QString &key, Value LocationSettings::*member,
-                Value (*fromStored)(const QVariant &), void (LocationSettings::*changed)());
+    MGConfItem *follow(const QString &key, Value (*fromStored)(const QVariant &),
+                       void (LocationSettings::*changed)());
 
-    bool m_gpsEnabled = false;
-    bool m_mlsEnabled = false;
-    OnlineAGpsState m_mlsOnlineState = OnlineAGpsNotAgreed;
-    OnlineAGpsState m_hereState = OnlineAGpsNotAgreed;
+    MGConfItem *const m_gpsEnabled;
+    MGConfItem *const m_mlsEnabled;
+    MGConfItem *const m_mlsOnlineState;
+    MGConfItem *const m_hereState;
 };
 
 #endif

@@ -40,6 +40,7 @@ private Q_SLOTS:
     void restoresInOrder();
     void anotherObjectRestores();
     void sharesWithAnotherProcess();
+    void restoresOverChangesThatAreNotDeliveredYet();
 
     void agreement_data();
     void agreement();
@@ -446,6 +447,21 @@ void TestLocationConfiguration::sharesWithAnotherProcess()
     QVERIFY(configuration.mlsEnabled());
     QCOMPARE(configuration.mlsOnlineState(), State(1));
     QCOMPARE(configuration.hereState(), State(2));
+}
+
+void TestLocationConfiguration::restoresOverChangesThatAreNotDeliveredYet()
+{
+    LocationConfiguration configuration;
+    configuration.saveCustomSettings();
+    DconfTool::waitUntilStored();
+    DconfTool::run({QStringLiteral("load"), QStringLiteral("/settings/location/")},
+                   "[/]\ngps_enabled=true\nmls_online_state=2\n");
+    configuration.restoreCustomSettings();
+    DconfTool::waitUntilStored();
+    QCOMPARE(DconfTool::read(QStringLiteral("/settings/location/gps_enabled")),
+             QByteArray("false"));
+    QCOMPARE(DconfTool::read(QStringLiteral("/settings/location/mls_online_state")),
+             QByteArray("1"));
 }
 
 void TestLocationConfiguration::addAgreements()

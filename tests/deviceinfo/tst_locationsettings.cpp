@@ -35,6 +35,7 @@ private Q_SLOTS:
     void aHandlerMayDelete();
     void otherKeysChangeNothing();
     void followsAnotherProcess();
+    void changesThatAreNotDeliveredYet();
     void anotherProcessFollows();
 
 private:
@@ -331,17 +332,47 @@ void TestLocationSettings::otherKeysChangeNothing()
 void TestLocationSettings::followsAnotherProcess()
 {
     const LocationSettings settings;
+    QSignalSpy gpsChanged(&settings, &LocationSettings::gpsEnabledChanged);
     QSignalSpy mlsOnlineChanged(&settings, &LocationSettings::mlsOnlineStateChanged);
     DconfTool::waitUntilStored();
     DconfTool::write(gpsKey, "true");
     DconfTool::write(mlsOnlineKey, "2");
-    QTRY_VERIFY(settings.gpsEnabled());
-    QTRY_COMPARE(settings.mlsOnlineState(), State(2));
-    QCOMPARE(mlsOnlineChanged.size(), 1);
+    QTRY_COMPARE(gpsChanged.size(), 1);
+    QTRY_COMPARE(mlsOnlineChanged.size(), 1);
+    QVERIFY(settings.gpsEnabled());
+    QCOMPARE(settings.mlsOnlineState(), State(2));
     DconfTool::reset(QStringLiteral("/settings/location/"));
-    QTRY_VERIFY(!settings.gpsEnabled());
-    QTRY_COMPARE(settings.mlsOnlineState(), State(0));
-    QCOMPARE(mlsOnlineChanged.size(), 2);
+    QTRY_COMPARE(gpsChanged.size(), 2);
+    QTRY_COMPARE(mlsOnlineChanged.size(), 2);
+    QVERIFY(!settings.gpsEnabled());
+    QCOMPARE(settings.mlsOnlineState(), State(0));
+}
+
+void TestLocationSettings::changesThatAreNotDeliveredYet()
+{
+    LocationSettings settings;
+    QSignalSpy gpsChanged(&settings, &LocationSettings::gpsEnabledChanged);
+    QSignalSpy mlsChanged(&settings, &LocationSettings::mlsEnabledChanged);
+    DconfTool::waitUntilStored();
+    const QStringList keys = {gpsKey, mlsKey, mlsOnlineKey, hereKey};
+    for (const QString &key : keys) {
+        DconfTool::write(key, key == gpsKey || key == mlsKey ? "true" : "2");
+    }
+    QVERIFY(gpsChanged.isEmpty());
+    QVERIFY(settings.gpsEnabled());
+    QCOMPARE(settings.hereState(), State(2));
+
+    settings.setGpsEnabled(false);
+    settings.setMlsEnabled(true);
+    settings.setMlsOnlineState(State(0));
+    settings.setHereState(State(0));
+    QTRY_COMPARE(DconfTool::read(hereKey), QByteArray("0")); // stored last
+    QCOMPARE(DconfTool::read(mlsOnlineKey), QByteArray("0"));
+    QCOMPARE(DconfTool::read(mlsKey), QByteArray("true"));
+    QCOMPARE(DconfTool::read(gpsKey), QByteArray("false"));
+    QTRY_COMPARE(mlsChanged.size(), 1);
+    QVERIFY(settings.mlsEnabled());
+    QVERIFY(!settings.gpsEnabled());
 }
 
 void TestLocationSettings::anotherProcessFollows()

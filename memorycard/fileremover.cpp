@@ -12,6 +12,7 @@
 #include <array>
 #include <cerrno>
 #include <cstdio>
+#include <cstring>
 #include <memory>
 #include <utility>
 
@@ -29,6 +30,32 @@ struct CloseMountTable {
     void operator()(FILE *table) const { endmntent(table); }
 };
 using MountTable = std::unique_ptr<FILE, CloseMountTable>;
+
+// glibc replaces the escapes in a field. musl, at least up to 1.2.3, returns them as they are.
+bool libraryDecodesEscapes()
+{
+    char line[] = "device /\\040 type options 0 0\n";
+    const MountTable table(fmemopen(line, sizeof(line) - 1, "r"));
+    mntent entry = {};
+    std::array<char, sizeof(line)> buffer = {};
+    return !table || !getmntent_r(table.get(), &entry, buffer.data(), int(buffer.size()))
+        || std::strcmp(entry.mnt_dir, "/ ") == 0;
+}
+
+void decodeEscapes(char *field)
+{
+    const auto isOctal = [](char c) { return c >= '0' && c <= '7'; };
+    char *out = field;
+    for (const char *in = field; *in != '\0'; ++out) {
+        if (in[0] == '\\' && isOctal(in[1]) && isOctal(in[2]) && isOctal(in[3])) {
+            *out = static_cast<char>((in[1] - '0') * 64 + (in[2] - '0') * 8 + in[3] - '0');
+            in += 4;
+        } else {
+            *out = *in++;
+        }
+    }
+    *out = '\0';
+}
 
 FileDescriptor openDirectory(const char *path)
 {
@@ -106,16 +133,28 @@ bool FileRemover::emptyCard() const
     if (!table) {
         return false;
     }
+    const bool decoded = libraryDecodesEscapes();
     mntent entry = {};
     std::array<char, mountEntrySize> buffer = {};
-    while (getmntent_r(table.get(), &entry, buffer.data(), static_cast<int>(buffer.size()))) {
-        // The C library cuts a line that is longer than the buffer and skips its rest. Cut within
-        // the directory it has no type, and the directory may be another one.
+    while (true) {
+        errno = 0;
+        if (!getmntent_r(table.get(), &entry, buffer.data(), static_cast<int>(buffer.size()))) {
+            // musl skips a line that is longer than the buffer, and reports it by this error.
+            if (errno == ERANGE) {
+                continue;
+            }
+            return false;
+        }
+        if (!decoded) {
+            decodeEscapes(entry.mnt_fsname);
+            decodeEscapes(entry.mnt_dir);
+        }
+        // glibc cuts such a line at the buffer instead. Cut within the directory, which may then be
+        // another one, it has no type.
         const bool cut = entry.mnt_type[0] == '\0';
         // A card that is mounted twice gets a second attempt through its other mount directory.
         if (!cut && device == entry.mnt_fsname && emptyMount(device, entry.mnt_dir)) {
             return true;
         }
     }
-    return false;
 }

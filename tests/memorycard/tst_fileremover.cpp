@@ -17,12 +17,16 @@
 
 #include <atomic>
 #include <cerrno>
+#include <cstdio>
+#include <cstring>
 #include <functional>
 #include <memory>
 
+#include <dlfcn.h>
 #include <fcntl.h>
 #include <linux/capability.h>
 #include <linux/fs.h>
+#include <mntent.h>
 #include <sys/ioctl.h>
 #include <sys/mount.h>
 #include <sys/stat.h>
@@ -38,6 +42,10 @@ const QByteArray mountTable = QByteArrayLiteral("/etc/mtab");
 // No such node exists: the tests' cards are folders.
 const QByteArray device = QByteArrayLiteral("/dev/test-card1");
 constexpr int runTimeout = 60000;
+
+// Whether the mount table is read as by musl 1.2.3: no escapes are decoded, and a line that is longer
+// than the buffer is skipped with an error.
+bool readsLikeMusl = false;
 
 enum Outcome {
     Nothing,
@@ -146,6 +154,36 @@ public:
 
 } // namespace
 
+// Takes the place of the C library's own.
+extern "C" mntent *getmntent_r(FILE *table, mntent *entry, char *buffer, int size) noexcept
+{
+    static const auto original =
+        reinterpret_cast<decltype(&getmntent_r)>(dlsym(RTLD_NEXT, "getmntent_r"));
+    if (!readsLikeMusl) {
+        return original(table, entry, buffer, size);
+    }
+    char *fields[4] = {};
+    while (!fields[1]) {
+        if (!fgets(buffer, size, table)) {
+            return nullptr;
+        }
+        if (!strchr(buffer, '\n') && !feof(table)) {
+            for (int c = 0; c != '\n' && c != EOF;) {
+                c = fgetc(table);
+            }
+            errno = ERANGE;
+            return nullptr;
+        }
+        char *rest = buffer;
+        for (char *&field : fields) {
+            field = strtok_r(rest, " \t\n", &rest);
+        }
+    }
+    static char nothing[] = "";
+    *entry = {fields[0], fields[1], fields[2] ? fields[2] : nothing, nothing, 0, 0};
+    return entry;
+}
+
 class tst_FileRemover : public QObject
 {
     Q_OBJECT
@@ -175,6 +213,7 @@ private Q_SLOTS:
     void rootMountDirectory_data();
     void rootMountDirectory();
     void longLine();
+    void anotherCLibrary();
     void lineCutWithinDirectory();
     void lastLineWithoutBreak();
     void mountedTwice();
@@ -213,6 +252,7 @@ void tst_FileRemover::init()
 
 void tst_FileRemover::cleanup()
 {
+    readsLikeMusl = false;
     QCOMPARE(read(path("outside/file")), QByteArray("precious"));
     m_files.reset();
     QCOMPARE(m_log->takeAll(), QList<MessageLog::Message>());
@@ -540,6 +580,20 @@ void tst_FileRemover::longLine()
     writeMountTable(device + ' ' + card + " vfat rw," + QByteArray(30000, 'x') + " 0 0\n");
     QCOMPARE(runHere(device), Completed);
     QCOMPARE(list(card), QByteArrayList());
+}
+
+void tst_FileRemover::anotherCLibrary()
+{
+    readsLikeMusl = true;
+    const QByteArray card = makeCard("my\tcard \\040");
+    const QByteArray other = makeCard("my\\011card\\040\\134040");
+    const QByteArray source = device + "\\040x";
+    const QByteArray longLine = line("overlay", '/' + QByteArray(30000, 'x'));
+    writeMountTable(longLine + line(source, card) + longLine);
+    QCOMPARE(runHere(device + " x"), Completed);
+    QCOMPARE(list(card), QByteArrayList());
+    QCOMPARE(list(other).size(), 4);
+    QCOMPARE(runHere(device), Error);
 }
 
 void tst_FileRemover::lineCutWithinDirectory()

@@ -4,7 +4,7 @@
 // A tree, and what happens to it while it is removed.
 
 #include "fuzzing.h"
-#include "jail.h"
+#include "isolatedthread.h"
 #include "memorycard/directoryemptier.h"
 #include "memorycard/filedescriptor.h"
 #include "systemcalls.h"
@@ -390,9 +390,9 @@ private:
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t *data, std::size_t size)
 {
-    static Jail jail;
+    static IsolatedThread thread;
     static bool made = false;
-    const char *const failure = jail.run([&]() -> const char * {
+    const char *const failure = thread.run([&]() -> const char * {
         if (!made) {
             makeWorld();
             made = true;

@@ -4,7 +4,7 @@
 // The path of a card's device, on the first line, and a mount table.
 
 #include "fuzzing.h"
-#include "jail.h"
+#include "isolatedthread.h"
 #include "memorycard/fileremover.h"
 
 #include <QFile>
@@ -18,7 +18,7 @@
 
 namespace {
 
-// What there is in the jail: folders, those that are in others behind them, and a file in each.
+// The directories of the isolated file system, parents first; each contains a file.
 const std::vector<std::string> folders = {
     "/etc",   "/dev",     "/card",   "/card/folder", "/card/folder/deep",
     "/card2", "/a b",     "/tab\tx", "/back\\slash", "/new\nline",
@@ -165,10 +165,10 @@ const char *empty(const QString &devicePath, const QByteArray &table)
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t *data, std::size_t size)
 {
-    static Jail jail;
+    static IsolatedThread thread;
     Bytes input(data, size);
     const QString devicePath = QString::fromUtf8(input.takeUntil('\n'));
-    const char *const failure = jail.run([&] { return empty(devicePath, input.rest()); });
+    const char *const failure = thread.run([&] { return empty(devicePath, input.rest()); });
     Fuzzing::require(failure == nullptr, failure);
     return 0;
 }

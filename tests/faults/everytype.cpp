@@ -4,6 +4,7 @@
 #include "everytype.h"
 
 #include "files.h"
+#include "moduletypes.h"
 
 #include <QAbstractListModel>
 #include <QDebug>
@@ -16,19 +17,6 @@
 
 namespace {
 
-const QStringList typeNames = {
-    QStringLiteral("AndroidSupport"),
-    QStringLiteral("BluetoothInfo"),
-    QStringLiteral("EventsWidgetsModel"),
-    QStringLiteral("KivInfo"),
-    QStringLiteral("LocationConfiguration"),
-    QStringLiteral("MemoryCardFormatter"),
-    QStringLiteral("ModemFeatures"),
-    QStringLiteral("QuickActionsModel"),
-    QStringLiteral("TermsOfUseManager"),
-    QStringLiteral("TextFileReader"),
-    QStringLiteral("TitlesView"),
-};
 const QStringList typesOfFiles = {
     QStringLiteral("AndroidSupport"), QStringLiteral("BluetoothInfo"),
     QStringLiteral("ModemFeatures"),  QStringLiteral("TermsOfUseManager"),
@@ -44,11 +32,12 @@ QString describe(const QVariant &value)
     return description;
 }
 
-QByteArray document(const QString &name)
+QByteArray document(const ModuleType &type)
 {
+    const QString &name = type.name;
     QByteArray it = name.toUtf8();
-    if (name == QLatin1String("TextFileReader")) {
-        // A singleton.
+    if (type.isSingleton) {
+        // It exists without being declared.
     } else if (name == QLatin1String("QuickActionsModel")) {
         it += " { showPotential: true }";
     } else if (name == QLatin1String("TitlesView")) {
@@ -145,17 +134,22 @@ void EveryType::installFiles()
 EveryType::EveryType()
 {
     m_engine.addImportPath(QStringLiteral(QML_BUILD_DIR));
-    for (const QString &name : typeNames) {
+    for (const ModuleType &type : ModuleType::all()) {
+        m_names.append(type.name);
         auto component = std::make_unique<QQmlComponent>(&m_engine);
-        component->setData(document(name), QUrl(QStringLiteral("test.qml")));
-        m_components.emplace(name, std::move(component));
-        m_objects.emplace(name, make(name));
+        component->setData(document(type), QUrl(QStringLiteral("test.qml")));
+        m_components.emplace(type.name, std::move(component));
+        m_objects.emplace(type.name, make(type.name));
     }
 }
 
 QStringList EveryType::names()
 {
-    return typeNames;
+    QStringList names;
+    for (const ModuleType &type : ModuleType::all()) {
+        names.append(type.name);
+    }
+    return names;
 }
 
 QObject *EveryType::object(const QString &name) const
@@ -176,7 +170,7 @@ std::unique_ptr<QObject> EveryType::make(const QString &name) const
 QStringList EveryType::state() const
 {
     QStringList lines;
-    for (const QString &name : typeNames) {
+    for (const QString &name : m_names) {
         lines += state(name);
     }
     return lines;
@@ -269,7 +263,7 @@ std::vector<EveryType::Use> EveryType::uses(const QString &name) const
 
 void EveryType::useAll() const
 {
-    for (const QString &name : typeNames) {
+    for (const QString &name : m_names) {
         const std::vector<Use> all = uses(name);
         for (const Use &use : all) {
             use.run();

@@ -49,6 +49,7 @@ public:
     void useAll() const;
 
 private:
+    QStringList m_names;
     QQmlEngine m_engine;
     std::map<QString, std::unique_ptr<QQmlComponent>> m_components;
     std::map<QString, std::unique_ptr<QObject>> m_objects;

@@ -3,6 +3,7 @@
 
 #include "soak.h"
 
+#include "moduletypes.h"
 #include "process.h"
 
 #include <QAbstractItemModel>
@@ -21,12 +22,6 @@
 
 namespace {
 
-const std::array<const char *, 10> types = {
-    "AndroidSupport",        "BluetoothInfo",       "EventsWidgetsModel", "KivInfo",
-    "LocationConfiguration", "MemoryCardFormatter", "ModemFeatures",      "QuickActionsModel",
-    "TermsOfUseManager",     "TitlesView",
-};
-const char *const singleton = "TextFileReader";
 const char *const module = "com.marlo.settings.system";
 
 constexpr std::size_t maximumObjects = 24;
@@ -61,6 +56,9 @@ void processEvents(int time)
 Soak::Soak(quint32 seed) : m_random(seed), m_world(&m_random)
 {
     m_engine.addImportPath(QStringLiteral(QML_BUILD_DIR));
+    for (const ModuleType &type : ModuleType::all()) {
+        (type.isSingleton ? m_singletons : m_creatable).append(type.name);
+    }
 }
 
 Soak::~Soak() = default;
@@ -128,10 +126,9 @@ void Soak::makeObject()
     if (m_objects.size() >= maximumObjects) {
         return;
     }
+    const QString &type = m_creatable.at(random(m_creatable.size()));
     QQmlComponent component(&m_engine);
-    component.setData(QByteArray("import ") + module + " 1.0\n"
-                          + types[std::size_t(random(int(types.size())))] + " { }",
-                      QUrl());
+    component.setData(QByteArray("import ") + module + " 1.0\n" + type.toLatin1() + " { }", QUrl());
     QObject *const object = component.create();
     if (object == nullptr) {
         qFatal("cannot make an object: %s", qPrintable(component.errorString()));
@@ -161,7 +158,9 @@ void Soak::useProperty(QObject *object)
 void Soak::callMethod(QObject *object)
 {
     if (random(8) == 0) {
-        object = m_engine.singletonInstance<QObject *>(qmlTypeId(module, 1, 0, singleton));
+        const QByteArray singleton = m_singletons.at(random(m_singletons.size())).toLatin1();
+        object =
+            m_engine.singletonInstance<QObject *>(qmlTypeId(module, 1, 0, singleton.constData()));
     }
     const QMetaObject *const meta = object->metaObject();
     std::vector<QMetaMethod> methods;

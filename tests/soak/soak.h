@@ -49,6 +49,8 @@ private:
     QRandomGenerator m_random;
     World m_world;
     QQmlEngine m_engine;
+    QStringList m_creatable;
+    QStringList m_singletons;
     std::vector<QPointer<QObject>> m_objects;
     QElapsedTimer m_time;
     qint64 m_steps = 0;

@@ -1,0 +1,79 @@
+#!/usr/bin/python3
+# SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+# SPDX-License-Identifier: BSD-3-Clause
+#
+# usage: tst_reference.py SOURCES INDEX
+#
+# Checks that the documentation covers plugins.qmltypes: each type, each of its members and each
+# enumeration value has an entry in the reference, and each list of types in the documentation and
+# in the gallery contains each type. INDEX is the index file that qdoc writes.
+
+import collections
+import pathlib
+import re
+import sys
+import xml.etree.ElementTree
+
+LISTS_OF_TYPES = ["README.md", "docs/architecture.qdoc", "docs/module.qdoc", "gallery/Pages.qml"]
+
+sources, index = map(pathlib.Path, sys.argv[1:])
+failures = []
+
+
+def module_types():
+    """The members and enumeration values of each exported type, with those it inherits."""
+    own = {}
+    text = (sources / "plugin/plugins.qmltypes").read_text()
+    for component in text.split("\n    Component {")[1:]:
+        members = set(re.findall(r'(?:Property|Signal|Method) \{\s*name: "(\w+)"', component))
+        values = re.findall(r'"(\w+)": -?\d+', component)
+        name = re.search(r'name: "(\w+)"', component)[1]
+        prototype = re.search(r'prototype: "(\w+)"', component)
+        exported = re.search(r'exports: \["[\w.]+/(\w+) ', component)
+        own[name] = (members, values, prototype and prototype[1], exported and exported[1])
+    types = {}
+    for members, values, base, exported in own.values():
+        while exported and base in own and not base.startswith("Q"):
+            members = members | own[base][0]
+            values = values + own[base][1]
+            base = own[base][2]
+        if exported:
+            types[exported] = (members, values)
+    return types
+
+
+def documented_members():
+    """The members of each type in the reference."""
+    documented = collections.defaultdict(set)
+    for page in xml.etree.ElementTree.parse(index).iter():
+        # Newer versions of qdoc name the element after the current term for a QML type.
+        if page.tag in ("qmlclass", "qmltype"):
+            documented[page.get("name")] |= {member.get("name") for member in page}
+    return documented
+
+
+types = module_types()
+documented = documented_members()
+if len(types) == 0 or len(documented) == 0:
+    failures.append("no type was found")
+for name in sorted(set(types) ^ set(documented)):
+    where = "the reference" if name in types else "plugins.qmltypes"
+    failures.append(f"{name} is missing in {where}")
+
+pages = "".join(path.read_text() for path in sources.glob("*/*.cpp"))
+for name, (members, values) in types.items():
+    for member in sorted(members - documented[name]):
+        failures.append(f"{name}.{member} is not documented")
+    for value in values:
+        if f"\\value {name}.{value} " not in pages:
+            failures.append(f"{name}.{value} is not documented")
+for path in LISTS_OF_TYPES:
+    text = (sources / path).read_text()
+    for name in types:
+        if not re.search(rf"\b{name}\b", text):
+            failures.append(f"{path} does not list {name}")
+
+for failure in failures:
+    print("FAILED:", failure)
+print(f"{len(types)} types, {sum(len(members) for members, values in types.values())} members")
+sys.exit(1 if failures else 0)

@@ -1,0 +1,32 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "moduletypes.h"
+
+#include <QFile>
+#include <QRegularExpression>
+#include <QStringList>
+
+std::vector<ModuleType> ModuleType::all()
+{
+    QFile file(QStringLiteral(QMLTYPES_FILE));
+    if (!file.open(QIODevice::ReadOnly)) {
+        qFatal("cannot open %s", qPrintable(file.fileName()));
+    }
+    static const QRegularExpression className(QStringLiteral("^\\s*name: \"(\\w+)\""));
+    static const QRegularExpression exported(QStringLiteral("exports: \\[\"[\\w.]+/(\\w+) "));
+    std::vector<ModuleType> types;
+    const QStringList components =
+        QString::fromUtf8(file.readAll()).split(QStringLiteral("\n    Component {"));
+    for (const QString &component : components) {
+        const QRegularExpressionMatch match = exported.match(component);
+        if (match.hasMatch()) {
+            types.push_back({match.captured(1), className.match(component).captured(1).toLatin1(),
+                             component.contains(QLatin1String("isSingleton: true"))});
+        }
+    }
+    if (types.empty()) {
+        qFatal("no type in %s", qPrintable(file.fileName()));
+    }
+    return types;
+}

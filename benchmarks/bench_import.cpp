@@ -2,9 +2,8 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 /*
-    Importing the module, and creating one object of each of its types, beside importing a module
-    in which there is nothing. Each in a process of its own, which tells how much memory of its own
-    it came to use.
+    Importing the module, and creating one object of each of its types, compared with importing an
+    empty module. Each runs in a process of its own, which prints how much private memory it uses.
 */
 
 #include "moduletypes.h"
@@ -56,7 +55,7 @@ int ownMemory()
             return line.simplified().split(' ').at(1).toInt();
         }
     }
-    qFatal("smaps_rollup tells no memory");
+    qFatal("smaps_rollup does not contain the private memory");
 }
 
 int evaluate(const QByteArray &text)

@@ -59,7 +59,7 @@ void writeMountTable(const QByteArray &table)
     close(fd);
 }
 
-// The next word of a line, with what stands for its spaces and such replaced.
+// The next word of a line, with its escapes decoded.
 std::string takeWord(const std::string &line, size_t *at)
 {
     *at = std::min(line.find_first_not_of(" \t", *at), line.size());
@@ -86,7 +86,7 @@ std::string takeWord(const std::string &line, size_t *at)
     return decoded;
 }
 
-// The folders that the table names for the device, by their numbers.
+// The inodes of the directories that the table names for the device.
 std::vector<ino_t> namedFolders(const std::string &device, const std::string &table)
 {
     std::vector<ino_t> named;
@@ -122,7 +122,7 @@ const char *empty(const QString &devicePath, const QByteArray &table)
     writeMountTable(table);
     const std::vector<ino_t> named =
         namedFolders(QFile::encodeName(devicePath).toStdString(), table.toStdString());
-    // Each folder with the number that it had, and whether what is in it may go.
+    // For each directory, whether its files may be removed.
     std::vector<bool> mayLose;
     for (const std::string &folder : folders) {
         bool may = false;
@@ -141,10 +141,10 @@ const char *empty(const QString &devicePath, const QByteArray &table)
     remover.run();
 
     if (completed + failed != 1) {
-        return "it tells how it ended, once";
+        return "the remover reports its end exactly once";
     }
     if (!exists(linkPath)) {
-        return "the link is still there";
+        return "the link must stay";
     }
     bool lost = false;
     for (size_t i = 0; i < folders.size(); ++i) {

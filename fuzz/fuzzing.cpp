@@ -17,7 +17,7 @@ extern "C" int LLVMFuzzerInitialize(int *argc, char ***argv);
 
 namespace {
 
-// What is read is expected to complain of almost every input.
+// The code under test warns about almost every input.
 void keepQuiet(QtMsgType type, const QMessageLogContext &context, const QString &text)
 {
     Q_UNUSED(context)
@@ -29,7 +29,7 @@ void keepQuiet(QtMsgType type, const QMessageLogContext &context, const QString 
 // Called once, before the first input, by the fuzzer and by replay.cpp.
 int LLVMFuzzerInitialize(int *argc, char ***argv)
 {
-    // Inputs name files and services: nothing of the machine's own is to be reached with them.
+    // Inputs name files and services; they must not reach those of the machine.
     if (!qEnvironmentVariableIsSet("MARLO_THROW_AWAY_ROOT")) {
         qFatal("this program runs only in the throw-away root of simulator");
     }

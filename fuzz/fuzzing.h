@@ -11,24 +11,24 @@
 #include <cstdint>
 
 /*
-    What the fuzz targets share. Each of them is this one function, which takes an input apart,
-    gives it to what it tests, and ends the process when something does not hold. A fuzzer calls it
-    with inputs that it makes up, replay.cpp with those that are kept in files.
+    Shared by the fuzz targets. Each target is this one function: it splits an input, passes it to the
+    code under test, and ends the process when a condition does not hold. A fuzzer calls it with
+    generated inputs, replay.cpp with the committed ones.
 */
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t *data, std::size_t size);
 
 namespace Fuzzing {
 
-// Ends the process, with a line on what should have held, unless it does.
+// Ends the process with a message unless the condition holds.
 void require(bool holds, const char *what);
 
-// Writes to a file below the throw-away home folder, in one go, and returns its path.
+// Writes a file in the throw-away home directory with one call, and returns its path.
 QString writeFile(const char *name, const QByteArray &content);
 
 } // namespace Fuzzing
 
 /*
-    Takes an input apart from the front. At the end it gives zeros and empty texts.
+    Splits an input from the front. At the end it returns zeros and empty texts.
 */
 class Bytes
 {
@@ -40,7 +40,7 @@ public:
 
     bool atEnd() const { return m_rest.isEmpty(); }
     std::uint8_t takeByte();
-    // Up to the separator, which is passed, or to the end.
+    // Up to the separator, which is skipped, or to the end.
     QByteArray takeUntil(char separator);
     QByteArray rest() const { return m_rest; }
 

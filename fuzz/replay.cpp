@@ -1,10 +1,10 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-// usage: PROGRAM FILE|FOLDER...
+// usage: PROGRAM FILE|DIRECTORY...
 //
-// Gives each of the files to the fuzz target that it is linked with, once: for compilers without a
-// fuzzer, and so that what was wrong once stays right.
+// Passes each file once to the fuzz target that it is linked with: for compilers without a fuzzer, and
+// as a regression test.
 
 #include "fuzzing.h"
 
@@ -26,10 +26,10 @@ QStringList filesOf(const QString &path)
         return {path};
     }
     QStringList files;
-    const QDir folder(path);
-    const QStringList names = folder.entryList(QDir::Files, QDir::Name);
+    const QDir directory(path);
+    const QStringList names = directory.entryList(QDir::Files, QDir::Name);
     for (const QString &name : names) {
-        files.append(folder.filePath(name));
+        files.append(directory.filePath(name));
     }
     return files;
 }
@@ -43,14 +43,14 @@ int main(int argc, char *argv[])
     for (int i = 1; i < argc; ++i) {
         const QStringList paths = filesOf(QFile::decodeName(argv[i]));
         for (const QString &path : paths) {
-            // The last one that is named before a crash is the one.
+            // The last path printed before a crash is the one that caused it.
             std::fprintf(stderr, "%s\n", qPrintable(path));
             QFile file(path);
             if (!file.open(QIODevice::ReadOnly)) {
                 std::fprintf(stderr, "cannot be read\n");
                 return 1;
             }
-            // Of just its size: what is read beyond it, a sanitizer sees.
+            // Exactly as large as the input, so that a sanitizer notices reads beyond the end.
             const QByteArray content = file.readAll();
             const std::vector<std::uint8_t> input(content.cbegin(), content.cend());
             LLVMFuzzerTestOneInput(input.data(), input.size());

@@ -1,7 +1,7 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-// The examples of the README, the manual pages and the reference work as they stand there.
+// The examples of the README, the manual pages and the reference work exactly as printed.
 
 #include "files.h"
 #include "messagelog.h"

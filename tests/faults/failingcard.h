@@ -18,7 +18,7 @@
 class FailingCard
 {
 public:
-    // What becomes of the removal of a file, and with Unreadable of the listing.
+    // How the removal of a file behaves, and for Unreadable the listing.
     enum class Fault { None, Unreadable, Stuck, Waits, Gone };
 
     // Ends the program if there is no right to mount; see whyNot().

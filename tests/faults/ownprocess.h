@@ -20,7 +20,7 @@ bool isThis();
 
 // Runs the current test, with its data, in one; the command is what starts it, for example in a
 // namespace of its own. Empty if it passed; else, or if it was skipped, what it wrote, of which
-// skipped() tells the reason.
+// skipped() returns the reason.
 QByteArray runCurrentTest(const QStringList &command = {});
 QByteArray skipped(const QByteArray &output);
 

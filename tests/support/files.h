@@ -12,9 +12,9 @@
 */
 namespace Files {
 
-// Makes the folders on the way; the file is complete when it appears under its name.
+// Creates missing parent directories. The file appears under its name only when it is complete.
 void write(const QString &path, const QByteArray &content);
-// Removes a file or a whole folder, if it is there.
+// Removes a file or a whole directory, if it exists.
 void remove(const QString &path);
 void makeFolder(const QString &path);
 void makePipe(const QString &path);

@@ -6,7 +6,7 @@
 #include "files.h"
 #include "messagelog.h"
 #include "mgconfitem.h"
-#include "quickactionsmodel.h"
+#include "quickactions/quickactionsmodel.h"
 
 #include <QProcess>
 #include <QtTest>

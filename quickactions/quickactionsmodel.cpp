@@ -122,10 +122,41 @@ QuickActionsModel::~QuickActionsModel()
 /*!
     \qmlproperty bool QuickActionsModel::showPotential
 
-    Whether every action that is offered is listed, enabled or not, for a page on which the user
-    enables, disables and orders them. As the model loads, the enabled ones are placed first, in the
-    user's order, then the others by the priority that their files give, each before the first row of
-    a greater priority or of none, whether that is enabled or not. The default is false.
+    Whether every offered action is listed, enabled or not, for a page on which the user enables and
+    disables actions. The default is false.
+
+    When the model loads, it places the enabled actions first, in the user's order. Each of the others
+    goes before the first row with a greater priority or with none, whether that row is enabled or not.
+
+    Ordering takes a second model, without this property: move() takes positions in the user's list,
+    and among the rows of this model there can be actions that are not in the list. Both models follow
+    the list.
+
+    \qml
+    Column {
+        QuickActionsModel { id: offered; showPotential: true }
+        Repeater {
+            model: offered
+            delegate: Switch {
+                text: model.title || ""
+                checked: model.enabled
+                onToggled: checked ? offered.enableAction(path) : offered.disableAction(path)
+            }
+        }
+        QuickActionsModel { id: chosen }
+        Repeater {
+            model: chosen
+            delegate: Button {
+                text: "Move up " + (model.title || "")
+                enabled: index > 0
+                onClicked: chosen.move(index, index - 1)
+            }
+        }
+    }
+    \endqml
+
+    If a handler sets the property while rows are being changed, it has the new value at once. The
+    rows and showPotentialChanged() follow when control returns to the event loop.
 */
 bool QuickActionsModel::showPotential() const
 {
@@ -274,11 +305,14 @@ void QuickActionsModel::disableAction(const QString &path)
     \qmlmethod void QuickActionsModel::move(int index, int newIndex)
 
     Moves the row and the entry of the user's list at \a index to \a newIndex, and notes that the
-    user has chosen, as enableAction() does. An index outside the user's list does nothing.
+    user has chosen, as enableAction() does. An index outside the user's list does nothing. If the
+    list cannot be changed, because a dconf profile locks it, the row goes back.
 
-    The rows have to begin with the enabled actions in the user's order. Without \l showPotential they
-    do, unless an enabled action is missing or blocked, or has been given another place by somebody
-    else; with it, actions that are not enabled may stand among them.
+    The rows have to begin with the enabled actions in the user's order. That is so without
+    \l showPotential, unless an enabled action is missing or blocked or another model or process has
+    changed the order. With \l showPotential, actions that are not enabled can stand among them, and
+    move() would move the wrong entry: use a second model for ordering, as in the example of
+    \l showPotential.
 */
 void QuickActionsModel::move(int index, int newIndex)
 {
@@ -288,7 +322,8 @@ void QuickActionsModel::move(int index, int newIndex)
 /*!
     \qmlsignal QuickActionsModel::showPotentialChanged()
 
-    Emitted after \l showPotential and with it the rows have changed.
+    Emitted after \l showPotential and with it the rows have changed, also if a handler sets the
+    property while rows are being changed.
 */
 
 /*!

@@ -50,7 +50,9 @@ QString translation(const QString &id, const QString &fallback)
     \row \li \c title \li string \li The title in the user's language, or the untranslated one.
     \row \li \c description \li string \li The description in the user's language; empty without a
          translation.
-    \row \li \c icon \li string \li As in the definition file.
+    \row \li \c icon \li string \li As in the definition file: a URL such as \c{image://theme/lamp}, an
+         absolute path, before which an image needs \c{file://}, or the name of an icon of the
+         theme.
     \row \li \c path \li string \li As in the definition file: the widget's identity, which
          enableWidget() and disableWidget() take.
     \row \li \c enabled \li bool \li Whether the widget is enabled.

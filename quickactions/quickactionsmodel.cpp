@@ -69,7 +69,9 @@ qint64 priorityOfRow(const QuickAction &action)
     \header \li Role \li Type \li Value
     \row \li \c title \li string \li The title in the user's language, or its identifier without a
          translation; undefined if the file gives no title.
-    \row \li \c icon \li string \li As in the definition file; undefined if it gives none.
+    \row \li \c icon \li string \li As in the definition file: a URL such as \c{image://theme/lamp}, an
+         absolute path, before which an image needs \c{file://}, or the name of an icon of the
+         theme. Undefined if the file has none.
     \row \li \c path \li string \li The path of the definition file: the action's identity, which
          enableAction() and disableAction() take.
     \row \li \c enabled \li bool \li Whether the user has enabled the action.

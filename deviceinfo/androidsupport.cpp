@@ -24,6 +24,14 @@ const QLatin1String runtimeDaemon("/usr/sbin/apkd");
         AndroidSupport { id: android }
     }
     \endqml
+
+    \image gallery-android.png The gallery's page of this type
+
+    \section1 What may surprise
+    \section2 A binding does not notice the installation
+    \l dataDirectoriesVisible is checked on every read and has no change signal, so a binding keeps
+    the first value. Read it in a function to get the current one. Packages are not installed while
+    a page is open, and watching for them would cost more than it gives.
 */
 
 AndroidSupport::AndroidSupport(QObject *parent) : QObject(parent)

@@ -25,6 +25,12 @@ const QLatin1String addressFile("/var/lib/bluetooth/board-address");
         BluetoothInfo { id: bluetooth }
     }
     \endqml
+
+    \image gallery-bluetooth.png The gallery's page of this type
+
+    \section1 What may surprise
+    \section2 The address is read once
+    It is read when the object is created, because the address of a device does not change.
 */
 
 BluetoothInfo::BluetoothInfo(QObject *parent) : QObject(parent)

@@ -67,6 +67,19 @@ QVariantMap changedProperties(const QDBusMessage &message)
         KivInfo { id: cover }
     }
     \endqml
+
+    \image gallery-cover.png The gallery's page of this type
+
+    \section1 What may surprise
+    \section2 Only values of the exact type count
+    The daemon answers with a bare string and a bare 32-bit integer. Any other type, a D-Bus variant
+    too, counts as an error, and the property has its default until the daemon's next signal. Only
+    the number 1 means ready.
+
+    \section2 A late answer wins
+    An answer to the first question that arrives after a change signal replaces the value of the
+    signal. The next signal corrects it. A property that a signal merely invalidates keeps its
+    value. The signal counts for whatever interface it names: the daemon has only one.
 */
 
 KivInfo::KivInfo(QObject *parent) : QObject(parent)

@@ -81,6 +81,30 @@ QString agreementText(QLatin1String base)
         LocationConfiguration { id: location }
     }
     \endqml
+
+    \image gallery-location.png The gallery's page of this type
+
+    \section1 What may surprise
+    \section2 Services that were not saved are switched off
+    restoreCustomSettings() switches off everything that the saved settings do not name, also when
+    nothing was ever saved: location services are on only if the user wanted them.
+
+    \section2 A service without consent stays as it is
+    State 0 means that the user has not agreed to the terms. Restoring neither leaves nor enters
+    this state: only the user can agree.
+
+    \section2 customSettingsEnabled is not followed
+    It is read when the object is created. Saving and restoring do not change it, and changing it
+    neither saves nor restores: the page decides what the flag means.
+
+    \section2 An agreement that cannot be opened gives a message
+    Without a file in the user's language the English one is read, after a warning. If the file
+    exists but cannot be opened, the text is the translated message that there is none. The English
+    one is not read then: it would not be the text that this user agrees to.
+
+    \section2 The agreement texts have no change signal
+    They are read from their files on every read, so a binding keeps the first text. Read them in a
+    function to get the current one.
 */
 
 LocationConfiguration::LocationConfiguration(QObject *parent)

@@ -26,6 +26,13 @@ const QLatin1String variantKey("variant");
         ModemFeatures { id: modem }
     }
     \endqml
+
+    \image gallery-modem.png The gallery's page of this type
+
+    \section1 What may surprise
+    \section2 A binding does not notice an update
+    \l variant is read from its file on every read and has no change signal, so a binding keeps the
+    first value. Read it in a function to get the current one.
 */
 
 ModemFeatureReader::ModemFeatureReader(QObject *parent) : QObject(parent)

@@ -97,6 +97,19 @@ QStringList readTerms(const QString &base, const QString &localeName)
         TermsOfUseManager { id: manager }
     }
     \endqml
+
+    \image gallery-terms.png The gallery's page of this type
+
+    \section1 What may surprise
+    \section2 The language goes before the country
+    For \c fi_FI.UTF-8 the file \c fi.txt is preferred to \c{fi_FI.txt}, which is tried last. For \c
+    fi_FI, without an encoding, \c{fi_FI.txt} comes first. Terms are installed by language, and
+    vendors rely on the order.
+
+    \section2 Vendor terms without a path
+    The vendor methods do not check \c vendorPath. Without one they search below the root of the
+    file system, find nothing, and return an empty list after warnings. Check \l hasVendorTermsOfUse
+    first. Its change signal is emitted when \c vendorPath changes, not when the directory does.
 */
 
 TermsOfUseManager::TermsOfUseManager(QObject *parent) : QObject(parent)

@@ -46,6 +46,17 @@ QString readText(const QString &path, qint64 *maximumSize)
                                      "Licenses:\n")
     }
     \endqml
+
+    \image gallery-text-files.png The gallery's page of this type
+
+    \section1 What may surprise
+    \section2 Lines run together
+    The line breaks of a file are dropped without a replacement: pages wrap the text to their own
+    width. To separate its lines, a text ends them with a blank.
+
+    \section2 Files that cannot be read are silent
+    They read as empty, and collate() skips them. If nothing is left, collate() returns an empty
+    text without the prefix, so that a page can hide the whole section.
 */
 
 TextFileReader::TextFileReader(QObject *parent) : QObject(parent)

@@ -78,6 +78,40 @@ QString translation(const QString &id, const QString &fallback)
     \note Handlers may call any method of the model. While rows are being changed, requests wait until
     control returns to the event loop. The model then runs each kind of update at most once and
     applies the choices (enableWidget(), disableWidget()) in the order of the calls.
+
+    \image gallery-events-widgets.png The gallery's page of this type
+
+    \section1 What may surprise
+    \section2 The first choice enables everything else
+    Until the user makes a choice, widgets are enabled by their own default. The first
+    enableWidget() or disableWidget() writes a list of every known widget, plus or minus this one,
+    also of those whose default is off. From then on only the list counts. A page that wants to keep
+    the defaults writes the list before.
+
+    \section2 A widget keeps its place
+    The \c order of a widget places it when it is first listed. A changed order moves nothing until
+    the model is created again, because rows do not jump under the user's finger. A new widget with
+    an order is placed before the first row of a higher order. Rows without an order do not count as
+    higher, so it may be placed after them.
+
+    \section2 Availability is checked only on request
+    The model checks whether a widget's file exists when it reads the definition files, and
+    otherwise when a page calls updateAvailable(). The files may be anywhere, and watching them all
+    would cost more than it gives. A widget that is not available stays listed, so that a page can
+    say so.
+
+    \section2 directoryChanged() and enabledWidgetsChanged() are methods
+    They have names of signals, but a page calls them to make the model read the files or the list
+    again.
+
+    \section2 Catalogs stay
+    The catalogs of a file that is removed, or that names another one, remain in use until the model
+    is destroyed: a text that is still on the screen keeps its translation. A loaded catalog does
+    not follow a change of the language. A page that follows the language creates its models again.
+
+    \section2 A change of file or catalog is no change of a row
+    A widget that moves to another file, or whose file names another catalog, is not reported as
+    changed, because everything that a row shows is the same.
 */
 
 EventsWidgetsModel::EventsWidgetsModel(QObject *parent)

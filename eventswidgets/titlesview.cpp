@@ -99,6 +99,34 @@ void forEachObject(QVariant *value, const std::function<void(QObject *, QVariant
         }
     }
     \endqml
+
+    \image gallery-titles.png The gallery's page of this type
+
+    \section1 What may surprise
+    \section2 A model cannot be cleared
+    Setting \l model to null logs a warning and keeps the old model: a page that is being closed
+    keeps the sentence that it shows. A model that is destroyed is removed.
+
+    \section2 An unknown matchRole takes every row
+    An unknown \l role reads the display role. A view may be set up before the model has its roles.
+    The role with the number 0 counts as unknown here. It is the first role of many list models,
+    such as \c title of QuickActionsModel.
+
+    \section2 Moved rows are not noticed
+    The view follows rows that are inserted, removed or changed, and a reset. After a move or a new
+    layout call update().
+
+    \section2 A new language is not noticed
+    \l value uses the list format of the locale at the time of reading, and \l values has the texts
+    of the last update. Neither reports a change of the language: the engine evaluates the texts of
+    its pages again.
+
+    \section2 Empty texts count
+    A row without text gives an empty text in \l values and \l value. Exclude such rows with \l
+    matchRole.
+
+    \section2 A step from a value that is no object is skipped
+    One role path therefore serves rows that hold an object and rows that hold its text.
 */
 
 TitlesView::TitlesView(QObject *parent) : QObject(parent)

@@ -122,6 +122,73 @@ bool hasDescriptorsLeft()
 
     Warnings are logged in the category \c org.tarnwickos.settings.memorycard, whose debug messages
     are off by default.
+
+    \image gallery-memory-card.png The gallery's page of this type
+
+    \section1 What may surprise
+    \section2 The status of the disk service comes afterwards
+    \c Formatting, \c RemovingFiles and \c Probing are set when the work begins. \c Unmounting and
+    \c Mounting are set when the disk service has reported success. Until then the status is still
+    the previous one, and for the first step of a sequence \l busy is \c false. A page that shows
+    progress remembers its request.
+
+    \section2 busyChanged() is emitted once more
+    It is emitted when an operation has been accepted, although \l busy changes only with the
+    status. Pages may use it to learn that an operation was not refused.
+
+    \section2 Early requests are queued
+    Operations are refused while \l busy is \c true. While the first request to the disk service is
+    under way, \l busy is still \c false: operations are accepted then, and run afterwards. If the
+    request fails, they are dropped, except the probe of a new \l devicePath. Two formats that are
+    requested in this way each make their own type.
+
+    \section2 Formatting needs a mounted card
+    format() unmounts the card first. A card that is not mounted leads to \c Error with \c
+    ErrorNotMounted: only a card that was known to work is formatted. Call mount() first; its \c
+    ErrorAlreadyMounted is harmless.
+
+    \section2 Two errors are forgiven
+    \c ErrorAlreadyMounted and \c ErrorAlreadyUnmounting are signalled, and the sequence continues:
+    the card is already in the requested state, or about to be. The status of that step is not
+    shown.
+
+    \section2 Some errors have no signal
+    mountError() and unmountError() carry the disk service's own errors. Others, such as a service
+    that does not exist, only lead to the status \c Error. The signal comes before the status.
+
+    \section2 Any type can be requested
+    A type other than \c vfat and \c ext4 (case-sensitive) runs the helper program without a command
+    word, and its exit code decides. A device's helper may support more than this module.
+
+    \section2 A failed probe still changes the type
+    The output of the helper replaces \l filesystemType even if the helper fails, usually with an
+    empty text: a card that cannot be read has no known type. A helper that crashes or cannot be
+    started leaves the type as it was, perhaps that of another card, so check \l status first. A new
+    \l devicePath is probed immediately, an empty one too.
+
+    \section2 Without a device name a sequence waits
+    Mounting and unmounting use the \l deviceName that is set when the step starts. If it is empty
+    then, the step only logs a critical message. The status stays, and so does the rest of the
+    sequence, which runs before the next operation: an unmount() after a format() without a name
+    formats the card. If the name is empty in the middle of a sequence, the formatter stays busy and
+    refuses every operation; only a new object helps. The message says "unmount" for mounting and
+    "mount" for unmounting, because programs that read logs expect exactly these lines.
+
+    \section2 A directory that cannot be opened counts as empty
+    removeAllFiles() removes all that it can, continues after a failure, and then ends in \c Error.
+    The directory on which the card is mounted counts as empty if it cannot be opened: the operation
+    ends well, and nothing has been removed. If a card is mounted more than once, it is enough that
+    one of its mount directories can be emptied.
+
+    \section2 Some mount directories are refused
+    A mount directory that is a symbolic link, the root directory or a directory on another device
+    than the card's is not emptied. The card has been unmounted meanwhile, or the mount table is
+    wrong.
+
+    \section2 Work outlives its formatter
+    Destroying a formatter does not stop the removal of files, nor a helper that formats: a card
+    that is half formatted cannot be used. The process waits for the removal when it ends, as it
+    does for all work in the global thread pool.
 */
 
 MemoryCardFormatter::MemoryCardFormatter(QObject *parent) : QObject(parent)

@@ -92,6 +92,81 @@ qint64 priorityOfRow(const QuickAction &action)
     \note Handlers may call any method of the model. While rows are being changed, requests wait until
     control returns to the event loop. The model then reloads at most once and applies the choices
     (enableAction(), disableAction(), move()) in the order of the calls.
+
+    \image gallery-quick-actions.png The gallery's page of this type
+
+    \section1 What may surprise
+    \section2 A title may be undefined
+    An action without a title has the title undefined, not an empty text. Write \c{model.title ||
+    ""}, or choose another text: the page decides what to show. An action whose text is in no
+    catalog shows its identifier, so that the missing translation is noticed.
+
+    \section2 A file that cannot be read is still a row
+    A broken definition file is listed without title and icon, after a warning. Triggering it sends
+    nothing. The user's list may contain it, and move() relies on its place in the rows.
+    EventsWidgetsModel skips such files, because no index refers to its rows.
+
+    \section2 The roles have the numbers 0 to 3
+    These are also the numbers of Qt's roles for display, decoration, editing and tool tips. They
+    stay, for users who know the roles by number. TitlesView treats role 0 as unknown: with \c title
+    as its \c matchRole it takes every row.
+
+    \section2 An action can be enabled twice
+    enableAction() appends to the user's list without a check, and disableAction() removes every
+    entry of the path. The list that the model knows may be older than the stored one, so a check
+    could be wrong; removing every entry is always right. A repeated entry gives one row.
+
+    \section2 Rows change only after dconf reports the change
+    After enableAction() and disableAction() the model waits for the change of the key, as if
+    another process had made it. This keeps the models of all pages equal. Do not rely on the
+    moment: dconf may report the change during the call or later.
+
+    \section2 move() counts in the user's list
+    Both indexes are entries of the user's list. Larger ones are ignored silently, even if \l
+    showPotential gives more rows. The row and the entry are moved with the same indexes, so use a
+    model without \l showPotential. There the rows are the user's list, except for enabled actions
+    that are not installed or are blocked: they stay in the list and have no row. Their entries
+    remain so that an action returns to its place when its package is installed again.
+
+    \section2 Existing rows do not move
+    When another model or process changes the order of the user's list, existing rows keep their
+    places until the model is created again: rows do not jump under the user's finger.
+
+    \section2 Other actions may stand above the enabled ones
+    With \l showPotential, an action that is not enabled is placed before the first row that has a
+    greater priority or none, and the search begins at the top. If the first enabled action has no
+    priority, every new action with a priority is placed above it. Give all actions a priority, or
+    show the enabled ones in a model of their own.
+
+    \section2 Blocked wins over enabled
+    Actions in \c blocked_actions are never listed, not even with \l showPotential. A vendor removes
+    an action from a device with it, whatever the user's settings are.
+
+    \section2 The first change waits, later ones cost more
+    The model reloads one second after the directory changed, because packages install several files
+    at once. Each such reload adds one more to all later ones. The extra reloads change nothing that
+    a page could notice.
+
+    \section2 Arguments are strings
+    Arguments of a call are sent as the strings in the file, \c 1 and \c true too, because an INI
+    file has no types. A value with an unquoted comma is sent as an array of strings. A service that
+    offers quick actions takes strings.
+
+    \section2 No answer is no failure
+    A service that does not answer in time causes no warning: it may be busy with opening its
+    window. Every other failure is logged as a warning, and only a service that does not exist leads
+    to the store. The warning of a call that could not be sent ends in \c{%6}, because programs that
+    read logs expect exactly this text.
+
+    \section2 The store shows the package of any action with the same call
+    If a service does not exist, the model takes the first row that sends the same call and names a
+    package. This need not be the row that the user tapped: actions with the same call need the same
+    service.
+
+    \section2 Titles keep the language of the first moment
+    The catalog of the settings pages follows a change of the language. Catalogs that definition
+    files name do not: a model loads them once. A page that follows the language creates its models
+    again.
 */
 
 QuickActionsModel::QuickActionsModel(QObject *parent)

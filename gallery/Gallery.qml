@@ -61,6 +61,8 @@ ApplicationWindow {
     }
 
     header: ToolBar {
+        // The window decides. A width that follows the title is a binding loop at times.
+        contentWidth: 0
         Universal.theme: Universal.Dark
         background: Rectangle {
             color: window.Universal.accent
@@ -86,19 +88,26 @@ ApplicationWindow {
         }
     }
 
-    StackView {
-        id: stack
+    // Not as a footer: keys and screen readers reach a footer before the page.
+    ColumnLayout {
         anchors.fill: parent
-        focus: true
-        initialItem: StartPage {
-            pages: window.pages
-            onOpened: window.openPage(page.name)
-        }
-    }
+        spacing: 0
 
-    footer: LogPane {
-        id: log
-        open: window.width >= 900 && Messages.count > 0
+        StackView {
+            id: stack
+            Layout.fillWidth: true
+            Layout.fillHeight: true
+            focus: true
+            initialItem: StartPage {
+                pages: window.pages
+                onOpened: window.openPage(page.name)
+            }
+        }
+        LogPane {
+            id: log
+            Layout.fillWidth: true
+            open: window.width >= 900 && Messages.count > 0
+        }
     }
 
     // The return key presses what has the focus, as the space bar does.

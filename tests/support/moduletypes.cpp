@@ -7,7 +7,9 @@
 #include <QRegularExpression>
 #include <QStringList>
 
-std::vector<ModuleType> ModuleType::all()
+namespace {
+
+std::vector<ModuleType> readTypes()
 {
     QFile file(QStringLiteral(QMLTYPES_FILE));
     if (!file.open(QIODevice::ReadOnly)) {
@@ -28,5 +30,13 @@ std::vector<ModuleType> ModuleType::all()
     if (types.empty()) {
         qFatal("no type in %s", qPrintable(file.fileName()));
     }
+    return types;
+}
+
+} // namespace
+
+const std::vector<ModuleType> &ModuleType::all()
+{
+    static const std::vector<ModuleType> types = readTypes();
     return types;
 }

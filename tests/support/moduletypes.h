@@ -18,8 +18,8 @@ struct ModuleType {
     QByteArray className;
     bool isSingleton = false;
 
-    // Sorted by class name. Ends the program if the file cannot be read.
-    static std::vector<ModuleType> all();
+    // Sorted by class name. Ends the program if the file cannot be read; it is read only once.
+    static const std::vector<ModuleType> &all();
 };
 
 #endif

@@ -21,10 +21,10 @@ const QLatin1String catalogRule("catalog");
 const QLatin1String textIdRule("text-id");
 const QLatin1String relativePathRule("relative-path");
 
-// Longer names are no slips of the pen, and would take their time.
+// Longer names are not typing errors, and comparing them would take long.
 constexpr int longestName = 64;
 
-// How many letters have to be added, left out or replaced.
+// The number of letters to add, remove or replace.
 int distance(const QString &left, const QString &right)
 {
     std::vector<int> row(size_t(right.size()) + 1);
@@ -41,7 +41,7 @@ int distance(const QString &left, const QString &right)
     return row.back();
 }
 
-// Two keys that differ in their case or in their dashes are meant to be the same.
+// Keys that differ only in case, or in dashes and underscores, are most similar.
 QString normalised(const QString &name)
 {
     return name.toLower().replace(QLatin1Char('_'), QLatin1Char('-'));
@@ -81,7 +81,7 @@ bool reportUnreadable(const QString &path, qint64 maximumSize, QByteArray *conte
         text = QStringLiteral("the file cannot be opened");
         break;
     case RegularFile::State::NotRegular:
-        text = QStringLiteral("this is no regular file");
+        text = QStringLiteral("this is not a regular file");
         break;
     case RegularFile::State::TooLarge:
         text = QStringLiteral("the file is larger than %1 MiB and is not read")

@@ -7,25 +7,26 @@
 #include "definitionschecker.h"
 
 /*
-    What both kinds of definition files are checked for.
+    Checks that both kinds of definition files share.
 */
 
-// Says why a reader refused a file before it looked at what is in it; false if it did not.
+// Reports why a reader refused a file without looking at its content. Returns false, and the content,
+// if the file can be read.
 bool reportUnreadable(const QString &path, qint64 maximumSize, QByteArray *content,
                       Findings *findings);
 
-// Warns of a key that nobody reads, and names the known one that was meant if any is near.
+// Warns of a key that no model reads, and suggests the most similar known one.
 void reportUnknownKey(const QString &what, const QString &name, const QStringList &known, int line,
                       Findings *findings);
 
 // Warns of a catalog that is not installed, that lacks engineering English, or whose name is wrong.
 void checkCatalog(const QString &catalog, int line, CheckContext *context, Findings *findings);
 
-// Warns of a text that the catalog does not hold; no identifier or no catalog has none.
+// Warns of a text that the catalog does not hold. Without an identifier or a catalog, does nothing.
 void checkTextId(const QString &id, const QString &catalog, int line, CheckContext *context,
                  Findings *findings);
 
-// Warns of a picture that is found only from some folder: names and URLs are found from everywhere.
+// Warns of an icon whose path is relative. Names and URLs are not.
 void checkIcon(const QString &icon, int line, Findings *findings);
 
 #endif

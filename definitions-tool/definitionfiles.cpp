@@ -24,14 +24,14 @@ bool DefinitionFiles::isEventsWidgets(const QString &path)
     return path.endsWith(eventsWidgetsSuffix, Qt::CaseInsensitive);
 }
 
-QStringList DefinitionFiles::inFolder(const QString &path)
+QStringList DefinitionFiles::inDirectory(const QString &path)
 {
-    const QDir folder(path);
+    const QDir directory(path);
     QStringList files;
     // The models list in the same way: nothing hidden, no links to nowhere, and widgets in files.
-    const QStringList names = folder.entryList();
+    const QStringList names = directory.entryList();
     for (const QString &name : names) {
-        const QString file = folder.filePath(name);
+        const QString file = directory.filePath(name);
         if (isQuickAction(name) || (isEventsWidgets(name) && QFileInfo(file).isFile())) {
             files.append(file);
         }

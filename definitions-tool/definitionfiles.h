@@ -8,7 +8,7 @@
 #include <QStringList>
 
 /*
-    Which files the models read.
+    The files that the models read.
 */
 namespace DefinitionFiles {
 
@@ -19,8 +19,8 @@ const QLatin1String eventsWidgetsDirectory("/usr/share/glimmera/eventswidgets");
 bool isQuickAction(const QString &path);
 bool isEventsWidgets(const QString &path);
 
-// Those in a folder that a model would read if they were installed, by name.
-QStringList inFolder(const QString &path);
+// The files of a directory that a model would read if they were installed, sorted by name.
+QStringList inDirectory(const QString &path);
 
 } // namespace DefinitionFiles
 

@@ -17,9 +17,9 @@ DefinitionsChecker::DefinitionsChecker(const QString &root) : m_root(root), m_co
 bool DefinitionsChecker::check(const QString &path)
 {
     const QFileInfo entry(path);
-    // To the model of quick actions a folder of such a name is an entry like any other.
+    // The model of quick actions lists a directory of such a name like a file.
     if (entry.isDir() && !DefinitionFiles::isQuickAction(path)) {
-        return checkFolder(path);
+        return checkDirectory(path);
     }
     if (entry.exists()) {
         checkFile(path);
@@ -30,17 +30,17 @@ bool DefinitionsChecker::check(const QString &path)
 bool DefinitionsChecker::checkInstalled()
 {
     using namespace DefinitionFiles;
-    const bool hasQuickActions = checkFolder(QDir::cleanPath(m_root + quickActionsDirectory));
-    const bool hasEventsWidgets = checkFolder(QDir::cleanPath(m_root + eventsWidgetsDirectory));
+    const bool hasQuickActions = checkDirectory(QDir::cleanPath(m_root + quickActionsDirectory));
+    const bool hasEventsWidgets = checkDirectory(QDir::cleanPath(m_root + eventsWidgetsDirectory));
     return hasQuickActions || hasEventsWidgets;
 }
 
-bool DefinitionsChecker::checkFolder(const QString &path)
+bool DefinitionsChecker::checkDirectory(const QString &path)
 {
     if (!QFileInfo(path).isDir()) {
         return false;
     }
-    const QStringList files = DefinitionFiles::inFolder(path);
+    const QStringList files = DefinitionFiles::inDirectory(path);
     for (const QString &file : files) {
         checkFile(file);
     }
@@ -49,8 +49,8 @@ bool DefinitionsChecker::checkFolder(const QString &path)
 
 void DefinitionsChecker::checkFile(const QString &path)
 {
-    // Its widgets would be there twice, and QSettings, which keeps what it has read, would have no
-    // error to tell of.
+    // A second check would report its widgets as duplicates, and would miss errors, because QSettings
+    // caches what it has read.
     const QString canonicalPath = QFileInfo(path).canonicalFilePath();
     if (m_checked.contains(canonicalPath)) {
         return;

@@ -11,8 +11,7 @@
 #include <QSet>
 
 /*
-    What the checks of several files have in common, which is also what they may contradict each
-    other in.
+    What the checks of several files share.
 */
 struct CheckContext {
     struct Place {
@@ -25,33 +24,33 @@ struct CheckContext {
     InstalledCatalogs catalogs;
     // Whether it does not matter which catalogs are installed.
     bool ignoresCatalogs = false;
-    // Where the widgets are defined that were met.
+    // The widgets of the files checked so far.
     QHash<QString, Place> widgets;
 };
 
 /*
-    Finds what a model would pass over or misread in definition files, and what their authors will
-    hardly have meant. What a file holds the models' own readers say.
+    Finds what a model ignores or misreads in definition files, and probable mistakes of their authors.
+    The files are read by the readers of the models.
 */
 class DefinitionsChecker
 {
 public:
-    // Catalogs and installed definitions are looked for below the root folder.
+    // Looks for catalogs and installed definitions below the root directory.
     explicit DefinitionsChecker(const QString &root);
 
     // For sources, whose catalogs are not compiled yet.
     void ignoreCatalogs() { m_context.ignoresCatalogs = true; }
 
-    // A file, or all definition files in a folder; a name that is no definition file's is a finding.
-    // What was checked is not checked again. False if there is nothing there.
+    // A file, or all definition files in a directory; the name of any other file is
+    // a finding. Checks each file once. False if the path does not exist.
     bool check(const QString &path);
-    // The definitions that are installed below the root; false if it has no folder for any.
+    // The definitions that are installed below the root; false if it has no directory for any.
     bool checkInstalled();
 
     const std::vector<Finding> &findings() const { return m_findings; }
 
 private:
-    bool checkFolder(const QString &path);
+    bool checkDirectory(const QString &path);
     void checkFile(const QString &path);
 
     QString m_root;

@@ -66,7 +66,7 @@ enum WidgetKey {
     WidgetKeyCount
 };
 constexpr std::array<Key, WidgetKeyCount> widgetKeys = {{
-    {"path", Type::Any}, // Without a text there, there is no widget.
+    {"path", Type::Any}, // checkEntry() reports the type.
     {"title", Type::Text},
     {"translation_id", Type::Text},
     {"description_id", Type::Text},
@@ -124,7 +124,7 @@ public:
     void check();
 
 private:
-    // Of a known key of an object; of a key that is repeated, the last one. Line 0 if there is none.
+    // The last member of a known key. Its line is 0 if there is none.
     struct Member {
         int line = 0;
         int position = 0; // Of the value.
@@ -201,13 +201,13 @@ EventsWidgetsCheck::checkMembers(const std::array<Key, count> &keys, int positio
         Member &member = members.at(size_t(key - keys.cbegin()));
         if (member.line > 0) {
             add(member.line, Severity::Error, repeatedKeyRule,
-                QStringLiteral("the key %1 stands again in line %2, and only that counts")
+                QStringLiteral("the key %1 is repeated in line %2, and only that one counts")
                     .arg(quoted(name), QString::number(line)));
         }
         member = {line, walker.position(), walker.value()};
         if (!isOf(key->type, member.value)) {
             add(line, Severity::Error, typeRule,
-                QStringLiteral("the value of %1 is not %2 and is passed over")
+                QStringLiteral("the value of %1 is not %2 and is ignored")
                     .arg(quoted(name), nameOf(key->type)));
         }
     }
@@ -218,7 +218,8 @@ void EventsWidgetsCheck::checkEntry(int position)
 {
     const int line = lineOf(position);
     if (m_content.at(position) != '{') {
-        add(line, Severity::Error, widgetRule, QStringLiteral("this is no object and passed over"));
+        add(line, Severity::Error, widgetRule,
+            QStringLiteral("this is not an object and is ignored"));
         return;
     }
     const auto members = checkMembers(widgetKeys, position);
@@ -229,10 +230,10 @@ void EventsWidgetsCheck::checkEntry(int position)
         ++m_next;
     } else {
         add(path.line > 0 ? path.line : line, Severity::Error, pathRule,
-            path.line == 0 ? QStringLiteral("there is no \"path\": the widget is passed over")
+            path.line == 0 ? QStringLiteral("there is no \"path\": the widget is ignored")
                 : path.value.isString()
-                ? QStringLiteral("\"path\" is empty: the widget is passed over")
-                : QStringLiteral("\"path\" is not a text: the widget is passed over"));
+                ? QStringLiteral("\"path\" is empty: the widget is ignored")
+                : QStringLiteral("\"path\" is not a text: the widget is ignored"));
     }
 }
 
@@ -244,7 +245,7 @@ void EventsWidgetsCheck::checkWidget(const Widget &widget, const Members<WidgetK
         m_context->widgets.insert(widget.path, {m_path, members[PathKey].line});
     } else {
         add(members[PathKey].line, Severity::Warning, duplicatePathRule,
-            QStringLiteral("the path %1 stands in %2:%3 too, and one of the two widgets is lost")
+            QStringLiteral("the path %1 is also in %2:%3; only one of the two widgets is listed")
                 .arg(quoted(widget.path), known->file, QString::number(known->line)));
     }
     static const QRegularExpression absolute(QStringLiteral("^(/|[a-zA-Z][a-zA-Z0-9+.-]*:)"));
@@ -340,7 +341,7 @@ void reportRefused(const QByteArray &content, Findings *findings)
         ++start;
     }
     if (document.isArray() || isScalar(content.mid(start))) {
-        report(start, jsonRule, "this is no object");
+        report(start, jsonRule, "this is not an object");
         return;
     }
     const int comma = trailingComma(content, error);
@@ -353,7 +354,7 @@ void reportRefused(const QByteArray &content, Findings *findings)
     while (end > 0 && isSpace(content.at(end - 1))) {
         --end;
     }
-    report(std::min(error.offset, end), jsonRule, "from here on this is no JSON");
+    report(std::min(error.offset, end), jsonRule, "from here on this is not JSON");
 }
 
 } // namespace

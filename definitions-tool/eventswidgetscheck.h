@@ -6,7 +6,7 @@
 
 #include "definitionschecker.h"
 
-// Says what is wrong with a definition file of events widgets.
+// Finds mistakes in a definition file of events widgets.
 void checkEventsWidgets(const QString &path, CheckContext *context, Findings *findings);
 
 #endif

@@ -27,7 +27,7 @@ QString nameOf(Finding::Severity severity)
     return QStringLiteral("note");
 }
 
-// Names of files and what is in them come from anywhere, and go to terminals.
+// File names and contents are untrusted, and are printed to terminals.
 QString onOneLine(const QString &text)
 {
     QString line;
@@ -51,8 +51,7 @@ void Findings::add(int line, Finding::Severity severity, QLatin1String rule, con
         m_findings.push_back({m_file, line, severity, rule, text});
     } else if (count == maximumFindings + 1) {
         m_findings.push_back({m_file, line, severity, QStringLiteral("too-many"),
-                              QStringLiteral("what else of this kind is found from here on is left "
-                                             "out")});
+                              QStringLiteral("further findings of this severity are left out")});
     }
 }
 

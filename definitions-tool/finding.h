@@ -12,15 +12,15 @@
 #include <vector>
 
 /*
-    Something that is to be said about a line of a definition file.
+    A mistake, or a possible one, in a line of a definition file.
 */
 struct Finding {
     enum class Severity { Error, Warning, Note };
 
     QString file;
-    int line; // From 1; that too for what concerns the whole file.
+    int line; // From 1, which is also used for the whole file.
     Severity severity;
-    QString rule; // A word by which findings of the same kind are known.
+    QString rule; // Names the kind of the finding.
     QString text;
 };
 
@@ -30,9 +30,9 @@ class Findings
 public:
     explicit Findings(QString file) : m_file(std::move(file)) { }
 
-    // Of each severity, keeps no more than anybody reads, and says so.
+    // Keeps a limited number of each severity, and adds a finding when it is reached.
     void add(int line, Finding::Severity severity, QLatin1String rule, const QString &text);
-    // In the order of lines.
+    // Returns them in the order of lines.
     std::vector<Finding> take();
 
 private:
@@ -41,12 +41,12 @@ private:
     std::array<int, 3> m_counts = {};
 };
 
-// FILE:LINE: error|warning|note: text [rule], without the end of the line.
+// FILE:LINE: error|warning|note: text [rule], without a line break.
 QString toText(const Finding &finding);
 // An array with an object for each.
 QByteArray toJson(const std::vector<Finding> &findings);
 
-// In double quotes and, whatever it holds, on one line of reasonable length.
+// In double quotes, on one line, shortened if necessary.
 QString quoted(const QString &text);
 
 #endif

@@ -50,7 +50,7 @@ const InstalledCatalogs::Catalog &InstalledCatalogs::find(const QString &catalog
         return *known;
     }
     Catalog found;
-    // Asked for as the models do: Qt also takes a file of a shorter name.
+    // Loaded as the models load it: Qt also accepts files with shorter names.
     found.hasEngineeringEnglish = load(&found, catalog + CatalogFiles::engineeringEnglishSuffix);
     const QString prefix = catalog + CatalogFiles::localePrefix;
     for (const QString &fileName : qAsConst(m_fileNames)) {

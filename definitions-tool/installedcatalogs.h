@@ -14,13 +14,12 @@
 class QTranslator;
 
 /*
-    The translation catalogs of a system: which of them there are, in which languages, and which text
-    identifiers they hold.
+    The translation catalogs of a system, their languages and the text identifiers that they hold.
 */
 class InstalledCatalogs
 {
 public:
-    // Those below a root folder.
+    // Those below a root directory.
     explicit InstalledCatalogs(const QString &root);
     ~InstalledCatalogs();
     Q_DISABLE_COPY_MOVE(InstalledCatalogs)
@@ -28,9 +27,9 @@ public:
     QString directory() const { return m_directory; }
 
     bool hasEngineeringEnglish(const QString &catalog);
-    // As in the file names, "fi" or "pt_BR".
+    // As in file names: "fi" or "pt_BR".
     QStringList languages(const QString &catalog);
-    // Whether a file of the catalog, in whatever language, has a text for the identifier.
+    // Whether the catalog has a text for the identifier in any language.
     bool holds(const QString &catalog, const QString &id);
 
 private:

@@ -7,14 +7,14 @@
 #include <QString>
 
 /*
-    What the models list on this machine, as text for a terminal.
+    Text for a terminal: what the models list on this machine.
 */
 
-// The rows of either model in its order, with the state that dconf gives them.
+// The rows of both models in their order, with their state from dconf.
 QString listDefinitions();
 
-// For each catalog that an installed definition names, the files that a model loads: of engineering
-// English, for the current locale, and for every language that is there.
+// For each catalog that an installed definition names, the files that a model loads: for engineering
+// English, for the current locale, and for each installed language.
 QString listCatalogs();
 
 #endif

@@ -1,7 +1,7 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-// For authors of definition files: what the models make of them.
+// Shows authors of definition files how the models read them.
 
 #include "definitionschecker.h"
 #include "listing.h"
@@ -22,9 +22,9 @@ enum Status { Clean = 0, HasFindings = 1, CouldNotRun = 2 };
 
 const char *const description =
     "Checks, lists and shows the definition files of quick actions (*.conf) and\n"
-    "events widgets (*.json), by the readers of the models themselves.\n"
+    "events widgets (*.json), with the readers of the models.\n"
     "\n"
-    "  check [--strict] [--no-catalogs] [--format json] [--root DIR] [FILE|FOLDER...]\n"
+    "  check [--strict] [--no-catalogs] [--format json] [--root DIR] [FILE|DIRECTORY...]\n"
     "  list [--catalogs]\n"
     "  show FILE";
 
@@ -34,7 +34,7 @@ int fail(const QString &text)
     return CouldNotRun;
 }
 
-// What cannot be written has not been said.
+// A result that cannot be written is a failure.
 int print(const QByteArray &text, int status)
 {
     const bool isWritten =
@@ -52,7 +52,7 @@ private:
     int check(const QStringList &paths);
     int list() const;
     static int show(const QString &path);
-    // The first option that was given and that the command does not have, or nothing.
+    // The first given option that the command does not have, or an empty text.
     QString misplacedOption(const QStringList &allowed) const;
 
     QCommandLineParser m_parser;
@@ -64,13 +64,13 @@ int Command::run(const QStringList &arguments)
     const QCommandLineOption help = m_parser.addHelpOption();
     const QCommandLineOption version = m_parser.addVersionOption();
     m_parser.addOptions({
-        {QStringLiteral("strict"), QStringLiteral("check: warnings count like errors.")},
+        {QStringLiteral("strict"), QStringLiteral("check: warnings count as errors.")},
         {QStringLiteral("no-catalogs"),
          QStringLiteral("check: ignore which catalogs are installed, and what they hold.")},
         {QStringLiteral("format"), QStringLiteral("check: text, the default, or json."),
          QStringLiteral("format"), QStringLiteral("text")},
         {QStringLiteral("root"),
-         QStringLiteral("check: the root of an image or of a package's staging folder, in which "
+         QStringLiteral("check: the root of an image or of a package's staging directory, in which "
                         "catalogs are looked for and, unless files are named, definitions."),
          QStringLiteral("dir"), QStringLiteral("/")},
         {QStringLiteral("catalogs"),
@@ -79,7 +79,7 @@ int Command::run(const QStringList &arguments)
     m_parser.addPositionalArgument(QStringLiteral("command"),
                                    QStringLiteral("check, list or show."));
     m_parser.addPositionalArgument(QStringLiteral("file"),
-                                   QStringLiteral("Definition files, for check also folders."),
+                                   QStringLiteral("Definition files, for check also directories."),
                                    QStringLiteral("[file...]"));
     if (!m_parser.parse(arguments)) {
         return fail(m_parser.errorText());
@@ -105,7 +105,7 @@ int Command::run(const QStringList &arguments)
         {QStringLiteral("show"), {}},
     };
     if (!options.contains(command)) {
-        return fail(QStringLiteral("the command is check, list or show; --help says more"));
+        return fail(QStringLiteral("the command is check, list or show; see --help"));
     }
     const QString misplaced = misplacedOption(options.value(command));
     if (!misplaced.isEmpty()) {
@@ -129,7 +129,7 @@ int Command::check(const QStringList &paths)
     }
     const QString root = m_parser.value(QStringLiteral("root"));
     if (!QFileInfo(root).isDir()) {
-        return fail(QStringLiteral("there is no folder %1").arg(quoted(root)));
+        return fail(QStringLiteral("there is no directory %1").arg(quoted(root)));
     }
 
     DefinitionsChecker checker(root);
@@ -139,7 +139,7 @@ int Command::check(const QStringList &paths)
     int failure = Clean;
     if (paths.isEmpty() && !checker.checkInstalled()) {
         failure =
-            fail(QStringLiteral("there are no folders of definitions in %1").arg(quoted(root)));
+            fail(QStringLiteral("there are no directories of definitions in %1").arg(quoted(root)));
     }
     for (const QString &path : paths) {
         if (!checker.check(path)) {
@@ -192,7 +192,7 @@ QString Command::misplacedOption(const QStringList &allowed) const
 
 int main(int argc, char *argv[])
 {
-    // Packages are built in all kinds of locales; the names of files and the findings stay the same.
+    // Findings and file names do not depend on the locale in which a package is built.
     QTextCodec::setCodecForLocale(QTextCodec::codecForName("UTF-8"));
     const QCoreApplication application(argc, argv);
     QCoreApplication::setApplicationName(QStringLiteral("marlo-definitions"));

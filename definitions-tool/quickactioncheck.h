@@ -6,7 +6,7 @@
 
 #include "definitionschecker.h"
 
-// Says what is wrong with the definition file of a quick action.
+// Finds mistakes in the definition file of a quick action.
 void checkQuickAction(const QString &path, CheckContext *context, Findings *findings);
 
 #endif

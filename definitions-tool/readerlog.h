@@ -7,8 +7,8 @@
 #include <QStringList>
 
 /*
-    Takes what the readers of definition files log while it lives: with that they tell a file that
-    they refuse from one with nothing in it.
+    Intercepts warnings while it exists. The readers of definition files log a warning when they refuse
+    a file, which an empty result does not show.
 */
 class ReaderLog
 {

@@ -36,7 +36,7 @@ QString shellWord(QString text)
     return QLatin1Char('\'') + text + QLatin1Char('\'');
 }
 
-// A text goes out up to its first zero.
+// A text is sent up to its first zero character.
 QString sentText(const QString &text)
 {
     return text.section(QChar(), 0, 0);
@@ -49,7 +49,7 @@ QString callLine(const QuickAction &action)
         return QStringLiteral("# cannot be sent: %1\n").arg(error.message());
     }
     if (action.interface().isEmpty()) {
-        return QStringLiteral("# goes out without an interface, which busctl cannot do\n");
+        return QStringLiteral("# is sent without an interface, which busctl cannot do\n");
     }
     // A value may begin with a dash.
     QStringList words = {QStringLiteral("busctl"), QStringLiteral("--user"), QStringLiteral("--"),
@@ -83,9 +83,10 @@ QString callLine(const QuickAction &action)
 
 QString valueText(const QVariant &value)
 {
-    return value.userType() == QMetaType::QStringList ? QStringLiteral("a list, which is no text: ")
+    return value.userType() == QMetaType::QStringList
+        ? QStringLiteral("a list, which is not a text: ")
             + value.toStringList().join(QLatin1String(", "))
-                                                      : value.toString();
+        : value.toString();
 }
 
 std::optional<QString> showQuickAction(const QString &path)

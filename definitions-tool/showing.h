@@ -8,7 +8,7 @@
 
 #include <optional>
 
-// A definition file as its model sees it, as text for a terminal; of a quick action also its D-Bus
+// A definition file as its model reads it, as text for a terminal; for a quick action also the D-Bus
 // call, as a line for a shell. Nothing if no model reads the file.
 std::optional<QString> showDefinition(const QString &path);
 

@@ -54,7 +54,7 @@ private:
     QString write(const QByteArray &content, const char *suffix);
 
     std::unique_ptr<MessageLog> m_log;
-    std::unique_ptr<QTemporaryDir> m_folder;
+    std::unique_ptr<QTemporaryDir> m_directory;
     int m_files = 0;
 };
 
@@ -154,21 +154,21 @@ void TestAgreement::init()
 {
     m_log = std::make_unique<MessageLog>();
     // In memory: these are many files.
-    m_folder = std::make_unique<QTemporaryDir>(QStringLiteral("/run/agreement-XXXXXX"));
+    m_directory = std::make_unique<QTemporaryDir>(QStringLiteral("/run/agreement-XXXXXX"));
 }
 
 void TestAgreement::cleanup()
 {
     QCOMPARE(m_log->takeReport(), QString());
     m_log.reset();
-    m_folder.reset();
+    m_directory.reset();
 }
 
 // Under a name of its own: QSettings does not read a file anew that looks as it did.
 QString TestAgreement::write(const QByteArray &content, const char *suffix)
 {
     const QString path =
-        m_folder->filePath(QStringLiteral("%1.%2").arg(++m_files).arg(QLatin1String(suffix)));
+        m_directory->filePath(QStringLiteral("%1.%2").arg(++m_files).arg(QLatin1String(suffix)));
     Files::write(path, content);
     return path;
 }

@@ -87,8 +87,8 @@ std::vector<Finding> check(const QString &path)
 // Looks at a copy: what QSettings has read under a name it does not read again.
 bool hasErrors(const QString &path)
 {
-    const QTemporaryDir folder;
-    const QString copy = folder.filePath(QFileInfo(path).fileName());
+    const QTemporaryDir directory;
+    const QString copy = directory.filePath(QFileInfo(path).fileName());
     Files::write(copy, read(path));
     const std::vector<Finding> findings = check(copy);
     return std::any_of(findings.cbegin(), findings.cend(), [](const Finding &finding) {

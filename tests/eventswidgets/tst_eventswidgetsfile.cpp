@@ -55,6 +55,8 @@ private Q_SLOTS:
 
 private:
     std::optional<EventsWidgetsFile> read(const QByteArray &content);
+    // The only widget of a file, with these members besides its path.
+    Widget readWidget(const QByteArray &members);
     QString warning(const char *text) const;
 
     std::unique_ptr<MessageLog> m_log;
@@ -80,6 +82,12 @@ std::optional<EventsWidgetsFile> TestEventsWidgetsFile::read(const QByteArray &c
 {
     Files::write(m_path, content);
     return readEventsWidgetsFile(m_path);
+}
+
+Widget TestEventsWidgetsFile::readWidget(const QByteArray &members)
+{
+    const auto file = read(R"({ "widgets": [ { "path": "a")" + members + "} ] }");
+    return file ? file->widgets.at(0) : Widget();
 }
 
 // As MessageLog reports it.
@@ -117,10 +125,8 @@ void TestEventsWidgetsFile::readsEveryKey()
 
 void TestEventsWidgetsFile::defaultsOfAbsentKeys()
 {
-    const auto file = read(R"({ "widgets": [ { "path": "a" } ] })");
-    QVERIFY(file);
-    QCOMPARE(file->translationCatalog, QString());
-    const Widget &widget = file->widgets.at(0);
+    const Widget widget = readWidget("");
+    QCOMPARE(widget.path, QStringLiteral("a"));
     QCOMPARE(widget.title, QString());
     QCOMPARE(widget.translationId, QString());
     QCOMPARE(widget.descriptionId, QString());
@@ -151,22 +157,18 @@ void TestEventsWidgetsFile::wrongTypesReadAsAbsent()
     QVERIFY(catalog);
     QCOMPARE(catalog->translationCatalog, text);
 
-    const auto file = read(R"({ "widgets": [ { "path": "a", "title": )" + value
-                           + R"(, "translation_id": )" + value + R"(, "description_id": )" + value
-                           + R"(, "icon": )" + value + R"(, "available_path": )" + value + "} ] }");
-    QVERIFY(file);
-    const Widget &widget = file->widgets.at(0);
+    const Widget widget =
+        readWidget(R"(, "title": )" + value + R"(, "translation_id": )" + value
+                   + R"(, "description_id": )" + value + R"(, "icon": )" + value
+                   + R"(, "available_path": )" + value + R"(, "default_enabled": )" + value);
+    QCOMPARE(widget.path, QStringLiteral("a"));
     QCOMPARE(widget.title, text);
     QCOMPARE(widget.translationId, text);
     QCOMPARE(widget.descriptionId, text);
     QCOMPARE(widget.icon, text);
     QCOMPARE(widget.availablePath, text);
     QCOMPARE(widget.available, !isText);
-
-    const auto enabled =
-        read(R"({ "widgets": [ { "path": "a", "default_enabled": )" + value + "} ] }");
-    QVERIFY(enabled);
-    QCOMPARE(enabled->widgets.at(0).defaultEnabled, value == "true");
+    QCOMPARE(widget.defaultEnabled, value == "true");
 
     const auto path = read(R"({ "widgets": [ { "path": )" + value + "} ] }");
     QVERIFY(path);
@@ -210,9 +212,9 @@ void TestEventsWidgetsFile::order_data()
 void TestEventsWidgetsFile::order()
 {
     QFETCH(QByteArray, value);
-    const auto file = read(R"({ "widgets": [ { "path": "a", "order": )" + value + "} ] }");
-    QVERIFY(file);
-    QTEST(file->widgets.at(0).order, "order");
+    const Widget widget = readWidget(R"(, "order": )" + value);
+    QCOMPARE(widget.path, QStringLiteral("a"));
+    QTEST(widget.order, "order");
 }
 
 void TestEventsWidgetsFile::keepsTheOrderOfEntries()
@@ -353,7 +355,7 @@ void TestEventsWidgetsFile::missingFile()
 void TestEventsWidgetsFile::notARegularFile_data()
 {
     QTest::addColumn<QString>("kind");
-    for (const auto *kind : {"pipe", "link to a pipe", "endless device", "folder"}) {
+    for (const auto *kind : {"pipe", "link to a pipe", "endless device", "directory"}) {
         QTest::newRow(kind) << QString::fromLatin1(kind);
     }
 }
@@ -428,10 +430,8 @@ void TestEventsWidgetsFile::availability()
     Files::makeFolder(widget.availablePath);
     QVERIFY(widget.isAvailable());
 
-    const auto file = read(R"({ "widgets": [ { "path": "a", "available_path": ")"
-                           + widget.availablePath.toUtf8() + R"(" } ] })");
-    QVERIFY(file);
-    QCOMPARE(file->widgets.at(0).available, true);
+    const QByteArray path = '"' + widget.availablePath.toUtf8() + '"';
+    QVERIFY(readWidget(", \"available_path\": " + path).available);
 }
 
 void TestEventsWidgetsFile::comparison_data()

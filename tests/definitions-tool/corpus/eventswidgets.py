@@ -36,15 +36,15 @@ def file(*widgets):
 
 
 def no_json(line):
-    return f"{line}: error: from here on this is no JSON: nothing of the file is read [json]"
+    return f"{line}: error: from here on this is not JSON: nothing of the file is read [json]"
 
 
 def no_object(line):
-    return f"{line}: error: this is no object: nothing of the file is read [json]"
+    return f"{line}: error: this is not an object: nothing of the file is read [json]"
 
 
 def no_widget(line):
-    return f"{line}: error: this is no object and passed over [widget]"
+    return f"{line}: error: this is not an object and is ignored [widget]"
 
 
 def no_value(line):
@@ -72,7 +72,7 @@ def relative(line, path):
 
 
 def wrong_type(line, key, what):
-    return f'{line}: error: the value of "{key}" is not {what} and is passed over [type]'
+    return f'{line}: error: the value of "{key}" is not {what} and is ignored [type]'
 
 
 INTEGER = "an integer of 32 bits"
@@ -130,7 +130,7 @@ case(
     "bad-repeated-widgets",
     '{ "widgets": "none",\n"widgets": [ %s, 5 ], "translation_catalog": "maps" }' % short(),
     wrong_type(1, "widgets", "an array"),
-    '1: error: the key "widgets" stands again in line 2, and only that counts [repeated-key]',
+    '1: error: the key "widgets" is repeated in line 2, and only that one counts [repeated-key]',
     no_widget(2),
 )
 case(
@@ -180,29 +180,29 @@ for name, order in {"fraction": "5.5", "large": "2147483648", "huge": "1e300"}.i
 case(
     "bad-no-path",
     file(short("a"), '{\n"order": 1 }', short("b")),
-    '5: error: there is no "path": the widget is passed over [path]',
+    '5: error: there is no "path": the widget is ignored [path]',
 )
 case(
     "bad-empty-path",
     file(short("a"), '{ "order": 1,\n"path": "" }', short("b")),
-    '6: error: "path" is empty: the widget is passed over [path]',
+    '6: error: "path" is empty: the widget is ignored [path]',
 )
 case(
     "bad-path-type",
     file(short("a"), '{ "order": 1,\n"path": 7 }', short("b")),
-    '6: error: "path" is not a text: the widget is passed over [path]',
+    '6: error: "path" is not a text: the widget is ignored [path]',
 )
 case(
     "bad-repeated-key",
     file(widget(order='10,\n"title": "Torch"')),
-    '6: error: the key "title" stands again in line 11, and only that counts [repeated-key]',
+    '6: error: the key "title" is repeated in line 11, and only that one counts [repeated-key]',
 )
 case(
     "bad-several",
     file('{ "title": 3, "order": "x" }', widget(default_enabled='"yes"'), "7"),
     wrong_type(4, "title", "a text"),
     wrong_type(4, "order", INTEGER),
-    '4: error: there is no "path": the widget is passed over [path]',
+    '4: error: there is no "path": the widget is ignored [path]',
     wrong_type(12, "default_enabled", BOOLEAN),
     no_widget(15),
 )
@@ -225,8 +225,8 @@ case("good-path-url", file(widget(path='"qrc:/lamp.qml"')))
 case(
     "warn-duplicate-path",
     file(short("a"), short("b"), short("a")),
-    '6: warning: the path "/usr/share/a.qml" stands in warn-duplicate-path.json:4 too, and one of '
-    "the two widgets is lost [duplicate-path]",
+    '6: warning: the path "/usr/share/a.qml" is also in warn-duplicate-path.json:4; only one of '
+    "the two widgets is listed [duplicate-path]",
 )
 case(
     "warn-relative",

@@ -4,18 +4,15 @@
 #include "dconftool.h"
 #include "eventswidgets/eventswidgetsmodel.h"
 #include "files.h"
-#include "messagelog.h"
+#include "interfaceof.h"
+#include "loggedtest.h"
 
 #include <QAbstractItemModelTester>
-#include <QJsonArray>
-#include <QJsonDocument>
-#include <QJsonObject>
-#include <QRandomGenerator>
 #include <QtTest>
 
 #include <functional>
 
-class TestEventsWidgetsModel : public QObject
+class TestEventsWidgetsModel : public LoggedTest
 {
     Q_OBJECT
 
@@ -36,7 +33,6 @@ private Q_SLOTS:
     void badFilesHideNoGoodOnes();
     void placesByOrder_data();
     void placesByOrder();
-    void placesAsIfEveryRowWereCompared();
     void repeatedPathInOneFile();
     void repeatedPathInTwoFiles();
 
@@ -95,7 +91,6 @@ private:
     }
     QStringList storedList() const { return m_key->value().toStringList(); }
 
-    std::unique_ptr<MessageLog> m_log;
     std::unique_ptr<MGConfItem> m_key;
 };
 
@@ -178,30 +173,23 @@ void TestEventsWidgetsModel::init()
     Files::makeFolder(directory);
     m_key = std::make_unique<MGConfItem>(keyName);
     m_key->unset();
-    m_log = std::make_unique<MessageLog>();
+    LoggedTest::init();
 }
 
 void TestEventsWidgetsModel::cleanup()
 {
-    QCOMPARE(m_log->takeReport(), QString());
-    m_log.reset();
+    LoggedTest::cleanup();
     m_key.reset();
 }
 
 void TestEventsWidgetsModel::interface()
 {
     EventsWidgetsModel model;
-    const QMetaObject *meta = model.metaObject();
-    QCOMPARE(meta->propertyCount(), meta->propertyOffset());
-    QList<QByteArray> methods;
-    for (int i = meta->methodOffset(); i < meta->methodCount(); ++i) {
-        QCOMPARE(meta->method(i).access(), QMetaMethod::Public);
-        methods.append(meta->method(i).methodSignature());
-    }
-    QCOMPARE(
-        methods,
-        (QList<QByteArray>{"enableWidget(QString)", "disableWidget(QString)", "directoryChanged()",
-                           "enabledWidgetsChanged()", "updateAvailable()"}));
+    const QStringList members{
+        QStringLiteral("void enableWidget(QString)"), QStringLiteral("void disableWidget(QString)"),
+        QStringLiteral("void directoryChanged()"), QStringLiteral("void enabledWidgetsChanged()"),
+        QStringLiteral("void updateAvailable()")};
+    QCOMPARE(interfaceOf(EventsWidgetsModel::staticMetaObject), members);
     QVERIFY(model.qt_metacast("org.qt-project.Qt.QQmlParserStatus") != nullptr);
     QVERIFY(qobject_cast<QAbstractListModel *>(&model) != nullptr);
 }
@@ -373,54 +361,6 @@ void TestEventsWidgetsModel::placesByOrder()
     model.directoryChanged();
     if (orders == QVector<int>{1, 3, 7}) {
         QCOMPARE(paths(model).indexOf(QStringLiteral("late")), 2);
-    }
-}
-
-void TestEventsWidgetsModel::placesAsIfEveryRowWereCompared()
-{
-    // Widgets come, go and change their orders at random; the plain rule says what comes out.
-    struct Row {
-        QString path;
-        int order;
-    };
-    QVector<Row> expected;
-    QRandomGenerator random(20260712);
-    Model model;
-    for (int scan = 0; scan < 30; ++scan) {
-        QJsonArray widgets;
-        QStringList read;
-        for (int i = 0; i < 30; ++i) {
-            const QString path = QString::number(random.bounded(40));
-            const int order = random.bounded(-2, 8);
-            read.append(path);
-            widgets.append(
-                QJsonObject{{QStringLiteral("path"), path}, {QStringLiteral("order"), order}});
-
-            const auto known = std::find_if(expected.begin(), expected.end(),
-                                            [&path](const Row &row) { return row.path == path; });
-            if (known != expected.end()) {
-                known->order = order;
-                continue;
-            }
-            int place = expected.size();
-            for (int row = expected.size() - 1; order >= 0 && row >= 0; --row) {
-                place = order < expected.at(row).order ? row : place;
-            }
-            expected.insert(place, {path, order});
-        }
-        const auto gone = std::remove_if(expected.begin(), expected.end(), [&read](const Row &row) {
-            return !read.contains(row.path);
-        });
-        expected.erase(gone, expected.end());
-        QStringList expectedPaths;
-        for (const Row &row : qAsConst(expected)) {
-            expectedPaths.append(row.path);
-        }
-
-        Files::write(pathOf("test.json"),
-                     QJsonDocument(QJsonObject{{QStringLiteral("widgets"), widgets}}).toJson());
-        model.directoryChanged();
-        QCOMPARE(paths(model), expectedPaths);
     }
 }
 

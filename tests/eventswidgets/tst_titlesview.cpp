@@ -2,7 +2,8 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 #include "eventswidgets/titlesview.h"
-#include "messagelog.h"
+#include "interfaceof.h"
+#include "loggedtest.h"
 
 #include <QAbstractItemModelTester>
 #include <QIdentityProxyModel>
@@ -14,13 +15,12 @@
 
 Q_DECLARE_METATYPE(std::function<QVariant(QVariant)>)
 
-class TestTitlesView : public QObject
+class TestTitlesView : public LoggedTest
 {
     Q_OBJECT
 
 private Q_SLOTS:
     void init();
-    void cleanup();
 
     void interface();
     void isEmptyAtFirst();
@@ -68,9 +68,6 @@ private Q_SLOTS:
     void joins_data();
     void joins();
     void joinsByTheCurrentLocale();
-
-private:
-    std::unique_ptr<MessageLog> m_log;
 };
 
 namespace {
@@ -197,50 +194,19 @@ const QString kind = QStringLiteral("kind");
 void TestTitlesView::init()
 {
     QLocale::setDefault(QLocale(QStringLiteral("en_US")));
-    m_log = std::make_unique<MessageLog>();
-}
-
-void TestTitlesView::cleanup()
-{
-    QCOMPARE(m_log->takeReport(), QString());
-    m_log.reset();
+    LoggedTest::init();
 }
 
 void TestTitlesView::interface()
 {
-    const QMetaObject &meta = TitlesView::staticMetaObject;
-    QList<QByteArray> methods;
-    for (int i = meta.methodOffset(); i < meta.methodCount(); ++i) {
-        QCOMPARE(meta.method(i).access(), QMetaMethod::Public);
-        methods.append(meta.method(i).methodSignature());
-    }
-    QCOMPARE(
-        methods,
-        (QList<QByteArray>{"modelChanged()", "matchRoleChanged()", "matchChanged()",
-                           "roleChanged()", "valueChanged()", "update()", "joined(QStringList)"}));
-
-    struct Property {
-        QByteArray name;
-        QByteArray type;
-        bool writable;
-        QByteArray notify;
-    };
-    const QVector<Property> properties = {
-        {"model", "QObject*", true, "modelChanged"},
-        {"matchRole", "QString", true, "matchRoleChanged"},
-        {"match", "QVariant", true, "matchChanged"},
-        {"role", "QString", true, "roleChanged"},
-        {"value", "QString", false, "valueChanged"},
-        {"values", "QStringList", false, "valueChanged"},
-    };
-    QCOMPARE(meta.propertyCount() - meta.propertyOffset(), properties.size());
-    for (int i = 0; i < properties.size(); ++i) {
-        const QMetaProperty property = meta.property(meta.propertyOffset() + i);
-        QCOMPARE(QByteArray(property.name()), properties.at(i).name);
-        QCOMPARE(QByteArray(property.typeName()), properties.at(i).type);
-        QCOMPARE(property.isWritable(), properties.at(i).writable);
-        QCOMPARE(property.notifySignal().name(), properties.at(i).notify);
-    }
+    const QStringList members =
+        list({"QObject* model modelChanged()", "QString matchRole matchRoleChanged()",
+              "QVariant match matchChanged()", "QString role roleChanged()",
+              "QString value readonly valueChanged()", "QStringList values readonly valueChanged()",
+              "signal void modelChanged()", "signal void matchRoleChanged()",
+              "signal void matchChanged()", "signal void roleChanged()",
+              "signal void valueChanged()", "void update()", "QString joined(QStringList)"});
+    QCOMPARE(interfaceOf(TitlesView::staticMetaObject), members);
 }
 
 void TestTitlesView::isEmptyAtFirst()

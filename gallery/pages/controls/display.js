@@ -10,7 +10,8 @@ function icon(value) {
                              : value || "";
 }
 
-// The title of a row. A definition that has none is shown by the name of its file.
+// The title of a row. A row without one shows the name of its file. A row that is being removed has
+// neither.
 function title(title, path) {
-    return title || path.replace(/^.*\//, "");
+    return title || (path || "").replace(/^.*\//, "");
 }

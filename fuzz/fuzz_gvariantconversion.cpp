@@ -27,8 +27,8 @@ void store(const QVariant &value)
 
 QVariant takeValue(Bytes *input, int nesting)
 {
-    const int type = input->takeByte() % 12;
-    const int count = nesting < 40 ? input->takeByte() % 8 : 0;
+    const int type = input->takeByte() % 10;
+    const int count = nesting < 2 ? input->takeByte() % 8 : 0;
     switch (type) {
     case 0:
         return true;
@@ -41,29 +41,20 @@ QVariant takeValue(Bytes *input, int nesting)
     case 4:
         return qulonglong(input->takeByte()) << 56U;
     case 5:
-        return 1.0 / input->takeByte();
-    case 6:
         return QString::fromUtf8(input->takeUntil(';'));
-    case 7: {
+    case 6: {
         // Half a surrogate pair, as QML's texts may hold.
         const QByteArray text = input->takeUntil(';');
         return QString(reinterpret_cast<const QChar *>(text.constData()), text.size() / 2);
     }
-    case 8: {
+    case 7: {
         QStringList list;
         for (int i = 0; i < count; ++i) {
             list.append(QString::fromLatin1(input->takeUntil(';')));
         }
         return list;
     }
-    case 9: {
-        QVariantList list;
-        for (int i = 0; i < count; ++i) {
-            list.append(takeValue(input, nesting + 1));
-        }
-        return list;
-    }
-    case 10: {
+    case 8: {
         QVariantMap map;
         for (int i = 0; i < count; ++i) {
             const QString key = QString::fromUtf8(input->takeUntil(';'));

@@ -10,10 +10,6 @@
 
 namespace {
 
-// Within the 128 levels of GVariant the database gives back 41 maps in each other, three levels
-// each, and no more. D-Bus, by which programs pass settings on, carries 32 arrays in each other.
-constexpr int maximumNesting = 32;
-
 GVariantPtr sink(GVariant *floating)
 {
     return GVariantPtr(g_variant_ref_sink(floating));
@@ -29,15 +25,6 @@ GVariantPtr refuseText(QString *reason)
     *reason = QStringLiteral("text of type QString with a NUL or half a surrogate pair");
     return nullptr;
 }
-
-GVariantPtr refuseNesting(const char *type, QString *reason)
-{
-    *reason = QStringLiteral("a value of type %1 nested deeper than %2 levels")
-                  .arg(QLatin1String(type), QString::number(maximumNesting));
-    return nullptr;
-}
-
-GVariantPtr convert(const QVariant &value, int nesting, QString *reason);
 
 GVariantPtr convertText(const QString &text, QString *reason)
 {
@@ -61,45 +48,7 @@ GVariantPtr convertStringList(const QStringList &list, QString *reason)
     return sink(g_variant_builder_end(&builder));
 }
 
-GVariantPtr convertList(const QVariantList &list, int nesting, QString *reason)
-{
-    if (nesting > maximumNesting) {
-        return refuseNesting("QVariantList", reason);
-    }
-    GVariantBuilder builder;
-    g_variant_builder_init(&builder, G_VARIANT_TYPE("av"));
-    for (const QVariant &element : list) {
-        const GVariantPtr converted = convert(element, nesting, reason);
-        if (!converted) {
-            g_variant_builder_clear(&builder);
-            return nullptr;
-        }
-        g_variant_builder_add(&builder, "v", converted.get());
-    }
-    return sink(g_variant_builder_end(&builder));
-}
-
-GVariantPtr convertMap(const QVariantMap &map, int nesting, QString *reason)
-{
-    if (nesting > maximumNesting) {
-        return refuseNesting("QVariantMap", reason);
-    }
-    GVariantBuilder builder;
-    g_variant_builder_init(&builder, G_VARIANT_TYPE_VARDICT);
-    for (auto it = map.cbegin(); it != map.cend(); ++it) {
-        const GVariantPtr converted = isUnicodeWithoutNul(it.key())
-            ? convert(it.value(), nesting, reason)
-            : refuseText(reason);
-        if (!converted) {
-            g_variant_builder_clear(&builder);
-            return nullptr;
-        }
-        g_variant_builder_add(&builder, "{sv}", it.key().toUtf8().constData(), converted.get());
-    }
-    return sink(g_variant_builder_end(&builder));
-}
-
-GVariantPtr convert(const QVariant &value, int nesting, QString *reason)
+GVariantPtr convertPlain(const QVariant &value, QString *reason)
 {
     switch (value.userType()) {
     case QMetaType::Bool:
@@ -112,24 +61,32 @@ GVariantPtr convert(const QVariant &value, int nesting, QString *reason)
         return sink(g_variant_new_int64(value.toLongLong()));
     case QMetaType::ULongLong:
         return sink(g_variant_new_uint64(value.toULongLong()));
-    case QMetaType::Float:
-    case QMetaType::Double:
-        return sink(g_variant_new_double(value.toDouble()));
     case QMetaType::QString:
         return convertText(value.toString(), reason);
     case QMetaType::QStringList:
         return convertStringList(value.toStringList(), reason);
-    case QMetaType::QVariantList:
-        return convertList(value.toList(), nesting + 1, reason);
-    case QMetaType::QVariantMap:
-    case QMetaType::QVariantHash: // sorted as a map, or an equal hash might look like another value
-        return convertMap(value.toMap(), nesting + 1, reason);
     default:
         *reason = value.isValid()
             ? QStringLiteral("a value of type %1").arg(QLatin1String(value.typeName()))
             : QStringLiteral("an invalid QVariant");
         return nullptr;
     }
+}
+
+GVariantPtr convertMap(const QVariantMap &map, QString *reason)
+{
+    GVariantBuilder builder;
+    g_variant_builder_init(&builder, G_VARIANT_TYPE_VARDICT);
+    for (auto it = map.cbegin(); it != map.cend(); ++it) {
+        const GVariantPtr converted =
+            isUnicodeWithoutNul(it.key()) ? convertPlain(it.value(), reason) : refuseText(reason);
+        if (!converted) {
+            g_variant_builder_clear(&builder);
+            return nullptr;
+        }
+        g_variant_builder_add(&builder, "{sv}", it.key().toUtf8().constData(), converted.get());
+    }
+    return sink(g_variant_builder_end(&builder));
 }
 
 QVariant convert(GVariant *value);
@@ -178,7 +135,7 @@ QVariantMap map(GVariant *dictionary)
     QVariantMap map;
     for (gsize i = 0; i < count; ++i) {
         const GVariantPtr entry = childAt(dictionary, i);
-        const QString key = convert(childAt(entry.get(), 0).get()).toString();
+        const QString key = text(childAt(entry.get(), 0).get());
         if (!map.contains(key)) { // of equal keys the first counts, as in GLib's own look-up
             map.insert(key, convert(childAt(entry.get(), 1).get()));
         }
@@ -186,19 +143,15 @@ QVariantMap map(GVariant *dictionary)
     return map;
 }
 
-QVariant convertArray(GVariant *array)
+QVariant convertContainer(GVariant *container)
 {
-    if (g_variant_is_of_type(array, G_VARIANT_TYPE_STRING_ARRAY)) {
-        return stringList(array);
+    if (g_variant_is_of_type(container, G_VARIANT_TYPE_STRING_ARRAY)) {
+        return stringList(container);
     }
-    if (g_variant_is_of_type(array, G_VARIANT_TYPE_BYTESTRING)) {
-        return QByteArray(static_cast<const char *>(g_variant_get_data(array)),
-                          static_cast<int>(g_variant_get_size(array)));
+    if (g_variant_is_of_type(container, G_VARIANT_TYPE("a{s*}"))) {
+        return map(container);
     }
-    if (g_variant_is_of_type(array, G_VARIANT_TYPE_DICTIONARY)) {
-        return map(array);
-    }
-    return list(array);
+    return list(container);
 }
 
 QVariant convert(GVariant *value)
@@ -220,24 +173,15 @@ QVariant convert(GVariant *value)
         return static_cast<qlonglong>(g_variant_get_int64(value));
     case G_VARIANT_CLASS_UINT64:
         return static_cast<qulonglong>(g_variant_get_uint64(value));
-    case G_VARIANT_CLASS_HANDLE:
-        return g_variant_get_handle(value);
     case G_VARIANT_CLASS_DOUBLE:
         return g_variant_get_double(value);
     case G_VARIANT_CLASS_STRING:
-    case G_VARIANT_CLASS_OBJECT_PATH:
-    case G_VARIANT_CLASS_SIGNATURE:
         return text(value);
     case G_VARIANT_CLASS_VARIANT:
-    case G_VARIANT_CLASS_MAYBE:
-        return g_variant_n_children(value) > 0 ? convert(childAt(value, 0).get()) : QVariant();
-    case G_VARIANT_CLASS_ARRAY:
-        return convertArray(value);
-    case G_VARIANT_CLASS_TUPLE:
-    case G_VARIANT_CLASS_DICT_ENTRY:
-        return list(value);
+        return convert(childAt(value, 0).get());
+    default:
+        return g_variant_is_container(value) ? convertContainer(value) : QVariantList();
     }
-    return {};
 }
 
 } // namespace
@@ -249,7 +193,8 @@ void GVariantUnref::operator()(GVariant *value) const
 
 GVariantPtr toGVariant(const QVariant &value, QString *reason)
 {
-    return convert(value, 0, reason);
+    return value.userType() == QMetaType::QVariantMap ? convertMap(value.toMap(), reason)
+                                                      : convertPlain(value, reason);
 }
 
 QVariant toQVariant(GVariant *value)

@@ -16,19 +16,19 @@ struct GVariantUnref {
 using GVariantPtr = std::unique_ptr<GVariant, GVariantUnref>;
 
 /*
-    The value as the settings database holds it: bool, int, uint, 64 bit integers, floating point
-    numbers, strings, string lists, and lists and maps of these. Null, with a reason, for a value
-    of any other type, text that is no Unicode or holds a NUL, and nesting beyond 32 levels.
+    The value as the settings database holds it: a boolean, an integer, a string, a string list, or a
+    map of these. Null, with a reason, for a value of any other type and for text that is not Unicode
+    or contains a NUL.
 */
 GVariantPtr toGVariant(const QVariant &value, QString *reason);
 
 /*
-    The value as Qt holds it, whatever its type; invalid if the data is damaged.
+    The value as Qt holds it; invalid only if the data is damaged, because any stored value may count
+    as a choice.
 
-    Small integers become int or uint. An array becomes a QVariantList, but an array of strings a
-    QStringList and one of bytes a QByteArray with every byte it has. A dictionary becomes a
-    QVariantMap whatever its keys: numbers and booleans stand there as their text. A tuple becomes
-    a QVariantList; a variant or a maybe what it holds, and an empty maybe an invalid value.
+    Small integers become int or uint. An array of strings becomes a QStringList, a dictionary with
+    strings as keys a QVariantMap, and a variant what it contains. All other containers become a
+    QVariantList, and all other values an empty one.
 */
 QVariant toQVariant(GVariant *value);
 

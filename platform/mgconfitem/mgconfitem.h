@@ -35,8 +35,8 @@ public:
     QVariant value() const;
     QVariant value(const QVariant &defaultValue) const;
 
-    // Stores booleans, numbers, strings, string lists, and lists and maps of these. Any other value
-    // is refused with a warning and the key stays as it is; an invalid one unsets the key.
+    // Stores booleans, integers, strings, string lists and maps of these. Any other value is refused
+    // with a warning and the key stays as it is; an invalid one unsets the key.
     void set(const QVariant &value);
     void unset();
 

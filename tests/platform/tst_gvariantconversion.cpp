@@ -44,16 +44,6 @@ GVariantPtr untrusted(const char *type, const QByteArray &data)
     return GVariantPtr(g_variant_ref_sink(value));
 }
 
-QVariant nest(int levels, bool inMaps)
-{
-    QVariant value = 1;
-    for (int i = 0; i < levels; ++i) {
-        value = inMaps ? QVariant(QVariantMap{{QStringLiteral("k"), value}})
-                       : QVariant(QVariantList{value});
-    }
-    return value;
-}
-
 } // namespace
 
 class TestGVariantConversion : public QObject
@@ -70,15 +60,10 @@ private Q_SLOTS:
 
     void bothWays_data();
     void bothWays();
-    void floatBecomesDouble();
-    void notANumberStaysOne();
-    void equalHashesBecomeEqualValues();
     void refusesOtherTypes_data();
     void refusesOtherTypes();
     void refusesTextThatIsNone_data();
     void refusesTextThatIsNone();
-    void holdsThirtyTwoLevels_data();
-    void holdsThirtyTwoLevels();
     void readsForeignTypes_data();
     void readsForeignTypes();
     void readsTheFirstOfEqualKeys();
@@ -109,9 +94,6 @@ void TestGVariantConversion::bothWays_data()
                                << QStringLiteral("int64 -9223372036854775808");
     QTest::newRow("qulonglong") << QVariant(std::numeric_limits<qulonglong>::max())
                                 << QStringLiteral("uint64 18446744073709551615");
-    QTest::newRow("double") << QVariant(0.1) << QStringLiteral("0.10000000000000001");
-    QTest::newRow("infinity") << QVariant(-std::numeric_limits<double>::infinity())
-                              << QStringLiteral("-inf");
     QTest::newRow("string") << QVariant(text) << QStringLiteral("'text'");
     QTest::newRow("empty string") << QVariant(QString()) << QStringLiteral("''");
     QTest::newRow("beyond Latin") << QVariant(QStringLiteral("Ünïcödé 日本 😀"))
@@ -123,17 +105,10 @@ void TestGVariantConversion::bothWays_data()
         QStringList{QStringLiteral("b"), QString(), QStringLiteral("a")})
                                  << QStringLiteral("['b', '', 'a']");
     QTest::newRow("empty string list") << QVariant(QStringList()) << QStringLiteral("@as []");
-    QTest::newRow("list") << QVariant(QVariantList{1, text, QVariantList{true}})
-                          << QStringLiteral("[<1>, <'text'>, <[<true>]>]");
-    QTest::newRow("empty list") << QVariant(QVariantList()) << QStringLiteral("@av []");
-    QTest::newRow("map") << QVariant(QVariantMap{{QStringLiteral("b"), 1.5},
-                                                 {QStringLiteral("a"), QStringList{text}},
-                                                 {QString(), QVariantMap()}})
-                         << QStringLiteral("{'': <@a{sv} {}>, 'a': <['text']>, 'b': <1.5>}");
+    QTest::newRow("map") << QVariant(QVariantMap{
+        {QStringLiteral("b"), 15}, {QStringLiteral("a"), QStringList{text}}, {QString(), true}})
+                         << QStringLiteral("{'': <true>, 'a': <['text']>, 'b': <15>}");
     QTest::newRow("empty map") << QVariant(QVariantMap()) << QStringLiteral("@a{sv} {}");
-    QTest::newRow("maps in lists in maps") << QVariant(
-        QVariantMap{{QStringLiteral("k"), QVariantList{QVariantMap{{QStringLiteral("l"), 7U}}}}})
-                                           << QStringLiteral("{'k': <[<{'l': <uint32 7>}>]>}");
 }
 
 void TestGVariantConversion::bothWays()
@@ -153,43 +128,6 @@ void TestGVariantConversion::bothWays()
     QCOMPARE(back, value);
 }
 
-void TestGVariantConversion::floatBecomesDouble()
-{
-    QString reason;
-    const GVariantPtr converted = toGVariant(0.5F, &reason);
-    QVERIFY(converted);
-    QCOMPARE(describe(toQVariant(converted.get())), describe(0.5));
-}
-
-void TestGVariantConversion::notANumberStaysOne()
-{
-    QString reason;
-    const GVariantPtr converted = toGVariant(std::numeric_limits<double>::quiet_NaN(), &reason);
-    QVERIFY(converted);
-    QCOMPARE(print(converted.get()), QStringLiteral("nan"));
-    QVERIFY(qIsNaN(toQVariant(converted.get()).toDouble()));
-}
-
-void TestGVariantConversion::equalHashesBecomeEqualValues()
-{
-    QVariantHash forward;
-    QVariantHash backward;
-    backward.reserve(1000);
-    for (int i = 0; i < 50; ++i) {
-        forward.insert(QString::number(i), i);
-        backward.insert(QString::number(49 - i), 49 - i);
-    }
-    QCOMPARE(forward, backward);
-    QVERIFY(forward.keys() != backward.keys());
-
-    QString reason;
-    const GVariantPtr first = toGVariant(forward, &reason);
-    const GVariantPtr second = toGVariant(backward, &reason);
-    QVERIFY(first && second);
-    QVERIFY(g_variant_equal(first.get(), second.get()));
-    QCOMPARE(describe(toQVariant(first.get())), describe(QVariant(forward).toMap()));
-}
-
 void TestGVariantConversion::refusesOtherTypes_data()
 {
     QTest::addColumn<QVariant>("value");
@@ -204,14 +142,16 @@ void TestGVariantConversion::refusesOtherTypes_data()
     QTest::newRow("character") << QVariant(QChar(u'x')) << type("QChar");
     QTest::newRow("null pointer") << QVariant::fromValue(nullptr) << type("std::nullptr_t");
     QTest::newRow("object") << QVariant::fromValue<QObject *>(this) << type("QObject*");
-    QTest::newRow("in a list") << QVariant(QVariantList{1, QByteArray()}) << type("QByteArray");
+    QTest::newRow("double") << QVariant(0.5) << type("double");
+    QTest::newRow("list") << QVariant(QVariantList{1}) << type("QVariantList");
+    QTest::newRow("hash") << QVariant(QVariantHash()) << type("QVariantHash");
+    QTest::newRow("map in a map") << QVariant(QVariantMap{{QStringLiteral("k"), QVariantMap()}})
+                                  << type("QVariantMap");
     QTest::newRow("in a map") << QVariant(QVariantMap{{QStringLiteral("k"), QUrl()}})
                               << type("QUrl");
-    QTest::newRow("in a hash") << QVariant(QVariantHash{{QStringLiteral("k"), QUrl()}})
-                               << type("QUrl");
     QTest::newRow("invalid") << QVariant() << QStringLiteral("an invalid QVariant");
-    QTest::newRow("invalid in a list")
-        << QVariant(QVariantList{QVariant()}) << QStringLiteral("an invalid QVariant");
+    QTest::newRow("invalid in a map") << QVariant(QVariantMap{{QStringLiteral("k"), QVariant()}})
+                                      << QStringLiteral("an invalid QVariant");
 }
 
 void TestGVariantConversion::refusesOtherTypes()
@@ -245,11 +185,8 @@ void TestGVariantConversion::refusesTextThatIsNone()
     const QVariantList carriers = {
         text,
         QStringList{fine, text},
-        QVariantList{fine, text},
         QVariantMap{{fine, text}},
         QVariantMap{{text, fine}},
-        QVariantHash{{text, fine}},
-        QVariantList{QVariantMap{{fine, QVariantMap{{text, fine}}}}},
         QVariantMap{{fine, QStringList{text}}},
     };
     for (const QVariant &carrier : carriers) {
@@ -257,33 +194,6 @@ void TestGVariantConversion::refusesTextThatIsNone()
         QVERIFY2(!toGVariant(carrier, &reason), qPrintable(describe(carrier)));
         QCOMPARE(reason,
                  QStringLiteral("text of type QString with a NUL or half a surrogate pair"));
-    }
-}
-
-void TestGVariantConversion::holdsThirtyTwoLevels_data()
-{
-    QTest::addColumn<bool>("inMaps");
-    QTest::addColumn<QString>("type");
-
-    QTest::newRow("lists") << false << QStringLiteral("QVariantList");
-    QTest::newRow("maps") << true << QStringLiteral("QVariantMap");
-}
-
-void TestGVariantConversion::holdsThirtyTwoLevels()
-{
-    QFETCH(const bool, inMaps);
-    QFETCH(const QString, type);
-
-    QString reason;
-    const GVariantPtr deepest = toGVariant(nest(32, inMaps), &reason);
-    QVERIFY(deepest);
-    QCOMPARE(toQVariant(deepest.get()), nest(32, inMaps));
-
-    const auto levels = {33, 10000};
-    for (const int deeper : levels) {
-        QVERIFY(!toGVariant(nest(deeper, inMaps), &reason));
-        QCOMPARE(reason,
-                 QStringLiteral("a value of type %1 nested deeper than 32 levels").arg(type));
     }
 }
 
@@ -295,34 +205,27 @@ void TestGVariantConversion::readsForeignTypes_data()
     QTest::newRow("byte 0xff") << QVariant(255);
     QTest::newRow("int16 -5") << QVariant(-5);
     QTest::newRow("uint16 65535") << QVariant(65535U);
-    QTest::newRow("handle 3") << QVariant(3);
-    QTest::newRow("objectpath '/a/b'") << QVariant(text("/a/b"));
-    QTest::newRow("signature 'a{sv}'") << QVariant(text("a{sv}"));
+    QTest::newRow("1.5") << QVariant(1.5);
     QTest::newRow("<<<'deep'>>>") << QVariant(text("deep"));
+    QTest::newRow("[<'a'>, <1>]") << QVariant(QVariantList{text("a"), 1});
     QTest::newRow("[1, 2]") << QVariant(QVariantList{1, 2});
     QTest::newRow("@ai []") << QVariant(QVariantList());
     QTest::newRow("[['a'], []]") << QVariant(QVariantList{QStringList{text("a")}, QStringList()});
-    QTest::newRow("[objectpath '/a']") << QVariant(QVariantList{text("/a")});
-    QTest::newRow("@ay [0x61, 0x00, 0xff]") << QVariant(QByteArray("a\0\xff", 3));
-    QTest::newRow("b'bytes'") << QVariant(QByteArray("bytes\0", 6));
-    QTest::newRow("@ay []") << QVariant(QByteArray(""));
     QTest::newRow("{'a': 1}") << QVariant(QVariantMap{{text("a"), 1}});
     QTest::newRow("{'a': 'b'}") << QVariant(QVariantMap{{text("a"), text("b")}});
+    QTest::newRow("{'a': <{'b': <1>}>}")
+        << QVariant(QVariantMap{{text("a"), QVariantMap{{text("b"), 1}}}});
     QTest::newRow("@a{ss} {}") << QVariant(QVariantMap());
-    QTest::newRow("{objectpath '/a': <1>}") << QVariant(QVariantMap{{text("/a"), 1}});
-    QTest::newRow("{1: 'x', -2: 'y'}")
-        << QVariant(QVariantMap{{text("1"), text("x")}, {text("-2"), text("y")}});
-    QTest::newRow("{true: 1}") << QVariant(QVariantMap{{text("true"), 1}});
-    QTest::newRow("{uint64 18446744073709551615: 1}")
-        << QVariant(QVariantMap{{text("18446744073709551615"), 1}});
-    QTest::newRow("{1.5: 1}") << QVariant(QVariantMap{{text("1.5"), 1}});
-    QTest::newRow("@ms nothing") << QVariant();
-    QTest::newRow("@ms 'some'") << QVariant(text("some"));
-    QTest::newRow("@mms just nothing") << QVariant();
-    QTest::newRow("@ami [just 1, nothing]") << QVariant(QVariantList{1, QVariant()});
+    // Types that nothing stores are values all the same.
+    QTest::newRow("handle 3") << QVariant(QVariantList());
+    QTest::newRow("objectpath '/a/b'") << QVariant(QVariantList());
+    QTest::newRow("signature 'a{sv}'") << QVariant(QVariantList());
+    QTest::newRow("b'a'") << QVariant(QVariantList{97, 0});
+    QTest::newRow("{1: 'x'}") << QVariant(QVariantList{QVariantList{1, text("x")}});
+    QTest::newRow("@ms nothing") << QVariant(QVariantList());
+    QTest::newRow("@ms 'some'") << QVariant(QVariantList{text("some")});
     QTest::newRow("()") << QVariant(QVariantList());
     QTest::newRow("('a', 1, [true])") << QVariant(QVariantList{text("a"), 1, QVariantList{true}});
-    QTest::newRow("{'a', 1}") << QVariant(QVariantList{text("a"), 1}); // an entry on its own
 }
 
 void TestGVariantConversion::readsForeignTypes()

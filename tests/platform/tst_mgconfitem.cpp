@@ -399,11 +399,10 @@ void TestMGConfItem::equalValueEmitsNothing()
 {
     const QVariantList values = {
         1,
-        1.5,
         QStringLiteral("x"),
         QStringList{QStringLiteral("x")},
         QStringList(),
-        QVariantMap{{QStringLiteral("k"), QVariantList{1, 2}}},
+        QVariantMap{{QStringLiteral("k"), QStringList{QStringLiteral("x")}}},
     };
     for (const QVariant &value : values) {
         const QString key = newKey();
@@ -433,7 +432,7 @@ void TestMGConfItem::anotherTypeIsAnotherValue()
     item.set(1U);
     QCOMPARE(changed.count(), 1);
     QCOMPARE(describe(item.value()), describe(1U));
-    item.set(QVariantList());
+    item.set(QVariantMap());
     item.set(QStringList());
     QCOMPARE(changed.count(), 3);
     QCOMPARE(describe(item.value()), describe(QStringList()));
@@ -739,15 +738,12 @@ void TestMGConfItem::storesWhatOthersRead_data()
     QTest::newRow("uint") << QVariant(5U) << QByteArray("uint32 5");
     QTest::newRow("qlonglong") << QVariant(-5LL) << QByteArray("int64 -5");
     QTest::newRow("qulonglong") << QVariant(5ULL) << QByteArray("uint64 5");
-    QTest::newRow("double") << QVariant(0.5) << QByteArray("0.5");
     QTest::newRow("string") << QVariant(text) << QByteArray("'tëxt'");
     QTest::newRow("string list") << QVariant(QStringList{text, QString()})
                                  << QByteArray("['tëxt', '']");
     QTest::newRow("empty string list") << QVariant(QStringList()) << QByteArray("@as []");
-    QTest::newRow("list") << QVariant(QVariantList{1, text}) << QByteArray("[<1>, <'tëxt'>]");
-    QTest::newRow("empty list") << QVariant(QVariantList()) << QByteArray("@av []");
-    QTest::newRow("map") << QVariant(QVariantMap{{text, QVariantMap{{text, 1}}}})
-                         << QByteArray("{'tëxt': <{'tëxt': <1>}>}");
+    QTest::newRow("map") << QVariant(QVariantMap{{text, QStringList{text}}})
+                         << QByteArray("{'tëxt': <['tëxt']>}");
     QTest::newRow("empty map") << QVariant(QVariantMap()) << QByteArray("@a{sv} {}");
 }
 
@@ -780,11 +776,7 @@ void TestMGConfItem::readsWhatOthersStore_data()
     QTest::newRow("[1, 2]") << QVariant(QVariantList{1, 2});
     QTest::newRow("('a', 1)") << QVariant(QVariantList{text("a"), 1});
     QTest::newRow("{'a': <1>}") << QVariant(QVariantMap{{text("a"), 1}});
-    QTest::newRow("{1: 'x'}") << QVariant(QVariantMap{{text("1"), text("x")}});
-    QTest::newRow("@ms 'some'") << QVariant(text("some"));
-    QTest::newRow("@ms nothing") << QVariant();
-    QTest::newRow("b'bytes'") << QVariant(QByteArray("bytes\0", 6));
-    QTest::newRow("objectpath '/a'") << QVariant(text("/a"));
+    QTest::newRow("handle 5") << QVariant(QVariantList());
     QTest::newRow("<<1>>") << QVariant(1);
 }
 
@@ -810,7 +802,7 @@ void TestMGConfItem::refusesWhatCannotBeHeld_data()
         QStringLiteral("text of type QString with a NUL or half a surrogate pair");
     QTest::newRow("type") << QVariant(QUrl(QStringLiteral("file:///x")))
                           << QStringLiteral("a value of type QUrl");
-    QTest::newRow("nested type") << QVariant(QVariantList{QByteArray()})
+    QTest::newRow("nested type") << QVariant(QVariantMap{{QStringLiteral("k"), QByteArray()}})
                                  << QStringLiteral("a value of type QByteArray");
     QTest::newRow("NUL") << QVariant(QString(QChar(QChar::Null))) << notText;
     QTest::newRow("lone surrogate in a key")

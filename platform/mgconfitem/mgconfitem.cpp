@@ -5,6 +5,8 @@
 
 #include <QAbstractEventDispatcher>
 #include <QSemaphore>
+#include <QSet>
+#include <QTimer>
 #include <QtDebug>
 #include <cstdlib>
 #include <cstring>
@@ -14,6 +16,9 @@ namespace {
 
 // How long an exiting process waits for dconf-service to take what was set last.
 constexpr int exitTimeoutMs = 5000;
+
+// How long a key stays watched when no item is left.
+constexpr int unwatchDelayMs = 1000;
 
 DConfClient *client();
 
@@ -111,6 +116,23 @@ void warnOfLimits()
     }
 }
 
+// Each watch and each unwatch is a message to the bus, which dconf queues without a limit. Pages may
+// create and destroy items faster than the bus takes messages: a key therefore stays watched for a
+// moment after its last item is gone.
+void unwatchLater(const QByteArray &path)
+{
+    static QSet<QByteArray> kept;
+    if (!QAbstractEventDispatcher::instance() || kept.contains(path)) {
+        dconf_client_unwatch_fast(client(), path.constData());
+        return;
+    }
+    kept.insert(path);
+    QTimer::singleShot(unwatchDelayMs, [path] {
+        kept.remove(path);
+        dconf_client_unwatch_fast(client(), path.constData());
+    });
+}
+
 } // namespace
 
 MGConfItem::MGConfItem(const QString &key, QObject *parent) : QObject(parent), m_key(key)
@@ -138,8 +160,8 @@ MGConfItem::MGConfItem(const QString &key, QObject *parent) : QObject(parent), m
 MGConfItem::~MGConfItem()
 {
     if (!m_path.isEmpty()) {
-        dconf_client_unwatch_fast(client(), m_path.constData());
         g_signal_handler_disconnect(client(), m_handler);
+        unwatchLater(m_path);
     }
 }
 

@@ -500,6 +500,7 @@ void TestMGConfItem::deletedItemIsWatchedNoMore()
 {
     // What goes out over the connection that dconf uses, seen in a thread of GLib's.
     static std::atomic<int> watches{0};
+    static std::atomic<int> messages{0};
     static const QString key = newKey();
     GDBusConnection *const bus = g_bus_get_sync(G_BUS_TYPE_SESSION, nullptr, nullptr);
     QVERIFY(bus != nullptr);
@@ -509,6 +510,7 @@ void TestMGConfItem::deletedItemIsWatchedNoMore()
         if (incoming == FALSE && QByteArray(rule).contains(path)) {
             const QByteArray member = g_dbus_message_get_member(message);
             watches += member == "AddMatch" ? 1 : member == "RemoveMatch" ? -1 : 0;
+            ++messages;
         }
         return message;
     };
@@ -522,6 +524,16 @@ void TestMGConfItem::deletedItemIsWatchedNoMore()
     QCOMPARE(watches.load(), 1);
     another.reset();
     QTRY_COMPARE(watches.load(), 0);
+    QCOMPARE(messages.load(), 2);
+
+    // Items that come and go quickly share one watch, or a message for each would wait to be sent.
+    for (int i = 0; i < 1000; ++i) {
+        const MGConfItem brief(key);
+    }
+    QTRY_COMPARE(messages.load(), 4);
+    QTest::qWait(100);
+    QCOMPARE(messages.load(), 4);
+    QCOMPARE(watches.load(), 0);
 
     g_dbus_connection_remove_filter(bus, filter);
     g_object_unref(bus);

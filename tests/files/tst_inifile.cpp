@@ -83,6 +83,9 @@ QByteArray randomFile(std::mt19937 *random)
         "x",
         "\\x",
         "\\q",
+        "\\8",
+        "\\t",
+        "\\?",
         "\\",
         "\\\\",
         "\\\"",
@@ -111,7 +114,7 @@ QByteArray randomFile(std::mt19937 *random)
     const auto below = [random](int end) { return int((*random)() % uint(end)); };
     QByteArray text = below(4) == 0 ? iniByteOrderMark : "";
     for (int key = 1 + below(3); key > 0; --key) {
-        text += 'k' + QByteArray::number(key) + '=';
+        text += below(8) == 0 ? "" : 'k' + QByteArray::number(key) + '=';
         for (int count = below(7); count > 0; --count) {
             text += pieces.at(size_t(below(int(pieces.size()))));
         }

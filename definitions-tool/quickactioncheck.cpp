@@ -55,10 +55,10 @@ const QStringList &knownKeys()
 }
 
 constexpr int maximumName = 255;
-// Of a call, whose signature has no more letters. What is beyond is not read.
+// The reader ignores more arguments: no signature of a call is longer.
 constexpr int maximumArguments = 255;
 
-// What a call may go out to, by D-Bus's own rules. QtDBus answers other names with an error.
+// The names that D-Bus allows in a call. QtDBus answers other names with an error.
 struct Name {
     QString key;
     QString (Action::*value)() const;
@@ -74,7 +74,7 @@ const std::vector<Name> &names()
          QStringLiteral("name of a service")},
         {pathKey, &Action::objectPath, QStringLiteral("/|(/\\w+)+"),
          QStringLiteral("path of an object")},
-        // The one thing that a call may do without.
+        // Optional, as the only one.
         {interfaceKey, &Action::interface, QStringLiteral("([a-zA-Z_]\\w*(\\.[a-zA-Z_]\\w*)+)?"),
          QStringLiteral("name of an interface")},
         {methodKey, &Action::method, QStringLiteral("[a-zA-Z_]\\w*"),
@@ -103,7 +103,7 @@ int argumentNumber(const QString &key)
     static const QRegularExpression element(
         QRegularExpression::anchoredPattern(QStringLiteral("remote-arguments/([0-9]+)/argument")));
     const QRegularExpressionMatch match = element.match(key);
-    // QSettings writes no zeroes before a number and finds none with them.
+    // QSettings does not find numbers with leading zeroes.
     const bool isNumber = match.hasMatch() && !match.capturedRef(1).startsWith(QLatin1Char('0'));
     return isNumber ? match.capturedRef(1).toInt() : 0;
 }
@@ -145,7 +145,7 @@ public:
     void checkCall();
 
 private:
-    // The last one counts. What is not in the file concerns the whole of it.
+    // The line of the last such key, or the first line if the file has no such key.
     int lineOf(const QString &key) const { return m_lineOf.value(key, 1); }
     void checkKey(const NamedIniLine &line, const QString &section);
     void checkText(const QString &key, const QVariant &value);
@@ -161,7 +161,7 @@ private:
     CheckContext *const m_context;
     Findings *const m_findings;
     QHash<QString, int> m_lineOf;
-    // Keys whose value reads as none.
+    // Keys whose value is not a string.
     QSet<QString> m_misread;
     bool m_argumentsAreWrong = false;
 };
@@ -224,7 +224,7 @@ void QuickActionCheck::checkKey(const NamedIniLine &line, const QString &section
                && argumentNumber(line.name) == 0) {
         QString key = line.name.mid(section.size());
         const int number = qMax(1, key.section(QLatin1Char('/'), 0, 0).toInt());
-        // As it stands there.
+        // As in the file.
         key.replace(QLatin1Char('/'), QLatin1Char('\\'));
         reportUnknownKey(QStringLiteral("key"), key,
                          {QStringLiteral("size"), QStringLiteral("%1\\argument").arg(number)},
@@ -257,7 +257,7 @@ void QuickActionCheck::checkTexts()
 
 void QuickActionCheck::checkText(const QString &key, const QVariant &value)
 {
-    // The icon goes to pages as it is: there a list is no picture, nor is anything else.
+    // Pages get the icon as it is, and can only use a string.
     if (value.userType() == QMetaType::QString || (key != iconKey && !value.toString().isEmpty())) {
         return;
     }
@@ -298,7 +298,7 @@ void QuickActionCheck::checkArguments()
             highestLine = line.number;
         }
     }
-    // Under a key of that name QSettings may have something else.
+    // The file may have a key of that name instead of the array.
     const bool hasArray = m_lineOf.contains(sizeKey) || highest > 0;
     const QVariantList arguments = hasArray ? m_action.arguments() : QVariantList();
     const int size = arguments.size();
@@ -352,7 +352,7 @@ void QuickActionCheck::checkCall()
             continue;
         }
         isSendable = false;
-        // Said already, if it is none because it is a list.
+        // Unless another finding has reported this value already.
         if (!m_misread.contains(name.key)) {
             add(lineOf(name.key), Severity::Error, callRule,
                 value.isEmpty()
@@ -371,7 +371,7 @@ void QuickActionCheck::checkCall()
     }
 }
 
-// A file that the reader has refused.
+// Reports why the reader refused a file.
 void reportRefused(const QString &path, Findings *findings)
 {
     QByteArray content;

@@ -14,7 +14,7 @@ const QLatin1String runtimeDaemon("/usr/sbin/apkd");
 /*!
     \qmltype AndroidSupport
     \inqmlmodule com.marlo.settings.system
-    \brief Tells whether the support for Android applications is installed.
+    \brief Says whether the support for Android applications is installed.
 
     \qml
     Label {

@@ -16,7 +16,7 @@ const QLatin1String addressFile("/var/lib/bluetooth/board-address");
 /*!
     \qmltype BluetoothInfo
     \inqmlmodule com.marlo.settings.system
-    \brief Tells the address of the device's Bluetooth adapter.
+    \brief Provides the address of the device's Bluetooth adapter.
 
     \qml
     Label {
@@ -42,9 +42,10 @@ BluetoothInfo::BluetoothInfo(QObject *parent) : QObject(parent)
     \qmlproperty string BluetoothInfo::adapterAddress
     \readonly
 
-    The address of the Bluetooth adapter in lower case, such as \c{00:1a:7d:da:71:13}: the first
-    line of \c /var/lib/bluetooth/board-address, whatever it holds, read when the object is created.
-    Empty, with a warning, if the file cannot be read or is larger than 16 MiB.
+    The address of the Bluetooth adapter in lower case, such as \c{00:1a:7d:da:71:13}. It is the
+    first line of \c /var/lib/bluetooth/board-address, which is not validated. The file is read
+    once, when the object is created. Empty, with a warning, if the file cannot be read or is larger
+    than 16 MiB.
 */
 
 void BluetoothInfo::initAdapterAddress()

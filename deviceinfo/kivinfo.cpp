@@ -48,12 +48,12 @@ QVariantMap changedProperties(const QDBusMessage &message)
 /*!
     \qmltype KivInfo
     \inqmlmodule com.marlo.settings.system
-    \brief Tells which smart back cover is attached to the device.
+    \brief Identifies the smart back cover that is attached to the device.
 
     Asks the cover daemon when it is created, and follows its \c PropertiesChanged signal from then
     on, also when the daemon starts only later. (A signal that a daemon sends in the very moment of
-    its start may be missed.) Without the daemon, or if it answers with an error, the properties keep
-    their defaults; nothing is logged.
+    its start may be missed.) Without the daemon, or if it answers with an error, the properties
+    keep their defaults; nothing is logged.
 
     The daemon is the service \c com.marlo.kivd on the system bus. It is asked with the method
     \c Get of \c org.freedesktop.DBus.Properties at the path \c /com/marlo/kivd, for properties of
@@ -104,8 +104,8 @@ KivInfo::KivInfo(QObject *parent) : QObject(parent)
     \qmlproperty bool KivInfo::kivReady
     \readonly
 
-    Whether the daemon is ready: its property \c Ready is 1. False until it has answered, and without
-    a daemon.
+    Whether the daemon is ready: its property \c Ready is 1. False until it has answered, and
+    without a daemon.
 */
 
 /*!

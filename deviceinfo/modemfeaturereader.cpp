@@ -17,7 +17,7 @@ const QLatin1String variantKey("variant");
 /*!
     \qmltype ModemFeatures
     \inqmlmodule com.marlo.settings.system
-    \brief Tells which variant of the modem software the device carries.
+    \brief Provides the variant of the modem software on the device.
 
     \qml
     Label {
@@ -43,10 +43,10 @@ ModemFeatureReader::ModemFeatureReader(QObject *parent) : QObject(parent)
     \qmlproperty string ModemFeatures::variant
     \readonly
 
-    The key \c variant of \c /usr/share/modem-software/features.ini, which stands before the first
-    section or in the section \c General. Read from the file on every read. Empty if there is no
-    such file or key, if the value is a list, which an unquoted comma makes it, and if the file is
-    larger than 1 MiB or has values that QSettings would unpack.
+    The key \c variant of \c /usr/share/modem-software/features.ini, before the first section or in
+    the section \c General. Every read of the property reads the file again. The value is empty if
+    there is no such file or key, if an unquoted comma makes the value a list, or if the file is
+    larger than 1 MiB or has a value that QSettings would unpack.
 */
 QString ModemFeatureReader::variant() const
 {

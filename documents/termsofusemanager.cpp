@@ -20,11 +20,11 @@ const QLatin1String suffix(".txt");
 const QLatin1String english("en_GB");
 constexpr int languageLength = 2;
 
-// Empty if there is neither a file for the locale nor one in English.
+// The path of the best file; empty if there is neither one for the locale nor one in English.
 QString findTerms(const QString &base, const QString &localeName)
 {
-    // The language alone is preferred to language and country on purpose, and the latter is looked
-    // for only behind an encoding: terms are installed by language, and vendors rely on the order.
+    // Intended: the language alone comes before language and country, and the latter is only tried
+    // if the name has an encoding. Terms are installed by language, and vendors rely on this order.
     QStringList candidates = {localeName, localeName.left(languageLength)};
     const int encoding = localeName.indexOf(QLatin1Char('.'));
     if (encoding > 0) {
@@ -45,7 +45,7 @@ QString findTerms(const QString &base, const QString &localeName)
     return findTerms(base, english);
 }
 
-// The text ends at the first NUL, as a C string does.
+// The text ends at its first NUL.
 QString toText(const QByteArray &data)
 {
     return QString::fromUtf8(data.constData()).trimmed();
@@ -79,13 +79,13 @@ QStringList readTerms(const QString &base, const QString &localeName)
     \inqmlmodule com.marlo.settings.system
     \brief Finds and reads the terms of use in the user's language.
 
-    Terms are UTF-8 text files named by locale. For the locale name \c fi_FI.UTF-8 the first of
-    \c fi_FI.UTF-8.txt, \c fi.txt and \c fi_FI.txt that exists is read; for \c fi_FI, without an
-    encoding, \c fi_FI.txt or \c{fi.txt}. If there is none, with a warning, British English,
+    Terms are UTF-8 text files named by locale. For the locale name \c fi_FI.UTF-8 the type reads
+    the first of \c fi_FI.UTF-8.txt, \c fi.txt and \c fi_FI.txt that exists; for \c fi_FI, which has
+    no encoding, \c fi_FI.txt or \c{fi.txt}. If none exists, it warns and reads British English,
     \c{en_GB.txt} or \c{en.txt}.
 
-    The first line of a file is the title and everything after it the body, both without white space
-    around them. A file of more than 16 MiB counts as unreadable.
+    The first line of a file is the title, and everything after it is the body. White space around
+    both is removed. A file of more than 16 MiB counts as unreadable.
 
     \qml
     Label {
@@ -120,7 +120,7 @@ TermsOfUseManager::TermsOfUseManager(QObject *parent) : QObject(parent)
     \qmlproperty bool TermsOfUseManager::hasVendorTermsOfUse
     \readonly
 
-    Whether \l vendorPath is set and exists. Looked up on every read.
+    Whether \l vendorPath is set and exists. Every read checks it again.
 */
 bool TermsOfUseManager::hasVendorTermsOfUse() const
 {
@@ -130,8 +130,8 @@ bool TermsOfUseManager::hasVendorTermsOfUse() const
 /*!
     \qmlproperty string TermsOfUseManager::vendorPath
 
-    The directory of the vendor's terms: those in full are in its directory \c{full}, summaries in
-    \c{summary}. Empty by default.
+    The directory of the vendor's terms. It contains a directory \c full with the full terms and a
+    directory \c summary with their summaries. Empty by default.
 */
 void TermsOfUseManager::setVendorPath(const QString &path)
 {
@@ -144,9 +144,9 @@ void TermsOfUseManager::setVendorPath(const QString &path)
 /*!
     \qmlmethod list<string> TermsOfUseManager::platformTermsOfUse(string localeName)
 
-    Returns title and body of the platform's terms for \a localeName, from
-    \c{/usr/share/marlo-settings/platform-eula/tarnwick_termsofuse-<locale>.txt}. An empty list,
-    with warnings, if there are none or they cannot be read.
+    Returns the title and the body of the platform's terms for \a localeName, from
+    \c{/usr/share/marlo-settings/platform-eula/tarnwick_termsofuse-<locale>.txt}. The list is empty,
+    with warnings in the log, if there are no terms or they cannot be read.
 */
 QStringList TermsOfUseManager::platformTermsOfUse(const QString &localeName) const
 {
@@ -156,8 +156,8 @@ QStringList TermsOfUseManager::platformTermsOfUse(const QString &localeName) con
 /*!
     \qmlmethod list<string> TermsOfUseManager::vendorTermsOfUse(string localeName)
 
-    Returns title and body of the vendor's terms in full for \a localeName, from the directory
-    \c full below \l vendorPath, as platformTermsOfUse() does.
+    Returns the title and the body of the vendor's full terms for \a localeName, from the directory
+    \c full below \l vendorPath, in the same way as platformTermsOfUse().
 */
 QStringList TermsOfUseManager::vendorTermsOfUse(const QString &localeName) const
 {
@@ -167,8 +167,8 @@ QStringList TermsOfUseManager::vendorTermsOfUse(const QString &localeName) const
 /*!
     \qmlmethod list<string> TermsOfUseManager::vendorTermsSummary(string localeName)
 
-    Returns title and body of the summary of the vendor's terms for \a localeName, from the
-    directory \c summary below \l vendorPath, as platformTermsOfUse() does.
+    Returns the title and the body of the summary of the vendor's terms for \a localeName, from the
+    directory \c summary below \l vendorPath, in the same way as platformTermsOfUse().
 */
 QStringList TermsOfUseManager::vendorTermsSummary(const QString &localeName) const
 {

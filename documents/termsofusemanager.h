@@ -8,8 +8,8 @@
 #include <QStringList>
 
 /*
-    The terms of use in the user's language: the platform's own, and those of the vendor of the
-    device, as title and body.
+    The terms of use in the user's language: those of the platform and those of the device's vendor,
+    each as a title and a body.
 */
 class TermsOfUseManager : public QObject
 {
@@ -24,7 +24,7 @@ public:
     QString vendorPath() const { return m_vendorPath; }
     void setVendorPath(const QString &path);
 
-    // Title and body, or nothing if there are no terms to read.
+    // Title and body; empty if there are no terms that can be read.
     Q_INVOKABLE QStringList platformTermsOfUse(const QString &localeName) const;
     Q_INVOKABLE QStringList vendorTermsOfUse(const QString &localeName) const;
     Q_INVOKABLE QStringList vendorTermsSummary(const QString &localeName) const;

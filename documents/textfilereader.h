@@ -9,7 +9,7 @@
 class QUrl;
 
 /*
-    Reads plain text files for QML: a file, or all the files of a folder.
+    Reads plain text files for QML: one file, or all files of a directory.
 */
 class TextFileReader : public QObject
 {
@@ -18,9 +18,9 @@ class TextFileReader : public QObject
 public:
     explicit TextFileReader(QObject *parent = nullptr);
 
-    // Null if the file cannot be opened; an empty file reads as an empty text.
+    // Null if the file cannot be read; the text of an empty file is empty, not null.
     Q_INVOKABLE QString readContent(const QString &filePath) const;
-    // Null if there is no folder or no text in it.
+    // Null if there is no such directory, or no text in it.
     Q_INVOKABLE QString collate(const QUrl &directory, const QString &separator,
                                 const QString &prefix) const;
 };

@@ -24,16 +24,16 @@ const QLatin1String pathKey("remote-path");
 const QLatin1String interfaceKey("remote-interface");
 const QLatin1String methodKey("remote-method");
 const QLatin1String argumentsKey("remote-arguments");
-// As an array of QSettings is kept, which counts from 1.
+// The keys of a QSettings array, whose elements are numbered from 1.
 const QLatin1String argumentsSizeKey("remote-arguments/size");
 const QLatin1String argumentKey("remote-arguments/%1/argument");
 
-// The longest signature that D-Bus knows.
+// The longest signature that D-Bus allows.
 constexpr int maximumSignature = 255;
-// More arguments than a call can have: a file may name any number of them.
+// More arguments than a call can have. A file may claim to have any number of them.
 constexpr int enoughArguments = 256;
 
-// Libraries keep these to themselves: the bus hangs up on whoever sends a message with one of them.
+// Reserved for D-Bus libraries: the bus disconnects a client that sends a message with one of them.
 const QLatin1String reservedPath("/org/freedesktop/DBus/Local");
 const QLatin1String reservedInterface("org.freedesktop.DBus.Local");
 
@@ -110,8 +110,8 @@ QVariantList QuickAction::arguments() const
 
 QDBusError QuickAction::whyUnsendable() const
 {
-    // QtDBus would not notice: it sends a call without a service to the bus itself, and on a service
-    // that is a lone word, or a signature that is too long, the process ends.
+    // QtDBus would not notice: it sends a call without a service to the bus itself, and on a
+    // service that is a lone word, or a signature that is too long, the process ends.
     if (service().isEmpty()) {
         return {QDBusError::InvalidService, QStringLiteral("The call names no service")};
     }
@@ -159,8 +159,8 @@ bool QuickAction::trigger(QObject *receiver, const char *returnMethod,
         error = bus.lastError();
     }
 
-    // Error name and message fill one place and the last one stays open: log readers know the line
-    // in just this form.
+    // Intended: the error's name and message fill one placeholder, and the last one stays unfilled.
+    // Programs that read the log expect exactly this line.
     const QString text = QStringLiteral("Failed to initialize dbus call to: service=%1 path=%2 "
                                         "interface=%3 method=%4. Error was: %5 %6")
                              .arg(service(), objectPath(), interface(), method(),
@@ -197,7 +197,7 @@ QVariantMap QuickAction::readActionConfig(const QString &path) const
             hasArguments = true;
         }
     }
-    // An array without elements is an entry too; no other group is of interest.
+    // An array without elements is an entry, too. All other groups are ignored.
     if (hasArguments) {
         QVariantList arguments;
         const int size = qMin(settings.value(argumentsSizeKey).toInt(), enoughArguments);

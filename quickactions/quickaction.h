@@ -23,8 +23,9 @@ public:
     // Whether the user has enabled the action.
     bool enabled() const { return m_enabled; }
 
-    // The keys of the file, with their values as QSettings gives them: a value with a comma is a
-    // list, and a list of several texts reads as no text. Whatever the file lacks is empty.
+    // The keys of the file with their values as QSettings returns them. A value with a comma is a
+    // list of strings; a list of several strings converts to an empty string. A missing key is
+    // empty.
     QVariantMap config() const { return m_config; }
     QString title() const;
     QVariant icon() const;
@@ -39,13 +40,13 @@ public:
     QString interface() const;
     QString method() const;
     QVariantList arguments() const;
-    // What keeps the call from being sent at all; no error if nothing does. A name or path that is
-    // wrong in itself passes: it is answered with an error, as by the bus.
+    // Why the call cannot be sent; an invalid error if it can. Names and paths that D-Bus does not
+    // allow can be sent: QtDBus answers them with an error.
     QDBusError whyUnsendable() const;
 
     // Sends the call on the session bus and returns at once. The receiver's slots get the reply, or
-    // the error together with the message that was sent; either may be null. A call that cannot be
-    // sent is reported on the receiver's QML warning channel; the result tells.
+    // the error together with the message that was sent; either may be null. Returns false, with a
+    // QML warning of the receiver, if the call cannot be sent.
     bool trigger(QObject *receiver, const char *returnMethod, const char *errorMethod) const;
 
     bool operator==(const QuickAction &other) const;

@@ -27,8 +27,8 @@ struct EventsWidget {
     // Whether there is now a file at availablePath; always if that is empty.
     bool isAvailable() const;
 
-    // Leaves out file and translationCatalog on purpose: a widget that moves to another file, or
-    // whose file changes its catalog, is the same to whoever shows it and not reported as changed.
+    // Ignores file and translationCatalog on purpose: a view shows the same widget if it moves to
+    // another file or its file names another catalog, so that is not reported as a change.
     bool operator!=(const EventsWidget &other) const;
 };
 

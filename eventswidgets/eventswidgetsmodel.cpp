@@ -127,7 +127,8 @@ EventsWidgetsModel::EventsWidgetsModel(QObject *parent)
 
 EventsWidgetsModel::~EventsWidgetsModel()
 {
-    // Announces language changes, which may lead back to data(): while there is a model to ask.
+    // Removing the catalogs sends language change events, whose handlers may call data(). The model
+    // still exists here.
     m_catalogs.clear();
 }
 
@@ -297,7 +298,7 @@ void EventsWidgetsModel::updateAvailable()
 
 QStringList EventsWidgetsModel::enabledList() const
 {
-    // A choice that is made before anything was read must not replace the user's others.
+    // A choice before componentComplete() must not discard the user's other choices.
     return m_complete ? m_enabledList : m_enabledItem.value().toStringList();
 }
 
@@ -309,7 +310,7 @@ std::vector<EventsWidget> EventsWidgetsModel::readWidgets()
     QDirIterator entries(definitionDirectory, {definitionFilter}, QDir::Files);
     while (entries.hasNext()) {
         const QString path = entries.next();
-        // The iterator lets links to pipes and devices through.
+        // The filter of the iterator accepts links to pipes and devices.
         if (!entries.fileInfo().isFile()) {
             continue;
         }
@@ -335,7 +336,7 @@ std::vector<EventsWidget> EventsWidgetsModel::readWidgets()
 
 void EventsWidgetsModel::mergeWidgets(const std::vector<Widget> &widgets)
 {
-    // Where to look for the row of a path, from there downwards: insertions only push rows down.
+    // The row of a path is this one or a later one, because insertions only push rows down.
     QHash<QString, int> firstRows;
     firstRows.reserve(m_rows.size() + int(widgets.size()));
     std::vector<qint64> orders;
@@ -371,7 +372,8 @@ void EventsWidgetsModel::insertWidget(int row, const Widget &widget)
 
 void EventsWidgetsModel::updateWidget(int row, const Widget &widget)
 {
-    // Stays where it is, on purpose, even with another order: rows do not jump under the user.
+    // The row keeps its place, on purpose, even if its order changes: rows must not jump while the
+    // user looks at them.
     m_rows[row] = widget;
     Q_EMIT dataChanged(index(row), index(row));
 }
@@ -388,8 +390,8 @@ void EventsWidgetsModel::removeStaleRows(const QSet<QString> &paths)
             continue;
         }
         beginRemoveRows({}, row, row);
-        // Finds no such user, on purpose: those of the catalogs are bare file names, and this is a
-        // path. Catalogs are only ever added; their texts stay at hand until the model goes.
+        // Deliberately without effect: the users of the catalogs are file names, and this is a path.
+        // Catalogs are only added; their texts remain until the model is destroyed.
         m_catalogs.removeDefinition(m_rows.at(row).file, m_rows.at(row).translationCatalog);
         m_rows.removeAt(row);
         endRemoveRows();

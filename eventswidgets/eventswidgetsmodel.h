@@ -76,11 +76,10 @@ private:
     DirectoryWatcher m_watcher;
     WriteWatcher m_writeWatcher;
     MGConfItem m_enabledItem;
-    // What the key holds. While it holds nothing: the paths of all widgets, on purpose. The first
-    // choice of the user stores them, so that each widget but the one that was switched is enabled
-    // from then on, whatever its default was.
+    // The value of the key. Without a value, the paths of all widgets, on purpose: the user's first
+    // choice stores them, so that every other widget is enabled from then on, whatever its default.
     QStringList m_enabledList;
-    // While the key holds nothing at all; an empty list is a choice.
+    // True while the key has no value; an empty list is a choice.
     bool m_defaults = false;
     bool m_complete = false;
 };

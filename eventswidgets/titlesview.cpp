@@ -11,7 +11,7 @@
 
 namespace {
 
-// A role of a model, and the properties to follow from its values.
+// A role of a model, and the properties that lead on from its values.
 class RolePath
 {
 public:
@@ -27,16 +27,15 @@ public:
         }
     }
 
-    // An unknown role is the same as the one of number 0, on purpose: there everything matches, and
-    // the model's display role is read.
+    // An unknown role counts as role 0, on purpose: as matchRole it takes every row, as role it reads
+    // the model's display role.
     bool isKnown() const { return m_role != noRole; }
 
     QVariant value(const QModelIndex &index) const
     {
         QVariant value = index.data(m_role);
         for (const QByteArray &property : m_properties) {
-            // A step from something that is no object, or a null one, leads nowhere and is left
-            // out.
+            // A value that is not an object has no properties: the step is skipped.
             if (const auto *object = value.value<QObject *>()) {
                 value = object->property(property.constData());
             }
@@ -51,7 +50,7 @@ private:
     QVector<QByteArray> m_properties;
 };
 
-// Calls the function with every object in a value, and in the lists and maps that it is made of.
+// Calls the function for every object in a value, also within its lists and maps.
 void forEachObject(QVariant *value, const std::function<void(QObject *, QVariant *)> &function)
 {
     if (value->userType() == QMetaType::QVariantList) {
@@ -152,7 +151,7 @@ void TitlesView::setModel(QObject *model)
     }
     auto *listModel = qobject_cast<QAbstractListModel *>(model);
     if (listModel == nullptr) {
-        // Null too, on purpose: a page that is being taken down keeps the sentence that it shows.
+        // Null too, on purpose: a page keeps its sentence while it is being destroyed.
         qWarning() << "Unsupported model type" << model;
         return;
     }
@@ -206,7 +205,7 @@ QVariant TitlesView::match() const
 
 void TitlesView::setMatch(const QVariant &match)
 {
-    // An array of QML's arrives in a wrapping that equals nothing.
+    // A QML array arrives as a QJSValue, which never compares equal.
     QVariant plain =
         match.userType() == qMetaTypeId<QJSValue>() ? match.value<QJSValue>().toVariant() : match;
     if (m_match == plain) {
@@ -286,7 +285,7 @@ void TitlesView::update()
 {
     const uint updates = ++m_updates;
     const QStringList values = collect();
-    // A property that was read may have led back here: what was read since is newer.
+    // Reading a property may have called update() again; then the values from there are newer.
     if (updates == m_updates && m_values != values) {
         m_values = values;
         Q_EMIT valueChanged();
@@ -335,7 +334,7 @@ QStringList TitlesView::collect() const
 
     QStringList values;
     const int count = m_model->rowCount();
-    // Whose property is read may end the model.
+    // Reading a property may destroy the model.
     for (int row = 0; row < count && m_model != nullptr; ++row) {
         const QModelIndex index = m_model->index(row, 0);
         if (matchRole.isKnown() && (!matches(matchRole.value(index)) || m_model == nullptr)) {
@@ -355,8 +354,8 @@ bool TitlesView::matches(const QVariant &value) const
     if (m_match.userType() == QMetaType::QVariantList && m_match.toList().contains(value)) {
         return true;
     }
-    // In this order: variants convert the right one to the type of the left, and not all
-    // conversions have a way back.
+    // The order matters: the right variant is converted to the type of the left one, and some
+    // conversions work in one direction only.
     return m_match == value;
 }
 

@@ -190,8 +190,8 @@ QuickActionsModel::QuickActionsModel(QObject *parent)
 
 QuickActionsModel::~QuickActionsModel()
 {
-    // Announces language changes, which may lead back here: while there is a model to ask, but one
-    // that loads nothing any more.
+    // Removing the catalogs sends language change events, whose handlers may call the model. It
+    // still exists here, and loads nothing any more.
     m_complete = false;
     m_catalogs.clear();
 }
@@ -261,7 +261,7 @@ int QuickActionsModel::count() const
 
 int QuickActionsModel::rowCount(const QModelIndex &parent) const
 {
-    // The same for every parent, on purpose: a list has but one, and pages need not name it.
+    // Every parent has the same rows, on purpose, so that pages need not pass one.
     Q_UNUSED(parent)
     return m_rows.size();
 }
@@ -432,8 +432,8 @@ void QuickActionsModel::loadActions()
             }
         }
 
-        // The enabled ones in the order of the list, each behind those before it that have a row. A
-        // repeated entry counts once.
+        // Enabled actions keep the order of the list: each goes behind the entries before it that
+        // have a row. A repeated entry counts once.
         QSet<QString> placed;
         for (const QString &path : qAsConst(m_enabledList)) {
             if (listed.contains(path) && !placed.contains(path)) {
@@ -475,8 +475,8 @@ void QuickActionsModel::directoryChanged()
 {
     if (!m_reloadTimer.isActive()) {
         m_reloadTimer.start();
-        // Not to be tidied into one connection: on purpose none is ever undone, so that a timeout
-        // loads once more for every period of changes that went before.
+        // Deliberately a new connection each time, and none is ever removed: each timeout loads once
+        // more for every earlier period of changes.
         connect(&m_reloadTimer, &QTimer::timeout, this, &QuickActionsModel::loadActions);
     }
 }
@@ -495,7 +495,7 @@ void QuickActionsModel::triggerActionError(const QDBusError &error, const QDBusM
         return;
     }
 
-    // Several actions may make the same call, and not every one need name the package.
+    // Several actions can send the same call, and some of them may not name the package.
     for (const Action &action : qAsConst(m_rows)) {
         const bool sent = action.service() == msg.service() && action.objectPath() == msg.path()
             && action.interface() == msg.interface() && action.method() == msg.member();
@@ -512,7 +512,7 @@ void QuickActionsModel::showStorePackage(const QString &packageName)
         QDBusMessage::createMethodCall(storeService, storePath, storeInterface, storeMethod);
     call.setArguments({packageName});
     const QDBusConnection bus = QDBusConnection::sessionBus();
-    // Fails only if it cannot be sent; nobody waits for an answer.
+    // Only a call that cannot be sent fails here: the model does not wait for a reply.
     if (bus.call(call, QDBus::NoBlock).type() == QDBusMessage::ErrorMessage) {
         qmlInfo(this) << "call to com.marlo.marlostore failed: " << bus.lastError();
     }
@@ -531,7 +531,7 @@ void QuickActionsModel::applyShowPotential()
     }
 }
 
-// In the order of their names.
+// Sorted by name.
 QStringList QuickActionsModel::selectedPaths(const QSet<QString> &enabled) const
 {
     const QSet<QString> blocked(m_blockedList.cbegin(), m_blockedList.cend());
@@ -574,7 +574,7 @@ void QuickActionsModel::updateAction(int row, const Action &action)
 {
     const QString oldCatalog = m_rows.at(row).translationCatalog();
     m_rows[row] = action;
-    // The old catalog is not released, on purpose: its texts stay available until the model goes.
+    // The old catalog is not released, on purpose: its texts remain until the model is destroyed.
     if (action.translationCatalog() != oldCatalog) {
         m_catalogs.addDefinition(action.path(), action.translationCatalog());
     }
@@ -589,7 +589,7 @@ void QuickActionsModel::moveAction(int index, int newIndex)
     }
     {
         const Change change(&m_requests);
-        // An entry of the list need not have a row.
+        // An entry of the list may have no row.
         const bool movesRow = index != newIndex && hasRow(index) && hasRow(newIndex);
         if (movesRow) {
             beginMoveAction(index, newIndex);
@@ -605,8 +605,8 @@ void QuickActionsModel::moveAction(int index, int newIndex)
         if (m_enabledItem.value().toStringList() == m_enabledList) {
             return;
         }
-        // The key is locked, or another list was stored in answer. That list counts, and the rows
-        // have to agree with it.
+        // The key is locked, or a handler stored another list. The stored list counts, and the rows
+        // must agree with it.
         if (movesRow) {
             beginMoveAction(newIndex, index);
             endMoveRows();
@@ -615,7 +615,7 @@ void QuickActionsModel::moveAction(int index, int newIndex)
     updateEnabledActions();
 }
 
-// The caller ends the move.
+// The caller calls endMoveRows().
 void QuickActionsModel::beginMoveAction(int index, int newIndex)
 {
     beginMoveRows({}, index, index, {}, newIndex > index ? newIndex + 1 : newIndex);

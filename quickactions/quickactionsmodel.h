@@ -20,11 +20,11 @@ class QDBusMessage;
 class QuickAction;
 
 /*
-    The quick actions that packages offer and the user has enabled, for the events screen; with
-    showPotential every action that is offered, for the page on which the user chooses.
+    Lists the quick actions that packages offer and the user has enabled, for the events screen. With
+    showPotential it lists every offered action, for the page on which the user chooses.
 
-    Reads the definition files in /usr/share/glimmera/quickactions and follows that directory and
-    the user's lists in dconf.
+    The model reads the definition files in /usr/share/glimmera/quickactions. It follows that
+    directory and the user's lists in dconf.
 */
 class QuickActionsModel : public QAbstractListModel, public QQmlParserStatus
 {
@@ -37,8 +37,8 @@ class QuickActionsModel : public QAbstractListModel, public QQmlParserStatus
 public:
     using Action = QuickAction;
 
-    // The numbers coincide with those of Qt's display, decoration, edit and tool tip roles: views
-    // that know nothing of this model show the title and the icon.
+    // The numbers are also those of Qt's display, decoration, edit and tool tip roles, so that
+    // generic views show the title and the icon.
     enum Role { TitleRole, IconRole, PathRole, EnabledRole };
 
     explicit QuickActionsModel(QObject *parent = nullptr);
@@ -98,7 +98,7 @@ private:
     QStringList m_blockedList;
     bool m_showPotential = false;
     bool m_complete = false;
-    // While move() writes the enabled list: the change that dconf reports is the model's own.
+    // True while move() writes the enabled list: the change that dconf reports is the model's own.
     bool m_moving = false;
 };
 

@@ -99,7 +99,11 @@ void beforeRemovalOf(const QByteArray &name, std::function<void()> function)
     SystemCalls::hooks().unlinkat = [=](int directory, const char *entry, int flags) {
         if (!*called && name == entry) {
             *called = true;
+            // What the test itself does is not counted.
+            SystemCalls hooks;
+            std::swap(hooks, SystemCalls::hooks());
             function();
+            std::swap(hooks, SystemCalls::hooks());
         }
         return SystemCalls::real().unlinkat(directory, entry, flags);
     };
@@ -124,6 +128,14 @@ template<typename Change> void changeListings(Change change)
     };
 }
 
+// A file and a full directory on one side of a directory.
+void makeNeighbours(const QByteArray &folder, const char *side)
+{
+    makeFile(folder + side + "File");
+    makeFolder(folder + side + "Folder");
+    makeFile(folder + side + "Folder/file");
+}
+
 // A chain of folders, each with files and full folders on both sides of the next one in directory
 // order, whichever way that runs: the walk has something left to do in all of them on its way back.
 void makeDeepTree(const QByteArray &top, int depth)
@@ -131,9 +143,7 @@ void makeDeepTree(const QByteArray &top, int depth)
     for (int level = 0; level <= depth; ++level) {
         const QByteArray folder = chainPath(top, level);
         for (const char *const side : {"/a", "/z"}) {
-            makeFile(folder + side + "File");
-            makeFolder(folder + side + "Folder");
-            makeFile(folder + side + "Folder/file");
+            makeNeighbours(folder, side);
             if (level < depth && !exists(chainPath(top, level + 1))) {
                 makeFolder(chainPath(top, level + 1));
             }
@@ -141,15 +151,12 @@ void makeDeepTree(const QByteArray &top, int depth)
     }
 }
 
-// What a walk would remove that took this folder for one of such a tree.
-void makeBait(const QByteArray &folder)
+// Such a tree, and what happens before its deepest file is removed.
+void makeDeepTree(const QByteArray &top, int depth, const std::function<void()> &happening)
 {
-    makeFolder(folder + "/d");
-    for (const char *const side : {"/a", "/z"}) {
-        makeFile(folder + side + "File");
-        makeFolder(folder + side + "Folder");
-        makeFile(folder + side + "Folder/file");
-    }
+    makeDeepTree(top, depth);
+    makeFile(chainPath(top, depth) + "/trigger");
+    beforeRemovalOf("trigger", happening);
 }
 
 // Enough for a walk to be met at every turn: a walk by paths lost files in most of 120.
@@ -167,6 +174,16 @@ template<typename Work> pid_t startRepeating(Work work)
         }
     }
     return pid;
+}
+
+void makeVictims(const QByteArray &top)
+{
+    for (int i = 0; i < 10; ++i) {
+        const QByteArray folder = top + "/folder" + QByteArray::number(i);
+        makeFolder(folder);
+        makeFolder(folder + "/victim");
+        makeFiles(folder + "/victim", 20);
+    }
 }
 
 pid_t startSwapping(const QByteArray &first, const QByteArray &second)
@@ -244,6 +261,8 @@ private Q_SLOTS:
 
 private:
     void checkOutside();
+    // What a walk would remove that took the outside for a directory of a deep tree.
+    void makeBait();
 
     std::unique_ptr<MessageLog> m_log;
     std::unique_ptr<ScratchFileSystem> m_files;
@@ -283,6 +302,14 @@ void tst_DirectoryEmptier::checkOutside()
     }
     QCOMPARE(read(m_outside + "/file"), QByteArray("precious"));
     QCOMPARE(read(m_outside + "/folder/file"), QByteArray("precious"));
+}
+
+void tst_DirectoryEmptier::makeBait()
+{
+    makeFolder(m_outside + "/d");
+    makeNeighbours(m_outside, "/a");
+    makeNeighbours(m_outside, "/z");
+    m_outsideBefore = listAll(m_outside);
 }
 
 void tst_DirectoryEmptier::emptyFolder()
@@ -552,12 +579,7 @@ void tst_DirectoryEmptier::folderThatDoesNotOpen()
     std::sort(attempted.begin(), attempted.end());
     QCOMPARE(attempted, (QByteArrayList{"empty", "full"}));
 
-    SystemCalls::hooks() = {};
     unlink((m_top + "/full/file").constData());
-    SystemCalls::hooks().openat = [&](int, const char *, int) {
-        errno = EACCES;
-        return -1;
-    };
     QVERIFY(empty(m_top));
     QCOMPARE(list(m_top), QByteArrayList());
 }
@@ -688,15 +710,10 @@ void tst_DirectoryEmptier::fileBecomesFolder()
 {
     makeFile(m_top + "/file");
     makeFile(m_top + "/other");
-    auto swapped = false;
-    SystemCalls::hooks().unlinkat = [&](int directory, const char *name, int flags) {
-        if (!swapped && qstrcmp(name, "file") == 0) {
-            swapped = true;
-            unlink((m_top + "/file").constData());
-            makeFolder(m_top + "/file");
-        }
-        return SystemCalls::real().unlinkat(directory, name, flags);
-    };
+    beforeRemovalOf("file", [&] {
+        unlink((m_top + "/file").constData());
+        makeFolder(m_top + "/file");
+    });
     QVERIFY(!empty(m_top));
     QCOMPARE(list(m_top), QByteArrayList{"file"});
 }
@@ -716,12 +733,8 @@ void tst_DirectoryEmptier::folderMovedOutFarDown()
 {
     // Nothing above the folder is open any more, and its ".." leads outside: the way back is found
     // from the top.
-    constexpr int depth = 150;
-    makeDeepTree(m_top, depth);
-    makeFile(chainPath(m_top, depth) + "/trigger");
-    beforeRemovalOf("trigger", [&] { rename(chainPath(m_top, 20), m_outside + "/moved"); });
-    makeBait(m_outside);
-    m_outsideBefore = listAll(m_outside);
+    makeDeepTree(m_top, 150, [&] { rename(chainPath(m_top, 20), m_outside + "/moved"); });
+    makeBait();
     QVERIFY(!empty(m_top));
     const QByteArrayList left = listAll(m_top);
     QCOMPARE(left.size(), 19);
@@ -732,15 +745,11 @@ void tst_DirectoryEmptier::folderMovedOutFarDown()
 void tst_DirectoryEmptier::wayMovedOutFarDown()
 {
     // Two folders move: the way back ends above the higher one.
-    constexpr int depth = 150;
-    makeDeepTree(m_top, depth);
-    makeFile(chainPath(m_top, depth) + "/trigger");
-    beforeRemovalOf("trigger", [&] {
+    makeDeepTree(m_top, 150, [&] {
         rename(chainPath(m_top, 40), m_outside + "/moved");
         rename(chainPath(m_top, 10), m_outside + "/movedToo");
     });
-    makeBait(m_outside);
-    m_outsideBefore = listAll(m_outside);
+    makeBait();
     QVERIFY(!empty(m_top));
     const QByteArrayList left = listAll(m_top);
     QCOMPARE(left.size(), 9);
@@ -768,8 +777,7 @@ void tst_DirectoryEmptier::wayMovedOutAndReplaced()
     if (full) {
         makeDeepTree(m_outside + "/other", 30);
     }
-    makeBait(m_outside);
-    m_outsideBefore = listAll(m_outside);
+    makeBait();
     // Except the folder that is moved into the card.
     m_outsideBefore.erase(
         std::remove_if(m_outsideBefore.begin(), m_outsideBefore.end(),
@@ -789,9 +797,7 @@ void tst_DirectoryEmptier::wayMovedOutAndReplaced()
 void tst_DirectoryEmptier::descriptorsAfterDetour()
 {
     // As many are kept open after a way back from the top as before, in either direction.
-    makeDeepTree(m_top, 150);
-    makeFile(chainPath(m_top, 150) + "/trigger");
-    beforeRemovalOf("trigger", [&] {
+    makeDeepTree(m_top, 150, [&] {
         rename(chainPath(m_top, 90), m_outside + "/moved");
         // In the place of what is still to be removed there, for the walk to go down into.
         for (const char *const side : {"/aFolder", "/zFolder"}) {
@@ -823,12 +829,7 @@ void tst_DirectoryEmptier::entryVanishes()
 void tst_DirectoryEmptier::raceOfFoldersAndLinks()
 {
     for (int run = 0; run < races; ++run) {
-        for (int i = 0; i < 10; ++i) {
-            const QByteArray folder = m_top + "/folder" + QByteArray::number(i);
-            makeFolder(folder);
-            makeFolder(folder + "/victim");
-            makeFiles(folder + "/victim", 20);
-        }
+        makeVictims(m_top);
         makeLink(m_outside + "/link", m_outside);
         const pid_t swapper = startSwapping(m_top + "/folder5/victim", m_outside + "/link");
         const pid_t swapper2 = startSwapping(m_top + "/folder2", m_top + "/folder7/victim");
@@ -882,12 +883,7 @@ void tst_DirectoryEmptier::raceOfMounts()
     const QByteArrayList before = listAll(other);
     const QByteArrayList mountPoints{m_top + "/folder2", m_top + "/folder7/victim"};
     for (int run = 0; run < races; ++run) {
-        for (int i = 0; i < 10; ++i) {
-            const QByteArray folder = m_top + "/folder" + QByteArray::number(i);
-            makeFolder(folder);
-            makeFolder(folder + "/victim");
-            makeFiles(folder + "/victim", 20);
-        }
+        makeVictims(m_top);
         const pid_t mounter = startMounting(other, mountPoints[0]);
         const pid_t mounter2 = startMounting(other, mountPoints[1]);
         QVERIFY(mounter > 0 && mounter2 > 0);

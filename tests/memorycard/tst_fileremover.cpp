@@ -130,6 +130,23 @@ private:
     __user_cap_data_struct m_old[1] = {};
 };
 
+// A mount point: while it is one, neither root nor anybody else can remove the entry.
+class MountPoint
+{
+public:
+    explicit MountPoint(const QByteArray &path) : m_path(path)
+    {
+        if (mount(path.constData(), path.constData(), nullptr, MS_BIND, nullptr) != 0) {
+            qFatal("cannot mount on %s", path.constData());
+        }
+    }
+    ~MountPoint() { umount(m_path.constData()); }
+    Q_DISABLE_COPY_MOVE(MountPoint)
+
+private:
+    const QByteArray m_path;
+};
+
 class Receiver : public QObject
 {
     Q_OBJECT
@@ -233,6 +250,8 @@ private Q_SLOTS:
 
 private:
     void writeMountTable(const QByteArray &content);
+    // Runs a remover with a mount table of one card.
+    Outcome emptyMounted(const QByteArray &card);
     QByteArray path(const char *name) const;
     // A folder with a file, a hidden one, a folder and a link in it.
     QByteArray makeCard(const char *name);
@@ -265,6 +284,12 @@ void tst_FileRemover::writeMountTable(const QByteArray &content)
     const QByteArray draft = mountTable + ".draft";
     makeFile(draft, content);
     QCOMPARE(::rename(draft.constData(), mountTable.constData()), 0);
+}
+
+Outcome tst_FileRemover::emptyMounted(const QByteArray &card)
+{
+    writeMountTable(line(device, card));
+    return runHere(device);
 }
 
 QByteArray tst_FileRemover::path(const char *name) const
@@ -359,8 +384,7 @@ void tst_FileRemover::receiverGoesFirst()
 void tst_FileRemover::emptyCard()
 {
     makeFolder(path("card"));
-    writeMountTable(line(device, path("card")));
-    QCOMPARE(runHere(device), Completed);
+    QCOMPARE(emptyMounted(path("card")), Completed);
     QVERIFY(exists(path("card")));
 }
 
@@ -482,8 +506,7 @@ void tst_FileRemover::mountDirectoriesOfAnyBytes()
     if (reencoded != name) {
         makeCard(reencoded.constData());
     }
-    writeMountTable(line(device, card));
-    QCOMPARE(runHere(device), Completed);
+    QCOMPARE(emptyMounted(card), Completed);
     QCOMPARE(list(card), QByteArrayList());
     if (reencoded != name) {
         QCOMPARE(list(path(reencoded.constData())).size(), 4);
@@ -620,8 +643,7 @@ void tst_FileRemover::lineCutWithinDirectory()
     QVERIFY(exists(folder + "/file"));
 
     // The same directory in a line that fits.
-    writeMountTable(line(device, folder));
-    QCOMPARE(runHere(device), Completed);
+    QCOMPARE(emptyMounted(folder), Completed);
     QVERIFY(!exists(folder + "/file"));
 }
 
@@ -637,12 +659,9 @@ void tst_FileRemover::mountedTwice()
 {
     const QByteArray first = makeCard("first");
     const QByteArray second = makeCard("second");
-    const QByteArray stuck = first + "/folder/file";
-    QCOMPARE(mount(stuck.constData(), stuck.constData(), nullptr, MS_BIND, nullptr), 0);
+    const MountPoint stuck(first + "/folder/file");
     writeMountTable(line(device, first) + line("tmpfs", "/run") + line(device, second));
-    const Outcome outcome = runHere(device);
-    QCOMPARE(umount(stuck.constData()), 0);
-    QCOMPARE(outcome, Completed);
+    QCOMPARE(runHere(device), Completed);
     QCOMPARE(listAll(first), (QByteArrayList{"folder", "folder/file"}));
     QCOMPARE(list(second), QByteArrayList());
 }
@@ -661,30 +680,20 @@ void tst_FileRemover::mountedTwiceAndNeitherGoes()
 {
     const QByteArray first = makeCard("first");
     const QByteArray second = makeCard("second");
-    for (const QByteArray &card : {first, second}) {
-        const QByteArray stuck = card + "/file";
-        QCOMPARE(mount(stuck.constData(), stuck.constData(), nullptr, MS_BIND, nullptr), 0);
-    }
+    const MountPoint stuck(first + "/file");
+    const MountPoint stuckToo(second + "/file");
     writeMountTable(line(device, first) + line(device, second));
-    const Outcome outcome = runHere(device);
-    QCOMPARE(umount((first + "/file").constData()), 0);
-    QCOMPARE(umount((second + "/file").constData()), 0);
-    QCOMPARE(outcome, Error);
+    QCOMPARE(runHere(device), Error);
     QCOMPARE(list(first), QByteArrayList{"file"});
     QCOMPARE(list(second), QByteArrayList{"file"});
 }
 
 void tst_FileRemover::entryThatCannotBeRemoved()
 {
-    // A mount point: neither root nor anybody else can remove it.
     const QByteArray card = makeCard("card");
     makeFiles(card, 100);
-    const QByteArray stuck = card + "/file50";
-    QCOMPARE(mount(stuck.constData(), stuck.constData(), nullptr, MS_BIND, nullptr), 0);
-    writeMountTable(line(device, card));
-    const Outcome outcome = runHere(device);
-    QCOMPARE(umount(stuck.constData()), 0);
-    QCOMPARE(outcome, Error);
+    const MountPoint stuck(card + "/file50");
+    QCOMPARE(emptyMounted(card), Error);
     QCOMPARE(list(card), QByteArrayList{"file50"});
 }
 
@@ -700,8 +709,7 @@ void tst_FileRemover::immutableFile()
         QSKIP(qPrintable(
             QStringLiteral("cannot make a file immutable here: %1").arg(qt_error_string(reason))));
     }
-    writeMountTable(line(device, card));
-    const Outcome outcome = runHere(device);
+    const Outcome outcome = emptyMounted(card);
     flags = 0;
     QCOMPARE(ioctl(fd, FS_IOC_SETFLAGS, &flags), 0);
     close(fd);
@@ -742,8 +750,7 @@ void tst_FileRemover::readOnlyCard()
     makeFiles(card + "/folder", 3);
     makeFiles(card, 3);
     QCOMPARE(mount(nullptr, card.constData(), nullptr, MS_REMOUNT | MS_RDONLY, nullptr), 0);
-    writeMountTable(line(device, card));
-    const Outcome outcome = runHere(device);
+    const Outcome outcome = emptyMounted(card);
     const int left = listAll(card).size();
     QCOMPARE(umount(card.constData()), 0);
     QCOMPARE(outcome, Error);
@@ -767,8 +774,7 @@ void tst_FileRemover::unreadableMountDirectory()
 
 void tst_FileRemover::missingMountDirectory()
 {
-    writeMountTable(line(device, path("nowhere")));
-    QCOMPARE(runHere(device), Completed);
+    QCOMPARE(emptyMounted(path("nowhere")), Completed);
 }
 
 void tst_FileRemover::mountDirectoryReplaced_data()
@@ -789,8 +795,7 @@ void tst_FileRemover::mountDirectoryReplaced()
     } else {
         makeLink(path("card"), target);
     }
-    writeMountTable(line(device, path("card")));
-    QCOMPARE(runHere(device), Error);
+    QCOMPARE(emptyMounted(path("card")), Error);
     QVERIFY(exists(path("outside/file")));
 
     const QByteArray second = makeCard("second");
@@ -849,12 +854,9 @@ void tst_FileRemover::removeAllEntries()
     QVERIFY(exists(card));
     QVERIFY(FileRemover::removeAllEntries(QFile::decodeName(card)));
 
-    const QByteArray stuck = card + "/file1";
     makeFiles(card, 3);
-    QCOMPARE(mount(stuck.constData(), stuck.constData(), nullptr, MS_BIND, nullptr), 0);
-    const bool removed = FileRemover::removeAllEntries(QFile::decodeName(card));
-    QCOMPARE(umount(stuck.constData()), 0);
-    QVERIFY(!removed);
+    const MountPoint stuck(card + "/file1");
+    QVERIFY(!FileRemover::removeAllEntries(QFile::decodeName(card)));
     QCOMPARE(list(card), QByteArrayList{"file1"});
 }
 

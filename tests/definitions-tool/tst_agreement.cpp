@@ -8,7 +8,7 @@
 #include "definitions-tool/jsonwalker.h"
 #include "eventswidgets/eventswidgetsfile.h"
 #include "files.h"
-#include "messagelog.h"
+#include "loggedtest.h"
 #include "quickactions/quickaction.h"
 
 #include <QDBusError>
@@ -36,7 +36,7 @@ public Q_SLOTS:
     void fail(const QDBusError &answer, const QDBusMessage &) { error = answer; }
 };
 
-class TestAgreement : public QObject
+class TestAgreement : public LoggedTest
 {
     Q_OBJECT
 
@@ -53,7 +53,6 @@ private Q_SLOTS:
 private:
     QString write(const QByteArray &content, const char *suffix);
 
-    std::unique_ptr<MessageLog> m_log;
     std::unique_ptr<QTemporaryDir> m_directory;
     int m_files = 0;
 };
@@ -152,15 +151,14 @@ int count(const std::vector<Finding> &findings, std::initializer_list<const char
 
 void TestAgreement::init()
 {
-    m_log = std::make_unique<MessageLog>();
+    LoggedTest::init();
     // In memory: these are many files.
     m_directory = std::make_unique<QTemporaryDir>(QStringLiteral("/run/agreement-XXXXXX"));
 }
 
 void TestAgreement::cleanup()
 {
-    QCOMPARE(m_log->takeReport(), QString());
-    m_log.reset();
+    LoggedTest::cleanup();
     m_directory.reset();
 }
 

@@ -8,7 +8,7 @@
 #include "eventswidgets/eventswidgetsfile.h"
 #include "eventswidgets/eventswidgetsmodel.h"
 #include "files.h"
-#include "messagelog.h"
+#include "loggedtest.h"
 #include "quickactions/quickaction.h"
 #include "quickactions/quickactionsmodel.h"
 
@@ -22,7 +22,7 @@
 
 #include <algorithm>
 
-class TestCorpus : public QObject
+class TestCorpus : public LoggedTest
 {
     Q_OBJECT
 
@@ -39,9 +39,6 @@ private Q_SLOTS:
     void agreesOnEventsWidgets();
     void examplesAreClean_data();
     void examplesAreClean();
-
-private:
-    std::unique_ptr<MessageLog> m_log;
 };
 
 namespace {
@@ -206,15 +203,14 @@ void TestCorpus::initTestCase()
 
 void TestCorpus::init()
 {
-    m_log = std::make_unique<MessageLog>();
+    LoggedTest::init();
     Files::makeFolder(quickActionsDirectory);
     Files::makeFolder(eventsWidgetsDirectory);
 }
 
 void TestCorpus::cleanup()
 {
-    QCOMPARE(m_log->takeReport(), QString());
-    m_log.reset();
+    LoggedTest::cleanup();
     Files::remove(quickActionsDirectory);
     Files::remove(eventsWidgetsDirectory);
 }

@@ -4,7 +4,7 @@
 // The command as its users run it.
 
 #include "files.h"
-#include "messagelog.h"
+#include "loggedtest.h"
 #include "mgconfitem.h"
 #include "simulator/recordingservice.h"
 
@@ -19,7 +19,7 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
-class TestMarloDefinitions : public QObject
+class TestMarloDefinitions : public LoggedTest
 {
     Q_OBJECT
 
@@ -64,7 +64,6 @@ private:
     // failure.
     static Result run(const QByteArray &line, const char *locale = "C.UTF-8");
 
-    std::unique_ptr<MessageLog> m_log;
     std::unique_ptr<QTemporaryDir> m_directory;
 };
 
@@ -91,7 +90,7 @@ QString lines(const QStringList &lines)
 
 void TestMarloDefinitions::init()
 {
-    m_log = std::make_unique<MessageLog>();
+    LoggedTest::init();
     m_directory = std::make_unique<QTemporaryDir>();
     QVERIFY(QDir::setCurrent(m_directory->path()));
     Files::installCatalog(QStringLiteral("maps_eng_en"));
@@ -99,8 +98,7 @@ void TestMarloDefinitions::init()
 
 void TestMarloDefinitions::cleanup()
 {
-    QCOMPARE(m_log->takeReport(), QString());
-    m_log.reset();
+    LoggedTest::cleanup();
     QVERIFY(QDir::setCurrent(QStringLiteral("/")));
     m_directory.reset();
     Files::remove(glimmera);

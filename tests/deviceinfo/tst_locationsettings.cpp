@@ -3,7 +3,7 @@
 
 #include "dconftool.h"
 #include "locationsettings.h"
-#include "messagelog.h"
+#include "loggedtest.h"
 #include "mgconfitem.h"
 
 #include <QProcess>
@@ -11,13 +11,12 @@
 
 #include <cstdio>
 
-class TestLocationSettings : public QObject
+class TestLocationSettings : public LoggedTest
 {
     Q_OBJECT
 
 private Q_SLOTS:
     void init();
-    void cleanup();
 
     void properties();
     void statesAreNumbers();
@@ -37,9 +36,6 @@ private Q_SLOTS:
     void followsAnotherProcess();
     void changesThatAreNotDeliveredYet();
     void anotherProcessFollows();
-
-private:
-    std::unique_ptr<MessageLog> m_log;
 };
 
 using State = LocationSettings::OnlineAGpsState;
@@ -96,13 +92,7 @@ void TestLocationSettings::init()
     for (const QString &key : {gpsKey, mlsKey, mlsOnlineKey, hereKey}) {
         MGConfItem(key).unset();
     }
-    m_log = std::make_unique<MessageLog>();
-}
-
-void TestLocationSettings::cleanup()
-{
-    QCOMPARE(m_log->takeReport(), QString());
-    m_log.reset();
+    LoggedTest::init();
 }
 
 void TestLocationSettings::properties()

@@ -4,7 +4,7 @@
 // The examples of the README, the manual pages and the reference work exactly as printed.
 
 #include "files.h"
-#include "messagelog.h"
+#include "loggedtest.h"
 #include "mgconfitem.h"
 #include "simulator/recordingservice.h"
 
@@ -58,19 +58,12 @@ bool isBusy(const QObject &example)
 
 } // namespace
 
-class TestExamples : public QObject
+class TestExamples : public LoggedTest
 {
     Q_OBJECT
 
 private Q_SLOTS:
     void initTestCase();
-    void init() { m_log = std::make_unique<MessageLog>(); }
-    void cleanup()
-    {
-        QCOMPARE(m_log->takeReport(), QString());
-        m_log.reset();
-    }
-
     void definesAQuickAction();
     void definesAWidget();
     void listsTheActionOnAPage();
@@ -84,7 +77,6 @@ private:
     std::unique_ptr<QObject> create(const QByteArray &document);
 
     QQmlEngine m_engine;
-    std::unique_ptr<MessageLog> m_log;
 };
 
 void TestExamples::initTestCase()

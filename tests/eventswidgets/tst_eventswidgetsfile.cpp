@@ -5,7 +5,7 @@
 
 #include "eventswidgets/eventswidgetsfile.h"
 #include "files.h"
-#include "messagelog.h"
+#include "loggedtest.h"
 
 #include <QTemporaryDir>
 #include <QtTest>
@@ -16,7 +16,7 @@ using Widget = EventsWidget;
 
 Q_DECLARE_METATYPE(std::function<void(EventsWidget *)>)
 
-class TestEventsWidgetsFile : public QObject
+class TestEventsWidgetsFile : public LoggedTest
 {
     Q_OBJECT
 
@@ -59,7 +59,6 @@ private:
     Widget readWidget(const QByteArray &members);
     QString warning(const char *text) const;
 
-    std::unique_ptr<MessageLog> m_log;
     std::unique_ptr<QTemporaryDir> m_root;
     QString m_path;
 };
@@ -68,13 +67,12 @@ void TestEventsWidgetsFile::init()
 {
     m_root = std::make_unique<QTemporaryDir>();
     m_path = m_root->filePath(QStringLiteral("test.json"));
-    m_log = std::make_unique<MessageLog>();
+    LoggedTest::init();
 }
 
 void TestEventsWidgetsFile::cleanup()
 {
-    QCOMPARE(m_log->takeReport(), QString());
-    m_log.reset();
+    LoggedTest::cleanup();
     m_root.reset();
 }
 

@@ -3,7 +3,7 @@
 
 #include "files.h"
 #include "files/directorywatcher.h"
-#include "messagelog.h"
+#include "loggedtest.h"
 
 #include <QTemporaryDir>
 #include <QtTest>
@@ -31,7 +31,7 @@ extern "C" Q_DECL_EXPORT int inotify_add_watch(int inotify, const char *path, ui
     return original(inotify, path, events);
 }
 
-class TestDirectoryWatcher : public QObject
+class TestDirectoryWatcher : public LoggedTest
 {
     Q_OBJECT
 
@@ -53,14 +53,13 @@ private Q_SLOTS:
 private:
     QString path(const char *name) const { return m_root->filePath(QString::fromLatin1(name)); }
 
-    std::unique_ptr<MessageLog> m_log;
     std::unique_ptr<QTemporaryDir> m_root;
     QString m_directory;
 };
 
 void TestDirectoryWatcher::init()
 {
-    m_log = std::make_unique<MessageLog>();
+    LoggedTest::init();
     m_root = std::make_unique<QTemporaryDir>();
     m_directory = path("a/b/c");
 }
@@ -68,8 +67,7 @@ void TestDirectoryWatcher::init()
 void TestDirectoryWatcher::cleanup()
 {
     m_root.reset();
-    QCOMPARE(m_log->takeReport(), QString());
-    m_log.reset();
+    LoggedTest::cleanup();
 }
 
 void TestDirectoryWatcher::reportsEntries()

@@ -2,7 +2,7 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 #include "gvariantconversion.h"
-#include "messagelog.h"
+#include "loggedtest.h"
 
 #include <QDate>
 #include <QDebug>
@@ -46,18 +46,11 @@ GVariantPtr untrusted(const char *type, const QByteArray &data)
 
 } // namespace
 
-class TestGVariantConversion : public QObject
+class TestGVariantConversion : public LoggedTest
 {
     Q_OBJECT
 
 private Q_SLOTS:
-    void init() { m_log = std::make_unique<MessageLog>(); }
-    void cleanup()
-    {
-        QCOMPARE(m_log->takeAll(), QList<MessageLog::Message>());
-        m_log.reset();
-    }
-
     void bothWays_data();
     void bothWays();
     void refusesOtherTypes_data();
@@ -73,9 +66,6 @@ private Q_SLOTS:
     void longListsAreReadOnce();
     void anyBytesAreSafe_data();
     void anyBytesAreSafe();
-
-private:
-    std::unique_ptr<MessageLog> m_log;
 };
 
 void TestGVariantConversion::bothWays_data()

@@ -2,7 +2,7 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 #include "dconftool.h"
-#include "messagelog.h"
+#include "loggedtest.h"
 #include "mgconfitem.h"
 
 #include <QDBusConnection>
@@ -296,16 +296,14 @@ extern "C" Q_DECL_EXPORT gboolean dconf_client_write_fast(DConfClient *client, c
     return write(client, key, value, error);
 }
 
-class TestMGConfItem : public QObject
+class TestMGConfItem : public LoggedTest
 {
     Q_OBJECT
 
 private Q_SLOTS:
-    void init() { m_log = std::make_unique<MessageLog>(); }
     void cleanup()
     {
-        QCOMPARE(m_log->takeAll(), QList<MessageLog::Message>());
-        m_log.reset();
+        LoggedTest::cleanup();
         DconfTool::reset(QStringLiteral("/test/"));
     }
 
@@ -350,9 +348,6 @@ private Q_SLOTS:
     void withoutABusWarnsOnce();
     void withoutGlibWarnsOnce();
     void outlivesTheBus();
-
-private:
-    std::unique_ptr<MessageLog> m_log;
 };
 
 void TestMGConfItem::startsUnset()

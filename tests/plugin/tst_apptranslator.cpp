@@ -2,18 +2,17 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 #include "files.h"
-#include "messagelog.h"
+#include "loggedtest.h"
 #include "plugin/translations/apptranslator.h"
 
 #include <QtTest>
 
-class TestAppTranslator : public QObject
+class TestAppTranslator : public LoggedTest
 {
     Q_OBJECT
 
 private Q_SLOTS:
     void init();
-    void cleanup();
 
     void loadsForTheDefaultLocale();
     void loadsEngineeringEnglish();
@@ -23,9 +22,6 @@ private Q_SLOTS:
     void passesEveryEventOn();
     void otherEventsReadNothing();
     void leavesTheApplicationWithItsParent();
-
-private:
-    std::unique_ptr<MessageLog> m_log;
 };
 
 namespace {
@@ -62,13 +58,7 @@ void TestAppTranslator::init()
         Files::installCatalog(QString::fromLatin1(name));
     }
     QLocale::setDefault(QLocale(QStringLiteral("fi_FI")));
-    m_log = std::make_unique<MessageLog>();
-}
-
-void TestAppTranslator::cleanup()
-{
-    QCOMPARE(m_log->takeReport(), QString());
-    m_log.reset();
+    LoggedTest::init();
 }
 
 void TestAppTranslator::loadsForTheDefaultLocale()

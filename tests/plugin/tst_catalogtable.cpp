@@ -2,7 +2,7 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 #include "files.h"
-#include "messagelog.h"
+#include "loggedtest.h"
 #include "plugin/translations/catalogtable.h"
 
 #include <QScopedValueRollback>
@@ -10,7 +10,7 @@
 
 #include <functional>
 
-class TestCatalogTable : public QObject
+class TestCatalogTable : public LoggedTest
 {
     Q_OBJECT
 
@@ -36,7 +36,6 @@ private Q_SLOTS:
 private:
     QList<QTranslator *> translators() const { return m_owner->findChildren<QTranslator *>(); }
 
-    std::unique_ptr<MessageLog> m_log;
     std::unique_ptr<QObject> m_owner;
     std::unique_ptr<CatalogTable> m_table;
 };
@@ -65,7 +64,7 @@ void TestCatalogTable::init()
         Files::installCatalog(QString::fromLatin1(name));
     }
     QLocale::setDefault(QLocale(QStringLiteral("fi_FI")));
-    m_log = std::make_unique<MessageLog>();
+    LoggedTest::init();
     m_owner = std::make_unique<QObject>();
     m_table = std::make_unique<CatalogTable>(m_owner.get());
 }
@@ -75,8 +74,7 @@ void TestCatalogTable::cleanup()
     m_table.reset();
     m_owner.reset();
     QCOMPARE(title(), QStringLiteral("maps-title"));
-    QCOMPARE(m_log->takeReport(), QString());
-    m_log.reset();
+    LoggedTest::cleanup();
 }
 
 void TestCatalogTable::languageWinsOverEngineeringEnglish()

@@ -5,7 +5,7 @@
 
 #include "files.h"
 #include "gallery/simulation/languageforwarder.h"
-#include "messagelog.h"
+#include "loggedtest.h"
 #include "moduletypes.h"
 
 #include <QJsonObject>
@@ -16,13 +16,12 @@
 #include <QQmlExtensionPlugin>
 #include <QtTest>
 
-class TestPlugin : public QObject
+class TestPlugin : public LoggedTest
 {
     Q_OBJECT
 
 private Q_SLOTS:
     void init();
-    void cleanup();
 
     void metaData();
     void oneInstance();
@@ -45,8 +44,6 @@ private:
     // Has the engine evaluate a small document that imports the module.
     static std::unique_ptr<QObject> create(QQmlEngine *engine, const QByteArray &object,
                                            const QByteArray &version = "1.0");
-
-    std::unique_ptr<MessageLog> m_log;
 };
 
 namespace {
@@ -119,13 +116,7 @@ void TestPlugin::init()
     // Without it BluetoothInfo warns.
     Files::write(QStringLiteral("/var/lib/bluetooth/board-address"), "00:1A:7D:DA:71:13\n");
     QLocale::setDefault(QLocale(QStringLiteral("fi_FI")));
-    m_log = std::make_unique<MessageLog>();
-}
-
-void TestPlugin::cleanup()
-{
-    QCOMPARE(m_log->takeReport(), QString());
-    m_log.reset();
+    LoggedTest::init();
 }
 
 void TestPlugin::metaData()

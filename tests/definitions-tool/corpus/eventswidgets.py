@@ -67,8 +67,8 @@ def no_catalog(line):
     )
 
 
-def relative(line, path):
-    return f'{line}: warning: the path "{path}" is a relative path [relative-path]'
+def relative(line, what, path):
+    return f'{line}: warning: the {what} "{path}" is a relative path [relative-path]'
 
 
 def wrong_type(line, key, what):
@@ -228,12 +228,13 @@ case(
     '6: warning: the path "/usr/share/a.qml" is also in warn-duplicate-path.json:4; only one of '
     "the two widgets is listed [duplicate-path]",
 )
+case("warn-relative-path", file(widget(path='"lamp.qml"')), relative(5, "path", "lamp.qml"))
+for name, icon in {"": "icons/lamp", "-name": "lamp.SVG"}.items():
+    case(f"warn-relative-icon{name}", file(widget(icon=f'"{icon}"')), relative(9, "icon", icon))
 case(
-    "warn-relative",
-    file(widget(path='"lamp.qml"', icon='"icons/lamp.svg"', available_path='"bin/lamp"')),
-    relative(5, "lamp.qml"),
-    '9: warning: the icon "icons/lamp.svg" is a relative path [relative-path]',
-    '12: warning: the available path "bin/lamp" is a relative path [relative-path]',
+    "warn-relative-available-path",
+    file(widget(available_path='"bin/lamp"')),
+    relative(12, "available path", "bin/lamp"),
 )
 case(
     "warn-unknown-key",
@@ -253,6 +254,11 @@ case(
     '6: warning: unknown key "defaultEnabled"; is "default_enabled" meant? [unknown-key]',
     '7: warning: unknown key "tilte"; is "title" meant? [unknown-key]',
     '8: warning: unknown key "colour" [unknown-key]',
+)
+case(
+    "warn-unknown-key-of-a-file",
+    file(short()).replace("{\n", '{\n"widget": [],\n', 1),
+    '2: warning: unknown key "widget"; is "widgets" meant? [unknown-key]',
 )
 case(
     "warn-escaped-unknown-key",
@@ -292,3 +298,4 @@ case(
     no_title(2),
     no_catalog(3),
 )
+case("warn-empty-catalog", file(short()).replace("maps", ""), no_catalog(4))

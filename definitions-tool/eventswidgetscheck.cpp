@@ -124,7 +124,7 @@ public:
     void check();
 
 private:
-    // The last member of a known key. Its line is 0 if there is none.
+    // The last member of a known key. Its line is 0 without such a member.
     struct Member {
         int line = 0;
         int position = 0; // Of the value.

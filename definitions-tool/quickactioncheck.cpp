@@ -97,7 +97,7 @@ bool isName(const Name &name, const QString &value)
         && expressions.at(size_t(&name - names().data())).match(value).hasMatch();
 }
 
-// The number of the array's element, from 1, or 0 if the key is no element's.
+// The number of an element of the array, from 1, or 0 for any other key.
 int argumentNumber(const QString &key)
 {
     static const QRegularExpression element(
@@ -185,9 +185,9 @@ void QuickActionCheck::checkLines(bool isLatin1)
         default:
             add(line.number, Severity::Error, noKeyRule,
                 line.name.startsWith(QLatin1Char('#'))
-                    ? QStringLiteral("this line is no key and is passed over; comments begin with "
+                    ? QStringLiteral("this line is not a key and is ignored; comments begin with "
                                      "\";\"")
-                    : QStringLiteral("this line is no key and is passed over"));
+                    : QStringLiteral("this line is not a key and is ignored"));
             break;
         }
         if (!line.isAscii && isLatin1) {
@@ -207,7 +207,7 @@ void QuickActionCheck::checkKey(const NamedIniLine &line, const QString &section
     }
     if (m_lineOf.value(line.name) != line.number) {
         add(line.number, Severity::Error, repeatedKeyRule,
-            QStringLiteral("the key %1 stands again in line %2, and only that counts")
+            QStringLiteral("the key %1 is repeated in line %2, and only that one counts")
                 .arg(quoted(line.name), QString::number(m_lineOf.value(line.name))));
     }
     if (line.isCut) {
@@ -264,12 +264,13 @@ void QuickActionCheck::checkText(const QString &key, const QVariant &value)
     m_misread.insert(key);
     if (value.userType() == QMetaType::QStringList) {
         add(lineOf(key), Severity::Error, commaRule,
-            QStringLiteral("an unquoted comma makes %1 a list, which is no text; put it in double "
-                           "quotes")
+            QStringLiteral(
+                "an unquoted comma makes %1 a list, which is not a text; put it in double "
+                "quotes")
                 .arg(quoted(key)));
     } else {
         add(lineOf(key), Severity::Error, typeRule,
-            QStringLiteral("%1 reads as no text; write a leading @ twice").arg(quoted(key)));
+            QStringLiteral("%1 is not read as a text; write a leading @ twice").arg(quoted(key)));
     }
 }
 
@@ -280,7 +281,7 @@ void QuickActionCheck::checkPriority()
             QStringLiteral("without \"priority\" the action comes last"));
     } else if (!m_action.priority()) {
         add(lineOf(priorityKey), Severity::Error, typeRule,
-            QStringLiteral("\"priority\" is no integer: the action comes last"));
+            QStringLiteral("\"priority\" is not an integer: the action comes last"));
     } else if (*m_action.priority() < 0) {
         add(lineOf(priorityKey), Severity::Warning, priorityRule,
             QStringLiteral("\"priority\" is negative: the action comes last"));
@@ -328,16 +329,17 @@ void QuickActionCheck::checkArgument(int number, const QVariant &value)
     const int line = lineOf(argumentKey(number));
     if (value.userType() == QMetaType::QStringList) {
         add(line, Severity::Note, argumentTypeRule,
-            QStringLiteral("argument %1 goes out as a list of %2 texts")
+            QStringLiteral("argument %1 is sent as a list of %2 texts")
                 .arg(number)
                 .arg(value.toStringList().size()));
     } else if (value.userType() != QMetaType::QString) {
         m_argumentsAreWrong = true;
         add(line, Severity::Error, argumentsRule,
-            QStringLiteral("argument %1 reads as no text; write a leading @ twice").arg(number));
+            QStringLiteral("argument %1 is not read as a text; write a leading @ twice")
+                .arg(number));
     } else if (looksLikeNumberOrBoolean(value.toString())) {
         add(line, Severity::Note, argumentTypeRule,
-            QStringLiteral("argument %1 goes out as the text %2")
+            QStringLiteral("argument %1 is sent as the text %2")
                 .arg(number)
                 .arg(quoted(value.toString())));
     }
@@ -357,7 +359,7 @@ void QuickActionCheck::checkCall()
             add(lineOf(name.key), Severity::Error, callRule,
                 value.isEmpty()
                     ? QStringLiteral("the call cannot be sent without %1").arg(quoted(name.key))
-                    : QStringLiteral("the call cannot be sent: %1 is no %2")
+                    : QStringLiteral("the call cannot be sent: %1 is not a valid %2")
                           .arg(quoted(value), name.what));
         }
     }

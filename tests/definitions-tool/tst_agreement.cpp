@@ -162,7 +162,7 @@ void TestAgreement::cleanup()
     m_directory.reset();
 }
 
-// Under a name of its own: QSettings does not read a file anew that looks as it did.
+// Under a new name each time, because QSettings caches what it has read.
 QString TestAgreement::write(const QByteArray &content, const char *suffix)
 {
     const QString path =

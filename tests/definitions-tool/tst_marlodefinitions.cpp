@@ -215,9 +215,9 @@ void TestMarloDefinitions::directory()
     QCOMPARE(result.status, 1);
     QCOMPARE(
         result.output,
-        lines({QStringLiteral("f/A.CONF:1: error: this line is no key and is passed over "
+        lines({QStringLiteral("f/A.CONF:1: error: this line is not a key and is ignored "
                               "[no-key]"),
-               QStringLiteral("f/b.conf:1: error: this line is no key and is passed over "
+               QStringLiteral("f/b.conf:1: error: this line is not a key and is ignored "
                               "[no-key]"),
                QStringLiteral("f/directory.conf:1: error: this is not a regular file [unreadable]"),
                QStringLiteral("f/w.json:1: error: this is not an object: nothing of the file is "
@@ -337,7 +337,7 @@ void TestMarloDefinitions::hostileNames()
                      QStringLiteral("./a\\u000ab.conf:1: note\\u001b[2J ä.json:1: error: ")),
                  qPrintable(result.output));
     }
-    // What is no UTF-8 is named in vain, but in an orderly way.
+    // A name that is not UTF-8 is not found, but does no harm.
     QFile file(QStringLiteral("plain.conf"));
     QVERIFY(file.open(QIODevice::WriteOnly));
     QCOMPARE(::rename("plain.conf", "bad\xff.conf"), 0);

@@ -28,7 +28,7 @@ def action(**changes):
 def arguments(*values, size=None):
     """The arguments of the call; the lines begin behind the eight of a good definition."""
     lines = [f"{i}\\argument={value}\n" for i, value in enumerate(values, 1)]
-    return f"[remote-arguments]\nsize={len(values) if size is None else size}\n" + "".join(lines)
+    return f"[remote-arguments]\nsize={size if size is not None else len(values)}\n{''.join(lines)}"
 
 
 NO_PRIORITY = '1: warning: without "priority" the action comes last [priority]'
@@ -42,12 +42,12 @@ NO_CALL = [
     '1: error: the call cannot be sent without "remote-path" [call]',
     '1: error: the call cannot be sent without "remote-method" [call]',
 ]
-NO_KEY = "error: this line is no key and is passed over"
+NO_KEY = "error: this line is not a key and is ignored"
 LATIN1 = (
     "error: bytes outside ASCII are read as Latin-1; write \\x and the character's number [encoding]"
 )
 MARKED = "1: error: the byte-order mark becomes a part of the key [encoding]"
-NO_INTEGER = '4: error: "priority" is no integer: the action comes last [type]'
+NO_INTEGER = '4: error: "priority" is not an integer: the action comes last [type]'
 TOO_MANY = "10: error: the call cannot be sent: The call has too many arguments [call]"
 RESERVED_PATH = "6: error: the call cannot be sent: The path is reserved [call]"
 PACKED = "9: error: a packed value: nothing of the file is read [unreadable]"
@@ -55,17 +55,17 @@ PACKED = "9: error: a packed value: nothing of the file is read [unreadable]"
 
 def comma(line, key):
     return (
-        f'{line}: error: an unquoted comma makes "{key}" a list, which is no text; put it in double '
+        f'{line}: error: an unquoted comma makes "{key}" a list, which is not a text; put it in double '
         "quotes [comma]"
     )
 
 
 def no_text(line, key):
-    return f'{line}: error: "{key}" reads as no text; write a leading @ twice [type]'
+    return f'{line}: error: "{key}" is not read as a text; write a leading @ twice [type]'
 
 
 def no_name(line, value, what):
-    return f'{line}: error: the call cannot be sent: "{value}" is no {what} [call]'
+    return f'{line}: error: the call cannot be sent: "{value}" is not a valid {what} [call]'
 
 
 # Values.
@@ -150,12 +150,12 @@ case(
 case(
     "bad-repeated-key",
     action() + "title=maps-english\n",
-    '1: error: the key "title" stands again in line 9, and only that counts [repeated-key]',
+    '1: error: the key "title" is repeated in line 9, and only that one counts [repeated-key]',
 )
 case(
     "bad-repeated-in-general",
     action() + "[x]\ny=1\n[general]\nicon=other\n",
-    '3: error: the key "icon" stands again in line 12, and only that counts [repeated-key]',
+    '3: error: the key "icon" is repeated in line 12, and only that one counts [repeated-key]',
     '9: warning: unknown section "x" [unknown-key]',
 )
 case(
@@ -303,19 +303,19 @@ case(
 case(
     "good-list-argument",
     action() + arguments("a, b, c"),
-    "11: note: argument 1 goes out as a list of 3 texts [argument-type]",
+    "11: note: argument 1 is sent as a list of 3 texts [argument-type]",
 )
 case(
     "good-number-arguments",
     action() + arguments("1", "true", "-1.5e3", "1.2.3"),
-    '11: note: argument 1 goes out as the text "1" [argument-type]',
-    '12: note: argument 2 goes out as the text "true" [argument-type]',
-    '13: note: argument 3 goes out as the text "-1.5e3" [argument-type]',
+    '11: note: argument 1 is sent as the text "1" [argument-type]',
+    '12: note: argument 2 is sent as the text "true" [argument-type]',
+    '13: note: argument 3 is sent as the text "-1.5e3" [argument-type]',
 )
 case(
     "bad-argument-type",
     action() + arguments("a", "@Point(1 2)"),
-    "12: error: argument 2 reads as no text; write a leading @ twice [arguments]",
+    "12: error: argument 2 is not read as a text; write a leading @ twice [arguments]",
 )
 case(
     "bad-key-named-as-the-arguments",
@@ -362,7 +362,7 @@ case(
     action() + arguments(*["x,y"] * 130),
     TOO_MANY,
     *(
-        f"{10 + i}: note: argument {i} goes out as a list of 2 texts [argument-type]"
+        f"{10 + i}: note: argument {i} is sent as a list of 2 texts [argument-type]"
         for i in range(1, 131)
     ),
 )

@@ -23,10 +23,9 @@
 #include <csignal>
 #include <functional>
 #include <memory>
+#include <type_traits>
 
 #include <glib.h>
-
-Q_DECLARE_METATYPE(std::function<std::unique_ptr<class User>()>)
 
 // A type with one choice that it keeps in dconf.
 class User
@@ -40,36 +39,39 @@ public:
     virtual QByteArray stored(bool on) const = 0;
 };
 
+using MakeUser = std::function<std::unique_ptr<User>()>;
+Q_DECLARE_METATYPE(MakeUser)
+
+// Every function runs for each type that keeps something in dconf.
 class TestDconfFaults : public QObject
 {
     Q_OBJECT
 
 private Q_SLOTS:
+    void initTestCase_data();
     void init();
     void cleanup();
 
-    void serviceHangs_data();
     void serviceHangs();
-    void goesWhileTheServiceHangs_data();
     void goesWhileTheServiceHangs();
-    void serviceDiesInTheMiddleOfAWrite_data();
     void serviceDiesInTheMiddleOfAWrite();
-    void serviceIsAbsent_data();
     void serviceIsAbsent();
-    void everyOtherType_data();
     void everyOtherType();
-    void hugeLists_data();
     void hugeLists();
-    void hugeDatabase_data();
     void hugeDatabase();
-    void tenThousandNotifications_data();
     void tenThousandNotifications();
 
 private:
-    void addUsers();
+    // Chooses, and waits until that is stored.
+    bool stores(bool on);
+    bool isStored(bool on) const;
+    // Waits until dconf reports a failed write.
+    bool aWriteFails();
     QStringList takeMessages();
     void takeFailedWrites();
 
+    MakeUser m_make;
+    std::unique_ptr<User> m_user;
     std::unique_ptr<MessageLog> m_log;
 };
 
@@ -109,11 +111,25 @@ const QStringList allKeys = {
 const QString actionPath = QStringLiteral("/usr/share/glimmera/quickactions/lamp.conf");
 const QString widgetPath = QStringLiteral("weather");
 
-// One that keeps the paths of what is enabled.
-class ListUser : public User
+// A model that keeps the paths of what is enabled.
+template<typename Model, auto enable, auto disable> class ListUser : public User
 {
 public:
-    ListUser(QString key, QString path) : m_key(std::move(key)), m_path(std::move(path)) { }
+    ListUser(QString key, QString path) : m_key(std::move(key)), m_path(std::move(path))
+    {
+        if constexpr (std::is_same_v<Model, QuickActionsModel>) {
+            m_model.setShowPotential(true);
+        } else {
+            // The other model has rows below its rows, which the tester refuses.
+            new QAbstractItemModelTester(&m_model, &m_model);
+        }
+        m_model.componentComplete();
+    }
+    void choose(bool on) override { (m_model.*(on ? enable : disable))(m_path); }
+    bool isOn() const override
+    {
+        return m_model.data(m_model.index(0), Model::EnabledRole).toBool();
+    }
     QString key() const override { return m_key; }
     QByteArray stored(bool on) const override
     {
@@ -123,54 +139,13 @@ public:
 private:
     const QString m_key;
     const QString m_path;
+    Model m_model;
 };
 
-class ActionsUser : public ListUser
-{
-public:
-    ActionsUser() : ListUser(actionsKey, actionPath)
-    {
-        m_model.setShowPotential(true);
-        m_model.componentComplete();
-    }
-    void choose(bool on) override
-    {
-        if (on) {
-            m_model.enableAction(actionPath);
-        } else {
-            m_model.disableAction(actionPath);
-        }
-    }
-    bool isOn() const override
-    {
-        return m_model.data(m_model.index(0), QuickActionsModel::EnabledRole).toBool();
-    }
-
-private:
-    QuickActionsModel m_model;
-};
-
-class WidgetsUser : public ListUser
-{
-public:
-    WidgetsUser() : ListUser(widgetsKey, widgetPath) { m_model.componentComplete(); }
-    void choose(bool on) override
-    {
-        if (on) {
-            m_model.enableWidget(widgetPath);
-        } else {
-            m_model.disableWidget(widgetPath);
-        }
-    }
-    bool isOn() const override
-    {
-        return m_model.data(m_model.index(0), EventsWidgetsModel::EnabledRole).toBool();
-    }
-
-private:
-    EventsWidgetsModel m_model;
-    QAbstractItemModelTester m_tester = {&m_model};
-};
+using ActionsUser = ListUser<QuickActionsModel, &QuickActionsModel::enableAction,
+                             &QuickActionsModel::disableAction>;
+using WidgetsUser = ListUser<EventsWidgetsModel, &EventsWidgetsModel::enableWidget,
+                             &EventsWidgetsModel::disableWidget>;
 
 class LocationUser : public User
 {
@@ -183,13 +158,6 @@ public:
 private:
     LocationConfiguration m_location;
 };
-
-using MakeUser = std::function<std::unique_ptr<User>()>;
-
-template<typename Type> MakeUser maker()
-{
-    return [] { return std::make_unique<Type>(); };
-}
 
 // Several keys in one write, of whatever size.
 void load(const QStringList &keys, const QByteArray &value)
@@ -300,6 +268,17 @@ GLogWriterOutput intoMessageLog(GLogLevelFlags level, const GLogField *fields, g
 
 } // namespace
 
+void TestDconfFaults::initTestCase_data()
+{
+    QTest::addColumn<MakeUser>("make");
+    QTest::newRow("QuickActionsModel")
+        << MakeUser([] { return std::make_unique<ActionsUser>(actionsKey, actionPath); });
+    QTest::newRow("EventsWidgetsModel")
+        << MakeUser([] { return std::make_unique<WidgetsUser>(widgetsKey, widgetPath); });
+    QTest::newRow("LocationConfiguration")
+        << MakeUser([] { return std::make_unique<LocationUser>(); });
+}
+
 void TestDconfFaults::init()
 {
     Files::write(actionPath, "title=lamp\n");
@@ -309,10 +288,14 @@ void TestDconfFaults::init()
     // Without a list the first choice would enable all widgets.
     load({widgetsKey}, "@as []");
     m_log = std::make_unique<MessageLog>();
+    QFETCH_GLOBAL(MakeUser, make);
+    m_make = make;
+    m_user = m_make();
 }
 
 void TestDconfFaults::cleanup()
 {
+    m_user.reset();
     QCOMPARE(takeMessages(), QStringList());
     m_log.reset();
 }
@@ -331,101 +314,78 @@ void TestDconfFaults::takeFailedWrites()
              qUtf8Printable(messages.join(QLatin1Char('\n'))));
 }
 
-void TestDconfFaults::addUsers()
+bool TestDconfFaults::stores(bool on)
 {
-    QTest::addColumn<MakeUser>("make");
-    QTest::newRow("QuickActionsModel") << maker<ActionsUser>();
-    QTest::newRow("EventsWidgetsModel") << maker<WidgetsUser>();
-    QTest::newRow("LocationConfiguration") << maker<LocationUser>();
+    m_user->choose(on);
+    return QTest::qWaitFor([&] { return isStored(on); }, patience);
 }
 
-void TestDconfFaults::serviceHangs_data()
+bool TestDconfFaults::isStored(bool on) const
 {
-    addUsers();
+    return DconfTool::read(m_user->key()) == m_user->stored(on);
+}
+
+bool TestDconfFaults::aWriteFails()
+{
+    QStringList messages;
+    return QTest::qWaitFor([&] { return !(messages += takeMessages()).isEmpty(); }, patience)
+        && isFailedWrite(messages.first());
 }
 
 void TestDconfFaults::serviceHangs()
 {
-    QFETCH(MakeUser, make);
-    const auto user = make();
-    user->choose(true);
-    TRY_COMPARE(DconfTool::read(user->key()), user->stored(true));
+    QVERIFY(stores(true));
 
     StoppedService service;
     // The process itself sees what it has chosen; others once the service goes on.
-    user->choose(false);
-    TRY(!user->isOn());
-    user->choose(true);
-    user->choose(false);
-    TRY(!user->isOn());
-    QVERIFY(!make()->isOn());
-    QCOMPARE(DconfTool::read(user->key()), user->stored(true));
+    m_user->choose(false);
+    TRY(!m_user->isOn());
+    m_user->choose(true);
+    m_user->choose(false);
+    TRY(!m_user->isOn());
+    QVERIFY(!m_make()->isOn());
+    QVERIFY(isStored(true));
     service.goOn();
-    TRY_COMPARE(DconfTool::read(user->key()), user->stored(false));
-    QVERIFY(!user->isOn());
-}
-
-void TestDconfFaults::goesWhileTheServiceHangs_data()
-{
-    addUsers();
+    TRY(isStored(false));
+    QVERIFY(!m_user->isOn());
 }
 
 void TestDconfFaults::goesWhileTheServiceHangs()
 {
-    QFETCH(MakeUser, make);
-    auto user = make();
-    const QString key = user->key();
-    const QByteArray stored = user->stored(true);
+    const QString key = m_user->key();
+    const QByteArray stored = m_user->stored(true);
     StoppedService service;
-    user->choose(true);
-    user.reset();
-    delete make().release();
+    m_user->choose(true);
+    m_user.reset();
+    delete m_make().release();
     service.goOn();
     TRY_COMPARE(DconfTool::read(key), stored);
-    QVERIFY(make()->isOn());
-}
-
-void TestDconfFaults::serviceDiesInTheMiddleOfAWrite_data()
-{
-    addUsers();
+    QVERIFY(m_make()->isOn());
 }
 
 void TestDconfFaults::serviceDiesInTheMiddleOfAWrite()
 {
-    QFETCH(MakeUser, make);
-    const auto user = make();
-    user->choose(true);
-    TRY_COMPARE(DconfTool::read(user->key()), user->stored(true));
+    QVERIFY(stores(true));
 
     StoppedService service;
-    user->choose(false);
-    TRY(!user->isOn());
+    m_user->choose(false);
+    TRY(!m_user->isOn());
     // The call has left.
     QTest::qWait(100);
     service.kill();
     // What was not stored is taken back, once all that is under way has failed or been stored.
-    QStringList messages;
-    TRY(!(messages += takeMessages()).isEmpty());
-    QVERIFY(isFailedWrite(messages.first()));
-    TRY_COMPARE(user->isOn(), true);
-    QCOMPARE(DconfTool::read(user->key()), user->stored(true));
+    QVERIFY(aWriteFails());
+    TRY_COMPARE(m_user->isOn(), true);
+    QVERIFY(isStored(true));
 
     // The bus starts the service anew.
-    user->choose(false);
-    TRY_COMPARE(DconfTool::read(user->key()), user->stored(false));
-    QVERIFY(!user->isOn());
+    QVERIFY(stores(false));
+    QVERIFY(!m_user->isOn());
     takeFailedWrites();
-}
-
-void TestDconfFaults::serviceIsAbsent_data()
-{
-    addUsers();
 }
 
 void TestDconfFaults::serviceIsAbsent()
 {
-    QFETCH(MakeUser, make);
-    const auto user = make();
     const QString away = serviceFile + QStringLiteral(".away");
     QVERIFY(QFile::rename(serviceFile, away));
     reloadBusConfiguration();
@@ -435,29 +395,20 @@ void TestDconfFaults::serviceIsAbsent()
     }
     TRY_COMPARE(servicePid(), 0);
 
-    user->choose(true);
-    QStringList messages;
-    TRY(!(messages += takeMessages()).isEmpty());
-    QVERIFY(isFailedWrite(messages.first()));
-    TRY_COMPARE(user->isOn(), false);
-    QVERIFY(!make()->isOn());
+    m_user->choose(true);
+    QVERIFY(aWriteFails());
+    TRY_COMPARE(m_user->isOn(), false);
+    QVERIFY(!m_make()->isOn());
 
     QVERIFY(QFile::rename(away, serviceFile));
     reloadBusConfiguration();
-    user->choose(true);
-    TRY_COMPARE(DconfTool::read(user->key()), user->stored(true));
-    QVERIFY(user->isOn());
+    QVERIFY(stores(true));
+    QVERIFY(m_user->isOn());
     takeFailedWrites();
-}
-
-void TestDconfFaults::everyOtherType_data()
-{
-    addUsers();
 }
 
 void TestDconfFaults::everyOtherType()
 {
-    QFETCH(MakeUser, make);
     const char *const values[] = {
         "true",
         "byte 0x7f",
@@ -494,33 +445,25 @@ void TestDconfFaults::everyOtherType()
         "[{'key': <('a', @mi 7)>}]",
         "{'key', <7>}",
     };
-    const auto user = make();
-    Change change(user->key());
+    Change change(m_user->key());
     for (const char *value : values) {
         load(allKeys, value);
         QVERIFY2(change.hasCome(), value);
         // Both what follows and what comes only now.
-        user->isOn();
-        make()->isOn();
+        m_user->isOn();
+        m_make()->isOn();
         LocationConfiguration().restoreCustomSettings();
     }
     reset();
     QVERIFY(change.hasCome());
     load({widgetsKey}, "@as []");
-    QVERIFY(user->key() != widgetsKey || change.hasCome());
-    user->choose(true);
-    TRY_COMPARE(DconfTool::read(user->key()), user->stored(true));
-    QVERIFY(user->isOn());
-}
-
-void TestDconfFaults::hugeLists_data()
-{
-    addUsers();
+    QVERIFY(m_user->key() != widgetsKey || change.hasCome());
+    QVERIFY(stores(true));
+    QVERIFY(m_user->isOn());
 }
 
 void TestDconfFaults::hugeLists()
 {
-    QFETCH(MakeUser, make);
     QByteArray list;
     QByteArray map;
     for (int i = 0; i < many; ++i) {
@@ -529,7 +472,6 @@ void TestDconfFaults::hugeLists()
         map += (i == 0 ? "{'entry" : ", 'entry") + number + "': <true>";
     }
     map += ", 'gps/enabled': <true>}";
-    const auto user = make();
     Change listChange(actionsKey);
     Change mapChange(customKey);
     load({actionsKey, widgetsKey, blockedKey}, list + ']');
@@ -538,8 +480,8 @@ void TestDconfFaults::hugeLists()
     QVERIFY(mapChange.hasCome());
     QCOMPARE(MGConfItem(actionsKey).value().toStringList().size(), many);
     QCOMPARE(MGConfItem(customKey).value().toMap().size(), many + 1);
-    QVERIFY(!user->isOn());
-    QVERIFY(!make()->isOn());
+    QVERIFY(!m_user->isOn());
+    QVERIFY(!m_make()->isOn());
     QCOMPARE(LocationConfiguration().gpsEnabled(), false);
     LocationConfiguration().restoreCustomSettings();
     QCOMPARE(LocationConfiguration().gpsEnabled(), true);
@@ -547,27 +489,19 @@ void TestDconfFaults::hugeLists()
 
     // A choice that replaces such a list takes as long as dconf takes to compare it with the new
     // one, which is not ours to shorten; so once it is gone.
-    Change keyChange(user->key());
+    Change keyChange(m_user->key());
     reset();
     QVERIFY(keyChange.hasCome());
-    if (user->key() == widgetsKey) {
+    if (m_user->key() == widgetsKey) {
         load({widgetsKey}, "@as []");
         QVERIFY(keyChange.hasCome());
     }
-    QVERIFY(!user->isOn());
-    user->choose(true);
-    TRY_COMPARE(DconfTool::read(user->key()), user->stored(true));
-}
-
-void TestDconfFaults::hugeDatabase_data()
-{
-    addUsers();
+    QVERIFY(!m_user->isOn());
+    QVERIFY(stores(true));
 }
 
 void TestDconfFaults::hugeDatabase()
 {
-    QFETCH(MakeUser, make);
-    const auto user = make();
     QByteArray file = "[other]\n";
     for (int i = 0; i < manyKeys; ++i) {
         file += "key" + QByteArray::number(i) + "=1\n";
@@ -575,24 +509,15 @@ void TestDconfFaults::hugeDatabase()
     // One change of many keys is told to everybody.
     DconfTool::run({QStringLiteral("load"), QStringLiteral("/")}, file);
     TRY_COMPARE(MGConfItem(QStringLiteral("/other/key%1").arg(manyKeys - 1)).value(), QVariant(1));
-    QVERIFY(!user->isOn());
-    user->choose(true);
-    TRY_COMPARE(DconfTool::read(user->key()), user->stored(true));
-    QVERIFY(user->isOn());
-    QVERIFY(make()->isOn());
-}
-
-void TestDconfFaults::tenThousandNotifications_data()
-{
-    addUsers();
+    QVERIFY(!m_user->isOn());
+    QVERIFY(stores(true));
+    QVERIFY(m_user->isOn());
+    QVERIFY(m_make()->isOn());
 }
 
 void TestDconfFaults::tenThousandNotifications()
 {
-    QFETCH(MakeUser, make);
-    const auto user = make();
-    user->choose(true);
-    TRY_COMPARE(DconfTool::read(user->key()), user->stored(true));
+    QVERIFY(stores(true));
     // As the service tells of a change, but there is none.
     QDBusConnection bus =
         QDBusConnection::connectToBus(QDBusConnection::SessionBus, QStringLiteral("notifications"));
@@ -600,12 +525,12 @@ void TestDconfFaults::tenThousandNotifications()
         QDBusMessage notify = QDBusMessage::createSignal(
             QStringLiteral("/ca/desrt/dconf/Writer/user"), QStringLiteral("ca.desrt.dconf.Writer"),
             QStringLiteral("Notify"));
-        notify.setArguments({user->key(), QStringList{QString()}, QStringLiteral("tag")});
+        notify.setArguments({m_user->key(), QStringList{QString()}, QStringLiteral("tag")});
         QVERIFY(bus.send(notify));
     }
     // And then there is.
-    load({user->key()}, user->stored(false));
-    TRY(!user->isOn());
+    load({m_user->key()}, m_user->stored(false));
+    TRY(!m_user->isOn());
     QDBusConnection::disconnectFromBus(QStringLiteral("notifications"));
 }
 

@@ -19,16 +19,16 @@ constexpr int maximumContainers = 1000000;
 bool isTooComplex(const QByteArray &json);
 
 /*
-    A definition file of events widgets: a value that is read once and needs no model.
+    The content of a definition file of events widgets: a value that needs no model.
 */
 struct EventsWidgetsFile {
-    QString translationCatalog; // Empty for none.
-    // In the order of the file. Which of them are enabled only a model can tell.
+    QString translationCatalog; // May be empty.
+    // In the order of the file. Only a model knows which ones are enabled.
     std::vector<EventsWidget> widgets;
 };
 
-// Nothing if the file cannot be read or is no definition. That, and every entry of the file that is
-// no widget, is logged as a warning; the entries beside it are read all the same.
+// Nothing if the file cannot be read or is not a definition file. This, and every entry that is not a
+// widget, is logged as a warning. The other entries are read.
 std::optional<EventsWidgetsFile> readEventsWidgetsFile(const QString &path);
 
 #endif

@@ -1,7 +1,7 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-// The checker beside the readers, on files that nobody would write.
+// Compares the checker with the readers on random files.
 
 #include "definitions-tool/definitionschecker.h"
 #include "definitions-tool/inilines.h"
@@ -84,7 +84,7 @@ QVector<QByteArray> corpus(const char *kind)
     return contents;
 }
 
-// Some bytes are taken out, put in or changed; mostly into those that mean something.
+// Removes, inserts or replaces some bytes, mostly with meaningful ones.
 QByteArray mutilated(QByteArray content, const QByteArray &meaningful, Random *random)
 {
     for (int changes = 1 + below(4, random); changes > 0; --changes) {
@@ -119,7 +119,7 @@ std::vector<Finding> check(const QString &path)
     return checker.findings();
 }
 
-// Everything that begins at a position, as the walker finds it.
+// The object or array at a position, as the walker reads it.
 QJsonValue walk(const QByteArray &text, int position)
 {
     JsonWalker walker(text, position);
@@ -152,7 +152,7 @@ int count(const std::vector<Finding> &findings, std::initializer_list<const char
 void TestAgreement::init()
 {
     LoggedTest::init();
-    // In memory: these are many files.
+    // In memory, because there are many files.
     m_directory = std::make_unique<QTemporaryDir>(QStringLiteral("/run/agreement-XXXXXX"));
 }
 
@@ -177,7 +177,7 @@ void TestAgreement::linesHaveTheKeysOfQSettings()
     const QVector<QByteArray> contents = corpus("quickaction");
     int compared = 0;
     for (int i = 0; i < 4000; ++i) {
-        // What else a percent sign begins, only QSettings knows.
+        // Only QSettings understands percent signs.
         const QByteArray content =
             mutilated(contents.at(below(contents.size(), &random)), "\n\r\\\"=;[] ,/#", &random)
                 .replace('%', 'x')
@@ -218,7 +218,7 @@ void TestAgreement::mutilatedQuickActions()
                                              "\n\r\\\"=;[] ,/#@%x1", &random);
         const QString path = write(content, "conf");
         const std::vector<Finding> findings = check(path);
-        // To the model it is a file that it has not seen yet.
+        // For the model, under another name.
         const QString another = write(content, "conf");
         const QuickAction action(another, false);
         const bool isRefused = !m_log->takeAll().isEmpty();
@@ -269,7 +269,7 @@ void TestAgreement::walkerReadsWhatQJsonDocumentReads()
     QVector<QByteArray> contents = corpus("eventswidgetsfile");
     contents.append(
         R"( { "a\"]" : [ -1.5e3 ,true, null,{ } , [ ] ,"\\" ] ,"\u0061": {"b\\":"}" }, "a":[{"":0}] } )");
-    // Of these, QJsonDocument makes halves of surrogate pairs, which equal nothing.
+    // QJsonDocument reads these as unpaired surrogates, which compare unequal.
     static const QRegularExpression escapedBytes(QStringLiteral("\\\\[\\x80-\\xff]"));
     Random random(5);
     int accepted = 0;
@@ -316,7 +316,7 @@ void TestAgreement::namesThatCanBeSent()
         if (isSent) {
             QTRY_VERIFY(receiver.error.isValid());
         }
-        // Nobody has the name.
+        // No service has the name.
         const bool arrived = receiver.error.type() == QDBusError::ServiceUnknown;
         (arrived ? sent : refused) += 1;
         m_log->takeAll();

@@ -1,8 +1,8 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-// Good and bad definition files: what the checker finds in each, to the line, and that it finds an
-// error exactly where the model makes something else of a file than what stands there.
+// Good and bad definition files: the checker finds what is expected, in the expected line, and finds an
+// error exactly if the model reads something else than what is written in the file.
 
 #include "definitions-tool/definitionschecker.h"
 #include "eventswidgets/eventswidgetsfile.h"
@@ -81,7 +81,7 @@ std::vector<Finding> check(const QString &path)
     return checker.findings();
 }
 
-// Looks at a copy: what QSettings has read under a name it does not read again.
+// Checks a copy, because QSettings caches the file of a name.
 bool hasErrors(const QString &path)
 {
     const QTemporaryDir directory;
@@ -93,8 +93,8 @@ bool hasErrors(const QString &path)
     });
 }
 
-// A file as somebody reads it who knows what an INI file is, but not what QSettings makes of one.
-// Values with a backslash, which only QSettings understands, are left out.
+// Reads a plain INI file, without the special rules of QSettings. Values with a backslash, which only
+// QSettings understands, are left out.
 struct Reading {
     QVector<QPair<QString, QString>> values; // of the keys outside sections, or in remote-arguments
     bool hasOtherLines = false;
@@ -141,7 +141,7 @@ Reading readPlainly(const QByteArray &content)
     return reading;
 }
 
-// What the model has for a key, as text; nothing for keys that it does not know.
+// The value of a key in the model, as text; nothing for keys that it does not know.
 std::optional<QString> modelText(const QuickActionsModel &model, const QuickAction &action,
                                  const QString &key)
 {
@@ -169,7 +169,7 @@ std::optional<QString> modelText(const QuickActionsModel &model, const QuickActi
         QStringLiteral("^remote-arguments/([1-9][0-9]*)\\\\argument$"));
     const QRegularExpressionMatch match = argument.match(key);
     if (match.hasMatch()) {
-        // A list goes out as a list of what stands there.
+        // A value with commas is sent as a list.
         return action.arguments()
             .value(match.captured(1).toInt() - 1)
             .toStringList()
@@ -178,7 +178,7 @@ std::optional<QString> modelText(const QuickActionsModel &model, const QuickActi
     return {};
 }
 
-// How often a member of one of the names stands in a text.
+// The number of members with these names in a text.
 int countMembers(const QString &text, const QStringList &names)
 {
     const QRegularExpression member(
@@ -228,7 +228,7 @@ void TestCorpus::findings()
     QVERIFY(QDir::setCurrent(file.path()));
     QString found;
     for (const Finding &finding : check(name)) {
-        // Every line of the expected findings begins with the number of a line.
+        // The expected findings begin with the line number.
         found += toText(finding).mid(name.size() + 1) + QLatin1Char('\n');
     }
     QCOMPARE(found, QString::fromUtf8(read(expectedFindings + name)));
@@ -272,7 +272,7 @@ void TestCorpus::agreesOnQuickActions()
         }
     }
 
-    // Nobody has the name: what can be sent at all comes back with just that error.
+    // No service has the name: every call that can be sent fails with this error.
     model.triggerAction(0);
     QString outcome;
     const auto isAnswered = [this, &outcome] {
@@ -354,7 +354,7 @@ void TestCorpus::agreesOnEventsWidgets()
             compare(written, "default_enabled", widget.defaultEnabled);
             compare(written, "available_path", widget.availablePath);
 
-            // The last widget of a path is the one that the model lists.
+            // The model lists the last widget of each path.
             const QModelIndex row =
                 model
                     .match(model.index(0), EventsWidgetsModel::PathRole, widget.path, 1,
@@ -394,7 +394,7 @@ void TestCorpus::examplesAreClean_data()
 
 void TestCorpus::examplesAreClean()
 {
-    // But for their catalog, which nobody has installed.
+    // Their catalogs are not installed.
     QFETCH(QString, path);
     for (const Finding &finding : check(path)) {
         QVERIFY2(finding.rule == QStringLiteral("catalog")

@@ -140,7 +140,7 @@ void TestMarloDefinitions::exitStatus()
     Files::write(QStringLiteral("lamp.conf"), content);
     QTEST(run("check lamp.conf").status, "status");
     QTEST(run("check lamp.conf --strict").status, "strictStatus");
-    // A file that is not there cannot be made up for.
+    // A missing file is a failure, whatever else is checked.
     const Result result = run("check lamp.conf missing.conf");
     QCOMPARE(result.status, 2);
     QCOMPARE(result.errors, QStringLiteral("marlo-definitions: there is no \"missing.conf\"\n"));
@@ -248,7 +248,7 @@ void TestMarloDefinitions::installedDefinitions()
 
 void TestMarloDefinitions::root()
 {
-    // Whatever the machine has does not count.
+    // What is installed on this machine is ignored.
     Files::installCatalog(QStringLiteral("atlas_eng_en"));
     Files::write(quickActions + QStringLiteral("bad.conf"), "x\n");
     Files::write(QStringLiteral("root/usr/share/glimmera/quickactions/lamp.conf"),
@@ -272,7 +272,7 @@ void TestMarloDefinitions::root()
         QStringLiteral("root/usr/share/glimmera/quickactions/lamp.conf:2: warning: the catalog "
                        "\"atlas\" does not hold the text \"Lamp\" [text-id]\n"));
 
-    // Named files are looked for where their names say.
+    // The root does not apply to named files.
     QVERIFY(QFile::copy(QStringLiteral("/usr/share/translations/maps_eng_en.qm"),
                         QStringLiteral("root/usr/share/translations/maps_eng_en.qm")));
     Files::write(QStringLiteral("other.conf"), goodAction);
@@ -281,7 +281,7 @@ void TestMarloDefinitions::root()
     QCOMPARE(named.output, QString());
 }
 
-// The catalogs of a package are not compiled yet where its sources are checked.
+// When sources are checked, their catalogs are not compiled yet.
 void TestMarloDefinitions::catalogsOfSources()
 {
     Files::removeCatalog(QStringLiteral("maps_eng_en"));
@@ -292,7 +292,7 @@ void TestMarloDefinitions::catalogsOfSources()
     QCOMPARE(run(line).output, QString());
     QCOMPARE(run(line).status, 0);
 
-    // Nor do installed ones count, which may be older.
+    // Installed catalogs, which may be older, are ignored, too.
     Files::installCatalog(QStringLiteral("maps_eng_en"));
     Files::write(QStringLiteral("lamp.conf"), goodAction + "[General]\ntitle=maps-new\n");
     QVERIFY(!run(line).output.contains(QStringLiteral("[text-id]")));
@@ -326,7 +326,7 @@ void TestMarloDefinitions::sameFileTwice()
 
 void TestMarloDefinitions::hostileNames()
 {
-    // A name must not forge a line of the report, nor write to a terminal what it likes.
+    // A name must neither forge a line of the report nor control a terminal.
     const QString name = QStringLiteral("a\nb.conf:1: note\u001b[2J ä.json");
     Files::write(name, "{");
     for (const char *locale : {"C.UTF-8", "C", "POSIX"}) {

@@ -88,7 +88,7 @@ Widget TestEventsWidgetsFile::readWidget(const QByteArray &members)
     return file ? file->widgets.at(0) : Widget();
 }
 
-// As MessageLog reports it.
+// In the form that MessageLog reports.
 QString TestEventsWidgetsFile::warning(const char *text) const
 {
     return QStringLiteral("warning [default] %1 \"%2\"").arg(QLatin1String(text), m_path);
@@ -173,7 +173,7 @@ void TestEventsWidgetsFile::wrongTypesReadAsAbsent()
     QCOMPARE(path->widgets.size(), size_t(isText ? 1 : 0));
     QCOMPARE(m_log->takeReport(), isText ? QString() : warning("Invalid widget defined in"));
 
-    // No array is an empty one; of an array, what is no widget is left out.
+    // Any other type reads as an empty array. Entries that are not widgets are left out.
     const auto widgets = read(R"({ "widgets": )" + value + "}");
     QVERIFY(widgets);
     QCOMPARE(widgets->widgets.size(), size_t(0));
@@ -360,7 +360,7 @@ void TestEventsWidgetsFile::notARegularFile_data()
 
 void TestEventsWidgetsFile::notARegularFile()
 {
-    // As if one took the place of a file that was listed.
+    // Something else replaced a file after it was listed.
     QFETCH(QString, kind);
     if (kind == QStringLiteral("pipe")) {
         Files::makePipe(m_path);
@@ -387,7 +387,7 @@ void TestEventsWidgetsFile::largeFile()
 
 void TestEventsWidgetsFile::tooLargeFile()
 {
-    // A file of holes, which takes no room and would take all memory.
+    // A sparse file, which takes no space on disk, but would take all memory.
     QFile file(m_path);
     QVERIFY(file.open(QIODevice::WriteOnly));
     file.write("{ \"widgets\": [] }");

@@ -10,14 +10,14 @@ import com.marlo.settings.system 1.0
 import gallery.simulation 1.0
 
 /*
-    The gallery: a start page that lists the pages, and a page for each of the module's types.
+    The gallery: a start page that lists the pages, and pages for all of the module's types.
 */
 ApplicationWindow {
     id: window
 
     readonly property alias pages: pages.list
     readonly property alias currentPage: stack.currentItem
-    // The item that has all that is shown in it, popups too.
+    // Contains everything that the window shows, including popups.
     readonly property Item surface: contentItem.parent
     property alias logOpen: log.open
     readonly property bool popupOpen: Overlay.overlay.visible
@@ -32,7 +32,12 @@ ApplicationWindow {
         return currentPage.page;
     }
 
-    function press(button) {
+    // The return key presses the control that has the focus, as the space bar does.
+    function pressFocused() {
+        const button = activeFocusItem;
+        if (!button || typeof button.clicked !== "function") {
+            return;
+        }
         if (button.checkable && !(button.autoExclusive && button.checked)) {
             button.toggle();
             button.toggled();
@@ -63,6 +68,8 @@ ApplicationWindow {
     header: ToolBar {
         // The window decides. A width that follows the title is a binding loop at times.
         contentWidth: 0
+        Keys.onReturnPressed: window.pressFocused()
+        Keys.onEnterPressed: window.pressFocused()
         Universal.theme: Universal.Dark
         background: Rectangle {
             color: window.Universal.accent
@@ -92,6 +99,8 @@ ApplicationWindow {
     ColumnLayout {
         anchors.fill: parent
         spacing: 0
+        Keys.onReturnPressed: window.pressFocused()
+        Keys.onEnterPressed: window.pressFocused()
 
         StackView {
             id: stack
@@ -108,13 +117,6 @@ ApplicationWindow {
             Layout.fillWidth: true
             open: window.width >= 900 && Messages.count > 0
         }
-    }
-
-    // The return key presses what has the focus, as the space bar does.
-    Shortcut {
-        sequences: ["Return", "Enter"]
-        enabled: window.activeFocusItem instanceof AbstractButton
-        onActivated: window.press(window.activeFocusItem)
     }
 
     Shortcut {

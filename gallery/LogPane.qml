@@ -7,7 +7,7 @@ import QtQuick.Layouts 1.15
 import gallery.simulation 1.0
 
 /*
-    What the module and QML report, as it comes: the latest in a line, or all of it.
+    The messages of the module and of QML: the latest one in a line, or all of them in a list.
 */
 Rectangle {
     id: pane
@@ -43,12 +43,12 @@ Rectangle {
                         font.pixelSize: 13
                     }
                     Label {
-                        // The whole of it is in the list.
+                        // The list shows the whole message.
                         readonly property bool mayBeCut: true
 
                         Layout.fillWidth: true
                         visible: !pane.open
-                        // Which file it comes from takes all the room.
+                        // The URL of the file would take all the room.
                         text: Messages.latest.replace(/^file:\S+ /, "")
                         textFormat: Text.PlainText
                         color: "#ffd180"

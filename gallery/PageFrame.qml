@@ -5,13 +5,13 @@ import QtQuick 2.15
 import QtQuick.Layouts 1.15
 
 /*
-    A page of pages/, unchanged, and the panel that simulates the device around it (the file of the same name in
-    simulations/): beside it where there is room, below it otherwise.
+    A page of pages/ and the panel that simulates the device around it, a file of simulations/. The panel
+    is next to the page if there is room, and below it otherwise.
 */
 ScrollingPage {
     id: frame
 
-    // Of Pages; another language brings another one.
+    // An entry of Pages. A change of the language replaces it.
     property var entry
     readonly property Item page: pageLoader.item
     readonly property Item simulation: simulationLoader.item

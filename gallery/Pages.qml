@@ -4,7 +4,7 @@
 import QtQml 2.15
 
 /*
-    The pages of the gallery. A new page is a file in pages/, one in simulations/, and an entry here.
+    The pages of the gallery. A new page needs a file in pages/, one in simulations/, and an entry here.
 */
 QtObject {
     readonly property var list: [

@@ -7,7 +7,7 @@ import QtQuick.Layouts 1.15
 import QtQuick.Window 2.15
 
 /*
-    A page that scrolls: by touch, by wheel, by the keys for it, and to whatever gets the focus.
+    A page that scrolls by touch, by wheel and by keys, and to the item that gets the focus.
 */
 Page {
     id: page
@@ -54,7 +54,11 @@ Page {
         boundsBehavior: Flickable.StopAtBounds
         clip: true
         focus: true
-        // Always to be seen where there is more than is on the screen.
+        // Qt starts at the header when Tab is pressed in an item that is not a tab stop itself.
+        activeFocusOnTab: true
+        Accessible.role: Accessible.Grouping
+        Accessible.name: page.title
+        // Always visible if the page is longer than the screen.
         ScrollBar.vertical: ScrollBar {
             width: 6
             policy: ScrollBar.AlwaysOn

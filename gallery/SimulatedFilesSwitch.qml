@@ -6,7 +6,7 @@ import gallery.simulation 1.0
 import "pages/controls"
 
 /*
-    Puts sample files away and brings them back.
+    Hides sample files and shows them again.
 */
 TextSwitch {
     property alias path: files.path

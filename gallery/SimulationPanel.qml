@@ -7,7 +7,7 @@ import QtQuick.Layouts 1.15
 import "pages/controls"
 
 /*
-    The panel of a simulation. It looks different from the page: nothing of it is for pages.
+    The panel of a simulation. It looks different from the page, to which it does not belong.
 */
 Pane {
     id: pane

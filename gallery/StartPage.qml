@@ -8,7 +8,7 @@ import QtQuick.Layouts 1.15
 import "pages/controls"
 
 /*
-    Lists the pages, with the type that each is of and what that is for.
+    Lists the pages, with the type that each of them shows and its purpose.
 */
 ScrollingPage {
     id: start
@@ -30,7 +30,6 @@ ScrollingPage {
             focusPolicy: Qt.StrongFocus
             text: modelData.title
             onClicked: start.opened(modelData)
-            Keys.onReturnPressed: clicked()
 
             padding: 12
             background: Card {

@@ -30,7 +30,7 @@ const QString udisksd = QStringLiteral("/usr/libexec/udisks2/udisksd");
 const QString loopControl = QStringLiteral("/dev/loop-control");
 const QString helper = QStringLiteral("/usr/libexec/sdcardhelper");
 // A helper that waits ends when the program that runs it has ended.
-// The disk service is told of a new file system before anybody asks it to mount that.
+// The disk service has to know of the new file system before it is asked to mount it.
 constexpr char helperScript[] = R"(#!/bin/sh
 set -eu
 while [ -e /usr/libexec/sdcardhelper-waits ]; do

@@ -4,12 +4,12 @@
 /*
     usage: gallery-with-card COMMAND [ARG]...
 
-    Runs a command with a real memory card at hand, where there can be one: a loop device that the
-    distribution's own disk service mounts. GALLERY_CARD is the name of the device then, and
-    GALLERY_CARD_NETWORK the network namespace that its disk service has to run in.
+    Runs a command with a real memory card if possible. The card is a loop device that the
+    distribution's own disk service mounts. GALLERY_CARD is then the name of the device, and
+    GALLERY_CARD_NETWORK the network namespace in which its disk service has to run.
 
-    A second process keeps the card. The kernel ends it with the command, however that ends, and with
-    it go the daemons, the mounts and the loop device.
+    A second process holds the card. However the command ends, the kernel ends this process, too, and
+    with it the daemons, the mounts and the loop device.
 */
 
 #include "simulator/realcard.h"
@@ -31,9 +31,9 @@
 
 namespace {
 
-[[noreturn]] void keepCard(pid_t command, int report, int argc, char **argv)
+[[noreturn]] void holdCard(pid_t command, int report, int argc, char **argv)
 {
-    // What cannot be had ends the program, which is no crash to look into.
+    // A missing prerequisite ends the process by abort(). Nobody needs a core dump of that.
     const rlimit noCore = {0, 0};
     setrlimit(RLIMIT_CORE, &noCore);
     prctl(PR_SET_PDEATHSIG, SIGKILL);
@@ -57,11 +57,11 @@ namespace {
 bool enterMounts(const QByteArray &process)
 {
     const int mounts = open((process + "/ns/mnt").constData(), O_RDONLY | O_CLOEXEC);
-    const int folder = open(".", O_PATH | O_DIRECTORY | O_CLOEXEC);
-    return mounts >= 0 && setns(mounts, CLONE_NEWNS) == 0 && fchdir(folder) == 0;
+    const int directory = open(".", O_PATH | O_DIRECTORY | O_CLOEXEC);
+    return mounts >= 0 && setns(mounts, CLONE_NEWNS) == 0 && fchdir(directory) == 0;
 }
 
-// Whether there is a card now.
+// Returns whether there is a card now.
 bool makeCard(int argc, char **argv)
 {
     const pid_t self = getpid();
@@ -69,17 +69,17 @@ bool makeCard(int argc, char **argv)
     if (pipe2(report.data(), O_CLOEXEC) != 0) {
         return false;
     }
-    const pid_t keeper = fork();
-    if (keeper == 0) {
+    const pid_t holder = fork();
+    if (holder == 0) {
         close(report[0]);
-        keepCard(self, report[1], argc, argv);
+        holdCard(self, report[1], argc, argv);
     }
     close(report[1]);
     std::array<char, 64> name = {};
     const ssize_t size = read(report[0], name.data(), name.size() - 1);
     close(report[0]);
-    const QByteArray process = "/proc/" + QByteArray::number(keeper);
-    if (keeper < 0 || size <= 0 || !enterMounts(process)) {
+    const QByteArray process = "/proc/" + QByteArray::number(holder);
+    if (holder < 0 || size <= 0 || !enterMounts(process)) {
         return false;
     }
     qputenv("GALLERY_CARD", name.data());

@@ -6,7 +6,7 @@ import com.marlo.settings.system 1.0
 import "controls"
 
 /*
-    Whether there are folders of Android applications to be shown.
+    Whether to show the data directories of Android applications.
 */
 GalleryPage {
     AndroidSupport {

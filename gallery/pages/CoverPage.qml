@@ -6,7 +6,7 @@ import com.marlo.settings.system 1.0
 import "controls"
 
 /*
-    The smart back cover, as the cover daemon tells of it.
+    The smart back cover, as the cover daemon reports it.
 */
 GalleryPage {
     KivInfo {

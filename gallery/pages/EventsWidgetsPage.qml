@@ -41,7 +41,7 @@ GalleryPage {
             text: list.count === 0 ? qsTrId("gallery-events-widgets-none")
                                    : qsTrId("gallery-events-widgets-first-choice")
         }
-        // Nobody else tells the model that what a widget needs has come or gone.
+        // The model does not watch the paths that make widgets available.
         Button {
             text: qsTrId("gallery-events-widgets-check")
             onClicked: widgets.updateAvailable()

@@ -8,11 +8,11 @@ import com.marlo.settings.system 1.0
 import "controls"
 
 /*
-    The location services: their switches, a set of them that is saved and restored, and the terms
-    that the user agrees to before an online service can be switched.
+    The location services: their switches, saving and restoring the switches, and the terms that the user
+    agrees to before an online service can be switched.
 */
 GalleryPage {
-    // By their numbers, since platforms have different names for them.
+    // The numbers of the states. Platforms have different names for them.
     enum OnlineState { NotAgreed, Disabled, Enabled }
 
     readonly property bool mlsAgreed: location.mlsOnlineState !== LocationPage.OnlineState.NotAgreed

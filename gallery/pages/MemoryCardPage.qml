@@ -13,7 +13,7 @@ import "controls"
 GalleryPage {
     id: page
 
-    // The kernel's name of the card, empty while there is none.
+    // The kernel's name of the card. Empty without a card.
     property string cardName
     readonly property bool running: operation.active
     property string fileSystem
@@ -231,7 +231,7 @@ GalleryPage {
                 text: (index + 1) + ". " + stepText(model.status)
             }
         }
-        // Of as many steps as the operation has, so that it does not only show that something goes on.
+        // Shows how many steps of the operation have begun.
         ProgressBar {
             Layout.fillWidth: true
             visible: page.running

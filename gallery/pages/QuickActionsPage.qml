@@ -8,7 +8,7 @@ import "controls"
 import "controls/display.js" as Display
 
 /*
-    The quick actions as a home screen shows them: the enabled ones, in the user's order.
+    The enabled quick actions in the user's order, as a home screen shows them.
 */
 GalleryPage {
     QuickActionsModel {

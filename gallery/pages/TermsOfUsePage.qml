@@ -8,19 +8,19 @@ import com.marlo.settings.system 1.0
 import "controls"
 
 /*
-    The terms of use of the platform and of the vendor, in a language that can be chosen.
+    The terms of use of the platform and of the vendor, in a language that the user chooses.
 */
 GalleryPage {
     readonly property var localeNames: ["en_GB", "fi_FI.UTF-8", "de_DE.UTF-8"]
     readonly property string language: Qt.locale().name.substring(0, 2)
     property string localeName: localeNames.find(name => name.startsWith(language)) || "en_GB"
 
-    // Each a title and a body, or nothing.
+    // Each is a list of a title and a body, or an empty list.
     readonly property var platformTerms: manager.platformTermsOfUse(localeName)
     readonly property var vendorSummary: vendorTermsOf(() => manager.vendorTermsSummary(localeName))
     readonly property var vendorTerms: vendorTermsOf(() => manager.vendorTermsOfUse(localeName))
 
-    // A device whose vendor has none does not look for them.
+    // Without vendor terms, reading them would only log warnings.
     function vendorTermsOf(read) {
         return manager.hasVendorTermsOfUse ? read() : [];
     }

@@ -6,7 +6,7 @@ import com.marlo.settings.system 1.0
 import "controls"
 
 /*
-    A text file, and the files of a folder as one text.
+    A text file, and the files of a directory joined into one text.
 */
 GalleryPage {
     readonly property string about: TextFileReader.readContent("/usr/share/marlo-settings/about.html")

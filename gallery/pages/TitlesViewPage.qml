@@ -7,7 +7,7 @@ import "controls"
 import "controls/display.js" as Display
 
 /*
-    Sentences of the titles of what is enabled, which follow the switches.
+    Sentences that join the titles of the enabled rows. They follow the switches.
 */
 GalleryPage {
     EventsWidgetsModel {

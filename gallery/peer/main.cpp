@@ -1,8 +1,8 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-// A sample service, started by the session bus: answers every call and tells the gallery of it.
-// While the file /usr/libexec/gallery-services-fail is there it answers with an error.
+// A sample service that the session bus starts. It answers every call and reports it to the gallery.
+// While the file /usr/libexec/gallery-services-fail exists, it answers with an error.
 //
 // usage: gallery-peer SERVICE
 
@@ -14,7 +14,7 @@
 
 namespace {
 
-// One text for each argument; those of a list are joined.
+// One text for each argument. The texts of a list are joined.
 QStringList texts(const QVariantList &arguments)
 {
     QStringList result;
@@ -61,7 +61,7 @@ int main(int argc, char *argv[])
         signal.setArguments({name, call.member(), texts(call.arguments())});
         bus.send(signal);
     });
-    // Nobody else ends it: a service goes with its bus.
+    // The service ends with its bus. Nothing else ends it.
     bus.connect(QString(), QStringLiteral("/org/freedesktop/DBus/Local"),
                 QStringLiteral("org.freedesktop.DBus.Local"), QStringLiteral("Disconnected"),
                 QCoreApplication::instance(), SLOT(quit()));

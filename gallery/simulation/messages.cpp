@@ -11,9 +11,9 @@
 
 namespace {
 
-constexpr int most = 200;
+constexpr int maxCount = 200;
 
-// A message handler is a plain function and messages come from any thread.
+// A message handler is a plain function, and any thread may log.
 std::mutex mutex;
 Messages *receiver = nullptr;
 QtMessageHandler previousHandler = nullptr;
@@ -43,7 +43,7 @@ Messages::~Messages()
 {
     const std::lock_guard<std::mutex> lock(mutex);
     receiver = nullptr;
-    // Somebody may have come later, and be still there.
+    // Another handler may have been installed since then. It stays.
     const QtMessageHandler current = qInstallMessageHandler(previousHandler);
     if (current != pass) {
         qInstallMessageHandler(current);
@@ -79,7 +79,7 @@ QHash<int, QByteArray> Messages::roleNames() const
 
 void Messages::add(const QString &text)
 {
-    if (m_texts.size() == most) {
+    if (m_texts.size() == maxCount) {
         beginRemoveRows({}, 0, 0);
         m_texts.removeFirst();
         endRemoveRows();

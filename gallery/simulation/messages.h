@@ -8,8 +8,8 @@
 #include <QStringList>
 
 /*
-    What this process logs, but for debug messages: the oldest first, and not for ever. Whoever has
-    taken the messages before still gets them.
+    The latest messages of this process except debug messages, the oldest first. The message handler that
+    was installed before still gets every message.
 */
 class Messages : public QAbstractListModel
 {
@@ -30,7 +30,7 @@ public:
     QVariant data(const QModelIndex &index, int role) const override;
     QHash<int, QByteArray> roleNames() const override;
 
-    // From the message handler, in the thread of this object.
+    // Called by the message handler, in the thread of this object.
     Q_INVOKABLE void add(const QString &text);
 
 Q_SIGNALS:

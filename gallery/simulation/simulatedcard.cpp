@@ -36,7 +36,7 @@ SimulatedCard::SimulatedCard(QObject *parent)
             &SimulatedCard::contentChanged);
     m_mounts.setFileName(QStringLiteral("/proc/self/mounts"));
     if (m_mounts.open(QIODevice::ReadOnly | QIODevice::Unbuffered)) {
-        // The table is always there to be read; it is its changes that are exceptional.
+        // The table is always readable. The kernel reports its changes as exceptional conditions.
         m_mountsNotifier =
             std::make_unique<QSocketNotifier>(m_mounts.handle(), QSocketNotifier::Exception);
         connect(m_mountsNotifier.get(), &QSocketNotifier::activated, this,
@@ -79,7 +79,7 @@ void SimulatedCard::setDiskService(DiskService diskService)
     if (diskService == m_diskService) {
         return;
     }
-    // A real one goes only if somebody takes its place.
+    // A real disk service ends only when another one takes its name.
     const bool replaces = m_real && m_diskService == Working;
     m_diskService = diskService;
     m_simulated.reset();
@@ -106,11 +106,11 @@ bool SimulatedCard::isReady() const
 
 void SimulatedCard::fill()
 {
-    for (const char *folder : {"Music", "Pictures", "Pictures/Summer"}) {
-        QDir(m_directory).mkpath(QLatin1String(folder));
+    for (const char *directory : {"Music", "Pictures", "Pictures/Summer"}) {
+        QDir(m_directory).mkpath(QLatin1String(directory));
         for (int i = 1; i <= 5; ++i) {
             QFile file(
-                QStringLiteral("%1/%2/%3.txt").arg(m_directory, QLatin1String(folder)).arg(i));
+                QStringLiteral("%1/%2/%3.txt").arg(m_directory, QLatin1String(directory)).arg(i));
             if (!isMounted() || !file.open(QIODevice::WriteOnly)) {
                 qmlWarning(this) << file.fileName() << ": " << file.errorString();
                 return;
@@ -138,11 +138,12 @@ void SimulatedCard::startDiskService()
     m_daemon = std::make_unique<QProcess>();
     m_daemon->setStandardOutputFile(QProcess::nullDevice());
     m_daemon->setStandardErrorFile(QProcess::nullDevice());
-    // A sanitizer that is loaded into this process is not for the daemon.
+    // The daemon must not load the sanitizer of this process.
     QProcessEnvironment environment = QProcessEnvironment::systemEnvironment();
     environment.remove(QStringLiteral("LD_PRELOAD"));
     m_daemon->setProcessEnvironment(environment);
-    // It hears of devices from the device manager of the card, and goes with this process.
+    // It runs in the network namespace of the device manager, which reports devices to it, and ends with
+    // this process.
     m_daemon->start(QStringLiteral("nsenter"),
                     {QStringLiteral("--net=") + qEnvironmentVariable("GALLERY_CARD_NETWORK"),
                      QStringLiteral("setpriv"), QStringLiteral("--pdeathsig"),

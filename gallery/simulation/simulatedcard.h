@@ -16,8 +16,8 @@
 #include <memory>
 
 /*
-    The memory card of the gallery, and its disk service: real ones where gallery-with-card has made
-    them, a name and a simulated service otherwise.
+    The memory card of the gallery and its disk service. Both are real if gallery-with-card has made a
+    card. Otherwise the card is only a name, and the service is simulated.
 */
 class SimulatedCard : public QObject
 {
@@ -27,13 +27,13 @@ class SimulatedCard : public QObject
     Q_PROPERTY(bool real READ isReal CONSTANT)
     Q_PROPERTY(bool inserted MEMBER m_inserted NOTIFY insertedChanged)
     Q_PROPERTY(bool mounted READ isMounted NOTIFY contentChanged)
-    // How many entries the card has while it is mounted.
+    // The number of entries in the top directory of the mounted card.
     Q_PROPERTY(int fileCount READ fileCount NOTIFY contentChanged)
-    // Whether a program has a file on the card open, which keeps it from being unmounted.
+    // Whether a program has a file on the card open. The card cannot be unmounted then.
     Q_PROPERTY(bool inUse READ isInUse WRITE setInUse NOTIFY inUseChanged)
     Q_PROPERTY(
         DiskService diskService READ diskService WRITE setDiskService NOTIFY diskServiceChanged)
-    // Whether a working disk service has come up.
+    // Whether a working disk service is on the bus.
     Q_PROPERTY(bool ready READ isReady NOTIFY readyChanged)
 
 public:
@@ -53,7 +53,7 @@ public:
     DiskService diskService() const { return m_diskService; }
     void setDiskService(DiskService diskService);
     bool isReady() const;
-    // Some folders and files.
+    // Creates some directories and files.
     Q_INVOKABLE void fill();
 
 Q_SIGNALS:

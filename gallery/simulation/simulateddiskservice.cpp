@@ -22,7 +22,7 @@ const QLatin1String errorPrefix("org.freedesktop.UDisks2.Error.");
 
 QDBusMessage errorReply(const QDBusMessage &call, const char *name)
 {
-    return call.createErrorReply(errorPrefix + QLatin1String(name), QStringLiteral("as told"));
+    return call.createErrorReply(errorPrefix + QLatin1String(name), QStringLiteral("simulated"));
 }
 
 } // namespace
@@ -32,7 +32,7 @@ SimulatedDiskService::SimulatedDiskService(Manner manner, const QString &deviceP
       m_connection(QDBusConnection::connectToBus(QDBusConnection::SystemBus,
                                                  QStringLiteral("simulated disk service")))
 {
-    // The real one lets itself be replaced, and ends then.
+    // A real disk service allows that it is replaced, and ends then.
     if (!m_connection.registerVirtualObject(QStringLiteral("/"), this, QDBusConnection::SubPath)
         || !m_connection.interface()->registerService(
             service, QDBusConnectionInterface::ReplaceExistingService)) {
@@ -43,7 +43,7 @@ SimulatedDiskService::SimulatedDiskService(Manner manner, const QString &deviceP
 SimulatedDiskService::~SimulatedDiskService()
 {
     m_connection.unregisterObject(QStringLiteral("/"), QDBusConnection::UnregisterTree);
-    // A real one that came before the name is free would give up.
+    // A real disk service that starts before the name is free would end.
     m_connection.interface()->unregisterService(service);
     QDBusConnection::disconnectFromBus(m_connection.name());
 }

@@ -11,8 +11,8 @@
 #include <QString>
 
 /*
-    The disk service for as long as this lives, in place of a real one, on a connection of its own.
-    What it mounts as the card is a file system in memory, whose files go when it is unmounted.
+    Simulates the disk service while the object exists, and replaces a real one. It has a bus connection
+    of its own. The card that it mounts is a file system in memory: unmounting removes its files.
 */
 class SimulatedDiskService : public QDBusVirtualObject
 {
@@ -22,7 +22,7 @@ public:
     enum class Manner { Working, Forbidding, Silent };
 
     SimulatedDiskService(Manner manner, const QString &devicePath);
-    // With calls left unanswered, their callers learn that it has gone.
+    // The callers of unanswered calls get an error.
     ~SimulatedDiskService() override;
     Q_DISABLE_COPY_MOVE(SimulatedDiskService)
 

@@ -9,7 +9,7 @@
 
 namespace {
 
-// Before the names of files that are put away: nobody looks at hidden files.
+// The prefix of files that are hidden. The module does not read hidden files.
 const QString hidden = QStringLiteral(".away-");
 
 } // namespace

@@ -10,14 +10,14 @@
 #include <QString>
 
 /*
-    Sample files that can be put away and brought back, as when a package is removed and installed.
+    Sample files that can be hidden and shown again, as if a package was removed and installed.
 */
 class SimulatedFiles : public QObject
 {
     Q_OBJECT
-    // A file or a folder; its name may have wildcards, and is then that of several.
+    // A file or a directory. Wildcards in its name select several.
     Q_PROPERTY(QString path MEMBER m_path NOTIFY presentChanged)
-    // Of a file that is no sample: it is made and removed.
+    // If set, the file is not a sample: it is created with this content, and removed.
     Q_PROPERTY(QString content MEMBER m_content)
     Q_PROPERTY(bool present READ isPresent WRITE setPresent NOTIFY presentChanged)
 

@@ -20,11 +20,11 @@ const QLatin1String peerPath("/");
 const QLatin1String peerInterface("com.marlo.settings.gallery.Peer");
 const QLatin1String peerSignal("CallReceived");
 
-// Texts that are there in English are in British English.
+// The English sample texts are in British English.
 const QLatin1String english("en");
 const QString britishEnglish = QStringLiteral("en_GB");
 
-// What the cover daemon tells of.
+// The interface of the cover daemon.
 const QString coverService = QStringLiteral("com.marlo.kivd");
 const QString coverIdProperty = QStringLiteral("KIVID");
 const QString coverReadyProperty = QStringLiteral("Ready");
@@ -43,11 +43,11 @@ Simulation::Simulation(QQmlEngine *engine)
         qmlWarning(this) << "no session bus: received calls will not be shown";
     }
     new LanguageForwarder(engine);
-    // Of no country yet.
+    // The locale has no country until now.
     QLocale::setDefault(QLocale(britishEnglish));
-    // QtDBus may lose a signal that follows too soon on a new owner of the daemon's name.
+    // QtDBus may lose a signal that is sent right after the daemon's name gets a new owner.
     connect(&m_coverDaemonWatcher, &QDBusServiceWatcher::serviceRegistered, this,
-            &Simulation::tellOfCover);
+            &Simulation::announceCover);
     startCoverDaemon();
 }
 
@@ -79,7 +79,7 @@ void Simulation::setCover(Cover cover)
     } else if (m_coverDaemon == nullptr) {
         startCoverDaemon();
     } else {
-        tellOfCover();
+        announceCover();
     }
     Q_EMIT coverChanged();
 }
@@ -87,10 +87,10 @@ void Simulation::setCover(Cover cover)
 void Simulation::startCoverDaemon()
 {
     m_coverDaemon = std::make_unique<CoverDaemon>();
-    tellOfCover();
+    announceCover();
 }
 
-void Simulation::tellOfCover()
+void Simulation::announceCover()
 {
     if (m_coverDaemon == nullptr) {
         return;

@@ -16,8 +16,8 @@ class QQmlEngine;
 class QQmlError;
 
 /*
-    Simulates the device around the gallery's pages: changes the language as a home screen does, tells
-    which calls the sample services on the session bus receive, and has a smart back cover.
+    Simulates the device around the gallery's pages. It changes the language as a home screen does,
+    reports the calls that the sample services on the session bus receive, and has a smart back cover.
 */
 class Simulation : public QObject
 {
@@ -41,15 +41,15 @@ Q_SIGNALS:
     void languageChanged();
     void coverChanged();
     void callReceived(const QString &service, const QString &method, const QStringList &arguments);
-    // A mistake in QML. What an object of a module reports for information is none.
+    // A warning of the QML engine, such as a mistake in a binding.
     void warning(const QString &text);
 
 private:
     void startCoverDaemon();
-    void tellOfCover();
+    void announceCover();
     void reportWarnings(const QList<QQmlError> &errors);
 
-    // The pages meet it on the system bus alone.
+    // The pages reach it only through the system bus.
     std::unique_ptr<CoverDaemon> m_coverDaemon;
     QDBusServiceWatcher m_coverDaemonWatcher;
     Cover m_cover = NoCover;

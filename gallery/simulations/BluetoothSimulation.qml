@@ -7,7 +7,7 @@ import ".."
 import "../pages/controls"
 
 /*
-    The file that the platform keeps the address in.
+    The file in which the platform stores the address.
 */
 ColumnLayout {
     spacing: 8

@@ -7,7 +7,7 @@ import ".."
 import "../pages/controls"
 
 /*
-    The packages that offer widgets, and what one of them needs.
+    The packages that offer widgets, and the program that one widget needs.
 */
 ColumnLayout {
     spacing: 8

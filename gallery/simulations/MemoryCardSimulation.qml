@@ -9,7 +9,7 @@ import ".."
 import "../pages/controls"
 
 /*
-    The card, its disk service and the program that formats.
+    The card, its disk service and the helper program.
 */
 ColumnLayout {
     spacing: 8

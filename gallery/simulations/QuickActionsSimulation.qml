@@ -8,7 +8,7 @@ import ".."
 import "../pages/controls"
 
 /*
-    The packages that offer quick actions, and the services that these call.
+    The packages that offer quick actions, and the services that the actions call.
 */
 ColumnLayout {
     spacing: 8

@@ -7,7 +7,7 @@ import ".."
 import "../pages/controls"
 
 /*
-    The file and the folder.
+    The file and the directory.
 */
 ColumnLayout {
     spacing: 8

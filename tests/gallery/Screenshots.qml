@@ -9,17 +9,17 @@ import "screen.js" as Screen
 /*
     Takes screenshots of every page in each of its states, without a display:
 
-        QT_QPA_PLATFORM=offscreen QT_QUICK_BACKEND=software qml Screenshots.qml -- FOLDER
+        QT_QPA_PLATFORM=offscreen QT_QUICK_BACKEND=software qml Screenshots.qml -- DIRECTORY
 
-    A page that is longer than the screen is taken in several. Prints a line for each state and ends
-    with status 0, or at the first problem with another and a line that names it: a page that does
-    not load, a state that is not reached, any warning of QML, a text without translation, that is
-    cut off or overlaps another, an image that cannot be saved.
+    A page that is longer than the screen takes several screenshots. The program prints a line for each
+    state. It ends with status 0, or at the first problem with another status and a line that names the
+    problem: a page that does not load, a state that is not reached, any warning of QML, a text without
+    translation, a text that is cut off or overlaps another, an image that cannot be saved.
 */
 Gallery {
     id: gallery
 
-    readonly property string folder: Qt.application.arguments[Qt.application.arguments.length - 1]
+    readonly property string directory: Qt.application.arguments[Qt.application.arguments.length - 1]
     // Every page is shown in each view. A state is reached and shown in English; in Finnish only its
     // layout is checked.
     readonly property var views: [
@@ -27,7 +27,7 @@ Gallery {
         { language: "en", width: 1280, height: 800 },
         { language: "fi", width: 360, height: 640 },
     ]
-    // What a user does, each step until it is true.
+    // The steps of a user. A step is repeated until it returns true.
     readonly property var shots: [
         { page: "start" },
 
@@ -138,7 +138,8 @@ Gallery {
             () => simulate(qsTrId("gallery-card-helper")),
             () => press(qsTrId("gallery-simulation-reload")),
             () => shows(qsTrId("gallery-card-probing-failed"))] },
-        // The last: the helper goes on when its page has gone, and nothing may mount the card then.
+        // The last state of the card: the helper program outlives the page, and meanwhile no other page
+        // may mount the card.
         { page: "memory-card", state: "busy", moving: true, steps: [
             () => probed(),
             () => SimulatedCard.mounted || press(qsTrId("gallery-card-mount")),
@@ -198,7 +199,7 @@ Gallery {
         { page: "text-files", steps: [() => !shows(qsTrId("gallery-text-files-none"))] },
         { page: "text-files", state: "none", steps: [
             () => simulate(qsTrId("gallery-text-files-file-installed")),
-            () => simulate(qsTrId("gallery-text-files-folder-installed")),
+            () => simulate(qsTrId("gallery-text-files-directory-installed")),
             () => press(qsTrId("gallery-simulation-reload")),
             () => shows(qsTrId("gallery-text-files-none"))] },
     ]
@@ -232,7 +233,7 @@ Gallery {
         return true;
     }
 
-    // Presses a switch that is pressed again when the screenshot is taken.
+    // Presses a switch. It is pressed again after the screenshot.
     function simulate(text) {
         if (!press(text)) {
             return false;
@@ -295,7 +296,7 @@ Gallery {
         step = 0;
     }
 
-    // As it is now.
+    // Shows the page in its present state.
     function present() {
         const shown = views[view];
         Simulation.language = shown.language;
@@ -311,7 +312,7 @@ Gallery {
         const untranslated = Screen.untranslated(surface);
         const flaw = untranslated ? "no translation of " + untranslated : Screen.flaw(surface);
         if (flaw) {
-            // What has just changed may be about to be laid out.
+            // The layout may not be up to date yet.
             if (++looks === enoughLooks) {
                 fail(flaw);
             }
@@ -327,8 +328,8 @@ Gallery {
         const name = [shots[shot].page, shots[shot].state, shown.width + "x" + shown.height,
                       shown.language, part ? part + 1 : ""].filter(word => word).join("-") + ".png";
         const begun = surface.grabToImage(result => {
-            if (!result.saveToFile(folder + "/" + name)) {
-                fail("cannot save " + folder + "/" + name);
+            if (!result.saveToFile(directory + "/" + name)) {
+                fail("cannot save " + directory + "/" + name);
                 return;
             }
             files.push(name);
@@ -361,7 +362,7 @@ Gallery {
     }
 
     Component.onCompleted: nextShot()
-    // While anything moves there are new frames: an image is taken when nothing does any more.
+    // Moving items cause new frames. The screenshot is taken when there are none.
     onFrameSwapped: {
         if (step === (shots[shot].steps || []).length && !shots[shot].moving) {
             still.restart();

@@ -2,9 +2,9 @@
 // SPDX-License-Identifier: BSD-3-Clause
 .pragma library
 
-// What is on the screen, for tests and screenshots: `root` is the item that has all of it.
+// Finds what is on the screen, for tests and screenshots. `root` is the item that contains all of it.
 
-// Of an item and all below it that can be seen, in the order in which they are drawn.
+// Returns an item and all its visible descendants, in the order in which they are drawn.
 function visibleItems(item, found) {
     found = found || [];
     if (item.visible && item.opacity > 0) {
@@ -24,13 +24,13 @@ function texts(root) {
     return visibleItems(root).filter(item => isText(item) && item.text);
 }
 
-// Buttons, switches and the like by their text; the one on top of others.
+// Returns the button, switch or the like with a text. If there are several, the topmost one.
 function control(root, text) {
     return visibleItems(root).reverse().find(item => item.text === text
                                                      && typeof item.clicked === "function");
 }
 
-// The part of an item that nothing clips.
+// Returns the part of an item that is not clipped.
 function seenPart(root, item) {
     let seen = item.mapToItem(root, 0, 0, item.width, item.height);
     for (let clip = item; clip && clip !== root.parent; clip = clip.parent) {
@@ -45,7 +45,7 @@ function seenPart(root, item) {
     return seen;
 }
 
-// What is wrong with the layout; empty if nothing is.
+// Returns the first mistake in the layout, or an empty text.
 function flaw(root) {
     const all = texts(root);
     for (const text of all) {
@@ -76,7 +76,7 @@ function flaw(root) {
     return "";
 }
 
-// Popups lie over the rest.
+// Returns whether an item belongs to a popup. Popups cover other items.
 function inPopup(root, item) {
     while (item && item.parent !== root) {
         item = item.parent;
@@ -84,7 +84,7 @@ function inPopup(root, item) {
     return item !== null && /Overlay/.test(item.toString());
 }
 
-// A text that the catalogs lack shows as its identifier.
+// Returns a text without translation, which shows as its identifier, or an empty text.
 function untranslated(root) {
     const text = texts(root).find(item => /^(gallery|settings_location)-/.test(item.text));
     return text ? text.text : "";

@@ -7,8 +7,8 @@ import gallery.simulation 1.0
 import "../../gallery"
 import "screen.js" as Screen
 
-// Every page of the gallery, driven with the pointer and the keys as a person would, who looks at
-// the screen for what comes of it.
+// Drives every page of the gallery with the pointer and the keys, and looks at the screen for the
+// results.
 TestCase {
     id: test
 
@@ -48,7 +48,7 @@ TestCase {
         compare(root.takeMessages(), []);
     }
 
-    // As tryVerify(), but not with a rest of 50 ms between two looks.
+    // As tryVerify(), but with shorter pauses than 50 ms.
     function until(condition, otherwise) {
         const end = Date.now() + patience;
         while (!condition()) {
@@ -57,14 +57,14 @@ TestCase {
         }
     }
 
-    // The part of the screen that a finger would be put on.
+    // The place on the screen where a finger would touch an item.
     function place(item) {
         const part = Screen.seenPart(surface, item);
         return part.width > 4 && part.height > 4
             ? { x: part.x + part.width / 2, y: part.y + part.height / 2 } : null;
     }
 
-    // What moves is not to be hit.
+    // A moving item cannot be hit.
     function waitUntilStill(item) {
         let before = null;
         until(() => {
@@ -76,7 +76,7 @@ TestCase {
         }, "does not stand still: " + item.text);
     }
 
-    // With the keys for it, until an item can be touched.
+    // Scrolls with the page keys until an item can be touched.
     function scrollTo(item) {
         const page = gallery.currentPage;
         const inPage = () => Screen.seenPart(surface, item).height >= Math.min(item.height, 40);
@@ -130,7 +130,7 @@ TestCase {
         tryCompare(findControl(text), "checked", checked, patience);
     }
 
-    // From the start page, as one gets there.
+    // Opens a page from the start page.
     function openPage(name) {
         const page = gallery.pages.find(page => page.name === name);
         tap(page.title);
@@ -143,7 +143,7 @@ TestCase {
         see("Settings gallery");
     }
 
-    // The messages that the pages have led to, which are in the log of the gallery too.
+    // Expects messages that contain these texts. The log of the gallery has them, too.
     function expectMessages(parts) {
         const messages = [];
         until(() => {
@@ -157,7 +157,7 @@ TestCase {
         see(latest.replace(/^file:\S+ /, ""));
     }
 
-    function test_startPageTellsOfEachPage() {
+    function test_startPageListsEachPage() {
         compare(gallery.pages.map(page => page.name), pages);
         gallery.pages.forEach(page => {
             see(page.title);
@@ -186,11 +186,11 @@ TestCase {
                 verify(page.height >= 200, "the page has no room");
             }
         }
-        // Terms that lack the language.
+        // Some terms are not available in each language.
         root.takeMessages();
     }
 
-    // Tab goes through everything there is on a page, and the page goes along.
+    // Tab reaches every control of a page, and the page scrolls along.
     function test_everyPageIsUsedByKeys_data() {
         return pages.map(name => ({ tag: name }));
     }
@@ -198,6 +198,8 @@ TestCase {
     function test_everyPageIsUsedByKeys(data) {
         const entry = gallery.pages.findIndex(page => page.name === data.tag);
         const focused = () => gallery.activeFocusItem;
+        keyClick(Qt.Key_Tab);
+        compare(focused().text, gallery.pages[0].title);
         for (let i = 0; i < 20 && focused().text !== gallery.pages[entry].title; ++i) {
             keyClick(Qt.Key_Tab);
         }
@@ -241,7 +243,7 @@ TestCase {
         findControl("Weather").forceActiveFocus(Qt.TabFocusReason);
         keyClick(Qt.Key_Space);
         seeSwitch("Weather", false);
-        keyClick(Qt.Key_Space);
+        keyClick(Qt.Key_Return);
         seeSwitch("Weather", true);
     }
 
@@ -280,7 +282,7 @@ TestCase {
         see("com.marlo.camera");
         tap("Torch");
         see("toggle(\"bright\")".replace("\"bright\"", ""));
-        // Nobody has its service: the store is asked.
+        // No service has this name, so the store is asked.
         tap("Navigate home");
         see("showApp(\"marlo-maps\")");
         see("com.marlo.marlostore");
@@ -337,7 +339,7 @@ TestCase {
         until(() => root.key("/desktop/glimmera-marlo-home/events_screen_actions")[2]
                     === "/usr/share/glimmera/quickactions/camera.conf", "kept");
 
-        // And back by keys.
+        // And back with keys.
         Screen.visibleItems(list.contentItem).find(item => item.text === "Take a photo"
                                                            && item.forceActiveFocus)
               .forceActiveFocus(Qt.TabFocusReason);
@@ -353,7 +355,7 @@ TestCase {
             item => item.text === "New note" && item.checkable));
         until(() => rowsOf(list).join() === before.join(), "disabled");
 
-        // One that has nothing to show is shown by its path.
+        // An action without a title is shown with the name of its file.
         tap("An empty definition file is there");
         see("empty.conf");
         tap("An empty definition file is there");
@@ -429,7 +431,7 @@ TestCase {
         see("Ready");
         expectMessages(["AlreadyMounted"]);
 
-        // Asked first; who declines keeps the files.
+        // The page asks first. Cancel keeps the files.
         const files = SimulatedCard.fileCount;
         tap("Remove all files");
         see("Remove all files?");
@@ -506,7 +508,7 @@ TestCase {
         until(() => shows("ext4"), "probed again");
     }
 
-    function test_cardSaysWhetherItIsReal() {
+    function test_pageShowsWhetherTheCardIsReal() {
         openPage("memory-card");
         see(SimulatedCard.real ? "A real card: %1, an ext4 file system in memory, and the real disk "
                               .arg(SimulatedCard.name) + "service"
@@ -589,7 +591,7 @@ TestCase {
     function test_android() {
         openPage("android");
         see("Shown: Android support is installed");
-        // Its switch has the name that the page says.
+        // The switch has the name that the page shows.
         tap("Android support is installed");
         tap("Open the page again");
         see("Hidden: no Android support");

@@ -1,7 +1,7 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-// Takes the screenshots of the gallery as ./dev run does, and looks at them.
+// Takes the screenshots of the gallery as ./dev run does, and checks them.
 
 #include <QDir>
 #include <QFile>
@@ -15,10 +15,10 @@
 namespace {
 
 const QLatin1String source(SOURCE_DIR);
-// A page without content is of one colour below the header; smooth text and icons bring many.
+// Below the header, a page without content has one colour. Smooth text and icons have many.
 constexpr int headerHeight = 48;
 constexpr int enoughColours = 20;
-constexpr int patience = 120000; // ms; the gallery's own watchdog barks before
+constexpr int patience = 120000; // ms; the gallery's own timeout is shorter
 
 struct Result {
     int exitCode = -1;
@@ -40,7 +40,7 @@ Result takeScreenshots(const QString &source, const QString &folder)
     return result;
 }
 
-// How many colours a page has, counted until they are enough.
+// Counts the colours of a page, up to enoughColours.
 int countColours(const QImage &image)
 {
     QSet<QRgb> colours;
@@ -83,7 +83,7 @@ void ScreenshotsTest::everyPageIsShown()
 {
     const QTemporaryDir folder;
     const Result result = takeScreenshots(source, folder.path());
-    // The problem comes last.
+    // The problem is in the last line.
     QVERIFY2(result.exitCode == 0, qPrintable(result.output.right(800)));
 
     static const QRegularExpression line(
@@ -105,7 +105,7 @@ void ScreenshotsTest::everyPageIsShown()
             QVERIFY2(countColours(image) >= enoughColours, qPrintable(file));
         }
     }
-    // The start page, and every file of a page: none may be missing in the list.
+    // The start page and every file in pages/.
     QCOMPARE(pages.size(),
              1
                  + QDir(source + QStringLiteral("/gallery/pages"))

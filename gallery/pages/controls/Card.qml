@@ -4,7 +4,7 @@
 import QtQuick 2.15
 
 /*
-    What a section of a page stands on.
+    The background of a section.
 */
 Rectangle {
     radius: 8

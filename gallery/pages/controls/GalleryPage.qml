@@ -5,7 +5,7 @@ import QtQuick 2.15
 import QtQuick.Layouts 1.15
 
 /*
-    What a page of the gallery consists of: sections in one column, in two where there is room.
+    A page of the gallery: sections in one column, or in two if there is room.
 */
 GridLayout {
     columns: width >= 640 ? 2 : 1

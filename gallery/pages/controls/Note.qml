@@ -6,7 +6,7 @@ import QtQuick.Controls 2.15
 import QtQuick.Layouts 1.15
 
 /*
-    A sentence that explains.
+    An explanation.
 */
 Label {
     Layout.fillWidth: true

@@ -6,7 +6,7 @@ import QtQuick.Controls 2.15
 import QtQuick.Layouts 1.15
 
 /*
-    A text to read. What it shows may come from files, so markup in it is not looked at.
+    A text to read. It may come from a file, so markup is not interpreted.
 */
 Label {
     Layout.fillWidth: true

@@ -7,7 +7,7 @@ import QtQuick.Controls.impl 2.15
 import QtQuick.Layouts 1.15
 
 /*
-    A switch whose text may be long, with a description below it, and a remark if there is one.
+    A switch whose text may be long, with an optional description and remark below it.
 */
 SwitchDelegate {
     id: control

@@ -7,7 +7,7 @@ import QtQuick.Controls.impl 2.15
 import QtQuick.Controls.Universal 2.15
 
 /*
-    A button of a home screen: an icon over a text of up to two lines.
+    A button of a home screen: an icon above a text of at most two lines.
 */
 ItemDelegate {
     id: tile

@@ -6,7 +6,7 @@ import QtQuick.Controls 2.15
 import QtQuick.Layouts 1.15
 
 /*
-    A value under its name.
+    A value below its name.
 */
 ColumnLayout {
     property alias name: nameLabel.text

@@ -85,7 +85,7 @@
     </message>
     <message id="gallery-events-widgets-step-counter-note">
         <source></source>
-        <translation>The steps widget is available while this is there, as soon as the page checks.</translation>
+        <translation>The steps widget is available while this is installed. The page has to check again.</translation>
     </message>
     <message id="gallery-titles">
         <source></source>
@@ -93,7 +93,7 @@
     </message>
     <message id="gallery-titles-about">
         <source></source>
-        <translation>Joins the titles of a model’s rows, such as what is enabled, into a sentence of the language.</translation>
+        <translation>Joins the titles of a model’s rows, such as the enabled ones, into a sentence in the user’s language.</translation>
     </message>
     <message id="gallery-titles-widgets">
         <source></source>
@@ -241,7 +241,7 @@
     </message>
     <message id="gallery-location-about">
         <source></source>
-        <translation>Switches the location services, saves and restores the switches, and has the terms to agree to.</translation>
+        <translation>Switches the location services, saves and restores the switches, and shows the terms of the online services.</translation>
     </message>
     <message id="gallery-location-services">
         <source></source>
@@ -313,7 +313,7 @@
     </message>
     <message id="gallery-cover-info">
         <source></source>
-        <translation>What the daemon tells</translation>
+        <translation>Reported by the daemon</translation>
     </message>
     <message id="gallery-cover-id">
         <source></source>
@@ -385,7 +385,7 @@
     </message>
     <message id="gallery-bluetooth-about">
         <source></source>
-        <translation>Tells the address of the Bluetooth adapter.</translation>
+        <translation>Shows the address of the Bluetooth adapter.</translation>
     </message>
     <message id="gallery-bluetooth-address">
         <source></source>
@@ -401,7 +401,7 @@
     </message>
     <message id="gallery-android-about">
         <source></source>
-        <translation>Tells whether folders of Android applications are to be shown.</translation>
+        <translation>Shows whether the data folders of Android applications are visible.</translation>
     </message>
     <message id="gallery-android-folders">
         <source></source>
@@ -425,7 +425,7 @@
     </message>
     <message id="gallery-modem-about">
         <source></source>
-        <translation>Tells which variant of the modem software the device has.</translation>
+        <translation>Shows the variant of the modem software.</translation>
     </message>
     <message id="gallery-modem-variant">
         <source></source>

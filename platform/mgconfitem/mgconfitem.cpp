@@ -8,6 +8,7 @@
 #include <QSet>
 #include <QTimer>
 #include <QtDebug>
+#include <array>
 #include <cstdlib>
 #include <cstring>
 #include <dconf.h>
@@ -246,6 +247,6 @@ void MGConfItem::write(GVariant *value)
     }
     // dconf reports the change itself, unless it compares the new value with the result of a wrong
     // read, as described above, and takes the two for equal. Items that know the value ignore this.
-    const char *const changes[] = {"", nullptr};
-    g_signal_emit_by_name(client(), "changed", path.constData(), changes, "");
+    const std::array<const char *, 2> changes = {"", nullptr};
+    g_signal_emit_by_name(client(), "changed", path.constData(), changes.data(), "");
 }

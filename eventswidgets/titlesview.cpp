@@ -342,7 +342,7 @@ QStringList TitlesView::collect() const
         }
         values.append(role.value(index).toString());
     }
-    return m_model == nullptr ? QStringList() : values;
+    return values;
 }
 
 bool TitlesView::matches(const QVariant &value) const

@@ -115,12 +115,10 @@ QString translation(const QString &id, const QString &fallback)
 */
 
 EventsWidgetsModel::EventsWidgetsModel(QObject *parent)
-    : QAbstractListModel(parent), m_catalogs(this), m_watcher(definitionDirectory),
-      m_enabledItem(enabledKey)
+    : QAbstractListModel(parent), m_catalogs(this),
+      m_watcher(definitionDirectory, definitionFilter), m_enabledItem(enabledKey)
 {
-    connect(&m_watcher, &DirectoryWatcher::directoryChanged, this,
-            &EventsWidgetsModel::directoryChanged);
-    connect(&m_writeWatcher, &WriteWatcher::written, this, &EventsWidgetsModel::directoryChanged);
+    connect(&m_watcher, &DirectoryWatcher::changed, this, &EventsWidgetsModel::directoryChanged);
     connect(&m_enabledItem, &MGConfItem::valueChanged, this,
             &EventsWidgetsModel::enabledWidgetsChanged);
 }
@@ -304,8 +302,6 @@ QStringList EventsWidgetsModel::enabledList() const
 
 std::vector<EventsWidget> EventsWidgetsModel::readWidgets()
 {
-    m_writeWatcher.watch(definitionDirectory);
-
     std::vector<Widget> widgets;
     QDirIterator entries(definitionDirectory, {definitionFilter}, QDir::Files);
     while (entries.hasNext()) {

@@ -8,7 +8,6 @@
 #include "mgconfitem.h"
 #include "models/requestqueue.h"
 #include "plugin/translations/catalogtable.h"
-#include "writewatcher.h"
 
 #include <QAbstractListModel>
 #include <QList>
@@ -74,7 +73,6 @@ private:
     QList<Widget> m_rows;
     RequestQueue<EventsWidgetsModel> m_requests{this};
     DirectoryWatcher m_watcher;
-    WriteWatcher m_writeWatcher;
     MGConfItem m_enabledItem;
     // The value of the key. Without a value, the paths of all widgets, on purpose: the user's first
     // choice stores them, so that every other widget is enabled from then on, whatever its default.

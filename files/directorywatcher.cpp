@@ -3,77 +3,218 @@
 
 #include "directorywatcher.h"
 
+#include <QCoreApplication>
 #include <QFile>
-#include <QFileInfo>
+#include <QFileSystemWatcher>
+#include <QMultiHash>
+#include <QSocketNotifier>
+#include <QVarLengthArray>
+#include <QVector>
 
-#include <sys/stat.h>
+#include <algorithm>
+#include <utility>
+
+#include <sys/inotify.h>
+#include <sys/ioctl.h>
+#include <unistd.h>
 
 namespace {
 
-QString parentOf(const QString &path)
-{
-    return path.left(qMax(1, path.lastIndexOf(QLatin1Char('/'))));
-}
-
-QString nearestExisting(QString path)
-{
-    while (path.size() > 1 && !QFileInfo(path).isDir()) {
-        path = parentOf(path);
-    }
-    return path;
-}
+// The same for every directory: watchers that share a watch cannot take events from each other.
+constexpr uint32_t watchedEvents =
+    IN_CREATE | IN_DELETE | IN_MOVED_FROM | IN_MOVED_TO | IN_ATTRIB | IN_CLOSE_WRITE | IN_MOVE_SELF;
 
 } // namespace
 
-DirectoryWatcher::DirectoryWatcher(QString directory, QObject *parent)
-    : QObject(parent), m_directory(std::move(directory)), m_watcher(this)
+/*
+    The inotify instance of the process. It gives a directory one watch, by whatever path it is
+    reached, until that is removed or the directory ceases to exist; a number is not used again.
+*/
+class Inotify : public QObject
 {
-    // Not at once: where there is no inotify, QFileSystemWatcher tells of a change in the midst of
-    // going through its watches, and watchedChanged() takes them off.
-    connect(&m_watcher, &QFileSystemWatcher::directoryChanged, this,
-            &DirectoryWatcher::watchedChanged, Qt::QueuedConnection);
+public:
+    // Null if the process cannot get one.
+    static Inotify *instance();
+
+    ~Inotify() override;
+    Q_DISABLE_COPY_MOVE(Inotify)
+
+    // Returns the watch of a directory; negative if there is none.
+    int add(const QString &directory, DirectoryWatcher *watcher);
+    void remove(int watch, DirectoryWatcher *watcher);
+
+private:
+    explicit Inotify(int descriptor);
+
+    void readEvents();
+
+    const int m_descriptor;
+    QSocketNotifier m_notifier;
+    QMultiHash<int, DirectoryWatcher *> m_watchers;
+};
+
+Inotify *Inotify::instance()
+{
+    static QPointer<Inotify> instance;
+    if (instance == nullptr) {
+        const int descriptor = inotify_init1(IN_NONBLOCK | IN_CLOEXEC);
+        if (descriptor >= 0) {
+            instance = new Inotify(descriptor);
+        }
+    }
+    return instance;
+}
+
+Inotify::Inotify(int descriptor)
+    : QObject(QCoreApplication::instance()), m_descriptor(descriptor),
+      m_notifier(descriptor, QSocketNotifier::Read)
+{
+    connect(&m_notifier, &QSocketNotifier::activated, this, [this] { readEvents(); });
+}
+
+Inotify::~Inotify()
+{
+    m_notifier.setEnabled(false);
+    close(m_descriptor);
+}
+
+int Inotify::add(const QString &directory, DirectoryWatcher *watcher)
+{
+    const int watch =
+        inotify_add_watch(m_descriptor, QFile::encodeName(directory).constData(), watchedEvents);
+    if (watch >= 0 && !m_watchers.contains(watch, watcher)) {
+        m_watchers.insert(watch, watcher);
+    }
+    return watch;
+}
+
+void Inotify::remove(int watch, DirectoryWatcher *watcher)
+{
+    if (m_watchers.remove(watch, watcher) > 0 && !m_watchers.contains(watch)) {
+        // Fails if the directory does not exist any more, and its watch with it.
+        inotify_rm_watch(m_descriptor, watch);
+    }
+}
+
+void Inotify::readEvents()
+{
+    int pending = 0;
+    ioctl(m_descriptor, FIONREAD, &pending);
+    QVarLengthArray<char, 4096> buffer(pending);
+    const ssize_t size = read(m_descriptor, buffer.data(), size_t(pending));
+
+    // Each watcher reports once for all of these events. A receiver may destroy any watcher.
+    QVector<QPointer<DirectoryWatcher>> reporting;
+    for (ssize_t at = 0; at < size;) {
+        const auto &event = *reinterpret_cast<const inotify_event *>(buffer.constData() + at);
+        at += ssize_t(sizeof(inotify_event) + event.len);
+        // After an overflow anything may have happened.
+        const bool overflow = (event.mask & IN_Q_OVERFLOW) != 0;
+        auto watcher = overflow ? m_watchers.cbegin() : m_watchers.constFind(event.wd);
+        for (; watcher != m_watchers.cend() && (overflow || watcher.key() == event.wd); ++watcher) {
+            if ((*watcher)->take(event)) {
+                reporting.append(*watcher);
+            }
+        }
+    }
+    for (const QPointer<DirectoryWatcher> &watcher : qAsConst(reporting)) {
+        if (watcher != nullptr) {
+            watcher->report();
+        }
+    }
+}
+
+DirectoryWatcher::DirectoryWatcher(const QString &directory, const QString &nameFilter,
+                                   QObject *parent)
+    : QObject(parent), m_nameFilter(QRegularExpression::wildcardToRegularExpression(nameFilter),
+                                    QRegularExpression::CaseInsensitiveOption),
+      m_inotify(Inotify::instance())
+{
+    const QStringList names = directory.split(QLatin1Char('/'));
+    for (int i = 0; i < names.size(); ++i) {
+        // Only a directory can be reached by a path that ends with a slash.
+        const QString path = names.mid(0, i + 1).join(QLatin1Char('/')) + QLatin1Char('/');
+        m_levels.push_back({path, QFile::encodeName(names.at(i)), -1});
+    }
+    if (m_inotify == nullptr) {
+        m_poller = new QFileSystemWatcher(this);
+        // Queued: it goes through its paths as it emits this, and watch() adds paths.
+        connect(
+            m_poller, &QFileSystemWatcher::directoryChanged, this,
+            [this] {
+                watch();
+                Q_EMIT changed();
+            },
+            Qt::QueuedConnection);
+    }
     watch();
+}
+
+DirectoryWatcher::~DirectoryWatcher()
+{
+    if (m_inotify != nullptr) {
+        for (const Level &level : m_levels) {
+            m_inotify->remove(level.watch, this);
+        }
+    }
 }
 
 void DirectoryWatcher::watch()
 {
-    // A watch belongs to the directory that had the name when it was made. One that was removed and
-    // made again looks watched, and is not: take every watch off and put it on anew. Between
-    // looking and watching, a directory may have come or gone.
-    QString nearest;
-    do {
-        const QStringList watched = m_watcher.directories();
-        if (!watched.isEmpty()) {
-            m_watcher.removePaths(watched);
+    if (m_poller != nullptr) {
+        for (const Level &level : m_levels) {
+            m_poller->addPath(level.path);
         }
-        m_identity = identify();
-        nearest = nearestExisting(m_directory);
-        m_watcher.addPath(nearest);
-        if (nearest == m_directory) {
-            m_watcher.addPath(parentOf(m_directory));
-        }
-    } while (nearest != nearestExisting(m_directory) || m_identity != identify());
-}
-
-void DirectoryWatcher::watchedChanged(const QString &path)
-{
-    // What else happens in the parent is of no interest. The watches stay, too: taking them off
-    // would lose what the directory itself has yet to report.
-    if (path != m_directory && m_identity && m_identity == identify()) {
         return;
     }
-    const Identity before = m_identity;
-    watch();
-    if (path == m_directory || m_identity != before) {
-        Q_EMIT directoryChanged(m_directory);
+    const std::vector<Level> before = m_levels;
+    for (Level &level : m_levels) {
+        level.watch = m_inotify->add(level.path, this);
+    }
+    for (const Level &old : before) {
+        const auto has = [&old](const Level &level) { return level.watch == old.watch; };
+        if (std::none_of(m_levels.cbegin(), m_levels.cend(), has)) {
+            m_inotify->remove(old.watch, this);
+        }
     }
 }
 
-DirectoryWatcher::Identity DirectoryWatcher::identify() const
+bool DirectoryWatcher::take(const inotify_event &event)
 {
-    struct stat entry = {};
-    if (stat(QFile::encodeName(m_directory).constData(), &entry) != 0) {
-        return {};
+    const bool reporting = m_pathChanged || m_entriesChanged;
+    if ((event.mask & IN_Q_OVERFLOW) != 0) {
+        m_pathChanged = true;
+        m_entriesChanged = true;
     }
-    return std::make_pair(entry.st_dev, entry.st_ino);
+    for (auto level = m_levels.cbegin(); level != m_levels.cend(); ++level) {
+        if (level->watch != event.wd) {
+            continue;
+        }
+        const auto next = level + 1;
+        const bool isDirectory = next == m_levels.cend();
+        if (event.len == 0) {
+            // Of the directory itself. It may have been moved away, removed or unmounted.
+            m_pathChanged = true;
+            m_entriesChanged = m_entriesChanged || (isDirectory && (event.mask & IN_ATTRIB) != 0);
+        } else if (isDirectory) {
+            m_entriesChanged =
+                m_entriesChanged || m_nameFilter.match(QFile::decodeName(event.name)).hasMatch();
+        } else {
+            m_pathChanged = m_pathChanged || next->name == event.name;
+        }
+    }
+    return !reporting && (m_pathChanged || m_entriesChanged);
+}
+
+void DirectoryWatcher::report()
+{
+    bool isChanged = std::exchange(m_entriesChanged, false);
+    if (std::exchange(m_pathChanged, false)) {
+        const int before = m_levels.back().watch;
+        watch();
+        isChanged = isChanged || m_levels.back().watch != before;
+    }
+    if (isChanged) {
+        Q_EMIT changed();
+    }
 }

@@ -4,42 +4,76 @@
 #ifndef DIRECTORYWATCHER_H
 #define DIRECTORYWATCHER_H
 
-#include <QFileSystemWatcher>
+#include <QByteArray>
+#include <QObject>
+#include <QPointer>
+#include <QRegularExpression>
+#include <QString>
 
-#include <optional>
-#include <utility>
+#include <vector>
 
-#include <sys/types.h>
+class Inotify;
+class QFileSystemWatcher;
+struct inotify_event;
 
 /*
-    Watches one directory, whether or not it exists yet: a package that brings the first definition
-    brings its directory as well, and the last one to go takes it along.
+    Watches the files of one kind in a directory, whether or not the directory exists yet: a package
+    that installs the first definition file creates its directory as well, and the last package that
+    goes removes it.
 
-    QFileSystemWatcher sees neither, nor a directory that is renamed: this watches the parent too,
-    or the nearest one that exists.
+    changed() reports three events:
+    - an entry of a matching name is added, removed, renamed or given other permissions;
+    - a file of a matching name that was open for writing is closed, which means that it is complete;
+    - the directory appears, disappears or is replaced, alone or together with a directory above it.
+    Writes to a file outside the directory that a link in it leads to are not noticed.
+
+    No event is lost while the watches are set up. They are set from the root downwards, each before
+    the next name is looked up, so that a watch is already in place for whatever gets that name
+    later. A directory that is watched already keeps its watch, and changed() is emitted last: a
+    receiver that reads the directory sees everything that the watches do not report any more.
+
+    All watchers of a process share one inotify instance, which is kept until the application ends.
+    A user may have only 128 of them, and closing one blocks for more than 10 ms. If there is none
+    left, QFileSystemWatcher takes its place: it checks once a second, whatever the names are, and
+    does not notice a file that is rewritten in place.
+
+    To be used on the main thread.
 */
 class DirectoryWatcher : public QObject
 {
     Q_OBJECT
 
 public:
-    explicit DirectoryWatcher(QString directory, QObject *parent = nullptr);
+    // The path is absolute. Names match a filter such as "*.conf" as they do for QDir.
+    DirectoryWatcher(const QString &directory, const QString &nameFilter,
+                     QObject *parent = nullptr);
+    ~DirectoryWatcher() override;
+    Q_DISABLE_COPY_MOVE(DirectoryWatcher)
 
 Q_SIGNALS:
-    // An entry was added, removed or renamed, or the directory itself came, went or was replaced.
-    void directoryChanged(const QString &directory);
+    void changed();
 
 private:
-    // What has the name at a moment: nothing, or an inode of a device.
-    using Identity = std::optional<std::pair<dev_t, ino_t>>;
+    friend class Inotify;
+
+    // The directory or one above it, with its name in the one above and, if it exists, its watch.
+    struct Level {
+        QString path;
+        QByteArray name;
+        int watch;
+    };
 
     void watch();
-    void watchedChanged(const QString &path);
-    Identity identify() const;
+    // Returns whether this is the first event since the last call of report() that matters.
+    bool take(const inotify_event &event);
+    void report();
 
-    QString m_directory;
-    Identity m_identity;
-    QFileSystemWatcher m_watcher;
+    const QRegularExpression m_nameFilter;
+    std::vector<Level> m_levels; // from the root downwards
+    QPointer<Inotify> m_inotify;
+    QFileSystemWatcher *m_poller = nullptr;
+    bool m_pathChanged = false;
+    bool m_entriesChanged = false;
 };
 
 #endif

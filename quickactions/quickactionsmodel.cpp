@@ -170,13 +170,13 @@ qint64 priorityOfRow(const QuickAction &action)
 */
 
 QuickActionsModel::QuickActionsModel(QObject *parent)
-    : QAbstractListModel(parent), m_catalogs(this), m_watcher(definitionDirectory, this),
-      m_reloadTimer(this), m_enabledItem(enabledKey), m_blockedItem(blockedKey)
+    : QAbstractListModel(parent), m_catalogs(this),
+      m_watcher(definitionDirectory, definitionFilter), m_reloadTimer(this),
+      m_enabledItem(enabledKey), m_blockedItem(blockedKey)
 {
     m_reloadTimer.setSingleShot(true);
     m_reloadTimer.setInterval(reloadDelay);
-    connect(&m_watcher, &DirectoryWatcher::directoryChanged, this,
-            &QuickActionsModel::directoryChanged);
+    connect(&m_watcher, &DirectoryWatcher::changed, this, &QuickActionsModel::directoryChanged);
 
     connect(&m_enabledItem, &MGConfItem::valueChanged, this,
             &QuickActionsModel::updateEnabledActions);

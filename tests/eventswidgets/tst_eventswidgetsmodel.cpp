@@ -47,6 +47,7 @@ private Q_SLOTS:
     void directoryMadeAgain();
     void rewrittenInPlace();
     void oneScanPerNotification();
+    void otherFilesAreIgnored();
 
     // Texts
     void translatesTitleAndDescription();
@@ -586,6 +587,22 @@ void TestEventsWidgetsModel::oneScanPerNotification()
     QTRY_COMPARE(paths(model), QStringList{b});
     QTest::qWait(200);
     QCOMPARE(m_log->takeAll().size(), 1);
+}
+
+void TestEventsWidgetsModel::otherFilesAreIgnored()
+{
+    // Every scan says once that this is no definition.
+    Files::write(pathOf("bad.json"), "bad");
+    const Model model;
+    QCOMPARE(m_log->takeAll().size(), 1);
+    Files::write(pathOf("other.txt"), "x");
+    QFile other(pathOf("other.txt"));
+    QVERIFY(other.open(QIODevice::Append));
+    other.write("more");
+    other.close();
+    QVERIFY(other.remove());
+    QTest::qWait(200);
+    QCOMPARE(m_log->takeAll().size(), 0);
 }
 
 void TestEventsWidgetsModel::translatesTitleAndDescription()

@@ -70,6 +70,8 @@ private Q_SLOTS:
     void followsDirectoryMadeLater();
     void followsDirectoryMadeAgain();
     void changedDefinition();
+    void rewrittenInPlace();
+    void otherFilesAreIgnored();
     void unreadableDefinitionIsListed();
     void directoriesAndPipesAmongTheDefinitions();
     void otherFilesAreNoDefinitions();
@@ -897,6 +899,40 @@ void TestQuickActionsModel::changedDefinition()
     QCOMPARE(model->data(model->index(0), 1), QVariant(QStringLiteral("changed")));
     QCOMPARE(changed.size(), 1);
     QCOMPARE(changed.at(0).at(0).toModelIndex(), model->index(0));
+}
+
+void TestQuickActionsModel::rewrittenInPlace()
+{
+    QFile definition(add("a", "icon=old\n"));
+    const QuickActionsModel *model = loadedModel(true);
+    QSignalSpy changed(model, &QAbstractItemModel::dataChanged);
+    QVERIFY(definition.open(QIODevice::WriteOnly));
+    // Of another length: QSettings takes a file of the same length and time for the one it has read.
+    definition.write("icon=changed\n");
+    QVERIFY(definition.flush());
+    // Reported when it is complete, and read one second later.
+    QVERIFY(!changed.wait(longEnough));
+    definition.close();
+    QVERIFY(!changed.wait(500));
+    QVERIFY(changed.wait());
+    QCOMPARE(model->data(model->index(0), 1), QVariant(QStringLiteral("changed")));
+    QCOMPARE(changed.size(), 1);
+}
+
+void TestQuickActionsModel::otherFilesAreIgnored()
+{
+    // A definition that cannot be read gives a warning each time it is loaded.
+    Files::makeFolder(path("broken"));
+    loadedModel(true);
+    QCOMPARE(takeMessages().size(), 1);
+    Files::write(directory + QStringLiteral("/other.txt"), "x");
+    QFile other(directory + QStringLiteral("/other.txt"));
+    QVERIFY(other.open(QIODevice::Append));
+    other.write("more");
+    other.close();
+    QVERIFY(other.remove());
+    QTest::qWait(longEnough);
+    QCOMPARE(takeMessages(), QStringList());
 }
 
 void TestQuickActionsModel::unreadableDefinitionIsListed()

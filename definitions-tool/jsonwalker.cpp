@@ -86,7 +86,8 @@ int JsonWalker::endOfString(int position) const
     return position + 1;
 }
 
-// Every value is in an object or an array, so that something follows it.
+// Every value is in an object or an array, so that a comma or a bracket follows it. Spaces before that
+// do not matter.
 int JsonWalker::endOfValue(int position) const
 {
     int depth = 0;
@@ -98,9 +99,7 @@ int JsonWalker::endOfValue(int position) const
             depth += isOpening(character) ? 1 : isClosing(character) ? -1 : 0;
             ++position;
         }
-    } while (depth > 0
-             || !(isSpace(m_text.at(position)) || isClosing(m_text.at(position))
-                  || m_text.at(position) == ','));
+    } while (depth > 0 || !(isClosing(m_text.at(position)) || m_text.at(position) == ','));
     return position;
 }
 

@@ -59,7 +59,7 @@ constexpr double barOfRmOnExt4 = 1.20;
 constexpr double barOfBareCalls = 1.20;
 constexpr double barOfBareCallsInLargeDirectory = 1.05;
 constexpr double barOfDirectoryOrder = 1.00;
-constexpr double none = 0;
+constexpr double none = Rounds::noBar;
 constexpr double barOfProcessor = 1.05;
 constexpr double barOfCallsFlat = 1.01;
 constexpr double barOfCallsNested = 1.10;
@@ -137,7 +137,7 @@ void makeChain(int top, int levels)
 struct Tree {
     const char *name;
     int entries;
-    double barOfCalls; // into the kernel, per entry; 0 for none
+    double barOfCalls; // into the kernel, per entry
     std::function<void(int)> make;
     bool isLarge = false; // for rm: more than 10,000 entries in one directory
 };
@@ -153,7 +153,7 @@ const QVector<Tree> &trees()
          [](int top) { makeDirectories(top, 20, 250, photoSize); }},
         {"200,000 links in one directory", 200000, barOfCallsFlat,
          [](int top) { makeLinks(top, 200000); }, true},
-        {"50,000 directories in each other", depth, 0, [](int top) { makeChain(top, depth); }},
+        {"50,000 directories in each other", depth, none, [](int top) { makeChain(top, depth); }},
     };
     return all;
 }

@@ -109,12 +109,13 @@ int main(int argc, char *argv[])
             [&memory, number, text] { memory[number].push_back(evaluateInProcess(text)); }};
     };
     const auto times = Rounds::times({work(0, nothing), work(1, import), work(2, everyType())});
-    Rounds::report("import the module", "import of an empty one", times[1], times[0], 0);
+    Rounds::report("import the module", "import of an empty one", times[1], times[0],
+                   Rounds::noBar);
     Rounds::report("import it and create every type", "import of an empty one", times[2], times[0],
-                   0);
+                   Rounds::noBar);
     Rounds::report("import the module", "KiB more memory than an empty one",
-                   median(memory[1]) - median(memory[0]), 0);
+                   median(memory[1]) - median(memory[0]), Rounds::noBar);
     Rounds::report("import it and create every type", "KiB more memory than an empty one",
-                   median(memory[2]) - median(memory[0]), 0);
+                   median(memory[2]) - median(memory[0]), Rounds::noBar);
     return 0;
 }

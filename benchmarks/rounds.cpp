@@ -41,7 +41,7 @@ Rounds::Time timeOf(const Rounds::Work &work)
 
 void printRow(const char *work, const char *beside, const QString &figure, double bar, bool kept)
 {
-    const QString barText = bar > 0 ? QString::number(bar, 'f', 2) : QStringLiteral("none");
+    const QString barText = bar >= 0 ? QString::number(bar, 'f', 2) : QStringLiteral("none");
     std::printf("| %s | %s | %s | %s | %s |\n", work, beside, qPrintable(figure),
                 qPrintable(barText), kept ? "" : "MISSED");
     std::fflush(stdout);
@@ -67,6 +67,17 @@ std::vector<Rounds::Times> Rounds::times(const std::vector<Work> &works, int rou
     return times;
 }
 
+void Rounds::reportTimes(const char *work, std::vector<double> milliseconds)
+{
+    std::sort(milliseconds.begin(), milliseconds.end());
+    printRow(work, "time on this machine",
+             QStringLiteral("%1 ms (%2 to %3)")
+                 .arg(milliseconds[milliseconds.size() / 2], 0, 'f', 2)
+                 .arg(milliseconds.front(), 0, 'f', 2)
+                 .arg(milliseconds.back(), 0, 'f', 2),
+             noBar, true);
+}
+
 bool Rounds::report(const char *work, const char *beside, const Times &times,
                     const Times &references, double bar, double Time::*clock)
 {
@@ -76,7 +87,7 @@ bool Rounds::report(const char *work, const char *beside, const Times &times,
     }
     std::sort(ratios.begin(), ratios.end());
     const double median = ratios[ratios.size() / 2];
-    const bool kept = bar <= 0 || median <= bar || ratios[1] <= bar;
+    const bool kept = bar < 0 || median <= bar || ratios[1] <= bar;
     printRow(work, beside,
              QStringLiteral("%1 (%2 to %3)")
                  .arg(median, 0, 'f', 2)
@@ -88,7 +99,7 @@ bool Rounds::report(const char *work, const char *beside, const Times &times,
 
 bool Rounds::report(const char *work, const char *unit, double figure, double bar)
 {
-    const bool kept = bar <= 0 || figure <= bar;
+    const bool kept = bar < 0 || figure <= bar;
     printRow(work, unit, QString::number(figure, 'g', 5), bar, kept);
     return kept;
 }

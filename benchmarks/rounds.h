@@ -29,16 +29,22 @@ struct Work {
     std::function<void()> prepare = [] {};
 };
 
+// For a figure that is only information.
+constexpr double noBar = -1;
+
 // Runs everything once for warming up, then in rounds, each in an order of its own.
 std::vector<Times> times(const std::vector<Work> &works, int rounds = 9);
 
-// Prints the median of the rounds' ratios, the lowest and the highest, and the bar; 0 is none. The
-// bar counts as missed only when all rounds but one miss it: a lone round tells of the machine.
-// Gives whether it is kept.
+// Prints the median of the rounds' ratios, the lowest and the highest, and the bar. The bar is missed
+// only when all rounds but one miss it: the machine may disturb a single round. Returns whether the
+// bar is kept.
 bool report(const char *work, const char *beside, const Times &times, const Times &references,
             double bar, double Time::*clock = &Time::processor);
 
-// Prints a figure that is no time, which is missed as soon as it is above its bar; 0 is none.
+// Prints the median of times on this machine, the lowest and the highest, which have no bar.
+void reportTimes(const char *work, std::vector<double> milliseconds);
+
+// Prints a figure that is not a ratio. Its bar is missed as soon as the figure is above it.
 bool report(const char *work, const char *unit, double figure, double bar);
 
 } // namespace Rounds

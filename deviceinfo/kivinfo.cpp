@@ -120,8 +120,8 @@ KivInfo::KivInfo(QObject *parent) : QObject(parent)
     Emitted after \l kivReady has changed.
 */
 
-// A reply overwrites what a signal told before it came: both tell the truth of their moment, and
-// the next signal puts it right.
+// A reply overwrites the value of a signal that came before it. Each was right when it was sent, and
+// the next signal corrects the value.
 
 void KivInfo::slotIdFinished(QDBusPendingCallWatcher *watcher)
 {

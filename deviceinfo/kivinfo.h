@@ -10,7 +10,7 @@ class QDBusMessage;
 class QDBusPendingCallWatcher;
 
 /*
-    The smart back cover that is attached to the device, as the cover daemon on the system bus tells
+    The smart back cover that is attached to the device, as the cover daemon on the system bus reports
     it: read once, and followed from then on.
 */
 class KivInfo : public QObject

@@ -25,8 +25,8 @@ bool toSwitch(const QVariant &stored)
     return stored.toBool();
 }
 
-// Anybody may write anything to the key: what is no state counts as never agreed to. Other types
-// of numbers are none either, as large ones would wrap around.
+// Any program may write any value to the key. A value that is not a state counts as never agreed to.
+// So does a number of another type, because a large one would wrap around.
 LocationSettings::OnlineAGpsState toState(const QVariant &stored)
 {
     const int number = stored.userType() == QMetaType::Int ? stored.toInt() : -1;

@@ -13,8 +13,8 @@ class QVariant;
     The switches of the device's location services: the satellite receiver (GPS), the MLS network
     positioning with its online assistance, and the HERE positioning service.
 
-    They lie in dconf, so that every process sees the same switches and follows their changes. A
-    switch that was never set is off, and an online service never agreed to is not available.
+    They are stored in dconf, so that every process sees the same switches and follows their changes.
+    A switch that was never set is off. An online service is not available before the user agrees.
 */
 class LocationSettings : public QObject
 {

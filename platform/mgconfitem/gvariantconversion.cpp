@@ -96,7 +96,7 @@ QString text(GVariant *value)
     gsize length = 0;
     const char *const utf8 = g_variant_get_string(value, &length);
     const QString text = QString::fromUtf8(utf8, static_cast<int>(length));
-    // QString takes U+FEFF at the start for a mark of the encoding and drops it.
+    // QString takes U+FEFF at the start for a byte order mark and drops it.
     const bool marked =
         QByteArray::fromRawData(utf8, static_cast<int>(length)).startsWith("\xEF\xBB\xBF");
     return marked ? QChar(QChar::ByteOrderMark) + text : text;
@@ -136,7 +136,7 @@ QVariantMap map(GVariant *dictionary)
     for (gsize i = 0; i < count; ++i) {
         const GVariantPtr entry = childAt(dictionary, i);
         const QString key = text(childAt(entry.get(), 0).get());
-        if (!map.contains(key)) { // of equal keys the first counts, as in GLib's own look-up
+        if (!map.contains(key)) { // the first of equal keys counts, as in GLib's own look-up
             map.insert(key, convert(childAt(entry.get(), 1).get()));
         }
     }
@@ -199,8 +199,8 @@ GVariantPtr toGVariant(const QVariant &value, QString *reason)
 
 QVariant toQVariant(GVariant *value)
 {
-    // Data in its normal form is what it says it is: its strings are Unicode, its nesting is
-    // bounded, and no part of it overlaps another to unfold into more than was stored.
+    // Data in normal form is safe to convert: its strings are Unicode, its nesting is limited, and
+    // its parts do not overlap, so that it cannot unfold into more than was stored.
     const GVariantPtr normal = trusted(value);
     return normal ? convert(normal.get()) : QVariant();
 }

@@ -33,9 +33,9 @@ GVariantPtr toGVariant(const QVariant &value, QString *reason);
 QVariant toQVariant(GVariant *value);
 
 /*
-    The same value, known to GLib to be undamaged; null if it is damaged. Of data that it does not
-    trust, GLib checks for each element of an array all those before it: to look through a list of
-    100,000 would hold up the main thread for half a minute.
+    The same value, marked as trusted; null if it is damaged. In data that it does not trust, GLib
+    checks all previous elements of an array for each element: reading a list of 100,000 elements
+    would block the main thread for half a minute.
 */
 GVariantPtr trusted(GVariant *value);
 

@@ -23,8 +23,8 @@ constexpr int unwatchDelayMs = 1000;
 
 DConfClient *client();
 
-// dconf sends one change at a time from a thread of its own: what was set just before the process
-// exits is still waiting there. The wait is in another thread because it has no time limit.
+// dconf sends one change at a time, in a thread of its own, so the last changes before the process
+// exits still wait there. dconf_client_sync() has no time limit and therefore runs in another thread.
 void flushWrites()
 {
     static auto *const done = new QSemaphore; // for the thread, which may outlast this function
@@ -42,7 +42,7 @@ void flushWrites()
     }
 }
 
-// One for the process, so that every item sees at once what another one sets.
+// One client per process: an item sees at once what another item sets.
 DConfClient *client()
 {
     static DConfClient *const client = [] {
@@ -100,7 +100,7 @@ void meetBus(GObject *, GAsyncResult *result, gpointer)
     g_error_free(error);
 }
 
-// Once per process, as soon as there is an event loop to judge.
+// Warns once per process, as soon as there is an event dispatcher to examine.
 void warnOfLimits()
 {
     static bool warned = false;
@@ -211,7 +211,7 @@ void MGConfItem::unset()
     }
 }
 
-// A change names a key, or with a slash at its end a whole folder.
+// A change names a key, or a whole directory if it ends with a slash.
 bool MGConfItem::isAmong(const char *prefix, const char *const *changes) const
 {
     for (; *changes; ++changes) {

@@ -51,7 +51,7 @@ private:
     void write(GVariant *value);
 
     const QString m_key;
-    QByteArray m_path; // of the key in dconf; empty if it is none
+    QByteArray m_path; // of the key in dconf; empty if the key is not valid
     GVariantPtr m_lastValue;
     unsigned long m_handler = 0;
 };

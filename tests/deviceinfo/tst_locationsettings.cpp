@@ -57,7 +57,7 @@ void store(const QString &key, const QVariant &value)
     MGConfItem(key).set(value);
 }
 
-// Another process, which says every change on a line and does what it is told by a line.
+// Another process: it prints a line for each change, and sets two switches for each line it reads.
 int another(QCoreApplication &application)
 {
     LocationSettings settings;
@@ -221,7 +221,7 @@ void TestLocationSettings::nonsenseReadsAsTheDefault()
     const LocationSettings fresh;
     QCOMPARE(fresh.hereState(), State(0));
 
-    // And it can be put right.
+    // A valid state can be set again.
     followed.setHereState(State(1));
     QCOMPARE(fresh.hereState(), State(1));
     QCOMPARE(stored(hereKey), QVariant(1));

@@ -34,7 +34,7 @@ public:
     virtual ~User() = default;
     virtual void choose(bool on) = 0;
     virtual bool isOn() const = 0;
-    // The key, and what the dconf tool tells of either choice.
+    // The key, and what the dconf tool prints for either choice.
     virtual QString key() const = 0;
     virtual QByteArray stored(bool on) const = 0;
 };
@@ -178,7 +178,7 @@ void reset()
     }
 }
 
-// Follows a key as the types do, to tell when they have been told of a change.
+// Follows a key as the types do, and thereby knows when they have received a change.
 class Change
 {
 public:
@@ -255,7 +255,7 @@ bool isFailedWrite(const QString &message)
     return message.contains(QLatin1String("failed to commit changes to dconf"));
 }
 
-// That a write has failed, GLib's log alone is told.
+// dconf reports a failed write to GLib's log only.
 GLogWriterOutput intoMessageLog(GLogLevelFlags level, const GLogField *fields, gsize count, void *)
 {
     for (gsize i = 0; i < count && level <= G_LOG_LEVEL_WARNING; ++i) {
@@ -378,7 +378,7 @@ void TestDconfFaults::serviceDiesInTheMiddleOfAWrite()
     TRY_COMPARE(m_user->isOn(), true);
     QVERIFY(isStored(true));
 
-    // The bus starts the service anew.
+    // The bus starts the service again.
     QVERIFY(stores(false));
     QVERIFY(!m_user->isOn());
     takeFailedWrites();
@@ -506,7 +506,7 @@ void TestDconfFaults::hugeDatabase()
     for (int i = 0; i < manyKeys; ++i) {
         file += "key" + QByteArray::number(i) + "=1\n";
     }
-    // One change of many keys is told to everybody.
+    // Every type is notified of one change of many keys.
     DconfTool::run({QStringLiteral("load"), QStringLiteral("/")}, file);
     TRY_COMPARE(MGConfItem(QStringLiteral("/other/key%1").arg(manyKeys - 1)).value(), QVariant(1));
     QVERIFY(!m_user->isOn());
@@ -518,7 +518,7 @@ void TestDconfFaults::hugeDatabase()
 void TestDconfFaults::tenThousandNotifications()
 {
     QVERIFY(stores(true));
-    // As the service tells of a change, but there is none.
+    // Notifications like those of the service, although nothing has changed.
     QDBusConnection bus =
         QDBusConnection::connectToBus(QDBusConnection::SessionBus, QStringLiteral("notifications"));
     for (int i = 0; i < flood; ++i) {

@@ -199,7 +199,7 @@ Gallery {
         { page: "text-files", steps: [() => !shows(qsTrId("gallery-text-files-none"))] },
         { page: "text-files", state: "none", steps: [
             () => simulate(qsTrId("gallery-text-files-file-installed")),
-            () => simulate(qsTrId("gallery-text-files-directory-installed")),
+            () => simulate(qsTrId("gallery-text-files-folder-installed")),
             () => press(qsTrId("gallery-simulation-reload")),
             () => shows(qsTrId("gallery-text-files-none"))] },
     ]

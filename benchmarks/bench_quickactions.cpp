@@ -158,8 +158,7 @@ int main(int argc, char *argv[])
         qFatal("runs only in the throw-away root of simulator");
     }
     const QCoreApplication application(argc, argv);
-    // Held by somebody else as well, as where there are several models: the bus is asked once to tell
-    // of the keys' changes, and not for each model anew.
+    // Keep the keys watched, as other models do: otherwise each model subscribes to them again.
     const MGConfItem enabledItem(enabledKey);
     const MGConfItem blockedItem(blockedKey);
 

@@ -25,7 +25,7 @@ using Times = std::vector<Time>;
 
 struct Work {
     std::function<void()> run;
-    // What has to be there, made anew before every run; takes no part in the time.
+    // Runs before every run and is not measured.
     std::function<void()> prepare = [] {};
 };
 

@@ -64,8 +64,8 @@ QString agreementText(QLatin1String base)
     \brief Switches the location services, and saves and restores the user's own choice.
 
     The switches themselves, \l gpsEnabled, \l mlsEnabled, \l mlsOnlineState and \l hereState, are
-    those of the platform's location settings; a device's own library decides what stands behind
-    them. Where there is none, they lie in dconf, and every process sees the same.
+    those of the platform's location settings. A device's own library implements them. Without such a
+    library they are stored in dconf, and every process sees the same values.
 
     \qml
     Switch {
@@ -99,7 +99,7 @@ QString agreementText(QLatin1String base)
 
     \section2 An agreement that cannot be opened gives a message
     Without a file in the user's language the English one is read, after a warning. If the file
-    exists but cannot be opened, the text is the translated message that there is none. The English
+    exists but cannot be opened, the text is the translated message that no agreement exists. The English
     one is not read then: it would not be the text that this user agrees to.
 
     \section2 The agreement texts have no change signal
@@ -229,8 +229,8 @@ void LocationConfiguration::restoreCustomSettings()
 /*!
     \qmlproperty enumeration LocationConfiguration::hereState
 
-    The state of the HERE positioning service, as \l mlsOnlineState tells that of MLS. Where the
-    module keeps the switches itself: \c /settings/location/here_state.
+    The state of the HERE positioning service, like \l mlsOnlineState for MLS. Where the
+    module stores the switches itself: \c /settings/location/here_state.
 */
 
 /*!

@@ -37,8 +37,8 @@ QString translation(const QString &id, const QString &fallback)
     \brief Lists the widgets of the events screen.
 
     Packages offer widgets by installing a definition file, \c{*.json}, into
-    \c /usr/share/glimmera/eventswidgets; \l{marlo-eventswidgets(5)} tells what it
-    holds. The model lists all of them and follows the directory and the user's choice,
+    \c /usr/share/glimmera/eventswidgets; \l{marlo-eventswidgets(5)} describes it.
+    The model lists all of them and follows the directory and the user's choice,
     \c /desktop/glimmera-marlo-home/events_screen_widgets (dconf, list of strings): the paths of the
     enabled widgets. While the user has chosen nothing, each widget is enabled or not by its own
     default.
@@ -218,7 +218,7 @@ void EventsWidgetsModel::disableWidget(const QString &path)
 /*!
     \qmlmethod void EventsWidgetsModel::directoryChanged()
 
-    Reads the definition files anew. The model does so itself whenever the directory changes or a
+    Reads the definition files again. The model does so itself whenever the directory changes or a
     file in it has been written.
 */
 void EventsWidgetsModel::directoryChanged()
@@ -243,7 +243,7 @@ void EventsWidgetsModel::directoryChanged()
 /*!
     \qmlmethod void EventsWidgetsModel::enabledWidgetsChanged()
 
-    Reads the user's list anew. The model does so itself whenever dconf reports a change.
+    Reads the user's list again. The model does so itself whenever dconf reports a change.
 */
 void EventsWidgetsModel::enabledWidgetsChanged()
 {
@@ -273,9 +273,9 @@ void EventsWidgetsModel::enabledWidgetsChanged()
 /*!
     \qmlmethod void EventsWidgetsModel::updateAvailable()
 
-    Looks anew whether the files are there that the widgets need. Nothing else does so while the
-    definition files stay as they are: call this when the widgets are about to be shown, or when
-    something that they need may have been installed or removed.
+    Rechecks whether each widget's \c available_path exists. Call this when the widgets are about to be
+    shown, or when a file that they need may have been installed or removed: the model itself checks
+    only when it reads the definition files.
 */
 void EventsWidgetsModel::updateAvailable()
 {

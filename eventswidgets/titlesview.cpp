@@ -279,7 +279,7 @@ QString TitlesView::joined(const QStringList &list) const
 /*!
     \qmlmethod void TitlesView::update()
 
-    Reads the model anew, for changes that the view does not follow, as of a row's place.
+    Reads the model again, after a change that the view does not follow, such as a move of rows.
 */
 void TitlesView::update()
 {
@@ -301,19 +301,19 @@ void TitlesView::update()
 /*!
     \qmlsignal TitlesView::matchRoleChanged()
 
-    Emitted after \l matchRole has changed, before the model is read anew.
+    Emitted after \l matchRole has changed, before the model is read again.
 */
 
 /*!
     \qmlsignal TitlesView::matchChanged()
 
-    Emitted after \l match has changed, before the model is read anew.
+    Emitted after \l match has changed, before the model is read again.
 */
 
 /*!
     \qmlsignal TitlesView::roleChanged()
 
-    Emitted after \l role has changed, before the model is read anew.
+    Emitted after \l role has changed, before the model is read again.
 */
 
 /*!

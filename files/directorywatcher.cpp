@@ -39,7 +39,7 @@ public:
     ~Inotify() override;
     Q_DISABLE_COPY_MOVE(Inotify)
 
-    // Returns the watch of a directory; negative if there is none.
+    // Returns the watch of a directory; negative without one.
     int add(const QString &directory, DirectoryWatcher *watcher);
     void remove(int watch, DirectoryWatcher *watcher);
 

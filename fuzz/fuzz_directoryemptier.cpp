@@ -218,7 +218,7 @@ private:
         }
     }
 
-    // As deep as it takes until folders are closed on the way, with a file beside each or not.
+    // Deep enough that directories are closed and opened again, with a file in each or not.
     void makeChain(std::vector<std::string> *way, const std::string &name)
     {
         const int byte = m_input.takeByte();
@@ -294,7 +294,7 @@ private:
 
     bool happen(const Event &event)
     {
-        // A node may have gone long ago, or be another by now.
+        // The node may be gone, or another one may have its name.
         const std::string &node = m_nodes[event.node];
         const std::string &another = m_nodes[event.other];
         const std::string moved = aside + '/' + std::to_string(m_calls);

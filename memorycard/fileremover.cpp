@@ -83,12 +83,12 @@ bool mayLieOn(const QByteArray &device, const struct stat &directory)
 // are its name in whatever encoding.
 bool emptyMount(const QByteArray &device, const char *directory)
 {
-    // Relative to the current folder there is no card, and an empty name would be that very folder.
+    // A relative path is no mount directory, and an empty one would be the current directory.
     if (directory[0] != '/') {
         return false;
     }
-    // The table names directories by their real path. Where something else stands by now (a link, a
-    // file, the folder beneath a card that was unmounted meanwhile), it is not the card and stays.
+    // The table has real paths. If the path leads to something else meanwhile (a link, a file, the
+    // directory below a card that was unmounted), it is not the card and stays.
     FileDescriptor fd = openDirectory(directory);
     if (!fd.isOpen()) {
         // A card that cannot be read counts as empty, as for removeAllEntries().

@@ -52,9 +52,9 @@ bool hasDescriptorsLeft()
     \inqmlmodule com.marlo.settings.system
     \brief Formats, empties, mounts, unmounts and probes a memory card.
 
-    A card is named twice: \l deviceName is what the disk service knows it by, \l devicePath is the
-    device node of its partition. Every operation is a sequence of
-    commands that are carried out one after the other, without waiting, while \l status tells which:
+    A card has two names: the disk service knows it by \l deviceName, and \l devicePath is the device node
+    of its partition. Every operation is a sequence of commands that run one after the other, without
+    blocking. \l status shows which one:
 
     \table
     \header \li Operation \li Status on success

@@ -15,11 +15,11 @@
 class QDBusPendingCallWatcher;
 
 /*
-    Formats a memory card, removes all files from it, mounts and unmounts it, and tells what file
-    system is on it.
+    Formats a memory card, removes all files from it, mounts and unmounts it, and
+    identifies its file system.
 
-    What is asked for becomes commands in a queue, of which one at a time is carried out: by the
-    helper program, by the disk service or by a FileRemover. Nothing here waits for any of them.
+    Requests are queued as commands, which run one at a time: in the helper program, in the disk service
+    or in a FileRemover. Nothing here waits for any of them.
 */
 class MemoryCardFormatter : public QObject
 {
@@ -87,7 +87,7 @@ Q_SIGNALS:
     void devicePathChanged();
     void filesystemTypeChanged();
     void busyChanged();
-    // Users connect to these signatures as they stand.
+    // Users connect to exactly these signatures.
     void mountError(MountError error); // clazy:exclude=fully-qualified-moc-types
     void unmountError(MountError error); // clazy:exclude=fully-qualified-moc-types
 

@@ -10,7 +10,7 @@
 #include <vector>
 
 // Where to insert a row by its number: before the first row with a higher number, or at the end if
-// there is none or the number is negative. The rows need not be sorted.
+// no such row exists or the number is negative. The rows need not be sorted.
 inline int insertionIndex(const std::vector<qint64> &rows, qint64 number)
 {
     const auto isHigher = [number](qint64 row) { return row > number; };

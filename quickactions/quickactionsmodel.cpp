@@ -49,12 +49,12 @@ qint64 priorityOfRow(const QuickAction &action)
     \brief Lists the quick actions of the events screen.
 
     Packages offer a quick action by installing a definition file, \c{*.conf}, into
-    \c /usr/share/glimmera/quickactions; \l{marlo-quickactions(5)} tells what it holds.
+    \c /usr/share/glimmera/quickactions; \l{marlo-quickactions(5)} describes it.
     The model lists those that the user has enabled, in the user's order; with \l showPotential it
     lists all of them. It follows the directory, about a second after a change, and the user's lists.
-    (Rows that stay keep their places, though: with \l showPotential an action that is enabled or
-    disabled, one whose file gives another priority, and what another model or process orders anew
-    take their new places when the model is created the next time.)
+    Existing rows keep their places: an action that is enabled or disabled with \l showPotential, one
+    whose file has another priority, and a new order from another model or process get their new places
+    when the model is created the next time.
 
     \list
     \li \c /desktop/glimmera-marlo-home/events_screen_actions (dconf, list of strings): the paths of

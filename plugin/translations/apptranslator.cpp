@@ -21,7 +21,7 @@ bool loadForDefaultLocale(QTranslator *translator)
     return translator->load(QLocale(), catalog, localePrefix, directory);
 }
 
-// A digest of the file that would be loaded now; empty if there is none.
+// A digest of the file that would be loaded now; empty without a file.
 QByteArray digestForDefaultLocale()
 {
     QTranslator translator;

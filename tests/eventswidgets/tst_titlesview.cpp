@@ -735,7 +735,7 @@ void TestTitlesView::settersAnnounceChangesOnly()
 
 void TestTitlesView::signalsInOrder()
 {
-    // A property tells of its change before the values follow.
+    // A property's signal is emitted before the values change.
     ListModel model({named("a", 1)});
     TitlesView view;
     QStringList seen;

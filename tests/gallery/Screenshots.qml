@@ -362,7 +362,7 @@ Gallery {
     }
 
     Component.onCompleted: nextShot()
-    // Moving items cause new frames. The screenshot is taken when there are none.
+    // Moving items cause new frames. The screenshot is taken when no new frame comes.
     onFrameSwapped: {
         if (step === (shots[shot].steps || []).length && !shots[shot].moving) {
             still.restart();

@@ -71,7 +71,7 @@ void CardHelper::install(const QString &scenario, const QByteArray &output)
         qFatal("no such scenario: %s", qPrintable(scenario));
     }
     Files::write(inFolder("output"), output);
-    // Made anew each time: one that is being run must not be written to.
+    // A new file each time: a program that is running must not be written to.
     remove();
     Files::write(
         program,

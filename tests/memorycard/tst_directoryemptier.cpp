@@ -472,14 +472,14 @@ void tst_DirectoryEmptier::wideFolder()
 
 void tst_DirectoryEmptier::wideFoldersInDeepTree()
 {
-    // Deeper than descriptors are kept, with work left at every level on the way back.
+    // Deeper than the number of descriptors that are kept, with entries left at every level.
     constexpr int depth = 150;
     makeDeepTree(m_top, depth);
     CallCounter counter;
     QVERIFY(empty(m_top));
     QCOMPARE(list(m_top), QByteArrayList());
     QCOMPARE(counter.openDescriptors, maxOpenDescriptors);
-    // A folder is opened once, and those that are not kept open once more on the way back.
+    // A directory is opened once. Those that are not kept open are opened once more later.
     QVERIFY(counter.counts.value("openat") > depth + 2 * (depth + 1));
     QVERIFY(counter.counts.value("openat") < 2 * depth + 2 * (depth + 1));
 }
@@ -769,7 +769,7 @@ void tst_DirectoryEmptier::wayMovedOutAndReplaced_data()
 void tst_DirectoryEmptier::wayMovedOutAndReplaced()
 {
     QFETCH(const bool, full);
-    // In the place of a folder on the way stands another one: it was not listed and is not entered.
+    // Another directory has taken the name of a parent: it was not listed and is not entered.
     constexpr int depth = 150;
     makeDeepTree(m_top, depth);
     makeFile(chainPath(m_top, depth) + "/trigger");

@@ -681,7 +681,7 @@ void TestMemoryCardFormatter::retriesWhenTheStatusIsError()
     TRY(m_formatter->status() == Formatter::Idle && m_formatter->filesystemType() == ext4);
     QVERIFY(!m_formatter->busy());
     QCOMPARE(m_helper->runs().last(), words("probe testcard2"));
-    // Being busy is told of once in between, if at all: it may be over when that is due.
+    // busyChanged() is emitted at most once in between: the step may be over by then.
     QVERIFY2(m_events->line().endsWith("Probing, busy, type ext4, Idle, not busy")
                  || m_events->line().endsWith("not busy, Probing, busy, type ext4, Idle, not busy"),
              m_events->line().constData());
@@ -1224,7 +1224,7 @@ void TestMemoryCardFormatter::refusedCommandLeavesItsQueueBehind()
     QCOMPARE(m_events->line(), QByteArray("not busy"));
     QCOMPARE(m_formatter->status(), Formatter::Idle);
 
-    // What is left runs first, and takes the name that there is by now.
+    // The rest of the queue runs first, with the name set since then.
     m_formatter->setDeviceName(cardName);
     m_events->clear();
     m_formatter->unmount();
@@ -1734,7 +1734,7 @@ void TestMemoryCardFormatter::goesAfterAFailure()
     startDiskService("Failed");
     m_formatter->setDeviceName(cardName);
     m_events->clear();
-    // What is asked for now is still to be done when the formatter goes.
+    // This request is still queued when the formatter is destroyed.
     onStatus(Formatter::Error, [this] { m_formatter->mount(); });
     m_formatter->mount();
     while (m_formatter->status() != Formatter::Error) {

@@ -249,8 +249,8 @@ void TestGVariantConversion::damagedDataIsInvalid_data()
     row("string of half a surrogate pair", "s", QByteArray("\xed\xa0\xbd\0", 4));
     row("string with a NUL", "s", QByteArray("a\0b\0", 4));
     row("empty string data", "s", "");
-    row("object path that is none", "o", QByteArray("no path\0", 8));
-    row("signature that is none", "g", QByteArray("!\0", 2));
+    row("invalid object path", "o", QByteArray("no path\0", 8));
+    row("invalid signature", "g", QByteArray("!\0", 2));
     row("list whose offsets lie outside", "as", QByteArray("a\0\xff", 3));
     row("list whose elements overlap", "as", QByteArray("a\0\2\0\2\0\2", 7));
     row("variant of no type", "v", QByteArray("1234\0!", 6));

@@ -215,7 +215,7 @@ TestCase {
 
     function test_restoringWithNothingSaved(data) {
         const page = createTemporaryObject(locationPage, test);
-        // Seen to change: what is stored here is none of an earlier test's.
+        // The value changes, so it is not left over from an earlier test.
         for (const here of [1, 2]) {
             set(page, true, true, 2, here);
             page.saveCustomSettings();

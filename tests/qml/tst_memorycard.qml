@@ -72,7 +72,7 @@ TestCase {
         const formatter = createTemporaryObject(card, test);
         const types = formatter.supportedFormatTypes;
         verify(types.every(type => ["vfat", "ext4"].includes(type)), types);
-        // Looked up anew: programs that cannot be run make nothing.
+        // Looked up again: a program that cannot be run does not count.
         root.removeFile("/sbin/mkfs.vfat");
         root.writeFile("/sbin/mkfs.vfat", "");
         root.removeFile("/sbin/mkfs.ext4");
@@ -192,7 +192,7 @@ TestCase {
         });
         compare(messages,
                 ['"' + data.method + '" error: org.freedesktop.DBus.Error.ServiceUnknown']);
-        // The error is none of the disk service's own, and the sequence ends with it.
+        // The error is not one of the disk service's own, and it ends the sequence.
         compare(formatter.status, MemoryCardFormatter.Error);
         compare(formatter.heard, ["busy false"]);
     }

@@ -406,7 +406,7 @@ void TestQuickAction::shorterThanItSays()
     QVERIFY(number.open(QIODevice::ReadOnly));
     const QByteArray content = number.readAll();
     if (number.size() <= content.size()) {
-        QSKIP("the kernel tells the size of its files as it is");
+        QSKIP("the kernel reports the true size of its files");
     }
     Files::makeLink(number.fileName(), m_path);
     const QVariantMap config = Action(m_path, true).config();

@@ -1,7 +1,7 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-// What becomes of a tap: the call, its errors, and the way to the store.
+// A tap: the call, its errors, and the call to the store.
 
 #include "files.h"
 #include "messagelog.h"
@@ -135,7 +135,7 @@ void TestTriggering::callsWithoutPathOrInterface()
     QCOMPARE(lamp.calls().constFirst().member(), QStringLiteral("toggle"));
 
     m_model->triggerAction(1);
-    // Qt has a word to say of it too.
+    // Qt logs a message too.
     QTRY_COMPARE(messages().size(), 2);
     m_expected = messages();
     QCOMPARE(m_expected.last(),
@@ -296,7 +296,7 @@ void TestTriggering::invalidNamesAreReported()
         "remote-interface=%1\nremote-method=%2\nrequires-package=p\n");
     m_model->componentComplete();
     m_model->triggerAction(0);
-    // Qt has a word to say of it too.
+    // Qt logs a message too.
     QTRY_COMPARE(messages().size(), 2);
     m_expected = messages();
     const QString text = m_expected.last();

@@ -88,6 +88,7 @@ case("bad-trailing-comma", file(widget(available_path='"/usr/bin/lamp",')), no_v
 case("bad-trailing-comma-of-entries", file(short(), ""), no_value(4))
 case("bad-no-value", '{ "widgets":\n}', no_json(2))
 case("bad-comma-in-unclosed-text", '{ "widgets": [],\n"x": "a,\n}', no_json(3))
+case("bad-comma-before-bad-byte", '{ "widgets": [],\n"x": ",\n]\udcff" }', no_json(3))
 case("bad-comment", '{\n// The lamp.\n"widgets": []\n}', no_json(2))
 case("bad-quotes", "{\n'widgets': []\n}", no_json(2))
 case("bad-cut-off", '{\n"widgets": [\n{ "path": "a" }\n', no_json(3))

@@ -357,7 +357,7 @@ void TestEventsWidgetsModel::placesByOrder()
     }
     QTEST(rows, "rows");
 
-    // One that comes later goes behind those of its own order, too.
+    // A later widget goes behind those of its own order, too.
     writeFile("test.json", widgets + R"(, { "path": "late", "order": 3 })");
     model.directoryChanged();
     if (orders == QVector<int>{1, 3, 7}) {
@@ -379,7 +379,7 @@ void TestEventsWidgetsModel::repeatedPathInOneFile()
              QStringLiteral("2"));
     QCOMPARE(inserted.size(), 2);
     QCOMPARE(changed.size(), 1);
-    // And so it goes at every scan: the row becomes the first and then the second again.
+    // Every scan does the same: the row becomes the first widget and then the second again.
     model.directoryChanged();
     QCOMPARE(changed.size(), 3);
     QCOMPARE(model.data(model.index(0), EventsWidgetsModel::TitleRole).toString(),
@@ -393,7 +393,7 @@ void TestEventsWidgetsModel::repeatedPathInTwoFiles()
     Model model;
     QCOMPARE(model.rowCount(), 1);
 
-    // Whichever was last: the other one takes over.
+    // The file that was read last defines the row. Without it, the other one does.
     const QString title = model.data(model.index(0), EventsWidgetsModel::TitleRole).toString();
     Files::remove(pathOf((title + QStringLiteral(".json")).toLatin1().constData()));
     model.directoryChanged();
@@ -435,7 +435,7 @@ void TestEventsWidgetsModel::changedWidgetKeepsItsRow()
     QCOMPARE(changed.first().at(1).toModelIndex(), model.index(1));
     QCOMPARE(changed.first().at(2).value<QVector<int>>(), QVector<int>());
 
-    // The new order counts for those that come.
+    // The new order counts for the places of later widgets.
     writeFile("more.json", R"({ "path": "c", "order": 2 })");
     model.directoryChanged();
     QCOMPARE(paths(model), (QStringList{c, a, b}));
@@ -519,7 +519,7 @@ void TestEventsWidgetsModel::directoryMadeAgain()
     writeFile("test.json", R"({ "path": "b" })");
     QTRY_COMPARE(paths(model), QStringList{b});
 
-    // Files that are rewritten in place are seen in the new one as well.
+    // Files that are rewritten in place are noticed in the new directory, too.
     QFile file(pathOf("test.json"));
     QVERIFY(file.open(QIODevice::WriteOnly));
     file.write(R"({ "widgets": [ { "path": "c" } ] })");
@@ -537,7 +537,7 @@ void TestEventsWidgetsModel::rewrittenInPlace()
     QVERIFY(file.open(QIODevice::WriteOnly));
     file.write(R"({ "widgets": [ )");
     file.flush();
-    // A scan that meets the half of it finds no definition.
+    // A scan of the half-written file finds no definition.
     model.directoryChanged();
     QCOMPARE(paths(model), QStringList{b});
     QCOMPARE(m_log->takeTexts(),
@@ -546,7 +546,7 @@ void TestEventsWidgetsModel::rewrittenInPlace()
     file.close();
     QTRY_COMPARE(paths(model), (QStringList{b, c}));
 
-    // A new file that is made in place.
+    // A new file that is written in place.
     QFile added(pathOf("added.json"));
     QVERIFY(added.open(QIODevice::WriteOnly));
     QString report;
@@ -561,12 +561,12 @@ void TestEventsWidgetsModel::rewrittenInPlace()
 
 void TestEventsWidgetsModel::oneScanPerNotification()
 {
-    // Every scan says once that this is no definition.
+    // Every scan warns once that this is not a definition.
     Files::write(pathOf("bad.json"), "bad");
     const Model model;
     QCOMPARE(m_log->takeAll().size(), 1);
 
-    // A new file, complete before anybody looks: its making and its closing are one.
+    // A new file that is complete before the event loop runs causes one scan.
     QFile added(pathOf("added.json"));
     QVERIFY(added.open(QIODevice::WriteOnly));
     added.write(R"({ "widgets": [ { "path": "a" } ] })");
@@ -591,7 +591,7 @@ void TestEventsWidgetsModel::oneScanPerNotification()
 
 void TestEventsWidgetsModel::otherFilesAreIgnored()
 {
-    // Every scan says once that this is no definition.
+    // Every scan warns once that this is not a definition.
     Files::write(pathOf("bad.json"), "bad");
     const Model model;
     QCOMPARE(m_log->takeAll().size(), 1);
@@ -658,7 +658,7 @@ void TestEventsWidgetsModel::catalogsAreOnlyEverAdded()
     writeFile("test.json", R"({ "path": "a" })", "maps");
     Model model;
     QCOMPARE(qtTrId("maps-title"), QStringLiteral("Kartat"));
-    // Another catalog comes along, and the first one stays and is not loaded again.
+    // Another catalog is added; the first one stays and is not loaded again.
     writeFile("test.json", R"({ "path": "a" })", "atlas");
     model.directoryChanged();
     QCOMPARE(qtTrId("maps-title"), QStringLiteral("Atlas"));
@@ -716,7 +716,7 @@ void TestEventsWidgetsModel::emptyListEnablesNothing()
     Model model;
     QCOMPARE(column(model, EventsWidgetsModel::EnabledRole), QStringList{QStringLiteral("false")});
 
-    // And it is a choice that can be made.
+    // An empty list can also be the result of a choice.
     model.enableWidget(a);
     QCOMPARE(storedList(), QStringList{a});
     model.disableWidget(a);
@@ -744,7 +744,7 @@ void TestEventsWidgetsModel::valuesOfAnyType()
     DconfTool::waitUntilStored();
     DconfTool::write(keyName, QTest::currentDataTag());
     QTRY_VERIFY(m_key->value().isValid());
-    // Whatever it is, it is a choice: no default counts.
+    // Any stored value is a choice: the defaults do not count.
     writeFile("test.json",
               R"({ "path": "a" }, { "path": "b", "default_enabled": true }, { "path": "c" })");
     Model model;
@@ -770,7 +770,7 @@ void TestEventsWidgetsModel::firstChoiceEnablesAllOthers()
         column(model, EventsWidgetsModel::EnabledRole),
         (QStringList{QStringLiteral("true"), QStringLiteral("false"), QStringLiteral("true")}));
     QCOMPARE(storedList(), (QStringList{a, c}));
-    // Only what is different now, row by row.
+    // Only the rows that changed, one by one.
     QCOMPARE(changed.size(), 2);
     for (int i = 0; i < 2; ++i) {
         QCOMPARE(changed.at(i).at(0).toModelIndex(), model.index(i));
@@ -778,7 +778,7 @@ void TestEventsWidgetsModel::firstChoiceEnablesAllOthers()
         QCOMPARE(changed.at(i).at(2).value<QVector<int>>(), QVector<int>());
     }
 
-    // A widget that comes later is no choice of the user's.
+    // A later widget is not in the list of the user.
     writeFile("more.json", R"({ "path": "d", "default_enabled": true })");
     model.directoryChanged();
     QCOMPARE(column(model, EventsWidgetsModel::EnabledRole).last(), QStringLiteral("false"));
@@ -805,7 +805,7 @@ void TestEventsWidgetsModel::disablesAll()
     Model model;
     model.disableWidget(a);
     QCOMPARE(storedList(), (QStringList{b, c}));
-    // Paths are told apart by case.
+    // Paths are case-sensitive.
     model.disableWidget(QStringLiteral("B"));
     QCOMPARE(storedList(), (QStringList{b, c}));
     model.enableWidget(QStringLiteral("A"));
@@ -864,7 +864,7 @@ void TestEventsWidgetsModel::choiceBeforeCompletion()
 
 void TestEventsWidgetsModel::firstChoiceBeforeCompletion()
 {
-    // No widget is known yet, so none is stored beside it.
+    // No other widget is known yet, so none is stored with it.
     Model model(false);
     model.enableWidget(a);
     QCOMPARE(storedList(), QStringList{a});
@@ -881,7 +881,7 @@ void TestEventsWidgetsModel::followsTheKey()
     m_key->set(QStringList{a});
     QTRY_COMPARE(enabled(), (QStringList{yes, no}));
 
-    // By another program.
+    // Another process changes the key.
     DconfTool::waitUntilStored();
     DconfTool::write(keyName, "['a', 'b']");
     QTRY_COMPARE(enabled(), (QStringList{yes, yes}));
@@ -900,7 +900,7 @@ void TestEventsWidgetsModel::updatesAvailability()
     const auto available = [&model] { return column(model, EventsWidgetsModel::AvailableRole); };
     const QString yes = QStringLiteral("true");
     const QString no = QStringLiteral("false");
-    // Listed all the same.
+    // An unavailable widget is listed, too.
     QCOMPARE(available(), (QStringList{no, yes, yes}));
 
     QSignalSpy changed(&model, &Model::dataChanged);
@@ -918,7 +918,7 @@ void TestEventsWidgetsModel::updatesAvailability()
     QCOMPARE(available(), (QStringList{no, yes, yes}));
     QCOMPARE(changed.size(), 2);
 
-    // A scan looks as well, and says that the widget is another.
+    // A scan checks this too, and reports that the whole widget changed.
     Files::write(needed, "");
     model.directoryChanged();
     QCOMPARE(available(), (QStringList{yes, yes, yes}));
@@ -932,7 +932,7 @@ void TestEventsWidgetsModel::handlersMayCallBack()
     Model model;
     int answers = 0;
     const auto answer = [&] {
-        // At a loss for an end, otherwise.
+        // Otherwise the answers would never end.
         if (++answers > 20) {
             return;
         }
@@ -959,7 +959,7 @@ void TestEventsWidgetsModel::handlersMayCallBack()
                                            : R"({ "path": "c", "order": 0 })");
         QTRY_VERIFY(answers > before);
     }
-    // In the end it is what the files and the key say.
+    // Finally the model agrees with the files and the key.
     Files::remove(pathOf("test.json"));
     QTRY_COMPARE(model.rowCount(), 0);
     writeFile("test.json", R"({ "path": "a", "order": 1 }, { "path": "b", "order": 2 })");
@@ -998,7 +998,7 @@ void TestEventsWidgetsModel::choicesMadeInTheMiddleOfAScan()
     m_key->set(QStringList{QStringLiteral("stored")});
     writeFile("test.json", R"({ "path": "a" }, { "path": "b" }, { "path": "c" })");
     Model model(false);
-    // The second choice starts from the first, not from what was before.
+    // The second choice starts from the result of the first.
     QObject context;
     connect(&model, &Model::rowsInserted, &context, [&] {
         if (model.rowCount() == 1) {
@@ -1031,7 +1031,7 @@ void TestEventsWidgetsModel::firstChoiceInTheMiddleOfAScan()
 
 void TestEventsWidgetsModel::requestsInHandlersRunOnce()
 {
-    // Every scan says once that this is no definition.
+    // Every scan warns once that this is not a definition.
     Files::write(pathOf("bad.json"), "bad");
     const QString needed = QStringLiteral("/usr/share/glimmera/needed");
     Files::remove(needed);
@@ -1072,7 +1072,7 @@ void TestEventsWidgetsModel::requestsInHandlersRunOnce()
 
 void TestEventsWidgetsModel::languageChangesInTheMiddleOfAScan()
 {
-    // Two files, so that one may be left to read when the catalog of the other is installed.
+    // Two files: one may still be unread when the catalog of the other is installed.
     writeFile("1.json", R"({ "path": "a", "default_enabled": true })", "maps");
     writeFile("2.json", R"({ "path": "b", "default_enabled": true })", "atlas");
     Model model(false);

@@ -157,7 +157,7 @@ private:
     QAbstractItemModelTester m_tester{this, QAbstractItemModelTester::FailureReportingMode::QtTest};
 };
 
-// Answers the reading of its property.
+// Calls a function when its property is read.
 class Answering : public QObject
 {
     Q_OBJECT
@@ -291,7 +291,7 @@ void TestTitlesView::anotherModel()
     QCOMPARE(view.model(), &second);
     QCOMPARE(view.values(), list({"b"}));
 
-    // Nothing of the first one reaches the view any more.
+    // The view no longer follows the first model.
     second.reads = 0;
     first.insert(0, named("c"));
     first.change(0, named("d"));
@@ -324,7 +324,7 @@ void TestTitlesView::destroyedModel()
     view.setModel(&other);
     QCOMPARE(view.values(), list({"b"}));
 
-    // One that was replaced before is of no interest.
+    // The destruction of a replaced model changes nothing.
     auto replaced = std::make_unique<ListModel>();
     view.setModel(replaced.get());
     view.setModel(&other);
@@ -372,7 +372,7 @@ void TestTitlesView::modelDestroyedWhileItIsRead()
     }
 }
 
-// A property that is read may lead back to the view: what it shows is of its last role all the same.
+// Reading a property may call the view: it still shows the values of its last role.
 void TestTitlesView::roleChangedWhileItIsRead()
 {
     Answering object;
@@ -471,7 +471,7 @@ void TestTitlesView::followsPaths_data()
     row("object.missing", "");
     row("object.missing.objectName", "");
     row("object.nothing.objectName", "");
-    // A step from something that is no object is left out.
+    // A step from a value that is not an object is skipped.
     row("name.objectName", "a");
     row("name.objectName.objectName", "a");
     row("object.objectName.objectName", "outer");
@@ -719,7 +719,7 @@ void TestTitlesView::settersAnnounceChangesOnly()
     view.setRole(name);
     view.setMatchRole(kind);
     view.setMatch(1);
-    // Equal as values go, whatever their types.
+    // Equal values of different types.
     view.setMatch(1.0);
     QCOMPARE(role.size() + matchRole.size() + match.size(), 0);
     QCOMPARE(model.reads, 0);
@@ -801,7 +801,7 @@ void TestTitlesView::joins()
     }
     QCOMPARE(view.value(), sentence);
 
-    // For any list, whatever the view shows.
+    // Any list, independent of the state of the view.
     QSignalSpy changed(&view, &TitlesView::valueChanged);
     const TitlesView another;
     QCOMPARE(another.joined(texts), sentence);

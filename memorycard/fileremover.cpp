@@ -69,9 +69,8 @@ bool isRootDirectory(const struct stat &directory)
         || (root.st_dev == directory.st_dev && root.st_ino == directory.st_ino);
 }
 
-// Whether the directory may lie on the device. This cannot be known of file systems that number
-// themselves instead of bearing the number of their block device (major number 0), nor of a device
-// without a node here.
+// Whether the directory may be on the device. This cannot be known if the file system has a number of
+// its own (major number 0) instead of that of a block device, nor if the device has no node here.
 bool mayLieOn(const QByteArray &device, const struct stat &directory)
 {
     struct stat node = {};
@@ -79,8 +78,8 @@ bool mayLieOn(const QByteArray &device, const struct stat &directory)
         || major(directory.st_dev) == 0 || directory.st_dev == node.st_rdev;
 }
 
-// Empties the card that is mounted on the directory, given in the bytes of the mount table: they
-// are its name in whatever encoding.
+// Empties the card that is mounted on the directory. The bytes of the mount table are the name of the
+// directory, in whatever encoding.
 bool emptyMount(const QByteArray &device, const char *directory)
 {
     // A relative path is no mount directory, and an empty one would be the current directory.
@@ -125,7 +124,7 @@ bool FileRemover::removeAllEntries(const QString &path)
 bool FileRemover::emptyCard() const
 {
     const QByteArray device = QFile::encodeName(m_devicePath);
-    // Other sources are words like "tmpfs" and "none", which name no card and occur many times.
+    // Other sources are words such as "tmpfs" and "none", which are no devices and occur many times.
     if (!device.startsWith('/')) {
         return false;
     }

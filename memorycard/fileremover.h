@@ -9,11 +9,11 @@
 #include <QString>
 
 /*
-    Removes all files and folders from a mounted memory card and leaves its mount directory in
+    Removes all files and directories from a mounted memory card and leaves its mount directory in
     place.
 
-    Made for one run on a thread pool, which deletes it afterwards. Exactly one of the two signals
-    is emitted, once, from the pool's thread, as the last thing that run() does.
+    A remover runs once, on a thread pool, which deletes it afterwards. run() ends by emitting exactly
+    one of the two signals, once, from the pool's thread.
 */
 class FileRemover : public QObject, public QRunnable
 {
@@ -25,8 +25,8 @@ public:
 
     void run() override;
 
-    // Removes everything below the directory. True when all of it went; an empty directory and one
-    // that cannot be read give true, too.
+    // Removes everything below the directory and returns whether all of it was removed: true, too, for
+    // an empty directory and for one that cannot be read.
     static bool removeAllEntries(const QString &path);
 
 Q_SIGNALS:

@@ -200,9 +200,9 @@ MemoryCardFormatter::~MemoryCardFormatter()
     if (m_process == nullptr || m_process->state() == QProcess::NotRunning) {
         return;
     }
-    // As a child the process would be killed here and waited for. A card that is half formatted is
-    // of no use to anybody, and that it be formatted has been agreed to: the helper may finish. Its
-    // process object goes when it has; should the application end before, the helper goes on.
+    // A child process would be killed here and waited for. A card that is half formatted cannot be
+    // used, and the user has agreed to the formatting: the helper may finish. Its process object is
+    // deleted afterwards. If the application ends earlier, the helper still goes on.
     m_process->setParent(nullptr);
     connect(m_process, &QProcess::stateChanged, m_process, [process = m_process](auto state) {
         if (state == QProcess::NotRunning) {
@@ -218,14 +218,14 @@ MemoryCardFormatter::~MemoryCardFormatter()
     \qmlproperty enumeration MemoryCardFormatter::status
     \readonly
 
-    What the formatter does:
+    The state of the formatter:
 
     \value MemoryCardFormatter.Idle Nothing; the last sequence ended well, if there was one.
     \value MemoryCardFormatter.Unmounting The card has been unmounted.
     \value MemoryCardFormatter.Formatting The card is being formatted.
     \value MemoryCardFormatter.RemovingFiles The files on the card are being removed.
     \value MemoryCardFormatter.Mounting The card has been mounted.
-    \value MemoryCardFormatter.Probing The helper looks what file system is on the card.
+    \value MemoryCardFormatter.Probing The helper finds out which file system is on the card.
     \value MemoryCardFormatter.Error Nothing; the last sequence failed.
 
     While the disk service is asked to mount or unmount, the status is still the one before.
@@ -293,10 +293,9 @@ void MemoryCardFormatter::setDevicePath(const QString &path)
     \qmlproperty string MemoryCardFormatter::filesystemType
     \readonly
 
-    The type of the file system on the card, such as \c vfat, as the helper program reported it when
-    it was last run to probe: what it wrote to its standard output, without white space around it. A
-    helper that exits with an error usually leaves it empty; one that crashes or cannot be started
-    leaves it as it was.
+    The type of the file system on the card, such as \c vfat. It is the standard output of the helper
+    program's last probe, without white space around it. It is usually empty after a helper that exits
+    with an error; a helper that crashes or cannot be started does not change it.
 */
 QString MemoryCardFormatter::filesystemType() const
 {
@@ -366,7 +365,7 @@ void MemoryCardFormatter::format(const QString &type)
         return;
     }
     enqueue({Unmounting, Formatting, Mounting}, type);
-    // Here as in the other operations: busy has not changed yet, but users rely on being told.
+    // As in the other operations: busy has not changed yet, but users rely on the signal.
     Q_EMIT busyChanged();
     startIfNothingRuns();
 }
@@ -605,14 +604,14 @@ void MemoryCardFormatter::doNextCommand()
 void MemoryCardFormatter::startFormatting(const Command &command)
 {
     QStringList arguments;
-    // Any other type is left without a command word, on purpose: the helper's exit code decides.
+    // Any other type has no command word, on purpose: the helper's exit code decides.
     if (command.formatType == vfat) {
         arguments.append(helperFormatVfat);
     } else if (command.formatType == ext4) {
         arguments.append(helperFormatExt4);
     }
     arguments.append(QFileInfo(command.devicePath).fileName());
-    // Nobody reads what is written here, and a format must not die of a reader that has gone.
+    // Nobody reads the output. A pipe would end the helper if it outlived the application.
     m_process->setStandardOutputFile(QProcess::nullDevice());
     runHelper(Formatting, arguments);
 }
@@ -633,7 +632,7 @@ void MemoryCardFormatter::runHelper(Status command, const QStringList &arguments
         return;
     }
     m_process->start(helperProgram, arguments);
-    // A program that is not there is reported later; until then it is being started.
+    // A missing program is reported later. Until then the process is starting.
     if (m_process->state() != QProcess::NotRunning) {
         setStatus(command);
     }

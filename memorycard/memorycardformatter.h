@@ -32,7 +32,7 @@ class MemoryCardFormatter : public QObject
     Q_PROPERTY(bool busy READ busy NOTIFY busyChanged)
 
 public:
-    // A state of the formatter; those between Idle and Error are the commands of its queue, too.
+    // The states of the formatter. Those between Idle and Error are also the commands of its queue.
     enum Status {
         Idle,
         Unmounting,

@@ -8,9 +8,9 @@
 #include <QByteArrayList>
 
 /*
-    Makes and reads trees of files whose names are any bytes, which QFile and QDir would pass
-    through the locale's encoding. What cannot be made ends the program: no test goes on with a tree
-    other than the one it asked for.
+    Creates and reads trees of files whose names are any bytes, which QFile and QDir would convert by
+    the locale's encoding. The program ends if an entry cannot be created, so that no test runs with an
+    incomplete tree.
 */
 namespace FileTree {
 
@@ -20,16 +20,16 @@ void makeFiles(const QByteArray &folder, int count);
 void makeLink(const QByteArray &path, const QByteArray &target);
 void makePipe(const QByteArray &path);
 void makeSocket(const QByteArray &path);
-// A chain of folders with one name each below the folder at path.
+// A chain of directories below the one at path, all of the same name.
 void makeChain(const QByteArray &path, int depth, const QByteArray &name = "d");
-// The path of a folder of such a chain.
+// The path of a directory of such a chain.
 QByteArray chainPath(const QByteArray &path, int depth, const QByteArray &name = "d");
 
 bool exists(const QByteArray &path);
 QByteArray read(const QByteArray &path);
-// The names in a folder, in directory order.
+// The names in a directory, in directory order.
 QByteArrayList list(const QByteArray &path);
-// The paths of everything below a folder, relative to it, sorted.
+// The paths of everything below a directory, relative to it, sorted.
 QByteArrayList listAll(const QByteArray &path);
 
 } // namespace FileTree

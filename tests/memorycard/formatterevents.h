@@ -10,8 +10,8 @@
 #include <QMetaEnum>
 
 /*
-    The signals of a formatter, in the order in which they are emitted, as a line of words with what
-    a property has then: the key of a status, "busy" or "not busy", "name N", "path P", "type T",
+    The signals of a formatter as one line, in the order in which they are emitted, with the value of
+    the property at that time: the key of a status, "busy" or "not busy", "name N", "path P", "type T",
     "mount K" or "unmount K" with the key of an error.
 */
 class FormatterEvents

@@ -8,14 +8,14 @@
 #include <QTemporaryDir>
 
 /*
-    A file system of its own, in memory, on a temporary folder. Trees that are made to be removed
-    lie in it, so that a remover that is broken and climbs out of its tree meets another device,
-    where it would otherwise meet the developer's files.
+    A file system in memory, mounted on a temporary directory. Trees that are to be removed are created
+    in it: a broken remover that leaves its tree reaches another device there, and not the developer's
+    files.
 */
 class ScratchFileSystem
 {
 public:
-    // Ends the program when there is no right to mount, which the sandbox grants to everybody.
+    // Ends the program if it may not mount. In the sandbox everybody may.
     ScratchFileSystem();
     ~ScratchFileSystem();
     Q_DISABLE_COPY_MOVE(ScratchFileSystem)

@@ -33,9 +33,9 @@ struct inotify_event;
     receiver that reads the directory sees everything that the watches do not report any more.
 
     All watchers of a process share one inotify instance, which is kept until the application ends.
-    A user may have only 128 of them, and closing one blocks for more than 10 ms. If no
-    instance is left, QFileSystemWatcher is used instead: it checks once a second, whatever the names are, and
-    does not notice a file that is rewritten in place.
+    A user may have only 128 of them, and closing one blocks for more than 10 ms. If no instance is
+    left, QFileSystemWatcher is used instead: it checks once a second, whatever the names are, and does
+    not notice a file that is rewritten in place.
 
     To be used on the main thread.
 */

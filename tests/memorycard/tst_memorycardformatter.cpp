@@ -21,6 +21,7 @@
 
 #include <cerrno>
 #include <functional>
+#include <initializer_list>
 #include <memory>
 
 #include <dlfcn.h>
@@ -134,8 +135,7 @@ private Q_SLOTS:
     void fileNameOfThePath();
     void outputOfTheProbe_data();
     void outputOfTheProbe();
-    void outputInPieces();
-    void floodOnStandardError();
+    void outputInPiecesOrWithMuchBesides();
     void failedProbe_data();
     void failedProbe();
     void crashedProbe();
@@ -160,8 +160,7 @@ private Q_SLOTS:
     void removeAllFilesNeedsAPath();
     void removeAllFilesFromACardThatIsNotMounted();
     void removeAllFilesNeedsADescriptor();
-    void mount();
-    void unmount();
+    void mountAndUnmount();
     void operationsWhileBusy();
 
     void requestsOnTheWire();
@@ -213,13 +212,24 @@ private Q_SLOTS:
 private:
     // The disk service that does what the words say.
     void startDiskService(const char *scenarios);
-    // A card that has been probed, with what came of that forgotten.
+    // Gives the formatter a name and a path, and forgets the events up to the end of the probe.
     void setCard(const QString &name, const QString &path);
+    // Both, with the usual card.
+    void start(const char *scenarios);
+    void startWithoutPath(const char *scenarios);
     void makeFormatter();
+    Formatter *forgetEvents();
+    // Mounts or unmounts.
+    void request(bool mounts);
+    // The scenario "missing" is a helper that is not there.
+    void installHelper(const QString &scenario, const QByteArray &output = QByteArray());
+    static void addScenarios(std::initializer_list<const char *> scenarios);
+    std::unique_ptr<QObject> createFromQml(const QByteArray &source);
     // Answers each change of the status to the given one.
     void onStatus(Formatter::Status status, const std::function<void()> &answer);
     QByteArray takeLog() { return m_log->takeReport().toUtf8(); }
 
+    QQmlEngine m_engine;
     std::unique_ptr<MessageLog> m_log;
     std::unique_ptr<CardHelper> m_helper;
     std::unique_ptr<DiskServicePeer> m_diskService;
@@ -274,6 +284,59 @@ void TestMemoryCardFormatter::setCard(const QString &name, const QString &path)
     m_formatter->setDevicePath(path);
     TRY(m_formatter->status() == Formatter::Idle);
     m_events->clear();
+}
+
+void TestMemoryCardFormatter::start(const char *scenarios)
+{
+    startDiskService(scenarios);
+    setCard(cardName, card);
+}
+
+void TestMemoryCardFormatter::startWithoutPath(const char *scenarios)
+{
+    startDiskService(scenarios);
+    m_formatter->setDeviceName(cardName);
+    m_events->clear();
+}
+
+Formatter *TestMemoryCardFormatter::forgetEvents()
+{
+    m_events->clear();
+    return m_formatter.get();
+}
+
+void TestMemoryCardFormatter::request(bool mounts)
+{
+    (m_formatter.get()->*(mounts ? &Formatter::mount : &Formatter::unmount))();
+}
+
+void TestMemoryCardFormatter::installHelper(const QString &scenario, const QByteArray &output)
+{
+    if (scenario == QLatin1String("missing")) {
+        m_helper->remove();
+    } else {
+        m_helper->install(scenario, output);
+    }
+}
+
+void TestMemoryCardFormatter::addScenarios(std::initializer_list<const char *> scenarios)
+{
+    QTest::addColumn<QString>("scenario");
+    for (const char *scenario : scenarios) {
+        QTest::newRow(scenario) << QString::fromLatin1(scenario);
+    }
+}
+
+std::unique_ptr<QObject> TestMemoryCardFormatter::createFromQml(const QByteArray &source)
+{
+    qmlRegisterType<Formatter>("Test", 1, 0, "MemoryCardFormatter");
+    QQmlComponent component(&m_engine);
+    component.setData(source, QUrl(QStringLiteral("test.qml")));
+    std::unique_ptr<QObject> object(component.create());
+    if (object == nullptr) {
+        qWarning("%s", qPrintable(component.errorString()));
+    }
+    return object;
 }
 
 void TestMemoryCardFormatter::onStatus(Formatter::Status status,
@@ -338,25 +401,18 @@ void TestMemoryCardFormatter::interface()
 
 void TestMemoryCardFormatter::enumKeysInQml()
 {
-    qmlRegisterType<Formatter>("Test", 1, 0, "MemoryCardFormatter");
-    QQmlEngine engine;
-    QQmlComponent component(&engine);
-    component.setData("import QtQml 2.15\nimport Test 1.0\n"
-                      "QtObject {\n"
-                      "    property var status: ['Idle', 'Unmounting', 'Formatting',\n"
-                      "        'RemovingFiles', 'Mounting', 'Probing', 'Error']\n"
-                      "        .map(function(key) { return MemoryCardFormatter[key] })\n"
-                      "    property var errors: ['Failed', 'Cancelled', 'AlreadyCancelled',\n"
-                      "        'NotAuthorized', 'NotAuthorizedCanObtain',\n"
-                      "        'NotAuthorizedDismissed', 'AlreadyMounted', 'NotMounted',\n"
-                      "        'OptionNotPermitted', 'MountedByOtherUser',\n"
-                      "        'AlreadyUnmounting', 'NotSupported', 'Timedout',\n"
-                      "        'WouldWakeup', 'DeviceBusy']\n"
-                      "        .map(function(key) { return MemoryCardFormatter['Error' + key] })\n"
-                      "}",
-                      QUrl(QStringLiteral("test.qml")));
-    const std::unique_ptr<QObject> object(component.create());
-    QVERIFY2(object != nullptr, qPrintable(component.errorString()));
+    const auto object = createFromQml(R"(import QtQml 2.15
+        import Test 1.0
+        QtObject {
+            property var status: ['Idle', 'Unmounting', 'Formatting', 'RemovingFiles', 'Mounting',
+                'Probing', 'Error'].map(function(key) { return MemoryCardFormatter[key] })
+            property var errors: ['Failed', 'Cancelled', 'AlreadyCancelled', 'NotAuthorized',
+                'NotAuthorizedCanObtain', 'NotAuthorizedDismissed', 'AlreadyMounted', 'NotMounted',
+                'OptionNotPermitted', 'MountedByOtherUser', 'AlreadyUnmounting', 'NotSupported',
+                'Timedout', 'WouldWakeup', 'DeviceBusy']
+                .map(function(key) { return MemoryCardFormatter['Error' + key] })
+        })");
+    QVERIFY(object != nullptr);
     QCOMPARE(object->property("status").toList(), (QVariantList{0, 1, 2, 3, 4, 5, 6}));
     QCOMPARE(object->property("errors").toList(),
              (QVariantList{0, 1, 2, 3, 4, 5, 6, 7, 8, 9, 10, 11, 12, 13, 14}));
@@ -365,26 +421,21 @@ void TestMemoryCardFormatter::enumKeysInQml()
 void TestMemoryCardFormatter::errorsInQml()
 {
     startDiskService("Mount=DeviceBusy Unmount=NotMounted");
-    qmlRegisterType<Formatter>("Test", 1, 0, "MemoryCardFormatter");
-    QQmlEngine engine;
-    QQmlComponent component(&engine);
-    component.setData("import Test 1.0\n"
-                      "MemoryCardFormatter {\n"
-                      "    property string seen\n"
-                      "    deviceName: 'testcard1'\n"
-                      "    onUnmountError: {\n"
-                      "        seen += error === MemoryCardFormatter.ErrorNotMounted\n"
-                      "        seen += status === MemoryCardFormatter.Idle\n"
-                      "    }\n"
-                      "    onMountError: seen += error === MemoryCardFormatter.ErrorDeviceBusy\n"
-                      "    onStatusChanged: {\n"
-                      "        seen += status === MemoryCardFormatter.Error\n"
-                      "        mount()\n"
-                      "    }\n"
-                      "}",
-                      QUrl(QStringLiteral("test.qml")));
-    const std::unique_ptr<QObject> object(component.create());
-    QVERIFY2(object != nullptr, qPrintable(component.errorString()));
+    const auto object = createFromQml(R"(import Test 1.0
+        MemoryCardFormatter {
+            property string seen
+            deviceName: 'testcard1'
+            onUnmountError: {
+                seen += error === MemoryCardFormatter.ErrorNotMounted
+                seen += status === MemoryCardFormatter.Idle
+            }
+            onMountError: seen += error === MemoryCardFormatter.ErrorDeviceBusy
+            onStatusChanged: {
+                seen += status === MemoryCardFormatter.Error
+                mount()
+            }
+        })");
+    QVERIFY(object != nullptr);
     QVERIFY(QMetaObject::invokeMethod(object.get(), "unmount"));
     TRY_COMPARE(object->property("seen").toString(), QStringLiteral("truetruetruetrue"));
     QCOMPARE(takeLog(),
@@ -430,8 +481,7 @@ void TestMemoryCardFormatter::newPathIsProbed()
     QCOMPARE(m_helper->runs(), QList<QStringList>{words("probe mmcblk1p1")});
 
     // The same again is no change.
-    m_events->clear();
-    m_formatter->setDevicePath(otherCard);
+    forgetEvents()->setDevicePath(otherCard);
     TRY_EVENTS("path /dev/testcard2, Probing, busy, Idle, not busy");
 
     m_events->clear();
@@ -453,8 +503,7 @@ void TestMemoryCardFormatter::samePathIsNotProbed()
 
 void TestMemoryCardFormatter::pathIsKeptWhileBusy()
 {
-    startDiskService("done");
-    setCard(cardName, card);
+    start("done");
     m_helper->install(QStringLiteral("held"));
     m_formatter->format(vfat);
     TRY_EVENTS("not busy, Unmounting, busy, Formatting");
@@ -530,23 +579,18 @@ void TestMemoryCardFormatter::outputOfTheProbe()
     QCOMPARE(m_formatter->filesystemType(), type);
 
     m_helper->install(QStringLiteral("done"), " \n");
-    m_events->clear();
-    m_formatter->setDevicePath(otherCard);
+    forgetEvents()->setDevicePath(otherCard);
     TRY_EVENTS("path /dev/testcard2, Probing, busy, type , Idle, not busy");
 }
 
-void TestMemoryCardFormatter::outputInPieces()
+void TestMemoryCardFormatter::outputInPiecesOrWithMuchBesides()
 {
-    m_helper->install(QStringLiteral("slow"), "ext4\n");
-    m_formatter->setDevicePath(card);
-    TRY_EVENTS("path /dev/testcard1, Probing, busy, type ext4, Idle, not busy");
-}
-
-void TestMemoryCardFormatter::floodOnStandardError()
-{
-    m_helper->install(QStringLiteral("noisy"), "ext4\n");
-    m_formatter->setDevicePath(card);
-    TRY_EVENTS("path /dev/testcard1, Probing, busy, type ext4, Idle, not busy");
+    for (const char *scenario : {"slow", "noisy"}) {
+        installHelper(QString::fromLatin1(scenario), "ext4\n");
+        makeFormatter();
+        m_formatter->setDevicePath(card);
+        TRY_EVENTS("path /dev/testcard1, Probing, busy, type ext4, Idle, not busy");
+    }
 }
 
 void TestMemoryCardFormatter::failedProbe_data()
@@ -594,8 +638,7 @@ void TestMemoryCardFormatter::crashedProbe()
     QCOMPARE(m_formatter->filesystemType(), vfat);
 
     m_helper->install(QStringLiteral("done"), "ext4\n");
-    m_events->clear();
-    m_formatter->setDevicePath(card);
+    forgetEvents()->setDevicePath(card);
     TRY_EVENTS("path /dev/testcard1, Probing, busy, type ext4, Idle, not busy");
 }
 
@@ -623,8 +666,7 @@ void TestMemoryCardFormatter::helperThatCannotRun()
     QCOMPARE(m_formatter->filesystemType(), vfat);
 
     m_helper->install(QStringLiteral("done"), "ext4\n");
-    m_events->clear();
-    m_formatter->setDevicePath(card);
+    forgetEvents()->setDevicePath(card);
     TRY_EVENTS("path /dev/testcard1, Probing, busy, type ext4, Idle, not busy");
 }
 
@@ -643,8 +685,7 @@ void TestMemoryCardFormatter::helperWithFewDescriptors()
         m_formatter->setDevicePath(card);
         TRY(m_events->line().contains("Error") || m_events->line().endsWith("Idle, not busy"));
         const bool probed = m_formatter->status() == Formatter::Idle;
-        m_events->clear();
-        m_formatter->format(vfat);
+        forgetEvents()->format(vfat);
         TRY(m_events->line().endsWith(probed ? "Mounting, Idle, not busy" : "Error, not busy"));
         started = started || probed;
         failed = failed || !probed;
@@ -659,20 +700,13 @@ void TestMemoryCardFormatter::helperWithFewDescriptors()
 
 void TestMemoryCardFormatter::retriesWhenTheStatusIsError_data()
 {
-    QTest::addColumn<QString>("scenario");
-    for (const char *scenario : {"missing", "crash", "exit=1"}) {
-        QTest::newRow(scenario) << QString::fromLatin1(scenario);
-    }
+    addScenarios({"missing", "crash", "exit=1"});
 }
 
 void TestMemoryCardFormatter::retriesWhenTheStatusIsError()
 {
     QFETCH(QString, scenario);
-    if (scenario == QLatin1String("missing")) {
-        m_helper->remove();
-    } else {
-        m_helper->install(scenario);
-    }
+    installHelper(scenario);
     onStatus(Formatter::Error, [this] {
         m_helper->install(QStringLiteral("done"), "ext4\n");
         m_formatter->setDevicePath(otherCard);
@@ -756,8 +790,7 @@ void TestMemoryCardFormatter::format()
 {
     QFETCH(QString, type);
     QFETCH(QStringList, arguments);
-    startDiskService("done");
-    setCard(cardName, card);
+    start("done");
     m_formatter->format(type);
     // Told although it has not changed yet.
     QCOMPARE(m_events->line(), QByteArray("not busy"));
@@ -796,17 +829,13 @@ void TestMemoryCardFormatter::formatOutputIsNotRead()
     QCOMPARE(m_formatter->filesystemType(), vfat);
     // And a probe is read again.
     m_helper->install(QStringLiteral("done"), "ext4\n");
-    m_events->clear();
-    m_formatter->setDevicePath(otherCard);
+    forgetEvents()->setDevicePath(otherCard);
     TRY_EVENTS("path /dev/testcard2, Probing, busy, type ext4, Idle, not busy");
 }
 
 void TestMemoryCardFormatter::failedFormat_data()
 {
-    QTest::addColumn<QString>("scenario");
-    for (const char *scenario : {"missing", "crash", "exit=1", "exit=255"}) {
-        QTest::newRow(scenario) << QString::fromLatin1(scenario);
-    }
+    addScenarios({"missing", "crash", "exit=1", "exit=255"});
 }
 
 void TestMemoryCardFormatter::failedFormat()
@@ -815,11 +844,7 @@ void TestMemoryCardFormatter::failedFormat()
     startDiskService("done");
     m_helper->install(QStringLiteral("done"), "vfat\n");
     setCard(cardName, card);
-    if (scenario == QLatin1String("missing")) {
-        m_helper->remove();
-    } else {
-        m_helper->install(scenario, "ext4\n");
-    }
+    installHelper(scenario, "ext4\n");
     m_formatter->format(vfat);
     TRY_EVENTS("not busy, Unmounting, busy, Formatting, Error, not busy");
     QTest::qWait(100);
@@ -833,8 +858,7 @@ void TestMemoryCardFormatter::failedFormat()
 
 void TestMemoryCardFormatter::stepsOfTheSameSequenceKeepBusy()
 {
-    startDiskService("done");
-    setCard(cardName, card);
+    start("done");
     QList<bool> busy;
     connect(m_formatter.get(), &Formatter::statusChanged, this,
             [this, &busy] { busy.append(m_formatter->busy()); });
@@ -861,20 +885,17 @@ void TestMemoryCardFormatter::removeAllFiles()
 void TestMemoryCardFormatter::removeAllFilesNeedsAPath()
 {
     m_formatter->setDeviceName(cardName);
-    m_events->clear();
-    m_formatter->removeAllFiles();
+    forgetEvents()->removeAllFiles();
     QCOMPARE(takeLog(), warning + "devicePath is empty.");
     QCOMPARE(m_events->line(), QByteArray("Error"));
 }
 
 void TestMemoryCardFormatter::removeAllFilesFromACardThatIsNotMounted()
 {
-    startDiskService("done");
-    setCard(cardName, card);
+    start("done");
     m_formatter->removeAllFiles();
     TRY_EVENTS("not busy, Mounting, busy, RemovingFiles, Error, not busy");
-    m_events->clear();
-    m_formatter->mount();
+    forgetEvents()->mount();
     TRY_EVENTS("not busy, Mounting, busy, Idle, not busy");
 }
 
@@ -895,40 +916,28 @@ void TestMemoryCardFormatter::removeAllFilesNeedsADescriptor()
         TRY_EVENTS("not busy, Mounting, busy, Error, not busy");
     }
     QCOMPARE(mounted.files(), words("file"));
-    m_events->clear();
-    m_formatter->removeAllFiles();
+    forgetEvents()->removeAllFiles();
     TRY_EVENTS("not busy, Mounting, busy, RemovingFiles, Idle, not busy");
     QCOMPARE(mounted.files(), QStringList());
 }
 
-void TestMemoryCardFormatter::mount()
+void TestMemoryCardFormatter::mountAndUnmount()
 {
-    startDiskService("done");
     // No path is needed.
-    m_formatter->setDeviceName(cardName);
-    m_events->clear();
-    m_formatter->mount();
-    QCOMPARE(m_events->line(), QByteArray("not busy"));
-    TRY_EVENTS("not busy, Mounting, busy, Idle, not busy");
-    QCOMPARE(m_diskService->members(), words("Mount"));
-}
-
-void TestMemoryCardFormatter::unmount()
-{
-    startDiskService("done");
-    m_formatter->setDeviceName(cardName);
-    m_events->clear();
-    m_formatter->unmount();
-    QCOMPARE(m_events->line(), QByteArray("not busy"));
-    TRY_EVENTS("not busy, Unmounting, busy, Idle, not busy");
-    QCOMPARE(m_diskService->members(), words("Unmount"));
+    startWithoutPath("done");
+    for (const bool mounts : {true, false}) {
+        const QByteArray status = mounts ? "Mounting" : "Unmounting";
+        m_events->clear();
+        request(mounts);
+        QCOMPARE(m_events->line(), QByteArray("not busy"));
+        TRY_EVENTS("not busy, " + status + ", busy, Idle, not busy");
+    }
+    QCOMPARE(m_diskService->members(), words("Mount Unmount"));
 }
 
 void TestMemoryCardFormatter::operationsWhileBusy()
 {
-    startDiskService("done");
-    m_formatter->setDeviceName(cardName);
-    m_events->clear();
+    startWithoutPath("done");
     m_helper->install(QStringLiteral("held"));
     m_formatter->setDevicePath(card);
     TRY_EVENTS("path /dev/testcard1, Probing, busy");
@@ -974,9 +983,7 @@ void TestMemoryCardFormatter::requestsOnTheWire()
 
 void TestMemoryCardFormatter::requestsHaveFiveMinutes()
 {
-    startDiskService("done");
-    m_formatter->setDeviceName(cardName);
-    m_events->clear();
+    startWithoutPath("done");
     for (const auto operation : {&Formatter::mount, &Formatter::unmount}) {
         lastTimeout = 0;
         (m_formatter.get()->*operation)();
@@ -1006,14 +1013,8 @@ void TestMemoryCardFormatter::errorsOfTheDiskService()
     QFETCH(Formatter::MountError, code);
     const QByteArray key = FormatterEvents::key(code);
     const QByteArray error = key.mid(int(strlen("Error")));
-    startDiskService(error.constData());
-    m_formatter->setDeviceName(cardName);
-    m_events->clear();
-    if (mounts) {
-        m_formatter->mount();
-    } else {
-        m_formatter->unmount();
-    }
+    startWithoutPath(error.constData());
+    request(mounts);
     const bool forgiven = error == "AlreadyMounted" || error == "AlreadyUnmounting";
     // The error before the status; a sequence that is over goes from Idle to Idle without a word.
     TRY_EVENTS(QByteArray("not busy, ") + (mounts ? "mount " : "unmount ") + key
@@ -1026,8 +1027,7 @@ void TestMemoryCardFormatter::errorsOfTheDiskService()
 
 void TestMemoryCardFormatter::errorEndsTheSequence()
 {
-    startDiskService("Unmount=NotMounted Mount=DeviceBusy");
-    setCard(cardName, card);
+    start("Unmount=NotMounted Mount=DeviceBusy");
     m_formatter->format(vfat);
     TRY_EVENTS("not busy, unmount ErrorNotMounted, Error");
     QCOMPARE(takeLog(), warning + "\"Unmount\" error: org.freedesktop.UDisks2.Error.NotMounted");
@@ -1058,8 +1058,7 @@ void TestMemoryCardFormatter::alreadyDoneGoesOn_data()
 void TestMemoryCardFormatter::alreadyDoneGoesOn()
 {
     QFETCH(QByteArray, error);
-    startDiskService(error.constData());
-    setCard(cardName, card);
+    start(error.constData());
     m_formatter->format(vfat);
     // The status passes over what was not done.
     TRY_EVENTS("not busy, unmount Error" + error + ", Formatting, busy, mount Error" + error
@@ -1098,11 +1097,7 @@ void TestMemoryCardFormatter::otherErrors()
         makeFormatter();
         m_formatter->setDeviceName(cardName);
         m_events->clear();
-        if (mounts) {
-            m_formatter->mount();
-        } else {
-            m_formatter->unmount();
-        }
+        request(mounts);
         TRY_EVENTS("not busy, Error");
         QCOMPARE(takeLog(), warning + (mounts ? "\"Mount\"" : "\"Unmount\"") + " error: " + error);
     }
@@ -1128,8 +1123,7 @@ void TestMemoryCardFormatter::namesThatMakeNoObjectPath()
     QFETCH(QString, name);
     startDiskService("done");
     m_formatter->setDeviceName(name);
-    m_events->clear();
-    m_formatter->unmount();
+    forgetEvents()->unmount();
     TRY_EVENTS("not busy, Error");
     // Behind what Qt itself has to say.
     const auto messages = m_log->takeAll();
@@ -1141,15 +1135,13 @@ void TestMemoryCardFormatter::namesThatMakeNoObjectPath()
     QCOMPARE(m_diskService->members(), QStringList());
 
     m_formatter->setDeviceName(cardName);
-    m_events->clear();
-    m_formatter->unmount();
+    forgetEvents()->unmount();
     TRY_EVENTS("not busy, Unmounting, busy, Idle, not busy");
 }
 
 void TestMemoryCardFormatter::slowDiskService()
 {
-    startDiskService("slow");
-    setCard(cardName, card);
+    start("slow");
     m_formatter->format(vfat);
     TRY_EVENTS("not busy, Unmounting, busy, Formatting, Mounting, Idle, not busy");
 }
@@ -1177,8 +1169,7 @@ void TestMemoryCardFormatter::withoutASystemBus()
     }
     QVERIFY(!QDBusConnection::systemBus().isConnected());
     m_formatter->setDeviceName(cardName);
-    m_events->clear();
-    m_formatter->mount();
+    forgetEvents()->mount();
     QCOMPARE(m_events->line(), QByteArray("not busy"));
     TRY_EVENTS("not busy, Error");
     QCOMPARE(takeLog(), warning + "\"Mount\" error: org.freedesktop.DBus.Error.Disconnected");
@@ -1190,8 +1181,7 @@ void TestMemoryCardFormatter::fromErrorOn()
     m_formatter->format(vfat);
     takeLog();
     m_formatter->setDeviceName(cardName);
-    m_events->clear();
-    m_formatter->mount();
+    forgetEvents()->mount();
     QCOMPARE(m_formatter->status(), Formatter::Error);
     TRY_EVENTS("not busy, Mounting, busy, Idle, not busy");
 }
@@ -1226,8 +1216,7 @@ void TestMemoryCardFormatter::refusedCommandLeavesItsQueueBehind()
 
     // The rest of the queue runs first, with the name set since then.
     m_formatter->setDeviceName(cardName);
-    m_events->clear();
-    m_formatter->unmount();
+    forgetEvents()->unmount();
     TRY_EVENTS("not busy, Formatting, busy, Mounting, Unmounting, Idle, not busy");
     QCOMPARE(m_helper->runs().last(), words("format_vfat testcard1"));
     QCOMPARE(m_diskService->members(), words("Mount Unmount"));
@@ -1237,15 +1226,13 @@ void TestMemoryCardFormatter::refusedCommandLeavesItsQueueBehind()
     setCard(QString(), card);
     m_formatter->removeAllFiles();
     QCOMPARE(takeLog(), critical + "Cannot unmount without device name");
-    m_events->clear();
-    m_formatter->setDevicePath(otherCard);
+    forgetEvents()->setDevicePath(otherCard);
     TRY_EVENTS("path /dev/testcard2, RemovingFiles, busy, Error, not busy");
 }
 
 void TestMemoryCardFormatter::emptyTypeDuringARequest()
 {
-    startDiskService("hung");
-    setCard(cardName, card);
+    start("hung");
     m_formatter->unmount();
     TRY_COMPARE(m_diskService->members(), words("Unmount"));
     m_formatter->format(QString());
@@ -1257,9 +1244,7 @@ void TestMemoryCardFormatter::emptyTypeDuringARequest()
 
 void TestMemoryCardFormatter::oneRequestAtATime()
 {
-    startDiskService("hung");
-    m_formatter->setDeviceName(cardName);
-    m_events->clear();
+    startWithoutPath("hung");
     m_formatter->mount();
     m_formatter->unmount();
     m_formatter->mount();
@@ -1281,8 +1266,7 @@ void TestMemoryCardFormatter::oneRequestAtATime()
 
 void TestMemoryCardFormatter::formatsOneAfterTheOther()
 {
-    startDiskService("hung");
-    setCard(cardName, card);
+    start("hung");
     m_formatter->format(vfat);
     m_formatter->format(ext4);
     TRY_COMPARE(m_diskService->members(), words("Unmount"));
@@ -1310,8 +1294,7 @@ void TestMemoryCardFormatter::probeWaitsForTheRequest()
     startDiskService("hung");
     m_helper->install(QStringLiteral("done"), "vfat\n");
     m_formatter->setDeviceName(cardName);
-    m_events->clear();
-    m_formatter->mount();
+    forgetEvents()->mount();
     m_formatter->setDevicePath(card);
     TRY_COMPARE(m_diskService->members(), words("Mount"));
     QTest::qWait(100);
@@ -1332,15 +1315,10 @@ void TestMemoryCardFormatter::probeSurvivesAFailedRequest_data()
 void TestMemoryCardFormatter::probeSurvivesAFailedRequest()
 {
     QFETCH(bool, mounts);
-    startDiskService("DeviceBusy");
-    setCard(cardName, card);
+    start("DeviceBusy");
     m_helper->install(QStringLiteral("done"), "ext4\n");
     // The next card is set before the request for this one fails.
-    if (mounts) {
-        m_formatter->mount();
-    } else {
-        m_formatter->unmount();
-    }
+    request(mounts);
     m_formatter->format(vfat);
     m_formatter->setDevicePath(otherCard);
     const QByteArray error = mounts ? "mount ErrorDeviceBusy" : "unmount ErrorDeviceBusy";
@@ -1370,9 +1348,7 @@ void TestMemoryCardFormatter::errorsOfARunningHelper()
     TRY_EVENTS("path /dev/testcard1, Probing, busy, type ext4, Idle, not busy");
 
     // A second report of a failed start comes while the next command runs.
-    startDiskService("hung");
-    m_formatter->setDeviceName(cardName);
-    m_events->clear();
+    startWithoutPath("hung");
     m_formatter->mount();
     QVERIFY(report(QProcess::FailedToStart));
     TRY_COMPARE(m_diskService->members(), words("Mount"));
@@ -1385,8 +1361,7 @@ void TestMemoryCardFormatter::requestKeepsTheResultOfAProbe()
     startDiskService("hung");
     m_helper->install(QStringLiteral("done"), "vfat\n");
     m_formatter->setDeviceName(cardName);
-    m_events->clear();
-    m_formatter->mount();
+    forgetEvents()->mount();
     m_formatter->setDevicePath(card);
     m_formatter->unmount();
     TRY_COMPARE(m_diskService->members(), words("Mount"));
@@ -1409,8 +1384,7 @@ void TestMemoryCardFormatter::requestKeepsTheResultOfAProbe()
 
 void TestMemoryCardFormatter::commandsKeepTheirPath()
 {
-    startDiskService("hung");
-    setCard(cardName, card);
+    start("hung");
     m_formatter->format(vfat);
     // QML moves on to another card before the first one is unmounted.
     m_formatter->setDevicePath(otherCard);
@@ -1428,8 +1402,7 @@ void TestMemoryCardFormatter::commandsKeepTheirPath()
 
 void TestMemoryCardFormatter::nameIsReadWhenAStepStarts()
 {
-    startDiskService("hung");
-    setCard(cardName, card);
+    start("hung");
     m_formatter->format(vfat);
     TRY_COMPARE(m_diskService->members(), words("Unmount"));
     m_formatter->setDeviceName(otherCardName);
@@ -1455,8 +1428,7 @@ void TestMemoryCardFormatter::nameIsReadWhenAStepStarts()
 
 void TestMemoryCardFormatter::nameThatIsEmptyInTheMiddleOfASequence()
 {
-    startDiskService("hung");
-    setCard(cardName, card);
+    start("hung");
     m_formatter->format(vfat);
     TRY_COMPARE(m_diskService->members(), words("Unmount"));
     m_formatter->setDeviceName(QString());
@@ -1532,9 +1504,7 @@ void TestMemoryCardFormatter::retriesWhenToldOfAnError()
 {
     QFETCH(bool, mounts);
     QFETCH(bool, byStatus);
-    startDiskService("Mount=NotAuthorized Unmount=DeviceBusy");
-    m_formatter->setDeviceName(cardName);
-    m_events->clear();
+    startWithoutPath("Mount=NotAuthorized Unmount=DeviceBusy");
     const auto operation = mounts ? &Formatter::mount : &Formatter::unmount;
     const auto retry = [this, operation] {
         startDiskService("done");
@@ -1557,9 +1527,7 @@ void TestMemoryCardFormatter::retriesWhenToldOfAnError()
 
 void TestMemoryCardFormatter::asksForMoreWhenBusyChanges()
 {
-    startDiskService("done");
-    m_formatter->setDeviceName(cardName);
-    m_events->clear();
+    startWithoutPath("done");
     int left = 3;
     connect(m_formatter.get(), &Formatter::busyChanged, this, [this, &left] {
         if (left > 0 && !m_formatter->busy()) {
@@ -1578,8 +1546,7 @@ void TestMemoryCardFormatter::oneProcessForAll()
     startDiskService("done");
     const auto processes = [this] { return m_formatter->findChildren<QProcess *>(); };
     m_formatter->setDeviceName(cardName);
-    m_events->clear();
-    m_formatter->mount();
+    forgetEvents()->mount();
     TRY_EVENTS("not busy, Mounting, busy, Idle, not busy");
     QCOMPARE(processes().size(), 0);
 
@@ -1602,11 +1569,9 @@ void TestMemoryCardFormatter::statusIsLogged()
     m_formatter->setDeviceName(cardName);
     m_formatter->setDevicePath(card);
     TRY_EVENTS("name testcard1, path /dev/testcard1, Probing, busy, Idle, not busy");
-    m_events->clear();
-    m_formatter->format(vfat);
+    forgetEvents()->format(vfat);
     TRY_EVENTS("not busy, Unmounting, busy, Formatting, Mounting, Idle, not busy");
-    m_events->clear();
-    m_formatter->removeAllFiles();
+    forgetEvents()->removeAllFiles();
     TRY_EVENTS("not busy, Mounting, busy, RemovingFiles, Error, not busy");
     const QByteArray status = debug + "New status MemoryCardFormatter::";
     QCOMPARE(takeLog(),
@@ -1643,10 +1608,7 @@ void TestMemoryCardFormatter::goesDuringARequest()
 
 void TestMemoryCardFormatter::goesDuringAProbe_data()
 {
-    QTest::addColumn<QString>("scenario");
-    for (const char *scenario : {"hung", "held", "crash", "missing"}) {
-        QTest::newRow(scenario) << QString::fromLatin1(scenario);
-    }
+    addScenarios({"hung", "held", "crash", "missing"});
 }
 
 void TestMemoryCardFormatter::goesDuringAProbe()
@@ -1655,11 +1617,7 @@ void TestMemoryCardFormatter::goesDuringAProbe()
     const bool isThere = scenario != QLatin1String("missing");
     // While it is being started, and while it runs.
     for (const bool runs : {false, true}) {
-        if (isThere) {
-            m_helper->install(scenario, "vfat\n");
-        } else {
-            m_helper->remove();
-        }
+        installHelper(scenario, "vfat\n");
         makeFormatter();
         m_formatter->setDevicePath(card);
         QPointer<QProcess> process = m_formatter->findChild<QProcess *>();
@@ -1683,8 +1641,7 @@ void TestMemoryCardFormatter::goesDuringAFormat_data()
 void TestMemoryCardFormatter::goesDuringAFormat()
 {
     QFETCH(bool, runs);
-    startDiskService("done");
-    setCard(cardName, card);
+    start("done");
     m_helper->install(QStringLiteral("held"), QByteArray(1000000, 'x'));
     if (runs) {
         m_formatter->format(ext4);
@@ -1731,9 +1688,7 @@ void TestMemoryCardFormatter::goesWhileFilesAreRemoved()
 
 void TestMemoryCardFormatter::goesAfterAFailure()
 {
-    startDiskService("Failed");
-    m_formatter->setDeviceName(cardName);
-    m_events->clear();
+    startWithoutPath("Failed");
     // This request is still queued when the formatter is destroyed.
     onStatus(Formatter::Error, [this] { m_formatter->mount(); });
     m_formatter->mount();

@@ -8,14 +8,14 @@
 #include <vector>
 
 /*
-    Ratios between things that are timed in one run: no time says anything by itself.
+    Ratios between works that are timed in one run: a single time depends on the machine.
 
-    What is printed are the rows of one table in Markdown; ./dev bench prints its head.
+    The rows of one table in Markdown are printed; ./dev bench prints its head.
 */
 namespace Rounds {
 
-// In seconds. The processor's time, with that of children, is what other users of the machine
-// disturb least; waiting shows on the wall only.
+// In seconds. Other processes disturb processor time, which includes that of children, the least.
+// Waiting shows in wall time only.
 struct Time {
     double wall = 0;
     double processor = 0;
@@ -32,7 +32,7 @@ struct Work {
 // For a figure that is only information.
 constexpr double noBar = -1;
 
-// Runs everything once for warming up, then in rounds, each in an order of its own.
+// Runs everything once to warm up, then in rounds, each in a random order.
 std::vector<Times> times(const std::vector<Work> &works, int rounds = 9);
 
 // Prints the median of the rounds' ratios, the lowest and the highest, and the bar. The bar is missed

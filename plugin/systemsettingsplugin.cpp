@@ -55,10 +55,9 @@ void SystemSettingsPlugin::initializeEngine(QQmlEngine *engine, const char *uri)
 {
     Q_UNUSED(uri)
 
-    // The translator installed last is asked first: engineering English answers only for what the
-    // catalog of the language lacks. Both are installed while they are empty: the language change
-    // that a catalog with texts announces then comes from the event loop, not in the middle of the
-    // import.
+    // The translator installed last is asked first, so engineering English is used only for texts that
+    // the catalog of the language lacks. Both are installed while they are empty. The language change
+    // that a loaded catalog announces then arrives through the event loop, not during the import.
     auto *engineeringEnglish = new AppTranslator(engine);
     QCoreApplication::installTranslator(engineeringEnglish);
     engineeringEnglish->loadEngineeringEnglish();

@@ -7,8 +7,8 @@
 #include <QLatin1String>
 
 /*
-    Where translation catalogs lie, and what their files are called: for a catalog "maps",
-    maps_eng_en.qm with engineering English and maps-fi.qm and so on for the languages.
+    The directory of the translation catalogs and the names of their files: a catalog "maps" has
+    maps_eng_en.qm for engineering English, and a file such as maps-fi.qm for each language.
 */
 namespace CatalogFiles {
 

@@ -52,7 +52,7 @@ void CatalogTable::addCatalogTranslator(const QString &user, const QString &cata
     } else {
         static_cast<void>(translator->load(QLocale(), catalog, prefix, directory));
     }
-    // The table is complete before this: it announces a language change, which may lead back here.
+    // Last, when the table is complete: it announces a language change, whose handler may call back.
     QCoreApplication::installTranslator(translator);
 }
 
@@ -64,8 +64,8 @@ void CatalogTable::removeCatalogTranslator(const QString &user, const QString &c
     }
     known->users.remove(user);
     if (known->users.isEmpty()) {
-        // The translator itself stays until its owner goes: somebody may be in the middle of asking
-        // it, as removing it announces a language change too.
+        // The translator is deleted with its owner, not here: this may run in a handler of the language
+        // change that a caller of the translator caused.
         QTranslator *translator = known->translator;
         m_entries.erase(known);
         QCoreApplication::removeTranslator(translator);

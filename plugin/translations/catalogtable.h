@@ -12,23 +12,23 @@ class QObject;
 class QTranslator;
 
 /*
-    The translation catalogs that a model's definition files name, each installed in the application
-    for as long as a definition uses it. The catalogs lie in /usr/share/translations.
+    The translation catalogs that a model's definition files name. Each is installed in the application
+    for as long as a definition uses it. The catalogs are in /usr/share/translations.
 
-    A translator is asked before those that were installed earlier: definitions loaded later win
-    over earlier ones, and all of them over the settings pages' own catalog. A catalog keeps the
+    A translator is asked before those that were installed earlier. Definitions loaded later therefore
+    win over earlier ones, and all of them over the catalog of the settings pages. A catalog keeps the
     language that was current when its first user was added.
 */
 class CatalogTable
 {
 public:
-    // The translators become children of owner, which has to outlive the table.
+    // The translators become children of the owner, which must outlive the table.
     explicit CatalogTable(QObject *owner);
     ~CatalogTable();
     Q_DISABLE_COPY_MOVE(CatalogTable)
 
-    // The catalog of a definition is two translators: engineering English below the language of the
-    // default locale. No name, no catalog.
+    // Each catalog has two translators: engineering English, and above it the language of the default
+    // locale. A definition without a catalog name uses none.
     void addDefinition(const QString &user, const QString &catalog);
     void removeDefinition(const QString &user, const QString &catalog);
 
@@ -41,15 +41,15 @@ public:
 private:
     struct Entry {
         QTranslator *translator;
-        // One removal takes a user out however often it was added, so once is enough to know.
+        // A set, because one removal removes a user however often it was added.
         QSet<QString> users;
     };
 
-    // Registers a user of one catalog file and, for its first user, loads and installs it: for the
-    // default locale if there is a prefix (what stands between the name and the locale), else the
-    // file of just that name. A file that does not exist counts like any other.
+    // Registers a user of one catalog and, for its first user, loads and installs the catalog. A prefix
+    // separates the name from the default locale; without a prefix the file has just that name. A
+    // file that does not exist counts like any other.
     void addCatalogTranslator(const QString &user, const QString &catalog, const QString &prefix);
-    // Takes out a user, however often it was added, and with the last one the translator.
+    // Removes a user, however often it was added, and the translator with the last user.
     void removeCatalogTranslator(const QString &user, const QString &catalog);
 
     QObject *m_owner;

@@ -26,7 +26,7 @@ private Q_SLOTS:
 
 namespace {
 
-// Counts what reaches it after a filter that was installed later.
+// Records the events that pass a filter that was installed later.
 class EventCounter : public QObject
 {
 public:

@@ -101,7 +101,7 @@ void TestCatalogTable::sharesOneCatalogAmongItsUsers()
 
 void TestCatalogTable::prefersTheCatalogOfTheRegion()
 {
-    // Finnish, to be told from the other one.
+    // Finnish, to distinguish it from the other catalog.
     const QString regional = QStringLiteral("/usr/share/translations/maps-de_AT.qm");
     QVERIFY(QFile::copy(QStringLiteral("/usr/share/translations/maps-fi.qm"), regional));
     QLocale::setDefault(QLocale(QStringLiteral("de_AT")));
@@ -112,7 +112,7 @@ void TestCatalogTable::prefersTheCatalogOfTheRegion()
 
 void TestCatalogTable::fallsBackToCatalogsInstalledBefore()
 {
-    // As that of the settings pages is, which knows the title too.
+    // Installed earlier and with the same title, as the catalog of the settings pages may be.
     Files::installCatalog(QStringLiteral("settings-system_eng_en"));
     QTranslator settings;
     QVERIFY(settings.load(QStringLiteral("settings-system_eng_en"),
@@ -150,7 +150,7 @@ void TestCatalogTable::installsCatalogsThatDoNotExist()
     QVERIFY(translators().at(1)->isEmpty());
     QCOMPARE(title(), QStringLiteral("maps-title"));
 
-    // Installed and counted all the same: loaded by hand, they answer.
+    // Installed and counted although they are empty: once loaded by hand, they are asked.
     QVERIFY(translators().at(1)->load(QStringLiteral("maps-fi"),
                                       QStringLiteral("/usr/share/translations")));
     QCOMPARE(title(), QStringLiteral("Kartat"));
@@ -179,7 +179,7 @@ void TestCatalogTable::freshTranslatorAfterRemoval()
 {
     m_table->addDefinition(a, maps);
     m_table->removeDefinition(a, maps);
-    // Whoever is in the middle of asking a translator may go on.
+    // A caller that is using a translator can continue to use it.
     QCOMPARE(translators().size(), 2);
 
     QLocale::setDefault(QLocale(QStringLiteral("de_DE")));
@@ -207,14 +207,14 @@ void TestCatalogTable::leavesTheApplicationWithItsOwner()
 
 void TestCatalogTable::mayBeCalledBackByLanguageChanges()
 {
-    // Installing and removing a catalog that has texts announces a language change at once.
+    // Installing or removing a catalog with texts sends a language change immediately.
     class Listener : public QObject
     {
     public:
         explicit Listener(std::function<void()> answer) : m_answer(std::move(answer)) { }
         bool eventFilter(QObject *watched, QEvent *event) override
         {
-            // The answer changes the language itself.
+            // The handler changes the language itself.
             if (event->type() == QEvent::LanguageChange && !m_answering) {
                 const QScopedValueRollback<bool> answering(m_answering, true);
                 ++count;

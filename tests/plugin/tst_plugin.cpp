@@ -1,7 +1,7 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-// The module as a QML engine meets it, loaded from the build tree.
+// The module in a QML engine, loaded from the build tree.
 
 #include "files.h"
 #include "gallery/simulation/languageforwarder.h"
@@ -41,7 +41,7 @@ private Q_SLOTS:
 
 private:
     static QString libraryPath();
-    // Has the engine evaluate a small document that imports the module.
+    // Evaluates a small document that imports the module.
     static std::unique_ptr<QObject> create(QQmlEngine *engine, const QByteArray &object,
                                            const QByteArray &version = "1.0");
 };
@@ -139,7 +139,7 @@ void TestPlugin::oneInstance()
     QVERIFY(qobject_cast<QQmlExtensionInterface *>(instance) != nullptr);
     QVERIFY(instance->parent() == nullptr);
     QCOMPARE(loader.instance(), instance.data());
-    // Nothing of its own for QML or slots to reach.
+    // It declares no properties, signals or slots of its own.
     QCOMPARE(instance->metaObject()->propertyCount(),
              QQmlExtensionPlugin::staticMetaObject.propertyCount());
     QCOMPARE(instance->metaObject()->methodCount(),
@@ -195,7 +195,7 @@ void TestPlugin::oneTextFileReaderPerEngine()
     QVERIFY(anotherInstance != nullptr);
     QVERIFY(anotherInstance != instance);
 
-    // Each goes with its engine.
+    // Each is deleted with its engine.
     engine.reset();
     QVERIFY(instance == nullptr);
     QVERIFY(anotherInstance != nullptr);
@@ -354,7 +354,7 @@ void TestPlugin::translatorsGoWithTheirEngine()
     auto second = std::make_unique<QQmlEngine>();
     QVERIFY(create(second.get(), "QtObject {}") != nullptr);
 
-    // A pair each: the later engine's language wins, and the earlier one's is still there.
+    // Each engine has a pair. The later engine's language wins; the earlier one stays installed.
     QCOMPARE(first->findChildren<QTranslator *>().size(), 2);
     QCOMPARE(second->findChildren<QTranslator *>().size(), 2);
     QCOMPARE(both(), QStringLiteral("Beide"));

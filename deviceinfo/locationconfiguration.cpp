@@ -21,8 +21,8 @@ const QLatin1String mlsEntry("mls/enabled");
 const QLatin1String mlsOnlineEntry("mls/online_enabled");
 const QLatin1String hereEntry("here/enabled");
 
-// The states of an online service. The platform's library has names of its own for them; their
-// numbers are what is settled.
+// The states of an online service. The platform's library may use other names for them, but the
+// numbers are always the same.
 using State = LocationSettings::OnlineAGpsState;
 constexpr auto unavailable = State(0);
 constexpr auto disabled = State(1);
@@ -64,8 +64,8 @@ QString agreementText(QLatin1String base)
     \brief Switches the location services, and saves and restores the user's own choice.
 
     The switches themselves, \l gpsEnabled, \l mlsEnabled, \l mlsOnlineState and \l hereState, are
-    those of the platform's location settings. A device's own library implements them. Without such a
-    library they are stored in dconf, and every process sees the same values.
+    those of the platform's location settings. A device's own library implements them. Without such
+    a library they are stored in dconf, and every process sees the same values.
 
     \qml
     Switch {
@@ -86,21 +86,22 @@ QString agreementText(QLatin1String base)
 
     \section1 What may surprise
     \section2 Services that were not saved are switched off
-    restoreCustomSettings() switches off everything that the saved settings do not name, also when
-    nothing was ever saved: location services are on only if the user wanted them.
+    restoreCustomSettings() switches off every service that the saved settings do not contain, even
+    if nothing was ever saved: location services are on only if the user wanted them.
 
     \section2 A service without consent stays as it is
-    State 0 means that the user has not agreed to the terms. Restoring neither leaves nor enters
-    this state: only the user can agree.
+    State 0 means that the user has not agreed to the terms. restoreCustomSettings() neither changes
+    this state nor sets it: only the user can agree.
 
-    \section2 customSettingsEnabled is not followed
-    It is read when the object is created. Saving and restoring do not change it, and changing it
-    neither saves nor restores: the page decides what the flag means.
+    \section2 customSettingsEnabled does not change by itself
+    It is read when the object is created. Later changes of the dconf key have no effect on it.
+    Saving and restoring do not change it, and changing it neither saves nor restores: the page
+    decides what the flag means.
 
-    \section2 An agreement that cannot be opened gives a message
-    Without a file in the user's language the English one is read, after a warning. If the file
-    exists but cannot be opened, the text is the translated message that no agreement exists. The English
-    one is not read then: it would not be the text that this user agrees to.
+    \section2 The English agreement does not replace one that cannot be opened
+    If there is no file in the user's language, the English one is read, after a warning. If the
+    file exists but cannot be opened, the text is a translated message which says that there is no
+    agreement. The English file is not read then: it would not be the text that this user agrees to.
 
     \section2 The agreement texts have no change signal
     They are read from their files on every read, so a binding keeps the first text. Read them in a
@@ -118,10 +119,11 @@ LocationConfiguration::LocationConfiguration(QObject *parent)
     \readonly
 
     The text that the user agrees to before HERE positioning is used: the file
-    \c{/usr/share/libherepositioning/agreements/here_consent_<locale>.txt} of the default locale,
-    such as \c fi_FI. Without such a file it is that of \c en_GB, with a warning, and if the file
-    cannot be read or is larger than 16 MiB the translation of \c settings_location-la-no_agreement_text_found. Read from
-    the file on every read.
+    \c{/usr/share/libherepositioning/agreements/here_consent_<locale>.txt}, where \c{<locale>} is
+    the default locale, such as \c fi_FI. If there is no such file, the text of \c en_GB is used and
+    a warning is logged. If the file cannot be read or is larger than 16 MiB, the text is the
+    translation of \c settings_location-la-no_agreement_text_found. The file is read whenever the
+    property is read.
 */
 QString LocationConfiguration::hereAgreementText() const
 {
@@ -132,7 +134,7 @@ QString LocationConfiguration::hereAgreementText() const
     \qmlproperty string LocationConfiguration::mlsOnlineAgreementText
     \readonly
 
-    As \l hereAgreementText, for the online assistance of MLS:
+    Like \l hereAgreementText, but for the online assistance of MLS:
     \c{/usr/share/geoclue-provider-mlsdb/agreements/mls_consent_<locale>.txt}.
 */
 QString LocationConfiguration::mlsOnlineAgreementText() const
@@ -143,9 +145,9 @@ QString LocationConfiguration::mlsOnlineAgreementText() const
 /*!
     \qmlproperty bool LocationConfiguration::customSettingsEnabled
 
-    Whether the user has chosen the switches one by one. Kept in
-    \c /settings/location/custom_settings_enabled (dconf, bool), which is read when the object is
-    created and not followed; false if it was never set.
+    Whether the user has set each switch individually. Stored in
+    \c /settings/location/custom_settings_enabled (dconf, bool); false if that was never set. The
+    key is read only when the object is created.
 */
 void LocationConfiguration::setCustomSettingsEnabled(bool enabled)
 {
@@ -159,9 +161,9 @@ void LocationConfiguration::setCustomSettingsEnabled(bool enabled)
 /*!
     \qmlmethod void LocationConfiguration::saveCustomSettings()
 
-    Stores the switches as they are in \c /settings/location/custom_settings (dconf, dictionary of
-    \c gps/enabled, \c mls/enabled, \c mls/online_enabled and \c here/enabled, all bool), in place
-    of those stored before.
+    Stores the current values of the switches in \c /settings/location/custom_settings (dconf,
+    dictionary of \c gps/enabled, \c mls/enabled, \c mls/online_enabled and \c here/enabled, all
+    bool). They replace the values that were saved before.
 */
 void LocationConfiguration::saveCustomSettings()
 {
@@ -186,7 +188,7 @@ void LocationConfiguration::restoreCustomSettings()
     const QVariantMap settings = MGConfItem(customSettingsKey).value().toMap();
     setGpsEnabled(settings.value(gpsEntry).toBool());
     setMlsEnabled(settings.value(mlsEntry).toBool());
-    // Asked only now: the switches before may have changed the states.
+    // Read only now, because setting the other switches may have changed the states.
     if (mlsOnlineState() != unavailable) {
         setMlsOnlineState(toState(settings.value(mlsOnlineEntry)));
     }
@@ -198,15 +200,16 @@ void LocationConfiguration::restoreCustomSettings()
 /*!
     \qmlproperty bool LocationConfiguration::gpsEnabled
 
-    Whether the satellite receiver is switched on. Where the module keeps the switches itself:
-    \c /settings/location/gps_enabled (dconf, bool), off if it was never set.
+    Whether the satellite receiver is switched on. If the module stores the switches itself, the
+    value is in \c /settings/location/gps_enabled (dconf, bool), and false if that was never set.
 */
 
 /*!
     \qmlproperty bool LocationConfiguration::mlsEnabled
 
-    Whether the MLS network positioning is switched on. Where the module keeps the switches itself:
-    \c /settings/location/mls_enabled (dconf, bool), off if it was never set.
+    Whether the MLS network positioning is switched on. If the module stores the switches itself,
+    the value is in \c /settings/location/mls_enabled (dconf, bool), and false if that was never
+    set.
 */
 
 /*!
@@ -218,19 +221,20 @@ void LocationConfiguration::restoreCustomSettings()
     \value LocationConfiguration.OnlineAGpsDisabled The user has agreed; it is switched off (1).
     \value LocationConfiguration.OnlineAGpsEnabled It is switched on (2).
 
-    A device's own library may name the states otherwise, only their numbers are settled: pages that
-    are to run on every device use those.
+    A device's own library may use other names for the states, but the numbers are always the same.
+    Pages that must run on every device use the numbers.
 
-    Where the module keeps the switches itself: \c /settings/location/mls_online_state (dconf, 32-bit
-    integer), not agreed to if it was never set or holds anything else. Writing another number changes
-    nothing and gives a warning.
+    If the module stores the switches itself, the state is in
+    \c /settings/location/mls_online_state (dconf, 32-bit integer). It is 0 if that was never set or
+    has any other value. Setting the property to any other number changes nothing and gives a
+    warning.
 */
 
 /*!
     \qmlproperty enumeration LocationConfiguration::hereState
 
-    The state of the HERE positioning service, like \l mlsOnlineState for MLS. Where the
-    module stores the switches itself: \c /settings/location/here_state.
+    The state of the HERE positioning service, like \l mlsOnlineState for MLS. If the
+    module stores the switches itself, the state is in \c /settings/location/here_state.
 */
 
 /*!

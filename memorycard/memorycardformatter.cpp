@@ -33,9 +33,10 @@ const QLatin1String ext4("ext4");
 const QLatin1String mkfsVfat("/sbin/mkfs.vfat");
 const QLatin1String mkfsExt4("/sbin/mkfs.ext4");
 
-// Whether the process may open enough files to start a helper or a thread. With too few left, a thread
-// that lacks one for its event loop ends the process, and Qt 5.15 may take a helper for running that
-// never started. That one has the process id -1, and killing it would kill all processes of the user.
+// Whether the process can open enough descriptors to start a helper or a thread. With too few, a
+// thread that gets none for its event loop ends the process. Qt 5.15 may also treat a helper that
+// never started as running, with the process id -1: killing it would kill all processes of the
+// user.
 bool hasDescriptorsLeft()
 {
     std::array<FileDescriptor, 16> spare; // a helper takes up to 8
@@ -52,9 +53,9 @@ bool hasDescriptorsLeft()
     \inqmlmodule com.marlo.settings.system
     \brief Formats, empties, mounts, unmounts and probes a memory card.
 
-    A card has two names: the disk service knows it by \l deviceName, and \l devicePath is the device node
-    of its partition. Every operation is a sequence of commands that run one after the other, without
-    blocking. \l status shows which one:
+    A card has two names: the disk service knows it by \l deviceName, and \l devicePath is the
+    device node of its partition. Every operation is a sequence of commands that run one after the
+    other, without blocking. \l status shows which one:
 
     \table
     \header \li Operation \li Status on success
@@ -67,19 +68,18 @@ bool hasDescriptorsLeft()
 
     Mounting and unmounting are done by the disk service: the methods \c Mount and \c Unmount of
     \c org.freedesktop.UDisks2.Filesystem at \c{/org/freedesktop/UDisks2/block_devices/<deviceName>}
-    of the service \c org.freedesktop.UDisks2 on the system bus. Removing files finds the card by its
-    \l devicePath in \c{/etc/mtab}.
+    of the service \c org.freedesktop.UDisks2 on the system bus. Removing files finds the card by
+    its \l devicePath in \c{/etc/mtab}.
 
-    Formatting and probing are done by the program \c /usr/libexec/sdcardhelper. It is run with
-    \c format_vfat, \c format_ext4 or \c probe and the name of the partition, such as \c mmcblk1p1,
-    has to exit with 0 on success, and writes the type of the file system that it has found to its
+    Formatting and probing are done by the program \c /usr/libexec/sdcardhelper. Its arguments are
+    \c format_vfat, \c format_ext4 or \c probe, and the name of the partition, such as \c mmcblk1p1.
+    It must exit with 0 on success. For \c probe it writes the type of the file system to its
     standard output.
 
-    A failed command ends the sequence and leads to the status \c Error, from which every operation
-    is accepted again. Formatting, removing files and probing use the \l devicePath, and the type, of
-    their request, even if the properties change before they start: two formats that are requested one
-    after the other each make their own type. Mounting and unmounting use the \l deviceName that is set
-    when the step starts.
+    A failed command ends the sequence and sets the status to \c Error. In this status every
+    operation is accepted. Formatting, removing files and probing use the \l devicePath that was set
+    when they were requested, even if it changes before they start. Each format() uses its own type,
+    too. Mounting and unmounting use the \l deviceName that is set when the step starts.
 
     A label that shows the file system of a card:
 
@@ -97,23 +97,23 @@ bool hasDescriptorsLeft()
 
     \section1 When an operation has ended
 
-    The signals of a formatter that already had an operation do not always show that the next one has
-    ended. The status \c Error does not change when another operation fails, and the status \c Idle
-    does not change when mount() finds the card mounted. A page therefore creates a formatter for each
-    operation, in a Loader, and starts the operation in the handler of devicePathChanged(), before the
-    probe of the new path is queued. The probe then follows the operation. The status leaves \c Idle
-    and always arrives at \c Idle or \c Error. There the operation has ended, and after \c Idle
-    \l filesystemType is that of the card as it is now.
+    If a formatter is used for several operations, its signals do not always show that an operation
+    has ended. The status \c Error does not change when another operation fails, and the status
+    \c Idle does not change when mount() finds the card mounted. A page therefore creates a
+    formatter for each operation, in a Loader, and starts the operation in the handler of
+    devicePathChanged(), before the probe of the new path is queued. The probe then runs after the
+    operation. The status changes from \c Idle and finally becomes \c Idle or \c Error: the
+    operation has ended. If it is \c Idle, \l filesystemType is the current type of the card.
 
     \list
     \li Until the disk service answers the first request, the status is still \c Idle and \l busy is
-        \c false. The page knows that it has started an operation: it shows that it waits for the disk
-        service and disables its buttons.
+        \c false. The page knows that it has started an operation: it shows that it waits for the
+        disk service and disables its buttons.
     \li \c ErrorAlreadyMounted and \c ErrorAlreadyUnmounting do not stop an operation. The card is
-        already in the requested state, or about to be: the page shows a note, and the status goes on.
-    \li Any other error of mountError() and unmountError() is followed by \c Error. Failures that have
-        no code, such as those of the helper program, change only the status. The step before it shows
-        what failed.
+        already in the requested state, or about to be: the page shows a note and waits for the end.
+    \li Any other error of mountError() and unmountError() is followed by \c Error. Failures that
+        have no code, such as those of the helper program, change only the status. The status before
+        \c Error then shows which step failed.
     \endlist
 
     A complete page:
@@ -126,28 +126,28 @@ bool hasDescriptorsLeft()
     \image gallery-memory-card.png The gallery's page of this type
 
     \section1 What may surprise
-    \section2 The status of the disk service comes afterwards
+    \section2 Mounting and unmounting change the status afterwards
     \c Formatting, \c RemovingFiles and \c Probing are set when the work begins. \c Unmounting and
     \c Mounting are set when the disk service has reported success. Until then the status is still
     the previous one, and for the first step of a sequence \l busy is \c false. A page that shows
     progress remembers its request.
 
-    \section2 busyChanged() is emitted once more
-    It is emitted when an operation has been accepted, although \l busy changes only with the
+    \section2 busyChanged() is emitted without a change
+    It is also emitted when an operation has been accepted, although \l busy changes only with the
     status. Pages may use it to learn that an operation was not refused.
 
     \section2 Early requests are queued
     Operations are refused while \l busy is \c true. While the first request to the disk service is
     under way, \l busy is still \c false: operations are accepted then, and run afterwards. If the
-    request fails, they are dropped, except the probe of a new \l devicePath. Two formats that are
-    requested in this way each make their own type.
+    request fails, they are dropped, except the probe of a new \l devicePath. If format() is called
+    twice in this way, each call uses its own type.
 
     \section2 Formatting needs a mounted card
     format() unmounts the card first. A card that is not mounted leads to \c Error with \c
     ErrorNotMounted: only a card that was known to work is formatted. Call mount() first; its \c
     ErrorAlreadyMounted is harmless.
 
-    \section2 Two errors are forgiven
+    \section2 Two errors do not end the sequence
     \c ErrorAlreadyMounted and \c ErrorAlreadyUnmounting are signalled, and the sequence continues:
     the card is already in the requested state, or about to be. The status of that step is not
     shown.
@@ -157,38 +157,40 @@ bool hasDescriptorsLeft()
     that does not exist, only lead to the status \c Error. The signal comes before the status.
 
     \section2 Any type can be requested
-    A type other than \c vfat and \c ext4 (case-sensitive) runs the helper program without a command
-    word, and its exit code decides. A device's helper may support more than this module.
+    For a type other than \c vfat and \c ext4 (case-sensitive), the helper program gets only the
+    name of the partition. Its exit code determines whether the step succeeds. The helper of a
+    device may support more than this module.
 
     \section2 A failed probe still changes the type
     The output of the helper replaces \l filesystemType even if the helper fails, usually with an
     empty text: a card that cannot be read has no known type. A helper that crashes or cannot be
-    started leaves the type as it was, perhaps that of another card, so check \l status first. A new
-    \l devicePath is probed immediately, an empty one too.
+    started leaves the type unchanged. It may then be the type of another card, so check \l status
+    first. A new \l devicePath is probed immediately, even an empty one.
 
     \section2 Without a device name a sequence waits
     Mounting and unmounting use the \l deviceName that is set when the step starts. If it is empty
-    then, the step only logs a critical message. The status stays, and so does the rest of the
-    sequence, which runs before the next operation: an unmount() after a format() without a name
-    formats the card. If the name is empty in the middle of a sequence, the formatter stays busy and
-    refuses every operation; only a new object helps. The message says "unmount" for mounting and
-    "mount" for unmounting, because programs that read logs expect exactly these lines.
+    then, the step only logs a critical message. The status does not change. The rest of the
+    sequence stays in the queue and runs before the next operation: if format() is called without a
+    name and unmount() later, the card is formatted. If the name is empty in the middle of a
+    sequence, the formatter stays busy and refuses every operation; only a new object helps. The
+    message says "unmount" for mounting and "mount" for unmounting, because programs that read logs
+    expect exactly these lines.
 
     \section2 A directory that cannot be opened counts as empty
     removeAllFiles() removes all that it can, continues after a failure, and then ends in \c Error.
     The directory on which the card is mounted counts as empty if it cannot be opened: the operation
-    ends well, and nothing has been removed. If a card is mounted more than once, it is enough that
-    one of its mount directories can be emptied.
+    succeeds without removing anything. If a card is mounted more than once, it is enough that one
+    of its mount directories can be emptied.
 
     \section2 Some mount directories are refused
-    A mount directory that is a symbolic link, the root directory or a directory on another device
-    than the card's is not emptied. The card has been unmounted meanwhile, or the mount table is
-    wrong.
+    The formatter does not empty a mount directory that is a symbolic link, the root directory or on
+    a different device than the card. In these cases the card has been unmounted meanwhile, or the
+    mount table is wrong.
 
     \section2 Work outlives its formatter
-    Destroying a formatter does not stop the removal of files, nor a helper that formats: a card
-    that is half formatted cannot be used. The process waits for the removal when it ends, as it
-    does for all work in the global thread pool.
+    Destroying a formatter stops neither the removal of files nor a helper that is formatting: a
+    card that is half formatted cannot be used. When the process ends, it waits for the removal, as
+    it does for all work in the global thread pool.
 */
 
 MemoryCardFormatter::MemoryCardFormatter(QObject *parent) : QObject(parent)
@@ -200,9 +202,9 @@ MemoryCardFormatter::~MemoryCardFormatter()
     if (m_process == nullptr || m_process->state() == QProcess::NotRunning) {
         return;
     }
-    // A child process would be killed here and waited for. A card that is half formatted cannot be
-    // used, and the user has agreed to the formatting: the helper may finish. Its process object is
-    // deleted afterwards. If the application ends earlier, the helper still goes on.
+    // A child process object would kill the helper here and wait for it. The user has agreed to the
+    // formatting, and a card that is half formatted cannot be used: let the helper finish. The
+    // process object is deleted afterwards. If the application ends first, the helper continues.
     m_process->setParent(nullptr);
     connect(m_process, &QProcess::stateChanged, m_process, [process = m_process](auto state) {
         if (state == QProcess::NotRunning) {
@@ -220,15 +222,15 @@ MemoryCardFormatter::~MemoryCardFormatter()
 
     The state of the formatter:
 
-    \value MemoryCardFormatter.Idle Nothing; the last sequence ended well, if there was one.
+    \value MemoryCardFormatter.Idle Nothing runs; the last sequence, if any, succeeded.
     \value MemoryCardFormatter.Unmounting The card has been unmounted.
     \value MemoryCardFormatter.Formatting The card is being formatted.
     \value MemoryCardFormatter.RemovingFiles The files on the card are being removed.
     \value MemoryCardFormatter.Mounting The card has been mounted.
-    \value MemoryCardFormatter.Probing The helper finds out which file system is on the card.
-    \value MemoryCardFormatter.Error Nothing; the last sequence failed.
+    \value MemoryCardFormatter.Probing The helper identifies the file system on the card.
+    \value MemoryCardFormatter.Error Nothing runs; the last sequence failed.
 
-    While the disk service is asked to mount or unmount, the status is still the one before.
+    While a request to mount or unmount is under way, the status is still the previous one.
 */
 MemoryCardFormatter::Status MemoryCardFormatter::status() const
 {
@@ -243,9 +245,9 @@ MemoryCardFormatter::Status MemoryCardFormatter::status() const
     step that starts afterwards.
 
     If the name is empty when a step of mounting or unmounting starts, the formatter only logs a
-    critical message. The status stays, and so does the rest of the queue; the next operation that is
-    accepted runs it first. In the middle of a sequence the formatter then stays \l busy and refuses
-    every operation: only a new MemoryCardFormatter helps.
+    critical message. The status does not change. The rest of the queue remains and runs before the
+    next operation that is accepted. If this happens in the middle of a sequence, the formatter
+    stays \l busy and refuses every operation: only a new MemoryCardFormatter helps.
 */
 QString MemoryCardFormatter::deviceName() const
 {
@@ -264,9 +266,10 @@ void MemoryCardFormatter::setDeviceName(const QString &name)
 /*!
     \qmlproperty string MemoryCardFormatter::devicePath
 
-    The device node of the card's partition, such as \c /dev/mmcblk1p1. A new path is probed at
-    once, or when a request to the disk service that is under way has ended, well or not. While the
-    formatter is \l busy the path cannot be changed; that gives a warning.
+    The device node of the card's partition, such as \c /dev/mmcblk1p1. A new path is probed
+    immediately. If a request to the disk service is under way, the probe waits until the request
+    has succeeded or failed. While the formatter is \l busy, the path cannot be changed: trying to
+    do so gives a warning.
 */
 QString MemoryCardFormatter::devicePath() const
 {
@@ -293,9 +296,10 @@ void MemoryCardFormatter::setDevicePath(const QString &path)
     \qmlproperty string MemoryCardFormatter::filesystemType
     \readonly
 
-    The type of the file system on the card, such as \c vfat. It is the standard output of the helper
-    program's last probe, without white space around it. It is usually empty after a helper that exits
-    with an error; a helper that crashes or cannot be started does not change it.
+    The type of the file system on the card, such as \c vfat: the standard output of the helper
+    program in the last probe, without leading and trailing white space. It is usually empty after
+    the helper has exited with an error. If the helper crashes or cannot be started, the type does
+    not change.
 */
 QString MemoryCardFormatter::filesystemType() const
 {
@@ -306,8 +310,8 @@ QString MemoryCardFormatter::filesystemType() const
     \qmlproperty list<string> MemoryCardFormatter::supportedFormatTypes
     \readonly
 
-    The types that format() can make: \c vfat if \c /sbin/mkfs.vfat can be run, \c ext4 if
-    \c /sbin/mkfs.ext4 can, in this order. Looked up on every read.
+    The types that format() supports, in this order: \c vfat if \c /sbin/mkfs.vfat is executable,
+    and \c ext4 if \c /sbin/mkfs.ext4 is executable. They are checked whenever the property is read.
 */
 QStringList MemoryCardFormatter::supportedFormatTypes() const
 {
@@ -325,10 +329,10 @@ QStringList MemoryCardFormatter::supportedFormatTypes() const
     \qmlproperty bool MemoryCardFormatter::busy
     \readonly
 
-    Whether \l status is neither \c Idle nor \c Error. The operations are refused then, with a
-    warning. It is false while the disk service carries out the first step of a sequence: operations
-    that are requested meanwhile are queued. If the running one fails, they are dropped; only the probe
-    of a new \l devicePath still runs.
+    Whether \l status is neither \c Idle nor \c Error. While \c true, operations are refused with a
+    warning. While the disk service carries out the first step of a sequence, \c busy is \c false,
+    and other operations are queued. If this step fails, they are dropped; only the probe of a new
+    \l devicePath still runs.
 */
 bool MemoryCardFormatter::busy() const
 {
@@ -339,14 +343,15 @@ bool MemoryCardFormatter::busy() const
     \qmlmethod void MemoryCardFormatter::format(string type)
 
     Unmounts the card, makes a file system of the \a type \c vfat or \c ext4 on it, and mounts it.
-    \b {Everything on the card is lost.} The helper program is run for any other type too, without a
-    command word, and decides. An empty type or \l devicePath leads to \c Error with a warning, and
-    so does a card that is not mounted, with unmountError().
+    \b {Everything on the card is lost.} For any other type, the helper program gets only the name
+    of the partition, and its exit code determines whether the step succeeds. An empty type or
+    \l devicePath leads to \c Error with a warning. A card that is not mounted leads to
+    unmountError() and \c Error.
 
-    \b {Set \l deviceName before.} Without it the formatter only logs a critical message. The
+    \b {Set \l deviceName first.} Without it the formatter only logs a critical message. The
     formatting stays in the queue and runs before the next operation, even if that is only unmount()
-    or a new \l devicePath. The \l deviceName must not be empty before the card is mounted again,
-    either: the formatter would stay \l busy for ever.
+    or a new \l devicePath. Do not clear \l deviceName until the card is mounted again, either: the
+    formatter would stay \l busy forever.
 */
 void MemoryCardFormatter::format(const QString &type)
 {
@@ -373,17 +378,17 @@ void MemoryCardFormatter::format(const QString &type)
 /*!
     \qmlmethod void MemoryCardFormatter::removeAllFiles()
 
-    Mounts the card, unless it is mounted, and removes all files and directories on it. What cannot
-    be removed stays and leads to \c Error once all else is gone. An empty \l devicePath leads to
-    \c Error with a warning. Without a \l deviceName the removal stays in the queue, as a
-    formatting does: see format().
+    Mounts the card, unless it is already mounted, and removes all files and directories on it. If
+    some cannot be removed, the others are removed first, and the status then becomes \c Error. An
+    empty \l devicePath leads to \c Error with a warning. Without a \l deviceName the removal stays
+    in the queue, as described for format().
 
-    A mount directory that is a symbolic link, that is the root directory, or that lies on another
-    device than \l devicePath is not the card. Nothing is removed there, which leads to \c Error
-    unless the card is mounted elsewhere, too.
+    A mount directory that is a symbolic link, the root directory or on a different device than
+    \l devicePath is not the card. Nothing is removed there. The operation then ends in \c Error,
+    unless the card is mounted on another directory, too.
 
-    The files are removed on a thread of the application's global thread pool. Destroying the formatter
-    does not wait for the removal, but the process does when it ends.
+    The files are removed on a thread of the application's global thread pool. Destroying the
+    formatter does not wait for the removal, but the process does when it ends.
 */
 void MemoryCardFormatter::removeAllFiles()
 {
@@ -405,9 +410,9 @@ void MemoryCardFormatter::removeAllFiles()
 /*!
     \qmlmethod void MemoryCardFormatter::mount()
 
-    Mounts the card. A card that is mounted gives mountError(), and the sequence goes on as if it
-    had not been. Without a \l deviceName nothing happens but a critical message, and the command is
-    lost.
+    Mounts the card. If the card is already mounted, mountError() is emitted and the sequence
+    continues. Without a \l deviceName the formatter only logs a critical message and drops the
+    command.
 */
 void MemoryCardFormatter::mount()
 {
@@ -423,8 +428,8 @@ void MemoryCardFormatter::mount()
 /*!
     \qmlmethod void MemoryCardFormatter::unmount()
 
-    Unmounts the card. Without a \l deviceName nothing happens but a critical message, and the
-    command is lost.
+    Unmounts the card. Without a \l deviceName the formatter only logs a critical message and drops
+    the command.
 */
 void MemoryCardFormatter::unmount()
 {
@@ -470,16 +475,18 @@ void MemoryCardFormatter::unmount()
 /*!
     \qmlsignal MemoryCardFormatter::mountError(enumeration error)
 
-    Emitted when the disk service does not mount the card, before \l status changes. The \a error is
-    one of the disk service's own, \c {org.freedesktop.UDisks2.Error.*}; others lead to the status
-    \c Error only.
+    Emitted before \l status changes, when the disk service could not mount the card. Each \a error
+    stands for an error of the disk service, \c {org.freedesktop.UDisks2.Error.*}. Any other error
+    only changes the status to \c Error.
 
     \value MemoryCardFormatter.ErrorFailed The operation failed.
     \value MemoryCardFormatter.ErrorCancelled The operation was cancelled.
     \value MemoryCardFormatter.ErrorAlreadyCancelled The operation had been cancelled before.
-    \value MemoryCardFormatter.ErrorNotAuthorized The user may not do this.
-    \value MemoryCardFormatter.ErrorNotAuthorizedCanObtain The user may not, but can get leave to.
-    \value MemoryCardFormatter.ErrorNotAuthorizedDismissed The user did not grant leave.
+    \value MemoryCardFormatter.ErrorNotAuthorized The user is not authorized.
+    \value MemoryCardFormatter.ErrorNotAuthorizedCanObtain The user is not authorized, but
+           can obtain authorization.
+    \value MemoryCardFormatter.ErrorNotAuthorizedDismissed The user is not authorized and
+           dismissed the dialog.
     \value MemoryCardFormatter.ErrorAlreadyMounted The card is mounted; the sequence goes on.
     \value MemoryCardFormatter.ErrorNotMounted The card is not mounted.
     \value MemoryCardFormatter.ErrorOptionNotPermitted An option is not permitted.
@@ -495,14 +502,15 @@ void MemoryCardFormatter::unmount()
 /*!
     \qmlsignal MemoryCardFormatter::unmountError(enumeration error)
 
-    Emitted when the disk service does not unmount the card, as mountError() is when it does not
-    mount it; the values of \a error are the same.
+    Emitted before \l status changes, when the disk service could not unmount the card. The values
+    of \a error are those of mountError().
 */
 
 void MemoryCardFormatter::commandError(QProcess::ProcessError error)
 {
-    // The end of a helper that has started, by a crash too, is left to commandFinished(). Qt reports
-    // some failed starts twice: the second report must not hit the command that follows.
+    // Handles only failed starts: commandFinished() handles the end of a helper that has started,
+    // even a crash. Qt reports some failed starts twice: the second report must not hit the next
+    // command.
     const bool startsHelper = m_running == Formatting || m_running == Probing;
     if (error == QProcess::FailedToStart && startsHelper
         && m_process->state() == QProcess::NotRunning) {

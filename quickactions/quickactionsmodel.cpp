@@ -35,7 +35,7 @@ const QLatin1String storePath("/StoreClient");
 const QLatin1String storeInterface("com.marlo.marlostore");
 const QLatin1String storeMethod("showApp");
 
-// A row without a priority stops the search for a place, wherever it stands.
+// The search for the place of a new row stops at a row without a priority, wherever that is.
 qint64 priorityOfRow(const QuickAction &action)
 {
     return action.priority() ? *action.priority() : std::numeric_limits<qint64>::max();
@@ -49,12 +49,12 @@ qint64 priorityOfRow(const QuickAction &action)
     \brief Lists the quick actions of the events screen.
 
     Packages offer a quick action by installing a definition file, \c{*.conf}, into
-    \c /usr/share/glimmera/quickactions; \l{marlo-quickactions(5)} describes it.
-    The model lists those that the user has enabled, in the user's order; with \l showPotential it
-    lists all of them. It follows the directory, about a second after a change, and the user's lists.
-    Existing rows keep their places: an action that is enabled or disabled with \l showPotential, one
-    whose file has another priority, and a new order from another model or process get their new places
-    when the model is created the next time.
+    \c /usr/share/glimmera/quickactions; \l{marlo-quickactions(5)} describes the format.
+    The model lists the actions that the user has enabled, in the user's order; with
+    \l showPotential it lists all of them. When the directory changes, the model reloads after about
+    a second. It also follows the two lists below. Existing rows keep their places when an action is
+    enabled or disabled with \l showPotential, when the priority in a file changes, and when another
+    model or process changes the order. The new places apply to models that are created later.
 
     \list
     \li \c /desktop/glimmera-marlo-home/events_screen_actions (dconf, list of strings): the paths of
@@ -67,11 +67,11 @@ qint64 priorityOfRow(const QuickAction &action)
 
     \table
     \header \li Role \li Type \li Value
-    \row \li \c title \li string \li The title in the user's language, or its identifier without a
-         translation; undefined if the file gives no title.
-    \row \li \c icon \li string \li As in the definition file: a URL such as \c{image://theme/lamp}, an
-         absolute path, before which an image needs \c{file://}, or the name of an icon of the
-         theme. Undefined if the file has none.
+    \row \li \c title \li string \li The title in the user's language, or its identifier if there is
+         no translation; undefined if the file has no title.
+    \row \li \c icon \li string \li The value in the definition file: a URL such as
+         \c{image://theme/lamp}, an absolute path, or the name of an icon of the theme. To show a
+         path in an Image, prepend \c{file://}. Undefined if the file has no icon.
     \row \li \c path \li string \li The path of the definition file: the action's identity, which
          enableAction() and disableAction() take.
     \row \li \c enabled \li bool \li Whether the user has enabled the action.
@@ -89,27 +89,28 @@ qint64 priorityOfRow(const QuickAction &action)
     }
     \endqml
 
-    \note Handlers may call any method of the model. While rows are being changed, requests wait until
-    control returns to the event loop. The model then reloads at most once and applies the choices
-    (enableAction(), disableAction(), move()) in the order of the calls.
+    \note Handlers may call any method of the model. While rows are being changed, requests wait
+    until control returns to the event loop. The model then reloads at most once and applies the
+    choices (enableAction(), disableAction(), move()) in the order of the calls.
 
     \image gallery-quick-actions.png The gallery's page of this type
 
     \section1 What may surprise
     \section2 A title may be undefined
-    An action without a title has the title undefined, not an empty text. Write \c{model.title ||
-    ""}, or choose another text: the page decides what to show. An action whose text is in no
-    catalog shows its identifier, so that the missing translation is noticed.
+    The title of an action without one is undefined, not an empty text. Write \c{model.title || ""},
+    or choose another text: the page decides what to show. If no catalog has the text of an action,
+    its title is the identifier, so that the missing translation is noticed.
 
     \section2 A file that cannot be read is still a row
     A broken definition file is listed without title and icon, after a warning. Triggering it sends
-    nothing. The user's list may contain it, and move() relies on its place in the rows.
-    EventsWidgetsModel skips such files, because no index refers to its rows.
+    nothing. The row is needed because the user's list may contain the file, and move() relies on
+    rows and entries having the same indexes. EventsWidgetsModel skips such files, because none of
+    its methods takes an index in the user's list.
 
     \section2 The roles have the numbers 0 to 3
     These are also the numbers of Qt's roles for display, decoration, editing and tool tips. They
-    stay, for users who know the roles by number. TitlesView treats role 0 as unknown: with \c title
-    as its \c matchRole it takes every row.
+    do not change, because existing code may use the numbers. TitlesView treats role 0 as unknown:
+    if \c title is its \c matchRole, every row matches.
 
     \section2 An action can be enabled twice
     enableAction() appends to the user's list without a check, and disableAction() removes every
@@ -118,19 +119,19 @@ qint64 priorityOfRow(const QuickAction &action)
 
     \section2 Rows change only after dconf reports the change
     After enableAction() and disableAction() the model waits for the change of the key, as if
-    another process had made it. This keeps the models of all pages equal. Do not rely on the
-    moment: dconf may report the change during the call or later.
+    another process had made it. This keeps the models of all pages equal. Do not rely on when
+    that happens: dconf may report the change during the call or later.
 
-    \section2 move() counts in the user's list
-    Both indexes are entries of the user's list. Larger ones are ignored silently, even if \l
-    showPotential gives more rows. The row and the entry are moved with the same indexes, so use a
-    model without \l showPotential. There the rows are the user's list, except for enabled actions
-    that are not installed or are blocked: they stay in the list and have no row. Their entries
-    remain so that an action returns to its place when its package is installed again.
+    \section2 move() takes indexes in the user's list
+    A call with an index outside the user's list is ignored silently, even if \l showPotential gives
+    more rows. move() uses the same indexes for the row and for the entry in the list, so call it on
+    a model without \l showPotential, whose rows are the entries of the user's list. Enabled actions
+    that are not installed or are blocked have an entry but no row. The entry remains so that the
+    action returns to its place when its package is installed again.
 
     \section2 Existing rows do not move
     When another model or process changes the order of the user's list, existing rows keep their
-    places until the model is created again: rows do not jump under the user's finger.
+    places until the model is created again. Otherwise a row could move while the user taps it.
 
     \section2 Other actions may stand above the enabled ones
     With \l showPotential, an action that is not enabled is placed before the first row that has a
@@ -139,31 +140,31 @@ qint64 priorityOfRow(const QuickAction &action)
     show the enabled ones in a model of their own.
 
     \section2 Blocked wins over enabled
-    Actions in \c blocked_actions are never listed, not even with \l showPotential. A vendor removes
-    an action from a device with it, whatever the user's settings are.
+    Actions in \c blocked_actions are never listed, not even with \l showPotential. Vendors use this
+    list to hide an action on a device, whatever the user's settings are.
 
-    \section2 The first change waits, later ones cost more
+    \section2 Reloads are delayed, and repeated
     The model reloads one second after the directory changed, because packages install several files
-    at once. Each such reload adds one more to all later ones. The extra reloads change nothing that
-    a page could notice.
+    at once. The first change causes one reload, the second change two, the third change three. The
+    extra reloads have no visible effect.
 
     \section2 Arguments are strings
-    Arguments of a call are sent as the strings in the file, \c 1 and \c true too, because an INI
-    file has no types. A value with an unquoted comma is sent as an array of strings. A service that
-    offers quick actions takes strings.
+    Arguments of a call are sent as strings, even \c 1 and \c true, because an INI file has no
+    types. A value with an unquoted comma is sent as an array of strings. A service for quick
+    actions must accept strings.
 
-    \section2 No answer is no failure
-    A service that does not answer in time causes no warning: it may be busy with opening its
+    \section2 A timeout is not a failure
+    A service that does not answer in time causes no warning: it may be busy opening its
     window. Every other failure is logged as a warning, and only a service that does not exist leads
     to the store. The warning of a call that could not be sent ends in \c{%6}, because programs that
     read logs expect exactly this text.
 
-    \section2 The store shows the package of any action with the same call
-    If a service does not exist, the model takes the first row that sends the same call and names a
-    package. This need not be the row that the user tapped: actions with the same call need the same
-    service.
+    \section2 The store may show the package of another action
+    If a service does not exist, the store shows the package of the first row that sends the same
+    call and names a package. This need not be the row that the user tapped: actions with the same
+    call need the same service.
 
-    \section2 Titles keep the language of the first moment
+    \section2 Titles do not follow a change of the language
     The catalog of the settings pages follows a change of the language. Catalogs that definition
     files name do not: a model loads them once. A page that follows the language creates its models
     again.
@@ -202,12 +203,13 @@ QuickActionsModel::~QuickActionsModel()
     Whether every offered action is listed, enabled or not, for a page on which the user enables and
     disables actions. The default is false.
 
-    When the model loads, it places the enabled actions first, in the user's order. Each of the others
-    goes before the first row with a greater priority or with none, whether that row is enabled or not.
+    When the model loads, it places the enabled actions first, in the user's order. Each of the
+    others goes before the first row with a greater priority or with none, whether that row is
+    enabled or not.
 
-    Ordering takes a second model, without this property: move() takes positions in the user's list,
-    and among the rows of this model there can be actions that are not in the list. Both models follow
-    the list.
+    To let the user order the actions, use a second model without this property: move() takes
+    indexes in the user's list, and a model with this property can also have rows for actions that
+    are not in the list. Both models follow the list.
 
     \qml
     Column {
@@ -325,10 +327,10 @@ QVariantMap QuickActionsModel::get(int index) const
     answer.
 
     If the call fails because its service does not exist, and the action names a package that it
-    needs, the application store client is asked to show that package: by the method \c showApp of
-    \c com.marlo.marlostore at the path \c /StoreClient of the service of that name on the session
-    bus. Every failure but that of a service which does not answer in time gives a
-    warning, and so does an index without a row.
+    needs, the model asks the application store client to show that package. It calls the method
+    \c showApp of the interface \c com.marlo.marlostore, at the path \c /StoreClient of the service
+    \c com.marlo.marlostore on the session bus. Every failure except a timeout is logged as a
+    warning, and so is an index without a row.
 */
 void QuickActionsModel::triggerAction(int index)
 {
@@ -352,10 +354,10 @@ void QuickActionsModel::componentComplete()
 /*!
     \qmlmethod void QuickActionsModel::enableAction(string path)
 
-    Adds the action of the definition file \a path at the end of the user's list, even if it is in
-    there. The model follows once dconf reports the change. Notes in
-    \c /desktop/glimmera-marlo-home/events_screen_actions_user (dconf, bool) that the user has
-    chosen.
+    Adds the action of the definition file \a path at the end of the user's list, even if the list
+    already contains it. The rows change once dconf reports the change. Also sets
+    \c /desktop/glimmera-marlo-home/events_screen_actions_user (dconf, bool) to \c true, which
+    records that the user has changed the list.
 */
 void QuickActionsModel::enableAction(const QString &path)
 {
@@ -365,9 +367,8 @@ void QuickActionsModel::enableAction(const QString &path)
 /*!
     \qmlmethod void QuickActionsModel::disableAction(string path)
 
-    Takes the action of the definition file \a path out of the user's list, however often it is in
-    there. The model follows once dconf reports the change. Notes that the user has chosen, as
-    enableAction() does.
+    Removes every entry of the definition file \a path from the user's list. The rows change once
+    dconf reports the change. Like enableAction(), it records that the user has changed the list.
 */
 void QuickActionsModel::disableAction(const QString &path)
 {
@@ -381,15 +382,15 @@ void QuickActionsModel::disableAction(const QString &path)
 /*!
     \qmlmethod void QuickActionsModel::move(int index, int newIndex)
 
-    Moves the row and the entry of the user's list at \a index to \a newIndex, and notes that the
-    user has chosen, as enableAction() does. An index outside the user's list does nothing. If the
-    list cannot be changed, because a dconf profile locks it, the row goes back.
+    Moves the row and the entry of the user's list at \a index to \a newIndex. Like enableAction(),
+    it records that the user has changed the list. A call with an index outside the user's list does
+    nothing. If a dconf profile locks the list, the row returns to its old place.
 
-    The rows have to begin with the enabled actions in the user's order. That is so without
-    \l showPotential, unless an enabled action is missing or blocked or another model or process has
-    changed the order. With \l showPotential, actions that are not enabled can stand among them, and
-    move() would move the wrong entry: use a second model for ordering, as in the example of
-    \l showPotential.
+    The rows must begin with the enabled actions in the user's order. This is always true without
+    \l showPotential, unless an enabled action is missing or blocked, or another model or process
+    has changed the order. With \l showPotential, there can be other actions between the enabled
+    ones, and move() would move the wrong entry: use a second model for ordering, as in the example
+    of \l showPotential.
 */
 void QuickActionsModel::move(int index, int newIndex)
 {
@@ -399,8 +400,8 @@ void QuickActionsModel::move(int index, int newIndex)
 /*!
     \qmlsignal QuickActionsModel::showPotentialChanged()
 
-    Emitted after \l showPotential and with it the rows have changed, also if a handler sets the
-    property while rows are being changed.
+    Emitted after \l showPotential has changed and the rows have been updated. This also holds if a
+    handler sets the property while rows are being changed.
 */
 
 /*!
@@ -475,8 +476,8 @@ void QuickActionsModel::directoryChanged()
 {
     if (!m_reloadTimer.isActive()) {
         m_reloadTimer.start();
-        // Deliberately a new connection each time, and none is ever removed: each timeout loads once
-        // more for every earlier period of changes.
+        // Deliberately a new connection each time, and none is ever removed: each timeout loads
+        // once more for every earlier period of changes.
         connect(&m_reloadTimer, &QTimer::timeout, this, &QuickActionsModel::loadActions);
     }
 }

@@ -195,6 +195,10 @@ void TestQuickAction::readsKeys()
     write(content);
     const Action action(m_path, false);
     QCOMPARE(action.config(), config);
+    // To QVariant, a list of strings and a list of variants that are strings are equal.
+    for (auto it = config.cbegin(); it != config.cend(); ++it) {
+        QCOMPARE(action.config().value(it.key()).userType(), it->userType());
+    }
     QCOMPARE(action.readActionConfig(m_path), config);
 }
 
@@ -478,6 +482,8 @@ void TestQuickAction::packedValues_data()
     QTest::newRow("behind a byte-order mark") << "\xef\xbb\xbf\ntitle=\xef\xbb\xbf" + huge + '\n';
     QTest::newRow("quoted, in a list") << "title=\"a\", \"" + huge + "\"\n";
     QTest::newRow("in a section without an end") << "[a\ntitle=" + huge + '\n';
+    QTest::newRow("behind two comments") << "; a\n; b\ntitle=" + huge + '\n';
+    QTest::newRow("key with a quoted equals sign") << "\"a=b\"=" + huge + '\n';
     QTest::newRow("repeated key") << "title=" + huge + "\ntitle=x\n";
 }
 

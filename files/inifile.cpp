@@ -9,7 +9,6 @@
 #include <QTextCodec>
 
 #include <algorithm>
-#include <cstring>
 
 namespace {
 
@@ -149,10 +148,10 @@ QString ValueReader::readEscape()
         return digit() < 16 ? QString(readNumber(16)) : QString();
     }
     // QSettings ignores a backslash before any other character, together with that character.
-    constexpr char letters[] = "abfnrtv\"?'\\";
-    constexpr char meanings[] = "\a\b\f\n\r\t\v\"?'\\";
-    const char *letter = std::strchr(letters, character);
-    return letter && character ? QString(QLatin1Char(meanings[letter - letters])) : QString();
+    const QByteArray letters = QByteArrayLiteral("abfnrtv\"?'\\");
+    const QByteArray meanings = QByteArrayLiteral("\a\b\f\n\r\t\v\"?'\\");
+    const int letter = letters.indexOf(character);
+    return letter < 0 ? QString() : QString(QLatin1Char(meanings.at(letter)));
 }
 
 QChar ValueReader::readNumber(int base)
@@ -162,7 +161,7 @@ QChar ValueReader::readNumber(int base)
         number = number * uint(base) + uint(digit());
     }
     // QSettings drops the upper bits.
-    return QChar(ushort(number));
+    return {ushort(number)};
 }
 
 int ValueReader::digit() const

@@ -26,7 +26,7 @@ RegularFile readDescriptor(int descriptor, qint64 maximumSize)
                 S_ISDIR(entry.st_mode) ? QStringLiteral("file to open is a directory")
                                        : QStringLiteral("file to open is no regular file")};
     }
-    const RegularFile tooLarge = {
+    RegularFile tooLarge = {
         State::TooLarge,
         {},
         QStringLiteral("file to open is larger than %1 bytes").arg(maximumSize)};
@@ -62,7 +62,7 @@ RegularFile readRegularFile(const QString &path, qint64 maximumSize)
     if (descriptor < 0) {
         return {RegularFile::State::NotOpened, {}, qt_error_string(errno)};
     }
-    const RegularFile file = readDescriptor(descriptor, maximumSize);
+    RegularFile file = readDescriptor(descriptor, maximumSize);
     close(descriptor);
     return file;
 }

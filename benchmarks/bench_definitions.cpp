@@ -75,7 +75,7 @@ void load()
 void check()
 {
     DefinitionsChecker checker(QStringLiteral("/"));
-    // The catalogs are not installed, which each file is told.
+    // The catalogs are not installed, which is a finding for each file.
     if (!checker.checkInstalled() || checker.findings().size() != 2 * files) {
         qFatal("%zu findings", checker.findings().size());
     }

@@ -119,7 +119,7 @@ private:
     const pid_t m_dconf;
 };
 
-// Everything once; the pauses are those of a fresh set of objects.
+// Measures every operation once, with new objects.
 void measure(std::vector<Pauses> *pauses, QStringList *names)
 {
     const EveryType types;
@@ -141,7 +141,7 @@ void measure(std::vector<Pauses> *pauses, QStringList *names)
         }
         note(QLatin1Char('~') + name, pauseOf([&] { made.reset(); }));
     }
-    // Not under the timer: what the calls have left to do.
+    // Handles the events that the calls have posted. This is not measured.
     QCoreApplication::processEvents();
 }
 
@@ -154,8 +154,8 @@ int showPage()
     return QCoreApplication::exec();
 }
 
-// How often the threads of a process began to wait or were made to, since they started. While that
-// does not change, none of them has run, and so none has made a system call.
+// The number of context switches of the threads of a process. As long as it does not change, none
+// of the threads has run, and so none has made a system call.
 long switches(qint64 process)
 {
     long count = 0;

@@ -29,7 +29,7 @@ struct Work {
     std::function<void()> prepare = [] {};
 };
 
-// For a figure that is only information.
+// For figures that are printed but not checked.
 constexpr double noBar = -1;
 
 // Runs everything once to warm up, then in rounds, each in a random order.

@@ -28,7 +28,8 @@ QStringList DefinitionFiles::inDirectory(const QString &path)
 {
     const QDir directory(path);
     QStringList files;
-    // The models list in the same way: nothing hidden, no links to nowhere, and widgets in files.
+    // As in the models: hidden files and broken links are left out, and widgets must be in regular
+    // files.
     const QStringList names = directory.entryList();
     for (const QString &name : names) {
         const QString file = directory.filePath(name);

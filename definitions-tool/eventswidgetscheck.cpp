@@ -99,7 +99,7 @@ bool isOf(Type type, const QJsonValue &value)
     case Type::Text:
         return value.isString();
     case Type::Integer:
-        // Of any other value, toInt() returns what it is given.
+        // If the value is not an integer, toInt() returns its argument.
         return value.toInt(0) == value.toInt(-1);
     case Type::Boolean:
         return value.isBool();
@@ -224,7 +224,7 @@ void EventsWidgetsCheck::checkEntry(int position)
     }
     const auto members = checkMembers(widgetKeys, position);
     const Member &path = members[PathKey];
-    // What the reader has rejected is not among what it returned.
+    // The widgets that the reader returned do not include those that it rejected.
     if (m_next < m_file.widgets.size() && m_file.widgets.at(m_next).path == path.value.toString()) {
         checkWidget(m_file.widgets.at(m_next), members, line);
         ++m_next;

@@ -28,7 +28,7 @@ const QLatin1String availablePathKey("available_path");
 
 constexpr int noOrder = -1;
 
-// The main thread waits while the log is written: no more lines than anybody reads.
+// The main thread waits while the log is written, so the number of lines is limited.
 constexpr int maximumWarnings = 1000;
 
 EventsWidget readWidget(const QJsonObject &object)

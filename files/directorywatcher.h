@@ -56,7 +56,8 @@ Q_SIGNALS:
 private:
     friend class Inotify;
 
-    // The directory or one above it, with its name in the one above and, if it exists, its watch.
+    // The directory or one of its parents: its path, its name in its own parent, and its watch if
+    // it exists.
     struct Level {
         QString path;
         QByteArray name;

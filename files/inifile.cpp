@@ -183,7 +183,7 @@ bool isPackedElement(const QString &element)
 
 bool isPackedValue(const QByteArray &text, int start, int end)
 {
-    // Nearly every value has no "@", not even a hidden one.
+    // A fast path: nearly every value has neither an "@" nor a backslash, which may encode one.
     const auto value = text.cbegin();
     if (std::none_of(value + start, value + end,
                      [](char character) { return character == '@' || character == '\\'; })) {

@@ -30,8 +30,9 @@ const std::string top = "/top"; // is emptied
 const std::string outside = "/outside";
 const std::string aside = outside + "/aside"; // takes what is moved out of the top
 const std::string other = "/other"; // another file system
-// No link of a tree leads to a folder of such names as there are in trees: what happens to those is
-// not to reach what is to be kept. The last are what is in the way of who goes on in a wrong folder.
+// These must survive. No link in a tree leads to a folder with the names that are used in trees,
+// because the events that change a tree must not change these files. A walk that continues in a
+// wrong folder meets the last four.
 const std::vector<std::string> keptFiles = {
     outside + "/x", outside + "/y/x", outside + "/y/z/x", other + "/x", other + "/y/x",
     aside + "/a",   aside + "/b",     aside + "/c",       aside + "/d",
@@ -44,7 +45,7 @@ constexpr size_t maximumLength = 1000; // of a path
 constexpr int maximumEvents = 8;
 // Beyond all that a walk over so few nodes can need.
 constexpr int tooManyCalls = 100000;
-// What the walk says it holds open, at most.
+// The maximum number of descriptors that the walk promises to hold open.
 constexpr int maximumOpen = 57;
 
 const char *const hostileNames[] = {"..", ".", "../outside/x", "/outside/x", "../outside",
@@ -218,7 +219,7 @@ private:
         }
     }
 
-    // Deep enough that directories are closed and opened again, with a file in each or not.
+    // Deep enough that directories are closed and opened again. Each has a file in it, or none has.
     void makeChain(std::vector<std::string> *way, const std::string &name)
     {
         const int byte = m_input.takeByte();
@@ -336,14 +337,14 @@ private:
         return false;
     }
 
-    // The other file system, over a folder, once.
+    // Mounts the other file system on a folder, unless it is already mounted.
     void putMount(const std::string &node)
     {
         if (m_mount < 0 && node != top
             && mount(other.c_str(), node.c_str(), nullptr, MS_BIND, nullptr) == 0) {
             m_mount = SystemCalls::real().openat(AT_FDCWD, node.c_str(),
                                                  O_PATH | O_DIRECTORY | O_CLOEXEC);
-            // Out of the way of the count.
+            // A high number, so that the count of open descriptors does not include it.
             const int away = fcntl(m_mount, F_DUPFD_CLOEXEC, 500);
             close(m_mount);
             m_mount = away;

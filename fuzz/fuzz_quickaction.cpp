@@ -27,8 +27,8 @@ public Q_SLOTS:
     }
 };
 
-// The bus hangs up on whoever sends it something malformed. It takes longer to answer than all the
-// rest: once many calls went well it is asked after some of them only.
+// The bus disconnects a client that sends a malformed message. Asking the bus takes longer than the
+// rest of a run. After many successful calls it is therefore asked only once per hundred calls.
 bool isStillOnTheBus()
 {
     constexpr int many = 1000;

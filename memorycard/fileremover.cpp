@@ -78,8 +78,8 @@ bool mayLieOn(const QByteArray &device, const struct stat &directory)
         || major(directory.st_dev) == 0 || directory.st_dev == node.st_rdev;
 }
 
-// Empties the card that is mounted on the directory. The bytes of the mount table are the name of the
-// directory, in whatever encoding.
+// Empties the card that is mounted on the directory. Its name is the bytes in the mount table,
+// because their encoding is unknown.
 bool emptyMount(const QByteArray &device, const char *directory)
 {
     // A relative path is no mount directory, and an empty one would be the current directory.

@@ -33,7 +33,7 @@ public:
     QList<Call> calls();
     // The methods of calls().
     QStringList members();
-    // Replies to what a hung service has kept.
+    // Replies to the calls that the service kept while it hung.
     void replyToKept();
 
 private:

@@ -40,7 +40,7 @@ public:
     QString name() const { return m_name; }
     QString path() const { return m_path; }
 
-    // Makes it an empty ext4 card that is not mounted, and has the disk service see that.
+    // Makes it an empty, unmounted ext4 card, and waits until the disk service has noticed that.
     void reset();
     // Where it is mounted.
     QStringList mountDirectories() const;

@@ -19,7 +19,7 @@ class RecordingService : public QDBusVirtualObject
 public:
     enum class Answer { Reply, Error, Nothing };
 
-    // Ends the test program if the name is not to be had.
+    // Ends the test program if the service name cannot be registered.
     RecordingService(QDBusConnection::BusType bus, const QString &service);
     ~RecordingService() override;
     Q_DISABLE_COPY_MOVE(RecordingService)

@@ -122,7 +122,7 @@ GalleryPage {
         }
     }
 
-    // A new card is probed only.
+    // A new card is only probed.
     onCardNameChanged: {
         operation.active = false;
         fileSystem = "";

@@ -32,7 +32,7 @@ SimulatedDiskService::SimulatedDiskService(Manner manner, const QString &deviceP
       m_connection(QDBusConnection::connectToBus(QDBusConnection::SystemBus,
                                                  QStringLiteral("simulated disk service")))
 {
-    // A real disk service allows that it is replaced, and ends then.
+    // A real disk service allows other programs to replace it, and exits then.
     if (!m_connection.registerVirtualObject(QStringLiteral("/"), this, QDBusConnection::SubPath)
         || !m_connection.interface()->registerService(
             service, QDBusConnectionInterface::ReplaceExistingService)) {

@@ -37,7 +37,7 @@ public:
 
     explicit LocationSettings(QObject *parent = nullptr);
 
-    // What is stored at this moment, also when the signal of the change is still to come.
+    // Return the stored values, even before the signal of a change is emitted.
     bool gpsEnabled() const;
     bool mlsEnabled() const;
     OnlineAGpsState mlsOnlineState() const;

@@ -24,7 +24,7 @@
 #include <algorithm>
 #include <random>
 
-// Takes the error of a call.
+// Stores the error of a call.
 class Receiver : public QObject
 {
     Q_OBJECT

@@ -295,7 +295,7 @@ void TestKivInfo::errorsKeepTheDefaults()
     QTRY_VERIFY(isSettled(info));
     QCOMPARE(info.report(), QStringLiteral(" not ready: 0 0"));
 
-    // Nothing is asked again, and changes arrive as ever.
+    // The properties are not requested again, and change signals still arrive.
     daemon.sendChanges({{idProperty, cover}, {readyProperty, 1}});
     QTRY_COMPARE(info.report(), QStringLiteral("cover-7 ready: 1 1"));
     QCOMPARE(daemon.calls().size(), 2);
@@ -533,7 +533,7 @@ void TestKivInfo::aHandlerMayCallBack()
     answerBoth(daemon, {cover}, {1});
     const KivInfo info;
     bool readyInside = false;
-    // A handler that makes another one, and waits for it, in the middle of a reply.
+    // While a reply is handled, a handler creates another KivInfo and waits for it.
     connect(&info, &KivInfo::kivIdChanged, this, [&readyInside] {
         const KivInfo inner;
         QTRY_VERIFY(isSettled(inner));
@@ -622,7 +622,7 @@ void TestKivInfo::goesWithRepliesPending()
     QTRY_VERIFY(isSettled(another));
     QCOMPARE(another.kivId(), cover);
 
-    // And one that goes before its calls have even left.
+    // The next one is destroyed before its calls are sent.
     delete new KivInfo;
     flush(QDBusConnection::systemBus());
     const KivInfo last;

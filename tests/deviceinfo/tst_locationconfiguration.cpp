@@ -417,7 +417,7 @@ void TestLocationConfiguration::anotherObjectRestores()
     QCOMPARE(configuration.mlsOnlineState(), State(2));
     QCOMPARE(configuration.hereState(), State(1));
 
-    // Saved while not agreed to, it is disabled once it is.
+    // A service that was saved before the user agreed to it is disabled after the user agrees.
     setSwitches(true, false, 0, 1);
     configuration.saveCustomSettings();
     configuration.restoreCustomSettings();

@@ -156,7 +156,7 @@ void TestTermsOfUseManager::findsTheBestFile_data()
     row("de_DE", "en", "en", true);
     row("de_DE", "en_GB,en,fi,de_AT", "en_GB", true);
     row("de_DE.UTF-8", "en_GB", "en_GB", true);
-    // Without an encoding, language and country are looked for only as the whole name.
+    // If the locale has no encoding, only a file with the whole locale name matches.
     row("de_DE@euro", "de_DE,en_GB", "en_GB", true);
     row(".UTF-8", "en_GB", "en_GB", true);
     row(".UTF-8", ",en_GB", "en_GB", true); // a dot at the beginning ends no locale

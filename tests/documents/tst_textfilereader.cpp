@@ -177,7 +177,7 @@ void TestTextFileReader::readContentOfLargeFiles()
     QCOMPARE(reader.readContent(path("file")).size(), int(maximumTextSize));
     Files::makeSparse(path("file"), maximumTextSize + 1);
     QVERIFY(reader.readContent(path("file")).isNull());
-    // More than memory has.
+    // A file that is larger than the memory.
     Files::makeSparse(path("file"), qint64(1) << 40);
     QVERIFY(reader.readContent(path("file")).isNull());
 }

@@ -74,7 +74,7 @@ namespace {
 
 enum Role { NameRole = Qt::UserRole, KindRole, ObjectRole };
 
-// Rows of a name, a kind of any type and an object.
+// Each row has a name, a kind of any type, and an object.
 struct Row {
     QString name;
     QVariant kind;

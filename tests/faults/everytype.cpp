@@ -54,7 +54,7 @@ QByteArray document(const ModuleType &type)
         + it + " }\n";
 }
 
-// A value of a type for whoever wants one.
+// Some value of the type, to set a property or to call a method.
 QVariant anyValue(int type, const QVariant &current)
 {
     switch (type) {
@@ -94,7 +94,7 @@ void call(QObject *object, const QMetaMethod &method)
     }
 }
 
-// From which on properties and methods are the type's own.
+// The base class whose properties and methods are not part of the type.
 const QMetaObject *base(const QObject *object)
 {
     return qobject_cast<const QAbstractListModel *>(object) ? &QAbstractListModel::staticMetaObject

@@ -21,7 +21,7 @@ public:
     // How the removal of a file behaves, and for Unreadable the listing.
     enum class Fault { None, Unreadable, Stuck, Waits, Gone };
 
-    // Ends the program if there is no right to mount; see whyNot().
+    // Ends the program if it is not allowed to mount; see whyNot().
     FailingCard(const QString &device, int files);
     ~FailingCard();
     Q_DISABLE_COPY_MOVE(FailingCard)
@@ -31,11 +31,11 @@ public:
 
     void setFault(Fault fault) { m_fault = fault; }
     int filesLeft() const { return m_left; }
-    // Removals that wait for another fault to be set, or for none.
+    // The number of removals that are blocked until the fault changes.
     int waiting() const { return m_waiting; }
 
     QString directory() const { return m_dir.path(); }
-    // Takes the card out of its directory while whoever is in it goes on.
+    // Unmounts the card lazily: programs that are using it continue.
     void detach();
 
 private:

@@ -26,7 +26,7 @@ QByteArray skipped(const QByteArray &output);
 
 } // namespace OwnProcess
 
-// To begin a test with: goes on only in a process of its own.
+// The first line of a test that runs in a process of its own.
 #define IN_A_PROCESS_OF_ITS_OWN(...)                                                               \
     if (!OwnProcess::isThis()) {                                                                   \
         const QByteArray output = OwnProcess::runCurrentTest(__VA_ARGS__);                         \

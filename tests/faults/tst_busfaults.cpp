@@ -34,7 +34,7 @@ constexpr int patience = 60000; // ms, of a machine that is very busy
 
 const char *const addresses[] = {"DBUS_SESSION_BUS_ADDRESS", "DBUS_SYSTEM_BUS_ADDRESS"};
 
-// Both buses of this process, which must not have met any so far.
+// The session bus and the system bus of this process, which must not be connected to any bus yet.
 class Buses
 {
 public:
@@ -72,7 +72,7 @@ private:
     QProcess m_daemons[2];
 };
 
-// What is there without any service.
+// Values that need no service.
 const QStringList someFacts = {
     QStringLiteral("AndroidSupport.dataDirectoriesVisible QVariant(bool, true)"),
     QStringLiteral("BluetoothInfo.adapterAddress QVariant(QString, \"00:1a:7d:da:71:13\")"),
@@ -195,7 +195,7 @@ void TestBusFaults::everyTypeGoesWhenItsBusesHaveDied()
     auto others = std::make_unique<EveryType>();
     types->useAll();
     buses.kill();
-    // Before anybody has noticed, and after.
+    // Destroys some objects before Qt notices that the buses are gone, and the others after that.
     types.reset();
     TRY(Buses::areGone());
     others.reset();

@@ -212,7 +212,7 @@ void TestCallbacks::locationConfiguration()
 
 void TestCallbacks::memoryCardFormatter()
 {
-    // Everything that can be asked for, of a card that is not there.
+    // Requests every operation for a card that does not exist.
     DiskServicePeer service(
         {QStringLiteral("Mount=DeviceBusy"), QStringLiteral("Unmount=NotMounted")});
     make("MemoryCardFormatter");

@@ -79,7 +79,7 @@ void installHelper(const QByteArray &script)
     QVERIFY(QFile::setPermissions(path, QFile::ReadOwner | QFile::ExeOwner));
 }
 
-// The main thread is not the one that waits.
+// Runs the event loop for a while. Only other threads are blocked.
 void letEverythingArrive()
 {
     QTest::qWait(100);
@@ -281,7 +281,7 @@ void TestCardFaults::helperThatWritesAHundredMegabytes()
     TRY_COMPARE(m_formatter->status(), Formatter::Idle);
     // Whatever it writes is the type.
     QCOMPARE(m_formatter->filesystemType().size(), size);
-    // What it writes to say how a format went is not even read.
+    // The output of a helper that formats is not read at all.
     m_statuses.clear();
     m_formatter->format(QStringLiteral("vfat"));
     TRY_COMPARE(m_statuses,
@@ -296,7 +296,7 @@ void TestCardFaults::helperThatWritesAHundredMegabytes()
 
 void TestCardFaults::helperThatClosesItsOutputFirst()
 {
-    // It is the end that counts, and what was written until then.
+    // The probe ends when the helper exits, not when it closes its output.
     installHelper("echo vfat\nexec >&-\nsleep 0.5\nexit 0\n");
     m_formatter->setDevicePath(QStringLiteral("/dev/testcard2"));
     TRY_COMPARE(m_formatter->status(), Formatter::Probing);

@@ -34,7 +34,7 @@ public:
     virtual ~User() = default;
     virtual void choose(bool on) = 0;
     virtual bool isOn() const = 0;
-    // The key, and what the dconf tool prints for either choice.
+    // The key, and the output of the dconf tool for each of the two choices.
     virtual QString key() const = 0;
     virtual QByteArray stored(bool on) const = 0;
 };
@@ -487,8 +487,8 @@ void TestDconfFaults::hugeLists()
     QCOMPARE(LocationConfiguration().gpsEnabled(), true);
     TRY_COMPARE(DconfTool::read(gpsKey), QByteArray("true"));
 
-    // A choice that replaces such a list takes as long as dconf takes to compare it with the new
-    // one, which is not ours to shorten; so once it is gone.
+    // Replacing such a long list is slow, because dconf compares it with the new one. The test
+    // therefore removes the list before it makes a choice.
     Change keyChange(m_user->key());
     reset();
     QVERIFY(keyChange.hasCome());

@@ -217,7 +217,7 @@ void TestServiceFaults::diskServiceRepliesWithOtherTypes()
     Formatter formatter;
     formatter.setDeviceName(QStringLiteral("testcard1"));
     const QSignalSpy changed(&formatter, &Formatter::statusChanged);
-    // Whatever a reply holds, it is one.
+    // Any reply means success, whatever arguments it has.
     formatter.mount();
     TRY_COMPARE(changed.count(), 2);
     formatter.unmount();
@@ -279,7 +279,7 @@ void TestServiceFaults::goesWhileTheActionServiceHangs()
     letEverythingArrive();
     model.reset();
     service.goOn();
-    // What was tapped is done, and what comes of it is told to nobody.
+    // The service still receives the call. Its reply is discarded.
     TRY_COMPARE(service.calls(), QStringList{QStringLiteral("toggle")});
     letEverythingArrive();
 }

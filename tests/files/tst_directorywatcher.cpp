@@ -286,7 +286,7 @@ void TestDirectoryWatcher::reportsDirectoryMadeLater()
 {
     const DirectoryWatcher watcher(m_directory, filter);
     QSignalSpy spy(&watcher, &DirectoryWatcher::changed);
-    // One level at a time, each seen before the next is made, and all at once below.
+    // Creates one level at a time, and waits for its event before it creates the next.
     Files::makeFolder(path("a"));
     QVERIFY(!spy.wait(100));
     Files::makeFolder(path("a/b"));

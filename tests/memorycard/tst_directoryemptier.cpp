@@ -694,7 +694,7 @@ void tst_DirectoryEmptier::folderBecomesLink()
 
 void tst_DirectoryEmptier::folderBecomesLinkToParent()
 {
-    // While the walk is in the folder already.
+    // The folder is replaced while the walk is already in it.
     makeFolder(m_top + "/victim");
     makeFile(m_top + "/victim/trigger");
     makeFiles(m_top, 5);
@@ -731,8 +731,8 @@ void tst_DirectoryEmptier::folderMovedOutNearby()
 
 void tst_DirectoryEmptier::folderMovedOutFarDown()
 {
-    // Nothing above the folder is open any more, and its ".." leads outside: the way back is found
-    // from the top.
+    // No folder above this one is open any more, and its ".." leads outside: the walk finds its way
+    // back from the top.
     makeDeepTree(m_top, 150, [&] { rename(chainPath(m_top, 20), m_outside + "/moved"); });
     makeBait();
     QVERIFY(!empty(m_top));
@@ -744,7 +744,7 @@ void tst_DirectoryEmptier::folderMovedOutFarDown()
 
 void tst_DirectoryEmptier::wayMovedOutFarDown()
 {
-    // Two folders move: the way back ends above the higher one.
+    // Two folders are moved: the walk returns to the folder above the higher one.
     makeDeepTree(m_top, 150, [&] {
         rename(chainPath(m_top, 40), m_outside + "/moved");
         rename(chainPath(m_top, 10), m_outside + "/movedToo");
@@ -754,7 +754,7 @@ void tst_DirectoryEmptier::wayMovedOutFarDown()
     const QByteArrayList left = listAll(m_top);
     QCOMPARE(left.size(), 9);
     QCOMPARE(m_top + '/' + left.last(), chainPath(m_top, 9));
-    // What lay between the two is out of the card and stays.
+    // The folders between the two are outside the card now and are not removed.
     QVERIFY(exists(chainPath(m_outside + "/movedToo", 29)));
 }
 
@@ -799,7 +799,7 @@ void tst_DirectoryEmptier::descriptorsAfterDetour()
     // As many are kept open after a way back from the top as before, in either direction.
     makeDeepTree(m_top, 150, [&] {
         rename(chainPath(m_top, 90), m_outside + "/moved");
-        // In the place of what is still to be removed there, for the walk to go down into.
+        // Puts new deep trees into the folders that the walk still has to remove there.
         for (const char *const side : {"/aFolder", "/zFolder"}) {
             const QByteArray folder = chainPath(m_top, 89) + side;
             if (exists(folder)) {

@@ -99,7 +99,8 @@ QByteArray line(const QByteArray &source, const QByteArray &directory)
     return source + ' ' + escaped(directory) + " vfat rw,nosuid 0 0\n";
 }
 
-// Root may read and remove everything; without these capabilities it is its folders' plain owner.
+// Root may read and remove everything. Without these capabilities, root has only an owner's
+// permissions.
 class WithoutPrivileges
 {
 public:
@@ -536,7 +537,7 @@ void tst_FileRemover::relativeMountDirectories()
     QCOMPARE(runInChild(run), int(Error));
     QCOMPARE(listAll(current).size(), 6);
 
-    // Passed over: a proper entry after it counts.
+    // The invalid entry is skipped, and a valid entry after it is used.
     writeMountTable(entry + line(device, card));
     QCOMPARE(runInChild(run), int(Completed));
     QCOMPARE(listAll(current).size(), 6);
@@ -642,7 +643,7 @@ void tst_FileRemover::lineCutWithinDirectory()
     QCOMPARE(runHere(device), Error);
     QVERIFY(exists(folder + "/file"));
 
-    // The same directory in a line that fits.
+    // The same directory, in a line that is short enough.
     QCOMPARE(emptyMounted(folder), Completed);
     QVERIFY(!exists(folder + "/file"));
 }

@@ -101,7 +101,7 @@ extern "C" Q_DECL_EXPORT unsigned dbus_connection_send_with_reply(void *connecti
     return original(connection, message, reply, timeout);
 }
 
-// Takes the place of the C library's own: this process must never signal all processes there are.
+// Replaces kill() of the C library: this process must never send a signal to all processes.
 extern "C" Q_DECL_EXPORT int kill(pid_t pid, int signal) noexcept
 {
     if (pid <= 0) {
@@ -660,7 +660,7 @@ void TestMemoryCardFormatter::helperThatCannotRun()
         m_helper->remove();
     }
     m_formatter->setDevicePath(otherCard);
-    // It is being started, so far as anybody knows.
+    // The failed start has not been reported yet.
     QCOMPARE(m_formatter->status(), Formatter::Probing);
     TRY_EVENTS("path /dev/testcard2, Probing, busy, Error, not busy");
     QCOMPARE(m_formatter->filesystemType(), vfat);
@@ -805,7 +805,7 @@ void TestMemoryCardFormatter::formatNeedsAPathAndAType()
     m_formatter->format(vfat);
     QCOMPARE(takeLog(), warning + "devicePath is empty.");
     QCOMPARE(m_events->line(), QByteArray("Error"));
-    // The path is looked at first, and an error that lasts is no change.
+    // The path is checked first. The status stays Error, so no signal is emitted.
     m_formatter->format(QString());
     QCOMPARE(takeLog(), warning + "devicePath is empty.");
     QCOMPARE(m_events->line(), QByteArray("Error"));
@@ -945,7 +945,7 @@ void TestMemoryCardFormatter::operationsWhileBusy()
     const QByteArray tail = " called when not idle. Status is MemoryCardFormatter::Probing";
     m_formatter->format(vfat);
     QCOMPARE(takeLog(), warning + "format()" + tail);
-    // Being busy is looked at before anything else.
+    // Whether the formatter is busy is checked before the arguments.
     m_formatter->format(QString());
     QCOMPARE(takeLog(), warning + "format()" + tail);
     m_formatter->removeAllFiles();
@@ -1332,7 +1332,7 @@ void TestMemoryCardFormatter::probeSurvivesAFailedRequest()
 
 void TestMemoryCardFormatter::errorsOfARunningHelper()
 {
-    // Only a failed start is an end that the process does not report otherwise.
+    // Only a failed start is handled here: the process reports every other end by finished().
     const auto report = [this](QProcess::ProcessError error) {
         return QMetaObject::invokeMethod(m_formatter.get(), "commandError",
                                          Q_ARG(QProcess::ProcessError, error));
@@ -1625,7 +1625,7 @@ void TestMemoryCardFormatter::goesDuringAProbe()
             TRY(m_helper->runs().size() > 0);
         }
         m_formatter.reset();
-        // A probe that nobody waits for does not go on.
+        // A probe is stopped when its formatter is destroyed.
         TRY(process == nullptr);
         QCOMPARE(m_helper->running(), QList<qint64>());
     }
@@ -1656,11 +1656,11 @@ void TestMemoryCardFormatter::goesDuringAFormat()
     }
     QPointer<QProcess> process = m_formatter->findChild<QProcess *>();
     m_formatter.reset();
-    // The card is not left half formatted, and not mounted by anybody who has gone.
+    // The helper finishes formatting, but the destroyed formatter does not mount the card.
     TRY(m_helper->running().size() == 1);
     QTest::qWait(100);
     QCOMPARE(m_helper->running().size(), 1);
-    // Nor does it hang on anybody who reads what it says, if the application should go, too.
+    // The helper writes to /dev/null, so it can continue even after the application has ended.
     QCOMPARE(QFile::symLinkTarget(QStringLiteral("/proc/%1/fd/1").arg(m_helper->running().first())),
              QStringLiteral("/dev/null"));
     QVERIFY(process != nullptr);

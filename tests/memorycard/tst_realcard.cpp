@@ -72,7 +72,7 @@ private Q_SLOTS:
     void deviceThatDisappears();
 
 private:
-    // Does an operation to its end.
+    // Runs an operation and waits for its end.
     QByteArray run(void (Formatter::*operation)());
     QByteArray format(const QString &type);
     QByteArray wait();

@@ -206,7 +206,7 @@ void TestGVariantConversion::readsForeignTypes_data()
     QTest::newRow("{'a': <{'b': <1>}>}")
         << QVariant(QVariantMap{{text("a"), QVariantMap{{text("b"), 1}}}});
     QTest::newRow("@a{ss} {}") << QVariant(QVariantMap());
-    // Types that nothing stores are values all the same.
+    // Types that the module never stores are converted, too.
     QTest::newRow("handle 3") << QVariant(QVariantList());
     QTest::newRow("objectpath '/a/b'") << QVariant(QVariantList());
     QTest::newRow("signature 'a{sv}'") << QVariant(QVariantList());

@@ -301,7 +301,7 @@ TestCase {
         compare(support.dataDirectoriesVisible, false);
         root.writeFile(androidDaemon, "");
         compare(support.dataDirectoriesVisible, true);
-        // A constant: what is bound to it stays.
+        // The property is a constant, so bindings to it are not updated.
         compare(support.shown, false);
         compare(createTemporaryObject(android, test).shown, true);
     }

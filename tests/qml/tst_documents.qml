@@ -110,7 +110,7 @@ TestCase {
         compare(manager.shown, false);
         root.writeFile(vendorFolder + "/full/fi.txt", "");
         compare(manager.hasVendorTermsOfUse, true);
-        // Nobody said so yet.
+        // No change signal has been emitted yet.
         compare(manager.shown, false);
         manager.vendorPath = vendorFolder;
         compare(manager.changes, 1);

@@ -250,7 +250,7 @@ TestCase {
         model.append({ number: 2, who: newPerson("Bob", ann), note: "second" });
         const view = viewOf(model, { role: "who.name" });
         compare(view.values, ["Ann", "Bob"]);
-        // Ann has no friend whose name it would be.
+        // Ann has no friend, so the path leads to no name.
         view.role = "who.friend.name";
         compare(view.values, ["", "Ann"]);
         view.role = "who.age";

@@ -23,7 +23,7 @@ namespace {
 const QByteArray disconnected =
     "org.freedesktop.DBus.Error.Disconnected Not connected to D-Bus server";
 
-// Without what MGConfItem has to say of the missing bus.
+// Leaves out the messages of MGConfItem about the missing bus.
 QString takeQmlMessages(MessageLog *log)
 {
     return log->takeReport()

@@ -341,7 +341,7 @@ void TestRandomActions::waitForReload()
     QTRY_VERIFY_WITH_TIMEOUT(m_timeouts > before, patience);
 }
 
-// Does one of the things that can happen, and returns what.
+// Takes one random step and returns its description.
 QString TestRandomActions::step()
 {
     const QString path = RandomSteps::anyOf(&m_random, m_paths);

@@ -39,7 +39,7 @@ private Q_SLOTS:
 
 private:
     static void add(const char *name, const QByteArray &content);
-    // All of this test.
+    // All messages of the test function that is running.
     QStringList messages();
 
     std::unique_ptr<MessageLog> m_log;
@@ -122,7 +122,7 @@ void TestTriggering::callsTheService()
 
 void TestTriggering::callsWithoutPathOrInterface()
 {
-    // A call needs no interface, but a path.
+    // A call needs a path but no interface.
     RecordingService lamp(QDBusConnection::SessionBus, lampName);
     add("a", "remote-service=org.example.lamp\nremote-path=/lamp\nremote-method=toggle\n");
     add("b",
@@ -181,7 +181,7 @@ void TestTriggering::missingServiceLeadsToTheStore()
     m_expected = QStringList(failure(serviceUnknown));
     QCOMPARE(messagesBefore, m_expected);
 
-    // A second tap asks again.
+    // A second tap asks the store again.
     m_model->triggerAction(0);
     QTRY_COMPARE(store.calls().size(), 2);
     m_expected += m_expected;

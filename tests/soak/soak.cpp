@@ -74,7 +74,7 @@ bool Soak::run(int seconds)
         }
         all.push_back(measure());
     }
-    // What is made once and stays has been made by then.
+    // By then, everything that is allocated only once has been allocated.
     const auto start = all.begin() + measurements / 4;
     const auto least = [](auto from, auto to) {
         return std::min_element(from, to,

@@ -18,7 +18,7 @@ void write(const QString &path, const QByteArray &content);
 void remove(const QString &path);
 void makeFolder(const QString &path);
 void makePipe(const QString &path);
-// Makes a file of a size, which takes no room on the disk.
+// Makes a file of the given size that takes no disk space.
 void makeSparse(const QString &path, qint64 size);
 void makeLink(const QString &target, const QString &path);
 

@@ -373,7 +373,7 @@ void countCalls(const QByteArray &path, long &calls, long &openFiles)
             ++calls;
             number = static_cast<long>(info.entry.nr);
         } else if (number == SYS_openat && info.exit.rval >= 0) {
-            // The lowest free descriptor is given out, and this program closes what it opens.
+            // The kernel returns the lowest free descriptor, and this program closes what it opens.
             openFiles = std::max(openFiles, static_cast<long>(info.exit.rval) + 1);
         }
     }

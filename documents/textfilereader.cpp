@@ -12,7 +12,7 @@
 namespace {
 
 // The text of a file without its line breaks; null if the file cannot be read or is larger than
-// allowed. Subtracts its size from what is allowed.
+// maximumSize. Subtracts the size of the file from maximumSize.
 QString readText(const QString &path, qint64 *maximumSize)
 {
     const RegularFile file = readRegularFile(path, *maximumSize);

@@ -15,7 +15,7 @@
 constexpr qint64 maximumEventsWidgetsSize = qint64(32) * 1024 * 1024;
 constexpr int maximumContainers = 1000000;
 
-// Whether a text has more objects and arrays than that; brackets in its strings count as well.
+// Whether a text has more objects and arrays than the limit. Brackets in strings are counted, too.
 bool isTooComplex(const QByteArray &json);
 
 /*

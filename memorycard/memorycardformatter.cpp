@@ -78,9 +78,9 @@ bool hasDescriptorsLeft()
 
     A failed command ends the sequence and sets the status to \c Error. In this status every
     operation is accepted. Formatting, removing files and probing use the \l devicePath that was set
-    when they were requested, even if it changes before they start. Each format() uses its own type,
-    too. Mounting and unmounting use the \l deviceName that is set when the step starts.
-
+    when they were requested, even if it changes before they start. Each format() makes the type
+    that it was called with. Mounting and unmounting use the \l deviceName that is set when the step
+    starts.
     A label that shows the file system of a card:
 
     \qml
@@ -102,8 +102,8 @@ bool hasDescriptorsLeft()
     \c Idle does not change when mount() finds the card mounted. A page therefore creates a
     formatter for each operation, in a Loader, and starts the operation in the handler of
     devicePathChanged(), before the probe of the new path is queued. The probe then runs after the
-    operation. The status changes from \c Idle and finally becomes \c Idle or \c Error: the
-    operation has ended. If it is \c Idle, \l filesystemType is the current type of the card.
+    operation. The status therefore always leaves \c Idle. When it becomes \c Idle or \c Error, the
+    operation has ended. After \c Idle, \l filesystemType is the current type of the card.
 
     \list
     \li Until the disk service answers the first request, the status is still \c Idle and \l busy is
@@ -130,7 +130,7 @@ bool hasDescriptorsLeft()
     \c Formatting, \c RemovingFiles and \c Probing are set when the work begins. \c Unmounting and
     \c Mounting are set when the disk service has reported success. Until then the status is still
     the previous one, and for the first step of a sequence \l busy is \c false. A page that shows
-    progress remembers its request.
+    progress must remember which operation it has requested.
 
     \section2 busyChanged() is emitted without a change
     It is also emitted when an operation has been accepted, although \l busy changes only with the
@@ -140,7 +140,7 @@ bool hasDescriptorsLeft()
     Operations are refused while \l busy is \c true. While the first request to the disk service is
     under way, \l busy is still \c false: operations are accepted then, and run afterwards. If the
     request fails, they are dropped, except the probe of a new \l devicePath. If format() is called
-    twice in this way, each call uses its own type.
+    twice in this way, each call makes the type that it was called with.
 
     \section2 Formatting needs a mounted card
     format() unmounts the card first. A card that is not mounted leads to \c Error with \c
@@ -148,13 +148,14 @@ bool hasDescriptorsLeft()
     ErrorAlreadyMounted is harmless.
 
     \section2 Two errors do not end the sequence
-    \c ErrorAlreadyMounted and \c ErrorAlreadyUnmounting are signalled, and the sequence continues:
+    \c ErrorAlreadyMounted and \c ErrorAlreadyUnmounting are reported, and the sequence continues:
     the card is already in the requested state, or about to be. The status of that step is not
     shown.
 
     \section2 Some errors have no signal
     mountError() and unmountError() carry the disk service's own errors. Others, such as a service
-    that does not exist, only lead to the status \c Error. The signal comes before the status.
+    that does not exist, only lead to the status \c Error. The signal is emitted before the status
+    changes.
 
     \section2 Any type can be requested
     For a type other than \c vfat and \c ext4 (case-sensitive), the helper program gets only the
@@ -162,8 +163,8 @@ bool hasDescriptorsLeft()
     device may support more than this module.
 
     \section2 A failed probe still changes the type
-    The output of the helper replaces \l filesystemType even if the helper fails, usually with an
-    empty text: a card that cannot be read has no known type. A helper that crashes or cannot be
+    Even if the helper fails, its output replaces \l filesystemType. The output is then usually
+    empty: a card that cannot be read has no known type. A helper that crashes or cannot be
     started leaves the type unchanged. It may then be the type of another card, so check \l status
     first. A new \l devicePath is probed immediately, even an empty one.
 
@@ -496,7 +497,7 @@ void MemoryCardFormatter::unmount()
     \value MemoryCardFormatter.ErrorNotSupported The operation is not supported.
     \value MemoryCardFormatter.ErrorTimedout The operation took too long.
     \value MemoryCardFormatter.ErrorWouldWakeup The operation would wake up a sleeping disk.
-    \value MemoryCardFormatter.ErrorDeviceBusy Something uses the card.
+    \value MemoryCardFormatter.ErrorDeviceBusy The card is in use.
 */
 
 /*!

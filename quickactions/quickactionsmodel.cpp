@@ -115,7 +115,8 @@ qint64 priorityOfRow(const QuickAction &action)
     \section2 An action can be enabled twice
     enableAction() appends to the user's list without a check, and disableAction() removes every
     entry of the path. The list that the model knows may be older than the stored one, so a check
-    could be wrong; removing every entry is always right. A repeated entry gives one row.
+    could be wrong; removing every entry is always right. A path has one row, however many entries
+    it has.
 
     \section2 Rows change only after dconf reports the change
     After enableAction() and disableAction() the model waits for the change of the key, as if
@@ -234,8 +235,9 @@ QuickActionsModel::~QuickActionsModel()
     }
     \endqml
 
-    If a handler sets the property while rows are being changed, it has the new value at once. The
-    rows and showPotentialChanged() follow when control returns to the event loop.
+    If a handler sets the property while rows are being changed, the property has the new value
+    immediately. The rows change, and showPotentialChanged() is emitted, when control returns to the
+    event loop.
 */
 bool QuickActionsModel::showPotential() const
 {

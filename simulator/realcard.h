@@ -52,7 +52,7 @@ public:
     // Changes to its files wait from here until thaw().
     void freeze();
     void thaw();
-    // Takes the device away beneath its file system, until reset().
+    // Removes the device while its file system is mounted; reset() restores it.
     void vanish();
 
 private:

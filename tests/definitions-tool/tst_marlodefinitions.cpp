@@ -337,7 +337,7 @@ void TestMarloDefinitions::hostileNames()
                      QStringLiteral("./a\\u000ab.conf:1: note\\u001b[2J ä.json:1: error: ")),
                  qPrintable(result.output));
     }
-    // A name that is not UTF-8 is not found, but does no harm.
+    // A file whose name is not UTF-8 is not found, and causes no crash.
     QFile file(QStringLiteral("plain.conf"));
     QVERIFY(file.open(QIODevice::WriteOnly));
     QCOMPARE(::rename("plain.conf", "bad\xff.conf"), 0);

@@ -417,7 +417,8 @@ void TestLocationConfiguration::anotherObjectRestores()
     QCOMPARE(configuration.mlsOnlineState(), State(2));
     QCOMPARE(configuration.hereState(), State(1));
 
-    // A service that was saved before the user agreed to it is disabled after the user agrees.
+    // If the settings were saved before the user agreed to a service, restoring them later disables
+    // it.
     setSwitches(true, false, 0, 1);
     configuration.saveCustomSettings();
     configuration.restoreCustomSettings();

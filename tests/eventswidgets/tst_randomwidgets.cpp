@@ -214,7 +214,7 @@ private:
 
     MGConfItem m_item{key};
     bool m_defaults = false;
-    // Only ever added to.
+    // Catalogs are added but never removed.
     NaiveCatalogs m_catalogs;
 };
 

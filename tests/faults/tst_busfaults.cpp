@@ -100,7 +100,7 @@ QStringList missing(const QStringList &facts, const QStringList &state)
     return lines;
 }
 
-// The formatter is done with whatever useAll() asked of it.
+// Whether the formatter has finished everything that useAll() requested.
 bool isIdle(const EveryType &types)
 {
     return !types.object(QStringLiteral("MemoryCardFormatter"))->property("busy").toBool();

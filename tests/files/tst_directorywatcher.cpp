@@ -286,7 +286,8 @@ void TestDirectoryWatcher::reportsDirectoryMadeLater()
 {
     const DirectoryWatcher watcher(m_directory, filter);
     QSignalSpy spy(&watcher, &DirectoryWatcher::changed);
-    // Creates one level at a time, and waits for its event before it creates the next.
+    // Creates one level at a time. The watcher has time to notice each one before the next is
+    // created.
     Files::makeFolder(path("a"));
     QVERIFY(!spy.wait(100));
     Files::makeFolder(path("a/b"));

@@ -24,7 +24,7 @@ QString inFolder(const char *name)
     return folder + QLatin1Char('/') + QLatin1String(name);
 }
 
-// A process that has ended and is not reaped yet is not running.
+// A zombie process does not count as running.
 bool isRunning(qint64 pid)
 {
     QFile file(QStringLiteral("/proc/%1/stat").arg(pid));

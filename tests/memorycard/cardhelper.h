@@ -18,7 +18,7 @@ class CardHelper
 {
 public:
     CardHelper();
-    // Ends what it has left running.
+    // Ends the processes that are still running.
     ~CardHelper();
     Q_DISABLE_COPY_MOVE(CardHelper)
 

@@ -1,7 +1,7 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-// Evaluates the QML given on the command line and says whether it could.
+// Evaluates the QML given on the command line. The exit code is 0 if that succeeds.
 
 #include <QCoreApplication>
 #include <QQmlComponent>

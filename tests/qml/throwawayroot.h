@@ -42,7 +42,7 @@ public:
     // From here on messages are taken; whatever a test does not expect should fail it. Before, what
     // QML has to say of the test itself is to be seen.
     Q_INVOKABLE void recordMessages();
-    // The messages that were logged since it was last asked.
+    // Returns the messages that were logged since the last call.
     Q_INVOKABLE QStringList takeMessages();
 
 private:

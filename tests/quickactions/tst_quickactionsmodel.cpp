@@ -907,7 +907,8 @@ void TestQuickActionsModel::rewrittenInPlace()
     const QuickActionsModel *model = loadedModel(true);
     QSignalSpy changed(model, &QAbstractItemModel::dataChanged);
     QVERIFY(definition.open(QIODevice::WriteOnly));
-    // Of another length: QSettings takes a file of the same length and time for the one it has read.
+    // The length must change: QSettings does not read a file again if its length and time are the
+    // same.
     definition.write("icon=changed\n");
     QVERIFY(definition.flush());
     // Reported when it is complete, and read one second later.

@@ -104,7 +104,8 @@ public:
                 events.append(QStringLiteral("removed %1").arg(row));
             }
         }
-        // In any order: here those that have a row, then the enabled ones, then the others.
+        // The order does not matter. Here it is: actions with a row, other enabled actions, the
+        // rest.
         QStringList order;
         for (const Action &action : qAsConst(rows)) {
             order.append(action.path);

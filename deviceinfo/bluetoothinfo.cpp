@@ -44,18 +44,16 @@ BluetoothInfo::BluetoothInfo(QObject *parent) : QObject(parent)
 
     The address of the Bluetooth adapter in lower case, such as \c{00:1a:7d:da:71:13}. It is the
     first line of \c /var/lib/bluetooth/board-address, which is not validated. The file is read
-    once, when the object is created. Empty, with a warning, if the file cannot be read or is larger
-    than 16 MiB.
+    once, when the object is created. Empty, with a warning, if the file cannot be read or the line is
+    larger than 16 MiB.
 */
 
 void BluetoothInfo::initAdapterAddress()
 {
-    const RegularFile file = readRegularFile(addressFile, maximumTextSize);
+    const RegularFile file = readFirstLine(addressFile, maximumTextSize);
     if (file.state != RegularFile::State::Read) {
         qWarning() << "Unable to open file:" << QString(addressFile);
         return;
     }
-    // Only the first line, and of that only what precedes a NUL.
-    const QByteArray line = file.content.mid(0, file.content.indexOf('\n'));
-    m_adapterAddress = QString::fromLatin1(line.constData()).toLower().trimmed();
+    m_adapterAddress = QString::fromLatin1(file.content).toLower().trimmed();
 }

@@ -30,4 +30,7 @@ struct RegularFile {
 
 RegularFile readRegularFile(const QString &path, qint64 maximumSize);
 
+// Reads up to the first newline or NUL, without it. Only this part may not be larger.
+RegularFile readFirstLine(const QString &path, qint64 maximumSize);
+
 #endif

@@ -3,9 +3,11 @@
 
 #include "deviceinfo/bluetoothinfo.h"
 #include "files.h"
+#include "files/regularfile.h"
 #include "interfaceof.h"
 #include "loggedtest.h"
 
+#include <QFile>
 #include <QtTest>
 
 class TestBluetoothInfo : public LoggedTest
@@ -18,6 +20,7 @@ private Q_SLOTS:
     void isOneConstantProperty();
     void readsTheFirstLine_data();
     void readsTheFirstLine();
+    void readsTheFirstLineOfAHugeFile();
     void readsOnce();
     void warnsOfWhatCannotBeOpened_data();
     void warnsOfWhatCannotBeOpened();
@@ -79,6 +82,15 @@ void TestBluetoothInfo::readsTheFirstLine()
     QCOMPARE(info.adapterAddress(), address);
 }
 
+void TestBluetoothInfo::readsTheFirstLineOfAHugeFile()
+{
+    Files::write(addressPath, "AA\n");
+    QVERIFY(QFile::resize(addressPath, qint64(1) << 40));
+    QCOMPARE(BluetoothInfo().adapterAddress(), QStringLiteral("aa"));
+    Files::write(addressPath, QByteArray(maximumTextSize, 'A'));
+    QCOMPARE(BluetoothInfo().adapterAddress().size(), int(maximumTextSize));
+}
+
 void TestBluetoothInfo::readsOnce()
 {
     Files::write(addressPath, "AA\n");
@@ -97,8 +109,8 @@ void TestBluetoothInfo::warnsOfWhatCannotBeOpened_data()
     QTest::newRow("pipe") << Make([] { Files::makePipe(addressPath); });
     QTest::newRow("device") << Make(
         [] { Files::makeLink(QStringLiteral("/dev/zero"), addressPath); });
-    QTest::newRow("larger than memory")
-        << Make([] { Files::makeSparse(addressPath, qint64(1) << 40); });
+    QTest::newRow("a line above the limit")
+        << Make([] { Files::write(addressPath, QByteArray(maximumTextSize + 1, 'A')); });
 }
 
 void TestBluetoothInfo::warnsOfWhatCannotBeOpened()

@@ -17,6 +17,7 @@ class TestRegularFile : public QObject
 
 private Q_SLOTS:
     void readsUpToTheLimit();
+    void readsTheFirstLine();
     void readsFilesOfTheKernel();
     void refuses_data();
     void refuses();
@@ -38,6 +39,25 @@ void TestRegularFile::readsUpToTheLimit()
     Files::write(path, {});
     QCOMPARE(readRegularFile(path, 0).state, State::Read);
     QCOMPARE(readRegularFile(path, 4).content, QByteArray());
+}
+
+void TestRegularFile::readsTheFirstLine()
+{
+    const QTemporaryDir directory;
+    const QString path = directory.filePath(QStringLiteral("file"));
+    Files::write(path, "text\nmore");
+    QCOMPARE(readFirstLine(path, 4).state, State::Read);
+    QCOMPARE(readFirstLine(path, 4).content, QByteArray("text"));
+    QCOMPARE(readFirstLine(path, 3).state, State::TooLarge);
+    QCOMPARE(readFirstLine(path, 3).content, QByteArray());
+    // A line that ends in the second block, and one that ends with the file.
+    Files::write(path, QByteArray(5000, 'x') + '\0' + "more");
+    QCOMPARE(readFirstLine(path, 5000).content, QByteArray(5000, 'x'));
+    Files::write(path, QByteArray(8192, 'x'));
+    QCOMPARE(readFirstLine(path, 8192).content, QByteArray(8192, 'x'));
+    QCOMPARE(readFirstLine(path, 8191).state, State::TooLarge);
+    QCOMPARE(readFirstLine(directory.path(), 4).state, State::NotRegular);
+    QCOMPARE(readFirstLine(QStringLiteral("/proc/self/mem"), 4).state, State::Failed);
 }
 
 // These claim to be empty, and may be of any size.

@@ -123,12 +123,13 @@ void warnOfLimits()
 void unwatchLater(const QByteArray &path)
 {
     static QSet<QByteArray> kept;
-    if (!QAbstractEventDispatcher::instance() || kept.contains(path)) {
+    const QAbstractEventDispatcher *const dispatcher = QAbstractEventDispatcher::instance();
+    if (!dispatcher || kept.contains(path)) {
         dconf_client_unwatch_fast(client(), path.constData());
         return;
     }
     kept.insert(path);
-    QTimer::singleShot(unwatchDelayMs, [path] {
+    QTimer::singleShot(unwatchDelayMs, dispatcher, [path] {
         kept.remove(path);
         dconf_client_unwatch_fast(client(), path.constData());
     });

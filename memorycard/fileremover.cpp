@@ -34,10 +34,10 @@ using MountTable = std::unique_ptr<FILE, CloseMountTable>;
 // glibc replaces the escapes in a field. musl, at least up to 1.2.3, returns them as they are.
 bool libraryDecodesEscapes()
 {
-    char line[] = "device /\\040 type options 0 0\n";
-    const MountTable table(fmemopen(line, sizeof(line) - 1, "r"));
+    QByteArray line("device /\\040 type options 0 0\n");
+    const MountTable table(fmemopen(line.data(), size_t(line.size()), "r"));
     mntent entry = {};
-    std::array<char, sizeof(line)> buffer = {};
+    std::array<char, 64> buffer = {};
     return !table || !getmntent_r(table.get(), &entry, buffer.data(), int(buffer.size()))
         || std::strcmp(entry.mnt_dir, "/ ") == 0;
 }

@@ -581,7 +581,11 @@ void MemoryCardFormatter::doNextCommand()
         return;
     }
     const Command command = m_commands.dequeue();
-    if (m_process == nullptr && !isMountCommand(command.command)) {
+    if (isMountCommand(command.command)) {
+        startMountOperation(command.command);
+        return;
+    }
+    if (m_process == nullptr) {
         m_process = new QProcess(this);
         m_process->setStandardErrorFile(QProcess::nullDevice());
         // Queued: a process cannot be started again from the signal that it did not start.
@@ -591,10 +595,6 @@ void MemoryCardFormatter::doNextCommand()
                 &MemoryCardFormatter::commandFinished);
     }
     switch (command.command) {
-    case Unmounting:
-    case Mounting:
-        startMountOperation(command.command);
-        break;
     case Formatting:
         startFormatting(command);
         break;

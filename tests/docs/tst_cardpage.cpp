@@ -77,8 +77,8 @@ void TestCardPage::init()
 
 void TestCardPage::cleanup()
 {
+    m_window.reset(); // which releases what it has drawn of the page
     m_page.reset();
-    m_window.reset();
     m_helper.reset();
     QCOMPARE(m_log->takeReport(), QString());
     m_log.reset();

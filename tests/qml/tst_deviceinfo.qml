@@ -125,10 +125,10 @@ TestCase {
     function test_switchesFollowOtherProcesses() {
         const page = createTemporaryObject(locationPage, test);
         root.setKey(location + "gps_enabled", true);
-        tryCompare(page, "gpsEnabled", true);
+        tryCompare(page, "heard", ["gps true"]);
         root.setKey(location + "here_state", 2);
-        tryCompare(page, "hereState", 2);
-        compare(page.heard, ["gps true", "here 2"]);
+        tryCompare(page, "heard", ["gps true", "here 2"]);
+        compare(switches(page), [true, false, 0, 2]);
     }
 
     function test_aNumberThatIsNoStateIsRefused() {

@@ -10,7 +10,7 @@
 #include <QJsonObject>
 #include <QtDebug>
 
-#include <algorithm>
+#include <cstring>
 
 namespace {
 
@@ -49,9 +49,19 @@ EventsWidget readWidget(const QJsonObject &object)
 
 bool isTooComplex(const QByteArray &json)
 {
-    return std::count_if(json.cbegin(), json.cend(),
-                         [](char character) { return character == '{' || character == '['; })
-        > maximumContainers;
+    // A loop over the characters would take a twentieth of the time that reading a file takes.
+    const auto next = [&json](const char *from, char bracket) {
+        return static_cast<const char *>(
+            std::memchr(from, bracket, std::size_t(json.cend() - from)));
+    };
+    int containers = 0;
+    for (const char bracket : {'{', '['}) {
+        for (const char *at = next(json.cbegin(), bracket);
+             at != nullptr && containers <= maximumContainers; at = next(at + 1, bracket)) {
+            ++containers;
+        }
+    }
+    return containers > maximumContainers;
 }
 
 std::optional<EventsWidgetsFile> readEventsWidgetsFile(const QString &path)
@@ -74,6 +84,7 @@ std::optional<EventsWidgetsFile> readEventsWidgetsFile(const QString &path)
     file.translationCatalog = document[translationCatalogKey].toString();
     int rejected = 0;
     const QJsonArray entries = document[widgetsKey].toArray();
+    file.widgets.reserve(std::size_t(entries.size()));
     for (const QJsonValue &entry : entries) {
         EventsWidget widget = readWidget(entry.toObject());
         if (widget.path.isEmpty()) {

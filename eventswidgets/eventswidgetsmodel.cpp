@@ -229,6 +229,7 @@ void EventsWidgetsModel::directoryChanged()
     const Change change(&m_requests);
 
     QSet<QString> stale;
+    stale.reserve(m_rows.size());
     for (const Widget &widget : qAsConst(m_rows)) {
         stale.insert(widget.path);
     }
@@ -313,19 +314,22 @@ std::vector<EventsWidget> EventsWidgetsModel::readWidgets()
         std::optional<EventsWidgetsFile> file = readEventsWidgetsFile(path);
         if (file) {
             m_catalogs.addDefinition(entries.fileName(), file->translationCatalog);
-            std::move(file->widgets.begin(), file->widgets.end(), std::back_inserter(widgets));
+            widgets.insert(widgets.end(), std::make_move_iterator(file->widgets.begin()),
+                           std::make_move_iterator(file->widgets.end()));
         }
     }
 
     if (m_defaults) {
         m_enabledList.clear();
-        for (const Widget &widget : widgets) {
+        for (Widget &widget : widgets) {
             m_enabledList.append(widget.path);
+            widget.enabled = widget.defaultEnabled;
         }
-    }
-    const QSet<QString> enabledPaths(m_enabledList.cbegin(), m_enabledList.cend());
-    for (Widget &widget : widgets) {
-        widget.enabled = m_defaults ? widget.defaultEnabled : enabledPaths.contains(widget.path);
+    } else {
+        const QSet<QString> enabledPaths(m_enabledList.cbegin(), m_enabledList.cend());
+        for (Widget &widget : widgets) {
+            widget.enabled = enabledPaths.contains(widget.path);
+        }
     }
     return widgets;
 }
@@ -335,7 +339,7 @@ void EventsWidgetsModel::mergeWidgets(const std::vector<Widget> &widgets)
     // The row of a path is this one or a later one, because insertions only push rows down.
     QHash<QString, int> firstRows;
     firstRows.reserve(m_rows.size() + int(widgets.size()));
-    std::vector<qint64> orders;
+    std::vector<int> orders;
     for (int row = 0; row < m_rows.size(); ++row) {
         firstRows.insert(m_rows.at(row).path, row);
         orders.push_back(m_rows.at(row).order);

@@ -11,9 +11,9 @@
 
 // Where to insert a row by its number: before the first row with a higher number, or at the end if
 // no such row exists or the number is negative. The rows need not be sorted.
-inline int insertionIndex(const std::vector<qint64> &rows, qint64 number)
+template<typename Number> int insertionIndex(const std::vector<Number> &rows, qint64 number)
 {
-    const auto isHigher = [number](qint64 row) { return row > number; };
+    const auto isHigher = [number](Number row) { return row > number; };
     const auto place =
         number < 0 ? rows.cend() : std::find_if(rows.cbegin(), rows.cend(), isHigher);
     return int(place - rows.cbegin());

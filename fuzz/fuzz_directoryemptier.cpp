@@ -30,15 +30,15 @@ const std::string top = "/top"; // is emptied
 const std::string outside = "/outside";
 const std::string aside = outside + "/aside"; // takes what is moved out of the top
 const std::string other = "/other"; // another file system
-// These must survive. No link in a tree leads to a folder with the names that are used in trees,
+// These must survive. No link in a tree leads to a directory with the names that are used in trees,
 // because the events that change a tree must not change these files. A walk that continues in a
-// wrong folder meets the last four.
+// wrong directory meets the last four.
 const std::vector<std::string> keptFiles = {
     outside + "/x", outside + "/y/x", outside + "/y/z/x", other + "/x", other + "/y/x",
     aside + "/a",   aside + "/b",     aside + "/c",       aside + "/d",
 };
-const std::vector<std::string> keptFolders = {outside, outside + "/y", outside + "/y/z",
-                                              aside,   other,          other + "/y"};
+const std::vector<std::string> keptDirectories = {outside, outside + "/y", outside + "/y/z",
+                                                  aside,   other,          other + "/y"};
 
 constexpr size_t maximumNodes = 400;
 constexpr size_t maximumLength = 1000; // of a path
@@ -64,8 +64,8 @@ void makeWorld()
 {
     mkdir(other.c_str(), 0700);
     Fuzzing::require(mount("tmpfs", other.c_str(), "tmpfs", 0, "mode=700") == 0, "it can mount");
-    for (const std::string &folder : keptFolders) {
-        mkdir(folder.c_str(), 0700);
+    for (const std::string &directory : keptDirectories) {
+        mkdir(directory.c_str(), 0700);
     }
 }
 
@@ -76,7 +76,7 @@ void touchAll()
     }
 }
 
-void clear(const std::string &folder)
+void clear(const std::string &directory)
 {
     const auto removeOne = [](const char *path, const struct stat *, int, struct FTW *place) {
         if (place->level > 0) {
@@ -84,7 +84,7 @@ void clear(const std::string &folder)
         }
         return 0;
     };
-    nftw(folder.c_str(), removeOne, 20, FTW_DEPTH | FTW_PHYS | FTW_MOUNT);
+    nftw(directory.c_str(), removeOne, 20, FTW_DEPTH | FTW_PHYS | FTW_MOUNT);
 }
 
 // A descriptor above all that are open once as many as given are opened.
@@ -97,9 +97,9 @@ int beyond(int count)
     return fd;
 }
 
-bool isEmpty(const std::string &folder)
+bool isEmpty(const std::string &directory)
 {
-    DIR *const stream = opendir(folder.c_str());
+    DIR *const stream = opendir(directory.c_str());
     int count = 0;
     while (readdir(stream) != nullptr) {
         ++count;
@@ -122,9 +122,9 @@ public:
         close(lowest);
         static const int limit = beyond(maximumOpen);
         m_limit = limit;
-        const int folder = open(top.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC);
+        const int directory = open(top.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC);
         takeCalls();
-        const bool emptied = emptyDirectory(FileDescriptor(folder));
+        const bool emptied = emptyDirectory(FileDescriptor(directory));
         SystemCalls::hooks() = {};
         takeMountsOff();
 
@@ -226,7 +226,7 @@ private:
         std::string path = way->back();
         for (int i = byte % 80; i > 0 && path.size() < maximumLength; --i) {
             if (byte >= 128) {
-                // Listed behind the folder, as older.
+                // Listed behind the directory, as older.
                 touch(path + "/d");
             }
             path += '/' + name;
@@ -337,7 +337,7 @@ private:
         return false;
     }
 
-    // Mounts the other file system on a folder, unless it is already mounted.
+    // Mounts the other file system on a directory, unless it is already mounted.
     void putMount(const std::string &node)
     {
         if (m_mount < 0 && node != top

@@ -24,7 +24,7 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t *data, std::size_t size
 {
     static const QString home = qEnvironmentVariable("HOME");
     static const bool made = QDir(home).mkpath(QStringLiteral("full"));
-    Fuzzing::require(made, "the folder can be made");
+    Fuzzing::require(made, "the directory can be made");
 
     Bytes input(data, size);
     const QString localeName = QString::fromUtf8(input.takeUntil('\n'));
@@ -39,7 +39,7 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t *data, std::size_t size
     const QString collated =
         reader.collate(QUrl::fromLocalFile(home + QStringLiteral("/full")), localeName, localeName);
     Fuzzing::require(collated == (read.isEmpty() ? QString() : localeName + read),
-                     "a folder of one file is that file");
+                     "a directory of one file is that file");
     reader.collate(QUrl(localeName), localeName, localeName);
     reader.readContent(home + QLatin1Char('/') + localeName);
 

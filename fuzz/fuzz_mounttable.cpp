@@ -19,10 +19,10 @@
 namespace {
 
 // The directories of the isolated file system, parents first; each contains a file.
-const std::vector<std::string> folders = {
-    "/etc",   "/dev",     "/card",   "/card/folder", "/card/folder/deep",
-    "/card2", "/a b",     "/tab\tx", "/back\\slash", "/new\nline",
-    "/#",     "/outside", "/cwd",    "/cwd/card",    "/\xff",
+const std::vector<std::string> directories = {
+    "/etc",   "/dev",     "/card",   "/card/directory", "/card/directory/deep",
+    "/card2", "/a b",     "/tab\tx", "/back\\slash",    "/new\nline",
+    "/#",     "/outside", "/cwd",    "/cwd/card",       "/\xff",
 };
 const char *const fileName = "/file";
 const char *const linkPath = "/link"; // to /card2
@@ -43,12 +43,12 @@ void touch(const std::string &path)
 
 void makeWorld()
 {
-    for (const std::string &folder : folders) {
-        mkdir(folder.c_str(), 0700);
-        touch(folder + fileName);
+    for (const std::string &directory : directories) {
+        mkdir(directory.c_str(), 0700);
+        touch(directory + fileName);
     }
     Fuzzing::require(exists(linkPath) || symlink("/card2", linkPath) == 0, "a link can be made");
-    Fuzzing::require(chdir("/cwd") == 0, "there is a current folder");
+    Fuzzing::require(chdir("/cwd") == 0, "there is a current directory");
 }
 
 void writeMountTable(const QByteArray &table)
@@ -87,7 +87,7 @@ std::string takeWord(const std::string &line, size_t *at)
 }
 
 // The inodes of the directories that the table names for the device.
-std::vector<ino_t> namedFolders(const std::string &device, const std::string &table)
+std::vector<ino_t> namedDirectories(const std::string &device, const std::string &table)
 {
     std::vector<ino_t> named;
     size_t start = 0;
@@ -101,8 +101,9 @@ std::vector<ino_t> namedFolders(const std::string &device, const std::string &ta
         if (takeWord(line, &at) != device) {
             continue;
         }
-        const std::string folder = takeWord(line, &at);
-        if (!folder.empty() && folder[0] == '/' && lstat((folder + "/").c_str(), &info) == 0) {
+        const std::string directory = takeWord(line, &at);
+        if (!directory.empty() && directory[0] == '/'
+            && lstat((directory + "/").c_str(), &info) == 0) {
             named.push_back(info.st_ino);
         }
     }
@@ -121,13 +122,13 @@ const char *empty(const QString &devicePath, const QByteArray &table)
     makeWorld();
     writeMountTable(table);
     const std::vector<ino_t> named =
-        namedFolders(QFile::encodeName(devicePath).toStdString(), table.toStdString());
+        namedDirectories(QFile::encodeName(devicePath).toStdString(), table.toStdString());
     // For each directory, whether its files may be removed.
     std::vector<bool> mayLose;
-    for (const std::string &folder : folders) {
+    for (const std::string &directory : directories) {
         bool may = false;
-        for (size_t end = folder.size(); end != 0; end = folder.rfind('/', end - 1)) {
-            const ino_t number = numberOf(folder.substr(0, end));
+        for (size_t end = directory.size(); end != 0; end = directory.rfind('/', end - 1)) {
+            const ino_t number = numberOf(directory.substr(0, end));
             may = may || std::find(named.cbegin(), named.cend(), number) != named.cend();
         }
         mayLose.push_back(may);
@@ -147,11 +148,11 @@ const char *empty(const QString &devicePath, const QByteArray &table)
         return "the link must stay";
     }
     bool lost = false;
-    for (size_t i = 0; i < folders.size(); ++i) {
-        if (!exists(folders[i] + fileName)) {
+    for (size_t i = 0; i < directories.size(); ++i) {
+        if (!exists(directories[i] + fileName)) {
             lost = true;
             if (!mayLose[i]) {
-                return "no folder loses anything that the table does not name for the device";
+                return "no directory loses anything that the table does not name for the device";
             }
         }
     }

@@ -204,8 +204,8 @@ void TestCorpus::initTestCase()
 void TestCorpus::init()
 {
     LoggedTest::init();
-    Files::makeFolder(quickActionsDirectory);
-    Files::makeFolder(eventsWidgetsDirectory);
+    Files::makeDirectory(quickActionsDirectory);
+    Files::makeDirectory(eventsWidgetsDirectory);
 }
 
 void TestCorpus::cleanup()

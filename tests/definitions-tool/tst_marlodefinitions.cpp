@@ -208,8 +208,8 @@ void TestMarloDefinitions::directory()
     Files::write(QStringLiteral("f/readme.txt"), "x");
     Files::write(QStringLiteral("f/w.json"), "[]");
     Files::write(QStringLiteral("f/deeper/c.conf"), "c\n");
-    Files::makeFolder(QStringLiteral("f/directory.conf"));
-    Files::makeFolder(QStringLiteral("f/directory.json"));
+    Files::makeDirectory(QStringLiteral("f/directory.conf"));
+    Files::makeDirectory(QStringLiteral("f/directory.json"));
     Files::makeLink(QStringLiteral("nowhere.conf"), QStringLiteral("f/link.conf"));
     const Result result = run("check f");
     QCOMPARE(result.status, 1);
@@ -262,7 +262,7 @@ void TestMarloDefinitions::root()
                        "\"atlas\" is not installed in root/usr/share/translations "
                        "[catalog]\n"));
 
-    Files::makeFolder(QStringLiteral("root/usr/share/translations"));
+    Files::makeDirectory(QStringLiteral("root/usr/share/translations"));
     QVERIFY(QFile::copy(QStringLiteral("/usr/share/translations/atlas_eng_en.qm"),
                         QStringLiteral("root/usr/share/translations/atlas_eng_en.qm")));
     const Result lacking = run(line);
@@ -373,7 +373,7 @@ void TestMarloDefinitions::hostileFiles()
     } else if (kind == QStringLiteral("endless device")) {
         Files::makeLink(QStringLiteral("/dev/zero"), name);
     } else if (kind == QStringLiteral("directory")) {
-        Files::makeFolder(name + QStringLiteral("/x"));
+        Files::makeDirectory(name + QStringLiteral("/x"));
     } else if (kind == QStringLiteral("huge")) {
         Files::write(name, "{}");
         QVERIFY(QFile::resize(name, 1LL << 40));

@@ -53,7 +53,7 @@ void TestAndroidSupport::isVisibleWithTheDaemon()
 void TestAndroidSupport::anyEntryWillDo()
 {
     const AndroidSupport support;
-    Files::makeFolder(daemonPath);
+    Files::makeDirectory(daemonPath);
     QVERIFY(support.dataDirectoriesVisible());
     Files::remove(daemonPath);
     Files::makePipe(daemonPath);

@@ -105,7 +105,7 @@ void TestBluetoothInfo::warnsOfWhatCannotBeOpened_data()
 {
     QTest::addColumn<Make>("make");
     QTest::newRow("nothing") << Make([] {});
-    QTest::newRow("folder") << Make([] { Files::makeFolder(addressPath); });
+    QTest::newRow("directory") << Make([] { Files::makeDirectory(addressPath); });
     QTest::newRow("pipe") << Make([] { Files::makePipe(addressPath); });
     QTest::newRow("device") << Make(
         [] { Files::makeLink(QStringLiteral("/dev/zero"), addressPath); });

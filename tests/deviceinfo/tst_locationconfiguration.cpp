@@ -116,9 +116,9 @@ void TestLocationConfiguration::init()
                             "custom_settings", "custom_settings_enabled"}) {
         MGConfItem(QStringLiteral("/settings/location/") + QString::fromLatin1(key)).unset();
     }
-    for (const char *folder : {"/usr/share/geoclue-provider-mlsdb/agreements",
-                               "/usr/share/libherepositioning/agreements"}) {
-        Files::remove(QString::fromLatin1(folder));
+    for (const char *directory : {"/usr/share/geoclue-provider-mlsdb/agreements",
+                                  "/usr/share/libherepositioning/agreements"}) {
+        Files::remove(QString::fromLatin1(directory));
     }
     QLocale::setDefault(QLocale(QStringLiteral("fi_FI")));
     LoggedTest::init();
@@ -551,7 +551,7 @@ void TestLocationConfiguration::anAgreementThatCannotBeOpened()
     const QString path = base + QStringLiteral("fi_FI.txt");
     Files::write(base + QStringLiteral("en_GB.txt"), "Agreement\n");
     const LocationConfiguration configuration;
-    Files::makeFolder(path);
+    Files::makeDirectory(path);
     QCOMPARE(configuration.property(property).toString(), noTextId);
     Files::remove(path);
     Files::makePipe(path);
@@ -575,7 +575,7 @@ void TestLocationConfiguration::englishThatCannotBeOpened()
 {
     QFETCH(QByteArray, property);
     QFETCH(QString, base);
-    Files::makeFolder(QFileInfo(base).path());
+    Files::makeDirectory(QFileInfo(base).path());
     Files::makePipe(base + QStringLiteral("en_GB.txt"));
     const LocationConfiguration configuration;
     QCOMPARE(configuration.property(property).toString(), noTextId);

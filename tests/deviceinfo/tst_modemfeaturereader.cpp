@@ -97,7 +97,7 @@ void TestModemFeatureReader::readsOnEveryRead()
 void TestModemFeatureReader::whatCannotBeReadIsEmpty()
 {
     const ModemFeatureReader reader;
-    Files::makeFolder(featuresPath);
+    Files::makeDirectory(featuresPath);
     QCOMPARE(reader.variant(), QString());
     Files::remove(featuresPath);
     Files::makePipe(featuresPath);
@@ -111,8 +111,8 @@ void TestModemFeatureReader::doesNotWrite()
 {
     const ModemFeatureReader reader;
     QCOMPARE(reader.variant(), QString());
-    const QDir folder(QFileInfo(featuresPath).path());
-    QCOMPARE(folder.entryList(QDir::AllEntries | QDir::Hidden | QDir::NoDotAndDotDot),
+    const QDir directory(QFileInfo(featuresPath).path());
+    QCOMPARE(directory.entryList(QDir::AllEntries | QDir::Hidden | QDir::NoDotAndDotDot),
              QStringList());
 }
 

@@ -171,17 +171,17 @@ void TestExamples::listsTheActionOnAPage()
 void TestExamples::runsThoseOfTheReference_data()
 {
     QTest::addColumn<QByteArray>("document");
-    const QStringList folders = {QStringLiteral("deviceinfo"), QStringLiteral("documents"),
-                                 QStringLiteral("eventswidgets"), QStringLiteral("memorycard"),
-                                 QStringLiteral("quickactions")};
+    const QStringList directories = {QStringLiteral("deviceinfo"), QStringLiteral("documents"),
+                                     QStringLiteral("eventswidgets"), QStringLiteral("memorycard"),
+                                     QStringLiteral("quickactions")};
     int found = 0;
-    for (const QString &folder : folders) {
-        const QStringList names = QDir(QStringLiteral(SOURCE_DIR "/") + folder)
+    for (const QString &directory : directories) {
+        const QStringList names = QDir(QStringLiteral(SOURCE_DIR "/") + directory)
                                       .entryList({QStringLiteral("*.cpp")}, QDir::Files);
         for (const QString &name : names) {
             static const QRegularExpression block(QStringLiteral("(?s)\\\\qml\\n(.*?)\\\\endqml"));
-            auto blocks =
-                block.globalMatch(QString::fromUtf8(contentOf(folder + QLatin1Char('/') + name)));
+            auto blocks = block.globalMatch(
+                QString::fromUtf8(contentOf(directory + QLatin1Char('/') + name)));
             while (blocks.hasNext()) {
                 ++found;
                 QTest::addRow("%s %d", qPrintable(name), found)

@@ -39,15 +39,15 @@ Q_DECLARE_METATYPE(Make)
 
 namespace {
 
-const QString platformFolder = QStringLiteral("/usr/share/marlo-settings/platform-eula");
-const QString vendorFolder = QStringLiteral("/var/lib/marlo-vendor");
+const QString platformDirectory = QStringLiteral("/usr/share/marlo-settings/platform-eula");
+const QString vendorDirectory = QStringLiteral("/var/lib/marlo-vendor");
 const QString noTerms = QStringLiteral(
     "warning [default] TermsOfUseManager: unable to load either the specified locale or the "
     "English terms");
 
 QString platformFile(const QString &locale)
 {
-    return platformFolder + QStringLiteral("/tarnwick_termsofuse-%1.txt").arg(locale);
+    return platformDirectory + QStringLiteral("/tarnwick_termsofuse-%1.txt").arg(locale);
 }
 
 QString noLocalTerms(const QString &locale)
@@ -61,8 +61,8 @@ QString noLocalTerms(const QString &locale)
 
 void TestTermsOfUseManager::init()
 {
-    Files::remove(platformFolder);
-    Files::remove(vendorFolder);
+    Files::remove(platformDirectory);
+    Files::remove(vendorDirectory);
     LoggedTest::init();
 }
 
@@ -87,10 +87,10 @@ void TestTermsOfUseManager::vendorPath()
     manager.setVendorPath(QString());
     manager.setVendorPath(QStringLiteral(""));
     QVERIFY(changed.isEmpty());
-    manager.setVendorPath(vendorFolder);
-    QCOMPARE(manager.vendorPath(), vendorFolder);
+    manager.setVendorPath(vendorDirectory);
+    QCOMPARE(manager.vendorPath(), vendorDirectory);
     QCOMPARE(changed.size(), 1);
-    manager.setVendorPath(vendorFolder);
+    manager.setVendorPath(vendorDirectory);
     QCOMPARE(changed.size(), 1);
     manager.setVendorPath(QString());
     QCOMPARE(manager.vendorPath(), QString());
@@ -101,14 +101,14 @@ void TestTermsOfUseManager::hasVendorTermsOfUse()
 {
     TermsOfUseManager manager;
     QVERIFY(!manager.hasVendorTermsOfUse());
-    manager.setVendorPath(vendorFolder);
+    manager.setVendorPath(vendorDirectory);
     QVERIFY(!manager.hasVendorTermsOfUse());
     // Looked up on every read, and any entry will do.
-    Files::makeFolder(vendorFolder);
+    Files::makeDirectory(vendorDirectory);
     QVERIFY(manager.hasVendorTermsOfUse());
-    Files::remove(vendorFolder);
+    Files::remove(vendorDirectory);
     QVERIFY(!manager.hasVendorTermsOfUse());
-    Files::write(vendorFolder, {});
+    Files::write(vendorDirectory, {});
     QVERIFY(manager.hasVendorTermsOfUse());
     manager.setVendorPath(QString());
     QVERIFY(!manager.hasVendorTermsOfUse());
@@ -234,8 +234,8 @@ void TestTermsOfUseManager::whatCannotBeOpened_data()
 {
     QTest::addColumn<Make>("make");
     QTest::addColumn<QString>("error");
-    QTest::newRow("folder") << Make([](const QString &path) { Files::makeFolder(path); })
-                            << QStringLiteral("file to open is a directory");
+    QTest::newRow("directory") << Make([](const QString &path) { Files::makeDirectory(path); })
+                               << QStringLiteral("file to open is a directory");
     QTest::newRow("pipe") << Make([](const QString &path) { Files::makePipe(path); })
                           << QStringLiteral("file to open is no regular file");
     QTest::newRow("device") << Make([](const QString &path) {
@@ -271,11 +271,11 @@ void TestTermsOfUseManager::whatCannotBeOpened()
 void TestTermsOfUseManager::vendorTermsAndSummary()
 {
     Files::write(platformFile(QStringLiteral("fi")), "fi\nbody");
-    Files::write(vendorFolder + QStringLiteral("/full/fi.txt"), "Full\nfull body\n");
-    Files::write(vendorFolder + QStringLiteral("/full/en_GB.txt"), "English\n");
-    Files::write(vendorFolder + QStringLiteral("/summary/fi.txt"), "Summary\nsummary body\n");
+    Files::write(vendorDirectory + QStringLiteral("/full/fi.txt"), "Full\nfull body\n");
+    Files::write(vendorDirectory + QStringLiteral("/full/en_GB.txt"), "English\n");
+    Files::write(vendorDirectory + QStringLiteral("/summary/fi.txt"), "Summary\nsummary body\n");
     TermsOfUseManager manager;
-    manager.setVendorPath(vendorFolder);
+    manager.setVendorPath(vendorDirectory);
     const QString locale = QStringLiteral("fi_FI.UTF-8");
     QCOMPARE(manager.vendorTermsOfUse(locale),
              QStringList({QStringLiteral("Full"), QStringLiteral("full body")}));

@@ -39,16 +39,16 @@ private Q_SLOTS:
     void collateLeavesOutEmptyFiles();
     void collateLeavesOutWhatIsTooLarge();
     void collateOfNothing();
-    void collateOfNoLocalFolder_data();
-    void collateOfNoLocalFolder();
+    void collateOfNoLocalDirectory_data();
+    void collateOfNoLocalDirectory();
     void collateDecodesUrls();
     void collateKeepsSeparatorAndPrefix();
 
 private:
     QString path(const char *name) const;
-    QUrl folder() const { return QUrl::fromLocalFile(m_folder->path()); }
+    QUrl directory() const { return QUrl::fromLocalFile(m_directory->path()); }
 
-    std::unique_ptr<QTemporaryDir> m_folder;
+    std::unique_ptr<QTemporaryDir> m_directory;
 };
 
 namespace {
@@ -72,20 +72,20 @@ void makeSocket(const QString &path)
 
 QString TestTextFileReader::path(const char *name) const
 {
-    return m_folder->filePath(QString::fromUtf8(name));
+    return m_directory->filePath(QString::fromUtf8(name));
 }
 
 void TestTextFileReader::init()
 {
-    m_folder = std::make_unique<QTemporaryDir>();
-    QVERIFY(m_folder->isValid());
+    m_directory = std::make_unique<QTemporaryDir>();
+    QVERIFY(m_directory->isValid());
     LoggedTest::init();
 }
 
 void TestTextFileReader::cleanup()
 {
     LoggedTest::cleanup();
-    m_folder.reset();
+    m_directory.reset();
 }
 
 void TestTextFileReader::hasTwoMethods()
@@ -143,7 +143,7 @@ void TestTextFileReader::readContentOfNothing_data()
     QTest::newRow("no path") << QString();
     QTest::newRow("nothing") << QStringLiteral("%1/nothing");
     QTest::newRow("nothing in a file") << QStringLiteral("%1/file/nothing");
-    QTest::newRow("folder") << QStringLiteral("%1");
+    QTest::newRow("directory") << QStringLiteral("%1");
     QTest::newRow("pipe") << QStringLiteral("%1/pipe");
     QTest::newRow("socket") << QStringLiteral("%1/socket");
     QTest::newRow("link to a pipe") << QStringLiteral("%1/link");
@@ -166,7 +166,7 @@ void TestTextFileReader::readContentOfNothing()
     Files::makeLink(path("loop"), path("loop"));
     makeSocket(path("socket"));
     const TextFileReader reader;
-    name.replace(QStringLiteral("%1"), m_folder->path());
+    name.replace(QStringLiteral("%1"), m_directory->path());
     QVERIFY(reader.readContent(name).isNull());
 }
 
@@ -204,9 +204,9 @@ void TestTextFileReader::collateJoinsInOrder()
     Files::write(path("2"), "B");
     Files::write(path("1"), "A");
     const TextFileReader reader;
-    QCOMPARE(reader.collate(folder(), comma, colon), QStringLiteral(":A,B"));
+    QCOMPARE(reader.collate(directory(), comma, colon), QStringLiteral(":A,B"));
     Files::write(path("10"), "C\nD\n");
-    QCOMPARE(reader.collate(folder(), comma, colon), QStringLiteral(":A,CD,B"));
+    QCOMPARE(reader.collate(directory(), comma, colon), QStringLiteral(":A,CD,B"));
 }
 
 void TestTextFileReader::collateSortsByCase()
@@ -215,7 +215,7 @@ void TestTextFileReader::collateSortsByCase()
         Files::write(path(name), name);
     }
     const TextFileReader reader;
-    QCOMPARE(reader.collate(folder(), comma, QString()), QStringLiteral("1,B,D,_,a,c,ä"));
+    QCOMPARE(reader.collate(directory(), comma, QString()), QStringLiteral("1,B,D,_,a,c,ä"));
 }
 
 void TestTextFileReader::collateTakesFilesOnly()
@@ -226,15 +226,15 @@ void TestTextFileReader::collateTakesFilesOnly()
     Files::write(path("a"), "a");
     Files::makeLink(target, path("b"));
     Files::write(path(".hidden"), "hidden");
-    Files::write(path("folder/c"), "in a folder");
-    Files::makeLink(path("folder"), path("link to a folder"));
+    Files::write(path("directory/c"), "in a directory");
+    Files::makeLink(path("directory"), path("link to a directory"));
     Files::makeLink(path("nothing"), path("link to nothing"));
     Files::makePipe(path("pipe"));
     Files::makeLink(path("pipe"), path("link to a pipe"));
     Files::makeLink(QStringLiteral("/dev/zero"), path("link to a device"));
     makeSocket(path("socket"));
     const TextFileReader reader;
-    QCOMPARE(reader.collate(folder(), comma, colon), QStringLiteral(":a,link"));
+    QCOMPARE(reader.collate(directory(), comma, colon), QStringLiteral(":a,link"));
 }
 
 void TestTextFileReader::collateLeavesOutEmptyFiles()
@@ -245,7 +245,7 @@ void TestTextFileReader::collateLeavesOutEmptyFiles()
     Files::write(path("4"), " ");
     Files::write(path("5"), "");
     const TextFileReader reader;
-    QCOMPARE(reader.collate(folder(), comma, colon), QStringLiteral(":A, "));
+    QCOMPARE(reader.collate(directory(), comma, colon), QStringLiteral(":A, "));
 }
 
 void TestTextFileReader::collateLeavesOutWhatIsTooLarge()
@@ -257,7 +257,7 @@ void TestTextFileReader::collateLeavesOutWhatIsTooLarge()
     Files::write(path("5"), "C");
     const TextFileReader reader;
     // The limit is one of all files together.
-    const QString text = reader.collate(folder(), comma, QString());
+    const QString text = reader.collate(directory(), comma, QString());
     QCOMPARE(text.size(), int(maximumTextSize) + 2);
     QVERIFY(text.startsWith(QStringLiteral("A,")));
     QVERIFY(text.endsWith(QStringLiteral(",B")));
@@ -266,17 +266,17 @@ void TestTextFileReader::collateLeavesOutWhatIsTooLarge()
 void TestTextFileReader::collateOfNothing()
 {
     const TextFileReader reader;
-    QVERIFY(reader.collate(folder(), comma, colon).isNull());
+    QVERIFY(reader.collate(directory(), comma, colon).isNull());
     Files::write(path("1"), "");
     Files::write(path("2"), "\n");
-    QVERIFY(reader.collate(folder(), comma, colon).isNull());
+    QVERIFY(reader.collate(directory(), comma, colon).isNull());
     QVERIFY(reader.collate(QUrl::fromLocalFile(path("nothing")), comma, colon).isNull());
     Files::write(path("3"), "text");
     QVERIFY(reader.collate(QUrl::fromLocalFile(path("3")), comma, colon).isNull());
-    QVERIFY(!reader.collate(folder(), comma, colon).isNull());
+    QVERIFY(!reader.collate(directory(), comma, colon).isNull());
 }
 
-void TestTextFileReader::collateOfNoLocalFolder_data()
+void TestTextFileReader::collateOfNoLocalDirectory_data()
 {
     QTest::addColumn<QString>("url");
     QTest::newRow("none") << QString();
@@ -289,15 +289,15 @@ void TestTextFileReader::collateOfNoLocalFolder_data()
     QTest::newRow("NUL") << QStringLiteral("file://%1%00x");
 }
 
-void TestTextFileReader::collateOfNoLocalFolder()
+void TestTextFileReader::collateOfNoLocalDirectory()
 {
     QFETCH(QString, url);
     Files::write(path("1"), "text");
-    // The current folder has a text, which must not be found.
+    // The current directory has a text, which must not be found.
     const QString before = QDir::currentPath();
-    QVERIFY(QDir::setCurrent(m_folder->path()));
+    QVERIFY(QDir::setCurrent(m_directory->path()));
     const TextFileReader reader;
-    url.replace(QStringLiteral("%1"), m_folder->path());
+    url.replace(QStringLiteral("%1"), m_directory->path());
     const QString text = reader.collate(QUrl(url), comma, colon);
     QVERIFY(QDir::setCurrent(before));
     QVERIFY(text.isNull());
@@ -305,10 +305,10 @@ void TestTextFileReader::collateOfNoLocalFolder()
 
 void TestTextFileReader::collateDecodesUrls()
 {
-    Files::write(path("a folder #1/file"), "text");
+    Files::write(path("a directory #1/file"), "text");
     const TextFileReader reader;
-    const QUrl url(QStringLiteral("file://%1/a%20folder%20%231")
-                       .replace(QStringLiteral("%1"), m_folder->path()));
+    const QUrl url(QStringLiteral("file://%1/a%20directory%20%231")
+                       .replace(QStringLiteral("%1"), m_directory->path()));
     QCOMPARE(reader.collate(url, comma, QString()), QStringLiteral("text"));
 }
 
@@ -317,9 +317,9 @@ void TestTextFileReader::collateKeepsSeparatorAndPrefix()
     Files::write(path("1"), "%1");
     Files::write(path("2"), "%2");
     const TextFileReader reader;
-    QCOMPARE(reader.collate(folder(), QStringLiteral("%1\n"), QStringLiteral("%2")),
+    QCOMPARE(reader.collate(directory(), QStringLiteral("%1\n"), QStringLiteral("%2")),
              QStringLiteral("%2%1%1\n%2"));
-    QCOMPARE(reader.collate(folder(), QString(), QString()), QStringLiteral("%1%2"));
+    QCOMPARE(reader.collate(directory(), QString(), QString()), QStringLiteral("%1%2"));
 }
 
 QTEST_GUILESS_MAIN(TestTextFileReader)

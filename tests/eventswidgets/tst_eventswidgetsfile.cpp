@@ -370,7 +370,7 @@ void TestEventsWidgetsFile::notARegularFile()
     } else if (kind == QStringLiteral("endless device")) {
         Files::makeLink(QStringLiteral("/dev/zero"), m_path);
     } else {
-        Files::makeFolder(m_path);
+        Files::makeDirectory(m_path);
     }
     QVERIFY(!readEventsWidgetsFile(m_path));
     QCOMPARE(m_log->takeReport(), warning("Failed to open"));
@@ -425,7 +425,7 @@ void TestEventsWidgetsFile::availability()
     Files::write(widget.availablePath, "");
     QVERIFY(widget.isAvailable());
     Files::remove(widget.availablePath);
-    Files::makeFolder(widget.availablePath);
+    Files::makeDirectory(widget.availablePath);
     QVERIFY(widget.isAvailable());
 
     const QByteArray path = '"' + widget.availablePath.toUtf8() + '"';

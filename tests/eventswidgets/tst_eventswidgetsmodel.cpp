@@ -171,7 +171,7 @@ void TestEventsWidgetsModel::init()
     }
     QLocale::setDefault(QLocale(QStringLiteral("fi_FI")));
     Files::remove(directory);
-    Files::makeFolder(directory);
+    Files::makeDirectory(directory);
     m_key = std::make_unique<MGConfItem>(keyName);
     m_key->unset();
     LoggedTest::init();
@@ -286,7 +286,7 @@ void TestEventsWidgetsModel::readsJsonFilesOnly()
     writeFile("more.json.bak", R"({ "path": "backup" })");
     writeFile("json", R"({ "path": "bare" })");
     writeFile(".hidden.json", R"({ "path": "hidden" })");
-    writeFile("folder.json/below.json", R"({ "path": "below" })");
+    writeFile("directory.json/below.json", R"({ "path": "below" })");
     Files::makeLink(pathOf("json"), pathOf("link.json"));
     Files::makeLink(pathOf("nowhere"), pathOf("broken.json"));
     Files::makeLink(directory, pathOf("loop.json"));

@@ -212,9 +212,10 @@ QStringList EveryType::state(const QString &name) const
         QMetaObject::invokeMethod(it, "readContent", Q_RETURN_ARG(QString, text),
                                   Q_ARG(QString, textFile));
         note("readContent", text);
-        const QUrl folder = QUrl::fromLocalFile(textFile).adjusted(QUrl::RemoveFilename);
-        QMetaObject::invokeMethod(it, "collate", Q_RETURN_ARG(QString, text), Q_ARG(QUrl, folder),
-                                  Q_ARG(QString, QString()), Q_ARG(QString, QString()));
+        const QUrl directory = QUrl::fromLocalFile(textFile).adjusted(QUrl::RemoveFilename);
+        QMetaObject::invokeMethod(it, "collate", Q_RETURN_ARG(QString, text),
+                                  Q_ARG(QUrl, directory), Q_ARG(QString, QString()),
+                                  Q_ARG(QString, QString()));
         note("collate", text);
     }
     return lines;

@@ -12,8 +12,8 @@
 #include <vector>
 
 /*
-    A mounted card that fails as it is told: a file system of one folder of files, which a thread of
-    this process plays to the kernel.
+    A mounted card that fails on request: a file system of one directory of files, which a thread
+    of this process serves to the kernel.
 */
 class FailingCard
 {

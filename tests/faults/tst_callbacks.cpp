@@ -55,8 +55,8 @@ constexpr int patience = 60000; // ms, of a machine that is very busy
 #define TRY(condition) QTRY_VERIFY_WITH_TIMEOUT(condition, patience)
 #define TRY_COMPARE(actual, expected) QTRY_COMPARE_WITH_TIMEOUT(actual, expected, patience)
 
-const QString actionsFolder = QStringLiteral("/usr/share/glimmera/quickactions");
-const QString widgetsFolder = QStringLiteral("/usr/share/glimmera/eventswidgets");
+const QString actionsDirectory = QStringLiteral("/usr/share/glimmera/quickactions");
+const QString widgetsDirectory = QStringLiteral("/usr/share/glimmera/eventswidgets");
 
 QByteArray anyLiteral(int type)
 {
@@ -105,8 +105,8 @@ void TestCallbacks::initTestCase()
 void TestCallbacks::init()
 {
     m_object.reset();
-    Files::remove(actionsFolder);
-    Files::remove(widgetsFolder);
+    Files::remove(actionsDirectory);
+    Files::remove(widgetsDirectory);
     EveryType::installFiles();
     m_log = std::make_unique<MessageLog>();
 }
@@ -237,9 +237,9 @@ void TestCallbacks::memoryCardFormatter()
 void TestCallbacks::quickActionsModel()
 {
     make("QuickActionsModel", "    showPotential: true");
-    const QString path = actionsFolder + QStringLiteral("/lamp.conf");
+    const QString path = actionsDirectory + QStringLiteral("/lamp.conf");
     for (int i = 0; i < 20 && !unheard().isEmpty(); ++i) {
-        Files::write(actionsFolder + QStringLiteral("/%1.conf").arg(i), "title=a\n");
+        Files::write(actionsDirectory + QStringLiteral("/%1.conf").arg(i), "title=a\n");
         m_object->setProperty("showPotential", i % 2 == 0);
         QMetaObject::invokeMethod(m_object.get(), i % 4 < 2 ? "enableAction" : "disableAction",
                                   Q_ARG(QString, path));
@@ -253,7 +253,7 @@ void TestCallbacks::eventsWidgetsModel()
 {
     make("EventsWidgetsModel");
     for (int i = 0; i < 20 && !unheard().isEmpty(); ++i) {
-        const QString file = widgetsFolder + QStringLiteral("/new.json");
+        const QString file = widgetsDirectory + QStringLiteral("/new.json");
         if (i % 2 == 0) {
             Files::write(file, R"({ "widgets": [ { "path": "new" } ] })");
         } else {

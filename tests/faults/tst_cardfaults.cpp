@@ -177,7 +177,7 @@ void TestCardFaults::cardDetachedWhileItIsEmptied()
     card.setFault(FailingCard::Fault::Waits);
     startEmptying();
     TRY_COMPARE(card.waiting(), 1);
-    // Beneath the card lies a folder of somebody else's.
+    // Beneath the card lies a directory of somebody else's.
     card.detach();
     const QString below = card.directory() + QStringLiteral("/file0");
     Files::write(below, "not of the card");

@@ -164,8 +164,8 @@ void load(const QStringList &keys, const QByteArray &value)
 {
     QByteArray file;
     for (const QString &key : keys) {
-        const int folder = key.lastIndexOf(QLatin1Char('/'));
-        file += '[' + key.mid(1, folder - 1).toUtf8() + "]\n" + key.mid(folder + 1).toUtf8() + '='
+        const int slash = key.lastIndexOf(QLatin1Char('/'));
+        file += '[' + key.mid(1, slash - 1).toUtf8() + "]\n" + key.mid(slash + 1).toUtf8() + '='
             + value + '\n';
     }
     DconfTool::run({QStringLiteral("load"), QStringLiteral("/")}, file);
@@ -173,8 +173,8 @@ void load(const QStringList &keys, const QByteArray &value)
 
 void reset()
 {
-    for (const char *folder : {"/desktop/", "/settings/", "/other/"}) {
-        DconfTool::reset(QString::fromLatin1(folder));
+    for (const char *directory : {"/desktop/", "/settings/", "/other/"}) {
+        DconfTool::reset(QString::fromLatin1(directory));
     }
 }
 

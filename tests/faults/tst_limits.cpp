@@ -1,7 +1,7 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-// What the kernel gives out sparingly, used up; and folders that are not what they were.
+// What the kernel gives out sparingly, used up; and directories that are not what they were.
 
 #include "everytype.h"
 #include "files.h"
@@ -24,8 +24,8 @@ private Q_SLOTS:
     void noInotifyInstances();
     void noInotifyWatches();
     void noDescriptors();
-    void folderReplacedByALink_data();
-    void folderReplacedByALink();
+    void directoryReplacedByALink_data();
+    void directoryReplacedByALink();
 };
 
 namespace {
@@ -36,8 +36,8 @@ constexpr int patience = 60000; // ms, of a machine that is very busy
 
 const QString actions = QStringLiteral("QuickActionsModel");
 const QString widgets = QStringLiteral("EventsWidgetsModel");
-const QString actionsFolder = QStringLiteral("/usr/share/glimmera/quickactions");
-const QString widgetsFolder = QStringLiteral("/usr/share/glimmera/eventswidgets");
+const QString actionsDirectory = QStringLiteral("/usr/share/glimmera/quickactions");
+const QString widgetsDirectory = QStringLiteral("/usr/share/glimmera/eventswidgets");
 
 // A user namespace has limits of its own, below those of the machine.
 const QStringList ownNamespace = {QStringLiteral("unshare"), QStringLiteral("--user"),
@@ -53,8 +53,8 @@ void setLimit(const char *name, int value)
 
 void addFiles(const QString &name)
 {
-    Files::write(actionsFolder + QLatin1Char('/') + name + QStringLiteral(".conf"), "title=a\n");
-    Files::write(widgetsFolder + QLatin1Char('/') + name + QStringLiteral(".json"),
+    Files::write(actionsDirectory + QLatin1Char('/') + name + QStringLiteral(".conf"), "title=a\n");
+    Files::write(widgetsDirectory + QLatin1Char('/') + name + QStringLiteral(".json"),
                  R"({ "widgets": [ { "path": ")" + name.toUtf8() + R"(" } ] })");
 }
 
@@ -77,8 +77,8 @@ void TestLimits::initTestCase()
 
 void TestLimits::init()
 {
-    Files::remove(actionsFolder);
-    Files::remove(widgetsFolder);
+    Files::remove(actionsDirectory);
+    Files::remove(widgetsDirectory);
     EveryType::installFiles();
 }
 
@@ -89,7 +89,7 @@ void TestLimits::noInotifyInstances()
     const EveryType types;
     QCOMPARE(rows(types.object(actions)), 1);
     QCOMPARE(rows(types.object(widgets)), 1);
-    // The folders are looked at once in a while instead; files that are written in place are not.
+    // The models poll the directories instead, which does not show files that are written in place.
     for (int i = 0; i < 3; ++i) {
         addFiles(QStringLiteral("new%1").arg(i));
         TRY_COMPARE(rows(types.object(actions)), 2 + i);
@@ -98,7 +98,7 @@ void TestLimits::noInotifyInstances()
 
     setLimit("max_inotify_instances", 128);
     const auto model = types.make(widgets);
-    Files::write(widgetsFolder + QStringLiteral("/new0.json"), "{ \"widgets\": [ ] }");
+    Files::write(widgetsDirectory + QStringLiteral("/new0.json"), "{ \"widgets\": [ ] }");
     TRY_COMPARE(rows(it(model)), 3);
 }
 
@@ -164,38 +164,38 @@ void TestLimits::noDescriptors()
     TRY_COMPARE(rows(types.object(widgets)), 2);
 }
 
-void TestLimits::folderReplacedByALink_data()
+void TestLimits::directoryReplacedByALink_data()
 {
     QTest::addColumn<QString>("type");
-    QTest::addColumn<QString>("folder");
-    QTest::newRow("QuickActionsModel") << actions << actionsFolder;
-    QTest::newRow("EventsWidgetsModel") << widgets << widgetsFolder;
+    QTest::addColumn<QString>("directory");
+    QTest::newRow("QuickActionsModel") << actions << actionsDirectory;
+    QTest::newRow("EventsWidgetsModel") << widgets << widgetsDirectory;
 }
 
-void TestLimits::folderReplacedByALink()
+void TestLimits::directoryReplacedByALink()
 {
     QFETCH(QString, type);
-    QFETCH(QString, folder);
+    QFETCH(QString, directory);
     const EveryType types;
     QObject *model = types.object(type);
     QCOMPARE(rows(model), 1);
     addFiles(QStringLiteral("other"));
     TRY_COMPARE(rows(model), 2);
 
-    const QString target = folder + QStringLiteral("-target");
+    const QString target = directory + QStringLiteral("-target");
     Files::remove(target);
-    QVERIFY(QDir().rename(folder, target));
+    QVERIFY(QDir().rename(directory, target));
     TRY_COMPARE(rows(model), 0);
-    Files::makeLink(target, folder);
+    Files::makeLink(target, directory);
     TRY_COMPARE(rows(model), 2);
     // What happens behind the link is followed.
     addFiles(QStringLiteral("third"));
     TRY_COMPARE(rows(model), 3);
     // The link goes, and with it nothing of what it led to.
-    Files::remove(folder);
+    Files::remove(directory);
     TRY_COMPARE(rows(model), 0);
     QCOMPARE(QDir(target).count(), uint(3 + 2)); // with . and ..
-    Files::makeFolder(folder);
+    Files::makeDirectory(directory);
     addFiles(QStringLiteral("last"));
     TRY_COMPARE(rows(model), 1);
     Files::remove(target);

@@ -171,7 +171,7 @@ void TestDirectoryWatcher::cleanup()
 
 void TestDirectoryWatcher::reportsEntries()
 {
-    Files::makeFolder(m_directory);
+    Files::makeDirectory(m_directory);
     const DirectoryWatcher watcher(m_directory, filter);
     QSignalSpy spy(&watcher, &DirectoryWatcher::changed);
     QFile made(file());
@@ -221,7 +221,7 @@ void TestDirectoryWatcher::reportsWrittenFileOnceItIsClosed()
 
 void TestDirectoryWatcher::reportsOnceForManyFiles()
 {
-    Files::makeFolder(m_directory);
+    Files::makeDirectory(m_directory);
     const DirectoryWatcher watcher(m_directory, filter);
     QSignalSpy spy(&watcher, &DirectoryWatcher::changed);
     for (int i = 0; i < 500; ++i) {
@@ -237,7 +237,7 @@ void TestDirectoryWatcher::reportsAfterLostEvents()
     QFile limit(QStringLiteral("/proc/sys/fs/inotify/max_queued_events"));
     QVERIFY(limit.open(QIODevice::ReadOnly));
     const int events = limit.readAll().trimmed().toInt();
-    Files::makeFolder(m_directory);
+    Files::makeDirectory(m_directory);
     const DirectoryWatcher watcher(m_directory, filter);
     QSignalSpy spy(&watcher, &DirectoryWatcher::changed);
     // The kernel keeps the first events and drops the last, those of the file and the directory. It
@@ -266,7 +266,7 @@ void TestDirectoryWatcher::ignoresOtherNames()
     Files::write(file("file.conf.new"), "x");
     QVERIFY(QFile::setPermissions(file("other.txt"), QFile::ReadOwner));
     Files::remove(file("other.txt"));
-    Files::makeFolder(file("folder"));
+    Files::makeDirectory(file("directory"));
     QVERIFY(!spy.wait(200));
     rewrite(file());
     QVERIFY(spy.wait());
@@ -288,11 +288,11 @@ void TestDirectoryWatcher::reportsDirectoryMadeLater()
     QSignalSpy spy(&watcher, &DirectoryWatcher::changed);
     // Creates one level at a time. The watcher has time to notice each one before the next is
     // created.
-    Files::makeFolder(path("a"));
+    Files::makeDirectory(path("a"));
     QVERIFY(!spy.wait(100));
-    Files::makeFolder(path("a/b"));
+    Files::makeDirectory(path("a/b"));
     QVERIFY(!spy.wait(100));
-    Files::makeFolder(m_directory);
+    Files::makeDirectory(m_directory);
     QVERIFY(spy.wait());
 
     rewrite(file());
@@ -327,7 +327,7 @@ void TestDirectoryWatcher::reportsDirectoryMadeMeanwhile()
 {
     QFETCH(QString, made);
     QFETCH(QByteArray, before);
-    beforeWatch = [this, &made] { Files::makeFolder(m_root->filePath(made)); };
+    beforeWatch = [this, &made] { Files::makeDirectory(m_root->filePath(made)); };
     beforeWatchOf = before;
     const DirectoryWatcher watcher(m_directory, filter);
     QVERIFY(!beforeWatch);
@@ -338,13 +338,13 @@ void TestDirectoryWatcher::reportsDirectoryMadeMeanwhile()
 
 void TestDirectoryWatcher::reportsDirectoryMadeAgain()
 {
-    Files::makeFolder(m_directory);
+    Files::makeDirectory(m_directory);
     const DirectoryWatcher watcher(m_directory, filter);
     QSignalSpy spy(&watcher, &DirectoryWatcher::changed);
     Files::remove(path("a"));
     QVERIFY(spy.wait());
 
-    Files::makeFolder(m_directory);
+    Files::makeDirectory(m_directory);
     QVERIFY(spy.wait());
 
     rewrite(file());
@@ -353,12 +353,12 @@ void TestDirectoryWatcher::reportsDirectoryMadeAgain()
 
 void TestDirectoryWatcher::reportsDirectoryReplacedAtOnce()
 {
-    Files::makeFolder(m_directory);
+    Files::makeDirectory(m_directory);
     const DirectoryWatcher watcher(m_directory, filter);
     QSignalSpy spy(&watcher, &DirectoryWatcher::changed);
     // Nobody sees the moment without the directory.
     Files::remove(m_directory);
-    Files::makeFolder(m_directory);
+    Files::makeDirectory(m_directory);
     QVERIFY(spy.wait());
 
     rewrite(file());
@@ -367,7 +367,7 @@ void TestDirectoryWatcher::reportsDirectoryReplacedAtOnce()
 
 void TestDirectoryWatcher::reportsDirectoryRenamedAway()
 {
-    Files::makeFolder(m_directory);
+    Files::makeDirectory(m_directory);
     const DirectoryWatcher watcher(m_directory, filter);
     QSignalSpy spy(&watcher, &DirectoryWatcher::changed);
     QVERIFY(QDir().rename(m_directory, path("a/b/elsewhere")));
@@ -375,7 +375,7 @@ void TestDirectoryWatcher::reportsDirectoryRenamedAway()
 
     rewrite(path("a/b/elsewhere/file.conf"));
     QVERIFY(!spy.wait(100));
-    Files::makeFolder(m_directory);
+    Files::makeDirectory(m_directory);
     QVERIFY(spy.wait());
 }
 
@@ -389,7 +389,7 @@ void TestDirectoryWatcher::reportsReplacedParent_data()
 void TestDirectoryWatcher::reportsReplacedParent()
 {
     QFETCH(QString, parent);
-    Files::makeFolder(m_directory);
+    Files::makeDirectory(m_directory);
     const QString replaced = m_root->filePath(parent);
     const QString rest = m_directory.mid(replaced.size());
     const QString old = path("old");
@@ -406,7 +406,7 @@ void TestDirectoryWatcher::reportsReplacedParent()
     QVERIFY(spy.wait());
 
     // With one that does not have it, and back.
-    Files::makeFolder(path("new"));
+    Files::makeDirectory(path("new"));
     QVERIFY(QDir().rename(replaced, path("newer")));
     QVERIFY(QDir().rename(path("new"), replaced));
     QVERIFY(spy.wait());
@@ -419,8 +419,8 @@ void TestDirectoryWatcher::reportsReplacedParent()
 
 void TestDirectoryWatcher::reportsMovedTargetOfALink()
 {
-    Files::makeFolder(path("target/c"));
-    Files::makeFolder(path("a"));
+    Files::makeDirectory(path("target/c"));
+    Files::makeDirectory(path("a"));
     Files::makeLink(path("target"), path("a/b"));
     const DirectoryWatcher watcher(m_directory, filter);
     QSignalSpy spy(&watcher, &DirectoryWatcher::changed);
@@ -438,7 +438,7 @@ void TestDirectoryWatcher::reportsMovedTargetOfALink()
 
 void TestDirectoryWatcher::ignoresItsParents()
 {
-    Files::makeFolder(m_directory);
+    Files::makeDirectory(m_directory);
     const DirectoryWatcher present(m_directory, filter);
     const DirectoryWatcher missing(path("a/b/missing"), filter);
     QSignalSpy presentSpy(&present, &DirectoryWatcher::changed);
@@ -453,10 +453,10 @@ void TestDirectoryWatcher::ignoresItsParents()
 
 void TestDirectoryWatcher::losesNothingToItsParent()
 {
-    Files::makeFolder(m_directory);
+    Files::makeDirectory(m_directory);
     const DirectoryWatcher watcher(m_directory, filter);
     QSignalSpy spy(&watcher, &DirectoryWatcher::changed);
-    Files::makeFolder(path("a/b/sibling"));
+    Files::makeDirectory(path("a/b/sibling"));
     Files::write(file(), "x");
     QVERIFY(spy.wait());
     // While the watches are looked over because the parent has other permissions.
@@ -520,7 +520,7 @@ void TestDirectoryWatcher::losesNothingToAnotherProcess()
 
 void TestDirectoryWatcher::watchersShareOneInstance()
 {
-    Files::makeFolder(m_directory);
+    Files::makeDirectory(m_directory);
     std::vector<std::unique_ptr<DirectoryWatcher>> watchers;
     watchers.push_back(std::make_unique<DirectoryWatcher>(m_directory, filter));
     const QStringList used = instances();
@@ -540,7 +540,7 @@ void TestDirectoryWatcher::watchersShareOneInstance()
     QVERIFY(spy.wait());
     // A directory that is replaced leaves none behind.
     Files::remove(path("a/b"));
-    Files::makeFolder(path("a/b"));
+    Files::makeDirectory(path("a/b"));
     QVERIFY(spy.wait());
     QCOMPARE(watches(), once - 1);
     watchers.clear();
@@ -550,7 +550,7 @@ void TestDirectoryWatcher::watchersShareOneInstance()
 
 void TestDirectoryWatcher::watchersHaveFiltersOfTheirOwn()
 {
-    Files::makeFolder(m_directory);
+    Files::makeDirectory(m_directory);
     const DirectoryWatcher watcher(m_directory, filter);
     auto other = std::make_unique<DirectoryWatcher>(m_directory, QStringLiteral("*.json"));
     QSignalSpy spy(&watcher, &DirectoryWatcher::changed);
@@ -565,7 +565,7 @@ void TestDirectoryWatcher::watchersHaveFiltersOfTheirOwn()
 
 void TestDirectoryWatcher::aReceiverMayDestroyWatchers()
 {
-    Files::makeFolder(m_directory);
+    Files::makeDirectory(m_directory);
     std::vector<std::unique_ptr<DirectoryWatcher>> watchers;
     int reports = 0;
     for (int i = 0; i < 3; ++i) {
@@ -607,13 +607,13 @@ void TestDirectoryWatcher::pollsWithoutAnInstance()
     QCOMPARE(instances(), QStringList());
 
     QSignalSpy spy(&poller, &DirectoryWatcher::changed);
-    Files::makeFolder(m_directory);
+    Files::makeDirectory(m_directory);
     QVERIFY(spy.wait());
     Files::write(file(), "x");
     QVERIFY(spy.wait());
     // Replaced, and followed all the same.
     Files::remove(m_directory);
-    Files::makeFolder(m_directory);
+    Files::makeDirectory(m_directory);
     QVERIFY(spy.wait());
     Files::write(file("another.conf"), "x");
     QVERIFY(spy.wait());

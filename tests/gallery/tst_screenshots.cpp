@@ -25,13 +25,13 @@ struct Result {
     QString output;
 };
 
-Result takeScreenshots(const QString &source, const QString &folder)
+Result takeScreenshots(const QString &source, const QString &directory)
 {
     QProcess process;
     process.setProcessChannelMode(QProcess::MergedChannels);
-    process.start(
-        QStringLiteral(QML_PROGRAM),
-        {source + QStringLiteral("/tests/gallery/Screenshots.qml"), QStringLiteral("--"), folder});
+    process.start(QStringLiteral(QML_PROGRAM),
+                  {source + QStringLiteral("/tests/gallery/Screenshots.qml"), QStringLiteral("--"),
+                   directory});
     Result result;
     if (process.waitForFinished(patience) && process.exitStatus() == QProcess::NormalExit) {
         result.exitCode = process.exitCode();
@@ -76,13 +76,13 @@ private Q_SLOTS:
     void everyPageIsShown();
     void problemsAreReported_data();
     void problemsAreReported();
-    void unwritableFolderIsReported();
+    void unwritableDirectoryIsReported();
 };
 
 void ScreenshotsTest::everyPageIsShown()
 {
-    const QTemporaryDir folder;
-    const Result result = takeScreenshots(source, folder.path());
+    const QTemporaryDir directory;
+    const Result result = takeScreenshots(source, directory.path());
     // The problem is in the last line.
     QVERIFY2(result.exitCode == 0, qPrintable(result.output.right(800)));
 
@@ -98,7 +98,7 @@ void ScreenshotsTest::everyPageIsShown()
         const QStringList files = state.captured(2).split(QLatin1Char(' '));
         QVERIFY2(files.size() >= 2, qPrintable(result.output));
         for (const QString &file : files) {
-            const QImage image(folder.filePath(file));
+            const QImage image(directory.filePath(file));
             const QRegularExpressionMatch expected = size.match(file);
             QCOMPARE(image.size(),
                      QSize(expected.captured(1).toInt(), expected.captured(2).toInt()));
@@ -139,8 +139,8 @@ void ScreenshotsTest::problemsAreReported()
     QFETCH(const QByteArray, replacement);
     QFETCH(const QString, report);
 
-    const QTemporaryDir folder;
-    const QString copy = folder.filePath(QStringLiteral("copy"));
+    const QTemporaryDir directory;
+    const QString copy = directory.filePath(QStringLiteral("copy"));
     for (const char *directory : {"/gallery", "/tests/gallery"}) {
         copyDirectory(source + QLatin1String(directory), copy + QLatin1String(directory));
     }
@@ -154,14 +154,14 @@ void ScreenshotsTest::problemsAreReported()
     page.write(content);
     page.close();
 
-    const Result result = takeScreenshots(copy, folder.path());
+    const Result result = takeScreenshots(copy, directory.path());
     QVERIFY2(result.exitCode > 0, qPrintable(result.output));
     QVERIFY2(result.output.contains(report), qPrintable(result.output));
     QVERIFY2(result.output.contains(QStringLiteral("screenshots: quick-actions (en): ")),
              qPrintable(result.output));
 }
 
-void ScreenshotsTest::unwritableFolderIsReported()
+void ScreenshotsTest::unwritableDirectoryIsReported()
 {
     const Result result = takeScreenshots(source, QStringLiteral("/nonexistent"));
     QCOMPARE(result.exitCode, 1);

@@ -14,14 +14,14 @@
 namespace {
 
 const QString program = QStringLiteral("/usr/libexec/sdcardhelper");
-const QString folder = QStringLiteral("/usr/libexec/sdcardhelper.d");
+const QString directory = QStringLiteral("/usr/libexec/sdcardhelper.d");
 const QString script = QStringLiteral(SDCARDHELPER);
 
 constexpr auto executable = QFile::ReadOwner | QFile::ExeOwner;
 
-QString inFolder(const char *name)
+QString inDirectory(const char *name)
 {
-    return folder + QLatin1Char('/') + QLatin1String(name);
+    return directory + QLatin1Char('/') + QLatin1String(name);
 }
 
 // A zombie process does not count as running.
@@ -40,11 +40,11 @@ bool isRunning(qint64 pid)
 CardHelper::CardHelper()
 {
     remove();
-    Files::remove(folder);
-    Files::makeFolder(folder);
-    Files::makePipe(inFolder("go"));
+    Files::remove(directory);
+    Files::makeDirectory(directory);
+    Files::makePipe(inDirectory("go"));
     // For reading too: neither this nor writing then waits for the helper.
-    m_go.setFileName(inFolder("go"));
+    m_go.setFileName(inDirectory("go"));
     if (!m_go.open(QIODevice::ReadWrite | QIODevice::Unbuffered)) {
         qFatal("cannot open %s", qPrintable(m_go.fileName()));
     }
@@ -57,7 +57,7 @@ CardHelper::~CardHelper()
         kill(static_cast<pid_t>(pid), SIGKILL);
     }
     remove();
-    Files::remove(folder);
+    Files::remove(directory);
 }
 
 QString CardHelper::path()
@@ -70,12 +70,13 @@ void CardHelper::install(const QString &scenario, const QByteArray &output)
     if (QProcess::execute(script, {QStringLiteral("--check"), scenario}) != 0) {
         qFatal("no such scenario: %s", qPrintable(scenario));
     }
-    Files::write(inFolder("output"), output);
+    Files::write(inDirectory("output"), output);
     // A new file each time: a program that is running must not be written to.
     remove();
-    Files::write(
-        program,
-        QStringLiteral("#!/bin/sh\nexec %1 %2 %3 \"$@\"\n").arg(script, folder, scenario).toUtf8());
+    Files::write(program,
+                 QStringLiteral("#!/bin/sh\nexec %1 %2 %3 \"$@\"\n")
+                     .arg(script, directory, scenario)
+                     .toUtf8());
     QFile::setPermissions(program, executable);
 }
 
@@ -120,7 +121,7 @@ QList<qint64> CardHelper::running() const
 
 QList<CardHelper::Run> CardHelper::readRuns() const
 {
-    QFile file(inFolder("runs"));
+    QFile file(inDirectory("runs"));
     if (!file.open(QIODevice::ReadOnly)) {
         return {};
     }

@@ -26,11 +26,11 @@ int require(int result, const QByteArray &path)
     return result;
 }
 
-void append(QByteArrayList &paths, const QByteArray &folder, const QByteArray &prefix)
+void append(QByteArrayList &paths, const QByteArray &directory, const QByteArray &prefix)
 {
-    const QByteArrayList names = FileTree::list(folder);
+    const QByteArrayList names = FileTree::list(directory);
     for (const QByteArray &name : names) {
-        const QByteArray path = folder + '/' + name;
+        const QByteArray path = directory + '/' + name;
         paths.append(prefix + name);
         struct stat info = {};
         if (lstat(path.constData(), &info) == 0 && S_ISDIR(info.st_mode)) {
@@ -41,7 +41,7 @@ void append(QByteArrayList &paths, const QByteArray &folder, const QByteArray &p
 
 } // namespace
 
-void FileTree::makeFolder(const QByteArray &path)
+void FileTree::makeDirectory(const QByteArray &path)
 {
     require(mkdir(path.constData(), 0700), path);
 }
@@ -55,10 +55,10 @@ void FileTree::makeFile(const QByteArray &path, const QByteArray &content)
     close(fd);
 }
 
-void FileTree::makeFiles(const QByteArray &folder, int count)
+void FileTree::makeFiles(const QByteArray &directory, int count)
 {
     for (int i = 0; i < count; ++i) {
-        makeFile(folder + "/file" + QByteArray::number(i));
+        makeFile(directory + "/file" + QByteArray::number(i));
     }
 }
 
@@ -119,14 +119,14 @@ QByteArray FileTree::read(const QByteArray &path)
 QByteArrayList FileTree::list(const QByteArray &path)
 {
     QByteArrayList names;
-    if (DIR *folder = opendir(path.constData())) {
-        while (const dirent *entry = readdir(folder)) {
+    if (DIR *directory = opendir(path.constData())) {
+        while (const dirent *entry = readdir(directory)) {
             const QByteArray name = entry->d_name;
             if (name != "." && name != "..") {
                 names.append(name);
             }
         }
-        closedir(folder);
+        closedir(directory);
     }
     return names;
 }

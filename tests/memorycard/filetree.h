@@ -14,9 +14,9 @@
 */
 namespace FileTree {
 
-void makeFolder(const QByteArray &path);
+void makeDirectory(const QByteArray &path);
 void makeFile(const QByteArray &path, const QByteArray &content = QByteArray());
-void makeFiles(const QByteArray &folder, int count);
+void makeFiles(const QByteArray &directory, int count);
 void makeLink(const QByteArray &path, const QByteArray &target);
 void makePipe(const QByteArray &path);
 void makeSocket(const QByteArray &path);

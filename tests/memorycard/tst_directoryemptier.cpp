@@ -129,23 +129,24 @@ template<typename Change> void changeListings(Change change)
 }
 
 // A file and a full directory on one side of a directory.
-void makeNeighbours(const QByteArray &folder, const char *side)
+void makeNeighbours(const QByteArray &directory, const char *side)
 {
-    makeFile(folder + side + "File");
-    makeFolder(folder + side + "Folder");
-    makeFile(folder + side + "Folder/file");
+    makeFile(directory + side + "File");
+    makeDirectory(directory + side + "Directory");
+    makeFile(directory + side + "Directory/file");
 }
 
-// A chain of folders, each with files and full folders on both sides of the next one in directory
-// order, whichever way that runs: the walk has something left to do in all of them on its way back.
+// A chain of directories. Each has files and full directories before and after the next one, in
+// whichever order they are listed, so the walk has something left to do in all of them on its way
+// back.
 void makeDeepTree(const QByteArray &top, int depth)
 {
     for (int level = 0; level <= depth; ++level) {
-        const QByteArray folder = chainPath(top, level);
+        const QByteArray directory = chainPath(top, level);
         for (const char *const side : {"/a", "/z"}) {
-            makeNeighbours(folder, side);
+            makeNeighbours(directory, side);
             if (level < depth && !exists(chainPath(top, level + 1))) {
-                makeFolder(chainPath(top, level + 1));
+                makeDirectory(chainPath(top, level + 1));
             }
         }
     }
@@ -179,10 +180,10 @@ template<typename Work> pid_t startRepeating(Work work)
 void makeVictims(const QByteArray &top)
 {
     for (int i = 0; i < 10; ++i) {
-        const QByteArray folder = top + "/folder" + QByteArray::number(i);
-        makeFolder(folder);
-        makeFolder(folder + "/victim");
-        makeFiles(folder + "/victim", 20);
+        const QByteArray directory = top + "/directory" + QByteArray::number(i);
+        makeDirectory(directory);
+        makeDirectory(directory + "/victim");
+        makeFiles(directory + "/victim", 20);
     }
 }
 
@@ -193,7 +194,7 @@ pid_t startSwapping(const QByteArray &first, const QByteArray &second)
     });
 }
 
-// Moves a folder out of a tree and back.
+// Moves a directory out of a tree and back.
 pid_t startMoving(const QByteArray &inside, const QByteArray &outside)
 {
     return startRepeating([=] {
@@ -202,10 +203,10 @@ pid_t startMoving(const QByteArray &inside, const QByteArray &outside)
     });
 }
 
-pid_t startMounting(const QByteArray &folder, const QByteArray &mountPoint)
+pid_t startMounting(const QByteArray &directory, const QByteArray &mountPoint)
 {
     return startRepeating([=] {
-        mount(folder.constData(), mountPoint.constData(), nullptr, MS_BIND, nullptr);
+        mount(directory.constData(), mountPoint.constData(), nullptr, MS_BIND, nullptr);
         umount2(mountPoint.constData(), MNT_DETACH);
     });
 }
@@ -226,7 +227,7 @@ private Q_SLOTS:
     void init();
     void cleanup();
 
-    void emptyFolder();
+    void directoryWithoutEntries();
     void everyKindOfEntry();
     void listsWholeThenRemovesInDirectoryOrder();
     void callsIntoTheKernel_data();
@@ -234,29 +235,29 @@ private Q_SLOTS:
     void unknownTypes();
     void unknownTypeOfVanishedEntry();
     void namesThatLeadElsewhere();
-    void wideFolder();
-    void wideFoldersInDeepTree();
+    void wideDirectory();
+    void wideDirectoriesInDeepTree();
     void veryDeep();
     void failureStopsNothing();
     void failureFarDown();
-    void folderThatDoesNotOpen();
+    void directoryThatDoesNotOpen();
     void listingThatBreaksOff();
-    void folderOfNoKnownDevice();
+    void directoryOfNoKnownDevice();
     void mountInside();
     void bindMountInside();
-    void folderBecomesLink_data();
-    void folderBecomesLink();
-    void folderBecomesLinkToParent();
-    void fileBecomesFolder();
-    void folderMovedOutNearby();
-    void folderMovedOutFarDown();
+    void directoryBecomesLink_data();
+    void directoryBecomesLink();
+    void directoryBecomesLinkToParent();
+    void fileBecomesDirectory();
+    void directoryMovedOutNearby();
+    void directoryMovedOutFarDown();
     void wayMovedOutFarDown();
     void wayMovedOutAndReplaced_data();
     void wayMovedOutAndReplaced();
     void descriptorsAfterDetour();
     void entryVanishes();
-    void raceOfFoldersAndLinks();
-    void raceOfMovedFolders();
+    void raceOfDirectoriesAndLinks();
+    void raceOfMovedDirectories();
     void raceOfMounts();
 
 private:
@@ -277,10 +278,10 @@ void tst_DirectoryEmptier::init()
     m_files = std::make_unique<ScratchFileSystem>();
     m_top = m_files->path("card");
     m_outside = m_files->path("outside");
-    makeFolder(m_top);
-    makeFolder(m_outside);
-    makeFolder(m_outside + "/folder");
-    makeFile(m_outside + "/folder/file", "precious");
+    makeDirectory(m_top);
+    makeDirectory(m_outside);
+    makeDirectory(m_outside + "/directory");
+    makeFile(m_outside + "/directory/file", "precious");
     makeFile(m_outside + "/file", "precious");
     m_outsideBefore = listAll(m_outside);
 }
@@ -301,18 +302,18 @@ void tst_DirectoryEmptier::checkOutside()
         QVERIFY2(left.contains(path), path.constData());
     }
     QCOMPARE(read(m_outside + "/file"), QByteArray("precious"));
-    QCOMPARE(read(m_outside + "/folder/file"), QByteArray("precious"));
+    QCOMPARE(read(m_outside + "/directory/file"), QByteArray("precious"));
 }
 
 void tst_DirectoryEmptier::makeBait()
 {
-    makeFolder(m_outside + "/d");
+    makeDirectory(m_outside + "/d");
     makeNeighbours(m_outside, "/a");
     makeNeighbours(m_outside, "/z");
     m_outsideBefore = listAll(m_outside);
 }
 
-void tst_DirectoryEmptier::emptyFolder()
+void tst_DirectoryEmptier::directoryWithoutEntries()
 {
     QVERIFY(empty(m_top));
     QVERIFY(exists(m_top));
@@ -327,20 +328,20 @@ void tst_DirectoryEmptier::everyKindOfEntry()
     makeFile(m_top + "/\xc3\x9cmlaut");
     makeFile(m_top + "/line\nbreak\\040");
     makeFile(m_top + '/' + QByteArray(255, 'n'));
-    makeLink(m_top + "/toFolder", m_outside);
+    makeLink(m_top + "/toDirectory", m_outside);
     makeLink(m_top + "/toFile", m_outside + "/file");
-    makeLink(m_top + "/toLink", m_top + "/toFolder");
+    makeLink(m_top + "/toLink", m_top + "/toDirectory");
     makeLink(m_top + "/toParent", "..");
     makeLink(m_top + "/dangling", "/nowhere/at/all");
     makeLink(m_top + "/toItself", m_top + "/toItself");
     makePipe(m_top + "/pipe");
     makeSocket(m_top + "/socket");
-    makeFolder(m_top + "/.hiddenFolder");
-    makeFile(m_top + "/.hiddenFolder/.hidden");
-    makeFolder(m_top + "/\xe9t\xe9");
+    makeDirectory(m_top + "/.hiddenDirectory");
+    makeFile(m_top + "/.hiddenDirectory/.hidden");
+    makeDirectory(m_top + "/\xe9t\xe9");
     makeFile(m_top + "/\xe9t\xe9/\x80");
     makeLink(m_top + "/\xe9t\xe9/link", "../..");
-    makeFolder(m_top + "/\xe9t\xe9/folder");
+    makeDirectory(m_top + "/\xe9t\xe9/directory");
     QVERIFY(empty(m_top));
     QCOMPARE(list(m_top), QByteArrayList());
     QVERIFY(exists(m_top));
@@ -348,15 +349,15 @@ void tst_DirectoryEmptier::everyKindOfEntry()
 
 void tst_DirectoryEmptier::listsWholeThenRemovesInDirectoryOrder()
 {
-    // Enough for a folder to be read in several pieces.
-    makeFolder(m_top + "/a");
+    // Enough for a directory to be read in several pieces.
+    makeDirectory(m_top + "/a");
     makeFiles(m_top + "/a", 3000);
-    makeFolder(m_top + "/b");
+    makeDirectory(m_top + "/b");
     makeFiles(m_top + "/b", 10);
     makeFiles(m_top, 3000);
     QHash<QByteArray, QByteArrayList> expected;
-    for (const QByteArray &folder : {m_top, m_top + "/a", m_top + "/b"}) {
-        expected[folder] = list(folder);
+    for (const QByteArray &directory : {m_top, m_top + "/a", m_top + "/b"}) {
+        expected[directory] = list(directory);
     }
 
     QHash<QByteArray, QByteArrayList> removed;
@@ -367,9 +368,9 @@ void tst_DirectoryEmptier::listsWholeThenRemovesInDirectoryOrder()
         return entry;
     };
     SystemCalls::hooks().unlinkat = [&](int directory, const char *name, int flags) {
-        const QByteArray folder = nameOf(directory);
-        if (listed.value(folder)) {
-            removed[folder].append(name);
+        const QByteArray path = nameOf(directory);
+        if (listed.value(path)) {
+            removed[path].append(name);
         }
         return SystemCalls::real().unlinkat(directory, name, flags);
     };
@@ -379,7 +380,7 @@ void tst_DirectoryEmptier::listsWholeThenRemovesInDirectoryOrder()
 
 void tst_DirectoryEmptier::callsIntoTheKernel_data()
 {
-    QTest::addColumn<int>("folders");
+    QTest::addColumn<int>("directories");
     QTest::addColumn<int>("files");
 
     QTest::newRow("flat") << 0 << 2000;
@@ -388,35 +389,35 @@ void tst_DirectoryEmptier::callsIntoTheKernel_data()
 
 void tst_DirectoryEmptier::callsIntoTheKernel()
 {
-    QFETCH(const int, folders);
+    QFETCH(const int, directories);
     QFETCH(const int, files);
-    for (int i = 0; i < folders; ++i) {
-        makeFolder(m_top + '/' + QByteArray::number(i));
+    for (int i = 0; i < directories; ++i) {
+        makeDirectory(m_top + '/' + QByteArray::number(i));
         makeFiles(m_top + '/' + QByteArray::number(i), files);
     }
-    if (folders == 0) {
+    if (directories == 0) {
         makeFiles(m_top, files);
     }
 
     CallCounter counter;
     QVERIFY(empty(m_top));
     // One removal per entry; a directory is also opened, looked at, and read to its end.
-    const int entries = folders == 0 ? files : folders * (files + 1);
+    const int entries = directories == 0 ? files : directories * (files + 1);
     QCOMPARE(counter.counts.value("unlinkat"), entries);
     QCOMPARE(counter.counts.value("fstatat"), 0);
-    QCOMPARE(counter.counts.value("openat"), folders);
-    QCOMPARE(counter.counts.value("fstat"), folders + 1);
+    QCOMPARE(counter.counts.value("openat"), directories);
+    QCOMPARE(counter.counts.value("fstat"), directories + 1);
     // With "." and "..", and once for the end.
-    QCOMPARE(counter.counts.value("readdir"), entries + 3 * (folders + 1));
+    QCOMPARE(counter.counts.value("readdir"), entries + 3 * (directories + 1));
     QCOMPARE(list(m_top), QByteArrayList());
 }
 
 void tst_DirectoryEmptier::unknownTypes()
 {
     makeFiles(m_top, 5);
-    makeFolder(m_top + "/folder");
-    makeFiles(m_top + "/folder", 5);
-    makeLink(m_top + "/folder/link", m_outside + "/folder");
+    makeDirectory(m_top + "/directory");
+    makeFiles(m_top + "/directory", 5);
+    makeLink(m_top + "/directory/link", m_outside + "/directory");
     makeLink(m_top + "/link", m_outside);
     makePipe(m_top + "/pipe");
 
@@ -446,12 +447,12 @@ void tst_DirectoryEmptier::unknownTypeOfVanishedEntry()
 
 void tst_DirectoryEmptier::namesThatLeadElsewhere()
 {
-    makeFolder(m_top + "/abcdefghij123456");
+    makeDirectory(m_top + "/abcdefghij123456789");
     makeFile(m_top + "/klmnopqrst12");
     makeFile(m_top + "/other");
     changeListings([](dirent *entry) {
-        if (qstrcmp(entry->d_name, "abcdefghij123456") == 0) {
-            std::strcpy(entry->d_name, "../outside/folder");
+        if (qstrcmp(entry->d_name, "abcdefghij123456789") == 0) {
+            std::strcpy(entry->d_name, "../outside/directory");
         } else if (qstrcmp(entry->d_name, "klmnopqrst12") == 0) {
             std::strcpy(entry->d_name, "../outside/file");
         }
@@ -461,7 +462,7 @@ void tst_DirectoryEmptier::namesThatLeadElsewhere()
     QVERIFY(!exists(m_top + "/other"));
 }
 
-void tst_DirectoryEmptier::wideFolder()
+void tst_DirectoryEmptier::wideDirectory()
 {
     makeFiles(m_top, 20000);
     CallCounter counter;
@@ -470,7 +471,7 @@ void tst_DirectoryEmptier::wideFolder()
     QCOMPARE(counter.counts.value("openat"), 0);
 }
 
-void tst_DirectoryEmptier::wideFoldersInDeepTree()
+void tst_DirectoryEmptier::wideDirectoriesInDeepTree()
 {
     // Deeper than the number of descriptors that are kept, with entries left at every level.
     constexpr int depth = 150;
@@ -517,10 +518,10 @@ void tst_DirectoryEmptier::veryDeep()
 void tst_DirectoryEmptier::failureStopsNothing()
 {
     makeFiles(m_top, 50);
-    makeFolder(m_top + "/a");
-    makeFolder(m_top + "/a/b");
+    makeDirectory(m_top + "/a");
+    makeDirectory(m_top + "/a/b");
     makeFiles(m_top + "/a/b", 50);
-    makeFolder(m_top + "/a/c");
+    makeDirectory(m_top + "/a/c");
     makeFiles(m_top + "/a/c", 50);
     QByteArrayList attempted;
     SystemCalls::hooks().unlinkat = [&](int directory, const char *name, int flags) {
@@ -535,7 +536,7 @@ void tst_DirectoryEmptier::failureStopsNothing()
     };
     QVERIFY(!empty(m_top));
     QCOMPARE(listAll(m_top), (QByteArrayList{"a", "a/b", "a/b/file7"}));
-    // A folder that something is left in is not even tried.
+    // A directory that something is left in is not even tried.
     QCOMPARE(attempted, QByteArrayList{"c"});
 }
 
@@ -557,10 +558,10 @@ void tst_DirectoryEmptier::failureFarDown()
     QVERIFY(left.last().endsWith("/stuck"));
 }
 
-void tst_DirectoryEmptier::folderThatDoesNotOpen()
+void tst_DirectoryEmptier::directoryThatDoesNotOpen()
 {
-    makeFolder(m_top + "/empty");
-    makeFolder(m_top + "/full");
+    makeDirectory(m_top + "/empty");
+    makeDirectory(m_top + "/full");
     makeFile(m_top + "/full/file");
     makeFiles(m_top, 5);
     QByteArrayList attempted;
@@ -586,7 +587,7 @@ void tst_DirectoryEmptier::folderThatDoesNotOpen()
 
 void tst_DirectoryEmptier::listingThatBreaksOff()
 {
-    makeFolder(m_top + "/unreadable");
+    makeDirectory(m_top + "/unreadable");
     makeFile(m_top + "/unreadable/file");
     makeFiles(m_top, 5);
     SystemCalls::hooks().readdir = [&](DIR *directory) -> dirent * {
@@ -609,7 +610,7 @@ void tst_DirectoryEmptier::listingThatBreaksOff()
     QCOMPARE(listAll(m_top), (QByteArrayList{"unreadable", "unreadable/file"}));
 }
 
-void tst_DirectoryEmptier::folderOfNoKnownDevice()
+void tst_DirectoryEmptier::directoryOfNoKnownDevice()
 {
     // Without it the walk could not tell where the card ends.
     makeFiles(m_top, 5);
@@ -625,28 +626,28 @@ void tst_DirectoryEmptier::folderOfNoKnownDevice()
 void tst_DirectoryEmptier::mountInside()
 {
     makeFiles(m_top, 5);
-    makeFolder(m_top + "/folder");
-    const QByteArray mounted = m_top + "/folder/mounted";
-    makeFolder(mounted);
+    makeDirectory(m_top + "/directory");
+    const QByteArray mounted = m_top + "/directory/mounted";
+    makeDirectory(mounted);
     QCOMPARE(mount("tmpfs", mounted.constData(), "tmpfs", 0, nullptr), 0);
     makeFile(mounted + "/file");
-    makeFolder(mounted + "/inner");
-    makeFiles(m_top + "/folder", 5);
+    makeDirectory(mounted + "/inner");
+    makeFiles(m_top + "/directory", 5);
     const bool emptied = empty(m_top);
     const QByteArrayList left = listAll(m_top);
     QCOMPARE(umount(mounted.constData()), 0);
     QVERIFY(!emptied);
     QCOMPARE(left,
-             (QByteArrayList{"folder", "folder/mounted", "folder/mounted/file",
-                             "folder/mounted/inner"}));
+             (QByteArrayList{"directory", "directory/mounted", "directory/mounted/file",
+                             "directory/mounted/inner"}));
 }
 
 void tst_DirectoryEmptier::bindMountInside()
 {
     // Mounted, but of the same device: what is in it is on the card.
     const QByteArray mounted = m_top + "/mounted";
-    makeFolder(mounted);
-    makeFolder(m_top + "/other");
+    makeDirectory(mounted);
+    makeDirectory(m_top + "/other");
     QCOMPARE(mount((m_top + "/other").constData(), mounted.constData(), nullptr, MS_BIND, nullptr),
              0);
     makeFiles(mounted, 5);
@@ -659,22 +660,22 @@ void tst_DirectoryEmptier::bindMountInside()
     QVERIFY(!left.contains("other/file0"));
 }
 
-void tst_DirectoryEmptier::folderBecomesLink_data()
+void tst_DirectoryEmptier::directoryBecomesLink_data()
 {
     QTest::addColumn<QByteArray>("target");
     QTest::addColumn<bool>("unknownType");
 
-    QTest::newRow("to a folder") << QByteArray("../outside/folder") << false;
+    QTest::newRow("to a directory") << QByteArray("../outside/directory") << false;
     QTest::newRow("to a file") << QByteArray("../outside/file") << false;
     QTest::newRow("to nothing") << QByteArray("../outside/nothing") << false;
-    QTest::newRow("after it was asked for") << QByteArray("../outside/folder") << true;
+    QTest::newRow("after it was asked for") << QByteArray("../outside/directory") << true;
 }
 
-void tst_DirectoryEmptier::folderBecomesLink()
+void tst_DirectoryEmptier::directoryBecomesLink()
 {
     QFETCH(const QByteArray, target);
     QFETCH(const bool, unknownType);
-    makeFolder(m_top + "/victim");
+    makeDirectory(m_top + "/victim");
     makeFiles(m_top + "/victim", 3);
     makeFiles(m_top, 5);
     if (unknownType) {
@@ -692,10 +693,10 @@ void tst_DirectoryEmptier::folderBecomesLink()
     QCOMPARE(list(m_outside + "/moved").size(), 3);
 }
 
-void tst_DirectoryEmptier::folderBecomesLinkToParent()
+void tst_DirectoryEmptier::directoryBecomesLinkToParent()
 {
-    // The folder is replaced while the walk is already in it.
-    makeFolder(m_top + "/victim");
+    // The directory is replaced while the walk is already in it.
+    makeDirectory(m_top + "/victim");
     makeFile(m_top + "/victim/trigger");
     makeFiles(m_top, 5);
     beforeRemovalOf("trigger", [&] {
@@ -706,21 +707,21 @@ void tst_DirectoryEmptier::folderBecomesLinkToParent()
     QCOMPARE(list(m_top), QByteArrayList{"victim"});
 }
 
-void tst_DirectoryEmptier::fileBecomesFolder()
+void tst_DirectoryEmptier::fileBecomesDirectory()
 {
     makeFile(m_top + "/file");
     makeFile(m_top + "/other");
     beforeRemovalOf("file", [&] {
         unlink((m_top + "/file").constData());
-        makeFolder(m_top + "/file");
+        makeDirectory(m_top + "/file");
     });
     QVERIFY(!empty(m_top));
     QCOMPARE(list(m_top), QByteArrayList{"file"});
 }
 
-void tst_DirectoryEmptier::folderMovedOutNearby()
+void tst_DirectoryEmptier::directoryMovedOutNearby()
 {
-    // The folders above are still open: their entries go.
+    // The directories above are still open: their entries go.
     makeDeepTree(m_top, 10);
     makeFile(chainPath(m_top, 8) + "/trigger");
     beforeRemovalOf("trigger", [&] { rename(chainPath(m_top, 5), m_outside + "/moved"); });
@@ -729,10 +730,10 @@ void tst_DirectoryEmptier::folderMovedOutNearby()
     QCOMPARE(listAll(m_top), (QByteArrayList{"d", "d/d", "d/d/d", "d/d/d/d"}));
 }
 
-void tst_DirectoryEmptier::folderMovedOutFarDown()
+void tst_DirectoryEmptier::directoryMovedOutFarDown()
 {
-    // No folder above this one is open any more, and its ".." leads outside: the walk finds its way
-    // back from the top.
+    // No directory above this one is open any more, and its ".." leads outside: the walk finds its
+    // way back from the top.
     makeDeepTree(m_top, 150, [&] { rename(chainPath(m_top, 20), m_outside + "/moved"); });
     makeBait();
     QVERIFY(!empty(m_top));
@@ -744,7 +745,7 @@ void tst_DirectoryEmptier::folderMovedOutFarDown()
 
 void tst_DirectoryEmptier::wayMovedOutFarDown()
 {
-    // Two folders are moved: the walk returns to the folder above the higher one.
+    // Two directories are moved: the walk returns to the directory above the higher one.
     makeDeepTree(m_top, 150, [&] {
         rename(chainPath(m_top, 40), m_outside + "/moved");
         rename(chainPath(m_top, 10), m_outside + "/movedToo");
@@ -754,7 +755,7 @@ void tst_DirectoryEmptier::wayMovedOutFarDown()
     const QByteArrayList left = listAll(m_top);
     QCOMPARE(left.size(), 9);
     QCOMPARE(m_top + '/' + left.last(), chainPath(m_top, 9));
-    // The folders between the two are outside the card now and are not removed.
+    // The directories between the two are outside the card now and are not removed.
     QVERIFY(exists(chainPath(m_outside + "/movedToo", 29)));
 }
 
@@ -762,8 +763,8 @@ void tst_DirectoryEmptier::wayMovedOutAndReplaced_data()
 {
     QTest::addColumn<bool>("full");
 
-    QTest::newRow("by a full folder") << true;
-    QTest::newRow("by an empty folder") << false;
+    QTest::newRow("by a full directory") << true;
+    QTest::newRow("by an empty directory") << false;
 }
 
 void tst_DirectoryEmptier::wayMovedOutAndReplaced()
@@ -773,12 +774,12 @@ void tst_DirectoryEmptier::wayMovedOutAndReplaced()
     constexpr int depth = 150;
     makeDeepTree(m_top, depth);
     makeFile(chainPath(m_top, depth) + "/trigger");
-    makeFolder(m_outside + "/other");
+    makeDirectory(m_outside + "/other");
     if (full) {
         makeDeepTree(m_outside + "/other", 30);
     }
     makeBait();
-    // Except the folder that is moved into the card.
+    // Except the directory that is moved into the card.
     m_outsideBefore.erase(
         std::remove_if(m_outsideBefore.begin(), m_outsideBefore.end(),
                        [](const QByteArray &path) { return path.startsWith("other"); }),
@@ -799,11 +800,11 @@ void tst_DirectoryEmptier::descriptorsAfterDetour()
     // As many are kept open after a way back from the top as before, in either direction.
     makeDeepTree(m_top, 150, [&] {
         rename(chainPath(m_top, 90), m_outside + "/moved");
-        // Puts new deep trees into the folders that the walk still has to remove there.
-        for (const char *const side : {"/aFolder", "/zFolder"}) {
-            const QByteArray folder = chainPath(m_top, 89) + side;
-            if (exists(folder)) {
-                makeChain(folder, 200);
+        // Puts new deep trees into the directories that the walk still has to remove there.
+        for (const char *const side : {"/aDirectory", "/zDirectory"}) {
+            const QByteArray directory = chainPath(m_top, 89) + side;
+            if (exists(directory)) {
+                makeChain(directory, 200);
             }
         }
     });
@@ -818,21 +819,21 @@ void tst_DirectoryEmptier::descriptorsAfterDetour()
 void tst_DirectoryEmptier::entryVanishes()
 {
     makeFiles(m_top, 5);
-    makeFolder(m_top + "/folder");
-    makeFile(m_top + "/folder/trigger");
-    beforeRemovalOf("trigger", [&] { unlink((m_top + "/folder/trigger").constData()); });
+    makeDirectory(m_top + "/directory");
+    makeFile(m_top + "/directory/trigger");
+    beforeRemovalOf("trigger", [&] { unlink((m_top + "/directory/trigger").constData()); });
     // The call failed, whatever the reason: it is not this walk that removed the entry.
     QVERIFY(!empty(m_top));
-    QCOMPARE(listAll(m_top), QByteArrayList{"folder"});
+    QCOMPARE(listAll(m_top), QByteArrayList{"directory"});
 }
 
-void tst_DirectoryEmptier::raceOfFoldersAndLinks()
+void tst_DirectoryEmptier::raceOfDirectoriesAndLinks()
 {
     for (int run = 0; run < races; ++run) {
         makeVictims(m_top);
         makeLink(m_outside + "/link", m_outside);
-        const pid_t swapper = startSwapping(m_top + "/folder5/victim", m_outside + "/link");
-        const pid_t swapper2 = startSwapping(m_top + "/folder2", m_top + "/folder7/victim");
+        const pid_t swapper = startSwapping(m_top + "/directory5/victim", m_outside + "/link");
+        const pid_t swapper2 = startSwapping(m_top + "/directory2", m_top + "/directory7/victim");
         QVERIFY(swapper > 0 && swapper2 > 0);
         empty(m_top);
         stop(swapper);
@@ -849,7 +850,7 @@ void tst_DirectoryEmptier::raceOfFoldersAndLinks()
     }
 }
 
-void tst_DirectoryEmptier::raceOfMovedFolders()
+void tst_DirectoryEmptier::raceOfMovedDirectories()
 {
     for (int run = 0; run < races; ++run) {
         makeChain(m_top, 90);
@@ -876,12 +877,12 @@ void tst_DirectoryEmptier::raceOfMounts()
 {
     const ScratchFileSystem otherDevice;
     const QByteArray other = otherDevice.path("other");
-    makeFolder(other);
-    makeFolder(other + "/folder");
-    makeFiles(other + "/folder", 20);
+    makeDirectory(other);
+    makeDirectory(other + "/directory");
+    makeFiles(other + "/directory", 20);
     makeFiles(other, 20);
     const QByteArrayList before = listAll(other);
-    const QByteArrayList mountPoints{m_top + "/folder2", m_top + "/folder7/victim"};
+    const QByteArrayList mountPoints{m_top + "/directory2", m_top + "/directory7/victim"};
     for (int run = 0; run < races; ++run) {
         makeVictims(m_top);
         const pid_t mounter = startMounting(other, mountPoints[0]);

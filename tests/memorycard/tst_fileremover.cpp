@@ -39,7 +39,7 @@ using namespace FileTree;
 namespace {
 
 const QByteArray mountTable = QByteArrayLiteral("/etc/mtab");
-// No such node exists: the tests' cards are folders.
+// No such node exists: the tests' cards are directories.
 const QByteArray device = QByteArrayLiteral("/dev/test-card1");
 constexpr int runTimeout = 60000;
 
@@ -67,7 +67,7 @@ Outcome runHere(const QByteArray &devicePath)
     return completed.count() == 1 ? Completed : error.count() == 1 ? Error : Nothing;
 }
 
-// A child of this program, which may change its root folder and such. Its result is the function's.
+// Runs the function in a child process, which may change its root directory. Returns its result.
 int runInChild(const std::function<int()> &function)
 {
     const pid_t pid = fork();
@@ -239,13 +239,13 @@ private Q_SLOTS:
     void mountedTwiceAndNeitherGoes();
     void entryThatCannotBeRemoved();
     void immutableFile();
-    void folderWithoutPermissions();
+    void directoryWithoutPermissions();
     void readOnlyCard();
     void unreadableMountDirectory();
     void missingMountDirectory();
     void mountDirectoryReplaced_data();
     void mountDirectoryReplaced();
-    void folderOfAnotherDisk();
+    void directoryOfAnotherDisk();
     void removeAllEntries();
     void removeAllEntriesOfNothing();
 
@@ -254,7 +254,7 @@ private:
     // Runs a remover with a mount table of one card.
     Outcome emptyMounted(const QByteArray &card);
     QByteArray path(const char *name) const;
-    // A folder with a file, a hidden one, a folder and a link in it.
+    // A directory with a file, a hidden one, a directory and a link in it.
     QByteArray makeCard(const char *name);
 
     std::unique_ptr<MessageLog> m_log;
@@ -265,7 +265,7 @@ void tst_FileRemover::init()
 {
     m_log = std::make_unique<MessageLog>();
     m_files = std::make_unique<ScratchFileSystem>();
-    makeFolder(path("outside"));
+    makeDirectory(path("outside"));
     makeFile(path("outside/file"), "precious");
     writeMountTable(QByteArray());
 }
@@ -301,11 +301,11 @@ QByteArray tst_FileRemover::path(const char *name) const
 QByteArray tst_FileRemover::makeCard(const char *name)
 {
     const QByteArray card = path(name);
-    makeFolder(card);
+    makeDirectory(card);
     makeFile(card + "/file");
     makeFile(card + "/.hidden");
-    makeFolder(card + "/folder");
-    makeFile(card + "/folder/file");
+    makeDirectory(card + "/directory");
+    makeFile(card + "/directory/file");
     makeLink(card + "/link", "../outside");
     return card;
 }
@@ -384,7 +384,7 @@ void tst_FileRemover::receiverGoesFirst()
 
 void tst_FileRemover::emptyCard()
 {
-    makeFolder(path("card"));
+    makeDirectory(path("card"));
     QCOMPARE(emptyMounted(path("card")), Completed);
     QVERIFY(exists(path("card")));
 }
@@ -395,7 +395,7 @@ void tst_FileRemover::removesAllAndKeepsMountDirectory()
     makeFile(card + "/caf\xe9");
     makeLink(card + "/dangling", "nowhere");
     makePipe(card + "/pipe");
-    makeFolder(card + "/.hiddenFolder");
+    makeDirectory(card + "/.hiddenDirectory");
     struct stat before = {};
     struct stat after = {};
     QCOMPARE(stat(card.constData(), &before), 0);
@@ -520,7 +520,7 @@ void tst_FileRemover::relativeMountDirectories_data()
 
     QTest::newRow("empty") << device + '\n';
     QTest::newRow("empty, with blanks") << device + "   \n";
-    QTest::newRow("one name") << device + " folder vfat rw 0 0\n";
+    QTest::newRow("one name") << device + " directory vfat rw 0 0\n";
     QTest::newRow("dot") << device + " . vfat rw 0 0\n";
     QTest::newRow("dots") << device + " ../current vfat rw 0 0\n";
     QTest::newRow("none") << device + " none swap sw 0 0\n";
@@ -531,7 +531,7 @@ void tst_FileRemover::relativeMountDirectories()
     QFETCH(const QByteArray, entry);
     const QByteArray current = makeCard("current");
     const QByteArray card = makeCard("card");
-    makeFolder(current + "/none");
+    makeDirectory(current + "/none");
     writeMountTable(entry);
     const auto run = [&] { return chdir(current.constData()) == 0 ? int(runHere(device)) : -1; };
     QCOMPARE(runInChild(run), int(Error));
@@ -559,8 +559,8 @@ void tst_FileRemover::rootMountDirectory()
     // In a root of its own: a remover that went for it would empty that one.
     QFETCH(const QByteArray, directory);
     const QByteArray root = makeCard("root");
-    makeFolder(root + "/etc");
-    makeFolder(root + "/card");
+    makeDirectory(root + "/etc");
+    makeDirectory(root + "/card");
     makeFile(root + "/card/file");
     makeFile(root + mountTable, line(device, directory));
     const auto run = [&] {
@@ -625,27 +625,27 @@ void tst_FileRemover::lineCutWithinDirectory()
     // Escapes make a line four times as long as its directory, so that the front of a line may name
     // another directory, which exists.
     const int escapes = 3000;
-    QByteArray folder = path("folder");
-    makeFolder(folder);
+    QByteArray directory = path("directory");
+    makeDirectory(directory);
     QByteArray padding;
-    while (folder.size() < escapes) {
-        folder += '/' + QByteArray(200, ' ');
-        makeFolder(folder);
+    while (directory.size() < escapes) {
+        directory += '/' + QByteArray(200, ' ');
+        makeDirectory(directory);
     }
-    makeFile(folder + "/file");
-    const QByteArray front = device + ' ' + escaped(folder);
+    makeFile(directory + "/file");
+    const QByteArray front = device + ' ' + escaped(directory);
     QVERIFY(front.size() < 12287);
     // Doubled slashes lead to the same place and fill the buffer exactly.
     const QByteArray filled =
-        device + ' ' + QByteArray(12287 - front.size(), '/') + escaped(folder);
+        device + ' ' + QByteArray(12287 - front.size(), '/') + escaped(directory);
     QCOMPARE(filled.size(), 12287);
     writeMountTable(filled + "/inner vfat rw 0 0\n");
     QCOMPARE(runHere(device), Error);
-    QVERIFY(exists(folder + "/file"));
+    QVERIFY(exists(directory + "/file"));
 
     // The same directory, in a line that is short enough.
-    QCOMPARE(emptyMounted(folder), Completed);
-    QVERIFY(!exists(folder + "/file"));
+    QCOMPARE(emptyMounted(directory), Completed);
+    QVERIFY(!exists(directory + "/file"));
 }
 
 void tst_FileRemover::lastLineWithoutBreak()
@@ -660,10 +660,10 @@ void tst_FileRemover::mountedTwice()
 {
     const QByteArray first = makeCard("first");
     const QByteArray second = makeCard("second");
-    const MountPoint stuck(first + "/folder/file");
+    const MountPoint stuck(first + "/directory/file");
     writeMountTable(line(device, first) + line("tmpfs", "/run") + line(device, second));
     QCOMPARE(runHere(device), Completed);
-    QCOMPARE(listAll(first), (QByteArrayList{"folder", "folder/file"}));
+    QCOMPARE(listAll(first), (QByteArrayList{"directory", "directory/file"}));
     QCOMPARE(list(second), QByteArrayList());
 }
 
@@ -718,11 +718,11 @@ void tst_FileRemover::immutableFile()
     QCOMPARE(list(card), QByteArrayList{"file5"});
 }
 
-void tst_FileRemover::folderWithoutPermissions()
+void tst_FileRemover::directoryWithoutPermissions()
 {
     const QByteArray card = makeCard("card");
     for (const char *const name : {"/unreadable", "/unwritable", "/unreadableEmpty"}) {
-        makeFolder(card + name);
+        makeDirectory(card + name);
         if (qstrcmp(name, "/unreadableEmpty") != 0) {
             makeFile(card + name + "/file");
         }
@@ -737,7 +737,7 @@ void tst_FileRemover::folderWithoutPermissions()
         const WithoutPrivileges guard;
         QCOMPARE(runHere(device), Error);
     }
-    // The permissions of the folder around it count, not those of the entry.
+    // The permissions of the directory around it count, not those of the entry.
     QCOMPARE(listAll(card),
              (QByteArrayList{"unreadable", "unreadable/file", "unwritable", "unwritable/file"}));
 }
@@ -745,10 +745,10 @@ void tst_FileRemover::folderWithoutPermissions()
 void tst_FileRemover::readOnlyCard()
 {
     const QByteArray card = path("card");
-    makeFolder(card);
+    makeDirectory(card);
     QCOMPARE(mount("tmpfs", card.constData(), "tmpfs", 0, nullptr), 0);
-    makeFolder(card + "/folder");
-    makeFiles(card + "/folder", 3);
+    makeDirectory(card + "/directory");
+    makeFiles(card + "/directory", 3);
     makeFiles(card, 3);
     QCOMPARE(mount(nullptr, card.constData(), nullptr, MS_REMOUNT | MS_RDONLY, nullptr), 0);
     const Outcome outcome = emptyMounted(card);
@@ -782,7 +782,7 @@ void tst_FileRemover::mountDirectoryReplaced_data()
 {
     QTest::addColumn<QByteArray>("target");
 
-    QTest::newRow("link to a folder") << QByteArray("outside");
+    QTest::newRow("link to a directory") << QByteArray("outside");
     QTest::newRow("link to a file") << QByteArray("outside/file");
     QTest::newRow("dangling link") << QByteArray("nowhere");
     QTest::newRow("file") << QByteArray();
@@ -806,29 +806,29 @@ void tst_FileRemover::mountDirectoryReplaced()
     QCOMPARE(list(second), QByteArrayList());
 }
 
-void tst_FileRemover::folderOfAnotherDisk()
+void tst_FileRemover::directoryOfAnotherDisk()
 {
-    // A block device whose node is here, and a folder of another: the card was unmounted meanwhile.
+    // The node of one block device and a directory of another: the card was unmounted meanwhile.
     QByteArray node;
     struct stat disk = {};
     const QTemporaryDir onDisk;
     const QByteArray card = QFile::encodeName(onDisk.path());
     makeFiles(card, 4);
-    struct stat folder = {};
-    QCOMPARE(stat(card.constData(), &folder), 0);
+    struct stat directory = {};
+    QCOMPARE(stat(card.constData(), &directory), 0);
     const QByteArrayList names = list("/dev");
     for (const QByteArray &name : names) {
         const QByteArray candidate = "/dev/" + name;
         if (stat(candidate.constData(), &disk) == 0 && S_ISBLK(disk.st_mode)
-            && disk.st_rdev != folder.st_dev) {
+            && disk.st_rdev != directory.st_dev) {
             node = candidate;
         }
     }
     if (node.isEmpty()) {
         QSKIP("no block device here");
     }
-    if (folder.st_dev >> 8 == 0) {
-        QSKIP("the temporary folder lies on no disk");
+    if (directory.st_dev >> 8 == 0) {
+        QSKIP("the temporary directory lies on no disk");
     }
     writeMountTable(line(node, card));
     QCOMPARE(runHere(node), Error);
@@ -836,7 +836,7 @@ void tst_FileRemover::folderOfAnotherDisk()
 
     // A file system that numbers itself may lie on any device.
     const QByteArray mounted = path("mounted");
-    makeFolder(mounted);
+    makeDirectory(mounted);
     QCOMPARE(mount("tmpfs", mounted.constData(), "tmpfs", 0, nullptr), 0);
     makeFile(mounted + "/file");
     writeMountTable(line(node, mounted));

@@ -873,7 +873,7 @@ void TestMemoryCardFormatter::removeAllFiles()
     const MountedCard mounted(card);
     Files::write(mounted.file("file"), "x");
     Files::write(mounted.file(".hidden"), "x");
-    Files::write(mounted.file("folder/file"), "x");
+    Files::write(mounted.file("directory/file"), "x");
     setCard(cardName, card);
     m_formatter->removeAllFiles();
     QCOMPARE(m_events->line(), QByteArray("not busy"));
@@ -1674,7 +1674,7 @@ void TestMemoryCardFormatter::goesWhileFilesAreRemoved()
 {
     startDiskService("done");
     const MountedCard mounted(card);
-    Files::write(mounted.file("folder/file"), "x");
+    Files::write(mounted.file("directory/file"), "x");
     setCard(cardName, card);
     bool removing = false;
     onStatus(Formatter::RemovingFiles, [&removing] { removing = true; });

@@ -76,7 +76,7 @@ private:
     QByteArray run(void (Formatter::*operation)());
     QByteArray format(const QString &type);
     QByteArray wait();
-    // Files, folders and links in the card, which has to be mounted.
+    // Files, directories and links in the card, which has to be mounted.
     void fill();
     QByteArray takeLog() { return m_log->takeReport().toUtf8(); }
 
@@ -163,7 +163,7 @@ void TestRealCard::fill()
 {
     for (int i = 0; i < 20; ++i) {
         for (int j = 0; j < 20; ++j) {
-            Files::write(m_card->file(QStringLiteral("folder %1/deep/.file%2").arg(i).arg(j)),
+            Files::write(m_card->file(QStringLiteral("directory %1/deep/.file%2").arg(i).arg(j)),
                          "content");
         }
     }

@@ -217,10 +217,11 @@ class Bus : public QProcess
 public:
     Bus()
     {
-        const QString folder = qEnvironmentVariable("XDG_RUNTIME_DIR");
+        const QString directory = qEnvironmentVariable("XDG_RUNTIME_DIR");
         start(QStringLiteral("dbus-daemon"),
               {QStringLiteral("--session"), QStringLiteral("--nofork"),
-               QStringLiteral("--print-address"), QStringLiteral("--address=unix:dir=") + folder});
+               QStringLiteral("--print-address"),
+               QStringLiteral("--address=unix:dir=") + directory});
         if (waitForReadyRead()) {
             m_address = QString::fromUtf8(readLine().trimmed());
         }
@@ -319,7 +320,7 @@ private Q_SLOTS:
 
     void followsOtherProcesses();
     void followsSeveralChangesAtOnce();
-    void followsTheResetOfAFolder();
+    void followsTheResetOfADirectory();
     void missesNothingWhileTheBusIsSlow();
 
     void everySetIsSeenWhileWritesComplete_data();
@@ -555,11 +556,11 @@ void TestMGConfItem::followsOtherProcesses()
 
 void TestMGConfItem::followsSeveralChangesAtOnce()
 {
-    const MGConfItem first(QStringLiteral("/test/folder/first"));
-    const MGConfItem second(QStringLiteral("/test/folder/below/second"));
-    MGConfItem same(QStringLiteral("/test/folder/same"));
-    const MGConfItem untouched(QStringLiteral("/test/folder/untouched"));
-    const MGConfItem neighbour(QStringLiteral("/test/folder2"));
+    const MGConfItem first(QStringLiteral("/test/directory/first"));
+    const MGConfItem second(QStringLiteral("/test/directory/below/second"));
+    MGConfItem same(QStringLiteral("/test/directory/same"));
+    const MGConfItem untouched(QStringLiteral("/test/directory/untouched"));
+    const MGConfItem neighbour(QStringLiteral("/test/directory2"));
     same.set(3);
     QTRY_COMPARE(DconfTool::read(same.key()), QByteArray("3"));
 
@@ -569,7 +570,7 @@ void TestMGConfItem::followsSeveralChangesAtOnce()
     const QSignalSpy untouchedChanged(&untouched, &MGConfItem::valueChanged);
     const QSignalSpy neighbourChanged(&neighbour, &MGConfItem::valueChanged);
 
-    DconfTool::run({QStringLiteral("load"), QStringLiteral("/test/folder/")},
+    DconfTool::run({QStringLiteral("load"), QStringLiteral("/test/directory/")},
                    "[/]\nfirst=1\nsame=3\n[below]\nsecond=2\n");
     QTRY_COMPARE(firstChanged.count(), 1);
     QTRY_COMPARE(secondChanged.count(), 1);
@@ -584,11 +585,11 @@ void TestMGConfItem::followsSeveralChangesAtOnce()
     QCOMPARE(neighbourChanged.count(), 0);
 }
 
-void TestMGConfItem::followsTheResetOfAFolder()
+void TestMGConfItem::followsTheResetOfADirectory()
 {
-    MGConfItem inside(QStringLiteral("/test/folder/inside"));
-    const MGConfItem empty(QStringLiteral("/test/folder/empty"));
-    MGConfItem neighbour(QStringLiteral("/test/folder2"));
+    MGConfItem inside(QStringLiteral("/test/directory/inside"));
+    const MGConfItem empty(QStringLiteral("/test/directory/empty"));
+    MGConfItem neighbour(QStringLiteral("/test/directory2"));
     inside.set(1);
     neighbour.set(2);
     QTRY_COMPARE(DconfTool::read(neighbour.key()), QByteArray("2"));
@@ -596,7 +597,7 @@ void TestMGConfItem::followsTheResetOfAFolder()
     QSignalSpy insideChanged(&inside, &MGConfItem::valueChanged);
     const QSignalSpy emptyChanged(&empty, &MGConfItem::valueChanged);
     const QSignalSpy neighbourChanged(&neighbour, &MGConfItem::valueChanged);
-    DconfTool::reset(QStringLiteral("/test/folder/"));
+    DconfTool::reset(QStringLiteral("/test/directory/"));
     QTRY_COMPARE(insideChanged.count(), 1);
     QVERIFY(!inside.value().isValid());
     QTest::qWait(100);
@@ -847,7 +848,7 @@ void TestMGConfItem::badKeyIsInert_data()
     };
     row("empty", QString());
     row("relative", QStringLiteral("test/bad/key"));
-    row("folder", QStringLiteral("/test/bad/"));
+    row("directory", QStringLiteral("/test/bad/"));
     row("root", QStringLiteral("/"));
     row("two slashes", QStringLiteral("/test/bad//key"));
     row("NUL", QStringLiteral("/test/bad/key") + QChar(QChar::Null) + QStringLiteral("x"));
@@ -911,16 +912,16 @@ void TestMGConfItem::failedStoreReverts()
 
     QVariantList seen;
     {
-        // A file in the place of the database's folder: nobody can write there, not even root.
+        // A file in the place of the database's directory: nobody can write there, not even root.
         QDir config(qEnvironmentVariable("XDG_CONFIG_HOME"));
-        const QString folder = QStringLiteral("dconf");
+        const QString directory = QStringLiteral("dconf");
         const QString aside = QStringLiteral("dconf.aside");
-        QVERIFY(config.rename(folder, aside));
+        QVERIFY(config.rename(directory, aside));
         const auto restore = qScopeGuard([&] {
-            config.remove(folder);
-            config.rename(aside, folder);
+            config.remove(directory);
+            config.rename(aside, directory);
         });
-        QVERIFY(QFile(config.filePath(folder)).open(QIODevice::WriteOnly));
+        QVERIFY(QFile(config.filePath(directory)).open(QIODevice::WriteOnly));
 
         connect(&item, &MGConfItem::valueChanged, this, [&] { seen.append(item.value()); });
         // The service must not fail before the new value was seen.

@@ -8,9 +8,9 @@ import com.marlo.settings.system 1.0
 TestCase {
     id: test
 
-    readonly property string platformFolder: "/usr/share/marlo-settings/platform-eula"
-    readonly property string vendorFolder: "/usr/share/vendor-eula"
-    readonly property string textFolder: "/usr/share/texts"
+    readonly property string platformDirectory: "/usr/share/marlo-settings/platform-eula"
+    readonly property string vendorDirectory: "/usr/share/vendor-eula"
+    readonly property string textDirectory: "/usr/share/texts"
     readonly property string noTerms: "TermsOfUseManager: unable to load either the specified "
                                       + "locale or the English terms"
 
@@ -26,7 +26,7 @@ TestCase {
     }
 
     function writePlatform(locale, content) {
-        root.writeFile(platformFolder + "/tarnwick_termsofuse-" + locale + ".txt", content);
+        root.writeFile(platformDirectory + "/tarnwick_termsofuse-" + locale + ".txt", content);
     }
 
     function noLocale(name) {
@@ -47,9 +47,9 @@ TestCase {
     }
 
     function init() {
-        root.removeFile(platformFolder);
-        root.removeFile(vendorFolder);
-        root.removeFile(textFolder);
+        root.removeFile(platformDirectory);
+        root.removeFile(vendorDirectory);
+        root.removeFile(textDirectory);
     }
 
     function cleanup() {
@@ -106,15 +106,15 @@ TestCase {
         const manager = createTemporaryObject(terms, test);
         compare(manager.vendorPath, "");
         compare(manager.shown, false);
-        manager.vendorPath = vendorFolder;
+        manager.vendorPath = vendorDirectory;
         compare(manager.shown, false);
-        root.writeFile(vendorFolder + "/full/fi.txt", "");
+        root.writeFile(vendorDirectory + "/full/fi.txt", "");
         compare(manager.hasVendorTermsOfUse, true);
         // No change signal has been emitted yet.
         compare(manager.shown, false);
-        manager.vendorPath = vendorFolder;
+        manager.vendorPath = vendorDirectory;
         compare(manager.changes, 1);
-        manager.vendorPath = vendorFolder + "/full";
+        manager.vendorPath = vendorDirectory + "/full";
         compare(manager.changes, 2);
         compare(manager.shown, true);
         manager.vendorPath = "";
@@ -122,9 +122,9 @@ TestCase {
     }
 
     function test_vendorTerms() {
-        root.writeFile(vendorFolder + "/full/fi.txt", "Ehdot\nKaikki");
-        root.writeFile(vendorFolder + "/summary/fi.txt", "Ehdot\nLyhyesti");
-        const manager = createTemporaryObject(terms, test, { vendorPath: vendorFolder });
+        root.writeFile(vendorDirectory + "/full/fi.txt", "Ehdot\nKaikki");
+        root.writeFile(vendorDirectory + "/summary/fi.txt", "Ehdot\nLyhyesti");
+        const manager = createTemporaryObject(terms, test, { vendorPath: vendorDirectory });
         compare(parts(manager.vendorTermsOfUse("fi_FI")), ["Ehdot", "Kaikki"]);
         compare(parts(manager.vendorTermsSummary("fi_FI")), ["Ehdot", "Lyhyesti"]);
     }
@@ -139,31 +139,32 @@ TestCase {
     }
 
     function test_readContent(data) {
-        root.writeFile(textFolder + "/a", data.content);
-        compare(TextFileReader.readContent(textFolder + "/a"), data.text);
+        root.writeFile(textDirectory + "/a", data.content);
+        compare(TextFileReader.readContent(textDirectory + "/a"), data.text);
     }
 
     // A null string is an empty one to QML, neither null nor undefined: pages bind texts to it.
     function test_whatCannotBeReadIsEmpty() {
-        root.writeFile(textFolder + "/empty", "\n");
-        verify(TextFileReader.readContent(textFolder + "/missing") === "");
-        verify(TextFileReader.readContent(textFolder) === "");
+        root.writeFile(textDirectory + "/empty", "\n");
+        verify(TextFileReader.readContent(textDirectory + "/missing") === "");
+        verify(TextFileReader.readContent(textDirectory) === "");
         verify(TextFileReader.readContent("") === "");
-        verify(TextFileReader.collate("file://" + textFolder, ",", ":") === "");
-        verify(TextFileReader.collate("file://" + textFolder + "/missing", ",", ":") === "");
-        verify(TextFileReader.collate("https://example.org" + textFolder, ",", ":") === "");
+        verify(TextFileReader.collate("file://" + textDirectory, ",", ":") === "");
+        verify(TextFileReader.collate("file://" + textDirectory + "/missing", ",", ":") === "");
+        verify(TextFileReader.collate("https://example.org" + textDirectory, ",", ":") === "");
         verify(TextFileReader.collate("", ",", ":") === "");
     }
 
     function test_collate() {
-        root.writeFile(textFolder + "/2", "B\n");
-        root.writeFile(textFolder + "/1", "A");
-        root.writeFile(textFolder + "/b", "lower");
-        root.writeFile(textFolder + "/C", "upper");
-        root.writeFile(textFolder + "/3", "\n");
-        root.writeFile(textFolder + "/.hidden", "hidden");
-        root.writeFile(textFolder + "/folder/4", "deeper");
-        compare(TextFileReader.collate("file://" + textFolder, ",", ":"), ":A,B,upper,lower");
-        compare(TextFileReader.collate("file://" + textFolder + "/folder", ",", ":"), ":deeper");
+        root.writeFile(textDirectory + "/2", "B\n");
+        root.writeFile(textDirectory + "/1", "A");
+        root.writeFile(textDirectory + "/b", "lower");
+        root.writeFile(textDirectory + "/C", "upper");
+        root.writeFile(textDirectory + "/3", "\n");
+        root.writeFile(textDirectory + "/.hidden", "hidden");
+        root.writeFile(textDirectory + "/directory/4", "deeper");
+        compare(TextFileReader.collate("file://" + textDirectory, ",", ":"), ":A,B,upper,lower");
+        compare(TextFileReader.collate("file://" + textDirectory + "/directory", ",", ":"),
+                ":deeper");
     }
 }

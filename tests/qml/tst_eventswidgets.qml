@@ -8,7 +8,7 @@ import com.marlo.settings.system 1.0
 TestCase {
     id: test
 
-    readonly property string folder: "/usr/share/glimmera/eventswidgets"
+    readonly property string directory: "/usr/share/glimmera/eventswidgets"
     readonly property string features: "/usr/share/glimmera/features"
     readonly property string enabledKey: "/desktop/glimmera-marlo-home/events_screen_widgets"
     readonly property int pathRole: 258
@@ -59,7 +59,7 @@ TestCase {
     }
 
     function file(name) {
-        return folder + "/" + name + ".json";
+        return directory + "/" + name + ".json";
     }
 
     function widget(name, more) {
@@ -91,7 +91,7 @@ TestCase {
 
     function init() {
         ++serial;
-        root.removeFile(folder);
+        root.removeFile(directory);
         root.removeFile(features);
         root.installCatalog("maps_eng_en");
         root.installCatalog("maps-fi");
@@ -132,7 +132,7 @@ TestCase {
         compare(shown.all("available"), [true, true]);
     }
 
-    function test_withoutAFolderThereAreNoWidgets() {
+    function test_withoutADirectoryThereAreNoWidgets() {
         const widgets = createTemporaryObject(allWidgets, test);
         compare(widgets.rowCount(), 0);
         add("a", [widget("a")]);
@@ -247,7 +247,7 @@ TestCase {
         compare(shown.all("icon"), ["", "icon-b"]);
         root.removeFile(file("a"));
         tryAll(shown, "title", ["B"]);
-        root.writeFile(folder + "/c.txt", JSON.stringify({ widgets: [widget("c")] }));
+        root.writeFile(directory + "/c.txt", JSON.stringify({ widgets: [widget("c")] }));
         add("d", [widget("d")]);
         tryAll(shown, "title", ["B", "d"]);
     }

@@ -8,7 +8,7 @@ import com.marlo.settings.system 1.0
 TestCase {
     id: test
 
-    readonly property string folder: "/usr/share/glimmera/quickactions"
+    readonly property string directory: "/usr/share/glimmera/quickactions"
     readonly property string enabledKey: "/desktop/glimmera-marlo-home/events_screen_actions"
     readonly property string call: "remote-service=org.example.lamp\nremote-path=/lamp\n"
                                    + "remote-interface=org.example.Lamp\nremote-method=toggle\n"
@@ -60,7 +60,7 @@ TestCase {
 
     // A name that no other test used: the module may yet see what that one stored.
     function path(name) {
-        return folder + "/" + name + "-" + serial + ".conf";
+        return directory + "/" + name + "-" + serial + ".conf";
     }
 
     function add(name, content) {
@@ -79,7 +79,7 @@ TestCase {
 
     function init() {
         ++serial;
-        root.removeFile(folder);
+        root.removeFile(directory);
         root.installCatalog("maps_eng_en");
         root.installCatalog("maps-fi");
         root.setLocale("fi_FI");

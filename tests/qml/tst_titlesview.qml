@@ -8,7 +8,7 @@ import com.marlo.settings.system 1.0
 TestCase {
     id: test
 
-    readonly property string folder: "/usr/share/glimmera/eventswidgets"
+    readonly property string directory: "/usr/share/glimmera/eventswidgets"
     readonly property string enabledKey: "/desktop/glimmera-marlo-home/events_screen_widgets"
 
     property int serial: 0
@@ -95,7 +95,7 @@ TestCase {
 
     function init() {
         ++serial;
-        root.removeFile(folder);
+        root.removeFile(directory);
         root.unsetKey(enabledKey);
         root.setLocale("en_US");
     }
@@ -345,7 +345,7 @@ TestCase {
     function test_aPageSaysWhatIsEnabled() {
         // Names that no other test used: the module may yet see what that one stored.
         const path = name => "/usr/share/widgets/titles-" + name + "-" + serial + ".qml";
-        root.writeFile(folder + "/w.json", JSON.stringify({
+        root.writeFile(directory + "/w.json", JSON.stringify({
             widgets: ["Clock", "Weather", "Calendar"].map(name => ({ path: path(name),
                                                                      title: name }))
         }));
@@ -359,7 +359,7 @@ TestCase {
         tryCompare(label, "text", "Weather and Calendar");
         tryVerify(() => String(root.key(enabledKey))
                         === [path("Calendar"), path("Weather")].toString());
-        root.removeFile(folder + "/w.json");
+        root.removeFile(directory + "/w.json");
         tryCompare(label, "text", "");
     }
 

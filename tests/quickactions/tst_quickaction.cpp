@@ -143,7 +143,7 @@ void TestQuickAction::init()
     // the next row may write as many bytes in the same millisecond.
     static int count = 0;
     m_path = QStringLiteral("/usr/share/glimmera/quickactions/%1.conf").arg(++count);
-    Files::makeFolder(QFileInfo(m_path).path());
+    Files::makeDirectory(QFileInfo(m_path).path());
     Files::remove(m_path);
     LoggedTest::init();
 }
@@ -357,7 +357,7 @@ void TestQuickAction::unreadable()
     if (kind == "unclosed section") {
         write("title=x\n[remote-arguments\n");
     } else if (kind == "directory") {
-        Files::makeFolder(m_path);
+        Files::makeDirectory(m_path);
     } else if (kind == "pipe") {
         Files::makePipe(m_path);
     } else if (kind == "link to a pipe") {

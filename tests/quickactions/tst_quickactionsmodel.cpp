@@ -208,7 +208,7 @@ QStringList TestQuickActionsModel::takeMessages()
 void TestQuickActionsModel::init()
 {
     Files::remove(directory);
-    Files::makeFolder(directory);
+    Files::makeDirectory(directory);
     for (const auto *name : {"maps_eng_en", "maps-fi", "maps-de", "atlas_eng_en"}) {
         Files::installCatalog(QString::fromLatin1(name));
     }
@@ -840,7 +840,7 @@ void TestQuickActionsModel::reloadsAccumulate()
 {
     // A definition that cannot be read causes a warning each time it is loaded.
     const QStringList warning(QStringLiteral("warning [default] Unable to open action file"));
-    Files::makeFolder(path("broken"));
+    Files::makeDirectory(path("broken"));
     loadedModel(true);
     QCOMPARE(takeMessages(), warning);
 
@@ -923,7 +923,7 @@ void TestQuickActionsModel::rewrittenInPlace()
 void TestQuickActionsModel::otherFilesAreIgnored()
 {
     // A definition that cannot be read gives a warning each time it is loaded.
-    Files::makeFolder(path("broken"));
+    Files::makeDirectory(path("broken"));
     loadedModel(true);
     QCOMPARE(takeMessages().size(), 1);
     Files::write(directory + QStringLiteral("/other.txt"), "x");
@@ -948,11 +948,11 @@ void TestQuickActionsModel::unreadableDefinitionIsListed()
 
 void TestQuickActionsModel::directoriesAndPipesAmongTheDefinitions()
 {
-    Files::makeFolder(path("folder"));
+    Files::makeDirectory(path("directory"));
     Files::makePipe(directory + QStringLiteral("/pipe"));
     Files::makeLink(directory + QStringLiteral("/pipe"), path("link"));
     add("a");
-    QCOMPARE(names(loadedModel(true)), list({"a", "folder", "link"}));
+    QCOMPARE(names(loadedModel(true)), list({"a", "directory", "link"}));
     QCOMPARE(takeMessages(),
              list({"warning [default] Unable to open action file",
                    "warning [default] Unable to open action file"}));
@@ -1196,7 +1196,7 @@ void TestQuickActionsModel::requestsInHandlersLoadOnce()
 {
     // Each load of a definition that cannot be read gives a warning.
     constexpr int count = 50;
-    Files::makeFolder(path("broken"));
+    Files::makeDirectory(path("broken"));
     for (int i = 0; i < count; ++i) {
         add(QByteArray::number(i).constData());
     }

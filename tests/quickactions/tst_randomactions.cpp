@@ -414,7 +414,7 @@ QString TestRandomActions::step()
     if (kind < 955) {
         Files::remove(directory);
         waitForReload();
-        Files::makeFolder(directory);
+        Files::makeDirectory(directory);
         waitForReload();
         return QStringLiteral("another directory");
     }
@@ -501,7 +501,7 @@ void TestRandomActions::steps()
     QFETCH(bool, busy);
     const auto load = busy ? std::make_unique<RandomSteps::BusyMachine>() : nullptr;
     Files::remove(directory);
-    Files::makeFolder(directory);
+    Files::makeDirectory(directory);
     for (const QString &key : {enabledKey, blockedKey, userKey}) {
         MGConfItem(key).unset();
     }

@@ -91,7 +91,7 @@ QStringList TestTriggering::messages()
 void TestTriggering::init()
 {
     Files::remove(directory);
-    Files::makeFolder(directory);
+    Files::makeDirectory(directory);
     MGConfItem(QStringLiteral("/desktop/glimmera-marlo-home/events_screen_actions")).unset();
     m_log = std::make_unique<MessageLog>();
     m_model = std::make_unique<QuickActionsModel>();

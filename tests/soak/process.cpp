@@ -24,7 +24,8 @@ qint64 Process::residentMemory()
 
 int Process::openFiles()
 {
-    const QDir folder(QStringLiteral("/proc/self/fd"));
-    // Not the one that the folder is read with.
-    return int(folder.entryList(QDir::AllEntries | QDir::System | QDir::NoDotAndDotDot).size()) - 1;
+    const QDir directory(QStringLiteral("/proc/self/fd"));
+    // Not the one that the directory is read with.
+    return int(directory.entryList(QDir::AllEntries | QDir::System | QDir::NoDotAndDotDot).size())
+        - 1;
 }

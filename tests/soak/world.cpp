@@ -16,11 +16,11 @@
 
 namespace {
 
-const QString actionsFolder = QStringLiteral("/usr/share/glimmera/quickactions");
-const QString widgetsFolder = QStringLiteral("/usr/share/glimmera/eventswidgets");
+const QString actionsDirectory = QStringLiteral("/usr/share/glimmera/quickactions");
+const QString widgetsDirectory = QStringLiteral("/usr/share/glimmera/eventswidgets");
 const QString elsewhere = QStringLiteral("/usr/share/glimmera/elsewhere");
 const QString availableFile = QStringLiteral("/usr/share/glimmera/available");
-const QString termsFolder = QStringLiteral("/usr/share/marlo-settings/platform-eula");
+const QString termsDirectory = QStringLiteral("/usr/share/marlo-settings/platform-eula");
 const QString mountTable = QStringLiteral("/etc/mtab");
 const QString device = QStringLiteral("/dev/soak-card1");
 const QString session = QStringLiteral("com.marlo.torch");
@@ -58,8 +58,8 @@ const QStringList words = {
     QStringLiteral("soak-card1"),
     device,
     QStringLiteral("/dev/soak-card2"),
-    termsFolder,
-    actionsFolder,
+    termsDirectory,
+    actionsDirectory,
 };
 const QStringList diskScenarios = {
     QStringLiteral("done"),         QStringLiteral("slow"),       QStringLiteral("hung"),
@@ -145,7 +145,7 @@ QString World::text()
 {
     switch (random(4)) {
     case 0:
-        return actionsFolder + QLatin1Char('/') + anyOf(names) + QLatin1String(".conf");
+        return actionsDirectory + QLatin1Char('/') + anyOf(names) + QLatin1String(".conf");
     case 1:
         return QLatin1String("/w/") + anyOf(names);
     case 2:
@@ -178,10 +178,11 @@ QVariant World::value()
 void World::changeQuickActions()
 {
     if (random(20) == 0) {
-        changeFolder(actionsFolder);
+        changeDirectory(actionsDirectory);
         return;
     }
-    const QString path = actionsFolder + QLatin1Char('/') + anyOf(names) + QLatin1String(".conf");
+    const QString path =
+        actionsDirectory + QLatin1Char('/') + anyOf(names) + QLatin1String(".conf");
     if (often()) {
         Files::write(path, QByteArray(anyOf(actions)).replace("%1", QByteArray::number(random(9))));
     } else {
@@ -192,10 +193,11 @@ void World::changeQuickActions()
 void World::changeWidgets()
 {
     if (random(20) == 0) {
-        changeFolder(widgetsFolder);
+        changeDirectory(widgetsDirectory);
         return;
     }
-    const QString path = widgetsFolder + QLatin1Char('/') + anyOf(names) + QLatin1String(".json");
+    const QString path =
+        widgetsDirectory + QLatin1Char('/') + anyOf(names) + QLatin1String(".json");
     if (often()) {
         Files::write(path, QByteArray(anyOf(widgets)).replace("%1", QByteArray::number(random(9))));
     } else if (random(2) == 0) {
@@ -207,16 +209,16 @@ void World::changeWidgets()
     }
 }
 
-void World::changeFolder(const QString &folder)
+void World::changeDirectory(const QString &directory)
 {
-    Files::remove(folder);
+    Files::remove(directory);
     switch (random(3)) {
     case 0:
-        Files::makeFolder(folder);
+        Files::makeDirectory(directory);
         break;
     case 1:
-        Files::makeFolder(elsewhere);
-        Files::makeLink(elsewhere, folder);
+        Files::makeDirectory(elsewhere);
+        Files::makeLink(elsewhere, directory);
         break;
     default:
         break; // made with its next file

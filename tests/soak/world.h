@@ -43,7 +43,7 @@ private:
 
     void changeQuickActions();
     void changeWidgets();
-    void changeFolder(const QString &folder);
+    void changeDirectory(const QString &directory);
     void changeCatalogs();
     void changeTexts();
     void changeSettings();

@@ -35,7 +35,7 @@ void requireThrowAwayRoot(const QString &path)
 
 void Files::write(const QString &path, const QByteArray &content)
 {
-    makeFolder(QFileInfo(path).path());
+    makeDirectory(QFileInfo(path).path());
     QSaveFile file(path);
     require(file.open(QIODevice::WriteOnly) && file.write(content) == content.size()
                 && file.commit(),
@@ -53,7 +53,7 @@ void Files::remove(const QString &path)
     }
 }
 
-void Files::makeFolder(const QString &path)
+void Files::makeDirectory(const QString &path)
 {
     requireThrowAwayRoot(path);
     require(QDir().mkpath(path), "make", path);

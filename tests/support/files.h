@@ -16,7 +16,7 @@ namespace Files {
 void write(const QString &path, const QByteArray &content);
 // Removes a file or a whole directory, if it exists.
 void remove(const QString &path);
-void makeFolder(const QString &path);
+void makeDirectory(const QString &path);
 void makePipe(const QString &path);
 // Makes a file of the given size that takes no disk space.
 void makeSparse(const QString &path, qint64 size);

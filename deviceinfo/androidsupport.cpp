@@ -14,7 +14,7 @@ const QLatin1String runtimeDaemon("/usr/sbin/apkd");
 /*!
     \qmltype AndroidSupport
     \inqmlmodule com.marlo.settings.system
-    \brief Says whether the support for Android applications is installed.
+    \brief Shows whether the support for Android applications is installed.
 
     \qml
     Label {
@@ -26,12 +26,6 @@ const QLatin1String runtimeDaemon("/usr/sbin/apkd");
     \endqml
 
     \image gallery-android.png The gallery's page of this type
-
-    \section1 What may surprise
-    \section2 A binding does not notice the installation
-    \l dataDirectoriesVisible is checked on every read and has no change signal, so a binding keeps
-    the first value. Read it in a function to get the current one. Packages are not installed while
-    a page is open, and watching for them would cost more than it gives.
 */
 
 AndroidSupport::AndroidSupport(QObject *parent) : QObject(parent)
@@ -42,9 +36,10 @@ AndroidSupport::AndroidSupport(QObject *parent) : QObject(parent)
     \qmlproperty bool AndroidSupport::dataDirectoriesVisible
     \readonly
 
-    Whether the data directories of Android applications are to be shown: true exactly when there
-    is a \c /usr/sbin/apkd, the daemon of the Android support. Looked up on every read. A binding
-    does not follow: an installation or removal shows when the property is read again.
+    Whether the data directories of Android applications are to be shown: true exactly when
+    \c /usr/sbin/apkd exists, the daemon of the Android support. It is checked on every read. There
+    is no change signal, so a binding keeps the first value: read the property in a function
+    instead.
 */
 bool AndroidSupport::dataDirectoriesVisible() const
 {

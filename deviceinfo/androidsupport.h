@@ -6,9 +6,7 @@
 
 #include <QObject>
 
-/*
-    Whether the support for Android applications is installed.
-*/
+// Whether the support for Android applications is installed.
 class AndroidSupport : public QObject
 {
     Q_OBJECT

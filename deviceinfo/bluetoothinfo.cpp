@@ -27,10 +27,6 @@ const QLatin1String addressFile("/var/lib/bluetooth/board-address");
     \endqml
 
     \image gallery-bluetooth.png The gallery's page of this type
-
-    \section1 What may surprise
-    \section2 The address is read once
-    It is read when the object is created, because the address of a device does not change.
 */
 
 BluetoothInfo::BluetoothInfo(QObject *parent) : QObject(parent)
@@ -44,8 +40,8 @@ BluetoothInfo::BluetoothInfo(QObject *parent) : QObject(parent)
 
     The address of the Bluetooth adapter in lower case, such as \c{00:1a:7d:da:71:13}. It is the
     first line of \c /var/lib/bluetooth/board-address, which is not validated. The file is read
-    once, when the object is created. Empty, with a warning, if the file cannot be read or the line is
-    larger than 16 MiB.
+    once, when the object is created, because the address does not change. Empty, with a warning, if
+    the file cannot be read or the line is larger than 16 MiB.
 */
 
 void BluetoothInfo::initAdapterAddress()

@@ -6,9 +6,7 @@
 
 #include <QObject>
 
-/*
-    The address of the device's Bluetooth adapter, read once.
-*/
+// The address of the device's Bluetooth adapter, read once.
 class BluetoothInfo : public QObject
 {
     Q_OBJECT

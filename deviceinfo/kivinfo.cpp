@@ -28,14 +28,14 @@ constexpr int ready = 1;
 template<typename Value> Value answer(const QDBusPendingCall &call)
 {
     const QDBusPendingReply<Value> reply = call;
-    // An error first: its message would pass for a text.
+    // The value of an error would be its message.
     return reply.isError() ? Value() : reply.value();
 }
 
 QVariantMap changedProperties(const QDBusMessage &message)
 {
     const QVariant changed = message.arguments().value(1);
-    // Taking a map out of anything else is no failure that QtDBus reports: it crashes.
+    // QtDBus crashes when it reads a map from an argument of another type.
     if (changed.userType() == qMetaTypeId<QDBusArgument>()
         && changed.value<QDBusArgument>().currentSignature() != changedSignature) {
         return {};
@@ -50,15 +50,14 @@ QVariantMap changedProperties(const QDBusMessage &message)
     \inqmlmodule com.marlo.settings.system
     \brief Identifies the smart back cover that is attached to the device.
 
-    Asks the cover daemon when it is created, and follows its \c PropertiesChanged signal from then
-    on, also when the daemon starts only later. (A signal that a daemon sends in the very moment of
-    its start may be missed.) Without the daemon, or if it answers with an error, the properties
-    keep their defaults; nothing is logged.
+    The object asks the cover daemon when it is created, and then follows its
+    \c PropertiesChanged signal, even if the daemon starts later. A signal that a daemon sends at
+    the moment of its start may be missed. Without the daemon, or after an error, the properties
+    keep their defaults. Nothing is logged.
 
-    The daemon is the service \c com.marlo.kivd on the system bus. It is asked with the method
-    \c Get of \c org.freedesktop.DBus.Properties at the path \c /com/marlo/kivd, for properties of
-    the interface \c com.marlo.kivd. Its answers have to be bare values, a string and a 32-bit
-    integer: a value of any other type, wrapped in a D-Bus variant too, counts as an error.
+    The daemon is the service \c com.marlo.kivd on the system bus. The object calls the method \c
+    Get of \c org.freedesktop.DBus.Properties at the path \c /com/marlo/kivd, for properties of the
+    interface \c com.marlo.kivd.
 
     \qml
     Label {
@@ -72,19 +71,18 @@ QVariantMap changedProperties(const QDBusMessage &message)
 
     \section1 What may surprise
     \section2 Only values of the exact type count
-    The daemon answers with a bare string and a bare 32-bit integer. Any other type, a D-Bus variant
-    too, counts as an error, and the property has its default until the daemon's next signal. Only
-    the number 1 means ready.
+    The daemon replies with a bare string and a bare 32-bit integer. Any other type, even a D-Bus
+    variant, counts as an error. Only the number 1 means ready.
 
-    \section2 A late answer wins
-    An answer to the first question that arrives after a change signal replaces the value of the
-    signal. The next signal corrects it. A property that a signal merely invalidates keeps its
-    value. The signal counts for whatever interface it names: the daemon has only one.
+    \section2 A late reply wins
+    A reply to the first call that arrives after a change signal replaces the value of the signal.
+    The next signal corrects it. A property that a signal only invalidates keeps its value. The
+    interface that a signal names does not matter: the daemon has only one.
 */
 
 KivInfo::KivInfo(QObject *parent) : QObject(parent)
 {
-    // Plain messages: an interface object would wait for the daemon to describe itself.
+    // Not QDBusInterface, which would wait for the daemon.
     connect(get(idProperty), &QDBusPendingCallWatcher::finished, this, &KivInfo::slotIdFinished);
     connect(get(readyProperty), &QDBusPendingCallWatcher::finished, this,
             &KivInfo::slotReadyFinished);
@@ -104,24 +102,15 @@ KivInfo::KivInfo(QObject *parent) : QObject(parent)
     \qmlproperty bool KivInfo::kivReady
     \readonly
 
-    Whether the daemon is ready: its property \c Ready is 1. False until it has answered, and
-    without a daemon.
+    Whether the daemon is ready: its property \c Ready is 1.
 */
 
 /*!
     \qmlsignal KivInfo::kivIdChanged()
-
-    Emitted after \l kivId has changed; before kivReadyChanged() if both change at once.
-*/
-
-/*!
     \qmlsignal KivInfo::kivReadyChanged()
 
-    Emitted after \l kivReady has changed.
+    Emitted after the property has changed, kivIdChanged() first if both have changed.
 */
-
-// A reply overwrites the value of a signal that came before it. Each was right when it was sent, and
-// the next signal corrects the value.
 
 void KivInfo::slotIdFinished(QDBusPendingCallWatcher *watcher)
 {
@@ -144,7 +133,7 @@ void KivInfo::propertiesChanged(const QDBusMessage &message)
     }
     const auto readiness = changed.constFind(readyProperty);
     if (readiness != changed.constEnd()) {
-        // As the widest integer: a number that is too large for a smaller one would wrap around.
+        // A number that is too large for an int would wrap around.
         setKivReady(readiness->toLongLong() == ready);
     }
 }

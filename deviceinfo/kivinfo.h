@@ -9,10 +9,7 @@
 class QDBusMessage;
 class QDBusPendingCallWatcher;
 
-/*
-    The smart back cover that is attached to the device, as the cover daemon on the system bus reports
-    it: read once, and followed from then on.
-*/
+// The smart back cover that is attached to the device, as the cover daemon reports it.
 class KivInfo : public QObject
 {
     Q_OBJECT

@@ -21,8 +21,7 @@ const QLatin1String mlsEntry("mls/enabled");
 const QLatin1String mlsOnlineEntry("mls/online_enabled");
 const QLatin1String hereEntry("here/enabled");
 
-// The states of an online service. The platform's library may use other names for them, but the
-// numbers are always the same.
+// The platform's library may use other names for the states, but the numbers are always the same.
 using State = LocationSettings::OnlineAGpsState;
 constexpr auto unavailable = State(0);
 constexpr auto disabled = State(1);
@@ -63,9 +62,9 @@ QString agreementText(QLatin1String base)
     \inqmlmodule com.marlo.settings.system
     \brief Switches the location services, and saves and restores the user's own choice.
 
-    The switches themselves, \l gpsEnabled, \l mlsEnabled, \l mlsOnlineState and \l hereState, are
-    those of the platform's location settings. A device's own library implements them. Without such
-    a library they are stored in dconf, and every process sees the same values.
+    The switches \l gpsEnabled, \l mlsEnabled, \l mlsOnlineState and \l hereState are those of the
+    platform's location settings, which a device's own library implements. Without such a library
+    the module stores them in dconf, and every process sees the same values.
 
     \qml
     Switch {
@@ -87,25 +86,18 @@ QString agreementText(QLatin1String base)
     \section1 What may surprise
     \section2 Services that were not saved are switched off
     restoreCustomSettings() switches off every service that the saved settings do not contain, even
-    if nothing was ever saved: location services are on only if the user wanted them.
-
-    \section2 A service without consent stays as it is
-    State 0 means that the user has not agreed to the terms. restoreCustomSettings() neither changes
-    this state nor sets it: only the user can agree.
+    if nothing was ever saved: location services are on only if the user wanted them. A service that
+    the user has not agreed to keeps its state: only the user can agree.
 
     \section2 customSettingsEnabled does not change by itself
-    It is read when the object is created. Later changes of the dconf key have no effect on it.
-    Saving and restoring do not change it, and changing it neither saves nor restores: the page
-    decides what the flag means.
+    It is read when the object is created and does not follow the dconf key. Saving and restoring do
+    not change it, and changing it neither saves nor restores.
 
     \section2 The English agreement does not replace one that cannot be opened
-    If there is no file in the user's language, the English one is read, after a warning. If the
-    file exists but cannot be opened, the text is a translated message which says that there is no
-    agreement. The English file is not read then: it would not be the text that this user agrees to.
+    It would not be the text that this user agrees to.
 
     \section2 The agreement texts have no change signal
-    They are read from their files on every read, so a binding keeps the first text. Read them in a
-    function to get the current one.
+    Their files are read on every read, so a binding keeps the first text. Read them in a function.
 */
 
 LocationConfiguration::LocationConfiguration(QObject *parent)
@@ -122,8 +114,7 @@ LocationConfiguration::LocationConfiguration(QObject *parent)
     \c{/usr/share/libherepositioning/agreements/here_consent_<locale>.txt}, where \c{<locale>} is
     the default locale, such as \c fi_FI. If there is no such file, the text of \c en_GB is used and
     a warning is logged. If the file cannot be read or is larger than 16 MiB, the text is the
-    translation of \c settings_location-la-no_agreement_text_found. The file is read whenever the
-    property is read.
+    translation of \c settings_location-la-no_agreement_text_found.
 */
 QString LocationConfiguration::hereAgreementText() const
 {
@@ -146,8 +137,7 @@ QString LocationConfiguration::mlsOnlineAgreementText() const
     \qmlproperty bool LocationConfiguration::customSettingsEnabled
 
     Whether the user has set each switch individually. Stored in
-    \c /settings/location/custom_settings_enabled (dconf, bool); false if that was never set. The
-    key is read only when the object is created.
+    \c /settings/location/custom_settings_enabled (dconf, bool). False by default.
 */
 void LocationConfiguration::setCustomSettingsEnabled(bool enabled)
 {
@@ -163,7 +153,7 @@ void LocationConfiguration::setCustomSettingsEnabled(bool enabled)
 
     Stores the current values of the switches in \c /settings/location/custom_settings (dconf,
     dictionary of \c gps/enabled, \c mls/enabled, \c mls/online_enabled and \c here/enabled, all
-    bool). They replace the values that were saved before.
+    bool).
 */
 void LocationConfiguration::saveCustomSettings()
 {
@@ -179,9 +169,7 @@ void LocationConfiguration::saveCustomSettings()
 /*!
     \qmlmethod void LocationConfiguration::restoreCustomSettings()
 
-    Sets the switches to what saveCustomSettings() stored last, in this or in any other process. A
-    switch that was not stored is switched off. An online service that the user has not agreed to
-    stays as it is.
+    Sets the switches to what saveCustomSettings() stored last, in this or any other process.
 */
 void LocationConfiguration::restoreCustomSettings()
 {
@@ -199,70 +187,38 @@ void LocationConfiguration::restoreCustomSettings()
 
 /*!
     \qmlproperty bool LocationConfiguration::gpsEnabled
-
-    Whether the satellite receiver is switched on. If the module stores the switches itself, the
-    value is in \c /settings/location/gps_enabled (dconf, bool), and false if that was never set.
-*/
-
-/*!
     \qmlproperty bool LocationConfiguration::mlsEnabled
 
-    Whether the MLS network positioning is switched on. If the module stores the switches itself,
-    the value is in \c /settings/location/mls_enabled (dconf, bool), and false if that was never
-    set.
+    Whether the satellite receiver and the MLS network positioning are switched on. The module
+    stores them in \c /settings/location/gps_enabled and \c /settings/location/mls_enabled (dconf,
+    bool). False by default.
 */
 
 /*!
     \qmlproperty enumeration LocationConfiguration::mlsOnlineState
+    \qmlproperty enumeration LocationConfiguration::hereState
 
-    The state of the online assistance of MLS:
+    The states of the online assistance of MLS and of the HERE positioning service:
 
     \value LocationConfiguration.OnlineAGpsNotAgreed The user has not agreed to the terms (0).
     \value LocationConfiguration.OnlineAGpsDisabled The user has agreed; it is switched off (1).
     \value LocationConfiguration.OnlineAGpsEnabled It is switched on (2).
 
-    A device's own library may use other names for the states, but the numbers are always the same.
-    Pages that must run on every device use the numbers.
+    A device's own library may use other names for the states. Pages that must run on every device
+    use the numbers.
 
-    If the module stores the switches itself, the state is in
-    \c /settings/location/mls_online_state (dconf, 32-bit integer). It is 0 if that was never set or
-    has any other value. Setting the property to any other number changes nothing and gives a
-    warning.
-*/
-
-/*!
-    \qmlproperty enumeration LocationConfiguration::hereState
-
-    The state of the HERE positioning service, like \l mlsOnlineState for MLS. If the
-    module stores the switches itself, the state is in \c /settings/location/here_state.
+    The module stores the states in \c /settings/location/mls_online_state and
+    \c /settings/location/here_state (dconf, 32-bit integer). Any other value counts as 0. Setting
+    another number changes nothing and gives a warning.
 */
 
 /*!
     \qmlsignal LocationConfiguration::gpsEnabledChanged()
-
-    Emitted after \l gpsEnabled has changed, here or in another process.
-*/
-
-/*!
     \qmlsignal LocationConfiguration::mlsEnabledChanged()
-
-    Emitted after \l mlsEnabled has changed, here or in another process.
-*/
-
-/*!
     \qmlsignal LocationConfiguration::mlsOnlineStateChanged()
-
-    Emitted after \l mlsOnlineState has changed, here or in another process.
-*/
-
-/*!
     \qmlsignal LocationConfiguration::hereStateChanged()
-
-    Emitted after \l hereState has changed, here or in another process.
-*/
-
-/*!
     \qmlsignal LocationConfiguration::customSettingsEnabledChanged()
 
-    Emitted after \l customSettingsEnabled has changed.
+    Emitted after the property has changed; all but customSettingsEnabledChanged() also after a
+    change in another process.
 */

@@ -6,10 +6,8 @@
 
 #include "locationsettings.h"
 
-/*
-    The location switches of the platform, together with a set of them that the user has chosen,
-    which can be saved and restored, and the texts that the user agrees to.
-*/
+// The location switches of the platform, a set of them that the user saves and restores, and the
+// texts that the user agrees to.
 class LocationConfiguration : public LocationSettings
 {
     Q_OBJECT

@@ -28,11 +28,6 @@ const QLatin1String variantKey("variant");
     \endqml
 
     \image gallery-modem.png The gallery's page of this type
-
-    \section1 What may surprise
-    \section2 A binding does not notice an update
-    \l variant is read from its file on every read and has no change signal, so a binding keeps the
-    first value. Read it in a function to get the current one.
 */
 
 ModemFeatureReader::ModemFeatureReader(QObject *parent) : QObject(parent)
@@ -44,9 +39,11 @@ ModemFeatureReader::ModemFeatureReader(QObject *parent) : QObject(parent)
     \readonly
 
     The key \c variant of \c /usr/share/modem-software/features.ini, before the first section or in
-    the section \c General. Every read of the property reads the file again. The value is empty if
-    there is no such file or key, if an unquoted comma makes the value a list, or if the file is
-    larger than 1 MiB or has a value that QSettings would unpack.
+    the section \c General. Empty if there is no such file or key, if an unquoted comma makes the
+    value a list, or if the file is larger than 1 MiB or has a value that QSettings would unpack.
+
+    Every read of the property reads the file. There is no change signal, so a binding keeps the
+    first value: read the property in a function instead.
 */
 QString ModemFeatureReader::variant() const
 {

@@ -6,9 +6,7 @@
 
 #include <QObject>
 
-/*
-    The variant of the modem software that the device carries. QML knows it as ModemFeatures.
-*/
+// The variant of the modem software on the device. The QML type is ModemFeatures.
 class ModemFeatureReader : public QObject
 {
     Q_OBJECT

@@ -81,7 +81,7 @@ QStringList readTerms(const QString &base, const QString &localeName)
 
     Terms are UTF-8 text files named by locale. For the locale name \c fi_FI.UTF-8 the type reads
     the first of \c fi_FI.UTF-8.txt, \c fi.txt and \c fi_FI.txt that exists; for \c fi_FI, which has
-    no encoding, \c fi_FI.txt or \c{fi.txt}. If none exists, it warns and reads British English,
+    no encoding, \c fi_FI.txt or \c{fi.txt}. Otherwise it warns and reads British English,
     \c{en_GB.txt} or \c{en.txt}.
 
     The first line of a file is the title, and everything after it is the body. White space around
@@ -102,14 +102,11 @@ QStringList readTerms(const QString &base, const QString &localeName)
 
     \section1 What may surprise
     \section2 The language goes before the country
-    For \c fi_FI.UTF-8 the file \c fi.txt is preferred to \c{fi_FI.txt}, which is tried last. For \c
-    fi_FI, without an encoding, \c{fi_FI.txt} comes first. Terms are installed by language, and
-    vendors rely on the order.
+    Terms are installed by language, and vendors rely on the order of the files.
 
     \section2 Vendor terms without a path
-    The vendor methods do not check \c vendorPath. Without one they search below the root of the
-    file system, find nothing, and return an empty list after warnings. Check \l hasVendorTermsOfUse
-    first. Its change signal is emitted when \c vendorPath changes, not when the directory does.
+    The vendor methods do not check \l vendorPath. Without one they search below the root of the
+    file system and return an empty list after warnings. Check \l hasVendorTermsOfUse first.
 */
 
 TermsOfUseManager::TermsOfUseManager(QObject *parent) : QObject(parent)
@@ -120,7 +117,8 @@ TermsOfUseManager::TermsOfUseManager(QObject *parent) : QObject(parent)
     \qmlproperty bool TermsOfUseManager::hasVendorTermsOfUse
     \readonly
 
-    Whether \l vendorPath is set and exists. Every read checks it again.
+    Whether \l vendorPath is set and exists. Every read checks it again, but the change signal is
+    emitted only when \l vendorPath changes.
 */
 bool TermsOfUseManager::hasVendorTermsOfUse() const
 {
@@ -130,8 +128,7 @@ bool TermsOfUseManager::hasVendorTermsOfUse() const
 /*!
     \qmlproperty string TermsOfUseManager::vendorPath
 
-    The directory of the vendor's terms. It contains a directory \c full with the full terms and a
-    directory \c summary with their summaries. Empty by default.
+    The directory of the vendor's terms. Empty by default.
 */
 void TermsOfUseManager::setVendorPath(const QString &path)
 {
@@ -156,8 +153,8 @@ QStringList TermsOfUseManager::platformTermsOfUse(const QString &localeName) con
 /*!
     \qmlmethod list<string> TermsOfUseManager::vendorTermsOfUse(string localeName)
 
-    Returns the title and the body of the vendor's full terms for \a localeName, from the directory
-    \c full below \l vendorPath, in the same way as platformTermsOfUse().
+    Like platformTermsOfUse(), for the vendor's full terms in the directory \c full below
+    \l vendorPath, in the language of \a localeName.
 */
 QStringList TermsOfUseManager::vendorTermsOfUse(const QString &localeName) const
 {
@@ -167,8 +164,8 @@ QStringList TermsOfUseManager::vendorTermsOfUse(const QString &localeName) const
 /*!
     \qmlmethod list<string> TermsOfUseManager::vendorTermsSummary(string localeName)
 
-    Returns the title and the body of the summary of the vendor's terms for \a localeName, from the
-    directory \c summary below \l vendorPath, in the same way as platformTermsOfUse().
+    Like platformTermsOfUse(), for the summary of the vendor's terms in the directory \c summary
+    below \l vendorPath, in the language of \a localeName.
 */
 QStringList TermsOfUseManager::vendorTermsSummary(const QString &localeName) const
 {

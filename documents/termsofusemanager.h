@@ -7,10 +7,7 @@
 #include <QObject>
 #include <QStringList>
 
-/*
-    The terms of use in the user's language: those of the platform and those of the device's vendor,
-    each as a title and a body.
-*/
+// The terms of use of the platform and of the device's vendor in the user's language.
 class TermsOfUseManager : public QObject
 {
     Q_OBJECT

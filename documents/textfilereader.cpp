@@ -51,8 +51,8 @@ QString readText(const QString &path, qint64 *maximumSize)
 
     \section1 What may surprise
     \section2 Lines run together
-    The line breaks of a file are dropped without a replacement: pages wrap the text to their own
-    width. To separate its lines, a text ends them with a blank.
+    The line breaks of a file are removed: pages wrap the text to their own width. To separate its
+    lines, a text ends them with a blank.
 
     \section2 Files that cannot be read are silent
     They read as empty, and collate() skips them. If nothing is left, collate() returns an empty
@@ -66,10 +66,9 @@ TextFileReader::TextFileReader(QObject *parent) : QObject(parent)
 /*!
     \qmlmethod string TextFileReader::readContent(string filePath)
 
-    Returns the text of the file \a filePath, a local path and no URL, without its line breaks: the
-    lines follow each other with nothing in between. The text is empty if the file cannot be read, is
-    no regular file or is larger than 16 MiB; nothing is logged. The encoding is that of the system's
-    locale, unless a byte-order mark says otherwise.
+    Returns the text of the file \a filePath, a local path and not a URL, without its line breaks.
+    The text is empty if the file cannot be read, is not a regular file or is larger than 16 MiB.
+    The encoding is that of the system's locale, unless the file has a byte-order mark.
 */
 QString TextFileReader::readContent(const QString &filePath) const
 {
@@ -80,16 +79,16 @@ QString TextFileReader::readContent(const QString &filePath) const
 /*!
     \qmlmethod string TextFileReader::collate(url directory, string separator, string prefix)
 
-    Returns \a prefix and after it the texts of all files of the local directory \a directory, as
-    readContent() gives them, with \a separator between each two. The files are taken in the order
-    of their names, upper case before lower case. Left out are hidden files, directories, files without
-    text, and each file with which all would be larger than 16 MiB together. The text is empty if no
-    file has any, or if \a directory is no local directory.
+    Returns \a prefix and the texts of all files of the local directory \a directory, as
+    readContent() reads them, with \a separator between them. The files are sorted by name, upper
+    case before lower case. Hidden files, directories, files without text, and each file with which
+    all would be larger than 16 MiB together are left out. The text is empty if no file has any, or
+    if \a directory is not a local directory.
 */
 QString TextFileReader::collate(const QUrl &directory, const QString &separator,
                                 const QString &prefix) const
 {
-    // Without a path QDir would list the current directory, and of a NUL Qt warns.
+    // Without a path QDir would list the current directory. Qt warns about a NUL.
     const QString path = directory.toLocalFile();
     if (path.isEmpty() || path.contains(QChar::Null)) {
         return {};

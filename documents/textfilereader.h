@@ -8,9 +8,7 @@
 
 class QUrl;
 
-/*
-    Reads plain text files for QML: one file, or all files of a directory.
-*/
+// Reads plain text files for QML: one file, or all files of a directory.
 class TextFileReader : public QObject
 {
     Q_OBJECT

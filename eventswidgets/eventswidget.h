@@ -6,10 +6,7 @@
 
 #include <QString>
 
-/*
-    An events widget as a definition file describes it, and how it stands with the user and the
-    device. Its path is its identity.
-*/
+// An events widget as a definition file describes it, and its state. The path is its identity.
 struct EventsWidget {
     QString file; // The definition file, absolute.
     QString title; // Shown where translationId has no translation.
@@ -24,11 +21,10 @@ struct EventsWidget {
     bool defaultEnabled = false; // While the user has not chosen.
     bool available = false; // As isAvailable() found it last.
 
-    // Whether there is now a file at availablePath; always if that is empty.
+    // Whether a file exists at availablePath now; always if that is empty.
     bool isAvailable() const;
 
-    // Ignores file and translationCatalog on purpose: a view shows the same widget if it moves to
-    // another file or its file names another catalog, so that is not reported as a change.
+    // Ignores file and translationCatalog on purpose: a change of these is no change of a row.
     bool operator!=(const EventsWidget &other) const;
 };
 

@@ -9,26 +9,23 @@
 #include <optional>
 #include <vector>
 
-// A widget takes a few hundred bytes of a file, and two containers are enough for a file of one. The
-// main thread reads the file, and QJsonDocument takes up to 16 bytes per byte of it and 160 per
-// container: files with more than this are invalid.
+// The limits of a file, in bytes and in objects and arrays: QJsonDocument takes up to 16 bytes per
+// byte of the file and 160 per container.
 constexpr qint64 maximumEventsWidgetsSize = qint64(32) * 1024 * 1024;
 constexpr int maximumContainers = 1000000;
 
-// Whether a text has more objects and arrays than the limit. Brackets in strings are counted, too.
+// Whether a text has too many objects and arrays. Brackets in strings are counted, too.
 bool isTooComplex(const QByteArray &json);
 
-/*
-    The content of a definition file of events widgets: a value that needs no model.
-*/
+// The content of a definition file of events widgets.
 struct EventsWidgetsFile {
     QString translationCatalog; // May be empty.
     // In the order of the file. Only a model knows which ones are enabled.
     std::vector<EventsWidget> widgets;
 };
 
-// Nothing if the file cannot be read or is not a definition file. This, and every entry that is not a
-// widget, is logged as a warning. The other entries are read.
+// Nothing if the file cannot be read or is not a definition file. This, and every entry that is not
+// a widget, is logged as a warning. The other entries are read.
 std::optional<EventsWidgetsFile> readEventsWidgetsFile(const QString &path);
 
 #endif

@@ -37,11 +37,10 @@ QString translation(const QString &id, const QString &fallback)
     \brief Lists the widgets of the events screen.
 
     Packages offer widgets by installing a definition file, \c{*.json}, into
-    \c /usr/share/glimmera/eventswidgets; \l{marlo-eventswidgets(5)} describes it.
-    The model lists all of them and follows the directory and the user's choice,
+    \c /usr/share/glimmera/eventswidgets; \l{marlo-eventswidgets(5)} describes the format. The model
+    lists all of them. It follows the directory and the user's choice,
     \c /desktop/glimmera-marlo-home/events_screen_widgets (dconf, list of strings): the paths of the
-    enabled widgets. While the user has chosen nothing, each widget is enabled or not by its own
-    default.
+    enabled widgets. Until the user makes a choice, each widget is enabled by its own default.
 
     The roles of a row:
 
@@ -50,18 +49,18 @@ QString translation(const QString &id, const QString &fallback)
     \row \li \c title \li string \li The title in the user's language, or the untranslated one.
     \row \li \c description \li string \li The description in the user's language; empty without a
          translation.
-    \row \li \c icon \li string \li As in the definition file: a URL such as \c{image://theme/lamp}, an
-         absolute path, before which an image needs \c{file://}, or the name of an icon of the
-         theme.
-    \row \li \c path \li string \li As in the definition file: the widget's identity, which
+    \row \li \c icon \li string \li The value in the definition file: a URL such as
+         \c{image://theme/lamp}, an absolute path, or the name of an icon of the theme. To show a
+         path in an Image, prepend \c{file://}.
+    \row \li \c path \li string \li The value in the definition file: the widget's identity, which
          enableWidget() and disableWidget() take.
     \row \li \c enabled \li bool \li Whether the widget is enabled.
-    \row \li \c available \li bool \li Whether the file that the widget needs is there, see
+    \row \li \c available \li bool \li Whether the file that the widget needs exists, see
          updateAvailable().
     \endtable
 
-    A widget takes its place by its order when it is first listed and keeps it. A definition file
-    that cannot be read is passed over with a warning, as is each entry that is no widget.
+    A definition file that cannot be read is skipped with a warning, as is each entry that is not a
+    widget.
 
     \qml
     Repeater {
@@ -75,34 +74,27 @@ QString translation(const QString &id, const QString &fallback)
     }
     \endqml
 
-    \note Handlers may call any method of the model. While rows are being changed, requests wait until
-    control returns to the event loop. The model then runs each kind of update at most once and
-    applies the choices (enableWidget(), disableWidget()) in the order of the calls.
+    \note Handlers may call any method of the model. While rows are being changed, requests wait
+    until control returns to the event loop. The model then runs each kind of update at most once
+    and applies the choices (enableWidget(), disableWidget()) in the order of the calls.
 
     \image gallery-events-widgets.png The gallery's page of this type
 
     \section1 What may surprise
     \section2 The first choice enables everything else
-    Until the user makes a choice, widgets are enabled by their own default. The first
-    enableWidget() or disableWidget() writes a list of every known widget, plus or minus this one,
-    also of those whose default is off. From then on only the list counts. A page that wants to keep
-    the defaults writes the list before.
+    The first enableWidget() or disableWidget() stores a list of every known widget, plus or minus
+    this one, even of those whose default is off. From then on only the list counts. A page that
+    wants to keep the defaults writes the list first.
 
     \section2 A widget keeps its place
-    The \c order of a widget places it when it is first listed. A changed order moves nothing until
-    the model is created again, because rows do not jump under the user's finger. A new widget with
-    an order is placed before the first row of a higher order. Rows without an order do not count as
-    higher, so it may be placed after them.
+    The \c order of a widget places it when it is first listed: before the first row of a higher
+    order, or at the end. Rows without an order do not count as higher. A changed order moves
+    nothing until the model is created again, because rows must not move while the user taps them.
 
     \section2 Availability is checked only on request
-    The model checks whether a widget's file exists when it reads the definition files, and
-    otherwise when a page calls updateAvailable(). The files may be anywhere, and watching them all
-    would cost more than it gives. A widget that is not available stays listed, so that a page can
-    say so.
-
-    \section2 directoryChanged() and enabledWidgetsChanged() are methods
-    They have names of signals, but a page calls them to make the model read the files or the list
-    again.
+    The model checks whether a widget's file exists when it reads the definition files, and when a
+    page calls updateAvailable(). The files may be anywhere, and watching them all would cost more
+    than it gives. A widget that is not available stays listed, so that a page can say so.
 
     \section2 Catalogs stay
     The catalogs of a file that is removed, or that names another one, remain in use until the model
@@ -185,11 +177,8 @@ void EventsWidgetsModel::componentComplete()
 /*!
     \qmlmethod void EventsWidgetsModel::enableWidget(string path)
 
-    Adds the widget \a path at the end of the user's list, even if it is in there. The model follows
-    once dconf reports the change.
-
-    The first choice of all turns the defaults into a list of the user's own, in which every known
-    widget is enabled.
+    Adds the widget \a path at the end of the user's list, even if the list already contains it. The
+    rows change once dconf reports the change.
 */
 void EventsWidgetsModel::enableWidget(const QString &path)
 {
@@ -200,11 +189,8 @@ void EventsWidgetsModel::enableWidget(const QString &path)
 /*!
     \qmlmethod void EventsWidgetsModel::disableWidget(string path)
 
-    Takes the widget \a path out of the user's list, however often it is in there. The model follows
-    once dconf reports the change.
-
-    The first choice of all turns the defaults into a list of the user's own, in which every known
-    widget but this is enabled.
+    Removes every entry of the widget \a path from the user's list. The rows change once dconf
+    reports the change.
 */
 void EventsWidgetsModel::disableWidget(const QString &path)
 {
@@ -218,8 +204,8 @@ void EventsWidgetsModel::disableWidget(const QString &path)
 /*!
     \qmlmethod void EventsWidgetsModel::directoryChanged()
 
-    Reads the definition files again. The model does so itself whenever the directory changes or a
-    file in it has been written.
+    Reads the definition files again. This is not a signal: the model calls it when the directory
+    changes or a file in it has been written, and a page may do so at any time.
 */
 void EventsWidgetsModel::directoryChanged()
 {
@@ -244,7 +230,7 @@ void EventsWidgetsModel::directoryChanged()
 /*!
     \qmlmethod void EventsWidgetsModel::enabledWidgetsChanged()
 
-    Reads the user's list again. The model does so itself whenever dconf reports a change.
+    Reads the user's list again. Like directoryChanged(), this is not a signal.
 */
 void EventsWidgetsModel::enabledWidgetsChanged()
 {
@@ -274,9 +260,8 @@ void EventsWidgetsModel::enabledWidgetsChanged()
 /*!
     \qmlmethod void EventsWidgetsModel::updateAvailable()
 
-    Rechecks whether each widget's \c available_path exists. Call this when the widgets are about to be
-    shown, or when a file that they need may have been installed or removed: the model itself checks
-    only when it reads the definition files.
+    Rechecks whether each widget's \c available_path exists. Call this when the widgets are about to
+    be shown, or when such a file may have been installed or removed.
 */
 void EventsWidgetsModel::updateAvailable()
 {
@@ -372,8 +357,7 @@ void EventsWidgetsModel::insertWidget(int row, const Widget &widget)
 
 void EventsWidgetsModel::updateWidget(int row, const Widget &widget)
 {
-    // The row keeps its place, on purpose, even if its order changes: rows must not jump while the
-    // user looks at them.
+    // The row keeps its place, on purpose, even if its order changes.
     m_rows[row] = widget;
     Q_EMIT dataChanged(index(row), index(row));
 }
@@ -390,8 +374,8 @@ void EventsWidgetsModel::removeStaleRows(const QSet<QString> &paths)
             continue;
         }
         beginRemoveRows({}, row, row);
-        // Deliberately without effect: the users of the catalogs are file names, and this is a path.
-        // Catalogs are only added; their texts remain until the model is destroyed.
+        // Deliberately without effect, because the users of the catalogs are file names and this is
+        // a path: texts that are still on the screen keep their translation.
         m_catalogs.removeDefinition(m_rows.at(row).file, m_rows.at(row).translationCatalog);
         m_rows.removeAt(row);
         endRemoveRows();

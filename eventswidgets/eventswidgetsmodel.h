@@ -19,12 +19,7 @@
 
 struct EventsWidget;
 
-/*
-    The widgets that packages offer for the events screen, and which of them the user has enabled.
-
-    Reads the definition files in /usr/share/glimmera/eventswidgets and follows that directory and
-    the user's list in dconf.
-*/
+// The widgets that packages offer for the events screen, and which of them the user has enabled.
 class EventsWidgetsModel : public QAbstractListModel, public QQmlParserStatus
 {
     Q_OBJECT
@@ -75,7 +70,7 @@ private:
     DirectoryWatcher m_watcher;
     MGConfItem m_enabledItem;
     // The value of the key. Without a value, the paths of all widgets, on purpose: the user's first
-    // choice stores them, so that every other widget is enabled from then on, whatever its default.
+    // choice stores them.
     QStringList m_enabledList;
     // True while the key has no value; an empty list is a choice.
     bool m_defaults = false;

@@ -27,8 +27,7 @@ public:
         }
     }
 
-    // An unknown role counts as role 0, on purpose: as matchRole it takes every row, as role it reads
-    // the model's display role.
+    // Role 0 counts as unknown, on purpose.
     bool isKnown() const { return m_role != noRole; }
 
     QVariant value(const QModelIndex &index) const
@@ -77,14 +76,14 @@ void forEachObject(QVariant *value, const std::function<void(QObject *, QVariant
     \inqmlmodule com.marlo.settings.system
     \brief Joins one role of the rows of a list model into a sentence.
 
-    The texts of \l role, of all rows or of those whose \l matchRole has the value \l match, are at
-    hand as a list, \l values, and joined in the way of the user's language, \l value: in English
-    "Clock, Weather, and Calendar". They follow rows that are inserted, removed or changed and a
-    reset of the model; they do not follow rows that are moved.
+    \l values has the texts of \l role, of all rows or of those whose \l matchRole has the value
+    \l match. \l value joins them as the user's language does, in English "Clock, Weather, and
+    Calendar". They follow rows that are inserted, removed or changed and a reset of the model.
 
     \l role and \l matchRole are role paths: the name of a role, or that followed by names of
     properties, joined by dots, such as \c "contact.name.first" for a role that holds objects. A
-    property that an object lacks has no value; a step from something that is no object is left out.
+    property that an object lacks has no value. A step from a value that is not an object is
+    skipped, so one path serves rows that hold an object and rows that hold its text.
 
     \qml
     Label {
@@ -103,29 +102,23 @@ void forEachObject(QVariant *value, const std::function<void(QObject *, QVariant
 
     \section1 What may surprise
     \section2 A model cannot be cleared
-    Setting \l model to null logs a warning and keeps the old model: a page that is being closed
-    keeps the sentence that it shows. A model that is destroyed is removed.
+    Setting \l model to null logs a warning and keeps the old model, so that a page that is being
+    closed keeps its sentence. A model that is destroyed is removed.
 
     \section2 An unknown matchRole takes every row
-    An unknown \l role reads the display role. A view may be set up before the model has its roles.
-    The role with the number 0 counts as unknown here. It is the first role of many list models,
-    such as \c title of QuickActionsModel.
+    An unknown \l role reads the display role, because a view may be set up before the model has its
+    roles. The role with the number 0 counts as unknown. It is the first role of many list models,
+    such as \c title of QuickActionsModel and the roles of a QML \c ListModel.
 
     \section2 Moved rows are not noticed
-    The view follows rows that are inserted, removed or changed, and a reset. After a move or a new
-    layout call update().
+    After a move or a new layout call update().
 
     \section2 A new language is not noticed
-    \l value uses the list format of the locale at the time of reading, and \l values has the texts
-    of the last update. Neither reports a change of the language: the engine evaluates the texts of
-    its pages again.
+    \l value uses the list format of the default locale at the time of reading, and \l values has
+    the texts of the last update. The engine evaluates the texts of its pages again after a change.
 
     \section2 Empty texts count
-    A row without text gives an empty text in \l values and \l value. Exclude such rows with \l
-    matchRole.
-
-    \section2 A step from a value that is no object is skipped
-    One role path therefore serves rows that hold an object and rows that hold its text.
+    A row without text gives an empty text. Exclude such rows with \l matchRole.
 */
 
 TitlesView::TitlesView(QObject *parent) : QObject(parent)
@@ -136,8 +129,7 @@ TitlesView::TitlesView(QObject *parent) : QObject(parent)
     \qmlproperty object TitlesView::model
 
     The model that is read, a \c QAbstractListModel; null before the first one is set and after a
-    model was destroyed. Anything else is refused with a warning and the model stays. That includes
-    null: a model cannot be cleared.
+    model was destroyed. Anything else is refused with a warning and the model stays.
 */
 QObject *TitlesView::model() const
 {
@@ -174,9 +166,7 @@ void TitlesView::setModel(QObject *model)
 /*!
     \qmlproperty string TitlesView::matchRole
 
-    The role path whose value selects the rows. Empty, the default, takes every row, and so does a
-    role that the model does not have or has under the number 0, as one of the roles of a QML
-    \c ListModel is.
+    The role path whose value selects the rows. Empty, the default, takes every row.
 */
 QString TitlesView::matchRole() const
 {
@@ -195,8 +185,8 @@ void TitlesView::setMatchRole(const QString &matchRole)
 /*!
     \qmlproperty var TitlesView::match
 
-    The value that \l matchRole has to have, or a list of values one of which it has to have. An
-    object that is destroyed becomes null.
+    The value that \l matchRole must have, or a list of the values that it may have. An object that
+    is destroyed becomes null.
 */
 QVariant TitlesView::match() const
 {
@@ -226,8 +216,7 @@ void TitlesView::setMatch(const QVariant &match)
 /*!
     \qmlproperty string TitlesView::role
 
-    The role path whose values are collected. Empty, the default, collects nothing; a role that the
-    model does not have reads the one that is meant for display.
+    The role path whose values are collected. Empty, the default, collects nothing.
 */
 QString TitlesView::role() const
 {
@@ -247,7 +236,7 @@ void TitlesView::setRole(const QString &role)
     \qmlproperty string TitlesView::value
     \readonly
 
-    The texts of \l values as one, joined in the way of the default locale at the time of reading.
+    The texts of \l values, joined as by joined().
 */
 QString TitlesView::value() const
 {
@@ -258,8 +247,7 @@ QString TitlesView::value() const
     \qmlproperty list<string> TitlesView::values
     \readonly
 
-    The texts of the rows that match, in the order of the model. A row without text gives an empty
-    one.
+    The texts of the rows that match, in the order of the model.
 */
 QStringList TitlesView::values() const
 {
@@ -269,7 +257,7 @@ QStringList TitlesView::values() const
 /*!
     \qmlmethod string TitlesView::joined(list<string> list)
 
-    Returns the texts of \a list joined in the way of the default locale.
+    Returns the texts of \a list, joined by the list format of the default locale.
 */
 QString TitlesView::joined(const QStringList &list) const
 {
@@ -279,7 +267,7 @@ QString TitlesView::joined(const QStringList &list) const
 /*!
     \qmlmethod void TitlesView::update()
 
-    Reads the model again, after a change that the view does not follow, such as a move of rows.
+    Reads the model again.
 */
 void TitlesView::update()
 {
@@ -294,33 +282,17 @@ void TitlesView::update()
 
 /*!
     \qmlsignal TitlesView::modelChanged()
-
-    Emitted after \l model has changed, before it is read.
-*/
-
-/*!
     \qmlsignal TitlesView::matchRoleChanged()
-
-    Emitted after \l matchRole has changed, before the model is read again.
-*/
-
-/*!
     \qmlsignal TitlesView::matchChanged()
-
-    Emitted after \l match has changed, before the model is read again.
-*/
-
-/*!
     \qmlsignal TitlesView::roleChanged()
 
-    Emitted after \l role has changed, before the model is read again.
+    Emitted after the property has changed, before the model is read again.
 */
 
 /*!
     \qmlsignal TitlesView::valueChanged()
 
-    Emitted after \l values and with it \l value have changed. A change of the default locale alone
-    is not noticed.
+    Emitted after \l values and with it \l value have changed.
 */
 
 QStringList TitlesView::collect() const

@@ -12,13 +12,8 @@
 
 #include <array>
 
-/*
-    One role of another list model as a list of texts and as a sentence in the user's language, of
-    all rows or of those that match.
-
-    A role path is a role's name, or that and the names of properties to follow into the objects
-    that the role holds, joined by dots.
-*/
+// One role of another list model as a list of texts and as a sentence in the user's language, of
+// all rows or of those that match.
 class TitlesView : public QObject
 {
     Q_OBJECT

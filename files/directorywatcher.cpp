@@ -26,10 +26,7 @@ constexpr uint32_t watchedEvents =
 
 } // namespace
 
-/*
-    The inotify instance of the process. It gives a directory one watch, by whatever path it is
-    reached, until that is removed or the directory ceases to exist; a number is not used again.
-*/
+// The inotify instance of the process. A directory has one watch, whatever path leads to it.
 class Inotify : public QObject
 {
 public:
@@ -91,7 +88,7 @@ int Inotify::add(const QString &directory, DirectoryWatcher *watcher)
 void Inotify::remove(int watch, DirectoryWatcher *watcher)
 {
     if (m_watchers.remove(watch, watcher) > 0 && !m_watchers.contains(watch)) {
-        // Fails if the directory does not exist any more, and its watch with it.
+        // Fails if the directory does not exist any more.
         inotify_rm_watch(m_descriptor, watch);
     }
 }
@@ -138,7 +135,7 @@ DirectoryWatcher::DirectoryWatcher(const QString &directory, const QString &name
     }
     if (m_inotify == nullptr) {
         m_poller = new QFileSystemWatcher(this);
-        // Queued: it goes through its paths as it emits this, and watch() adds paths.
+        // Queued: the poller iterates over its paths as it emits this, and watch() adds paths.
         connect(
             m_poller, &QFileSystemWatcher::directoryChanged, this,
             [this] {
@@ -193,7 +190,7 @@ bool DirectoryWatcher::take(const inotify_event &event)
         const auto next = level + 1;
         const bool isDirectory = next == m_levels.cend();
         if (event.len == 0) {
-            // Of the directory itself. It may have been moved away, removed or unmounted.
+            // The directory itself may have been moved away, removed or unmounted.
             m_pathChanged = true;
             m_entriesChanged = m_entriesChanged || (isDirectory && (event.mask & IN_ATTRIB) != 0);
         } else if (isDirectory) {

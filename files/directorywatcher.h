@@ -17,34 +17,30 @@ class QFileSystemWatcher;
 struct inotify_event;
 
 /*
-    Watches the files of one kind in a directory, whether or not the directory exists yet: a package
-    that installs the first definition file creates its directory as well, and the last package that
-    goes removes it.
+    Watches the files with matching names in a directory that need not exist yet.
 
     changed() reports three events:
-    - an entry of a matching name is added, removed, renamed or given other permissions;
-    - a file of a matching name that was open for writing is closed, which means that it is complete;
+    - an entry is added, removed, renamed or given other permissions;
+    - a file that was open for writing is closed, which means that it is complete;
     - the directory appears, disappears or is replaced, alone or together with a directory above it.
-    Writes to a file outside the directory that a link in it leads to are not noticed.
+    Writes to the target of a link that leads out of the directory are not noticed.
 
-    No event is lost while the watches are set up. They are set from the root downwards, each before
-    the next name is looked up, so that a watch is already in place for whatever gets that name
-    later. A directory that is watched already keeps its watch, and changed() is emitted last: a
-    receiver that reads the directory sees everything that the watches do not report any more.
+    No event is lost while the watches are set up: they are set from the root downwards, each before
+    the next name is looked up, and changed() is emitted last.
 
-    All watchers of a process share one inotify instance, which is kept until the application ends.
-    A user may have only 128 of them, and closing one blocks for more than 10 ms. If no instance is
-    left, QFileSystemWatcher is used instead: it checks once a second, whatever the names are, and does
-    not notice a file that is rewritten in place.
+    All watchers share one inotify instance until the application ends, because a user may have only
+    128 of them and closing one blocks for more than 10 ms. If no instance is left,
+    QFileSystemWatcher is used instead. It checks once a second, ignores the filter, and does not
+    notice a file that is rewritten in place.
 
-    To be used on the main thread.
+    For the main thread only.
 */
 class DirectoryWatcher : public QObject
 {
     Q_OBJECT
 
 public:
-    // The path is absolute. Names match a filter such as "*.conf" as they do for QDir.
+    // Takes an absolute path and a filter such as "*.conf", which works as for QDir.
     DirectoryWatcher(const QString &directory, const QString &nameFilter,
                      QObject *parent = nullptr);
     ~DirectoryWatcher() override;
@@ -56,8 +52,7 @@ Q_SIGNALS:
 private:
     friend class Inotify;
 
-    // The directory or one of its parents: its path, its name in its own parent, and its watch if
-    // it exists.
+    // The directory or one of its parents, with its watch if it exists.
     struct Level {
         QString path;
         QByteArray name;

@@ -45,7 +45,7 @@ int skipComment(const QByteArray &text, int position)
     return skipSpaces(text, position);
 }
 
-// One value, or the elements of a list one after the other, decoded as by QSettings.
+// Reads the elements of a value as QSettings decodes them.
 class ValueReader
 {
 public:
@@ -183,7 +183,7 @@ bool isPackedElement(const QString &element)
 
 bool isPackedValue(const QByteArray &text, int start, int end)
 {
-    // A fast path: nearly every value has neither an "@" nor a backslash, which may encode one.
+    // Nearly every value has neither an "@" nor a backslash, which may encode one.
     const auto value = text.cbegin();
     if (std::none_of(value + start, value + end,
                      [](char character) { return character == '@' || character == '\\'; })) {

@@ -11,25 +11,20 @@ class QString;
 
 constexpr qint64 maximumIniSize = qint64(1024) * 1024;
 
-// QSettings reads the values behind it as UTF-8, and as Latin-1 without.
+// With it, QSettings reads values as UTF-8, otherwise as Latin-1.
 constexpr const char *iniByteOrderMark = "\xef\xbb\xbf";
 
 /*
-    Whether QSettings may read the file. It must never read a file with a value that it would unpack:
-    a few bytes of @Variant(...) or @DateTime(...) make it allocate all memory, or recurse until the
-    stack is full, and end the process. Nor may it open a pipe, which blocks. A file of more than a
-    mebibyte is no settings file.
+    Whether QSettings may read the file: it is regular, not larger than a mebibyte, and has no value
+    that QSettings would unpack. A few bytes of @Variant(...) or @DateTime(...) make it allocate all
+    memory, or recurse until the process ends.
 
-    True also if there is no such file, or if it cannot be opened: QSettings reports that.
+    Also true if the file cannot be opened: QSettings reports that.
 */
 bool isPlainIni(const QString &path);
 
-/*
-    Whether the file is plain, and each of its sections has a name that ends.
-
-    QSettings has an error status for the latter, but only the first time that it reads the file:
-    an unchanged file comes from a cache, without the error.
-*/
+// Whether the file is plain and closes the name of each section. QSettings reports the latter only
+// the first time that it reads a file, and then reads an unchanged file from a cache.
 bool isWellFormedIni(const QString &path);
 
 // A line of a settings file as QSettings reads it: quotes and backslashes may join several lines of
@@ -45,9 +40,8 @@ struct IniLine {
     Kind kind = Kind::None;
     int start = 0;
     int end = 0;
-    // Where the name of a section or of a key ends.
-    int nameEnd = 0;
-    // Whether the name of a section ends on its line. If not, QSettings calls the file broken.
+    int nameEnd = 0; // Of a section or a key.
+    // Whether the name of a section ends on its line.
     bool isClosed = true;
     // Whether QSettings would unpack the value of a key, or an element of a list.
     bool isPacked = false;

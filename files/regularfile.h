@@ -10,16 +10,14 @@
 // The limit of texts that pages show: agreements, terms of use, licences.
 constexpr qint64 maximumTextSize = qint64(16) * 1024 * 1024;
 
-/*
-    The content of a file that somebody else has installed. Reading it neither blocks nor takes more
-    memory than allowed, whatever is there instead: a pipe, a device, a file without end.
-*/
+// The content of a file. Reading it neither blocks nor takes more memory than allowed, even if
+// there is a pipe, a device or a file without end instead.
 struct RegularFile {
     enum class State {
         Read,
-        NotOpened, // There is nothing, or nothing that may be opened.
+        NotOpened,
         NotRegular, // A directory, a pipe, a device.
-        Failed, // While it was read.
+        Failed, // While it was being read.
         TooLarge,
     };
 

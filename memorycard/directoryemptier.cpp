@@ -18,8 +18,7 @@
 
 namespace {
 
-// Besides the directory to empty and the one being opened. A process may have 1024 descriptors at
-// least, and few trees on a card are half as deep.
+// Besides the directory to empty and the one being opened. Few trees on a card are deeper.
 constexpr std::size_t maxOpenDirectories = 55;
 
 // In bytes. Larger blocks gain nothing.
@@ -45,16 +44,14 @@ struct Entry {
     unsigned char type; // a DT_ constant
 };
 
-// The entries of a directory in directory order, each as a type byte and a terminated name: 100,000
-// files take a few MiB. Names are bytes and never pass through an encoding.
+// The entries of a directory in directory order, each as a type byte and a terminated name.
 class Listing
 {
 public:
     void read(DIR *directory, std::string *buffer)
     {
         buffer->clear();
-        // An error ends the listing as the end of the directory does: what is left in the directory
-        // makes its removal fail.
+        // An error ends the listing, too: what is left in the directory makes its removal fail.
         while (const dirent *entry = readdir(directory)) {
             if (std::strcmp(entry->d_name, ".") == 0 || std::strcmp(entry->d_name, "..") == 0) {
                 continue;
@@ -150,8 +147,7 @@ private:
     {
         const Directory &directory = m_path.back();
         const Entry entry = directory.entries.current();
-        // Such a name leads out of the directory. Not every kernel refuses to list it when a card
-        // was made to contain it.
+        // Such a name leads out of the directory. Not every kernel refuses to list it.
         if (std::strchr(entry.name, '/')) {
             finishEntry(false);
             return;
@@ -236,8 +232,7 @@ private:
         m_firstOpen = std::max<std::size_t>(reached, 1);
     }
 
-    // Device and inode identify a directory, whatever was moved meanwhile, unless the inode was
-    // freed and used again.
+    // Device and inode identify a directory, unless the inode was freed and used again.
     bool isSame(const OpenDirectory &stream, const Directory &directory) const
     {
         struct stat info = {};
@@ -246,8 +241,8 @@ private:
     }
 
     dev_t m_device = 0;
-    // From the directory to empty to the one that is worked on. Open are the first one, always, and
-    // those from m_firstOpen on, the last one included.
+    // From the directory to empty to the current one. The first one and those from m_firstOpen on
+    // are open.
     std::deque<Directory> m_path;
     std::size_t m_firstOpen = 1;
     std::string m_buffer;

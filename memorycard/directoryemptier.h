@@ -7,13 +7,13 @@
 class FileDescriptor;
 
 /*
-    Removes everything below a directory that was just opened for reading; the directory itself stays.
+    Removes everything below a directory that was just opened for reading. Returns whether all
+    entries were removed: a failure never stops the walk.
 
-    A failure never stops the walk: it attempts every entry, and returns whether all of them were
-    removed. A directory that cannot be read counts as empty. Links are removed, never followed; a
-    directory on another device stays, which is a failure. Other processes may change the tree
-    meanwhile: the walk never enters what they put in the place of a directory. The depth of the tree
-    and the size of the thread's stack do not matter, and at most 57 descriptors are open at a time.
+    A directory that cannot be read counts as empty. Links are removed, never followed. A directory
+    on another device stays, which is a failure. The walk never enters what other processes put in
+    the place of a directory. The tree may have any depth; at most 57 descriptors are open
+    at a time.
 */
 bool emptyDirectory(FileDescriptor directory);
 

@@ -11,9 +11,7 @@
 
 #include <optional>
 
-/*
-    The calls to the disk service, UDisks2 on the system bus, and the errors that it replies with.
-*/
+// The calls to the disk service, UDisks2 on the system bus, and the errors that it replies with.
 namespace DiskService {
 
 // The calls that mount and unmount a block device, given by its kernel name.

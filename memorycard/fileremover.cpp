@@ -69,8 +69,8 @@ bool isRootDirectory(const struct stat &directory)
         || (root.st_dev == directory.st_dev && root.st_ino == directory.st_ino);
 }
 
-// Whether the directory may be on the device. This cannot be known if the file system has a number of
-// its own (major number 0) instead of that of a block device, nor if the device has no node here.
+// Whether the directory may be on the device. This is unknown if the file system has a number of
+// its own (major number 0) instead of that of a block device, or if the device has no node here.
 bool mayLieOn(const QByteArray &device, const struct stat &directory)
 {
     struct stat node = {};
@@ -78,16 +78,15 @@ bool mayLieOn(const QByteArray &device, const struct stat &directory)
         || major(directory.st_dev) == 0 || directory.st_dev == node.st_rdev;
 }
 
-// Empties the card that is mounted on the directory. Its name is the bytes in the mount table,
-// because their encoding is unknown.
+// Empties the card that is mounted on the directory, whose name has an unknown encoding.
 bool emptyMount(const QByteArray &device, const char *directory)
 {
-    // A relative path is no mount directory, and an empty one would be the current directory.
+    // Only an absolute path names a mount directory.
     if (directory[0] != '/') {
         return false;
     }
-    // The table has real paths. If the path leads to something else meanwhile (a link, a file, the
-    // directory below a card that was unmounted), it is not the card and stays.
+    // The table has real paths: a link is not the card, nor is the directory below a card that has
+    // been unmounted.
     FileDescriptor fd = openDirectory(directory);
     if (!fd.isOpen()) {
         // A card that cannot be read counts as empty, as for removeAllEntries().
@@ -124,7 +123,7 @@ bool FileRemover::removeAllEntries(const QString &path)
 bool FileRemover::emptyCard() const
 {
     const QByteArray device = QFile::encodeName(m_devicePath);
-    // Other sources are words such as "tmpfs" and "none", which are no devices and occur many times.
+    // Sources such as "tmpfs" and "none" are not devices.
     if (!device.startsWith('/')) {
         return false;
     }
@@ -138,7 +137,7 @@ bool FileRemover::emptyCard() const
     while (true) {
         errno = 0;
         if (!getmntent_r(table.get(), &entry, buffer.data(), static_cast<int>(buffer.size()))) {
-            // musl skips a line that is longer than the buffer, and reports it by this error.
+            // musl skips a line that is longer than the buffer, with this error.
             if (errno == ERANGE) {
                 continue;
             }
@@ -148,8 +147,7 @@ bool FileRemover::emptyCard() const
             decodeEscapes(entry.mnt_fsname);
             decodeEscapes(entry.mnt_dir);
         }
-        // glibc cuts such a line at the buffer instead. Cut within the directory, which may then be
-        // another one, it has no type.
+        // glibc cuts such a line instead. A line that is cut within the directory has no type.
         const bool cut = entry.mnt_type[0] == '\0';
         // A card that is mounted twice gets a second attempt through its other mount directory.
         if (!cut && device == entry.mnt_fsname && emptyMount(device, entry.mnt_dir)) {

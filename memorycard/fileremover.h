@@ -12,8 +12,8 @@
     Removes all files and directories from a mounted memory card and leaves its mount directory in
     place.
 
-    A remover runs once, on a thread pool, which deletes it afterwards. run() ends by emitting exactly
-    one of the two signals, once, from the pool's thread.
+    A remover runs once, on a thread pool, which deletes it afterwards. run() ends by emitting one
+    of the two signals, once, on the pool's thread.
 */
 class FileRemover : public QObject, public QRunnable
 {
@@ -25,8 +25,8 @@ public:
 
     void run() override;
 
-    // Removes everything below the directory and returns whether all of it was removed: true, too, for
-    // an empty directory and for one that cannot be read.
+    // Removes everything below the directory. Returns whether all of it was removed; also true for
+    // a directory that cannot be read.
     static bool removeAllEntries(const QString &path);
 
 Q_SIGNALS:

@@ -33,10 +33,9 @@ const QLatin1String ext4("ext4");
 const QLatin1String mkfsVfat("/sbin/mkfs.vfat");
 const QLatin1String mkfsExt4("/sbin/mkfs.ext4");
 
-// Whether the process can open enough descriptors to start a helper or a thread. With too few, a
-// thread that gets none for its event loop ends the process. Qt 5.15 may also treat a helper that
-// never started as running, with the process id -1: killing it would kill all processes of the
-// user.
+// Whether the process can open enough descriptors to start a helper or a thread. A thread that gets
+// none for its event loop ends the process. Qt 5.15 may treat a helper that never started as
+// running, with the process id -1: killing it would kill all processes of the user.
 bool hasDescriptorsLeft()
 {
     std::array<FileDescriptor, 16> spare; // a helper takes up to 8
@@ -53,9 +52,9 @@ bool hasDescriptorsLeft()
     \inqmlmodule com.marlo.settings.system
     \brief Formats, empties, mounts, unmounts and probes a memory card.
 
-    A card has two names: the disk service knows it by \l deviceName, and \l devicePath is the
-    device node of its partition. Every operation is a sequence of commands that run one after the
-    other, without blocking. \l status shows which one:
+    The disk service knows a card by its \l deviceName; \l devicePath is the device node of its
+    partition. Every operation is a sequence of commands that run one after the other, without
+    blocking. \l status shows which one:
 
     \table
     \header \li Operation \li Status on success
@@ -66,22 +65,18 @@ bool hasDescriptorsLeft()
     \row \li unmount() \li \c Unmounting, \c Idle
     \endtable
 
-    Mounting and unmounting are done by the disk service: the methods \c Mount and \c Unmount of
+    The disk service mounts and unmounts: the methods \c Mount and \c Unmount of
     \c org.freedesktop.UDisks2.Filesystem at \c{/org/freedesktop/UDisks2/block_devices/<deviceName>}
-    of the service \c org.freedesktop.UDisks2 on the system bus. Removing files finds the card by
-    its \l devicePath in \c{/etc/mtab}.
+    of the service \c org.freedesktop.UDisks2 on the system bus. The program
+    \c /usr/libexec/sdcardhelper formats and probes. Its arguments are \c format_vfat,
+    \c format_ext4 or \c probe, and the name of the partition, such as \c mmcblk1p1. It exits with
+    0 on success, and writes the type of the file system to its standard output for \c probe.
+    Removing files finds the card by its \l devicePath in \c{/etc/mtab}.
 
-    Formatting and probing are done by the program \c /usr/libexec/sdcardhelper. Its arguments are
-    \c format_vfat, \c format_ext4 or \c probe, and the name of the partition, such as \c mmcblk1p1.
-    It must exit with 0 on success. For \c probe it writes the type of the file system to its
-    standard output.
-
-    A failed command ends the sequence and sets the status to \c Error. In this status every
-    operation is accepted. Formatting, removing files and probing use the \l devicePath that was set
-    when they were requested, even if it changes before they start. Each format() makes the type
-    that it was called with. Mounting and unmounting use the \l deviceName that is set when the step
-    starts.
-    A label that shows the file system of a card:
+    A failed command ends the sequence with the status \c Error, in which every operation is
+    accepted. Formatting, removing files and probing use the \l devicePath and the type of their
+    request; mounting and unmounting use the \l deviceName that is set when the step starts.
+    Messages are in the logging category \c{org.tarnwickos.settings.memorycard}.
 
     \qml
     Label {
@@ -95,103 +90,56 @@ bool hasDescriptorsLeft()
     }
     \endqml
 
+    \image gallery-memory-card.png The gallery's page of this type
+
     \section1 When an operation has ended
 
-    If a formatter is used for several operations, its signals do not always show that an operation
-    has ended. The status \c Error does not change when another operation fails, and the status
-    \c Idle does not change when mount() finds the card mounted. A page therefore creates a
-    formatter for each operation, in a Loader, and starts the operation in the handler of
-    devicePathChanged(), before the probe of the new path is queued. The probe then runs after the
-    operation. The status therefore always leaves \c Idle. When it becomes \c Idle or \c Error, the
-    operation has ended. After \c Idle, \l filesystemType is the current type of the card.
-
-    \list
-    \li Until the disk service answers the first request, the status is still \c Idle and \l busy is
-        \c false. The page knows that it has started an operation: it shows that it waits for the
-        disk service and disables its buttons.
-    \li \c ErrorAlreadyMounted and \c ErrorAlreadyUnmounting do not stop an operation. The card is
-        already in the requested state, or about to be: the page shows a note and waits for the end.
-    \li Any other error of mountError() and unmountError() is followed by \c Error. Failures that
-        have no code, such as those of the helper program, change only the status. The status before
-        \c Error then shows which step failed.
-    \endlist
-
-    A complete page:
+    The signals of a formatter that is used twice do not always show the end of an operation: a
+    second failure does not change the status \c Error, and mount() on a mounted card does not
+    change \c Idle. A page therefore creates a formatter for each operation, in a Loader, and starts
+    the operation in the handler of devicePathChanged(). The probe of the path then runs after the
+    operation. When the status becomes \c Idle or \c Error, the operation has ended, and after
+    \c Idle \l filesystemType is up to date. A complete page:
 
     \quotefile memory-card.qml
 
-    Warnings are logged in the category \c org.tarnwickos.settings.memorycard, whose debug messages
-    are off by default.
-
-    \image gallery-memory-card.png The gallery's page of this type
-
     \section1 What may surprise
     \section2 Mounting and unmounting change the status afterwards
-    \c Formatting, \c RemovingFiles and \c Probing are set when the work begins. \c Unmounting and
-    \c Mounting are set when the disk service has reported success. Until then the status is still
-    the previous one, and for the first step of a sequence \l busy is \c false. A page that shows
-    progress must remember which operation it has requested.
-
-    \section2 busyChanged() is emitted without a change
-    It is also emitted when an operation has been accepted, although \l busy changes only with the
-    status. Pages may use it to learn that an operation was not refused.
-
-    \section2 Early requests are queued
-    Operations are refused while \l busy is \c true. While the first request to the disk service is
-    under way, \l busy is still \c false: operations are accepted then, and run afterwards. If the
-    request fails, they are dropped, except the probe of a new \l devicePath. If format() is called
-    twice in this way, each call makes the type that it was called with.
+    \c Formatting, \c RemovingFiles and \c Probing are set when the work begins, \c Unmounting and
+    \c Mounting when the disk service has reported success. Until then the status is the previous
+    one, and for the first step of a sequence \l busy is \c false. Further operations are queued
+    then, and run afterwards. If the request fails, they are dropped, except the probe of a new
+    \l devicePath. A page must remember that it has requested an operation.
 
     \section2 Formatting needs a mounted card
-    format() unmounts the card first. A card that is not mounted leads to \c Error with \c
-    ErrorNotMounted: only a card that was known to work is formatted. Call mount() first; its \c
-    ErrorAlreadyMounted is harmless.
+    Only a card that was known to work is formatted: format() on a card that is not mounted ends
+    with \c ErrorNotMounted. Call mount() first; its \c ErrorAlreadyMounted is harmless.
 
     \section2 Two errors do not end the sequence
-    \c ErrorAlreadyMounted and \c ErrorAlreadyUnmounting are reported, and the sequence continues:
-    the card is already in the requested state, or about to be. The status of that step is not
-    shown.
+    After \c ErrorAlreadyMounted and \c ErrorAlreadyUnmounting the sequence continues: the card is
+    already in the requested state, or about to be. The status of that step is not shown.
 
     \section2 Some errors have no signal
-    mountError() and unmountError() carry the disk service's own errors. Others, such as a service
-    that does not exist, only lead to the status \c Error. The signal is emitted before the status
-    changes.
-
-    \section2 Any type can be requested
-    For a type other than \c vfat and \c ext4 (case-sensitive), the helper program gets only the
-    name of the partition. Its exit code determines whether the step succeeds. The helper of a
-    device may support more than this module.
-
-    \section2 A failed probe still changes the type
-    Even if the helper fails, its output replaces \l filesystemType. The output is then usually
-    empty: a card that cannot be read has no known type. A helper that crashes or cannot be
-    started leaves the type unchanged. It may then be the type of another card, so check \l status
-    first. A new \l devicePath is probed immediately, even an empty one.
+    Errors that are not the disk service's own, such as a missing service, and failures of the
+    helper program only lead to the status \c Error. The status before it shows which step failed.
 
     \section2 Without a device name a sequence waits
-    Mounting and unmounting use the \l deviceName that is set when the step starts. If it is empty
-    then, the step only logs a critical message. The status does not change. The rest of the
-    sequence stays in the queue and runs before the next operation: if format() is called without a
-    name and unmount() later, the card is formatted. If the name is empty in the middle of a
+    If \l deviceName is empty when a step of mounting or unmounting starts, the step only logs a
+    critical message. The rest of the sequence stays in the queue and runs before the next
+    operation: after format() without a name, unmount() formats the card. In the middle of a
     sequence, the formatter stays busy and refuses every operation; only a new object helps. The
     message says "unmount" for mounting and "mount" for unmounting, because programs that read logs
     expect exactly these lines.
 
-    \section2 A directory that cannot be opened counts as empty
-    removeAllFiles() removes all that it can, continues after a failure, and then ends in \c Error.
-    The directory on which the card is mounted counts as empty if it cannot be opened: the operation
-    succeeds without removing anything. If a card is mounted more than once, it is enough that one
-    of its mount directories can be emptied.
-
-    \section2 Some mount directories are refused
+    \section2 Some mount directories are refused, and some count as empty
     The formatter does not empty a mount directory that is a symbolic link, the root directory or on
-    a different device than the card. In these cases the card has been unmounted meanwhile, or the
-    mount table is wrong.
+    another device than the card: the card has been unmounted, or the mount table is wrong. A
+    mount directory that cannot be opened counts as empty. If the card is mounted more than once,
+    one mount directory that can be emptied is enough.
 
     \section2 Work outlives its formatter
     Destroying a formatter stops neither the removal of files nor a helper that is formatting: a
-    card that is half formatted cannot be used. When the process ends, it waits for the removal, as
-    it does for all work in the global thread pool.
+    card that is half formatted cannot be used. When the process ends, it waits for the removal.
 */
 
 MemoryCardFormatter::MemoryCardFormatter(QObject *parent) : QObject(parent)
@@ -203,9 +151,8 @@ MemoryCardFormatter::~MemoryCardFormatter()
     if (m_process == nullptr || m_process->state() == QProcess::NotRunning) {
         return;
     }
-    // A child process object would kill the helper here and wait for it. The user has agreed to the
-    // formatting, and a card that is half formatted cannot be used: let the helper finish. The
-    // process object is deleted afterwards. If the application ends first, the helper continues.
+    // A child process object would kill the helper here and wait for it. A card that is half
+    // formatted cannot be used, so the helper continues, even after the application has ended.
     m_process->setParent(nullptr);
     connect(m_process, &QProcess::stateChanged, m_process, [process = m_process](auto state) {
         if (state == QProcess::NotRunning) {
@@ -221,8 +168,6 @@ MemoryCardFormatter::~MemoryCardFormatter()
     \qmlproperty enumeration MemoryCardFormatter::status
     \readonly
 
-    The state of the formatter:
-
     \value MemoryCardFormatter.Idle Nothing runs; the last sequence, if any, succeeded.
     \value MemoryCardFormatter.Unmounting The card has been unmounted.
     \value MemoryCardFormatter.Formatting The card is being formatted.
@@ -230,8 +175,6 @@ MemoryCardFormatter::~MemoryCardFormatter()
     \value MemoryCardFormatter.Mounting The card has been mounted.
     \value MemoryCardFormatter.Probing The helper identifies the file system on the card.
     \value MemoryCardFormatter.Error Nothing runs; the last sequence failed.
-
-    While a request to mount or unmount is under way, the status is still the previous one.
 */
 MemoryCardFormatter::Status MemoryCardFormatter::status() const
 {
@@ -242,13 +185,7 @@ MemoryCardFormatter::Status MemoryCardFormatter::status() const
     \qmlproperty string MemoryCardFormatter::deviceName
 
     The kernel name of the block device, such as \c mmcblk1p1, which the disk service mounts and
-    unmounts. It may be set at any time, even while the formatter is \l busy, and is used by every
-    step that starts afterwards.
-
-    If the name is empty when a step of mounting or unmounting starts, the formatter only logs a
-    critical message. The status does not change. The rest of the queue remains and runs before the
-    next operation that is accepted. If this happens in the middle of a sequence, the formatter
-    stays \l busy and refuses every operation: only a new MemoryCardFormatter helps.
+    unmounts. It can be set at any time, but must not be empty during an operation.
 */
 QString MemoryCardFormatter::deviceName() const
 {
@@ -267,10 +204,9 @@ void MemoryCardFormatter::setDeviceName(const QString &name)
 /*!
     \qmlproperty string MemoryCardFormatter::devicePath
 
-    The device node of the card's partition, such as \c /dev/mmcblk1p1. A new path is probed
-    immediately. If a request to the disk service is under way, the probe waits until the request
-    has succeeded or failed. While the formatter is \l busy, the path cannot be changed: trying to
-    do so gives a warning.
+    The device node of the card's partition, such as \c /dev/mmcblk1p1. A new path, even an empty
+    one, is probed immediately, or after a request to the disk service that is under way. While the
+    formatter is \l busy, the path cannot be changed: trying to do so gives a warning.
 */
 QString MemoryCardFormatter::devicePath() const
 {
@@ -297,10 +233,9 @@ void MemoryCardFormatter::setDevicePath(const QString &path)
     \qmlproperty string MemoryCardFormatter::filesystemType
     \readonly
 
-    The type of the file system on the card, such as \c vfat: the standard output of the helper
-    program in the last probe, without leading and trailing white space. It is usually empty after
-    the helper has exited with an error. If the helper crashes or cannot be started, the type does
-    not change.
+    The type of the file system on the card, such as \c vfat: the trimmed standard output of the
+    last probe. It is usually empty after a probe that exited with an error. A helper that crashes
+    or cannot be started leaves it unchanged: it may then be the type of another card.
 */
 QString MemoryCardFormatter::filesystemType() const
 {
@@ -331,9 +266,7 @@ QStringList MemoryCardFormatter::supportedFormatTypes() const
     \readonly
 
     Whether \l status is neither \c Idle nor \c Error. While \c true, operations are refused with a
-    warning. While the disk service carries out the first step of a sequence, \c busy is \c false,
-    and other operations are queued. If this step fails, they are dropped; only the probe of a new
-    \l devicePath still runs.
+    warning.
 */
 bool MemoryCardFormatter::busy() const
 {
@@ -344,15 +277,10 @@ bool MemoryCardFormatter::busy() const
     \qmlmethod void MemoryCardFormatter::format(string type)
 
     Unmounts the card, makes a file system of the \a type \c vfat or \c ext4 on it, and mounts it.
-    \b {Everything on the card is lost.} For any other type, the helper program gets only the name
-    of the partition, and its exit code determines whether the step succeeds. An empty type or
-    \l devicePath leads to \c Error with a warning. A card that is not mounted leads to
-    unmountError() and \c Error.
-
-    \b {Set \l deviceName first.} Without it the formatter only logs a critical message. The
-    formatting stays in the queue and runs before the next operation, even if that is only unmount()
-    or a new \l devicePath. Do not clear \l deviceName until the card is mounted again, either: the
-    formatter would stay \l busy forever.
+    \b {Everything on the card is lost.} For any other type (names are case-sensitive), the helper
+    program gets only the name of the partition, and its exit code determines whether the step
+    succeeds. An empty type or \l devicePath leads to \c Error with a warning. \b {Set \l deviceName
+    first.}
 */
 void MemoryCardFormatter::format(const QString &type)
 {
@@ -379,17 +307,10 @@ void MemoryCardFormatter::format(const QString &type)
 /*!
     \qmlmethod void MemoryCardFormatter::removeAllFiles()
 
-    Mounts the card, unless it is already mounted, and removes all files and directories on it. If
-    some cannot be removed, the others are removed first, and the status then becomes \c Error. An
-    empty \l devicePath leads to \c Error with a warning. Without a \l deviceName the removal stays
-    in the queue, as described for format().
-
-    A mount directory that is a symbolic link, the root directory or on a different device than
-    \l devicePath is not the card. Nothing is removed there. The operation then ends in \c Error,
-    unless the card is mounted on another directory, too.
-
-    The files are removed on a thread of the application's global thread pool. Destroying the
-    formatter does not wait for the removal, but the process does when it ends.
+    Mounts the card, unless it is already mounted, and removes all files and directories on it, on a
+    thread of the application's global thread pool. If some cannot be removed, the others are
+    removed first, and the status then becomes \c Error. An empty \l devicePath leads to \c Error
+    with a warning.
 */
 void MemoryCardFormatter::removeAllFiles()
 {
@@ -411,9 +332,7 @@ void MemoryCardFormatter::removeAllFiles()
 /*!
     \qmlmethod void MemoryCardFormatter::mount()
 
-    Mounts the card. If the card is already mounted, mountError() is emitted and the sequence
-    continues. Without a \l deviceName the formatter only logs a critical message and drops the
-    command.
+    Mounts the card.
 */
 void MemoryCardFormatter::mount()
 {
@@ -429,8 +348,7 @@ void MemoryCardFormatter::mount()
 /*!
     \qmlmethod void MemoryCardFormatter::unmount()
 
-    Unmounts the card. Without a \l deviceName the formatter only logs a critical message and drops
-    the command.
+    Unmounts the card.
 */
 void MemoryCardFormatter::unmount()
 {
@@ -445,55 +363,33 @@ void MemoryCardFormatter::unmount()
 
 /*!
     \qmlsignal MemoryCardFormatter::statusChanged()
-
-    Emitted after \l status has changed.
-*/
-
-/*!
     \qmlsignal MemoryCardFormatter::deviceNameChanged()
-
-    Emitted after \l deviceName has changed.
-*/
-
-/*!
     \qmlsignal MemoryCardFormatter::devicePathChanged()
-
-    Emitted after \l devicePath has changed, before it is probed.
-*/
-
-/*!
     \qmlsignal MemoryCardFormatter::filesystemTypeChanged()
-
-    Emitted after \l filesystemType has changed.
-*/
-
-/*!
     \qmlsignal MemoryCardFormatter::busyChanged()
 
-    Emitted after \l busy has changed, and whenever an operation has been accepted.
+    Emitted after the property has changed. devicePathChanged() is emitted before the probe is
+    queued. busyChanged() is also emitted whenever an operation has been accepted, although \l busy
+    changes only with the status.
 */
 
 /*!
     \qmlsignal MemoryCardFormatter::mountError(enumeration error)
 
     Emitted before \l status changes, when the disk service could not mount the card. Each \a error
-    stands for an error of the disk service, \c {org.freedesktop.UDisks2.Error.*}. Any other error
-    only changes the status to \c Error.
+    is an error of the disk service, \c {org.freedesktop.UDisks2.Error.*}.
 
     \value MemoryCardFormatter.ErrorFailed The operation failed.
     \value MemoryCardFormatter.ErrorCancelled The operation was cancelled.
     \value MemoryCardFormatter.ErrorAlreadyCancelled The operation had been cancelled before.
     \value MemoryCardFormatter.ErrorNotAuthorized The user is not authorized.
-    \value MemoryCardFormatter.ErrorNotAuthorizedCanObtain The user is not authorized, but
-           can obtain authorization.
-    \value MemoryCardFormatter.ErrorNotAuthorizedDismissed The user is not authorized and
-           dismissed the dialog.
-    \value MemoryCardFormatter.ErrorAlreadyMounted The card is mounted; the sequence goes on.
+    \value MemoryCardFormatter.ErrorNotAuthorizedCanObtain The user can obtain authorization.
+    \value MemoryCardFormatter.ErrorNotAuthorizedDismissed The user dismissed the dialog.
+    \value MemoryCardFormatter.ErrorAlreadyMounted The card is mounted; the sequence continues.
     \value MemoryCardFormatter.ErrorNotMounted The card is not mounted.
     \value MemoryCardFormatter.ErrorOptionNotPermitted An option is not permitted.
     \value MemoryCardFormatter.ErrorMountedByOtherUser Another user has mounted the card.
-    \value MemoryCardFormatter.ErrorAlreadyUnmounting The card is being unmounted; the sequence goes
-           on.
+    \value MemoryCardFormatter.ErrorAlreadyUnmounting It is being unmounted; the sequence continues.
     \value MemoryCardFormatter.ErrorNotSupported The operation is not supported.
     \value MemoryCardFormatter.ErrorTimedout The operation took too long.
     \value MemoryCardFormatter.ErrorWouldWakeup The operation would wake up a sleeping disk.

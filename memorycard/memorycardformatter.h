@@ -15,11 +15,11 @@
 class QDBusPendingCallWatcher;
 
 /*
-    Formats a memory card, removes all files from it, mounts and unmounts it, and
-    identifies its file system.
+    Formats a memory card, removes all files from it, mounts and unmounts it, and identifies its
+    file system.
 
-    Requests are queued as commands, which run one at a time: in the helper program, in the disk service
-    or in a FileRemover. Nothing here waits for any of them.
+    Requests are queued as commands, which run one at a time: in the helper program, in the disk
+    service or in a FileRemover. Nothing here waits for any of them.
 */
 class MemoryCardFormatter : public QObject
 {
@@ -44,7 +44,7 @@ public:
     };
     Q_ENUM(Status)
 
-    // Each stands for one error name of the disk service.
+    // The names of the disk service's errors, after "Error".
     enum MountError {
         ErrorFailed,
         ErrorCancelled,
@@ -98,8 +98,8 @@ private Q_SLOTS:
     void fileRemoverError();
 
 private:
-    // A command with the card and the type that it was requested for. devicePath may change before
-    // the command starts, and no card may be formatted or emptied in place of another.
+    // The path and the type of the request: devicePath may change before the command starts, and no
+    // card may be formatted or emptied instead of another.
     struct Command {
         Status command;
         QString devicePath;
@@ -124,8 +124,8 @@ private:
     QProcess *m_process = nullptr;
     QQueue<Command> m_commands;
     Status m_status = Idle;
-    // The command that is under way, or Idle. The status follows a request to the disk service only
-    // when that has succeeded.
+    // The command that is under way, or Idle. The status of a mount command changes only
+    // afterwards.
     Status m_running = Idle;
     QString m_deviceName;
     QString m_devicePath;

@@ -9,8 +9,8 @@
 #include <algorithm>
 #include <vector>
 
-// Where to insert a row by its number: before the first row with a higher number, or at the end if
-// no such row exists or the number is negative. The rows need not be sorted.
+// Where to insert a row: before the first row with a higher number, or at the end without such a
+// row or with a negative number. The rows need not be sorted.
 template<typename Number> int insertionIndex(const std::vector<Number> &rows, qint64 number)
 {
     const auto isHigher = [number](Number row) { return row > number; };

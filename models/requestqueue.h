@@ -14,15 +14,13 @@
 #include <vector>
 
 /*
-    What a model is requested to do while it changes its rows.
+    Queues requests that reach a model while it changes its rows. QML may call back from a handler
+    of a row signal, and a second change in the middle of the first would break the model and its
+    views. Such a request waits until control returns to the event loop.
 
-    QML may call back into the model from a handler of a row signal, or from an event loop that the
-    handler runs. A second change in the middle of the first would break the model and its views, so
-    such a request waits until the change has ended and control has returned to the event loop.
-
-    An update reads files or settings again: it waits once, however often it was requested. A choice
-    changes the user's settings: every one of them counts, in the order of the requests. Choices run
-    after the updates, because they start from what is stored.
+    An update reads files or settings again: it runs once, however often it was requested. A choice
+    changes the user's settings: all of them run, in the order of the requests and after the
+    updates, because they start from what is stored.
 */
 template<typename Model> class RequestQueue
 {
@@ -49,7 +47,7 @@ public:
         RequestQueue *m_queue;
     };
 
-    // Whether the update has to wait; otherwise the caller may go on with it at once.
+    // Whether the update has to wait. If not, the caller continues with it.
     bool defer(Update update)
     {
         if (m_changing
@@ -59,7 +57,7 @@ public:
         return m_changing;
     }
 
-    // Runs the choice at once, after whatever waits, or later if rows are being changed.
+    // Runs the choice after all waiting requests: now, or later if rows are being changed.
     void choose(Choice choice)
     {
         m_choices.push_back(std::move(choice));
@@ -69,7 +67,7 @@ public:
 private:
     void run()
     {
-        // A choice that is made in answer to another one waits for that one to be complete.
+        // A choice that a handler of another choice makes waits until that one is complete.
         if (m_changing || m_running) {
             return;
         }
@@ -78,8 +76,8 @@ private:
             for (const Update update : std::exchange(m_updates, {})) {
                 (m_model->*update)();
             }
-            // Requests that arrive from now on wait for the event loop, or two handlers that answer
-            // each other would never return to it.
+            // Later requests wait for the event loop. Otherwise two handlers that react to each
+            // other would never return to it.
             for (auto count = m_choices.size(); count > 0; --count) {
                 const Choice choice = std::move(m_choices.front());
                 m_choices.pop_front();

@@ -6,10 +6,8 @@
 
 #include <QQmlExtensionPlugin>
 
-/*
-    The entry point of the QML module com.marlo.settings.system: it registers the module's types and
-    gives each engine that imports the module the translators of the settings pages' catalog.
-*/
+// Registers the types of the QML module com.marlo.settings.system and gives each engine that
+// imports it the translators of the settings pages' catalog.
 class SystemSettingsPlugin : public QQmlExtensionPlugin
 {
     Q_OBJECT

@@ -110,8 +110,8 @@ QVariantList QuickAction::arguments() const
 
 QDBusError QuickAction::whyUnsendable() const
 {
-    // QtDBus would not notice: it sends a call without a service to the bus itself, and on a
-    // service that is a lone word, or a signature that is too long, the process ends.
+    // QtDBus sends a call without a service to the bus itself. It ends the process if the service
+    // is a single word or the signature is too long.
     if (service().isEmpty()) {
         return {QDBusError::InvalidService, QStringLiteral("The call names no service")};
     }

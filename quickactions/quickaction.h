@@ -10,10 +10,7 @@
 
 #include <optional>
 
-/*
-    A quick action as its definition file describes it: a value that is read once and needs no
-    model. The path of the file is the action's identity.
-*/
+// A quick action as its definition file describes it. The path of the file is its identity.
 class QuickAction
 {
 public:
@@ -24,8 +21,7 @@ public:
     bool enabled() const { return m_enabled; }
 
     // The keys of the file with their values as QSettings returns them. A value with a comma is a
-    // list of strings; a list of several strings converts to an empty string. A missing key is
-    // empty.
+    // list of strings, whose text is empty.
     QVariantMap config() const { return m_config; }
     QString title() const;
     QVariant icon() const;
@@ -40,13 +36,13 @@ public:
     QString interface() const;
     QString method() const;
     QVariantList arguments() const;
-    // Why the call cannot be sent; an invalid error if it can. Names and paths that D-Bus does not
-    // allow can be sent: QtDBus answers them with an error.
+    // Why the call cannot be sent; an invalid error if it can. QtDBus itself refuses names and
+    // paths that D-Bus does not allow.
     QDBusError whyUnsendable() const;
 
-    // Sends the call on the session bus and returns at once. The receiver's slots get the reply, or
-    // the error together with the message that was sent; either may be null. Returns false, with a
-    // QML warning of the receiver, if the call cannot be sent.
+    // Sends the call on the session bus without waiting. The receiver's slots, which may be null,
+    // get the reply, or the error and the sent message. Returns false, with a QML warning of the
+    // receiver, if the call cannot be sent.
     bool trigger(QObject *receiver, const char *returnMethod, const char *errorMethod) const;
 
     bool operator==(const QuickAction &other) const;

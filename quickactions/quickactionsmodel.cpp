@@ -51,16 +51,14 @@ qint64 priorityOfRow(const QuickAction &action)
     Packages offer a quick action by installing a definition file, \c{*.conf}, into
     \c /usr/share/glimmera/quickactions; \l{marlo-quickactions(5)} describes the format.
     The model lists the actions that the user has enabled, in the user's order; with
-    \l showPotential it lists all of them. When the directory changes, the model reloads after about
-    a second. It also follows the two lists below. Existing rows keep their places when an action is
-    enabled or disabled with \l showPotential, when the priority in a file changes, and when another
-    model or process changes the order. The new places apply to models that are created later.
+    \l showPotential it lists all of them. It reloads about a second after the directory changes,
+    and follows two lists in dconf:
 
     \list
-    \li \c /desktop/glimmera-marlo-home/events_screen_actions (dconf, list of strings): the paths of
-        the enabled actions' files, in the order in which they are shown.
-    \li \c /desktop/glimmera-marlo-home/blocked_actions (dconf, list of strings): the paths of
-    actions that are never listed.
+    \li \c /desktop/glimmera-marlo-home/events_screen_actions (list of strings): the paths of the
+        enabled actions' files, in the order in which they are shown.
+    \li \c /desktop/glimmera-marlo-home/blocked_actions (list of strings): the paths of actions that
+        are never listed, not even if the user has enabled them. Vendors use this list.
     \endlist
 
     The roles of a row:
@@ -76,8 +74,6 @@ qint64 priorityOfRow(const QuickAction &action)
          enableAction() and disableAction() take.
     \row \li \c enabled \li bool \li Whether the user has enabled the action.
     \endtable
-
-    A definition file that cannot be read is listed without title and icon, with a warning.
 
     \qml
     ListView {
@@ -96,79 +92,61 @@ qint64 priorityOfRow(const QuickAction &action)
     \image gallery-quick-actions.png The gallery's page of this type
 
     \section1 What may surprise
-    \section2 A title may be undefined
-    The title of an action without one is undefined, not an empty text. Write \c{model.title || ""},
-    or choose another text: the page decides what to show. If no catalog has the text of an action,
-    its title is the identifier, so that the missing translation is noticed.
-
     \section2 A file that cannot be read is still a row
-    A broken definition file is listed without title and icon, after a warning. Triggering it sends
-    nothing. The row is needed because the user's list may contain the file, and move() relies on
-    rows and entries having the same indexes. EventsWidgetsModel skips such files, because none of
-    its methods takes an index in the user's list.
+    After a warning, it is listed without title and icon, and triggering it sends nothing. The
+    user's list may contain the file, and move() relies on rows and entries having the same indexes.
 
     \section2 The roles have the numbers 0 to 3
-    These are also the numbers of Qt's roles for display, decoration, editing and tool tips. They
-    do not change, because existing code may use the numbers. TitlesView treats role 0 as unknown:
-    if \c title is its \c matchRole, every row matches.
+    These are also the numbers of Qt's roles for display, decoration, editing and tool tips. They do
+    not change, because existing code may use them. TitlesView treats role 0 as unknown: if \c title
+    is its \c matchRole, every row matches.
 
     \section2 An action can be enabled twice
-    enableAction() appends to the user's list without a check, and disableAction() removes every
-    entry of the path. The list that the model knows may be older than the stored one, so a check
-    could be wrong; removing every entry is always right. A path has one row, however many entries
-    it has.
+    enableAction() does not check whether the list already contains the path, because the list that
+    the model knows may be older than the stored one. disableAction() removes every entry. A path
+    has one row, however many entries it has.
 
     \section2 Rows change only after dconf reports the change
-    After enableAction() and disableAction() the model waits for the change of the key, as if
-    another process had made it. This keeps the models of all pages equal. Do not rely on when
-    that happens: dconf may report the change during the call or later.
+    This keeps the models of all pages equal after enableAction() and disableAction(). dconf may
+    report the change during the call or later.
 
     \section2 move() takes indexes in the user's list
-    A call with an index outside the user's list is ignored silently, even if \l showPotential gives
-    more rows. move() uses the same indexes for the row and for the entry in the list, so call it on
-    a model without \l showPotential, whose rows are the entries of the user's list. Enabled actions
-    that are not installed or are blocked have an entry but no row. The entry remains so that the
-    action returns to its place when its package is installed again.
+    It uses the same indexes for the row and for the entry in the list, so call it on a model
+    without \l showPotential. Enabled actions that are not installed or are blocked have an entry
+    but no row. The entry remains so that the action returns to its place when its package is
+    installed again.
 
     \section2 Existing rows do not move
-    When another model or process changes the order of the user's list, existing rows keep their
-    places until the model is created again. Otherwise a row could move while the user taps it.
+    Rows keep their places when an action is enabled or disabled with \l showPotential, when the
+    priority in a file changes, and when another model or process changes the order. Otherwise a row
+    could move while the user taps it. Models that are created later have the new places.
 
-    \section2 Other actions may stand above the enabled ones
-    With \l showPotential, an action that is not enabled is placed before the first row that has a
-    greater priority or none, and the search begins at the top. If the first enabled action has no
-    priority, every new action with a priority is placed above it. Give all actions a priority, or
-    show the enabled ones in a model of their own.
+    \section2 Other actions may be placed above the enabled ones
+    With \l showPotential, an action that is not enabled goes before the first row that has a
+    greater priority or none. If the first enabled action has no priority, every new action with one
+    is placed above it. Give all actions a priority, or show the enabled ones in a model of their
+    own.
 
-    \section2 Blocked wins over enabled
-    Actions in \c blocked_actions are never listed, not even with \l showPotential. Vendors use this
-    list to hide an action on a device, whatever the user's settings are.
-
-    \section2 Reloads are delayed, and repeated
-    The model reloads one second after the directory changed, because packages install several files
-    at once. The first change causes one reload, the second change two, the third change three. The
-    extra reloads have no visible effect.
+    \section2 Reloads are repeated
+    The first change of the directory causes one reload, the second change two, the third change
+    three. The extra reloads have no visible effect.
 
     \section2 Arguments are strings
     Arguments of a call are sent as strings, even \c 1 and \c true, because an INI file has no
-    types. A value with an unquoted comma is sent as an array of strings. A service for quick
-    actions must accept strings.
+    types. A value with an unquoted comma is sent as an array of strings.
 
     \section2 A timeout is not a failure
-    A service that does not answer in time causes no warning: it may be busy opening its
-    window. Every other failure is logged as a warning, and only a service that does not exist leads
-    to the store. The warning of a call that could not be sent ends in \c{%6}, because programs that
-    read logs expect exactly this text.
+    A service that does not answer in time causes no warning: it may be busy opening its window. The
+    warning of a call that could not be sent ends in \c{%6}, because programs that read logs expect
+    exactly this text.
 
     \section2 The store may show the package of another action
-    If a service does not exist, the store shows the package of the first row that sends the same
-    call and names a package. This need not be the row that the user tapped: actions with the same
-    call need the same service.
+    It shows the package of the first row that sends the same call and names a package: actions with
+    the same call need the same service.
 
     \section2 Titles do not follow a change of the language
-    The catalog of the settings pages follows a change of the language. Catalogs that definition
-    files name do not: a model loads them once. A page that follows the language creates its models
-    again.
+    A model loads the catalogs that definition files name once. A page that follows the language
+    creates its models again.
 */
 
 QuickActionsModel::QuickActionsModel(QObject *parent)
@@ -202,42 +180,22 @@ QuickActionsModel::~QuickActionsModel()
     \qmlproperty bool QuickActionsModel::showPotential
 
     Whether every offered action is listed, enabled or not, for a page on which the user enables and
-    disables actions. The default is false.
-
-    When the model loads, it places the enabled actions first, in the user's order. Each of the
-    others goes before the first row with a greater priority or with none, whether that row is
-    enabled or not.
-
-    To let the user order the actions, use a second model without this property: move() takes
-    indexes in the user's list, and a model with this property can also have rows for actions that
-    are not in the list. Both models follow the list.
+    disables actions. The default is false. A model that loads places the enabled actions first, in
+    the user's order.
 
     \qml
-    Column {
-        QuickActionsModel { id: offered; showPotential: true }
-        Repeater {
-            model: offered
-            delegate: Switch {
-                text: model.title || ""
-                checked: model.enabled
-                onToggled: checked ? offered.enableAction(path) : offered.disableAction(path)
-            }
-        }
-        QuickActionsModel { id: chosen }
-        Repeater {
-            model: chosen
-            delegate: Button {
-                text: "Move up " + (model.title || "")
-                enabled: index > 0
-                onClicked: chosen.move(index, index - 1)
-            }
+    Repeater {
+        model: QuickActionsModel { id: offered; showPotential: true }
+        delegate: Switch {
+            text: model.title || ""
+            checked: model.enabled
+            onToggled: checked ? offered.enableAction(path) : offered.disableAction(path)
         }
     }
     \endqml
 
-    If a handler sets the property while rows are being changed, the property has the new value
-    immediately. The rows change, and showPotentialChanged() is emitted, when control returns to the
-    event loop.
+    If a handler sets the property while rows are being changed, the rows change, and
+    showPotentialChanged() is emitted, when control returns to the event loop.
 */
 bool QuickActionsModel::showPotential() const
 {
@@ -325,14 +283,13 @@ QVariantMap QuickActionsModel::get(int index) const
 /*!
     \qmlmethod void QuickActionsModel::triggerAction(int index)
 
-    Sends the D-Bus call of the action at \a index on the session bus, without waiting for an
-    answer.
+    Sends the D-Bus call of the action at \a index on the session bus, without waiting for a reply.
+    Every failure except a timeout is logged as a warning, and so is an index without a row.
 
-    If the call fails because its service does not exist, and the action names a package that it
-    needs, the model asks the application store client to show that package. It calls the method
-    \c showApp of the interface \c com.marlo.marlostore, at the path \c /StoreClient of the service
-    \c com.marlo.marlostore on the session bus. Every failure except a timeout is logged as a
-    warning, and so is an index without a row.
+    If the service does not exist and the action names a package that it needs, the application
+    store client is asked to show that package: the method \c showApp of the interface
+    \c com.marlo.marlostore, at the path \c /StoreClient of the service \c com.marlo.marlostore on
+    the session bus.
 */
 void QuickActionsModel::triggerAction(int index)
 {
@@ -356,8 +313,7 @@ void QuickActionsModel::componentComplete()
 /*!
     \qmlmethod void QuickActionsModel::enableAction(string path)
 
-    Adds the action of the definition file \a path at the end of the user's list, even if the list
-    already contains it. The rows change once dconf reports the change. Also sets
+    Adds the action of the definition file \a path at the end of the user's list. Also sets
     \c /desktop/glimmera-marlo-home/events_screen_actions_user (dconf, bool) to \c true, which
     records that the user has changed the list.
 */
@@ -369,8 +325,8 @@ void QuickActionsModel::enableAction(const QString &path)
 /*!
     \qmlmethod void QuickActionsModel::disableAction(string path)
 
-    Removes every entry of the definition file \a path from the user's list. The rows change once
-    dconf reports the change. Like enableAction(), it records that the user has changed the list.
+    Removes every entry of the definition file \a path from the user's list. Like enableAction(), it
+    records that the user has changed the list.
 */
 void QuickActionsModel::disableAction(const QString &path)
 {
@@ -385,14 +341,12 @@ void QuickActionsModel::disableAction(const QString &path)
     \qmlmethod void QuickActionsModel::move(int index, int newIndex)
 
     Moves the row and the entry of the user's list at \a index to \a newIndex. Like enableAction(),
-    it records that the user has changed the list. A call with an index outside the user's list does
-    nothing. If a dconf profile locks the list, the row returns to its old place.
+    it records that the user has changed the list. An index outside the user's list is silently
+    ignored. If a dconf profile locks the list, the row returns to its old place.
 
-    The rows must begin with the enabled actions in the user's order. This is always true without
-    \l showPotential, unless an enabled action is missing or blocked, or another model or process
-    has changed the order. With \l showPotential, there can be other actions between the enabled
-    ones, and move() would move the wrong entry: use a second model for ordering, as in the example
-    of \l showPotential.
+    The rows must begin with the enabled actions in the user's order. Without \l showPotential this
+    is true unless an enabled action is missing or blocked, or another model or process has changed
+    the order.
 */
 void QuickActionsModel::move(int index, int newIndex)
 {
@@ -401,15 +355,9 @@ void QuickActionsModel::move(int index, int newIndex)
 
 /*!
     \qmlsignal QuickActionsModel::showPotentialChanged()
-
-    Emitted after \l showPotential has changed and the rows have been updated. This also holds if a
-    handler sets the property while rows are being changed.
-*/
-
-/*!
     \qmlsignal QuickActionsModel::countChanged()
 
-    Emitted after \l count has changed.
+    Emitted after the property has changed and the rows have been updated.
 */
 
 void QuickActionsModel::loadActions()

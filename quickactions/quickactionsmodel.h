@@ -19,13 +19,8 @@ class QDBusError;
 class QDBusMessage;
 class QuickAction;
 
-/*
-    Lists the quick actions that packages offer and the user has enabled, for the events screen. With
-    showPotential it lists every offered action, for the page on which the user chooses.
-
-    The model reads the definition files in /usr/share/glimmera/quickactions. It follows that
-    directory and the user's lists in dconf.
-*/
+// Lists the quick actions that packages offer and the user has enabled, for the events screen. With
+// showPotential it lists every offered action, for the page on which the user chooses.
 class QuickActionsModel : public QAbstractListModel, public QQmlParserStatus
 {
     Q_OBJECT
@@ -37,8 +32,7 @@ class QuickActionsModel : public QAbstractListModel, public QQmlParserStatus
 public:
     using Action = QuickAction;
 
-    // The numbers are also those of Qt's display, decoration, edit and tool tip roles, so that
-    // generic views show the title and the icon.
+    // Also the numbers of Qt's display, decoration, edit and tool tip roles, for generic views.
     enum Role { TitleRole, IconRole, PathRole, EnabledRole };
 
     explicit QuickActionsModel(QObject *parent = nullptr);
@@ -98,7 +92,7 @@ private:
     QStringList m_blockedList;
     bool m_showPotential = false;
     bool m_complete = false;
-    // True while move() writes the enabled list: the change that dconf reports is the model's own.
+    // True while move() writes the enabled list.
     bool m_moving = false;
 };
 

@@ -25,8 +25,8 @@ bool toSwitch(const QVariant &stored)
     return stored.toBool();
 }
 
-// Any program may write any value to the key. A value that is not a state counts as never agreed to.
-// So does a number of another type, because a large one would wrap around.
+// A value that is not a state counts as never agreed to. So does a number of another type, because
+// a large one would wrap around.
 LocationSettings::OnlineAGpsState toState(const QVariant &stored)
 {
     const int number = stored.userType() == QMetaType::Int ? stored.toInt() : -1;
@@ -62,8 +62,7 @@ LocationSettings::LocationSettings(QObject *parent)
 {
 }
 
-// All of these work on what is stored now. Another process may have changed it a moment ago, before
-// this one is notified: a switch must not stay on because it looked off.
+// These use the stored value: another process may have changed it before this one is notified.
 
 bool LocationSettings::gpsEnabled() const
 {

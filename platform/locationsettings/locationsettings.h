@@ -9,13 +9,9 @@
 class MGConfItem;
 class QVariant;
 
-/*
-    The switches of the device's location services: the satellite receiver (GPS), the MLS network
-    positioning with its online assistance, and the HERE positioning service.
-
-    They are stored in dconf, so that every process sees the same switches and follows their changes.
-    A switch that was never set is off. An online service is not available before the user agrees.
-*/
+// The switches of the device's location services: the satellite receiver (GPS), the MLS network
+// positioning with its online assistance, and the HERE positioning service. They are stored in
+// dconf, so that every process sees the same switches.
 class LocationSettings : public QObject
 {
     Q_OBJECT
@@ -26,8 +22,7 @@ class LocationSettings : public QObject
     Q_PROPERTY(OnlineAGpsState hereState READ hereState WRITE setHereState NOTIFY hereStateChanged)
 
 public:
-    // The numbers are what is stored, and what the settings pages know. The type is fixed because
-    // QML may write any number.
+    // The numbers are stored. The type is fixed because QML may write any number.
     enum OnlineAGpsState : int {
         OnlineAGpsNotAgreed = 0, // the user has not agreed to the terms of the service
         OnlineAGpsDisabled = 1,
@@ -43,8 +38,8 @@ public:
     OnlineAGpsState mlsOnlineState() const;
     OnlineAGpsState hereState() const;
 
-    // A change is seen, and its signal emitted, before these return. The value that is stored
-    // already is not written again. A number that is no state is refused with a warning.
+    // Emit the signal of a change before they return. A number that is not a state is refused with
+    // a warning.
     void setGpsEnabled(bool enabled);
     void setMlsEnabled(bool enabled);
     void setMlsOnlineState(OnlineAGpsState state);

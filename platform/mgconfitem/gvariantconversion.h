@@ -15,28 +15,17 @@ struct GVariantUnref {
 };
 using GVariantPtr = std::unique_ptr<GVariant, GVariantUnref>;
 
-/*
-    The value as the settings database holds it: a boolean, an integer, a string, a string list, or a
-    map of these. Null, with a reason, for a value of any other type and for text that is not Unicode
-    or contains a NUL.
-*/
+// The value as dconf stores it: a boolean, an integer, a string, a string list, or a map of these.
+// Null, with a reason, for any other type and for text that is not Unicode or contains a NUL.
 GVariantPtr toGVariant(const QVariant &value, QString *reason);
 
-/*
-    The value as Qt holds it; invalid only if the data is damaged, because any stored value may count
-    as a choice.
-
-    Small integers become int or uint. An array of strings becomes a QStringList, a dictionary with
-    strings as keys a QVariantMap, and a variant what it contains. All other containers become a
-    QVariantList, and all other values an empty one.
-*/
+// The value as a QVariant, which is invalid only if the data is damaged. An array of strings
+// becomes a QStringList, a dictionary with strings as keys a QVariantMap, and a variant what it
+// contains. All other containers become a QVariantList, and values of unknown types an empty one.
 QVariant toQVariant(GVariant *value);
 
-/*
-    The same value, marked as trusted; null if it is damaged. In data that it does not trust, GLib
-    checks all previous elements of an array for each element: reading a list of 100,000 elements
-    would block the main thread for half a minute.
-*/
+// The same value, marked as trusted; null if it is damaged. GLib needs half a minute to read a list
+// of 100,000 elements that it does not trust.
 GVariantPtr trusted(GVariant *value);
 
 #endif

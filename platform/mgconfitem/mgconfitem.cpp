@@ -23,8 +23,8 @@ constexpr int unwatchDelayMs = 1000;
 
 DConfClient *client();
 
-// dconf sends one change at a time, in a thread of its own, so the last changes before the process
-// exits still wait there. dconf_client_sync() has no time limit and therefore runs in another thread.
+// dconf sends changes in a thread of its own, so the last ones still wait when the process exits.
+// dconf_client_sync() has no time limit and therefore runs in another thread.
 void flushWrites()
 {
     static auto *const done = new QSemaphore; // for the thread, which may outlast this function
@@ -65,9 +65,8 @@ bool sameData(GVariant *one, GVariant *other)
 }
 
 // dconf_client_read() opens the database before it searches the queue of writes. A write that
-// completes between these two steps is in neither of them, and the read returns the value from
-// before that write. This cannot happen again until this thread writes the key again. So at most
-// one of several reads in a row is wrong: if the first two differ, the third one is right.
+// completes in between is in neither, and the read returns the previous value. This cannot happen
+// again until this thread writes the key: if the first two reads differ, the third one is right.
 GVariantPtr readStored(const QByteArray &path)
 {
     const auto readOnce = [&path] {
@@ -90,7 +89,8 @@ void meetBus(GObject *, GAsyncResult *result, gpointer)
     GError *error = nullptr;
     GDBusConnection *const bus = g_bus_get_finish(result, &error);
     if (bus) {
-        // The connection that dconf uses, too. By default GLib ends the process when the bus goes.
+        // dconf uses the same connection. By default GLib ends the process when the bus
+        // disconnects.
         g_dbus_connection_set_exit_on_close(bus, FALSE);
         g_object_unref(bus);
         return;
@@ -117,9 +117,8 @@ void warnOfLimits()
     }
 }
 
-// Each watch and each unwatch is a message to the bus, which dconf queues without a limit. Pages may
-// create and destroy items faster than the bus takes messages: a key therefore stays watched for a
-// moment after its last item is gone.
+// dconf queues a message to the bus for each watch and unwatch, without a limit. Pages may create
+// and destroy items faster than the bus takes messages, so a key stays watched for a moment.
 void unwatchLater(const QByteArray &path)
 {
     static QSet<QByteArray> kept;

@@ -12,20 +12,19 @@
 #include <QVariant>
 
 /*
-    One key of the user's settings in dconf: reads it, writes it and follows its changes, whoever
-    makes them. For the main thread only.
+    Reads, writes and follows one key of the user's settings in dconf. For the main thread only.
 
-    A value that is set is seen by every item of the process on that key, and valueChanged() is
-    emitted, before set() returns; it is stored in the background, whether or not the item lives on.
-    If it could not be stored the key falls back to its old value, with another valueChanged().
+    Before set() returns, every item of the process on that key has the new value and emits
+    valueChanged(). The value is stored in the background, even if the item is deleted. If it cannot
+    be stored, the key gets its old value back, with another valueChanged().
 */
 class MGConfItem : public QObject
 {
     Q_OBJECT
 
 public:
-    // The key is an absolute path, as "/settings/location/enabled". An item on anything else warns
-    // once, has no value and stores nothing.
+    // Takes an absolute path such as "/settings/location/enabled". Another key gives a warning; the
+    // item then has no value and stores nothing.
     explicit MGConfItem(const QString &key, QObject *parent = nullptr);
     ~MGConfItem() override;
 
@@ -35,14 +34,13 @@ public:
     QVariant value() const;
     QVariant value(const QVariant &defaultValue) const;
 
-    // Stores booleans, integers, strings, string lists and maps of these. Any other value is refused
-    // with a warning and the key stays as it is; an invalid one unsets the key.
+    // Stores booleans, integers, strings, string lists and maps of these, and refuses other types
+    // with a warning. An invalid value unsets the key.
     void set(const QVariant &value);
     void unset();
 
 Q_SIGNALS:
-    // The key holds another value than before; storing an equal one does not emit it. A slot may
-    // set the key again or delete the item.
+    // Not emitted for an equal value. A slot may set the key again or delete the item.
     void valueChanged();
 
 private:

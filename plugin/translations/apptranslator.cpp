@@ -46,16 +46,15 @@ void AppTranslator::loadEngineeringEnglish()
 
 void AppTranslator::loadDefaultLocale()
 {
-    // Before the file is loaded: if it is replaced in between, the next language change loads it.
+    // First: if the file is replaced in between, the next language change loads it.
     m_loaded = digestForDefaultLocale();
     static_cast<void>(loadForDefaultLocale(this));
 }
 
 bool AppTranslator::eventFilter(QObject *watched, QEvent *event)
 {
-    // An installed translator that loads a file posts a language change to the application, even if
-    // it is the same file. A host that passes those on to the watched object would never come to
-    // rest, so only what is new is loaded.
+    // Loading a file posts another language change, which a host passes on to the watched object:
+    // only a new file is loaded, or this would never end.
     if (event->type() == QEvent::LanguageChange && digestForDefaultLocale() != m_loaded) {
         loadDefaultLocale();
     }

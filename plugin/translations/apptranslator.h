@@ -20,15 +20,14 @@ class AppTranslator : public QTranslator
 public:
     explicit AppTranslator(QObject *parent);
 
-    // Both replace what was loaded before. A catalog that does not exist is not an error: the
-    // translator is then empty, and the translators installed before it are asked.
+    // Without its catalog the translator is empty, which is not an error.
     void loadEngineeringEnglish();
     void loadDefaultLocale();
 
     bool eventFilter(QObject *watched, QEvent *event) override;
 
 private:
-    // The digest of the file that loadDefaultLocale() loaded, as far as it is known.
+    // The digest of the file that loadDefaultLocale() loaded.
     QByteArray m_loaded;
 };
 

@@ -6,10 +6,8 @@
 
 #include <QLatin1String>
 
-/*
-    The directory of the translation catalogs and the names of their files: a catalog "maps" has
-    maps_eng_en.qm for engineering English, and a file such as maps-fi.qm for each language.
-*/
+// The directory of the translation catalogs and the names of their files: a catalog "maps" has
+// maps_eng_en.qm for engineering English, and a file such as maps-fi.qm for each language.
 namespace CatalogFiles {
 
 const QLatin1String directory("/usr/share/translations");

@@ -52,7 +52,7 @@ void CatalogTable::addCatalogTranslator(const QString &user, const QString &cata
     } else {
         static_cast<void>(translator->load(QLocale(), catalog, prefix, directory));
     }
-    // Last, when the table is complete: it announces a language change, whose handler may call back.
+    // Last, because handlers of the language change may call back.
     QCoreApplication::installTranslator(translator);
 }
 
@@ -64,8 +64,8 @@ void CatalogTable::removeCatalogTranslator(const QString &user, const QString &c
     }
     known->users.remove(user);
     if (known->users.isEmpty()) {
-        // The translator is deleted with its owner, not here: this may run in a handler of the language
-        // change that a caller of the translator caused.
+        // The translator is deleted with its owner: this may run in a handler of its language
+        // change.
         QTranslator *translator = known->translator;
         m_entries.erase(known);
         QCoreApplication::removeTranslator(translator);

@@ -191,8 +191,8 @@ void TestExamples::runsThoseOfTheReference_data()
             }
         }
     }
-    // That each type has one is for the test of the reference to see.
-    QVERIFY(found >= 11);
+    // tst_reference checks that each type has one.
+    QVERIFY(found > 0);
 }
 
 void TestExamples::runsThoseOfTheReference()

@@ -5,8 +5,8 @@
 # usage: tst_reference.py SOURCES INDEX
 #
 # Checks that the documentation covers plugins.qmltypes: each type, each of its members and each
-# enumeration value has an entry in the reference, and the table in the README lists each type. INDEX
-# is the index file that qdoc writes.
+# enumeration value has an entry in the reference, each type an example and a picture, and the table in
+# the README lists each type. INDEX is the index file that qdoc writes.
 
 import collections
 import pathlib
@@ -65,6 +65,12 @@ for name, (members, values) in types.items():
     for value in values:
         if f"\\value {name}.{value} " not in pages:
             failures.append(f"{name}.{value} is not documented")
+comments = {re.search(r"\\qmltype (\w+)", comment)[1]: comment
+            for comment in re.findall(r"/\*!(?:(?!\*/).)*\\qmltype (?:(?!\*/).)*\*/", pages, re.DOTALL)}
+for name in types:
+    for what, command in (("example", r"\\qml$"), ("picture", r"\\image gallery-[\w-]+\.png ")):
+        if not re.search(command, comments.get(name, ""), re.MULTILINE):
+            failures.append(f"the reference has no {what} for {name}")
 readme = (sources / "README.md").read_text()
 for name in types:
     if not re.search(rf"^\|.*`{name}`", readme, re.MULTILINE):

@@ -20,19 +20,22 @@ ListView {
     // The user moved a row. The model has to follow.
     signal moved(int from, int to)
 
-    function moveFocused(from, to, button) {
-        moved(from, to);
-        // The row has kept its delegate; a button at the end of the list is disabled now.
-        if (button && !button.enabled) {
-            itemAtIndex(to).forceActiveFocus(Qt.TabFocusReason);
-        }
-    }
-
     implicitHeight: count * rowHeight
     interactive: false
+    // A current row takes the focus from its buttons when it is moved.
+    currentIndex: -1
 
     delegate: ItemDelegate {
         id: row
+
+        // The row keeps the focus at the end of the list, where the button is disabled.
+        function moveBy(step, button) {
+            list.moved(index, index + step);
+            if (!button.enabled) {
+                forceActiveFocus(Qt.TabFocusReason);
+            }
+        }
+
         focusPolicy: Qt.StrongFocus
         width: ListView.view.width
         height: list.rowHeight
@@ -64,7 +67,7 @@ ListView {
                 icon.source: "up.svg"
                 enabled: index > 0
                 Accessible.name: list.upText.arg(row.text)
-                onClicked: list.moveFocused(index, index - 1, this)
+                onClicked: row.moveBy(-1, upButton)
             }
             ToolButton {
                 id: downButton
@@ -73,7 +76,7 @@ ListView {
                 icon.source: "down.svg"
                 enabled: index < list.count - 1
                 Accessible.name: list.downText.arg(row.text)
-                onClicked: list.moveFocused(index, index + 1, this)
+                onClicked: row.moveBy(1, downButton)
             }
             MouseArea {
                 id: handle

@@ -6,11 +6,13 @@
 #include "files.h"
 #include "files/regularfile.h"
 #include "interfaceof.h"
+#include "locationswitches.h"
 #include "loggedtest.h"
-#include "mgconfitem.h"
 
 #include <QTranslator>
 #include <QtTest>
+
+#include <functional>
 
 class TestLocationConfiguration : public LoggedTest
 {
@@ -24,19 +26,16 @@ private Q_SLOTS:
 
     void startsWithTheStoredFlag_data();
     void startsWithTheStoredFlag();
-    void theFlagIsStored();
+    void theFlagIsStoredBeforeItsSignal();
     void theSameFlagWritesNothing();
     void theFlagIsNotFollowed();
-    void theFlagIsStoredBeforeItIsTold();
 
     void savesTheSwitches_data();
     void savesTheSwitches();
     void savingReplacesEverything();
     void restores_data();
     void restores();
-    void whatIsNoMapRestoresAsNothing_data();
-    void whatIsNoMapRestoresAsNothing();
-    void statesAreAskedAfterTheSwitchesBefore();
+    void statesAreReadAfterTheSwitchesBefore();
     void restoresInOrder();
     void anotherObjectRestores();
     void sharesWithAnotherProcess();
@@ -44,40 +43,24 @@ private Q_SLOTS:
 
     void agreement_data();
     void agreement();
-    void agreementInEnglish_data();
-    void agreementInEnglish();
-    void noAgreement_data();
-    void noAgreement();
-    void anAgreementThatCannotBeOpened_data();
-    void anAgreementThatCannotBeOpened();
-    void englishThatCannotBeOpened_data();
-    void englishThatCannotBeOpened();
+    void missingAgreementsAreTranslated();
     void agreementContent_data();
     void agreementContent();
     void agreementsAreReadOnEveryRead();
-
-private:
-    void setSwitches(bool gps, bool mls, int mlsOnline, int here);
-    void addAgreements();
 };
-
-using State = LocationSettings::OnlineAGpsState;
 
 namespace {
 
 const QString flagKey = QStringLiteral("/settings/location/custom_settings_enabled");
 const QString savedKey = QStringLiteral("/settings/location/custom_settings");
 const QString noTextId = QStringLiteral("settings_location-la-no_agreement_text_found");
+const QString mlsAgreements =
+    QStringLiteral("/usr/share/geoclue-provider-mlsdb/agreements/mls_consent_");
+const QString hereAgreements =
+    QStringLiteral("/usr/share/libherepositioning/agreements/here_consent_");
 
-QVariant stored(const QString &key)
-{
-    return MGConfItem(key).value();
-}
-
-void store(const QString &key, const QVariant &value)
-{
-    MGConfItem(key).set(value);
-}
+// Makes agreements whose paths begin with the text.
+using Make = std::function<void(const QString &)>;
 
 QVariantMap savedMap(bool gps, bool mls, bool mlsOnline, bool here)
 {
@@ -87,50 +70,43 @@ QVariantMap savedMap(bool gps, bool mls, bool mlsOnline, bool here)
             {QStringLiteral("here/enabled"), here}};
 }
 
-QString warning(const char *locale)
+void setSwitches(const Switches &values)
+{
+    LocationSettings settings;
+    setSwitches(&settings, values);
+}
+
+QString warning(const QString &locale)
 {
     return QStringLiteral(
                "warning [default] No agreement found for \"%1\" , falling back to english")
-        .arg(QString::fromLatin1(locale));
+        .arg(locale);
 }
 
 class Translator : public QTranslator
 {
 public:
     bool isEmpty() const override { return false; }
-    QString translate(const char *context, const char *sourceText, const char *disambiguation,
-                      int n) const override
+    QString translate(const char *, const char *sourceText, const char *, int) const override
     {
-        Q_UNUSED(context)
-        Q_UNUSED(disambiguation)
-        Q_UNUSED(n)
         return sourceText == noTextId.toLatin1() ? QStringLiteral("Tekstiä ei ole") : QString();
     }
 };
 
 } // namespace
 
+Q_DECLARE_METATYPE(Make)
+
 void TestLocationConfiguration::init()
 {
-    for (const char *key : {"gps_enabled", "mls_enabled", "mls_online_state", "here_state",
-                            "custom_settings", "custom_settings_enabled"}) {
-        MGConfItem(QStringLiteral("/settings/location/") + QString::fromLatin1(key)).unset();
+    for (const QString &key : switchKeys + QStringList{flagKey, savedKey}) {
+        MGConfItem(key).unset();
     }
-    for (const char *directory : {"/usr/share/geoclue-provider-mlsdb/agreements",
-                                  "/usr/share/libherepositioning/agreements"}) {
-        Files::remove(QString::fromLatin1(directory));
+    for (const QString &agreements : {mlsAgreements, hereAgreements}) {
+        Files::remove(QFileInfo(agreements).path());
     }
     QLocale::setDefault(QLocale(QStringLiteral("fi_FI")));
     LoggedTest::init();
-}
-
-void TestLocationConfiguration::setSwitches(bool gps, bool mls, int mlsOnline, int here)
-{
-    LocationSettings settings;
-    settings.setGpsEnabled(gps);
-    settings.setMlsEnabled(mls);
-    settings.setMlsOnlineState(State(mlsOnline));
-    settings.setHereState(State(here));
 }
 
 void TestLocationConfiguration::propertiesAndMethods()
@@ -189,21 +165,17 @@ void TestLocationConfiguration::startsWithTheStoredFlag()
     QCOMPARE(stored(flagKey), value);
 }
 
-void TestLocationConfiguration::theFlagIsStored()
+void TestLocationConfiguration::theFlagIsStoredBeforeItsSignal()
 {
     LocationConfiguration configuration;
-    QSignalSpy changed(&configuration, &LocationConfiguration::customSettingsEnabledChanged);
+    QVariantList seen;
+    connect(&configuration, &LocationConfiguration::customSettingsEnabledChanged, this,
+            [&] { seen << configuration.customSettingsEnabled() << stored(flagKey); });
     configuration.setCustomSettingsEnabled(true);
-    QVERIFY(configuration.customSettingsEnabled());
-    QCOMPARE(changed.size(), 1);
-    QCOMPARE(stored(flagKey), QVariant(true));
-    const LocationConfiguration later;
-    QVERIFY(later.customSettingsEnabled());
-
+    QCOMPARE(seen, QVariantList({true, true}));
+    QVERIFY(LocationConfiguration().customSettingsEnabled());
     configuration.setCustomSettingsEnabled(false);
-    QVERIFY(!configuration.customSettingsEnabled());
-    QCOMPARE(changed.size(), 2);
-    QCOMPARE(stored(flagKey), QVariant(false));
+    QCOMPARE(seen, QVariantList({true, true, false, false}));
 }
 
 void TestLocationConfiguration::theSameFlagWritesNothing()
@@ -231,206 +203,144 @@ void TestLocationConfiguration::theFlagIsNotFollowed()
     QVERIFY(changed.isEmpty());
 }
 
-void TestLocationConfiguration::theFlagIsStoredBeforeItIsTold()
-{
-    LocationConfiguration configuration;
-    bool flag = false;
-    QVariant inStore;
-    connect(&configuration, &LocationConfiguration::customSettingsEnabledChanged, this, [&] {
-        flag = configuration.customSettingsEnabled();
-        inStore = stored(flagKey);
-    });
-    configuration.setCustomSettingsEnabled(true);
-    QVERIFY(flag);
-    QCOMPARE(inStore, QVariant(true));
-}
-
 void TestLocationConfiguration::savesTheSwitches_data()
 {
-    QTest::addColumn<bool>("gps");
-    QTest::addColumn<bool>("mls");
-    QTest::addColumn<int>("mlsOnline");
-    QTest::addColumn<int>("here");
-    QTest::newRow("all off") << false << false << 0 << 0;
-    QTest::newRow("all on") << true << true << 2 << 2;
-    QTest::newRow("gps") << true << false << 0 << 1;
-    QTest::newRow("mls") << false << true << 1 << 0;
-    QTest::newRow("mls online") << false << false << 2 << 1;
-    QTest::newRow("here") << false << false << 1 << 2;
+    QTest::addColumn<Switches>("switches");
+    QTest::newRow("all off") << Switches{0, 0, 0, 0};
+    QTest::newRow("all on") << Switches{1, 1, 2, 2};
+    QTest::newRow("gps") << Switches{1, 0, 0, 1};
+    QTest::newRow("mls") << Switches{0, 1, 1, 0};
+    QTest::newRow("mls online") << Switches{0, 0, 2, 1};
+    QTest::newRow("here") << Switches{0, 0, 1, 2};
 }
 
 void TestLocationConfiguration::savesTheSwitches()
 {
-    QFETCH(bool, gps);
-    QFETCH(bool, mls);
-    QFETCH(int, mlsOnline);
-    QFETCH(int, here);
-    setSwitches(gps, mls, mlsOnline, here);
+    QFETCH(const Switches, switches);
+    setSwitches(switches);
     LocationConfiguration configuration;
     configuration.saveCustomSettings();
-    QCOMPARE(stored(savedKey), QVariant(savedMap(gps, mls, mlsOnline == 2, here == 2)));
+    QCOMPARE(stored(savedKey),
+             QVariant(savedMap(switches[0], switches[1], switches[2] == 2, switches[3] == 2)));
 
-    // Nothing else is touched.
-    QCOMPARE(configuration.gpsEnabled(), gps);
-    QCOMPARE(int(configuration.mlsOnlineState()), mlsOnline);
+    // Nothing else is changed.
+    QCOMPARE(switchesOf(configuration), switches);
     QVERIFY(!configuration.customSettingsEnabled());
     QVERIFY(!stored(flagKey).isValid());
 }
 
 void TestLocationConfiguration::savingReplacesEverything()
 {
-    store(savedKey, QVariantMap{{QStringLiteral("another"), 1}});
     LocationConfiguration configuration;
-    configuration.saveCustomSettings();
-    QCOMPARE(stored(savedKey), QVariant(savedMap(false, false, false, false)));
-    store(savedKey, QStringLiteral("no map"));
-    configuration.saveCustomSettings();
-    QCOMPARE(stored(savedKey), QVariant(savedMap(false, false, false, false)));
+    for (const QVariant &before : {QVariant(QVariantMap{{QStringLiteral("another"), 1}}),
+                                   QVariant(QStringLiteral("no map"))}) {
+        store(savedKey, before);
+        configuration.saveCustomSettings();
+        QCOMPARE(stored(savedKey), QVariant(savedMap(false, false, false, false)));
+    }
 }
 
 void TestLocationConfiguration::restores_data()
 {
-    QTest::addColumn<QVariantMap>("saved");
-    QTest::addColumn<QList<int>>("before");
-    QTest::addColumn<QList<int>>("after");
+    QTest::addColumn<QVariant>("saved");
+    QTest::addColumn<Switches>("before");
+    QTest::addColumn<Switches>("after");
 
+    const auto row = [](const char *name, const QVariant &saved, const Switches &before,
+                        const Switches &after) { QTest::newRow(name) << saved << before << after; };
     const QVariantMap allOn = savedMap(true, true, true, true);
     const QVariantMap allOff = savedMap(false, false, false, false);
-    const QVariantMap nothing;
-    QTest::newRow("on from off") << allOn << QList<int>{0, 0, 1, 1} << QList<int>{1, 1, 2, 2};
-    QTest::newRow("on from on") << allOn << QList<int>{1, 1, 2, 2} << QList<int>{1, 1, 2, 2};
-    QTest::newRow("off from on") << allOff << QList<int>{1, 1, 2, 2} << QList<int>{0, 0, 1, 1};
-    QTest::newRow("off from off") << allOff << QList<int>{0, 0, 1, 1} << QList<int>{0, 0, 1, 1};
-    QTest::newRow("on, not agreed") << allOn << QList<int>{0, 0, 0, 0} << QList<int>{1, 1, 0, 0};
-    QTest::newRow("off, not agreed") << allOff << QList<int>{1, 1, 0, 0} << QList<int>{0, 0, 0, 0};
-    QTest::newRow("agreed to one") << allOn << QList<int>{0, 0, 0, 1} << QList<int>{1, 1, 0, 2};
-    QTest::newRow("agreed to the other")
-        << allOn << QList<int>{0, 0, 1, 0} << QList<int>{1, 1, 2, 0};
-    QTest::newRow("gps") << savedMap(true, false, false, false) << QList<int>{0, 1, 2, 2}
-                         << QList<int>{1, 0, 1, 1};
-    QTest::newRow("mls") << savedMap(false, true, false, false) << QList<int>{1, 0, 2, 2}
-                         << QList<int>{0, 1, 1, 1};
-    QTest::newRow("mls online") << savedMap(false, false, true, false) << QList<int>{1, 1, 1, 2}
-                                << QList<int>{0, 0, 2, 1};
-    QTest::newRow("here") << savedMap(false, false, false, true) << QList<int>{1, 1, 2, 1}
-                          << QList<int>{0, 0, 1, 2};
-    QTest::newRow("nothing saved") << nothing << QList<int>{1, 1, 2, 2} << QList<int>{0, 0, 1, 1};
-    QTest::newRow("nothing saved, not agreed")
-        << nothing << QList<int>{1, 1, 0, 0} << QList<int>{0, 0, 0, 0};
-    QTest::newRow("one entry") << QVariantMap{{QStringLiteral("mls/enabled"), true}}
-                               << QList<int>{1, 0, 2, 2} << QList<int>{0, 1, 1, 1};
-    QTest::newRow("entries of other types")
-        << QVariantMap{{QStringLiteral("gps/enabled"), 1},
-                       {QStringLiteral("mls/enabled"), QStringLiteral("true")},
-                       {QStringLiteral("mls/online_enabled"), QStringLiteral("false")},
-                       {QStringLiteral("here/enabled"),
-                        QStringList{QStringLiteral("a"), QStringLiteral("b")}}}
-        << QList<int>{0, 0, 2, 2} << QList<int>{1, 1, 1, 1};
+    row("on from off", allOn, {0, 0, 1, 1}, {1, 1, 2, 2});
+    row("on from on", allOn, {1, 1, 2, 2}, {1, 1, 2, 2});
+    row("off from on", allOff, {1, 1, 2, 2}, {0, 0, 1, 1});
+    row("off from off", allOff, {0, 0, 1, 1}, {0, 0, 1, 1});
+    row("on, not agreed", allOn, {0, 0, 0, 0}, {1, 1, 0, 0});
+    row("off, not agreed", allOff, {1, 1, 0, 0}, {0, 0, 0, 0});
+    row("agreed to one", allOn, {0, 0, 0, 1}, {1, 1, 0, 2});
+    row("agreed to the other", allOn, {0, 0, 1, 0}, {1, 1, 2, 0});
+    row("gps", savedMap(true, false, false, false), {0, 1, 2, 2}, {1, 0, 1, 1});
+    row("mls", savedMap(false, true, false, false), {1, 0, 2, 2}, {0, 1, 1, 1});
+    row("mls online", savedMap(false, false, true, false), {1, 1, 1, 2}, {0, 0, 2, 1});
+    row("here", savedMap(false, false, false, true), {1, 1, 2, 1}, {0, 0, 1, 2});
+    row("nothing saved", {}, {1, 1, 2, 2}, {0, 0, 1, 1});
+    row("nothing saved, not agreed", {}, {1, 1, 0, 0}, {0, 0, 0, 0});
+    const QString mls = QStringLiteral("mls/enabled");
+    row("one entry", QVariantMap{{mls, true}}, {1, 0, 2, 2}, {0, 1, 1, 1});
+    row("entries of other types",
+        QVariantMap{{QStringLiteral("gps/enabled"), 1},
+                    {mls, QStringLiteral("true")},
+                    {QStringLiteral("mls/online_enabled"), QStringLiteral("false")},
+                    {QStringLiteral("here/enabled"), QStringList{mls, mls}}},
+        {0, 0, 2, 2}, {1, 1, 1, 1});
+    row("a boolean, no map", true, {1, 1, 2, 0}, {0, 0, 1, 0});
+    row("text, no map", mls, {1, 1, 2, 0}, {0, 0, 1, 0});
+    row("a list, no map", QStringList(mls), {1, 1, 2, 0}, {0, 0, 1, 0});
 }
 
 void TestLocationConfiguration::restores()
 {
-    QFETCH(QVariantMap, saved);
-    QFETCH(QList<int>, before);
-    QFETCH(QList<int>, after);
-    if (!saved.isEmpty()) {
-        store(savedKey, saved);
-    }
-    setSwitches(before[0] != 0, before[1] != 0, before[2], before[3]);
+    QFETCH(const QVariant, saved);
+    QFETCH(const Switches, before);
+    QFETCH(const Switches, after);
+    store(savedKey, saved);
+    setSwitches(before);
     LocationConfiguration configuration;
     configuration.restoreCustomSettings();
-    const QList<int> now = {configuration.gpsEnabled(), configuration.mlsEnabled(),
-                            configuration.mlsOnlineState(), configuration.hereState()};
-    QCOMPARE(now, after);
+    QCOMPARE(switchesOf(configuration), after);
 
-    // Nothing else is touched.
-    QCOMPARE(stored(savedKey).toMap(), saved);
+    // Nothing else is changed.
+    QCOMPARE(stored(savedKey), saved);
     QVERIFY(!configuration.customSettingsEnabled());
     QVERIFY(!stored(flagKey).isValid());
 }
 
-void TestLocationConfiguration::whatIsNoMapRestoresAsNothing_data()
-{
-    QTest::addColumn<QVariant>("value");
-    QTest::newRow("boolean") << QVariant(true);
-    QTest::newRow("text") << QVariant(QStringLiteral("gps/enabled"));
-    QTest::newRow("list") << QVariant(QStringList(QStringLiteral("gps/enabled")));
-}
-
-void TestLocationConfiguration::whatIsNoMapRestoresAsNothing()
-{
-    QFETCH(QVariant, value);
-    store(savedKey, value);
-    setSwitches(true, true, 2, 0);
-    LocationConfiguration configuration;
-    configuration.restoreCustomSettings();
-    QVERIFY(!configuration.gpsEnabled());
-    QVERIFY(!configuration.mlsEnabled());
-    QCOMPARE(configuration.mlsOnlineState(), State(1));
-    QCOMPARE(configuration.hereState(), State(0));
-}
-
-void TestLocationConfiguration::statesAreAskedAfterTheSwitchesBefore()
+void TestLocationConfiguration::statesAreReadAfterTheSwitchesBefore()
 {
     store(savedKey, savedMap(true, true, true, true));
     LocationConfiguration configuration;
-    // As a platform may do that offers the online services only with positioning by network.
+    // Like a platform that offers the online services only with positioning by network.
     connect(&configuration, &LocationSettings::mlsEnabledChanged, this,
             [&configuration] { configuration.setMlsOnlineState(State(1)); });
     connect(&configuration, &LocationSettings::mlsOnlineStateChanged, this,
             [&configuration] { configuration.setHereState(State(1)); });
     configuration.restoreCustomSettings();
-    QCOMPARE(configuration.mlsOnlineState(), State(2));
-    QCOMPARE(configuration.hereState(), State(2));
+    QCOMPARE(switchesOf(configuration), Switches({1, 1, 2, 2}));
 }
 
 void TestLocationConfiguration::restoresInOrder()
 {
     store(savedKey, savedMap(true, true, true, true));
-    setSwitches(false, false, 1, 1);
+    setSwitches({0, 0, 1, 1});
     LocationConfiguration configuration;
-    QStringList order;
-    connect(&configuration, &LocationSettings::gpsEnabledChanged, this,
-            [&order] { order.append(QStringLiteral("gps")); });
-    connect(&configuration, &LocationSettings::mlsEnabledChanged, this,
-            [&order] { order.append(QStringLiteral("mls")); });
-    connect(&configuration, &LocationSettings::mlsOnlineStateChanged, this,
-            [&order] { order.append(QStringLiteral("mls online")); });
-    connect(&configuration, &LocationSettings::hereStateChanged, this,
-            [&order] { order.append(QStringLiteral("here")); });
+    QStringList changes;
+    recordChanges(&configuration, &changes);
     configuration.restoreCustomSettings();
-    QCOMPARE(order.join(QLatin1Char(',')), QStringLiteral("gps,mls,mls online,here"));
+    QCOMPARE(changes.join(QLatin1Char(',')), QStringLiteral("gps 1,mls 1,mls online 2,here 2"));
 }
 
 void TestLocationConfiguration::anotherObjectRestores()
 {
-    setSwitches(true, false, 2, 1);
-    {
-        LocationConfiguration configuration;
-        configuration.saveCustomSettings();
-    }
-    setSwitches(false, true, 1, 2);
+    setSwitches({1, 0, 2, 1});
+    LocationConfiguration().saveCustomSettings();
+    setSwitches({0, 1, 1, 2});
     LocationConfiguration configuration;
     configuration.restoreCustomSettings();
-    QVERIFY(configuration.gpsEnabled());
-    QVERIFY(!configuration.mlsEnabled());
-    QCOMPARE(configuration.mlsOnlineState(), State(2));
-    QCOMPARE(configuration.hereState(), State(1));
+    QCOMPARE(switchesOf(configuration), Switches({1, 0, 2, 1}));
 
     // If the settings were saved before the user agreed to a service, restoring them later disables
     // it.
-    setSwitches(true, false, 0, 1);
+    setSwitches({1, 0, 0, 1});
     configuration.saveCustomSettings();
     configuration.restoreCustomSettings();
     QCOMPARE(configuration.mlsOnlineState(), State(0));
-    setSwitches(true, false, 2, 1);
+    setSwitches({1, 0, 2, 1});
     configuration.restoreCustomSettings();
     QCOMPARE(configuration.mlsOnlineState(), State(1));
 }
 
 void TestLocationConfiguration::sharesWithAnotherProcess()
 {
-    setSwitches(true, false, 2, 1);
+    setSwitches({1, 0, 2, 1});
     LocationConfiguration configuration;
     configuration.saveCustomSettings();
     configuration.setCustomSettingsEnabled(true);
@@ -441,13 +351,9 @@ void TestLocationConfiguration::sharesWithAnotherProcess()
                         "'mls/online_enabled': <true>}"));
 
     DconfTool::write(savedKey, "{'mls/enabled': <true>, 'here/enabled': <true>}");
-    MGConfItem saved(savedKey);
-    QTRY_COMPARE(saved.value().toMap().size(), 2);
+    QTRY_COMPARE(stored(savedKey).toMap().size(), 2);
     configuration.restoreCustomSettings();
-    QVERIFY(!configuration.gpsEnabled());
-    QVERIFY(configuration.mlsEnabled());
-    QCOMPARE(configuration.mlsOnlineState(), State(1));
-    QCOMPARE(configuration.hereState(), State(2));
+    QCOMPARE(switchesOf(configuration), Switches({0, 1, 1, 2}));
 }
 
 void TestLocationConfiguration::restoresOverChangesThatAreNotDeliveredYet()
@@ -459,127 +365,89 @@ void TestLocationConfiguration::restoresOverChangesThatAreNotDeliveredYet()
                    "[/]\ngps_enabled=true\nmls_online_state=2\n");
     configuration.restoreCustomSettings();
     DconfTool::waitUntilStored();
-    QCOMPARE(DconfTool::read(QStringLiteral("/settings/location/gps_enabled")),
-             QByteArray("false"));
-    QCOMPARE(DconfTool::read(QStringLiteral("/settings/location/mls_online_state")),
-             QByteArray("1"));
-}
-
-void TestLocationConfiguration::addAgreements()
-{
-    QTest::addColumn<QByteArray>("property");
-    QTest::addColumn<QString>("base");
-    QTest::newRow("mls") << QByteArray("mlsOnlineAgreementText")
-                         << QStringLiteral(
-                                "/usr/share/geoclue-provider-mlsdb/agreements/mls_consent_");
-    QTest::newRow("here") << QByteArray("hereAgreementText")
-                          << QStringLiteral(
-                                 "/usr/share/libherepositioning/agreements/here_consent_");
+    QCOMPARE(DconfTool::read(gpsKey), QByteArray("false"));
+    QCOMPARE(DconfTool::read(mlsOnlineKey), QByteArray("1"));
 }
 
 void TestLocationConfiguration::agreement_data()
 {
-    addAgreements();
+    QTest::addColumn<QByteArray>("property");
+    QTest::addColumn<QString>("base");
+    QTest::addColumn<QString>("locale");
+    QTest::addColumn<Make>("make");
+    QTest::addColumn<QString>("text");
+    QTest::addColumn<bool>("isWarned");
+
+    const auto row = [](const char *name, const char *locale, const Make &make, const QString &text,
+                        bool isWarned) {
+        QTest::addRow("mls: %s", name) << QByteArray("mlsOnlineAgreementText") << mlsAgreements
+                                       << locale << make << text << isWarned;
+        QTest::addRow("here: %s", name) << QByteArray("hereAgreementText") << hereAgreements
+                                        << locale << make << text << isWarned;
+    };
+    const Make english = [](const QString &base) {
+        Files::write(base + QStringLiteral("en_GB.txt"), "Agreement\n");
+        Files::write(base + QStringLiteral("fi.txt"), "not the name of a locale");
+    };
+    const auto finnish = [english](const Make &make) -> Make {
+        return [=](const QString &base) {
+            english(base);
+            make(base + QStringLiteral("fi_FI.txt"));
+        };
+    };
+    const QString agreement = QStringLiteral("Agreement\n");
+    row("in the language", "fi_FI",
+        finnish([](const QString &path) { Files::write(path, "Sopimus\n"); }),
+        QStringLiteral("Sopimus\n"), false);
+    row("in English instead", "fi_FI", english, agreement, true);
+    row("in English instead of C", "C", english, agreement, true);
+    row("in English, the language", "en_GB", english, agreement, false);
+    const Make none = [](const QString &) {};
+    row("none", "fi_FI", none, noTextId, true);
+    row("none in English, the language", "en_GB", none, noTextId, true);
+    row(
+        "English that cannot be opened", "fi_FI",
+        [](const QString &base) {
+            Files::makeDirectory(QFileInfo(base).path());
+            Files::makePipe(base + QStringLiteral("en_GB.txt"));
+        },
+        noTextId, true);
+    // English does not replace a file that exists.
+    row("directory", "fi_FI", finnish(Files::makeDirectory), noTextId, false);
+    row("pipe", "fi_FI", finnish(Files::makePipe), noTextId, false);
+    row("device", "fi_FI",
+        finnish([](const QString &path) { Files::makeLink(QStringLiteral("/dev/zero"), path); }),
+        noTextId, false);
+    row("too large", "fi_FI",
+        finnish([](const QString &path) { Files::makeSparse(path, maximumTextSize + 1); }),
+        noTextId, false);
+    row("as large as possible", "fi_FI",
+        finnish([](const QString &path) { Files::makeSparse(path, maximumTextSize); }), QString(),
+        false);
 }
 
 void TestLocationConfiguration::agreement()
 {
-    QFETCH(QByteArray, property);
-    QFETCH(QString, base);
-    Files::write(base + QStringLiteral("fi_FI.txt"), "Sopimus\n");
-    Files::write(base + QStringLiteral("en_GB.txt"), "Agreement\n");
-    Files::write(base + QStringLiteral("fi.txt"), "no locale's name");
-    const LocationConfiguration configuration;
-    QCOMPARE(configuration.property(property).toString(), QStringLiteral("Sopimus\n"));
+    QFETCH(const QByteArray, property);
+    QFETCH(const QString, base);
+    QFETCH(const QString, locale);
+    QFETCH(const Make, make);
+    QFETCH(const QString, text);
+    QFETCH(const bool, isWarned);
+    QLocale::setDefault(QLocale(locale));
+    make(base);
+    QCOMPARE(LocationConfiguration().property(property).toString(), text);
+    QCOMPARE(m_log->takeReport(), isWarned ? warning(locale) : QString());
 }
 
-void TestLocationConfiguration::agreementInEnglish_data()
+void TestLocationConfiguration::missingAgreementsAreTranslated()
 {
-    addAgreements();
-}
-
-void TestLocationConfiguration::agreementInEnglish()
-{
-    QFETCH(QByteArray, property);
-    QFETCH(QString, base);
-    Files::write(base + QStringLiteral("fi.txt"), "no locale's name");
-    Files::write(base + QStringLiteral("en_GB.txt"), "Agreement\n");
-    const LocationConfiguration configuration;
-    QCOMPARE(configuration.property(property).toString(), QStringLiteral("Agreement\n"));
-    QCOMPARE(m_log->takeReport(), warning("fi_FI"));
-
-    QLocale::setDefault(QLocale::c());
-    QCOMPARE(configuration.property(property).toString(), QStringLiteral("Agreement\n"));
-    QCOMPARE(m_log->takeReport(), warning("C"));
-
-    QLocale::setDefault(QLocale(QStringLiteral("en_GB")));
-    QCOMPARE(configuration.property(property).toString(), QStringLiteral("Agreement\n"));
-}
-
-void TestLocationConfiguration::noAgreement_data()
-{
-    addAgreements();
-}
-
-void TestLocationConfiguration::noAgreement()
-{
-    QFETCH(QByteArray, property);
-    const LocationConfiguration configuration;
-    QCOMPARE(configuration.property(property).toString(), noTextId);
-    QCOMPARE(m_log->takeReport(), warning("fi_FI"));
-
     Translator translator;
     QVERIFY(QCoreApplication::installTranslator(&translator));
-    QCOMPARE(configuration.property(property).toString(), QStringLiteral("Tekstiä ei ole"));
-    QCOMPARE(m_log->takeReport(), warning("fi_FI"));
-
-    // English is looked for, and warned of, even where it is the language.
-    QLocale::setDefault(QLocale(QStringLiteral("en_GB")));
-    QCOMPARE(configuration.property(property).toString(), QStringLiteral("Tekstiä ei ole"));
-    QCOMPARE(m_log->takeReport(), warning("en_GB"));
-}
-
-void TestLocationConfiguration::anAgreementThatCannotBeOpened_data()
-{
-    addAgreements();
-}
-
-void TestLocationConfiguration::anAgreementThatCannotBeOpened()
-{
-    QFETCH(QByteArray, property);
-    QFETCH(QString, base);
-    const QString path = base + QStringLiteral("fi_FI.txt");
-    Files::write(base + QStringLiteral("en_GB.txt"), "Agreement\n");
     const LocationConfiguration configuration;
-    Files::makeDirectory(path);
-    QCOMPARE(configuration.property(property).toString(), noTextId);
-    Files::remove(path);
-    Files::makePipe(path);
-    QCOMPARE(configuration.property(property).toString(), noTextId);
-    Files::remove(path);
-    Files::makeLink(QStringLiteral("/dev/zero"), path);
-    QCOMPARE(configuration.property(property).toString(), noTextId);
-    Files::remove(path);
-    Files::makeSparse(path, maximumTextSize + 1);
-    QCOMPARE(configuration.property(property).toString(), noTextId);
-    Files::makeSparse(path, maximumTextSize);
-    QCOMPARE(configuration.property(property).toString(), QString());
-}
-
-void TestLocationConfiguration::englishThatCannotBeOpened_data()
-{
-    addAgreements();
-}
-
-void TestLocationConfiguration::englishThatCannotBeOpened()
-{
-    QFETCH(QByteArray, property);
-    QFETCH(QString, base);
-    Files::makeDirectory(QFileInfo(base).path());
-    Files::makePipe(base + QStringLiteral("en_GB.txt"));
-    const LocationConfiguration configuration;
-    QCOMPARE(configuration.property(property).toString(), noTextId);
-    QCOMPARE(m_log->takeReport(), warning("fi_FI"));
+    QCOMPARE(configuration.mlsOnlineAgreementText(), QStringLiteral("Tekstiä ei ole"));
+    QCOMPARE(configuration.hereAgreementText(), QStringLiteral("Tekstiä ei ole"));
+    QCOMPARE(m_log->takeAll().size(), 2);
 }
 
 void TestLocationConfiguration::agreementContent_data()
@@ -603,8 +471,7 @@ void TestLocationConfiguration::agreementContent()
 {
     QFETCH(QByteArray, content);
     QFETCH(QString, text);
-    Files::write(QStringLiteral("/usr/share/libherepositioning/agreements/here_consent_fi_FI.txt"),
-                 content);
+    Files::write(hereAgreements + QStringLiteral("fi_FI.txt"), content);
     const LocationConfiguration configuration;
     QCOMPARE(configuration.hereAgreementText(), text);
     QVERIFY(!configuration.hereAgreementText().isNull());
@@ -612,13 +479,11 @@ void TestLocationConfiguration::agreementContent()
 
 void TestLocationConfiguration::agreementsAreReadOnEveryRead()
 {
-    const QString base =
-        QStringLiteral("/usr/share/geoclue-provider-mlsdb/agreements/mls_consent_");
-    Files::write(base + QStringLiteral("fi_FI.txt"), "one");
-    Files::write(base + QStringLiteral("de_DE.txt"), "zwei");
+    Files::write(mlsAgreements + QStringLiteral("fi_FI.txt"), "one");
+    Files::write(mlsAgreements + QStringLiteral("de_DE.txt"), "zwei");
     const LocationConfiguration configuration;
     QCOMPARE(configuration.mlsOnlineAgreementText(), QStringLiteral("one"));
-    Files::write(base + QStringLiteral("fi_FI.txt"), "two");
+    Files::write(mlsAgreements + QStringLiteral("fi_FI.txt"), "two");
     QCOMPARE(configuration.mlsOnlineAgreementText(), QStringLiteral("two"));
     QLocale::setDefault(QLocale(QStringLiteral("de_DE")));
     QCOMPARE(configuration.mlsOnlineAgreementText(), QStringLiteral("zwei"));

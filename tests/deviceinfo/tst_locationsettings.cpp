@@ -2,9 +2,9 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 #include "dconftool.h"
-#include "locationsettings.h"
+#include "interfaceof.h"
+#include "locationswitches.h"
 #include "loggedtest.h"
-#include "mgconfitem.h"
 
 #include <QProcess>
 #include <QtTest>
@@ -18,16 +18,16 @@ class TestLocationSettings : public LoggedTest
 private Q_SLOTS:
     void init();
 
-    void properties();
+    void interface();
     void statesAreNumbers();
     void defaults();
     void settersStore();
     void sameValuesStoreNothing();
-    void readsWhatIsStored();
+    void readsStoredValues();
     void nonsenseReadsAsTheDefault_data();
     void nonsenseReadsAsTheDefault();
-    void refusesWhatIsNoState_data();
-    void refusesWhatIsNoState();
+    void refusesOtherNumbers_data();
+    void refusesOtherNumbers();
     void objectsAgree();
     void emitsOnRealChangesOnly();
     void aHandlerMayCallBack();
@@ -38,38 +38,22 @@ private Q_SLOTS:
     void anotherProcessFollows();
 };
 
-using State = LocationSettings::OnlineAGpsState;
-
 namespace {
 
-const QString gpsKey = QStringLiteral("/settings/location/gps_enabled");
-const QString mlsKey = QStringLiteral("/settings/location/mls_enabled");
-const QString mlsOnlineKey = QStringLiteral("/settings/location/mls_online_state");
-const QString hereKey = QStringLiteral("/settings/location/here_state");
-
-QVariant stored(const QString &key)
-{
-    return MGConfItem(key).value();
-}
-
-void store(const QString &key, const QVariant &value)
-{
-    MGConfItem(key).set(value);
-}
-
-// Another process: it prints a line for each change, and sets two switches for each line it reads.
+// Another process: it prints its switches after each change, and sets two for each line it reads.
 int another(QCoreApplication &application)
 {
     LocationSettings settings;
     const auto say = [&settings] {
-        std::printf("%d %d %d %d\n", settings.gpsEnabled(), settings.mlsEnabled(),
-                    settings.mlsOnlineState(), settings.hereState());
+        const Switches switches = switchesOf(settings);
+        std::printf("%d %d %d %d\n", switches[0], switches[1], switches[2], switches[3]);
         std::fflush(stdout);
     };
-    QObject::connect(&settings, &LocationSettings::gpsEnabledChanged, &settings, say);
-    QObject::connect(&settings, &LocationSettings::mlsEnabledChanged, &settings, say);
-    QObject::connect(&settings, &LocationSettings::mlsOnlineStateChanged, &settings, say);
-    QObject::connect(&settings, &LocationSettings::hereStateChanged, &settings, say);
+    for (const auto changed :
+         {&LocationSettings::gpsEnabledChanged, &LocationSettings::mlsEnabledChanged,
+          &LocationSettings::mlsOnlineStateChanged, &LocationSettings::hereStateChanged}) {
+        QObject::connect(&settings, changed, &settings, say);
+    }
 
     QSocketNotifier input(0, QSocketNotifier::Read);
     QObject::connect(&input, &QSocketNotifier::activated, &settings, [&] {
@@ -89,27 +73,25 @@ int another(QCoreApplication &application)
 
 void TestLocationSettings::init()
 {
-    for (const QString &key : {gpsKey, mlsKey, mlsOnlineKey, hereKey}) {
+    for (const QString &key : switchKeys) {
         MGConfItem(key).unset();
     }
     LoggedTest::init();
 }
 
-void TestLocationSettings::properties()
+void TestLocationSettings::interface()
 {
-    const QMetaObject &type = LocationSettings::staticMetaObject;
-    QStringList names;
-    for (int i = type.propertyOffset(); i < type.propertyCount(); ++i) {
-        const QMetaProperty property = type.property(i);
-        names.append(QString::fromLatin1(property.name()));
-        QVERIFY(property.isReadable());
-        QVERIFY(property.isWritable());
-        QCOMPARE(property.notifySignal().methodSignature(),
-                 QByteArray(property.name()) + "Changed()");
-    }
-    const QStringList expected = {QStringLiteral("gpsEnabled"), QStringLiteral("mlsEnabled"),
-                                  QStringLiteral("mlsOnlineState"), QStringLiteral("hereState")};
-    QCOMPARE(names, expected);
+    const QStringList expected = {
+        QStringLiteral("bool gpsEnabled gpsEnabledChanged()"),
+        QStringLiteral("bool mlsEnabled mlsEnabledChanged()"),
+        QStringLiteral("OnlineAGpsState mlsOnlineState mlsOnlineStateChanged()"),
+        QStringLiteral("OnlineAGpsState hereState hereStateChanged()"),
+        QStringLiteral("signal void gpsEnabledChanged()"),
+        QStringLiteral("signal void mlsEnabledChanged()"),
+        QStringLiteral("signal void mlsOnlineStateChanged()"),
+        QStringLiteral("signal void hereStateChanged()"),
+    };
+    QCOMPARE(interfaceOf(LocationSettings::staticMetaObject), expected);
 }
 
 void TestLocationSettings::statesAreNumbers()
@@ -127,75 +109,46 @@ void TestLocationSettings::statesAreNumbers()
 
 void TestLocationSettings::defaults()
 {
-    const LocationSettings settings;
-    QVERIFY(!settings.gpsEnabled());
-    QVERIFY(!settings.mlsEnabled());
-    QCOMPARE(settings.mlsOnlineState(), State(0));
-    QCOMPARE(settings.hereState(), State(0));
+    QCOMPARE(switchesOf(LocationSettings()), Switches({0, 0, 0, 0}));
     QVERIFY(!stored(gpsKey).isValid());
 }
 
 void TestLocationSettings::settersStore()
 {
     LocationSettings settings;
-    QSignalSpy gpsChanged(&settings, &LocationSettings::gpsEnabledChanged);
-    QSignalSpy mlsChanged(&settings, &LocationSettings::mlsEnabledChanged);
-    QSignalSpy mlsOnlineChanged(&settings, &LocationSettings::mlsOnlineStateChanged);
-    QSignalSpy hereChanged(&settings, &LocationSettings::hereStateChanged);
+    QStringList changes;
+    recordChanges(&settings, &changes);
 
-    settings.setGpsEnabled(true);
-    QVERIFY(settings.gpsEnabled());
-    QCOMPARE(gpsChanged.size(), 1);
+    setSwitches(&settings, {1, 1, 1, 2});
+    QCOMPARE(switchesOf(settings), Switches({1, 1, 1, 2}));
+    QCOMPARE(changes.join(QLatin1Char(',')), QStringLiteral("gps 1,mls 1,mls online 1,here 2"));
     QCOMPARE(stored(gpsKey), QVariant(true));
-    settings.setMlsEnabled(true);
-    QVERIFY(settings.mlsEnabled());
-    QCOMPARE(mlsChanged.size(), 1);
     QCOMPARE(stored(mlsKey), QVariant(true));
-    settings.setMlsOnlineState(State(1));
-    QCOMPARE(settings.mlsOnlineState(), State(1));
-    QCOMPARE(mlsOnlineChanged.size(), 1);
     QCOMPARE(stored(mlsOnlineKey), QVariant(1));
-    settings.setHereState(State(2));
-    QCOMPARE(settings.hereState(), State(2));
-    QCOMPARE(hereChanged.size(), 1);
     QCOMPARE(stored(hereKey), QVariant(2));
 
-    settings.setGpsEnabled(false);
-    settings.setMlsEnabled(false);
-    settings.setMlsOnlineState(State(0));
-    settings.setHereState(State(0));
-    QVERIFY(!settings.gpsEnabled());
-    QVERIFY(!settings.mlsEnabled());
-    QCOMPARE(settings.mlsOnlineState(), State(0));
-    QCOMPARE(settings.hereState(), State(0));
-    for (const QSignalSpy *spy : {&gpsChanged, &mlsChanged, &mlsOnlineChanged, &hereChanged}) {
-        QCOMPARE(spy->size(), 2);
-    }
+    changes.clear();
+    setSwitches(&settings, {0, 0, 0, 0});
+    QCOMPARE(switchesOf(settings), Switches({0, 0, 0, 0}));
+    QCOMPARE(changes.join(QLatin1Char(',')), QStringLiteral("gps 0,mls 0,mls online 0,here 0"));
 }
 
 void TestLocationSettings::sameValuesStoreNothing()
 {
     LocationSettings settings;
-    settings.setGpsEnabled(false);
-    settings.setMlsEnabled(false);
-    settings.setMlsOnlineState(State(0));
-    settings.setHereState(State(0));
-    for (const QString &key : {gpsKey, mlsKey, mlsOnlineKey, hereKey}) {
+    setSwitches(&settings, {0, 0, 0, 0});
+    for (const QString &key : switchKeys) {
         QVERIFY2(!stored(key).isValid(), qPrintable(key));
     }
 }
 
-void TestLocationSettings::readsWhatIsStored()
+void TestLocationSettings::readsStoredValues()
 {
     store(gpsKey, true);
     store(mlsKey, true);
     store(mlsOnlineKey, 2);
     store(hereKey, 1);
-    const LocationSettings settings;
-    QVERIFY(settings.gpsEnabled());
-    QVERIFY(settings.mlsEnabled());
-    QCOMPARE(settings.mlsOnlineState(), State(2));
-    QCOMPARE(settings.hereState(), State(1));
+    QCOMPARE(switchesOf(LocationSettings()), Switches({1, 1, 2, 1}));
 }
 
 void TestLocationSettings::nonsenseReadsAsTheDefault_data()
@@ -214,10 +167,10 @@ void TestLocationSettings::nonsenseReadsAsTheDefault()
     store(hereKey, 2);
     DconfTool::waitUntilStored();
     LocationSettings followed;
-    QSignalSpy hereChanged(&followed, &LocationSettings::hereStateChanged);
+    QStringList changes;
+    recordChanges(&followed, &changes);
     DconfTool::write(hereKey, value);
-    QTRY_COMPARE(hereChanged.size(), 1);
-    QCOMPARE(followed.hereState(), State(0));
+    QTRY_COMPARE(changes, QStringList(QStringLiteral("here 0")));
     const LocationSettings fresh;
     QCOMPARE(fresh.hereState(), State(0));
 
@@ -227,7 +180,7 @@ void TestLocationSettings::nonsenseReadsAsTheDefault()
     QCOMPARE(stored(hereKey), QVariant(1));
 }
 
-void TestLocationSettings::refusesWhatIsNoState_data()
+void TestLocationSettings::refusesOtherNumbers_data()
 {
     QTest::addColumn<int>("number");
     QTest::newRow("3") << 3;
@@ -235,20 +188,19 @@ void TestLocationSettings::refusesWhatIsNoState_data()
     QTest::newRow("large") << std::numeric_limits<int>::max();
 }
 
-void TestLocationSettings::refusesWhatIsNoState()
+void TestLocationSettings::refusesOtherNumbers()
 {
     QFETCH(int, number);
     LocationSettings settings;
-    settings.setHereState(State(2));
-    settings.setMlsOnlineState(State(1));
-    QSignalSpy hereChanged(&settings, &LocationSettings::hereStateChanged);
+    setSwitches(&settings, {0, 0, 1, 2});
+    QStringList changes;
+    recordChanges(&settings, &changes);
     // As QML does.
     settings.setProperty("hereState", number);
     settings.setProperty("mlsOnlineState", number);
-    QCOMPARE(settings.hereState(), State(2));
-    QCOMPARE(settings.mlsOnlineState(), State(1));
+    QCOMPARE(switchesOf(settings), Switches({0, 0, 1, 2}));
     QCOMPARE(stored(hereKey), QVariant(2));
-    QVERIFY(hereChanged.isEmpty());
+    QCOMPARE(changes, QStringList());
     const QString warning =
         QStringLiteral("LocationSettings: %1 is no state of an online service").arg(number);
     QCOMPARE(m_log->takeTexts(), QStringList({warning, warning}));
@@ -258,10 +210,10 @@ void TestLocationSettings::objectsAgree()
 {
     LocationSettings one;
     LocationSettings another;
-    QSignalSpy changed(&another, &LocationSettings::mlsEnabledChanged);
+    QStringList changes;
+    recordChanges(&another, &changes);
     one.setMlsEnabled(true);
-    QVERIFY(another.mlsEnabled());
-    QCOMPARE(changed.size(), 1);
+    QCOMPARE(changes, QStringList(QStringLiteral("mls 1")));
     another.setMlsEnabled(false);
     QVERIFY(!one.mlsEnabled());
 }
@@ -269,13 +221,12 @@ void TestLocationSettings::objectsAgree()
 void TestLocationSettings::emitsOnRealChangesOnly()
 {
     const LocationSettings settings;
-    QSignalSpy gpsChanged(&settings, &LocationSettings::gpsEnabledChanged);
-    QSignalSpy hereChanged(&settings, &LocationSettings::hereStateChanged);
+    QStringList changes;
+    recordChanges(&settings, &changes);
     store(gpsKey, false); // as good as not set
     store(hereKey, 0);
     store(hereKey, 7); // counts as 0
-    QVERIFY(gpsChanged.isEmpty());
-    QVERIFY(hereChanged.isEmpty());
+    QCOMPARE(changes, QStringList());
 }
 
 void TestLocationSettings::aHandlerMayCallBack()
@@ -283,14 +234,12 @@ void TestLocationSettings::aHandlerMayCallBack()
     LocationSettings settings;
     QSignalSpy gpsChanged(&settings, &LocationSettings::gpsEnabledChanged);
     QSignalSpy mlsChanged(&settings, &LocationSettings::mlsEnabledChanged);
-    // Positioning by network goes with the satellites, which this one never leaves on.
     connect(&settings, &LocationSettings::gpsEnabledChanged, this, [&settings] {
         settings.setMlsEnabled(settings.gpsEnabled());
         settings.setGpsEnabled(false);
     });
     settings.setGpsEnabled(true);
-    QVERIFY(!settings.gpsEnabled());
-    QVERIFY(!settings.mlsEnabled());
+    QCOMPARE(switchesOf(settings), Switches({0, 0, 0, 0}));
     QCOMPARE(gpsChanged.size(), 2);
     QCOMPARE(mlsChanged.size(), 2);
     QCOMPARE(stored(gpsKey), QVariant(false));
@@ -309,32 +258,29 @@ void TestLocationSettings::otherKeysChangeNothing()
 {
     LocationSettings settings;
     settings.setGpsEnabled(true);
-    QSignalSpy gpsChanged(&settings, &LocationSettings::gpsEnabledChanged);
+    QStringList changes;
+    recordChanges(&settings, &changes);
     store(QStringLiteral("/settings/location/custom_settings_enabled"), true);
     store(QStringLiteral("/settings/location/custom_settings"),
           QVariantMap{{QStringLiteral("gps/enabled"), false}});
-    QVERIFY(settings.gpsEnabled());
-    QVERIFY(!settings.mlsEnabled());
-    QVERIFY(gpsChanged.isEmpty());
+    QCOMPARE(switchesOf(settings), Switches({1, 0, 0, 0}));
+    QCOMPARE(changes, QStringList());
 }
 
 void TestLocationSettings::followsAnotherProcess()
 {
     const LocationSettings settings;
-    QSignalSpy gpsChanged(&settings, &LocationSettings::gpsEnabledChanged);
-    QSignalSpy mlsOnlineChanged(&settings, &LocationSettings::mlsOnlineStateChanged);
+    QStringList changes;
+    recordChanges(&settings, &changes);
     DconfTool::waitUntilStored();
     DconfTool::write(gpsKey, "true");
     DconfTool::write(mlsOnlineKey, "2");
-    QTRY_COMPARE(gpsChanged.size(), 1);
-    QTRY_COMPARE(mlsOnlineChanged.size(), 1);
-    QVERIFY(settings.gpsEnabled());
-    QCOMPARE(settings.mlsOnlineState(), State(2));
+    const auto all = [&changes] { return changes.join(QLatin1Char(',')); };
+    QTRY_COMPARE(all(), QStringLiteral("gps 1,mls online 2"));
+    QCOMPARE(switchesOf(settings), Switches({1, 0, 2, 0}));
     DconfTool::reset(QStringLiteral("/settings/location/"));
-    QTRY_COMPARE(gpsChanged.size(), 2);
-    QTRY_COMPARE(mlsOnlineChanged.size(), 2);
-    QVERIFY(!settings.gpsEnabled());
-    QCOMPARE(settings.mlsOnlineState(), State(0));
+    QTRY_COMPARE(all(), QStringLiteral("gps 1,mls online 2,gps 0,mls online 0"));
+    QCOMPARE(switchesOf(settings), Switches({0, 0, 0, 0}));
 }
 
 void TestLocationSettings::changesThatAreNotDeliveredYet()
@@ -343,25 +289,19 @@ void TestLocationSettings::changesThatAreNotDeliveredYet()
     QSignalSpy gpsChanged(&settings, &LocationSettings::gpsEnabledChanged);
     QSignalSpy mlsChanged(&settings, &LocationSettings::mlsEnabledChanged);
     DconfTool::waitUntilStored();
-    const QStringList keys = {gpsKey, mlsKey, mlsOnlineKey, hereKey};
-    for (const QString &key : keys) {
+    for (const QString &key : switchKeys) {
         DconfTool::write(key, key == gpsKey || key == mlsKey ? "true" : "2");
     }
     QVERIFY(gpsChanged.isEmpty());
-    QVERIFY(settings.gpsEnabled());
-    QCOMPARE(settings.hereState(), State(2));
+    QCOMPARE(switchesOf(settings), Switches({1, 1, 2, 2}));
 
-    settings.setGpsEnabled(false);
-    settings.setMlsEnabled(true);
-    settings.setMlsOnlineState(State(0));
-    settings.setHereState(State(0));
+    setSwitches(&settings, {0, 1, 0, 0});
     QTRY_COMPARE(DconfTool::read(hereKey), QByteArray("0")); // stored last
     QCOMPARE(DconfTool::read(mlsOnlineKey), QByteArray("0"));
     QCOMPARE(DconfTool::read(mlsKey), QByteArray("true"));
     QCOMPARE(DconfTool::read(gpsKey), QByteArray("false"));
     QTRY_COMPARE(mlsChanged.size(), 1);
-    QVERIFY(settings.mlsEnabled());
-    QVERIFY(!settings.gpsEnabled());
+    QCOMPARE(switchesOf(settings), Switches({0, 1, 0, 0}));
 }
 
 void TestLocationSettings::anotherProcessFollows()
@@ -369,6 +309,8 @@ void TestLocationSettings::anotherProcessFollows()
     LocationSettings settings;
     settings.setGpsEnabled(true);
     DconfTool::waitUntilStored();
+    QStringList changes;
+    recordChanges(&settings, &changes);
 
     QProcess process;
     process.setProcessChannelMode(QProcess::ForwardedErrorChannel);
@@ -376,18 +318,17 @@ void TestLocationSettings::anotherProcessFollows()
     QByteArray said;
     connect(&process, &QProcess::readyRead, this, [&] { said += process.readAll(); });
     QTRY_COMPARE_WITH_TIMEOUT(said, QByteArray("1 0 0 0\n"), 60000);
-
     settings.setMlsEnabled(true);
     QTRY_COMPARE_WITH_TIMEOUT(said, QByteArray("1 0 0 0\n1 1 0 0\n"), 60000);
     settings.setMlsOnlineState(State(2));
     QTRY_COMPARE_WITH_TIMEOUT(said, QByteArray("1 0 0 0\n1 1 0 0\n1 1 2 0\n"), 60000);
 
     // And the other way round.
+    changes.clear();
     process.write("now you\n");
-    QTRY_VERIFY_WITH_TIMEOUT(!settings.gpsEnabled(), 60000);
-    QTRY_COMPARE_WITH_TIMEOUT(settings.hereState(), State(1), 60000);
-    QVERIFY(settings.mlsEnabled());
-    QCOMPARE(settings.mlsOnlineState(), State(2));
+    QTRY_COMPARE_WITH_TIMEOUT(changes.join(QLatin1Char(',')), QStringLiteral("gps 0,here 1"),
+                              60000);
+    QCOMPARE(switchesOf(settings), Switches({0, 1, 2, 1}));
 
     process.closeWriteChannel();
     QTRY_COMPARE_WITH_TIMEOUT(process.state(), QProcess::NotRunning, 60000);

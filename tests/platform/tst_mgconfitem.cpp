@@ -2,6 +2,7 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 #include "dconftool.h"
+#include "files.h"
 #include "loggedtest.h"
 #include "mgconfitem.h"
 
@@ -9,7 +10,6 @@
 #include <QDBusConnectionInterface>
 #include <QDebug>
 #include <QDir>
-#include <QFile>
 #include <QProcess>
 #include <QScopeGuard>
 #include <QScopedValueRollback>
@@ -28,9 +28,8 @@
 #include <unistd.h>
 
 /*
-    What needs a process of its own (its exit, its bus, its event dispatcher) is a scenario, which
-    this program runs when it is called with the scenario's name. A scenario prints what the test
-    then looks at; what it logs goes to its standard error as usual.
+    A test that needs a process of its own (its exit, its bus, its event dispatcher) calls this
+    program with the name of a scenario. A scenario prints lines that the test reads.
 */
 namespace scenarios {
 
@@ -59,7 +58,7 @@ int setLocked(QCoreApplication &)
     return 0;
 }
 
-// Says when the key changes and when it is back to what it was.
+// Prints when the key has changed and when it has its old value again.
 int setAndSeeItFail(QCoreApplication &app)
 {
     MGConfItem item(followedKey);
@@ -78,27 +77,20 @@ int setAndSeeItFail(QCoreApplication &app)
     return app.exec();
 }
 
-// Runs until it is ended.
+// Prints a line for each change of the key, and runs until it is ended.
 int follow(QCoreApplication &app)
 {
     MGConfItem item(followedKey);
-    MGConfItem another(followedKey);
+    const MGConfItem another(followedKey); // a warning must not come twice
     QObject::connect(&item, &MGConfItem::valueChanged, &app, [] { say("changed"); });
-    item.set(QStringLiteral("own"));
+    if (app.arguments().value(2) == QStringLiteral("set")) {
+        item.set(QStringLiteral("own"));
+    }
     say("ready");
     return app.exec();
 }
 
-// As above, but sets nothing.
-int watch(QCoreApplication &app)
-{
-    const MGConfItem item(followedKey);
-    QObject::connect(&item, &MGConfItem::valueChanged, &app, [] { say("changed"); });
-    say("ready");
-    return app.exec();
-}
-
-// Says "ready" when its connection can be cut, "cut" when it was.
+// Prints "ready" when its connection can be cut, "cut" after that.
 int outliveTheBus(QCoreApplication &app)
 {
     const MGConfItem item(followedKey);
@@ -123,11 +115,8 @@ int outliveTheBus(QCoreApplication &app)
 }
 
 const QHash<QString, int (*)(QCoreApplication &)> all = {
-    {QStringLiteral("setAndExit"), setAndExit},
-    {QStringLiteral("setLocked"), setLocked},
-    {QStringLiteral("setAndSeeItFail"), setAndSeeItFail},
-    {QStringLiteral("follow"), follow},
-    {QStringLiteral("watch"), watch},
+    {QStringLiteral("setAndExit"), setAndExit},           {QStringLiteral("setLocked"), setLocked},
+    {QStringLiteral("setAndSeeItFail"), setAndSeeItFail}, {QStringLiteral("follow"), follow},
     {QStringLiteral("outliveTheBus"), outliveTheBus},
 };
 
@@ -135,6 +124,7 @@ const QHash<QString, int (*)(QCoreApplication &)> all = {
 
 namespace {
 
+const QString busVariable = QStringLiteral("DBUS_SESSION_BUS_ADDRESS");
 const QString noBus = QStringLiteral("unix:path=/nonexistent");
 
 const QByteArray withoutBus =
@@ -151,16 +141,31 @@ QString describe(const QVariant &value)
     return description;
 }
 
+// An item that counts its changes.
+class Item : public MGConfItem
+{
+public:
+    using MGConfItem::MGConfItem;
+
+    int changes() const { return m_changed.size(); }
+    void forgetChanges() { m_changed.clear(); }
+
+private:
+    QSignalSpy m_changed{this, &MGConfItem::valueChanged};
+};
+
+// This program, running a scenario, with a variable set in its environment.
 class Child : public QProcess
 {
 public:
-    explicit Child(const QStringList &scenario, const QMap<QString, QString> &environment = {})
+    explicit Child(const QStringList &scenario, const QString &variable = {},
+                   const QString &value = {})
     {
-        auto full = QProcessEnvironment::systemEnvironment();
-        for (auto it = environment.cbegin(); it != environment.cend(); ++it) {
-            full.insert(it.key(), it.value());
+        auto environment = QProcessEnvironment::systemEnvironment();
+        if (!variable.isEmpty()) {
+            environment.insert(variable, value);
         }
-        setProcessEnvironment(full);
+        setProcessEnvironment(environment);
         start(QCoreApplication::applicationFilePath(), scenario);
     }
     ~Child() override
@@ -178,12 +183,9 @@ public:
     }
     bool says(const QByteArray &line)
     {
-        while (!m_lines.contains(line)) {
-            if (!canReadLine() && !waitForReadyRead(60000)) {
+        while (!lines().contains(line)) {
+            if (!waitForReadyRead(60000)) {
                 return false;
-            }
-            while (canReadLine()) {
-                m_lines.append(readLine().trimmed());
             }
         }
         return true;
@@ -217,14 +219,14 @@ class Bus : public QProcess
 public:
     Bus()
     {
-        const QString directory = qEnvironmentVariable("XDG_RUNTIME_DIR");
         start(QStringLiteral("dbus-daemon"),
               {QStringLiteral("--session"), QStringLiteral("--nofork"),
                QStringLiteral("--print-address"),
-               QStringLiteral("--address=unix:dir=") + directory});
-        if (waitForReadyRead()) {
-            m_address = QString::fromUtf8(readLine().trimmed());
+               QStringLiteral("--address=unix:dir=") + qEnvironmentVariable("XDG_RUNTIME_DIR")});
+        if (!waitForReadyRead()) {
+            qFatal("no session bus starts");
         }
+        m_address = QString::fromUtf8(readLine().trimmed());
     }
     ~Bus() override
     {
@@ -238,19 +240,41 @@ private:
     QString m_address;
 };
 
-// Every test has keys of its own: what one set last may be stored when the next one runs.
+// Every test has its own keys, because a value may be stored when the next test runs already.
 QString newKey()
 {
     static int count = 0;
     return QStringLiteral("/test/key%1").arg(++count);
 }
 
-// Of dconf-service; 0 if it does not run.
+// Stops a process until it is destroyed.
+class Stopped
+{
+public:
+    explicit Stopped(pid_t pid) : m_pid(pid) { ::kill(m_pid, SIGSTOP); }
+    ~Stopped() { ::kill(m_pid, SIGCONT); }
+    Q_DISABLE_COPY_MOVE(Stopped)
+
+private:
+    const pid_t m_pid;
+};
+
+// Of dconf-service, which runs once a value was stored.
 pid_t servicePid()
 {
     const QDBusReply<uint> pid =
         QDBusConnection::sessionBus().interface()->servicePid(QStringLiteral("ca.desrt.dconf"));
+    if (!pid.isValid()) {
+        qFatal("dconf-service does not run");
+    }
     return static_cast<pid_t>(pid.value());
+}
+
+// Sets a value and waits until it is stored.
+void store(MGConfItem *item, const QVariant &value)
+{
+    item->set(value);
+    DconfTool::waitUntilStored();
 }
 
 /*
@@ -312,11 +336,11 @@ private Q_SLOTS:
     void setIsSeenByEveryItemBeforeItReturns();
     void equalValueEmitsNothing();
     void anotherTypeIsAnotherValue();
+    void unsetForgetsTheValue_data();
     void unsetForgetsTheValue();
-    void invalidValueUnsets();
     void temporaryItemStores();
     void deletedItemHearsNothing();
-    void deletedItemIsWatchedNoMore();
+    void deletedItemIsNoLongerWatched();
 
     void followsOtherProcesses();
     void followsSeveralChangesAtOnce();
@@ -336,8 +360,8 @@ private Q_SLOTS:
     void readsWhatOthersStore_data();
     void readsWhatOthersStore();
 
-    void refusesWhatCannotBeHeld_data();
-    void refusesWhatCannotBeHeld();
+    void refusesOtherValues_data();
+    void refusesOtherValues();
     void badKeyIsInert_data();
     void badKeyIsInert();
     void lockedKeyStays();
@@ -365,30 +389,27 @@ void TestMGConfItem::startsUnset()
 void TestMGConfItem::setIsSeenByEveryItemBeforeItReturns()
 {
     const QString key = newKey();
-    MGConfItem item(key);
-    const MGConfItem another(key);
-    const MGConfItem other(key + QLatin1Char('x'));
-    const QSignalSpy changed(&item, &MGConfItem::valueChanged);
-    const QSignalSpy anotherChanged(&another, &MGConfItem::valueChanged);
-    const QSignalSpy otherChanged(&other, &MGConfItem::valueChanged);
+    Item item(key);
+    const Item another(key);
+    const Item other(key + QLatin1Char('x'));
 
     item.set(1);
-    QCOMPARE(changed.count(), 1);
-    QCOMPARE(anotherChanged.count(), 1);
+    QCOMPARE(item.changes(), 1);
+    QCOMPARE(another.changes(), 1);
     QCOMPARE(describe(item.value()), describe(1));
     QCOMPARE(describe(another.value(7)), describe(1));
 
     MGConfItem(key).set(2);
-    QCOMPARE(changed.count(), 2);
-    QCOMPARE(anotherChanged.count(), 2);
+    QCOMPARE(item.changes(), 2);
+    QCOMPARE(another.changes(), 2);
     QCOMPARE(describe(another.value()), describe(2));
 
-    // Nor does it come a second time when the value has been stored.
-    QTRY_COMPARE(DconfTool::read(key), QByteArray("2"));
+    // There is no second signal when the value has been stored.
+    DconfTool::waitUntilStored();
     QTest::qWait(100);
-    QCOMPARE(changed.count(), 2);
-    QCOMPARE(anotherChanged.count(), 2);
-    QCOMPARE(otherChanged.count(), 0);
+    QCOMPARE(item.changes(), 2);
+    QCOMPARE(another.changes(), 2);
+    QCOMPARE(other.changes(), 0);
 }
 
 void TestMGConfItem::equalValueEmitsNothing()
@@ -402,66 +423,56 @@ void TestMGConfItem::equalValueEmitsNothing()
     };
     for (const QVariant &value : values) {
         const QString key = newKey();
-        MGConfItem item(key);
+        Item item(key);
         item.set(value);
-        const QSignalSpy changed(&item, &MGConfItem::valueChanged);
+        item.forgetChanges();
         item.set(value);
+        store(&item, value);
         MGConfItem(key).set(value);
-        QCOMPARE(changed.count(), 0);
 
-        // Equal to what is stored, too, and stored by somebody else.
-        QByteArray printed;
-        QTRY_VERIFY(!(printed = DconfTool::read(key)).isEmpty());
-        item.set(value);
-        DconfTool::write(key, printed.constData());
+        // Nor if another process stores it.
+        DconfTool::write(key, DconfTool::read(key));
         QTest::qWait(50);
-        QCOMPARE(changed.count(), 0);
+        QCOMPARE(item.changes(), 0);
         QCOMPARE(describe(item.value()), describe(value));
     }
 }
 
 void TestMGConfItem::anotherTypeIsAnotherValue()
 {
-    MGConfItem item(newKey());
+    Item item(newKey());
     item.set(1);
-    const QSignalSpy changed(&item, &MGConfItem::valueChanged);
     item.set(1U);
-    QCOMPARE(changed.count(), 1);
+    QCOMPARE(item.changes(), 2);
     QCOMPARE(describe(item.value()), describe(1U));
     item.set(QVariantMap());
     item.set(QStringList());
-    QCOMPARE(changed.count(), 3);
+    QCOMPARE(item.changes(), 4);
     QCOMPARE(describe(item.value()), describe(QStringList()));
+}
+
+void TestMGConfItem::unsetForgetsTheValue_data()
+{
+    QTest::addColumn<bool>("byInvalidValue");
+    QTest::newRow("unset()") << false;
+    QTest::newRow("set() with an invalid value") << true;
 }
 
 void TestMGConfItem::unsetForgetsTheValue()
 {
-    const QString key = newKey();
-    MGConfItem item(key);
-    item.set(1);
-    QTRY_COMPARE(DconfTool::read(key), QByteArray("1"));
-    const MGConfItem fresh(key); // has seen no change yet
-    const QSignalSpy changed(&item, &MGConfItem::valueChanged);
-    const QSignalSpy freshChanged(&fresh, &MGConfItem::valueChanged);
-    item.unset();
-    QCOMPARE(changed.count(), 1);
-    QCOMPARE(freshChanged.count(), 1);
-    QVERIFY(!item.value().isValid());
-    item.unset();
-    QCOMPARE(changed.count(), 1);
-    QTRY_COMPARE(DconfTool::read(key), QByteArray());
-}
+    QFETCH(const bool, byInvalidValue);
 
-void TestMGConfItem::invalidValueUnsets()
-{
     const QString key = newKey();
-    MGConfItem item(key);
-    item.set(1);
-    QTRY_COMPARE(DconfTool::read(key), QByteArray("1"));
-    const QSignalSpy changed(&item, &MGConfItem::valueChanged);
-    item.set(QVariant());
-    QCOMPARE(changed.count(), 1);
-    QVERIFY(!item.value().isValid());
+    Item item(key);
+    store(&item, 1);
+    item.forgetChanges();
+    const Item fresh(key); // has seen no change yet
+    for (int i = 0; i < 2; ++i) {
+        byInvalidValue ? item.set(QVariant()) : item.unset();
+        QCOMPARE(item.changes(), 1);
+        QCOMPARE(fresh.changes(), 1);
+        QVERIFY(!item.value().isValid());
+    }
     QTRY_COMPARE(DconfTool::read(key), QByteArray());
 }
 
@@ -482,19 +493,18 @@ void TestMGConfItem::deletedItemHearsNothing()
     int heard = 0;
     auto item = std::make_unique<MGConfItem>(key);
     connect(item.get(), &MGConfItem::valueChanged, this, [&heard] { ++heard; });
-    const MGConfItem another(key);
-    const QSignalSpy changed(&another, &MGConfItem::valueChanged);
+    const Item another(key);
     item.reset();
     MGConfItem(key).set(1);
-    QTRY_COMPARE(DconfTool::read(key), QByteArray("1"));
+    DconfTool::waitUntilStored();
     DconfTool::write(key, "2");
-    QTRY_COMPARE(changed.count(), 2); // the other item still follows the key
+    QTRY_COMPARE(another.changes(), 2); // the other item still follows the key
     QCOMPARE(heard, 0);
 }
 
-void TestMGConfItem::deletedItemIsWatchedNoMore()
+void TestMGConfItem::deletedItemIsNoLongerWatched()
 {
-    // What goes out over the connection that dconf uses, seen in a thread of GLib's.
+    // Messages that are sent over the connection of dconf; a thread of GLib counts them.
     static std::atomic<int> watches{0};
     static std::atomic<int> messages{0};
     static const QString key = newKey();
@@ -538,89 +548,72 @@ void TestMGConfItem::deletedItemIsWatchedNoMore()
 void TestMGConfItem::followsOtherProcesses()
 {
     const QString key = newKey();
-    const MGConfItem item(key);
-    const MGConfItem another(key);
-    QSignalSpy changed(&item, &MGConfItem::valueChanged);
-    const QSignalSpy anotherChanged(&another, &MGConfItem::valueChanged);
+    const Item item(key);
+    const Item another(key);
 
     DconfTool::write(key, "'theirs'");
-    QTRY_COMPARE(changed.count(), 1);
-    QTRY_COMPARE(anotherChanged.count(), 1);
+    QTRY_COMPARE(item.changes(), 1);
+    QTRY_COMPARE(another.changes(), 1);
     QCOMPARE(describe(item.value()), describe(QStringLiteral("theirs")));
 
     DconfTool::reset(key);
-    QTRY_COMPARE(changed.count(), 2);
-    QTRY_COMPARE(anotherChanged.count(), 2);
+    QTRY_COMPARE(item.changes(), 2);
+    QTRY_COMPARE(another.changes(), 2);
     QVERIFY(!item.value().isValid());
 }
 
 void TestMGConfItem::followsSeveralChangesAtOnce()
 {
-    const MGConfItem first(QStringLiteral("/test/directory/first"));
-    const MGConfItem second(QStringLiteral("/test/directory/below/second"));
-    MGConfItem same(QStringLiteral("/test/directory/same"));
-    const MGConfItem untouched(QStringLiteral("/test/directory/untouched"));
-    const MGConfItem neighbour(QStringLiteral("/test/directory2"));
-    same.set(3);
-    QTRY_COMPARE(DconfTool::read(same.key()), QByteArray("3"));
-
-    QSignalSpy firstChanged(&first, &MGConfItem::valueChanged);
-    QSignalSpy secondChanged(&second, &MGConfItem::valueChanged);
-    const QSignalSpy sameChanged(&same, &MGConfItem::valueChanged);
-    const QSignalSpy untouchedChanged(&untouched, &MGConfItem::valueChanged);
-    const QSignalSpy neighbourChanged(&neighbour, &MGConfItem::valueChanged);
+    const Item first(QStringLiteral("/test/directory/first"));
+    const Item second(QStringLiteral("/test/directory/below/second"));
+    Item same(QStringLiteral("/test/directory/same"));
+    const Item untouched(QStringLiteral("/test/directory/untouched"));
+    const Item neighbour(QStringLiteral("/test/directory2"));
+    store(&same, 3);
+    same.forgetChanges();
 
     DconfTool::run({QStringLiteral("load"), QStringLiteral("/test/directory/")},
                    "[/]\nfirst=1\nsame=3\n[below]\nsecond=2\n");
-    QTRY_COMPARE(firstChanged.count(), 1);
-    QTRY_COMPARE(secondChanged.count(), 1);
+    QTRY_COMPARE(first.changes(), 1);
+    QTRY_COMPARE(second.changes(), 1);
     QCOMPARE(describe(first.value()), describe(1));
     QCOMPARE(describe(second.value()), describe(2));
 
     QTest::qWait(100);
-    QCOMPARE(firstChanged.count(), 1);
-    QCOMPARE(secondChanged.count(), 1);
-    QCOMPARE(sameChanged.count(), 0);
-    QCOMPARE(untouchedChanged.count(), 0);
-    QCOMPARE(neighbourChanged.count(), 0);
+    QCOMPARE(first.changes(), 1);
+    QCOMPARE(second.changes(), 1);
+    QCOMPARE(same.changes() + untouched.changes() + neighbour.changes(), 0);
 }
 
 void TestMGConfItem::followsTheResetOfADirectory()
 {
-    MGConfItem inside(QStringLiteral("/test/directory/inside"));
-    const MGConfItem empty(QStringLiteral("/test/directory/empty"));
-    MGConfItem neighbour(QStringLiteral("/test/directory2"));
+    Item inside(QStringLiteral("/test/directory/inside"));
+    const Item empty(QStringLiteral("/test/directory/empty"));
+    Item neighbour(QStringLiteral("/test/directory2"));
     inside.set(1);
-    neighbour.set(2);
-    QTRY_COMPARE(DconfTool::read(neighbour.key()), QByteArray("2"));
+    store(&neighbour, 2);
 
-    QSignalSpy insideChanged(&inside, &MGConfItem::valueChanged);
-    const QSignalSpy emptyChanged(&empty, &MGConfItem::valueChanged);
-    const QSignalSpy neighbourChanged(&neighbour, &MGConfItem::valueChanged);
     DconfTool::reset(QStringLiteral("/test/directory/"));
-    QTRY_COMPARE(insideChanged.count(), 1);
+    QTRY_COMPARE(inside.changes(), 2);
     QVERIFY(!inside.value().isValid());
     QTest::qWait(100);
-    QCOMPARE(insideChanged.count(), 1);
-    QCOMPARE(emptyChanged.count(), 0);
-    QCOMPARE(neighbourChanged.count(), 0);
+    QCOMPARE(inside.changes(), 2);
+    QCOMPARE(empty.changes(), 0);
+    QCOMPARE(neighbour.changes(), 1);
 }
 
 void TestMGConfItem::missesNothingWhileTheBusIsSlow()
 {
-    // The change goes over another bus, so that no message of it reaches the item: dconf notices
-    // by itself what changed between the item's first look and the bus's answer.
+    // The change goes over another bus, so that the item receives no message of it: dconf compares
+    // the values before and after it has started to watch the key.
     Bus bus;
-    QVERIFY(!bus.address().isEmpty());
-    const auto pid = static_cast<pid_t>(bus.processId());
-    QCOMPARE(::kill(pid, SIGSTOP), 0);
-    Child child({QStringLiteral("watch")},
-                {{QStringLiteral("DBUS_SESSION_BUS_ADDRESS"), bus.address()}});
+    auto stopped = std::make_unique<Stopped>(static_cast<pid_t>(bus.processId()));
+    Child child({QStringLiteral("follow")}, busVariable, bus.address());
     QVERIFY(child.says("ready"));
     DconfTool::write(scenarios::followedKey, "'theirs'");
     QCOMPARE(DconfTool::read(scenarios::followedKey), QByteArray("'theirs'"));
     QCOMPARE(child.lines(), QList<QByteArray>{"ready"});
-    QCOMPARE(::kill(pid, SIGCONT), 0);
+    stopped.reset();
     QVERIFY(child.says("changed"));
 }
 
@@ -642,15 +635,13 @@ void TestMGConfItem::everySetIsSeenWhileWritesComplete()
 
     const int sets = waits == Call::None ? qEnvironmentVariableIntValue("SETS") : 1000;
     const QScopedValueRollback<Call> wait(callThatWaits, waits);
-    MGConfItem item(newKey());
-    int changes = 0;
+    Item item(newKey());
     int lost = 0;
-    connect(&item, &MGConfItem::valueChanged, this, [&] { ++changes; });
     for (int i = 1; i <= sets; ++i) {
         const bool value = i % 2 != 0;
-        const int before = changes;
+        item.forgetChanges();
         item.set(value);
-        if (changes != before + 1 || item.value() != value) {
+        if (item.changes() != 1 || item.value() != value) {
             ++lost;
         }
     }
@@ -679,20 +670,18 @@ void TestMGConfItem::slotMaySet()
 
 void TestMGConfItem::slotMayDeleteItsItem()
 {
-    const auto deleteOnChange = [this](const QString &key) {
-        auto *const item = new MGConfItem(key);
+    for (const bool setsItself : {true, false}) {
+        const QString key = newKey();
+        const QPointer<MGConfItem> item = new MGConfItem(key);
         connect(item, &MGConfItem::valueChanged, this, [item] { delete item; });
-        return QPointer<MGConfItem>(item);
-    };
-
-    const QPointer<MGConfItem> setsItself = deleteOnChange(newKey());
-    setsItself->set(1);
-    QVERIFY(!setsItself);
-
-    const QString key = newKey();
-    const QPointer<MGConfItem> follows = deleteOnChange(key);
-    DconfTool::write(key, "2");
-    QTRY_VERIFY(!follows);
+        if (setsItself) {
+            item->set(1);
+            QVERIFY(!item);
+        } else {
+            DconfTool::write(key, "2");
+            QTRY_VERIFY(!item);
+        }
+    }
 }
 
 void TestMGConfItem::slotMayDeleteAnotherItem()
@@ -719,20 +708,18 @@ void TestMGConfItem::slotMayMakeAnItem()
 {
     const QString key = newKey();
     MGConfItem item(key);
-    std::unique_ptr<MGConfItem> made;
-    int heard = 0;
+    std::unique_ptr<Item> made;
     connect(&item, &MGConfItem::valueChanged, this, [&] {
         if (!made) {
-            made = std::make_unique<MGConfItem>(key);
-            connect(made.get(), &MGConfItem::valueChanged, this, [&heard] { ++heard; });
+            made = std::make_unique<Item>(key);
         }
     });
     item.set(1);
     QVERIFY(made);
     QCOMPARE(describe(made->value()), describe(1));
-    QCOMPARE(heard, 0);
+    QCOMPARE(made->changes(), 0);
     item.set(2);
-    QCOMPARE(heard, 1);
+    QCOMPARE(made->changes(), 1);
 }
 
 void TestMGConfItem::storesWhatOthersRead_data()
@@ -741,18 +728,10 @@ void TestMGConfItem::storesWhatOthersRead_data()
     QTest::addColumn<QByteArray>("printed");
 
     const QString text = QStringLiteral("tëxt");
-    QTest::newRow("bool") << QVariant(true) << QByteArray("true");
-    QTest::newRow("int") << QVariant(-5) << QByteArray("-5");
     QTest::newRow("uint") << QVariant(5U) << QByteArray("uint32 5");
-    QTest::newRow("qlonglong") << QVariant(-5LL) << QByteArray("int64 -5");
-    QTest::newRow("qulonglong") << QVariant(5ULL) << QByteArray("uint64 5");
-    QTest::newRow("string") << QVariant(text) << QByteArray("'tëxt'");
-    QTest::newRow("string list") << QVariant(QStringList{text, QString()})
-                                 << QByteArray("['tëxt', '']");
     QTest::newRow("empty string list") << QVariant(QStringList()) << QByteArray("@as []");
     QTest::newRow("map") << QVariant(QVariantMap{{text, QStringList{text}}})
                          << QByteArray("{'tëxt': <['tëxt']>}");
-    QTest::newRow("empty map") << QVariant(QVariantMap()) << QByteArray("@a{sv} {}");
 }
 
 void TestMGConfItem::storesWhatOthersRead()
@@ -763,7 +742,7 @@ void TestMGConfItem::storesWhatOthersRead()
     const QString key = newKey();
     MGConfItem item(key);
     item.set(value);
-    QCOMPARE(describe(item.value()), describe(value)); // on its way
+    QCOMPARE(describe(item.value()), describe(value)); // not stored yet
     QTRY_COMPARE(DconfTool::read(key), printed);
     QCOMPARE(describe(item.value()), describe(value)); // from the database
 }
@@ -772,20 +751,10 @@ void TestMGConfItem::readsWhatOthersStore_data()
 {
     QTest::addColumn<QVariant>("value");
 
-    const auto text = [](const char *latin) { return QString::fromLatin1(latin); };
     QTest::newRow("true") << QVariant(true);
-    QTest::newRow("uint32 4294967295") << QVariant(4294967295U);
-    QTest::newRow("int64 5") << QVariant(5LL);
-    QTest::newRow("byte 5") << QVariant(5);
-    QTest::newRow("1.5") << QVariant(1.5);
-    QTest::newRow("'text'") << QVariant(text("text"));
-    QTest::newRow("['a', 'b']") << QVariant(QStringList{text("a"), text("b")});
-    QTest::newRow("@as []") << QVariant(QStringList());
-    QTest::newRow("[1, 2]") << QVariant(QVariantList{1, 2});
-    QTest::newRow("('a', 1)") << QVariant(QVariantList{text("a"), 1});
-    QTest::newRow("{'a': <1>}") << QVariant(QVariantMap{{text("a"), 1}});
+    QTest::newRow("{'a': <[1, 2]>}")
+        << QVariant(QVariantMap{{QStringLiteral("a"), QVariantList{1, 2}}});
     QTest::newRow("handle 5") << QVariant(QVariantList());
-    QTest::newRow("<<1>>") << QVariant(1);
 }
 
 void TestMGConfItem::readsWhatOthersStore()
@@ -793,48 +762,38 @@ void TestMGConfItem::readsWhatOthersStore()
     QFETCH(const QVariant, value);
 
     const QString key = newKey();
-    const MGConfItem item(key);
-    QSignalSpy changed(&item, &MGConfItem::valueChanged);
+    const Item item(key);
     DconfTool::write(key, QTest::currentDataTag());
-    QTRY_COMPARE(changed.count(), 1);
+    QTRY_COMPARE(item.changes(), 1);
     QCOMPARE(describe(item.value()), describe(value));
-    QCOMPARE(describe(item.value(7)), describe(value.isValid() ? value : QVariant(7)));
+    QCOMPARE(describe(item.value(7)), describe(value));
 }
 
-void TestMGConfItem::refusesWhatCannotBeHeld_data()
+void TestMGConfItem::refusesOtherValues_data()
 {
     QTest::addColumn<QVariant>("value");
     QTest::addColumn<QString>("reason");
 
-    const QString notText =
-        QStringLiteral("text of type QString with a NUL or half a surrogate pair");
-    QTest::newRow("type") << QVariant(QUrl(QStringLiteral("file:///x")))
-                          << QStringLiteral("a value of type QUrl");
-    QTest::newRow("nested type") << QVariant(QVariantMap{{QStringLiteral("k"), QByteArray()}})
-                                 << QStringLiteral("a value of type QByteArray");
-    QTest::newRow("NUL") << QVariant(QString(QChar(QChar::Null))) << notText;
+    QTest::newRow("type") << QVariant(QUrl(QStringLiteral("file:///x"))) << "a value of type QUrl";
     QTest::newRow("lone surrogate in a key")
-        << QVariant(QVariantMap{{QString(QChar(0xD83D)), 1}}) << notText;
+        << QVariant(QVariantMap{{QString(QChar(0xD83D)), 1}})
+        << "text of type QString with a NUL or half a surrogate pair";
 }
 
-void TestMGConfItem::refusesWhatCannotBeHeld()
+void TestMGConfItem::refusesOtherValues()
 {
     QFETCH(const QVariant, value);
     QFETCH(const QString, reason);
 
     const QString key = newKey();
-    MGConfItem item(key);
-    item.set(1);
-    QTRY_COMPARE(DconfTool::read(key), QByteArray("1"));
-    const QSignalSpy changed(&item, &MGConfItem::valueChanged);
+    Item item(key);
+    store(&item, 1);
     item.set(value);
-    const MessageLog::Message warning{
-        QtWarningMsg, QStringLiteral("default"),
-        QStringLiteral("MGConfItem: %1 cannot hold %2").arg(key, reason)};
-    QCOMPARE(m_log->takeAll(), QList<MessageLog::Message>{warning});
-    QCOMPARE(changed.count(), 0);
+    QCOMPARE(m_log->takeReport(),
+             QStringLiteral("warning [default] MGConfItem: %1 cannot hold %2").arg(key, reason));
+    QCOMPARE(item.changes(), 1);
     QCOMPARE(describe(item.value()), describe(1));
-    QTest::qWait(50);
+    DconfTool::waitUntilStored();
     QCOMPARE(DconfTool::read(key), QByteArray("1"));
 }
 
@@ -860,10 +819,9 @@ void TestMGConfItem::badKeyIsInert()
     QFETCH(const QString, key);
     QFETCH(const QString, named);
 
-    MGConfItem item(key);
+    Item item(key);
     QCOMPARE(m_log->takeTexts(),
              QStringList(QStringLiteral("MGConfItem: \"%1\" is not a dconf key").arg(named)));
-    QSignalSpy changed(&item, &MGConfItem::valueChanged);
     item.set(1);
     item.set(QUrl());
     item.unset();
@@ -872,28 +830,23 @@ void TestMGConfItem::badKeyIsInert()
     QCOMPARE(describe(item.value(7)), describe(7));
     DconfTool::write(QStringLiteral("/test/bad/key"), "1");
     QTest::qWait(50);
-    QCOMPARE(changed.count(), 0);
+    QCOMPARE(item.changes(), 0);
     QCOMPARE(DconfTool::run({QStringLiteral("list"), QStringLiteral("/test/bad/")}),
              QByteArray("key"));
 }
 
 void TestMGConfItem::lockedKeyStays()
 {
-    QTemporaryDir dir;
-    const auto write = [&dir](const char *name, const QByteArray &contents) {
-        QFile file(dir.filePath(QLatin1String(name)));
-        return file.open(QIODevice::WriteOnly) && file.write(contents) == contents.size();
-    };
-    QVERIFY(QDir(dir.path()).mkpath(QStringLiteral("keys/locks")));
-    QVERIFY(write("keys/values", "[test]\nlocked='vendor'\n"));
-    QVERIFY(write("keys/locks/locks", "/test/locked\n"));
-    DconfTool::run({QStringLiteral("compile"), dir.filePath(QStringLiteral("db")),
-                    dir.filePath(QStringLiteral("keys"))});
-    QVERIFY(
-        write("profile", "user-db:user\nfile-db:" + dir.filePath(QStringLiteral("db")).toUtf8()));
+    const QTemporaryDir directory;
+    const QString database = directory.filePath(QStringLiteral("db"));
+    const QString profile = directory.filePath(QStringLiteral("profile"));
+    const QString keys = directory.filePath(QStringLiteral("keys"));
+    Files::write(keys + QStringLiteral("/values"), "[test]\nlocked='vendor'\n");
+    Files::write(keys + QStringLiteral("/locks/locks"), "/test/locked\n");
+    DconfTool::run({QStringLiteral("compile"), database, keys});
+    Files::write(profile, "user-db:user\nfile-db:" + database.toUtf8());
 
-    Child child({QStringLiteral("setLocked")},
-                {{QStringLiteral("DCONF_PROFILE"), dir.filePath(QStringLiteral("profile"))}});
+    Child child({QStringLiteral("setLocked")}, QStringLiteral("DCONF_PROFILE"), profile);
     QVERIFY(child.succeeds());
     QCOMPARE(child.lines(), QList<QByteArray>{"vendor"});
     const QList<QByteArray> warnings = child.warnings();
@@ -906,13 +859,12 @@ void TestMGConfItem::failedStoreReverts()
 {
     const QString key = newKey();
     MGConfItem item(key);
-    item.set(1);
-    QTRY_COMPARE(DconfTool::read(key), QByteArray("1"));
+    store(&item, 1);
     QCOMPARE(describe(item.value()), describe(1)); // opens the database, before it goes
-
     QVariantList seen;
+    connect(&item, &MGConfItem::valueChanged, this, [&] { seen.append(item.value()); });
     {
-        // A file in the place of the database's directory: nobody can write there, not even root.
+        // A file in place of the database's directory: nobody can write there, not even root.
         QDir config(qEnvironmentVariable("XDG_CONFIG_HOME"));
         const QString directory = QStringLiteral("dconf");
         const QString aside = QStringLiteral("dconf.aside");
@@ -921,21 +873,18 @@ void TestMGConfItem::failedStoreReverts()
             config.remove(directory);
             config.rename(aside, directory);
         });
-        QVERIFY(QFile(config.filePath(directory)).open(QIODevice::WriteOnly));
+        Files::write(config.filePath(directory), {});
 
-        connect(&item, &MGConfItem::valueChanged, this, [&] { seen.append(item.value()); });
         // The service must not fail before the new value was seen.
-        const pid_t pid = servicePid();
-        QVERIFY(pid > 0);
-        QCOMPARE(::kill(pid, SIGSTOP), 0);
+        auto stopped = std::make_unique<Stopped>(servicePid());
         item.set(2);
         const QVariantList seenAtOnce = seen;
-        QCOMPARE(::kill(pid, SIGCONT), 0);
+        stopped.reset();
         QCOMPARE(seenAtOnce, QVariantList{2});
         QTRY_COMPARE(seen, (QVariantList{2, 1}));
     }
-    item.set(3);
-    QTRY_COMPARE(DconfTool::read(key), QByteArray("3"));
+    store(&item, 3);
+    QCOMPARE(DconfTool::read(key), QByteArray("3"));
     QCOMPARE(seen, (QVariantList{2, 1, 3}));
 }
 
@@ -966,61 +915,52 @@ void TestMGConfItem::exitLosesNothing()
 void TestMGConfItem::exitDoesNotHangOnAStoppedService()
 {
     DconfTool::write(QStringLiteral("/test/key"), "1"); // starts the service, if need be
-    const pid_t pid = servicePid();
-    QVERIFY(pid > 0);
-    QCOMPARE(::kill(pid, SIGSTOP), 0);
+    const Stopped stopped(servicePid());
     Child child({QStringLiteral("setAndExit"), QStringLiteral("2")});
-    // An answer that never comes counts as a failure after 25 s; nobody waits that long.
-    const bool finished = child.waitForFinished(20000);
-    QCOMPARE(::kill(pid, SIGCONT), 0);
-    QVERIFY(finished);
+    // A missing answer counts as a failure after 25 s; nobody waits that long.
+    QVERIFY(child.waitForFinished(20000));
     QVERIFY(child.succeeds());
 }
 
 void TestMGConfItem::withoutABusWarnsOnce()
 {
-    Child child({QStringLiteral("setAndSeeItFail")},
-                {{QStringLiteral("DBUS_SESSION_BUS_ADDRESS"), noBus}});
+    Child child({QStringLiteral("setAndSeeItFail")}, busVariable, noBus);
     QVERIFY(child.succeeds());
     QCOMPARE(child.warnings(), QList<QByteArray>{withoutBus});
     QVERIFY(child.lines().isEmpty() || child.lines().last() == "reverted");
 
-    // Nor does the exit wait for a bus that is not there, or fail.
-    Child brief({QStringLiteral("setAndExit"), QStringLiteral("2")},
-                {{QStringLiteral("DBUS_SESSION_BUS_ADDRESS"), noBus}});
+    // The exit neither waits for the missing bus nor fails.
+    Child brief({QStringLiteral("setAndExit"), QStringLiteral("2")}, busVariable, noBus);
     QVERIFY(brief.succeeds());
 }
 
 void TestMGConfItem::withoutGlibWarnsOnce()
 {
-    Child child({QStringLiteral("follow")}, {{QStringLiteral("QT_NO_GLIB"), QStringLiteral("1")}});
-    QVERIFY(child.says("ready"));
-    QTRY_COMPARE(DconfTool::read(scenarios::followedKey), QByteArray("'own'"));
-    DconfTool::write(scenarios::followedKey, "'theirs'");
-    QTest::qWait(300);
-    child.terminate();
-    QVERIFY(child.waitForFinished());
-    // Its own change it sees.
-    QCOMPARE(child.lines(), (QList<QByteArray>{"changed", "ready"}));
-    QCOMPARE(child.warnings(), QList<QByteArray>{withoutGlib});
-
-    // The same scenario with GLib: the silence above is not the test's.
-    Child other({QStringLiteral("follow")});
-    QVERIFY(other.says("ready"));
-    QTRY_COMPARE(DconfTool::read(scenarios::followedKey), QByteArray("'own'"));
-    DconfTool::write(scenarios::followedKey, "'theirs'");
-    QTRY_COMPARE(other.lines(), (QList<QByteArray>{"changed", "ready", "changed"}));
-    other.terminate();
-    QVERIFY(other.waitForFinished());
-    QCOMPARE(other.warnings(), QList<QByteArray>());
+    // With GLib, too, to show that a change is seen then.
+    for (const bool hasGlib : {false, true}) {
+        Child child({QStringLiteral("follow"), QStringLiteral("set")}, QStringLiteral("QT_NO_GLIB"),
+                    hasGlib ? QString() : QStringLiteral("1"));
+        QVERIFY(child.says("ready"));
+        QTRY_COMPARE(DconfTool::read(scenarios::followedKey), QByteArray("'own'"));
+        DconfTool::write(scenarios::followedKey, "'theirs'");
+        QList<QByteArray> expected = {"changed", "ready"}; // it sees its own change
+        if (hasGlib) {
+            expected.append("changed");
+            QTRY_COMPARE(child.lines(), expected);
+        } else {
+            QTest::qWait(300);
+        }
+        child.terminate();
+        QVERIFY(child.waitForFinished());
+        QCOMPARE(child.lines(), expected);
+        QCOMPARE(child.warnings(), hasGlib ? QList<QByteArray>() : QList<QByteArray>{withoutGlib});
+    }
 }
 
 void TestMGConfItem::outlivesTheBus()
 {
     Bus bus;
-    QVERIFY(!bus.address().isEmpty());
-    Child child({QStringLiteral("outliveTheBus")},
-                {{QStringLiteral("DBUS_SESSION_BUS_ADDRESS"), bus.address()}});
+    Child child({QStringLiteral("outliveTheBus")}, busVariable, bus.address());
     QVERIFY(child.says("ready"));
     bus.kill();
     QVERIFY(bus.waitForFinished());

@@ -16,10 +16,12 @@ private Q_SLOTS:
     void init();
 
     void isOneConstantProperty();
-    void isVisibleWithTheDaemon();
-    void anyEntryWillDo();
-    void looksOnEveryRead();
+    void isVisibleWithAnyEntry_data();
+    void isVisibleWithAnyEntry();
 };
+
+using Make = void (*)(const QString &);
+Q_DECLARE_METATYPE(Make)
 
 namespace {
 
@@ -41,37 +43,31 @@ void TestAndroidSupport::isOneConstantProperty()
     QCOMPARE(interfaceOf(AndroidSupport::staticMetaObject), expected);
 }
 
-void TestAndroidSupport::isVisibleWithTheDaemon()
+void TestAndroidSupport::isVisibleWithAnyEntry_data()
 {
-    const AndroidSupport support;
-    QVERIFY(!support.dataDirectoriesVisible());
-    Files::write(daemonPath, {});
-    const AndroidSupport supportNow;
-    QVERIFY(supportNow.dataDirectoriesVisible());
+    QTest::addColumn<Make>("make");
+    QTest::addColumn<bool>("visible");
+    QTest::newRow("empty file") << Make([](const QString &path) { Files::write(path, {}); })
+                                << true;
+    QTest::newRow("directory") << Make(Files::makeDirectory) << true;
+    QTest::newRow("pipe") << Make(Files::makePipe) << true;
+    QTest::newRow("link") << Make([](const QString &path) {
+        Files::makeLink(QStringLiteral("/dev/null"), path);
+    }) << true;
+    QTest::newRow("link to nothing")
+        << Make([](const QString &path) { Files::makeLink(QStringLiteral("/nowhere"), path); })
+        << false;
 }
 
-void TestAndroidSupport::anyEntryWillDo()
+// The path is checked on every read.
+void TestAndroidSupport::isVisibleWithAnyEntry()
 {
-    const AndroidSupport support;
-    Files::makeDirectory(daemonPath);
-    QVERIFY(support.dataDirectoriesVisible());
-    Files::remove(daemonPath);
-    Files::makePipe(daemonPath);
-    QVERIFY(support.dataDirectoriesVisible());
-    Files::remove(daemonPath);
-    Files::makeLink(QStringLiteral("/dev/null"), daemonPath);
-    QVERIFY(support.dataDirectoriesVisible());
-    Files::remove(daemonPath);
-    Files::makeLink(QStringLiteral("/nowhere"), daemonPath);
-    QVERIFY(!support.dataDirectoriesVisible());
-}
-
-void TestAndroidSupport::looksOnEveryRead()
-{
+    QFETCH(const Make, make);
+    QFETCH(const bool, visible);
     const AndroidSupport support;
     QVERIFY(!support.dataDirectoriesVisible());
-    Files::write(daemonPath, "#!/bin/sh\n");
-    QVERIFY(support.dataDirectoriesVisible());
+    make(daemonPath);
+    QCOMPARE(support.dataDirectoriesVisible(), visible);
     Files::remove(daemonPath);
     QVERIFY(!support.dataDirectoriesVisible());
 }

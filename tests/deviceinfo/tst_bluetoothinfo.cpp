@@ -22,8 +22,8 @@ private Q_SLOTS:
     void readsTheFirstLine();
     void readsTheFirstLineOfAHugeFile();
     void readsOnce();
-    void warnsOfWhatCannotBeOpened_data();
-    void warnsOfWhatCannotBeOpened();
+    void warnsIfTheFileCannotBeOpened_data();
+    void warnsIfTheFileCannotBeOpened();
 };
 
 using Make = void (*)();
@@ -54,23 +54,24 @@ void TestBluetoothInfo::readsTheFirstLine_data()
     QTest::addColumn<QByteArray>("content");
     QTest::addColumn<QString>("address");
 
-    const QString address = QStringLiteral("00:1a:7d:da:71:13");
-    QTest::newRow("line") << QByteArray("00:1A:7D:DA:71:13\n") << address;
-    QTest::newRow("no line end") << QByteArray("00:1A:7D:DA:71:13") << address;
-    QTest::newRow("blanks before") << QByteArray(" \t 00:1A:7D:DA:71:13\n") << address;
-    QTest::newRow("blanks behind") << QByteArray("00:1A:7D:DA:71:13 \t \n") << address;
-    QTest::newRow("carriage return") << QByteArray("00:1A:7D:DA:71:13\r\n") << address;
-    QTest::newRow("more lines") << QByteArray("00:1A:7D:DA:71:13\n00:00:00:00:00:00\n") << address;
-    QTest::newRow("an empty line first") << QByteArray("\n00:1A:7D:DA:71:13\n") << QString();
-    QTest::newRow("empty") << QByteArray() << QString();
-    QTest::newRow("NUL") << QByteArray("00:1A\0:7D:DA\n", 13) << QStringLiteral("00:1a");
-    QTest::newRow("NUL first") << QByteArray("\0X\n", 3) << QString();
-    QTest::newRow("blank before NUL") << QByteArray("X \0Y\n", 5) << QStringLiteral("x");
-    QTest::newRow("no address") << QByteArray("Not SET\n") << QStringLiteral("not set");
-    // As UTF-8 this would be no text at all. The last one is a blank that does not break.
-    QTest::newRow("Latin-1") << QByteArray("\xC4\xD6\xA0\n") << QStringLiteral("\u00E4\u00F6");
-    QTest::newRow("a long line") << QByteArray(100000, 'A') + '\n'
-                                 << QString(100000, QLatin1Char('a'));
+    const auto row = [](const char *name, const QByteArray &content, const char *address) {
+        QTest::newRow(name) << content << address;
+    };
+    row("line", "00:1A:7D:DA:71:13\n", "00:1a:7d:da:71:13");
+    row("no line end", "00:1A", "00:1a");
+    row("blanks before", " \t 00:1A\n", "00:1a");
+    row("blanks behind", "00:1A \t \n", "00:1a");
+    row("carriage return", "00:1A\r\n", "00:1a");
+    row("more lines", "00:1A\n00:00\n", "00:1a");
+    row("an empty line first", "\n00:1A\n", "");
+    row("empty", "", "");
+    row("NUL", QByteArray("00:1A\0:7D:DA\n", 13), "00:1a");
+    row("NUL first", QByteArray("\0X\n", 3), "");
+    row("blank before NUL", QByteArray("X \0Y\n", 5), "x");
+    row("no address", "Not SET\n", "not set");
+    // This is not UTF-8. The last character is a no-break space.
+    row("Latin-1", "\xC4\xD6\xA0\n", "äö");
+    row("a long line", QByteArray(100000, 'A') + '\n', QByteArray(100000, 'a').constData());
 }
 
 void TestBluetoothInfo::readsTheFirstLine()
@@ -78,8 +79,7 @@ void TestBluetoothInfo::readsTheFirstLine()
     QFETCH(QByteArray, content);
     QFETCH(QString, address);
     Files::write(addressPath, content);
-    const BluetoothInfo info;
-    QCOMPARE(info.adapterAddress(), address);
+    QCOMPARE(BluetoothInfo().adapterAddress(), address);
 }
 
 void TestBluetoothInfo::readsTheFirstLineOfAHugeFile()
@@ -101,7 +101,7 @@ void TestBluetoothInfo::readsOnce()
     QCOMPARE(info.adapterAddress(), QStringLiteral("aa"));
 }
 
-void TestBluetoothInfo::warnsOfWhatCannotBeOpened_data()
+void TestBluetoothInfo::warnsIfTheFileCannotBeOpened_data()
 {
     QTest::addColumn<Make>("make");
     QTest::newRow("nothing") << Make([] {});
@@ -113,7 +113,7 @@ void TestBluetoothInfo::warnsOfWhatCannotBeOpened_data()
         << Make([] { Files::write(addressPath, QByteArray(maximumTextSize + 1, 'A')); });
 }
 
-void TestBluetoothInfo::warnsOfWhatCannotBeOpened()
+void TestBluetoothInfo::warnsIfTheFileCannotBeOpened()
 {
     QFETCH(Make, make);
     make();

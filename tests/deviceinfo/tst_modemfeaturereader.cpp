@@ -19,7 +19,7 @@ private Q_SLOTS:
     void readsTheVariant_data();
     void readsTheVariant();
     void readsOnEveryRead();
-    void whatCannotBeReadIsEmpty();
+    void isEmptyIfTheFileCannotBeRead();
     void doesNotWrite();
 };
 
@@ -48,29 +48,28 @@ void TestModemFeatureReader::readsTheVariant_data()
     QTest::addColumn<QByteArray>("content");
     QTest::addColumn<QString>("variant");
 
-    const QString name = QStringLiteral("global");
-    QTest::newRow("first line") << QByteArray("variant=global\n") << name;
-    QTest::newRow("blanks") << QByteArray("variant = global \n") << name;
-    QTest::newRow("quotes") << QByteArray("variant=\"global\"\n") << name;
-    QTest::newRow("before a section") << QByteArray("variant=global\n[modem]\na=b\n") << name;
-    QTest::newRow("[General]") << QByteArray("[General]\nvariant=global\n") << name;
-    QTest::newRow("[general]") << QByteArray("[general]\nvariant=global\n") << name;
-    QTest::newRow("[General] last")
-        << QByteArray("[modem]\nvariant=x\n[General]\nvariant=global\n") << name;
-    QTest::newRow("another section") << QByteArray("[modem]\nvariant=global\n") << QString();
-    QTest::newRow("other keys") << QByteArray("variants=a\nvarian=b\n") << QString();
-    QTest::newRow("no value") << QByteArray("variant=\n") << QString();
-    QTest::newRow("empty") << QByteArray() << QString();
-    QTest::newRow("no INI file") << QByteArray("\xff\xfe\0[[]=\n", 9) << QString();
-    QTest::newRow("comma") << QByteArray("variant=a,b\n") << QString();
-    QTest::newRow("quoted comma") << QByteArray("variant=\"a,b\"\n") << QStringLiteral("a,b");
-    QTest::newRow("number") << QByteArray("variant=7\n") << QStringLiteral("7");
-    QTest::newRow("comment") << QByteArray("variant=a;b\n") << QStringLiteral("a");
-    QTest::newRow("Latin-1") << QByteArray("variant=\xE4\n") << QStringLiteral("\u00E4");
-    // QSettings would unpack whatever is in there, and the process might not survive it.
-    QTest::newRow("packed value") << QByteArray(
-        "variant=@Variant(\\0\\0\\0\\v\\0\\0\\0\\x1\\0\\0\\0"
-        "\\x2\\0g)\n") << QString();
+    const auto row = [](const char *name, const QByteArray &content, const char *variant) {
+        QTest::newRow(name) << content << variant;
+    };
+    row("first line", "variant=global\n", "global");
+    row("blanks", "variant = global \n", "global");
+    row("quotes", "variant=\"global\"\n", "global");
+    row("before a section", "variant=global\n[modem]\na=b\n", "global");
+    row("[General]", "[General]\nvariant=global\n", "global");
+    row("[general]", "[general]\nvariant=global\n", "global");
+    row("[General] last", "[modem]\nvariant=x\n[General]\nvariant=global\n", "global");
+    row("another section", "[modem]\nvariant=global\n", "");
+    row("other keys", "variants=a\nvarian=b\n", "");
+    row("no value", "variant=\n", "");
+    row("empty", "", "");
+    row("no INI file", QByteArray("\xff\xfe\0[[]=\n", 9), "");
+    row("comma", "variant=a,b\n", "");
+    row("quoted comma", "variant=\"a,b\"\n", "a,b");
+    row("number", "variant=7\n", "7");
+    row("comment", "variant=a;b\n", "a");
+    row("Latin-1", "variant=\xE4\n", "ä");
+    // QSettings would unpack the value, and the process might not survive it.
+    row("packed value", "variant=@Variant(\\0\\0\\0\\v\\0\\0\\0\\x1\\0\\0\\0\\x2\\0g)\n", "");
 }
 
 void TestModemFeatureReader::readsTheVariant()
@@ -78,8 +77,7 @@ void TestModemFeatureReader::readsTheVariant()
     QFETCH(QByteArray, content);
     QFETCH(QString, variant);
     Files::write(featuresPath, content);
-    const ModemFeatureReader reader;
-    QCOMPARE(reader.variant(), variant);
+    QCOMPARE(ModemFeatureReader().variant(), variant);
 }
 
 void TestModemFeatureReader::readsOnEveryRead()
@@ -94,7 +92,7 @@ void TestModemFeatureReader::readsOnEveryRead()
     QCOMPARE(reader.variant(), QString());
 }
 
-void TestModemFeatureReader::whatCannotBeReadIsEmpty()
+void TestModemFeatureReader::isEmptyIfTheFileCannotBeRead()
 {
     const ModemFeatureReader reader;
     Files::makeDirectory(featuresPath);

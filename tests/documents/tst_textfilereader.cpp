@@ -30,14 +30,13 @@ private Q_SLOTS:
     void readContentOfNothing_data();
     void readContentOfNothing();
     void readContentOfLargeFiles();
-    void readContentFollowsLinks();
-    void readContentReadsOnEveryCall();
+    void readContentFollowsLinksOnEveryCall();
 
     void collateJoinsInOrder();
     void collateSortsByCase();
     void collateTakesFilesOnly();
     void collateLeavesOutEmptyFiles();
-    void collateLeavesOutWhatIsTooLarge();
+    void collateLeavesOutFilesAboveTheLimit();
     void collateOfNothing();
     void collateOfNoLocalDirectory_data();
     void collateOfNoLocalDirectory();
@@ -45,8 +44,14 @@ private Q_SLOTS:
     void collateKeepsSeparatorAndPrefix();
 
 private:
-    QString path(const char *name) const;
-    QUrl directory() const { return QUrl::fromLocalFile(m_directory->path()); }
+    QString path(const char *name) const { return m_directory->filePath(QString::fromUtf8(name)); }
+    QString read(const char *name) const { return TextFileReader().readContent(path(name)); }
+    QString collate(const QString &separator = QStringLiteral(","),
+                    const QString &prefix = QStringLiteral(":")) const
+    {
+        const QUrl directory = QUrl::fromLocalFile(m_directory->path());
+        return TextFileReader().collate(directory, separator, prefix);
+    }
 
     std::unique_ptr<QTemporaryDir> m_directory;
 };
@@ -69,11 +74,6 @@ void makeSocket(const QString &path)
 }
 
 } // namespace
-
-QString TestTextFileReader::path(const char *name) const
-{
-    return m_directory->filePath(QString::fromUtf8(name));
-}
 
 void TestTextFileReader::init()
 {
@@ -102,28 +102,25 @@ void TestTextFileReader::readContent_data()
     QTest::addColumn<QByteArray>("content");
     QTest::addColumn<QString>("text");
 
-    QTest::newRow("line") << QByteArray("a") << QStringLiteral("a");
-    QTest::newRow("lines run together") << QByteArray("a\nb") << QStringLiteral("ab");
-    QTest::newRow("last line end") << QByteArray("a\nb\n") << QStringLiteral("ab");
-    QTest::newRow("empty lines") << QByteArray("\n\na\n\n\nb\n\n") << QStringLiteral("ab");
-    QTest::newRow("carriage returns") << QByteArray("a\r\nb\r\n") << QStringLiteral("ab");
-    QTest::newRow("a carriage return alone") << QByteArray("a\rb") << QStringLiteral("a\rb");
-    QTest::newRow("blanks") << QByteArray(" a \n b ") << QStringLiteral(" a  b ");
-    QTest::newRow("empty") << QByteArray() << QStringLiteral("");
-    QTest::newRow("line ends alone") << QByteArray("\n\n") << QStringLiteral("");
-    QTest::newRow("UTF-8") << QByteArray("\xC3\xA4\n\xE2\x9C\x93") << QStringLiteral("ä✓");
-    QTest::newRow("byte-order mark") << QByteArray("\xEF\xBB\xBF"
-                                                   "a")
-                                     << QStringLiteral("a");
-    QTest::newRow("UTF-16") << QByteArray("\xFF\xFE"
-                                          "a\0\n\0b\0",
-                                          8)
-                            << QStringLiteral("ab");
-    QTest::newRow("NUL") << QByteArray("a\0b", 3)
-                         << QString::fromUtf8(QByteArray("a")) + QChar(0) + QLatin1Char('b');
-    QTest::newRow("a long line") << QByteArray(300000, 'x') << QString(300000, QLatin1Char('x'));
-    QTest::newRow("many lines") << QByteArray("x\n").repeated(100000)
-                                << QString(100000, QLatin1Char('x'));
+    const auto row = [](const char *name, const QByteArray &content, const QString &text) {
+        QTest::newRow(name) << content << text;
+    };
+    const QString ab = QStringLiteral("ab");
+    row("line", "ab", ab);
+    row("lines run together", "a\nb", ab);
+    row("last line end", "a\nb\n", ab);
+    row("empty lines", "\n\na\n\n\nb\n\n", ab);
+    row("carriage returns", "a\r\nb\r\n", ab);
+    row("a carriage return alone", "a\rb", QStringLiteral("a\rb"));
+    row("blanks", " a \n b ", QStringLiteral(" a  b "));
+    row("empty", "", QStringLiteral(""));
+    row("line ends alone", "\n\n", QStringLiteral(""));
+    row("UTF-8", "ä\n✓", QStringLiteral("ä✓"));
+    row("byte-order mark", "\uFEFFab", ab);
+    row("UTF-16", QByteArray("\xFF\xFE\x61\0\n\0b\0", 8), ab);
+    row("NUL", QByteArray("a\0b", 3), QStringLiteral("a\0b"));
+    row("a long line", QByteArray(300000, 'x'), QString(300000, QLatin1Char('x')));
+    row("many lines", QByteArray("x\n").repeated(100000), QString(100000, QLatin1Char('x')));
 }
 
 void TestTextFileReader::readContent()
@@ -131,29 +128,27 @@ void TestTextFileReader::readContent()
     QFETCH(QByteArray, content);
     QFETCH(QString, text);
     Files::write(path("file"), content);
-    const TextFileReader reader;
-    const QString read = reader.readContent(path("file"));
-    QCOMPARE(read, text);
-    QVERIFY(!read.isNull());
+    QCOMPARE(read("file"), text);
+    QVERIFY(!read("file").isNull());
 }
 
 void TestTextFileReader::readContentOfNothing_data()
 {
     QTest::addColumn<QString>("name");
     QTest::newRow("no path") << QString();
-    QTest::newRow("nothing") << QStringLiteral("%1/nothing");
-    QTest::newRow("nothing in a file") << QStringLiteral("%1/file/nothing");
-    QTest::newRow("directory") << QStringLiteral("%1");
-    QTest::newRow("pipe") << QStringLiteral("%1/pipe");
-    QTest::newRow("socket") << QStringLiteral("%1/socket");
-    QTest::newRow("link to a pipe") << QStringLiteral("%1/link");
-    QTest::newRow("link to itself") << QStringLiteral("%1/loop");
-    QTest::newRow("endless device") << QStringLiteral("/dev/zero");
-    QTest::newRow("device") << QStringLiteral("/dev/null");
-    QTest::newRow("memory, which cannot be read") << QStringLiteral("/proc/self/mem");
-    QTest::newRow("URL") << QStringLiteral("file://%1/file");
-    QTest::newRow("NUL") << QStringLiteral("%1/file") + QChar(0) + QLatin1Char('x');
-    QTest::newRow("NUL first") << QString(QChar(0)) + QStringLiteral("%1/file");
+    QTest::newRow("nothing") << "%1/nothing";
+    QTest::newRow("nothing in a file") << "%1/file/nothing";
+    QTest::newRow("directory") << "%1";
+    QTest::newRow("pipe") << "%1/pipe";
+    QTest::newRow("socket") << "%1/socket";
+    QTest::newRow("link to a pipe") << "%1/link";
+    QTest::newRow("link to itself") << "%1/loop";
+    QTest::newRow("endless device") << "/dev/zero";
+    QTest::newRow("device") << "/dev/null";
+    QTest::newRow("memory, which cannot be read") << "/proc/self/mem";
+    QTest::newRow("URL") << "file://%1/file";
+    QTest::newRow("NUL") << QStringLiteral("%1/file\0x");
+    QTest::newRow("NUL first") << QStringLiteral("\0%1/file");
     QTest::newRow("long") << QStringLiteral("%1/") + QString(100000, QLatin1Char('x'));
 }
 
@@ -165,48 +160,37 @@ void TestTextFileReader::readContentOfNothing()
     Files::makeLink(path("pipe"), path("link"));
     Files::makeLink(path("loop"), path("loop"));
     makeSocket(path("socket"));
-    const TextFileReader reader;
     name.replace(QStringLiteral("%1"), m_directory->path());
-    QVERIFY(reader.readContent(name).isNull());
+    QVERIFY(TextFileReader().readContent(name).isNull());
 }
 
 void TestTextFileReader::readContentOfLargeFiles()
 {
-    const TextFileReader reader;
     Files::makeSparse(path("file"), maximumTextSize);
-    QCOMPARE(reader.readContent(path("file")).size(), int(maximumTextSize));
+    QCOMPARE(read("file").size(), int(maximumTextSize));
     Files::makeSparse(path("file"), maximumTextSize + 1);
-    QVERIFY(reader.readContent(path("file")).isNull());
+    QVERIFY(read("file").isNull());
     // A file that is larger than the memory.
     Files::makeSparse(path("file"), qint64(1) << 40);
-    QVERIFY(reader.readContent(path("file")).isNull());
+    QVERIFY(read("file").isNull());
 }
 
-void TestTextFileReader::readContentFollowsLinks()
+void TestTextFileReader::readContentFollowsLinksOnEveryCall()
 {
-    Files::write(path("file"), "text");
     Files::makeLink(path("file"), path("link"));
-    const TextFileReader reader;
-    QCOMPARE(reader.readContent(path("link")), QStringLiteral("text"));
-}
-
-void TestTextFileReader::readContentReadsOnEveryCall()
-{
-    const TextFileReader reader;
-    Files::write(path("file"), "one");
-    QCOMPARE(reader.readContent(path("file")), QStringLiteral("one"));
-    Files::write(path("file"), "two");
-    QCOMPARE(reader.readContent(path("file")), QStringLiteral("two"));
+    for (const char *text : {"one", "two"}) {
+        Files::write(path("file"), text);
+        QCOMPARE(read("link"), QString::fromLatin1(text));
+    }
 }
 
 void TestTextFileReader::collateJoinsInOrder()
 {
     Files::write(path("2"), "B");
     Files::write(path("1"), "A");
-    const TextFileReader reader;
-    QCOMPARE(reader.collate(directory(), comma, colon), QStringLiteral(":A,B"));
+    QCOMPARE(collate(), QStringLiteral(":A,B"));
     Files::write(path("10"), "C\nD\n");
-    QCOMPARE(reader.collate(directory(), comma, colon), QStringLiteral(":A,CD,B"));
+    QCOMPARE(collate(), QStringLiteral(":A,CD,B"));
 }
 
 void TestTextFileReader::collateSortsByCase()
@@ -214,13 +198,12 @@ void TestTextFileReader::collateSortsByCase()
     for (const char *name : {"a", "B", "c", "D", "ä", "_", "1"}) {
         Files::write(path(name), name);
     }
-    const TextFileReader reader;
-    QCOMPARE(reader.collate(directory(), comma, QString()), QStringLiteral("1,B,D,_,a,c,ä"));
+    QCOMPARE(collate(), QStringLiteral(":1,B,D,_,a,c,ä"));
 }
 
 void TestTextFileReader::collateTakesFilesOnly()
 {
-    QTemporaryDir elsewhere;
+    const QTemporaryDir elsewhere;
     const QString target = elsewhere.filePath(QStringLiteral("target"));
     Files::write(target, "link");
     Files::write(path("a"), "a");
@@ -233,60 +216,55 @@ void TestTextFileReader::collateTakesFilesOnly()
     Files::makeLink(path("pipe"), path("link to a pipe"));
     Files::makeLink(QStringLiteral("/dev/zero"), path("link to a device"));
     makeSocket(path("socket"));
-    const TextFileReader reader;
-    QCOMPARE(reader.collate(directory(), comma, colon), QStringLiteral(":a,link"));
+    QCOMPARE(collate(), QStringLiteral(":a,link"));
 }
 
 void TestTextFileReader::collateLeavesOutEmptyFiles()
 {
     Files::write(path("1"), "");
-    Files::write(path("2"), "A");
-    Files::write(path("3"), "\n\n");
+    Files::write(path("2"), "\n\n");
+    QVERIFY(collate().isNull());
+    Files::write(path("3"), "A");
     Files::write(path("4"), " ");
     Files::write(path("5"), "");
-    const TextFileReader reader;
-    QCOMPARE(reader.collate(directory(), comma, colon), QStringLiteral(":A, "));
+    QCOMPARE(collate(), QStringLiteral(":A, "));
 }
 
-void TestTextFileReader::collateLeavesOutWhatIsTooLarge()
+void TestTextFileReader::collateLeavesOutFilesAboveTheLimit()
 {
     Files::write(path("1"), "A");
     Files::makeSparse(path("2"), maximumTextSize);
     Files::makeSparse(path("3"), maximumTextSize - 2);
     Files::write(path("4"), "B");
     Files::write(path("5"), "C");
-    const TextFileReader reader;
-    // The limit is one of all files together.
-    const QString text = reader.collate(directory(), comma, QString());
-    QCOMPARE(text.size(), int(maximumTextSize) + 2);
-    QVERIFY(text.startsWith(QStringLiteral("A,")));
+    // The limit is that of all files together.
+    const QString text = collate();
+    QCOMPARE(text.size(), int(maximumTextSize) + 3);
+    QVERIFY(text.startsWith(QStringLiteral(":A,")));
     QVERIFY(text.endsWith(QStringLiteral(",B")));
 }
 
 void TestTextFileReader::collateOfNothing()
 {
-    const TextFileReader reader;
-    QVERIFY(reader.collate(directory(), comma, colon).isNull());
-    Files::write(path("1"), "");
-    Files::write(path("2"), "\n");
-    QVERIFY(reader.collate(directory(), comma, colon).isNull());
-    QVERIFY(reader.collate(QUrl::fromLocalFile(path("nothing")), comma, colon).isNull());
-    Files::write(path("3"), "text");
-    QVERIFY(reader.collate(QUrl::fromLocalFile(path("3")), comma, colon).isNull());
-    QVERIFY(!reader.collate(directory(), comma, colon).isNull());
+    QVERIFY(collate().isNull());
+    Files::write(path("file"), "text");
+    for (const char *name : {"nothing", "file"}) {
+        const QUrl url = QUrl::fromLocalFile(path(name));
+        QVERIFY(TextFileReader().collate(url, comma, colon).isNull());
+    }
 }
 
 void TestTextFileReader::collateOfNoLocalDirectory_data()
 {
     QTest::addColumn<QString>("url");
     QTest::newRow("none") << QString();
-    QTest::newRow("http") << QStringLiteral("http://localhost%1");
-    QTest::newRow("resource") << QStringLiteral("qrc:%1");
-    QTest::newRow("path") << QStringLiteral("%1");
-    QTest::newRow("no path") << QStringLiteral("file:");
-    QTest::newRow("no path, no host") << QStringLiteral("file://");
-    QTest::newRow("query alone") << QStringLiteral("file:?a");
-    QTest::newRow("NUL") << QStringLiteral("file://%1%00x");
+    QTest::newRow("http") << "http://localhost%1";
+    QTest::newRow("resource") << "qrc:%1";
+    QTest::newRow("path") << "%1";
+    QTest::newRow("no path") << "file:";
+    QTest::newRow("no path, no host") << "file://";
+    QTest::newRow("query alone") << "file:?a";
+    QTest::newRow("NUL") << "file://%1%00x";
 }
 
 void TestTextFileReader::collateOfNoLocalDirectory()
@@ -296,9 +274,8 @@ void TestTextFileReader::collateOfNoLocalDirectory()
     // The current directory has a text, which must not be found.
     const QString before = QDir::currentPath();
     QVERIFY(QDir::setCurrent(m_directory->path()));
-    const TextFileReader reader;
     url.replace(QStringLiteral("%1"), m_directory->path());
-    const QString text = reader.collate(QUrl(url), comma, colon);
+    const QString text = TextFileReader().collate(QUrl(url), comma, colon);
     QVERIFY(QDir::setCurrent(before));
     QVERIFY(text.isNull());
 }
@@ -306,20 +283,17 @@ void TestTextFileReader::collateOfNoLocalDirectory()
 void TestTextFileReader::collateDecodesUrls()
 {
     Files::write(path("a directory #1/file"), "text");
-    const TextFileReader reader;
     const QUrl url(QStringLiteral("file://%1/a%20directory%20%231")
                        .replace(QStringLiteral("%1"), m_directory->path()));
-    QCOMPARE(reader.collate(url, comma, QString()), QStringLiteral("text"));
+    QCOMPARE(TextFileReader().collate(url, comma, colon), QStringLiteral(":text"));
 }
 
 void TestTextFileReader::collateKeepsSeparatorAndPrefix()
 {
     Files::write(path("1"), "%1");
     Files::write(path("2"), "%2");
-    const TextFileReader reader;
-    QCOMPARE(reader.collate(directory(), QStringLiteral("%1\n"), QStringLiteral("%2")),
-             QStringLiteral("%2%1%1\n%2"));
-    QCOMPARE(reader.collate(directory(), QString(), QString()), QStringLiteral("%1%2"));
+    QCOMPARE(collate(QStringLiteral("%1\n"), QStringLiteral("%2")), QStringLiteral("%2%1%1\n%2"));
+    QCOMPARE(collate(QString(), QString()), QStringLiteral("%1%2"));
 }
 
 QTEST_GUILESS_MAIN(TestTextFileReader)

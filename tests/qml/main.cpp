@@ -7,7 +7,7 @@
 #include <QQmlEngine>
 #include <QtQuickTest>
 
-// Gives every test the object that its world is made with.
+// Gives every test the object that sets up its environment.
 class Setup : public QObject
 {
     Q_OBJECT

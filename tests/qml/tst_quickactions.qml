@@ -9,9 +9,7 @@ TestCase {
     id: test
 
     readonly property string directory: "/usr/share/glimmera/quickactions"
-    readonly property string enabledKey: "/desktop/glimmera-marlo-home/events_screen_actions"
-    readonly property string call: "remote-service=org.example.lamp\nremote-path=/lamp\n"
-                                   + "remote-interface=org.example.Lamp\nremote-method=toggle\n"
+    readonly property string home: "/desktop/glimmera-marlo-home/"
 
     property int serial: 0
 
@@ -32,28 +30,13 @@ TestCase {
     // Shows a model as a page does, with its roles by their names.
     Component {
         id: page
-        Item {
-            property alias model: repeater.model
-            property alias count: repeater.count
-            function rows() {
-                const list = [];
-                for (let i = 0; i < repeater.count; ++i) {
-                    list.push(repeater.itemAt(i));
-                }
-                return list;
+        Repeater {
+            function all(role) {
+                return Array.from({ length: count }, (none, i) => itemAt(i)[role]);
             }
-            function titles() {
-                return rows().map(row => row.title);
-            }
-            function states() {
-                return rows().map(row => row.on);
-            }
-            Repeater {
-                id: repeater
-                Item {
-                    readonly property var title: model.title
-                    readonly property bool on: model.enabled
-                }
+            Item {
+                readonly property var title: model.title
+                readonly property bool on: model.enabled
             }
         }
     }
@@ -68,9 +51,13 @@ TestCase {
         return path(name);
     }
 
-    // The module has a dconf client of its own, so what it stores arrives here in its time.
-    function stored(key) {
-        return String(root.key(key));
+    function pageOf(actions) {
+        return createTemporaryObject(page, test, { model: actions });
+    }
+
+    // The module has a dconf client of its own, so what it stores arrives here later.
+    function tryStored(name, value) {
+        tryVerify(() => String(root.key(home + name)) === String(value));
     }
 
     function initTestCase() {
@@ -83,9 +70,10 @@ TestCase {
         root.installCatalog("maps_eng_en");
         root.installCatalog("maps-fi");
         root.setLocale("fi_FI");
-        root.unsetKey(enabledKey);
-        root.unsetKey("/desktop/glimmera-marlo-home/blocked_actions");
-        root.unsetKey("/desktop/glimmera-marlo-home/events_screen_actions_user");
+        root.unsetKey(home + "events_screen_actions");
+        root.unsetKey(home + "blocked_actions");
+        root.unsetKey(home + "events_screen_actions_user");
+        root.waitUntilStored();
     }
 
     function cleanup() {
@@ -93,49 +81,42 @@ TestCase {
         compare(root.takeMessages(), []);
     }
 
-    function test_aPageShowsTheEnabledActions() {
-        root.setStringList(enabledKey, [add("b"), add("a", "title=maps-title\n"
-                                                           + "translation-catalog=maps\n")]);
-        add("c");
+    function test_rolesByTheirNames() {
+        const a = add("a", "title=maps-title\nicon=i\ntranslation-catalog=maps\n");
+        const b = add("b", "title=\n");
+        root.setStringList(home + "events_screen_actions", [b, a]);
         const actions = createTemporaryObject(enabledActions, test);
-        const shown = createTemporaryObject(page, test, { model: actions });
         tryCompare(actions, "count", 2);
-        compare(shown.titles(), ["b", "Kartat"]);
-        compare(shown.states(), [true, true]);
-    }
-
-    function test_anActionWithoutTitleHasNone() {
-        add("a", "title=\n");
-        const actions = createTemporaryObject(allActions, test);
-        const shown = createTemporaryObject(page, test, { model: actions });
-        compare(shown.titles(), [undefined]);
+        const shown = pageOf(actions);
+        compare(shown.all("title"), [undefined, "Kartat"]);
+        compare(shown.all("on"), [true, true]);
         compare(actions.get(0).title, undefined);
+        compare(actions.get(1), { title: "Kartat", icon: "i", path: a, enabled: true });
     }
 
     function test_choosingOnAPage() {
         const a = add("a");
         const b = add("b");
         const actions = createTemporaryObject(allActions, test);
-        const home = createTemporaryObject(enabledActions, test);
-        const shown = createTemporaryObject(page, test, { model: actions });
-        compare(shown.states(), [false, false]);
+        const enabled = createTemporaryObject(enabledActions, test);
+        const shown = pageOf(actions);
+        const enabledPaths = () => Array.from({ length: enabled.count },
+                                              (none, i) => enabled.get(i).path);
+        compare(shown.all("on"), [false, false]);
 
         actions.enableAction(b);
         actions.enableAction(a);
-        compare(shown.states(), [true, true]);
-        compare(home.count, 2);
-        compare(home.get(0).path, b);
-        compare(home.get(1).path, a);
-
-        home.move(1, 0);
-        compare(home.get(0).path, a);
-        tryVerify(() => stored(enabledKey) === [a, b].toString());
+        compare(shown.all("on"), [true, true]);
+        compare(enabledPaths(), [b, a]);
+        enabled.move(1, 0);
+        compare(enabledPaths(), [a, b]);
+        tryStored("events_screen_actions", [a, b]);
 
         actions.disableAction(a);
-        compare(shown.states(), [false, true]);
-        compare(home.count, 1);
-        tryVerify(() => stored(enabledKey) === b);
-        compare(stored("/desktop/glimmera-marlo-home/events_screen_actions_user"), "true");
+        compare(shown.all("on"), [false, true]);
+        compare(enabledPaths(), [b]);
+        tryStored("events_screen_actions", b);
+        tryStored("events_screen_actions_user", true);
     }
 
     function test_showPotentialIsAProperty() {
@@ -150,47 +131,27 @@ TestCase {
         compare(changes, 1);
     }
 
-    function test_getGivesTheRolesByTheirNames() {
-        const a = add("a", "title=maps-title\nicon=i\ntranslation-catalog=maps\n");
-        const actions = createTemporaryObject(allActions, test);
-        compare(actions.get(0), { title: "Kartat", icon: "i", path: a, enabled: false });
-    }
-
-    function test_invalidIndexesWarn() {
+    function test_warningsNameTheObjectInItsFile() {
         const actions = createTemporaryObject(allActions, test);
         compare(actions.get(3), {});
         actions.triggerAction(-1);
         const messages = root.takeMessages();
         compare(messages.length, 2);
-        verify(/QML QuickActionsModel: get\(\) called with invalid index: 3$/.test(messages[0]));
-        verify(/QML QuickActionsModel: triggerAction\(\) called with invalid index: -1$/
-               .test(messages[1]));
-        // Where it is: the file and line of the object.
-        verify(/^file:.*tst_quickactions\.qml:\d+:\d+: /.test(messages[0]), messages[0]);
+        const here = "^file:.*tst_quickactions\\.qml:\\d+:\\d+: QML QuickActionsModel: ";
+        verify(messages[0].match(here + "get\\(\\) called with invalid index: 3$"), messages[0]);
+        verify(messages[1].match(here + "triggerAction\\(\\) called with invalid index: -1$"),
+               messages[1]);
     }
 
     function test_aTapSendsTheCall() {
         root.ownService("org.example.lamp");
-        add("a", call + "[remote-arguments]\nsize=2\n1\\argument=1\n2\\argument=true\n");
-        const actions = createTemporaryObject(allActions, test);
-        actions.triggerAction(0);
+        add("a", "remote-service=org.example.lamp\nremote-path=/lamp\n"
+                 + "remote-interface=org.example.Lamp\nremote-method=toggle\n"
+                 + "[remote-arguments]\nsize=2\n1\\argument=1\n2\\argument=true\n");
+        createTemporaryObject(allActions, test).triggerAction(0);
         tryVerify(() => root.receivedCalls().length === 1);
         compare(root.receivedCalls()[0], { path: "/lamp", interface: "org.example.Lamp",
                                            method: "toggle", arguments: ["1", "true"] });
-    }
-
-    function test_aMissingServiceLeadsToTheStore() {
-        root.ownService("com.marlo.marlostore");
-        add("a", call + "requires-package=lamp-daemon\n");
-        const actions = createTemporaryObject(allActions, test);
-        actions.triggerAction(0);
-        tryVerify(() => root.receivedCalls().length === 1);
-        compare(root.receivedCalls()[0],
-                { path: "/StoreClient", interface: "com.marlo.marlostore",
-                  method: "showApp", arguments: ["lamp-daemon"] });
-        const messages = root.takeMessages();
-        compare(messages.length, 1);
-        verify(/Failed to send dbus call to: service=org.example.lamp /.test(messages[0]));
     }
 
     function test_followsPackages() {
@@ -202,21 +163,20 @@ TestCase {
         tryCompare(actions, "count", 0);
     }
 
-    // Signals are answered in the middle of what they announce.
     function test_handlersMayCallBack() {
         const a = add("a");
         const b = add("b");
         const actions = createTemporaryObject(allActions, test);
-        const shown = createTemporaryObject(page, test, { model: actions });
+        const shown = pageOf(actions);
         actions.rowsInserted.connect(() => actions.enableAction(b));
         actions.rowsRemoved.connect(() => actions.showPotential = true);
         actions.dataChanged.connect(() => actions.get(0));
         actions.countChanged.connect(() => actions.move(0, 0));
         add("c");
         tryCompare(actions, "count", 3);
-        root.setStringList("/desktop/glimmera-marlo-home/blocked_actions", [a]);
+        root.setStringList(home + "blocked_actions", [a]);
         tryCompare(actions, "count", 2);
-        tryVerify(() => shown.count === 2);
-        tryVerify(() => stored(enabledKey) === b);
+        tryCompare(shown, "count", 2);
+        tryStored("events_screen_actions", b);
     }
 }

@@ -5,32 +5,25 @@
 // really makes file systems.
 
 #include "files.h"
-#include "formatterevents.h"
-#include "memorycard/memorycardformatter.h"
-#include "messagelog.h"
+#include "formattertest.h"
 #include "simulator/realcard.h"
 
 #include <QDir>
 #include <QFile>
 #include <QtTest>
 
-#include <memory>
-
 #include <sys/prctl.h>
 
 #include <csignal>
 
-using Formatter = MemoryCardFormatter;
-
 namespace {
-
-constexpr int patience = 60000; // ms, of a machine that is very busy
 
 const QString ext4 = QStringLiteral("ext4");
 const QString vfat = QStringLiteral("vfat");
 
-const QByteArray warning = QByteArrayLiteral("warning [org.tarnwickos.settings.memorycard] ");
-const QByteArray diskServiceError = QByteArrayLiteral(" error: org.freedesktop.UDisks2.Error.");
+// The signals of operations that succeed. The first one says that the request was accepted.
+constexpr char mounted[] = "not busy, Mounting, busy, Idle, not busy";
+constexpr char unmounted[] = "not busy, Unmounting, busy, Idle, not busy";
 
 // Whether a thread of this process waits where it cannot be interrupted.
 bool someThreadIsStuck()
@@ -51,7 +44,7 @@ bool someThreadIsStuck()
 
 } // namespace
 
-class TestRealCard : public QObject
+class TestRealCard : public FormatterTest
 {
     Q_OBJECT
 
@@ -65,25 +58,20 @@ private Q_SLOTS:
     void mountAndUnmount();
     void format();
     void formatAsVfat();
-    void formatOfACardThatIsNotMounted();
     void removeAllFiles();
-    void removeAllFilesFromACardThatIsMounted();
     void busyCard();
     void deviceThatDisappears();
 
 private:
-    // Runs an operation and waits for its end.
+    // Each starts an operation, waits for its end and returns its signals.
     QByteArray run(void (Formatter::*operation)());
     QByteArray format(const QString &type);
+    QByteArray probe(const QString &path);
     QByteArray wait();
-    // Files, directories and links in the card, which has to be mounted.
+    // Creates files, directories and links on the card, which must be mounted.
     void fill();
-    QByteArray takeLog() { return m_log->takeReport().toUtf8(); }
 
-    std::unique_ptr<MessageLog> m_log;
     std::unique_ptr<RealCard> m_card;
-    std::unique_ptr<Formatter> m_formatter;
-    std::unique_ptr<FormatterEvents> m_events;
 };
 
 void TestRealCard::initTestCase()
@@ -108,55 +96,54 @@ void TestRealCard::cleanupTestCase()
     QVERIFY(QFileInfo::exists(loop));
     m_card.reset();
     // Nothing holds on to the device.
-    QTRY_VERIFY_WITH_TIMEOUT(!QFileInfo::exists(loop), patience);
+    TRY(!QFileInfo::exists(loop));
 }
 
 void TestRealCard::init()
 {
     m_card->reset();
-    m_log = std::make_unique<MessageLog>();
-    m_formatter = std::make_unique<Formatter>();
-    m_formatter->setDeviceName(m_card->name());
-    m_formatter->setDevicePath(m_card->path());
-    QTRY_COMPARE_WITH_TIMEOUT(m_formatter->filesystemType(), ext4, patience);
-    QTRY_COMPARE_WITH_TIMEOUT(m_formatter->status(), Formatter::Idle, patience);
-    m_events = std::make_unique<FormatterEvents>(m_formatter.get());
+    FormatterTest::init();
+    makeFormatter();
+    setCard(m_card->name(), m_card->path());
+    QCOMPARE(m_formatter->filesystemType(), ext4);
 }
 
 void TestRealCard::cleanup()
 {
     m_card->thaw();
     m_formatter.reset();
-    const QString report = m_log->takeReport();
-    m_log.reset();
-    QCOMPARE(report, QString());
+    FormatterTest::cleanup();
 }
 
 QByteArray TestRealCard::run(void (Formatter::*operation)())
 {
-    m_events->clear();
-    (m_formatter.get()->*operation)();
+    (forgetEvents()->*operation)();
     return wait();
 }
 
 QByteArray TestRealCard::format(const QString &type)
 {
-    m_events->clear();
-    m_formatter->format(type);
+    forgetEvents()->format(type);
+    return wait();
+}
+
+QByteArray TestRealCard::probe(const QString &path)
+{
+    forgetEvents()->setDevicePath(path);
     return wait();
 }
 
 QByteArray TestRealCard::wait()
 {
-    // An operation begins by saying "not busy", and ends with the status, with that again, or with
-    // an error that is no obstacle.
-    const auto isOver = [this] { return !m_formatter->busy() && m_events->line() != "not busy"; };
+    // An operation emits "not busy" first. It ends with the status, with "not busy" again, or with
+    // a forgiven error.
+    const auto isOver = [this] { return !m_formatter->busy() && events() != "not busy"; };
     if (!QTest::qWaitFor(isOver, patience)) {
-        return m_events->line() + " and no end";
+        return events() + " and no end";
     }
-    // Whatever is emitted together with that.
+    // The signals that are emitted together with the last one.
     QTest::qWait(0);
-    return m_events->line();
+    return events();
 }
 
 void TestRealCard::fill()
@@ -175,46 +162,50 @@ void TestRealCard::fill()
 
 void TestRealCard::probe()
 {
-    m_formatter->setDevicePath(QStringLiteral("/dev/nonexistent"));
-    QCOMPARE(wait(), QByteArray("path /dev/nonexistent, Probing, busy, type , Error, not busy"));
-    m_events->clear();
-    m_formatter->setDevicePath(m_card->path());
-    QCOMPARE(wait(),
+    QCOMPARE(probe(QStringLiteral("/dev/nonexistent")),
+             QByteArray("path /dev/nonexistent, Probing, busy, type , Error, not busy"));
+    QCOMPARE(probe(m_card->path()),
              "path " + m_card->path().toUtf8() + ", Probing, busy, type ext4, Idle, not busy");
 }
 
 void TestRealCard::mountAndUnmount()
 {
-    QCOMPARE(run(&Formatter::mount), QByteArray("not busy, Mounting, busy, Idle, not busy"));
+    QCOMPARE(run(&Formatter::mount), QByteArray(mounted));
     QCOMPARE(m_card->mountDirectories().size(), 1);
     QCOMPARE(m_card->files(), QStringList(QStringLiteral("lost+found")));
     QCOMPARE(run(&Formatter::mount), QByteArray("not busy, mount ErrorAlreadyMounted"));
-    QCOMPARE(takeLog(), warning + "\"Mount\"" + diskServiceError + "AlreadyMounted");
+    QCOMPARE(takeLog(), diskServiceError("Mount", "AlreadyMounted"));
 
-    QCOMPARE(run(&Formatter::unmount), QByteArray("not busy, Unmounting, busy, Idle, not busy"));
+    QCOMPARE(run(&Formatter::unmount), QByteArray(unmounted));
     QCOMPARE(m_card->mountDirectories(), QStringList());
     QCOMPARE(run(&Formatter::unmount), QByteArray("not busy, unmount ErrorNotMounted, Error"));
-    QCOMPARE(takeLog(), warning + "\"Unmount\"" + diskServiceError + "NotMounted");
+    QCOMPARE(takeLog(), diskServiceError("Unmount", "NotMounted"));
 }
 
 void TestRealCard::format()
 {
-    QCOMPARE(run(&Formatter::mount), QByteArray("not busy, Mounting, busy, Idle, not busy"));
-    fill();
     const QString before = m_card->probe("UUID");
+    // A card that is not mounted is not formatted.
+    QCOMPARE(format(ext4), QByteArray("not busy, unmount ErrorNotMounted, Error"));
+    QCOMPARE(takeLog(), diskServiceError("Unmount", "NotMounted"));
+    QCOMPARE(m_card->probe("UUID"), before);
+    QCOMPARE(m_card->mountDirectories(), QStringList());
+
+    QCOMPARE(run(&Formatter::mount), QByteArray(mounted));
+    fill();
     QCOMPARE(format(ext4),
              QByteArray("not busy, Unmounting, busy, Formatting, Mounting, Idle, not busy"));
     QVERIFY(m_card->probe("UUID") != before);
     QCOMPARE(m_card->mountDirectories().size(), 1);
     QCOMPARE(m_card->files(), QStringList(QStringLiteral("lost+found")));
-    QCOMPARE(run(&Formatter::unmount), QByteArray("not busy, Unmounting, busy, Idle, not busy"));
+    QCOMPARE(run(&Formatter::unmount), QByteArray(unmounted));
 }
 
 void TestRealCard::formatAsVfat()
 {
-    QCOMPARE(run(&Formatter::mount), QByteArray("not busy, Mounting, busy, Idle, not busy"));
+    QCOMPARE(run(&Formatter::mount), QByteArray(mounted));
     const QByteArray events = format(vfat);
-    // Not every kernel can mount what has been made.
+    // Not every kernel can mount the new file system.
     QVERIFY2(events.startsWith("not busy, Unmounting, busy, Formatting, Mounting, Idle, ")
                  || events.startsWith("not busy, Unmounting, busy, Formatting, mount ErrorFailed, "
                                       "Error, "),
@@ -222,18 +213,9 @@ void TestRealCard::formatAsVfat()
     takeLog();
     QCOMPARE(m_card->probe("TYPE"), vfat);
 
-    Formatter another;
-    another.setDevicePath(m_card->path());
-    QTRY_COMPARE_WITH_TIMEOUT(another.filesystemType(), vfat, patience);
-}
-
-void TestRealCard::formatOfACardThatIsNotMounted()
-{
-    const QString before = m_card->probe("UUID");
-    QCOMPARE(format(ext4), QByteArray("not busy, unmount ErrorNotMounted, Error"));
-    QCOMPARE(takeLog(), warning + "\"Unmount\"" + diskServiceError + "NotMounted");
-    QCOMPARE(m_card->probe("UUID"), before);
-    QCOMPARE(m_card->mountDirectories(), QStringList());
+    makeFormatter();
+    setCard(m_card->name(), m_card->path());
+    QCOMPARE(m_formatter->filesystemType(), vfat);
 }
 
 void TestRealCard::removeAllFiles()
@@ -245,16 +227,13 @@ void TestRealCard::removeAllFiles()
              QByteArray("not busy, Mounting, busy, RemovingFiles, Idle, not busy"));
     QCOMPARE(m_card->files(), QStringList());
     QVERIFY(QFileInfo::exists(QStringLiteral("/etc/passwd")));
-}
 
-void TestRealCard::removeAllFilesFromACardThatIsMounted()
-{
-    run(&Formatter::mount);
+    // The card is still mounted.
     fill();
     QCOMPARE(
         run(&Formatter::removeAllFiles),
         QByteArray("not busy, mount ErrorAlreadyMounted, RemovingFiles, busy, Idle, not busy"));
-    QCOMPARE(takeLog(), warning + "\"Mount\"" + diskServiceError + "AlreadyMounted");
+    QCOMPARE(takeLog(), diskServiceError("Mount", "AlreadyMounted"));
     QCOMPARE(m_card->files(), QStringList());
 }
 
@@ -268,15 +247,15 @@ void TestRealCard::busyCard()
     QVERIFY(file.open(QIODevice::ReadOnly));
 
     QCOMPARE(run(&Formatter::unmount), QByteArray("not busy, unmount ErrorDeviceBusy, Error"));
-    QCOMPARE(takeLog(), warning + "\"Unmount\"" + diskServiceError + "DeviceBusy");
+    QCOMPARE(takeLog(), diskServiceError("Unmount", "DeviceBusy"));
     QCOMPARE(format(ext4), QByteArray("not busy, unmount ErrorDeviceBusy"));
-    QCOMPARE(takeLog(), warning + "\"Unmount\"" + diskServiceError + "DeviceBusy");
+    QCOMPARE(takeLog(), diskServiceError("Unmount", "DeviceBusy"));
     QCOMPARE(m_formatter->status(), Formatter::Error);
     QCOMPARE(m_card->probe("UUID"), before);
     QCOMPARE(file.readAll(), QByteArray("content"));
 
     file.close();
-    QCOMPARE(run(&Formatter::unmount), QByteArray("not busy, Unmounting, busy, Idle, not busy"));
+    QCOMPARE(run(&Formatter::unmount), QByteArray(unmounted));
 }
 
 void TestRealCard::deviceThatDisappears()
@@ -284,39 +263,29 @@ void TestRealCard::deviceThatDisappears()
     run(&Formatter::mount);
     fill();
     m_card->freeze();
-    m_events->clear();
-    m_formatter->removeAllFiles();
-    QTRY_COMPARE_WITH_TIMEOUT(
-        m_events->line(), QByteArray("not busy, mount ErrorAlreadyMounted, RemovingFiles, busy"),
-        patience);
+    forgetEvents()->removeAllFiles();
+    TRY_EVENTS("not busy, mount ErrorAlreadyMounted, RemovingFiles, busy");
     takeLog();
-    // The remover has read the card, and waits for its first file to go.
-    QTRY_VERIFY_WITH_TIMEOUT(someThreadIsStuck(), patience);
+    // The remover has read the card, and waits for the removal of its first file.
+    TRY(someThreadIsStuck());
     m_card->vanish();
     m_card->thaw();
-    QTRY_COMPARE_WITH_TIMEOUT(m_events->line(),
-                              QByteArray("not busy, mount ErrorAlreadyMounted, RemovingFiles, "
-                                         "busy, Error, not busy"),
-                              patience);
+    TRY_EVENTS("not busy, mount ErrorAlreadyMounted, RemovingFiles, busy, Error, not busy");
 
-    // And with what is left of it: nothing to unmount, so far as the disk service knows, and
-    // nothing to find a file system on.
+    // The disk service no longer knows the device, and the helper finds no file system on it.
     m_formatter->unmount();
     QByteArray log;
-    QTRY_VERIFY_WITH_TIMEOUT((log += takeLog()).endsWith("DBus.Error.UnknownMethod"), patience);
+    TRY((log += takeLog()).endsWith("DBus.Error.UnknownMethod"));
     QCOMPARE(m_formatter->status(), Formatter::Error);
-    m_events->clear();
-    m_formatter->setDevicePath(m_card->path() + QLatin1Char(' '));
-    wait();
-    m_events->clear();
-    m_formatter->setDevicePath(m_card->path());
-    QCOMPARE(wait(), "path " + m_card->path().toUtf8() + ", Probing, busy, Error, not busy");
+    probe(m_card->path() + QLatin1Char(' '));
+    QCOMPARE(probe(m_card->path()),
+             "path " + m_card->path().toUtf8() + ", Probing, busy, Error, not busy");
     QCOMPARE(m_formatter->filesystemType(), QString());
 }
 
 int main(int argc, char *argv[])
 {
-    // Whoever runs the test may be killed, and everything here hangs on this process.
+    // The card and its daemons end with this process, even if whoever runs the test is killed.
     prctl(PR_SET_PDEATHSIG, SIGKILL);
     if (RealCard::whyNot().isEmpty()) {
         RealCard::becomePrivate();

@@ -41,6 +41,25 @@ void append(QByteArrayList &paths, const QByteArray &directory, const QByteArray
 
 } // namespace
 
+void FileTree::makeTree(const QByteArray &top, const QByteArrayList &entries)
+{
+    const QByteArray arrow = " -> ";
+    for (const QByteArray &entry : entries) {
+        const int nameEnd = entry.indexOf(arrow);
+        const QByteArray path = top + '/' + entry.mid(0, nameEnd);
+        for (int i = top.size(); i >= 0; i = path.indexOf('/', i + 1)) {
+            if (!exists(path.left(i))) {
+                makeDirectory(path.left(i));
+            }
+        }
+        if (nameEnd >= 0) {
+            makeLink(path, entry.mid(nameEnd + arrow.size()));
+        } else if (!path.endsWith('/')) {
+            makeFile(path);
+        }
+    }
+}
+
 void FileTree::makeDirectory(const QByteArray &path)
 {
     require(mkdir(path.constData(), 0700), path);

@@ -14,6 +14,9 @@
 */
 namespace FileTree {
 
+// Creates entries below the directory top, and missing directories on their paths: "directory/",
+// "link -> target", or the name of an empty file.
+void makeTree(const QByteArray &top, const QByteArrayList &entries);
 void makeDirectory(const QByteArray &path);
 void makeFile(const QByteArray &path, const QByteArray &content = QByteArray());
 void makeFiles(const QByteArray &directory, int count);

@@ -20,6 +20,7 @@ public:
     ~ScratchFileSystem();
     Q_DISABLE_COPY_MOVE(ScratchFileSystem)
 
+    QByteArray path() const { return m_path; }
     // The path of a name in it.
     QByteArray path(const char *name) const;
 

@@ -5,8 +5,7 @@
 
 #include "failingcard.h"
 #include "files.h"
-#include "memorycard/memorycardformatter.h"
-#include "messagelog.h"
+#include "formattertest.h"
 #include "ownprocess.h"
 #include "simulator/serviceprocess.h"
 #include "usedupdescriptors.h"
@@ -16,14 +15,13 @@
 #include <QtTest>
 
 #include <csignal>
-#include <memory>
 
 #include <sys/mount.h>
 
-using Formatter = MemoryCardFormatter;
-using Statuses = QList<Formatter::Status>;
+using Fault = FailingCard::Fault;
+Q_DECLARE_METATYPE(Fault)
 
-class TestCardFaults : public QObject
+class TestCardFaults : public FormatterTest
 {
     Q_OBJECT
 
@@ -31,8 +29,8 @@ private Q_SLOTS:
     void init();
     void cleanup();
 
-    void cardThatCannotBeListed();
-    void cardWithErrors();
+    void cardThatFails_data();
+    void cardThatFails();
     void cardGoneWhileItIsEmptied();
     void cardDetachedWhileItIsEmptied();
     void cardThatHangs();
@@ -45,28 +43,26 @@ private Q_SLOTS:
     void helperThatNeverEnds();
 
 private:
-    void makeFormatter();
-    void startEmptying();
+    // Starts to empty a card, which blocks the removal of its first file.
+    void startEmptying(FailingCard *card);
+    void startProbing(const QString &path, const QByteArray &helper);
 
-    std::unique_ptr<MessageLog> m_log;
     std::unique_ptr<ServiceProcess> m_diskService;
-    std::unique_ptr<Formatter> m_formatter;
-    // Since the last start.
-    Statuses m_statuses;
 };
 
 namespace {
 
-constexpr int patience = 60000; // ms, of a machine that is very busy
 constexpr int files = 300;
 
-const Statuses emptied = {Formatter::Mounting, Formatter::RemovingFiles, Formatter::Idle};
-const Statuses notEmptied = {Formatter::Mounting, Formatter::RemovingFiles, Formatter::Error};
+// The signals of removeAllFiles() when it succeeds and when it fails.
+constexpr char emptied[] = "not busy, Mounting, busy, RemovingFiles, Idle, not busy";
+constexpr char notEmptied[] = "not busy, Mounting, busy, RemovingFiles, Error, not busy";
 
+const QString name = QStringLiteral("testcard1");
 const QString device = QStringLiteral("/dev/testcard1");
+const QString otherDevice = QStringLiteral("/dev/testcard2");
+const QString vfat = QStringLiteral("vfat");
 
-#define TRY(condition) QTRY_VERIFY_WITH_TIMEOUT(condition, patience)
-#define TRY_COMPARE(actual, expected) QTRY_COMPARE_WITH_TIMEOUT(actual, expected, patience)
 #define NEEDS_FUSE()                                                                               \
     if (!FailingCard::whyNot().isEmpty()) {                                                        \
         QSKIP(qPrintable(FailingCard::whyNot()));                                                  \
@@ -79,21 +75,17 @@ void installHelper(const QByteArray &script)
     QVERIFY(QFile::setPermissions(path, QFile::ReadOwner | QFile::ExeOwner));
 }
 
-// Runs the event loop for a while. Only other threads are blocked.
-void letEverythingArrive()
-{
-    QTest::qWait(100);
-}
-
 } // namespace
 
 void TestCardFaults::init()
 {
+    FormatterTest::init();
     installHelper("echo ext4\n");
-    m_log = std::make_unique<MessageLog>();
     m_diskService = std::make_unique<ServiceProcess>(
         "system", QStringLiteral("org.freedesktop.UDisks2"), "replies");
     makeFormatter();
+    setCard(name, device);
+    QCOMPARE(m_formatter->filesystemType(), QStringLiteral("ext4"));
 }
 
 void TestCardFaults::cleanup()
@@ -101,54 +93,46 @@ void TestCardFaults::cleanup()
     m_formatter.reset();
     m_diskService.reset();
     QVERIFY(QThreadPool::globalInstance()->waitForDone(patience));
-    const QString report = m_log->takeReport();
-    m_log.reset();
-    QCOMPARE(report, QString());
+    FormatterTest::cleanup();
 }
 
-void TestCardFaults::makeFormatter()
+void TestCardFaults::startEmptying(FailingCard *card)
 {
-    m_formatter = std::make_unique<Formatter>();
-    connect(m_formatter.get(), &Formatter::statusChanged, this,
-            [this] { m_statuses.append(m_formatter->status()); });
-    m_formatter->setDeviceName(QStringLiteral("testcard1"));
-    m_formatter->setDevicePath(device);
-    TRY_COMPARE(m_formatter->filesystemType(), QStringLiteral("ext4"));
-    TRY_COMPARE(m_formatter->status(), Formatter::Idle);
-}
-
-void TestCardFaults::startEmptying()
-{
-    m_statuses.clear();
+    card->setFault(Fault::Waits);
     m_formatter->removeAllFiles();
+    TRY_COMPARE(card->waiting(), 1);
 }
 
-void TestCardFaults::cardThatCannotBeListed()
+void TestCardFaults::startProbing(const QString &path, const QByteArray &helper)
 {
-    NEEDS_FUSE()
-    FailingCard card(device, files);
-    card.setFault(FailingCard::Fault::Unreadable);
-    startEmptying();
-    // What cannot be read counts as empty.
-    TRY_COMPARE(m_statuses, emptied);
-    QCOMPARE(card.filesLeft(), files);
-    card.setFault(FailingCard::Fault::None);
-    startEmptying();
-    TRY_COMPARE(m_statuses, emptied);
-    QCOMPARE(card.filesLeft(), 0);
+    installHelper(helper);
+    forgetEvents()->setDevicePath(path);
+    QCOMPARE(m_formatter->status(), Formatter::Probing);
 }
 
-void TestCardFaults::cardWithErrors()
+void TestCardFaults::cardThatFails_data()
+{
+    QTest::addColumn<Fault>("fault");
+    QTest::addColumn<QByteArray>("expected");
+    // It counts as empty.
+    QTest::newRow("cannot be listed") << Fault::Unreadable << QByteArray(emptied);
+    QTest::newRow("removes nothing") << Fault::Stuck << QByteArray(notEmptied);
+}
+
+void TestCardFaults::cardThatFails()
 {
     NEEDS_FUSE()
+    QFETCH(Fault, fault);
+    QFETCH(QByteArray, expected);
     FailingCard card(device, files);
-    card.setFault(FailingCard::Fault::Stuck);
-    startEmptying();
-    TRY_COMPARE(m_statuses, notEmptied);
+    card.setFault(fault);
+    m_formatter->removeAllFiles();
+    TRY_EVENTS(expected);
     QCOMPARE(card.filesLeft(), files);
-    card.setFault(FailingCard::Fault::None);
-    startEmptying();
-    TRY_COMPARE(m_statuses, emptied);
+
+    card.setFault(Fault::None);
+    forgetEvents()->removeAllFiles();
+    TRY_EVENTS(emptied);
     QCOMPARE(card.filesLeft(), 0);
 }
 
@@ -157,16 +141,14 @@ void TestCardFaults::cardGoneWhileItIsEmptied()
     NEEDS_FUSE()
     {
         FailingCard card(device, files);
-        card.setFault(FailingCard::Fault::Waits);
-        startEmptying();
-        TRY_COMPARE(card.waiting(), 1);
-        card.setFault(FailingCard::Fault::Gone);
-        TRY_COMPARE(m_statuses, notEmptied);
+        startEmptying(&card);
+        card.setFault(Fault::Gone);
+        TRY_EVENTS(notEmptied);
         QCOMPARE(card.filesLeft(), files);
     }
-    FailingCard another(device, files);
-    startEmptying();
-    TRY_COMPARE(m_statuses, emptied);
+    const FailingCard another(device, files);
+    forgetEvents()->removeAllFiles();
+    TRY_EVENTS(emptied);
     QCOMPARE(another.filesLeft(), 0);
 }
 
@@ -174,21 +156,19 @@ void TestCardFaults::cardDetachedWhileItIsEmptied()
 {
     NEEDS_FUSE()
     FailingCard card(device, files);
-    card.setFault(FailingCard::Fault::Waits);
-    startEmptying();
-    TRY_COMPARE(card.waiting(), 1);
-    // Beneath the card lies a directory of somebody else's.
+    startEmptying(&card);
+    // The directory below the card is not part of it.
     card.detach();
     const QString below = card.directory() + QStringLiteral("/file0");
     Files::write(below, "not of the card");
-    card.setFault(FailingCard::Fault::None);
-    TRY_COMPARE(m_statuses, emptied);
+    card.setFault(Fault::None);
+    TRY_EVENTS(emptied);
     QCOMPARE(card.filesLeft(), 0);
     QVERIFY(QFile::exists(below));
 
     // And no card is mounted any more.
-    startEmptying();
-    TRY_COMPARE(m_statuses, notEmptied);
+    forgetEvents()->removeAllFiles();
+    TRY_EVENTS(notEmptied);
     QVERIFY(QFile::exists(below));
 }
 
@@ -196,14 +176,12 @@ void TestCardFaults::cardThatHangs()
 {
     NEEDS_FUSE()
     FailingCard card(device, files);
-    card.setFault(FailingCard::Fault::Waits);
-    startEmptying();
-    TRY_COMPARE(card.waiting(), 1);
-    letEverythingArrive();
-    QCOMPARE(m_formatter->status(), Formatter::RemovingFiles);
+    startEmptying(&card);
+    QTest::qWait(100);
+    TRY_EVENTS("not busy, Mounting, busy, RemovingFiles");
     QVERIFY(m_formatter->busy());
-    card.setFault(FailingCard::Fault::None);
-    TRY_COMPARE(m_statuses, emptied);
+    card.setFault(Fault::None);
+    TRY_EVENTS(emptied);
     QCOMPARE(card.filesLeft(), 0);
 }
 
@@ -211,21 +189,20 @@ void TestCardFaults::goesWhileTheCardHangs()
 {
     NEEDS_FUSE()
     FailingCard card(device, files);
-    card.setFault(FailingCard::Fault::Waits);
-    startEmptying();
-    TRY_COMPARE(card.waiting(), 1);
+    startEmptying(&card);
     m_formatter.reset();
-    letEverythingArrive();
-    // What was asked for is done all the same.
-    card.setFault(FailingCard::Fault::None);
+    QTest::qWait(100);
+    // The removal continues all the same.
+    card.setFault(Fault::None);
     TRY_COMPARE(card.filesLeft(), 0);
 }
 
 void TestCardFaults::fullCard()
 {
-    QTemporaryDir dir;
-    QCOMPARE(mount(QFile::encodeName(device).constData(), QFile::encodeName(dir.path()).constData(),
-                   "tmpfs", 0, "size=64k,nr_inodes=10"),
+    const QTemporaryDir dir;
+    const QByteArray path = QFile::encodeName(dir.path());
+    QCOMPARE(mount(QFile::encodeName(device).constData(), path.constData(), "tmpfs", 0,
+                   "size=64k,nr_inodes=10"),
              0);
     int written = 0;
     for (int i = 0; i < 20; ++i) {
@@ -236,10 +213,10 @@ void TestCardFaults::fullCard()
         }
     }
     QVERIFY(written > 0 && written < 20);
-    startEmptying();
-    TRY_COMPARE(m_statuses, emptied);
+    m_formatter->removeAllFiles();
+    TRY_EVENTS(emptied);
     const QStringList left = QDir(dir.path()).entryList(QDir::AllEntries | QDir::NoDotAndDotDot);
-    umount2(QFile::encodeName(dir.path()).constData(), MNT_DETACH);
+    umount2(path.constData(), MNT_DETACH);
     QCOMPARE(left, QStringList());
 }
 
@@ -253,79 +230,60 @@ void TestCardFaults::cardWithoutDescriptors()
     IN_A_PROCESS_OF_ITS_OWN()
     // A first connection to a bus cannot be had without descriptors: QtDBus ends the process.
     m_formatter->mount();
-    TRY_COMPARE(m_statuses.size(), 4); // with those of the probe
-    FailingCard card(device, files);
+    TRY_EVENTS("not busy, Mounting, busy, Idle, not busy");
+    const FailingCard card(device, files);
     {
         const UsedUpDescriptors none;
-        startEmptying();
-        TRY_COMPARE(m_statuses, (Statuses{Formatter::Mounting, Formatter::Error}));
+        forgetEvents()->removeAllFiles();
+        TRY_EVENTS("not busy, Mounting, busy, Error, not busy");
         QCOMPARE(card.filesLeft(), files);
     }
-    startEmptying();
-    TRY_COMPARE(m_statuses, emptied);
+    forgetEvents()->removeAllFiles();
+    TRY_EVENTS(emptied);
     QCOMPARE(card.filesLeft(), 0);
-    {
-        // Now there is a thread that is waiting for work.
-        const UsedUpDescriptors none;
-        startEmptying();
-        TRY_COMPARE(m_formatter->status(), Formatter::Error);
-    }
+
+    // Now the pool has a thread that waits for work.
+    const UsedUpDescriptors none;
+    forgetEvents()->removeAllFiles();
+    TRY_EVENTS("not busy, Mounting, busy, Error, not busy");
 }
 
 void TestCardFaults::helperThatWritesAHundredMegabytes()
 {
-    constexpr int size = 100000000;
-    installHelper("head -c 100000000 /dev/zero | tr '\\0' x\n");
-    m_formatter->setDevicePath(QStringLiteral("/dev/testcard2"));
-    TRY_COMPARE(m_formatter->status(), Formatter::Probing);
+    startProbing(otherDevice, "head -c 100000000 /dev/zero | tr '\\0' x\n");
     TRY_COMPARE(m_formatter->status(), Formatter::Idle);
     // Whatever it writes is the type.
-    QCOMPARE(m_formatter->filesystemType().size(), size);
-    // The output of a helper that formats is not read at all.
-    m_statuses.clear();
-    m_formatter->format(QStringLiteral("vfat"));
-    TRY_COMPARE(m_statuses,
-                (Statuses{Formatter::Unmounting, Formatter::Formatting, Formatter::Mounting,
-                          Formatter::Idle}));
-    QCOMPARE(m_formatter->filesystemType().size(), size);
-
-    installHelper("echo vfat\n");
-    m_formatter->setDevicePath(device);
-    TRY_COMPARE(m_formatter->filesystemType(), QStringLiteral("vfat"));
+    QCOMPARE(m_formatter->filesystemType().size(), 100000000);
+    startProbing(device, "echo vfat\n");
+    TRY_COMPARE(m_formatter->filesystemType(), vfat);
 }
 
 void TestCardFaults::helperThatClosesItsOutputFirst()
 {
     // The probe ends when the helper exits, not when it closes its output.
-    installHelper("echo vfat\nexec >&-\nsleep 0.5\nexit 0\n");
-    m_formatter->setDevicePath(QStringLiteral("/dev/testcard2"));
-    TRY_COMPARE(m_formatter->status(), Formatter::Probing);
+    startProbing(otherDevice, "echo vfat\nexec >&-\nsleep 0.5\nexit 0\n");
     TRY_COMPARE(m_formatter->status(), Formatter::Idle);
-    QCOMPARE(m_formatter->filesystemType(), QStringLiteral("vfat"));
-    installHelper("exec >&-\nsleep 0.5\nexit 1\n");
-    m_formatter->setDevicePath(device);
+    QCOMPARE(m_formatter->filesystemType(), vfat);
+    startProbing(device, "exec >&-\nsleep 0.5\nexit 1\n");
     TRY_COMPARE(m_formatter->status(), Formatter::Error);
     QCOMPARE(m_formatter->filesystemType(), QString());
 }
 
 void TestCardFaults::helperThatNeverEnds()
 {
-    installHelper("echo $$ >/run/helper\nexec sleep 600\n");
-    m_formatter->setDevicePath(QStringLiteral("/dev/testcard2"));
+    startProbing(otherDevice, "echo $$ >/run/helper\nexec sleep 600\n");
     QFile file(QStringLiteral("/run/helper"));
     TRY(file.size() > 0);
-    letEverythingArrive();
+    QTest::qWait(100);
     QCOMPARE(m_formatter->status(), Formatter::Probing);
-    // Somebody ends it.
+    // Another program ends it.
     QVERIFY(file.open(QIODevice::ReadOnly));
     const int pid = file.readAll().trimmed().toInt();
     QVERIFY(pid > 1);
     QCOMPARE(kill(pid, SIGKILL), 0);
     TRY_COMPARE(m_formatter->status(), Formatter::Error);
-    installHelper("echo vfat\n");
-    m_formatter->setDevicePath(device);
-    TRY_COMPARE(m_formatter->filesystemType(), QStringLiteral("vfat"));
-    TRY_COMPARE(m_formatter->status(), Formatter::Idle);
+    startProbing(device, "echo vfat\n");
+    TRY_EVENTS("path /dev/testcard1, Probing, busy, type vfat, Idle, not busy");
 }
 
 QTEST_GUILESS_MAIN(TestCardFaults)

@@ -5,21 +5,17 @@
 
 #include "deviceinfo/kivinfo.h"
 #include "files.h"
-#include "memorycard/memorycardformatter.h"
-#include "messagelog.h"
+#include "formattertest.h"
 #include "quickactions/quickactionsmodel.h"
 #include "simulator/serviceprocess.h"
+#include "words.h"
 
 #include <QDBusPendingCallWatcher>
 #include <QPointer>
 #include <QRegularExpression>
 #include <QtTest>
 
-#include <memory>
-
-using Formatter = MemoryCardFormatter;
-
-class TestServiceFaults : public QObject
+class TestServiceFaults : public FormatterTest
 {
     Q_OBJECT
 
@@ -30,90 +26,106 @@ private Q_SLOTS:
     void coverDaemonHangs();
     void coverDaemonDiesBeforeItReplies();
     void coverDaemonFloods();
-    void goesWhileTheCoverDaemonFloods();
 
     void diskServiceHangs();
     void goesWhileTheDiskServiceHangs();
-    void diskServiceRepliesWithOtherTypes();
-    void diskServiceFloods();
+    void diskServiceSendsOtherThings_data();
+    void diskServiceSendsOtherThings();
     void diskServiceComesBack();
 
     void actionServiceHangs();
     void goesWhileTheActionServiceHangs();
-    void actionServiceDiesBeforeItReplies();
-    void actionServiceRepliesWithOtherTypes();
-    void actionServiceFloods();
+    void actionServiceSendsOtherThings_data();
+    void actionServiceSendsOtherThings();
     void storeHangs();
 
 private:
-    QByteArray takeLog() { return m_log->takeReport().toUtf8(); }
+    // Each replaces the service of the test.
+    void start(const char *bus, const char *name, const char *scenario);
+    void startCoverDaemon(const char *scenario) { start("system", "com.marlo.kivd", scenario); }
+    void startDiskService(const char *scenario)
+    {
+        start("system", "org.freedesktop.UDisks2", scenario);
+        forgetEvents();
+    }
+    void startActionService(const char *scenario)
+    {
+        start("session", "org.example.lamp", scenario);
+    }
+    static void addScenarios();
 
-    std::unique_ptr<MessageLog> m_log;
+    std::unique_ptr<ServiceProcess> m_service;
+    std::unique_ptr<QuickActionsModel> m_model;
 };
 
 namespace {
 
-constexpr int patience = 60000; // ms, of a machine that is very busy
 constexpr int flood = 10000; // signals
-
-const QString coverDaemon = QStringLiteral("com.marlo.kivd");
-const QString diskService = QStringLiteral("org.freedesktop.UDisks2");
-const QString actionService = QStringLiteral("org.example.lamp");
-const QString store = QStringLiteral("com.marlo.marlostore");
 
 const QString directory = QStringLiteral("/usr/share/glimmera/quickactions");
 const QByteArray action = "remote-service=org.example.lamp\nremote-path=/lamp\n"
                           "remote-interface=org.example.Lamp\nremote-method=toggle\n"
                           "requires-package=lamp\n";
 
-#define TRY(condition) QTRY_VERIFY_WITH_TIMEOUT(condition, patience)
-#define TRY_COMPARE(actual, expected) QTRY_COMPARE_WITH_TIMEOUT(actual, expected, patience)
+// QtDBus logs this when two changes of an owner overtake each other between its threads, as they do
+// now and then where a service comes and goes as quickly as here. It goes by the later one.
+const QString lateOwner =
+    QStringLiteral("QDBusConnection: name '[^']*' had owner '[^']*' but we thought it was");
 
-// Nothing that is there to come changes anything.
+// Shows that nothing more changes.
 void letEverythingArrive()
 {
     QTest::qWait(100);
 }
-
-// QtDBus says so when two changes of an owner overtake each other between its threads, as they do
-// now and then where a service comes and goes as quickly as here. It goes by the later one.
-const QString lateOwner =
-    QStringLiteral("QDBusConnection: name '[^']*' had owner '[^']*' but we thought it was");
 
 bool isSettled(const KivInfo &info)
 {
     return info.findChildren<QDBusPendingCallWatcher *>().isEmpty();
 }
 
-std::unique_ptr<QuickActionsModel> loadedModel()
-{
-    auto model = std::make_unique<QuickActionsModel>();
-    model->setShowPotential(true);
-    model->componentComplete();
-    return model;
-}
-
 } // namespace
 
 void TestServiceFaults::init()
 {
+    FormatterTest::init();
     Files::remove(directory);
     Files::write(directory + QStringLiteral("/lamp.conf"), action);
-    m_log = std::make_unique<MessageLog>();
+    m_model = std::make_unique<QuickActionsModel>();
+    m_model->setShowPotential(true);
+    m_model->componentComplete();
+    makeFormatter();
+    m_formatter->setDeviceName(QStringLiteral("testcard1"));
 }
 
 void TestServiceFaults::cleanup()
 {
+    m_formatter.reset();
+    m_model.reset();
+    m_service.reset();
     QCOMPARE(m_log->takeLinesWithout(QRegularExpression(lateOwner)), QStringList());
-    m_log.reset();
+    FormatterTest::cleanup();
+}
+
+void TestServiceFaults::start(const char *bus, const char *name, const char *scenario)
+{
+    m_service.reset();
+    m_service = std::make_unique<ServiceProcess>(bus, QString::fromLatin1(name), scenario);
+}
+
+void TestServiceFaults::addScenarios()
+{
+    QTest::addColumn<QByteArray>("scenario");
+    QTest::addColumn<int>("signalCount");
+    QTest::newRow("replies of other types") << QByteArray("other-types") << 0;
+    QTest::newRow("many signals") << QByteArray("replies") << flood;
 }
 
 void TestServiceFaults::coverDaemonHangs()
 {
-    ServiceProcess daemon("system", coverDaemon, "replies");
-    daemon.stop();
+    startCoverDaemon("replies");
+    m_service->stop();
     const KivInfo info;
-    // One that goes meanwhile, before and after its calls have left.
+    // One is destroyed before its calls have been sent, and another after that.
     auto another = std::make_unique<KivInfo>();
     delete new KivInfo;
     letEverythingArrive();
@@ -122,216 +134,170 @@ void TestServiceFaults::coverDaemonHangs()
     QVERIFY(!info.kivReady());
     QVERIFY(!isSettled(info));
 
-    daemon.goOn();
+    m_service->goOn();
     TRY_COMPARE(info.kivId(), QStringLiteral("cover-0"));
     TRY(info.kivReady());
-    QVERIFY(!daemon.calls().contains(QStringLiteral("Introspect")));
+    QVERIFY(!m_service->calls().contains(QStringLiteral("Introspect")));
 }
 
 void TestServiceFaults::coverDaemonDiesBeforeItReplies()
 {
-    std::unique_ptr<KivInfo> info;
-    {
-        ServiceProcess daemon("system", coverDaemon, "gone");
-        info = std::make_unique<KivInfo>();
-        TRY(isSettled(*info));
-        TRY_COMPARE(daemon.calls().size(), 1);
-    }
-    QCOMPARE(info->kivId(), QString());
-    QVERIFY(!info->kivReady());
+    startCoverDaemon("gone");
+    const KivInfo info;
+    TRY(isSettled(info));
+    TRY_COMPARE(m_service->calls().size(), 1);
+    QCOMPARE(info.kivId(), QString());
+    QVERIFY(!info.kivReady());
 
     // The next one is followed.
-    ServiceProcess daemon("system", coverDaemon, "replies");
-    daemon.sendSignals(1);
-    TRY_COMPARE(info->kivId(), QStringLiteral("cover-1"));
-    QVERIFY(info->kivReady());
+    startCoverDaemon("replies");
+    m_service->sendSignals(1);
+    TRY_COMPARE(info.kivId(), QStringLiteral("cover-1"));
+    QVERIFY(info.kivReady());
 }
 
 void TestServiceFaults::coverDaemonFloods()
 {
-    ServiceProcess daemon("system", coverDaemon, "replies");
+    startCoverDaemon("replies");
     const KivInfo info;
     TRY(isSettled(info));
     const QSignalSpy changed(&info, &KivInfo::kivIdChanged);
-    daemon.sendSignals(flood);
+    // This one is destroyed meanwhile.
+    const QPointer<KivInfo> another = new KivInfo;
+    TRY(isSettled(*another));
+    connect(another, &KivInfo::kivIdChanged, another, [&another] {
+        if (another->kivId() == QLatin1String("cover-100")) {
+            another->deleteLater();
+        }
+    });
+    m_service->sendSignals(flood);
     TRY_COMPARE(info.kivId(), QStringLiteral("cover-%1").arg(flood));
     QVERIFY(info.kivReady());
     QCOMPARE(changed.count(), flood);
-}
-
-void TestServiceFaults::goesWhileTheCoverDaemonFloods()
-{
-    ServiceProcess daemon("system", coverDaemon, "replies");
-    const KivInfo last;
-    const QPointer<KivInfo> info = new KivInfo;
-    TRY(isSettled(*info));
-    connect(info, &KivInfo::kivIdChanged, info, [&info] {
-        if (info->kivId() == QLatin1String("cover-100")) {
-            info->deleteLater();
-        }
-    });
-    daemon.sendSignals(flood);
-    TRY_COMPARE(last.kivId(), QStringLiteral("cover-%1").arg(flood));
-    QVERIFY(info == nullptr);
+    QVERIFY(another == nullptr);
 }
 
 void TestServiceFaults::diskServiceHangs()
 {
-    ServiceProcess service("system", diskService, "replies");
-    service.stop();
-    Formatter formatter;
-    formatter.setDeviceName(QStringLiteral("testcard1"));
-    formatter.mount();
-    formatter.unmount();
+    startDiskService("replies");
+    m_service->stop();
+    m_formatter->mount();
+    m_formatter->unmount();
     letEverythingArrive();
-    QCOMPARE(formatter.status(), Formatter::Idle);
-    QVERIFY(!formatter.busy());
+    QCOMPARE(events(), QByteArray("not busy, not busy"));
 
-    const QSignalSpy changed(&formatter, &Formatter::statusChanged);
-    service.goOn();
-    // Mounting, then Unmounting at once, then Idle.
-    TRY_COMPARE(service.calls(), (QStringList{QStringLiteral("Mount"), QStringLiteral("Unmount")}));
-    TRY_COMPARE(changed.count(), 3);
-    QCOMPARE(formatter.status(), Formatter::Idle);
+    m_service->goOn();
+    TRY_COMPARE(m_service->calls(), words("Mount Unmount"));
+    TRY_EVENTS("not busy, not busy, Mounting, busy, Unmounting, Idle, not busy");
 }
 
 void TestServiceFaults::goesWhileTheDiskServiceHangs()
 {
-    ServiceProcess service("system", diskService, "replies");
-    service.stop();
-    auto formatter = std::make_unique<Formatter>();
-    formatter->setDeviceName(QStringLiteral("testcard1"));
-    formatter->mount();
-    formatter->unmount();
+    startDiskService("replies");
+    m_service->stop();
+    m_formatter->mount();
+    m_formatter->unmount();
     letEverythingArrive();
-    formatter.reset();
-    service.goOn();
-    TRY_COMPARE(service.calls(), QStringList{QStringLiteral("Mount")});
+    m_formatter.reset();
+    m_service->goOn();
+    TRY_COMPARE(m_service->calls(), words("Mount"));
     letEverythingArrive();
-    QCOMPARE(service.calls(), QStringList{QStringLiteral("Mount")});
+    QCOMPARE(m_service->calls(), words("Mount"));
 }
 
-void TestServiceFaults::diskServiceRepliesWithOtherTypes()
+void TestServiceFaults::diskServiceSendsOtherThings_data()
 {
-    ServiceProcess service("system", diskService, "other-types");
-    Formatter formatter;
-    formatter.setDeviceName(QStringLiteral("testcard1"));
-    const QSignalSpy changed(&formatter, &Formatter::statusChanged);
+    addScenarios();
+}
+
+void TestServiceFaults::diskServiceSendsOtherThings()
+{
+    QFETCH(QByteArray, scenario);
+    QFETCH(int, signalCount);
+    startDiskService(scenario.constData());
+    m_service->sendSignals(signalCount);
     // Any reply means success, whatever arguments it has.
-    formatter.mount();
-    TRY_COMPARE(changed.count(), 2);
-    formatter.unmount();
-    TRY_COMPARE(changed.count(), 4);
-    QCOMPARE(formatter.status(), Formatter::Idle);
-}
-
-void TestServiceFaults::diskServiceFloods()
-{
-    ServiceProcess service("system", diskService, "replies");
-    Formatter formatter;
-    formatter.setDeviceName(QStringLiteral("testcard1"));
-    const QSignalSpy changed(&formatter, &Formatter::statusChanged);
-    service.sendSignals(flood);
-    formatter.mount();
-    TRY_COMPARE(changed.count(), 2);
-    QCOMPARE(formatter.status(), Formatter::Idle);
+    m_formatter->mount();
+    TRY_EVENTS("not busy, Mounting, busy, Idle, not busy");
+    forgetEvents()->unmount();
+    TRY_EVENTS("not busy, Unmounting, busy, Idle, not busy");
 }
 
 void TestServiceFaults::diskServiceComesBack()
 {
-    Formatter formatter;
-    formatter.setDeviceName(QStringLiteral("testcard1"));
     for (const char *scenario : {"gone", "error"}) {
-        ServiceProcess service("system", diskService, scenario);
-        formatter.mount();
-        TRY_COMPARE(service.calls(), QStringList{QStringLiteral("Mount")});
-        TRY_COMPARE(formatter.status(), Formatter::Error);
-        const QByteArray log = takeLog();
-        QVERIFY2(log.startsWith("warning [org.tarnwickos.settings.memorycard] \"Mount\" error: "),
-                 log.constData());
+        startDiskService(scenario);
+        m_formatter->mount();
+        TRY_COMPARE(m_service->calls(), words("Mount"));
+        QByteArray log;
+        TRY(!(log += takeLog()).isEmpty());
+        QVERIFY2(log.startsWith(warning("\"Mount\" error: ")), log.constData());
+        QCOMPARE(m_formatter->status(), Formatter::Error);
     }
-    ServiceProcess service("system", diskService, "replies");
-    const QSignalSpy changed(&formatter, &Formatter::statusChanged);
-    formatter.mount();
-    TRY_COMPARE(changed.count(), 2);
-    QCOMPARE(formatter.status(), Formatter::Idle);
+    startDiskService("replies");
+    m_formatter->mount();
+    TRY_EVENTS("not busy, Mounting, busy, Idle, not busy");
 }
 
 void TestServiceFaults::actionServiceHangs()
 {
-    ServiceProcess service("session", actionService, "replies");
-    service.stop();
-    const auto model = loadedModel();
-    model->triggerAction(0);
-    model->triggerAction(0);
+    startActionService("replies");
+    m_service->stop();
+    m_model->triggerAction(0);
+    m_model->triggerAction(0);
     letEverythingArrive();
-    QCOMPARE(model->count(), 1);
-    service.goOn();
-    TRY_COMPARE(service.calls(), (QStringList{QStringLiteral("toggle"), QStringLiteral("toggle")}));
+    QCOMPARE(m_model->count(), 1);
+    m_service->goOn();
+    TRY_COMPARE(m_service->calls(), words("toggle toggle"));
 }
 
 void TestServiceFaults::goesWhileTheActionServiceHangs()
 {
-    ServiceProcess service("session", actionService, "error");
-    service.stop();
-    auto model = loadedModel();
-    model->triggerAction(0);
+    startActionService("error");
+    m_service->stop();
+    m_model->triggerAction(0);
     letEverythingArrive();
-    model.reset();
-    service.goOn();
+    m_model.reset();
+    m_service->goOn();
     // The service still receives the call. Its reply is discarded.
-    TRY_COMPARE(service.calls(), QStringList{QStringLiteral("toggle")});
+    TRY_COMPARE(m_service->calls(), words("toggle"));
     letEverythingArrive();
 }
 
-void TestServiceFaults::actionServiceDiesBeforeItReplies()
+void TestServiceFaults::actionServiceSendsOtherThings_data()
 {
-    const auto model = loadedModel();
-    {
-        ServiceProcess service("session", actionService, "gone");
-        model->triggerAction(0);
-        TRY_COMPARE(service.calls(), QStringList{QStringLiteral("toggle")});
-        letEverythingArrive();
-    }
-    // The bus says what it says of a service that does not answer in time: no message.
-    ServiceProcess service("session", actionService, "replies");
-    model->triggerAction(0);
-    TRY_COMPARE(service.calls(), QStringList{QStringLiteral("toggle")});
+    addScenarios();
+    // The bus replies as for a service that does not answer in time: no message is logged.
+    QTest::newRow("no reply") << QByteArray("gone") << 0;
 }
 
-void TestServiceFaults::actionServiceRepliesWithOtherTypes()
+void TestServiceFaults::actionServiceSendsOtherThings()
 {
-    ServiceProcess service("session", actionService, "other-types");
-    const auto model = loadedModel();
-    model->triggerAction(0);
-    TRY_COMPARE(service.calls(), QStringList{QStringLiteral("toggle")});
+    QFETCH(QByteArray, scenario);
+    QFETCH(int, signalCount);
+    startActionService(scenario.constData());
+    m_service->sendSignals(signalCount);
+    m_model->triggerAction(0);
+    TRY_COMPARE(m_service->calls(), words("toggle"));
     letEverythingArrive();
-    QCOMPARE(model->count(), 1);
-}
+    QCOMPARE(m_model->count(), 1);
 
-void TestServiceFaults::actionServiceFloods()
-{
-    ServiceProcess service("session", actionService, "replies");
-    const auto model = loadedModel();
-    service.sendSignals(flood);
-    model->triggerAction(0);
-    TRY_COMPARE(service.calls(), QStringList{QStringLiteral("toggle")});
-    letEverythingArrive();
-    QCOMPARE(model->count(), 1);
+    startActionService("replies");
+    m_model->triggerAction(0);
+    TRY_COMPARE(m_service->calls(), words("toggle"));
 }
 
 void TestServiceFaults::storeHangs()
 {
-    ServiceProcess service("session", store, "replies");
-    service.stop();
-    auto model = loadedModel();
-    model->triggerAction(0);
+    start("session", "com.marlo.marlostore", "replies");
+    m_service->stop();
+    m_model->triggerAction(0);
     QByteArray log;
     TRY((log += takeLog()).contains("org.freedesktop.DBus.Error.ServiceUnknown"));
     letEverythingArrive();
-    model.reset();
-    service.goOn();
-    TRY_COMPARE(service.calls(), QStringList{QStringLiteral("showApp")});
+    m_model.reset();
+    m_service->goOn();
+    TRY_COMPARE(m_service->calls(), words("showApp"));
 }
 
 QTEST_GUILESS_MAIN(TestServiceFaults)

@@ -6,6 +6,7 @@
 #include "everytype.h"
 #include "messagelog.h"
 #include "ownprocess.h"
+#include "patience.h"
 #include "simulator/serviceprocess.h"
 
 #include <QDBusConnection>
@@ -26,11 +27,6 @@ private Q_SLOTS:
 };
 
 namespace {
-
-constexpr int patience = 60000; // ms, of a machine that is very busy
-
-#define TRY(condition) QTRY_VERIFY_WITH_TIMEOUT(condition, patience)
-#define TRY_COMPARE(actual, expected) QTRY_COMPARE_WITH_TIMEOUT(actual, expected, patience)
 
 const char *const addresses[] = {"DBUS_SESSION_BUS_ADDRESS", "DBUS_SYSTEM_BUS_ADDRESS"};
 

@@ -7,6 +7,7 @@
 #include "everytype.h"
 #include "files.h"
 #include "messagelog.h"
+#include "patience.h"
 #include "simulator/diskservicepeer.h"
 #include "simulator/serviceprocess.h"
 
@@ -49,11 +50,6 @@ private:
 };
 
 namespace {
-
-constexpr int patience = 60000; // ms, of a machine that is very busy
-
-#define TRY(condition) QTRY_VERIFY_WITH_TIMEOUT(condition, patience)
-#define TRY_COMPARE(actual, expected) QTRY_COMPARE_WITH_TIMEOUT(actual, expected, patience)
 
 const QString actionsDirectory = QStringLiteral("/usr/share/glimmera/quickactions");
 const QString widgetsDirectory = QStringLiteral("/usr/share/glimmera/eventswidgets");

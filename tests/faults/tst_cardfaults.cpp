@@ -6,9 +6,7 @@
 #include "failingcard.h"
 #include "files.h"
 #include "formattertest.h"
-#include "ownprocess.h"
 #include "simulator/serviceprocess.h"
-#include "usedupdescriptors.h"
 
 #include <QDir>
 #include <QThreadPool>
@@ -36,7 +34,6 @@ private Q_SLOTS:
     void cardThatHangs();
     void goesWhileTheCardHangs();
     void fullCard();
-    void cardWithoutDescriptors();
 
     void helperThatWritesAHundredMegabytes();
     void helperThatClosesItsOutputFirst();
@@ -218,34 +215,6 @@ void TestCardFaults::fullCard()
     const QStringList left = QDir(dir.path()).entryList(QDir::AllEntries | QDir::NoDotAndDotDot);
     umount2(path.constData(), MNT_DETACH);
     QCOMPARE(left, QStringList());
-}
-
-void TestCardFaults::cardWithoutDescriptors()
-{
-    NEEDS_FUSE()
-    if (!OwnProcess::isThis()) {
-        // The other one has its own.
-        m_diskService.reset();
-    }
-    IN_A_PROCESS_OF_ITS_OWN()
-    // A first connection to a bus cannot be had without descriptors: QtDBus ends the process.
-    m_formatter->mount();
-    TRY_EVENTS("not busy, Mounting, busy, Idle, not busy");
-    const FailingCard card(device, files);
-    {
-        const UsedUpDescriptors none;
-        forgetEvents()->removeAllFiles();
-        TRY_EVENTS("not busy, Mounting, busy, Error, not busy");
-        QCOMPARE(card.filesLeft(), files);
-    }
-    forgetEvents()->removeAllFiles();
-    TRY_EVENTS(emptied);
-    QCOMPARE(card.filesLeft(), 0);
-
-    // Now the pool has a thread that waits for work.
-    const UsedUpDescriptors none;
-    forgetEvents()->removeAllFiles();
-    TRY_EVENTS("not busy, Mounting, busy, Error, not busy");
 }
 
 void TestCardFaults::helperThatWritesAHundredMegabytes()

@@ -10,7 +10,9 @@
 #include "files.h"
 #include "messagelog.h"
 #include "mgconfitem.h"
+#include "patience.h"
 #include "quickactions/quickactionsmodel.h"
+#include "words.h"
 
 #include <QAbstractItemModelTester>
 #include <QDBusConnection>
@@ -77,14 +79,10 @@ private:
 
 namespace {
 
-constexpr int patience = 60000; // ms, of a machine that is very busy
 constexpr int many = 100000; // entries
 // The service itself takes half a minute for fifty times as many.
 constexpr int manyKeys = 2000;
 constexpr int flood = 10000; // signals
-
-#define TRY(condition) QTRY_VERIFY_WITH_TIMEOUT(condition, patience)
-#define TRY_COMPARE(actual, expected) QTRY_COMPARE_WITH_TIMEOUT(actual, expected, patience)
 
 const QString serviceName = QStringLiteral("ca.desrt.dconf");
 const QString serviceFile = QStringLiteral("/usr/share/dbus-1/services/ca.desrt.dconf.service");
@@ -95,18 +93,10 @@ const QString userKey = QStringLiteral("/desktop/glimmera-marlo-home/events_scre
 const QString widgetsKey = QStringLiteral("/desktop/glimmera-marlo-home/events_screen_widgets");
 const QString gpsKey = QStringLiteral("/settings/location/gps_enabled");
 const QString customKey = QStringLiteral("/settings/location/custom_settings");
-const QStringList allKeys = {
-    actionsKey,
-    blockedKey,
-    userKey,
-    widgetsKey,
-    gpsKey,
-    QStringLiteral("/settings/location/mls_enabled"),
-    QStringLiteral("/settings/location/mls_online_state"),
-    QStringLiteral("/settings/location/here_state"),
-    QStringLiteral("/settings/location/custom_settings_enabled"),
-    customKey,
-};
+const QStringList allKeys =
+    QStringList{actionsKey, blockedKey, userKey, widgetsKey, gpsKey, customKey}
+    + words("/settings/location/mls_enabled /settings/location/mls_online_state "
+            "/settings/location/here_state /settings/location/custom_settings_enabled");
 
 const QString actionPath = QStringLiteral("/usr/share/glimmera/quickactions/lamp.conf");
 const QString widgetPath = QStringLiteral("weather");
@@ -409,42 +399,40 @@ void TestDconfFaults::serviceIsAbsent()
 
 void TestDconfFaults::everyOtherType()
 {
-    const char *const values[] = {
-        "true",
-        "byte 0x7f",
-        "int16 -7",
-        "uint16 7",
-        "-7",
-        "uint32 4294967295",
-        "int64 -9223372036854775808",
-        "uint64 18446744073709551615",
-        "handle 7",
-        "1.5",
-        "'text'",
-        "''",
-        "objectpath '/text'",
-        "signature 'as'",
-        "<7>",
-        "<<<<'text'>>>>",
-        "@mi 7",
-        "@mi nothing",
-        "@mmi just nothing",
-        "('text', 7)",
-        "()",
-        "@as []",
-        "['text', '']",
-        "[1, 2]",
-        "[<1>, <'text'>]",
-        "[['text'], ['other']]",
-        "b'bytes'",
-        "[true, false]",
-        "{'key': <true>}",
-        "{'gps/enabled': <'text'>, 'mls/enabled': <{'a': <1>}>}",
-        "{7: 'text'}",
-        "@a{sv} {}",
-        "[{'key': <('a', @mi 7)>}]",
-        "{'key', <7>}",
-    };
+    const char *const values[] = {"true",
+                                  "byte 0x7f",
+                                  "int16 -7",
+                                  "uint16 7",
+                                  "-7",
+                                  "uint32 4294967295",
+                                  "int64 -9223372036854775808",
+                                  "uint64 18446744073709551615",
+                                  "handle 7",
+                                  "1.5",
+                                  "'text'",
+                                  "''",
+                                  "objectpath '/text'",
+                                  "signature 'as'",
+                                  "<7>",
+                                  "<<<<'text'>>>>",
+                                  "@mi 7",
+                                  "@mi nothing",
+                                  "@mmi just nothing",
+                                  "('text', 7)",
+                                  "()",
+                                  "@as []",
+                                  "['text', '']",
+                                  "[1, 2]",
+                                  "[<1>, <'text'>]",
+                                  "[['text'], ['other']]",
+                                  "b'bytes'",
+                                  "[true, false]",
+                                  "{'key': <true>}",
+                                  "{'gps/enabled': <'text'>, 'mls/enabled': <{'a': <1>}>}",
+                                  "{7: 'text'}",
+                                  "@a{sv} {}",
+                                  "[{'key': <('a', @mi 7)>}]",
+                                  "{'key', <7>}"};
     Change change(m_user->key());
     for (const char *value : values) {
         load(allKeys, value);

@@ -7,6 +7,7 @@
 #include "files.h"
 #include "messagelog.h"
 #include "ownprocess.h"
+#include "patience.h"
 #include "usedupdescriptors.h"
 
 #include <QAbstractListModel>
@@ -29,10 +30,6 @@ private Q_SLOTS:
 };
 
 namespace {
-
-constexpr int patience = 60000; // ms, of a machine that is very busy
-
-#define TRY_COMPARE(actual, expected) QTRY_COMPARE_WITH_TIMEOUT(actual, expected, patience)
 
 const QString actions = QStringLiteral("QuickActionsModel");
 const QString widgets = QStringLiteral("EventsWidgetsModel");

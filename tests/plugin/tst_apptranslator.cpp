@@ -13,18 +13,29 @@ class TestAppTranslator : public LoggedTest
 
 private Q_SLOTS:
     void init();
+    void cleanup();
 
     void loadsForTheDefaultLocale();
     void loadsEngineeringEnglish();
     void followsLanguageChanges();
     void loadsWhatIsNew();
-    void isEmptyForLanguageWithoutCatalog();
     void passesEveryEventOn();
     void otherEventsReadNothing();
     void leavesTheApplicationWithItsParent();
+
+private:
+    void send(QEvent::Type type);
+    QString text() const { return m_translator->translate(nullptr, "settings-test-both"); }
+
+    // A translator for Finnish that watches the engine, which is its parent.
+    std::unique_ptr<QObject> m_engine;
+    AppTranslator *m_translator = nullptr;
 };
 
 namespace {
+
+const QString finnish = QStringLiteral("Molemmat");
+const QString german = QStringLiteral("Beide");
 
 // Records the events that pass a filter that was installed later.
 class EventCounter : public QObject
@@ -38,17 +49,6 @@ public:
     QVector<QEvent::Type> seen;
 };
 
-void send(QObject *receiver, QEvent::Type type)
-{
-    QEvent event(type);
-    QCoreApplication::sendEvent(receiver, &event);
-}
-
-QString text(const AppTranslator &translator)
-{
-    return translator.translate(nullptr, "settings-test-both");
-}
-
 } // namespace
 
 void TestAppTranslator::init()
@@ -59,115 +59,99 @@ void TestAppTranslator::init()
     }
     QLocale::setDefault(QLocale(QStringLiteral("fi_FI")));
     LoggedTest::init();
+    m_engine = std::make_unique<QObject>();
+    m_translator = new AppTranslator(m_engine.get());
+    m_translator->loadDefaultLocale();
+    m_engine->installEventFilter(m_translator);
+}
+
+void TestAppTranslator::cleanup()
+{
+    m_engine.reset();
+    LoggedTest::cleanup();
+}
+
+void TestAppTranslator::send(QEvent::Type type)
+{
+    QEvent event(type);
+    QCoreApplication::sendEvent(m_engine.get(), &event);
 }
 
 void TestAppTranslator::loadsForTheDefaultLocale()
 {
-    AppTranslator translator(nullptr);
-    QVERIFY(translator.isEmpty());
-    translator.loadDefaultLocale();
-    QCOMPARE(text(translator), QStringLiteral("Molemmat"));
+    QCOMPARE(text(), finnish);
+    QVERIFY(AppTranslator(nullptr).isEmpty());
 }
 
 void TestAppTranslator::loadsEngineeringEnglish()
 {
     AppTranslator translator(nullptr);
     translator.loadEngineeringEnglish();
-    QCOMPARE(text(translator), QStringLiteral("Both, engineering English"));
+    QCOMPARE(translator.translate(nullptr, "settings-test-both"),
+             QStringLiteral("Both, engineering English"));
 }
 
 void TestAppTranslator::followsLanguageChanges()
 {
-    QObject engine;
-    AppTranslator translator(&engine);
-    translator.loadDefaultLocale();
-    engine.installEventFilter(&translator);
-
     QLocale::setDefault(QLocale(QStringLiteral("de_DE")));
-    QCOMPARE(text(translator), QStringLiteral("Molemmat"));
-    send(&engine, QEvent::LanguageChange);
-    QCOMPARE(text(translator), QStringLiteral("Beide"));
+    QCOMPARE(text(), finnish);
+    send(QEvent::LanguageChange);
+    QCOMPARE(text(), german);
+
+    // A language without a catalog.
+    QLocale::setDefault(QLocale(QStringLiteral("sv_SE")));
+    send(QEvent::LanguageChange);
+    QVERIFY(m_translator->isEmpty());
 }
 
 void TestAppTranslator::loadsWhatIsNew()
 {
     const QString path = QStringLiteral("/usr/share/translations/settings-system-fi.qm");
-    const auto contentOf = [](const QString &path) {
-        QFile file(path);
-        return file.open(QIODevice::ReadOnly) ? file.readAll() : QByteArray();
-    };
-    const QByteArray finnish = contentOf(path);
-    const QByteArray german =
-        contentOf(QStringLiteral("/usr/share/translations/settings-system-de.qm"));
-    QObject engine;
-    AppTranslator translator(&engine);
-    translator.loadDefaultLocale();
-    engine.installEventFilter(&translator);
-
-    Files::write(path, german);
-    QCOMPARE(text(translator), QStringLiteral("Molemmat"));
-    send(&engine, QEvent::LanguageChange);
-    QCOMPARE(text(translator), QStringLiteral("Beide"));
+    QFile other(QStringLiteral("/usr/share/translations/settings-system-de.qm"));
+    QVERIFY(other.open(QIODevice::ReadOnly));
+    Files::write(path, other.readAll());
+    QCOMPARE(text(), finnish);
+    send(QEvent::LanguageChange);
+    QCOMPARE(text(), german);
 
     // A catalog that appears.
     Files::remove(path);
-    send(&engine, QEvent::LanguageChange);
-    QVERIFY(translator.isEmpty());
-    Files::write(path, finnish);
-    send(&engine, QEvent::LanguageChange);
-    QCOMPARE(text(translator), QStringLiteral("Molemmat"));
-}
-
-void TestAppTranslator::isEmptyForLanguageWithoutCatalog()
-{
-    QObject engine;
-    AppTranslator translator(&engine);
-    translator.loadDefaultLocale();
-    engine.installEventFilter(&translator);
-
-    QLocale::setDefault(QLocale(QStringLiteral("sv_SE")));
-    send(&engine, QEvent::LanguageChange);
-    QVERIFY(translator.isEmpty());
+    send(QEvent::LanguageChange);
+    QVERIFY(m_translator->isEmpty());
+    Files::installCatalog(QStringLiteral("settings-system-fi"));
+    send(QEvent::LanguageChange);
+    QCOMPARE(text(), finnish);
 }
 
 void TestAppTranslator::passesEveryEventOn()
 {
-    QObject engine;
     EventCounter behind;
-    AppTranslator translator(&engine);
-    engine.installEventFilter(&behind);
-    engine.installEventFilter(&translator);
+    m_engine->removeEventFilter(m_translator);
+    m_engine->installEventFilter(&behind);
+    m_engine->installEventFilter(m_translator);
 
     QEvent change(QEvent::LanguageChange);
-    QVERIFY(!translator.eventFilter(&engine, &change));
-    send(&engine, QEvent::LanguageChange);
-    send(&engine, QEvent::User);
+    QVERIFY(!m_translator->eventFilter(m_engine.get(), &change));
+    send(QEvent::LanguageChange);
+    send(QEvent::User);
     QCOMPARE(behind.seen, (QVector<QEvent::Type>{QEvent::LanguageChange, QEvent::User}));
 }
 
 void TestAppTranslator::otherEventsReadNothing()
 {
-    QObject engine;
-    AppTranslator translator(&engine);
-    translator.loadDefaultLocale();
-    engine.installEventFilter(&translator);
-
     Files::removeCatalog(QStringLiteral("settings-system-fi"));
-    send(&engine, QEvent::LocaleChange);
-    send(&engine, QEvent::User);
-    QCOMPARE(text(translator), QStringLiteral("Molemmat"));
-    send(&engine, QEvent::LanguageChange);
-    QVERIFY(translator.isEmpty());
+    send(QEvent::LocaleChange);
+    send(QEvent::User);
+    QCOMPARE(text(), finnish);
+    send(QEvent::LanguageChange);
+    QVERIFY(m_translator->isEmpty());
 }
 
 void TestAppTranslator::leavesTheApplicationWithItsParent()
 {
-    auto *engine = new QObject;
-    auto *translator = new AppTranslator(engine);
-    translator->loadDefaultLocale();
-    QCoreApplication::installTranslator(translator);
-    QCOMPARE(qtTrId("settings-test-both"), QStringLiteral("Molemmat"));
-    delete engine;
+    QCoreApplication::installTranslator(m_translator);
+    QCOMPARE(qtTrId("settings-test-both"), finnish);
+    m_engine.reset();
     QCOMPARE(qtTrId("settings-test-both"), QStringLiteral("settings-test-both"));
 }
 

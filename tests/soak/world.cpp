@@ -5,9 +5,10 @@
 
 #include "files.h"
 #include "mgconfitem.h"
+#include "words.h"
 
 #include <QDBusConnection>
-#include <QDBusMessage>
+#include <QDBusConnectionInterface>
 #include <QDBusReply>
 #include <QFile>
 
@@ -20,58 +21,30 @@ const QString actionsDirectory = QStringLiteral("/usr/share/glimmera/quickaction
 const QString widgetsDirectory = QStringLiteral("/usr/share/glimmera/eventswidgets");
 const QString elsewhere = QStringLiteral("/usr/share/glimmera/elsewhere");
 const QString availableFile = QStringLiteral("/usr/share/glimmera/available");
-const QString termsDirectory = QStringLiteral("/usr/share/marlo-settings/platform-eula");
 const QString mountTable = QStringLiteral("/etc/mtab");
 const QString device = QStringLiteral("/dev/soak-card1");
 const QString session = QStringLiteral("com.marlo.torch");
 
-const QStringList names = {QStringLiteral("a"), QStringLiteral("b"), QStringLiteral("c"),
-                           QStringLiteral("d"), QStringLiteral("e"), QStringLiteral("f")};
-const QStringList catalogs = {QStringLiteral("maps-fi"), QStringLiteral("maps-de"),
-                              QStringLiteral("maps_eng_en"), QStringLiteral("settings-system-fi"),
-                              QStringLiteral("settings-system_eng_en")};
-const QStringList keys = {
-    QStringLiteral("/desktop/glimmera-marlo-home/events_screen_actions"),
-    QStringLiteral("/desktop/glimmera-marlo-home/blocked_actions"),
-    QStringLiteral("/desktop/glimmera-marlo-home/events_screen_widgets"),
-    QStringLiteral("/settings/location/enabled"),
-    QStringLiteral("/settings/location/custom_settings"),
-};
-const QStringList texts = {
-    QStringLiteral("/usr/share/marlo-settings/platform-eula/tarnwick_termsofuse-fi.txt"),
-    QStringLiteral("/usr/share/marlo-settings/platform-eula/tarnwick_termsofuse-en_GB.txt"),
-    QStringLiteral("/var/lib/bluetooth/board-address"),
-    QStringLiteral("/usr/share/modem-software/features.ini"),
-    QStringLiteral("/usr/sbin/apkd"),
-    QStringLiteral("/usr/share/libherepositioning/agreements/here_consent_en_GB.txt"),
-};
-const QStringList words = {
-    QString(),
-    QStringLiteral("title"),
-    QStringLiteral("enabled"),
-    QStringLiteral("path"),
-    QStringLiteral("title.nothing"),
-    QStringLiteral("fi_FI.UTF-8"),
-    QStringLiteral("en_GB"),
-    QStringLiteral("vfat"),
-    QStringLiteral("ext4"),
-    QStringLiteral("soak-card1"),
-    device,
-    QStringLiteral("/dev/soak-card2"),
-    termsDirectory,
-    actionsDirectory,
-};
-const QStringList diskScenarios = {
-    QStringLiteral("done"),         QStringLiteral("slow"),       QStringLiteral("hung"),
-    QStringLiteral("gone"),         QStringLiteral("DeviceBusy"), QStringLiteral("AlreadyMounted"),
-    QStringLiteral("UnknownError"), QStringLiteral("Mount=done"), QStringLiteral("absent"),
-};
-const QStringList helperScenarios = {
-    QStringLiteral("done"),  QStringLiteral("done"), QStringLiteral("exit=1"),
-    QStringLiteral("crash"), QStringLiteral("slow"), QStringLiteral("held"),
-    QStringLiteral("noisy"),
-};
-const QStringList coverProperties = {QStringLiteral("KIVID"), QStringLiteral("Ready")};
+const QStringList names = words("a b c d e f");
+const QStringList catalogs =
+    words("maps-fi maps-de maps_eng_en settings-system-fi settings-system_eng_en");
+const QStringList keys = words("/desktop/glimmera-marlo-home/events_screen_actions "
+                               "/desktop/glimmera-marlo-home/blocked_actions "
+                               "/desktop/glimmera-marlo-home/events_screen_widgets "
+                               "/settings/location/enabled /settings/location/custom_settings");
+const QStringList files =
+    words("/usr/share/marlo-settings/platform-eula/tarnwick_termsofuse-fi.txt "
+          "/usr/share/marlo-settings/platform-eula/tarnwick_termsofuse-en_GB.txt "
+          "/var/lib/bluetooth/board-address /usr/share/modem-software/features.ini "
+          "/usr/sbin/apkd /usr/share/libherepositioning/agreements/here_consent_en_GB.txt");
+const QStringList values = QStringList(QString())
+    + words("title enabled path title.nothing fi_FI.UTF-8 en_GB vfat ext4 soak-card1 "
+            "/dev/soak-card1 /dev/soak-card2 /usr/share/marlo-settings/platform-eula "
+            "/usr/share/glimmera/quickactions");
+const QStringList diskScenarios =
+    words("done slow hung gone DeviceBusy AlreadyMounted UnknownError Mount=done absent");
+const QStringList helperScenarios = words("done done exit=1 crash slow held noisy");
+const QStringList coverProperties = words("KIVID Ready");
 
 const std::array<QByteArray, 6> actions = {
     "title=a-title\ntranslation-catalog=maps\npriority=%1\nremote-service=com.marlo.torch\n"
@@ -109,7 +82,7 @@ void World::changeSomething()
     switch (random(12)) {
     case 0:
     case 1:
-        return changeQuickActions();
+        return changeDefinition(actionsDirectory, QStringLiteral(".conf"), anyOf(actions));
     case 2:
     case 3:
         return changeWidgets();
@@ -149,9 +122,9 @@ QString World::text()
     case 1:
         return QLatin1String("/w/") + anyOf(names);
     case 2:
-        return anyOf(texts);
+        return anyOf(files);
     default:
-        return anyOf(words);
+        return anyOf(values);
     }
 }
 
@@ -175,16 +148,14 @@ QVariant World::value()
     }
 }
 
-void World::changeQuickActions()
+void World::changeDefinition(const QString &directory, const QString &suffix,
+                             const QByteArray &content)
 {
+    const QString path = directory + QLatin1Char('/') + anyOf(names) + suffix;
     if (random(20) == 0) {
-        changeDirectory(actionsDirectory);
-        return;
-    }
-    const QString path =
-        actionsDirectory + QLatin1Char('/') + anyOf(names) + QLatin1String(".conf");
-    if (often()) {
-        Files::write(path, QByteArray(anyOf(actions)).replace("%1", QByteArray::number(random(9))));
+        changeDirectory(directory);
+    } else if (often()) {
+        Files::write(path, QByteArray(content).replace("%1", QByteArray::number(random(9))));
     } else {
         Files::remove(path);
     }
@@ -192,16 +163,8 @@ void World::changeQuickActions()
 
 void World::changeWidgets()
 {
-    if (random(20) == 0) {
-        changeDirectory(widgetsDirectory);
-        return;
-    }
-    const QString path =
-        widgetsDirectory + QLatin1Char('/') + anyOf(names) + QLatin1String(".json");
-    if (often()) {
-        Files::write(path, QByteArray(anyOf(widgets)).replace("%1", QByteArray::number(random(9))));
-    } else if (random(2) == 0) {
-        Files::remove(path);
+    if (random(8) != 0) {
+        changeDefinition(widgetsDirectory, QStringLiteral(".json"), anyOf(widgets));
     } else if (QFile::exists(availableFile)) {
         Files::remove(availableFile);
     } else {
@@ -236,7 +199,7 @@ void World::changeCatalogs()
 
 void World::changeTexts()
 {
-    const QString path = anyOf(texts);
+    const QString path = anyOf(files);
     if (often()) {
         Files::write(path, QByteArray(random(2000), char('a' + random(26))) + "\nvariant=x\n");
     } else {
@@ -252,17 +215,11 @@ void World::changeSettings()
 
 void World::killSettingsService()
 {
-    QDBusMessage question = QDBusMessage::createMethodCall(
-        QStringLiteral("org.freedesktop.DBus"), QStringLiteral("/org/freedesktop/DBus"),
-        QStringLiteral("org.freedesktop.DBus"), QStringLiteral("GetConnectionUnixProcessID"));
-    question.setArguments({QStringLiteral("ca.desrt.dconf")});
-    const QDBusReply<uint> reply = QDBusConnection::sessionBus().call(question);
-    if (!reply.isValid()) {
-        return;
-    }
-    QFile name(QStringLiteral("/proc/%1/comm").arg(reply.value()));
-    if (name.open(QIODevice::ReadOnly) && name.readAll() == "dconf-service\n") {
-        kill(pid_t(reply.value()), SIGKILL);
+    const QDBusReply<uint> pid =
+        QDBusConnection::sessionBus().interface()->servicePid(QStringLiteral("ca.desrt.dconf"));
+    QFile name(QStringLiteral("/proc/%1/comm").arg(pid.value()));
+    if (pid.isValid() && name.open(QIODevice::ReadOnly) && name.readAll() == "dconf-service\n") {
+        kill(pid_t(pid.value()), SIGKILL);
     }
 }
 
@@ -309,6 +266,7 @@ void World::changeCover()
     if (m_cover == nullptr) {
         m_cover = std::make_unique<CoverDaemon>();
     }
+    const QVariant value = random(2) == 0 ? QVariant(text()) : QVariant(random(3));
     switch (random(8)) {
     case 0:
         m_cover.reset();
@@ -321,12 +279,10 @@ void World::changeCover()
         break;
     case 3:
     case 4:
-        m_cover->sendChanges(
-            {{anyOf(coverProperties), random(2) == 0 ? QVariant(text()) : QVariant(random(3))}});
+        m_cover->sendChanges({{anyOf(coverProperties), value}});
         break;
     default:
-        m_cover->answer(anyOf(coverProperties),
-                        {random(2) == 0 ? QVariant(text()) : QVariant(random(3))});
+        m_cover->answer(anyOf(coverProperties), {value});
     }
 }
 

@@ -66,18 +66,32 @@ QString agreementText(QLatin1String base)
     platform's location settings, which a device's own library implements. Without such a library
     the module stores them in dconf, and every process sees the same values.
 
+    A page saves the switches when the user changes one, and restores them when the user returns to
+    the own choice:
+
     \qml
-    Switch {
-        text: "My own choice"
-        checked: location.customSettingsEnabled
-        onToggled: {
-            location.customSettingsEnabled = checked
-            if (checked) {
-                location.restoreCustomSettings()
+    Column {
+        LocationConfiguration { id: location }
+
+        Switch {
+            text: "My own choice"
+            checked: location.customSettingsEnabled
+            onToggled: {
+                location.customSettingsEnabled = checked
+                if (checked) {
+                    location.restoreCustomSettings()
+                }
             }
         }
-
-        LocationConfiguration { id: location }
+        Switch {
+            text: "GPS"
+            enabled: location.customSettingsEnabled
+            checked: location.gpsEnabled
+            onToggled: {
+                location.gpsEnabled = checked
+                location.saveCustomSettings()
+            }
+        }
     }
     \endqml
 

@@ -18,16 +18,12 @@ private Q_SLOTS:
     void init();
     void cleanup();
 
-    void languageWinsOverEngineeringEnglish();
     void sharesOneCatalogAmongItsUsers();
     void prefersTheCatalogOfTheRegion();
     void fallsBackToCatalogsInstalledBefore();
-    void oneRemovalTakesOutEveryUse();
-    void emptyNameIsNoCatalog();
     void installsCatalogsThatDoNotExist();
     void laterCatalogsWin();
-    void keepsItsLanguage();
-    void freshTranslatorAfterRemoval();
+    void keepsItsLanguageUntilItIsRemoved();
     void removingTheUnknownIsHarmless();
     void leavesTheApplicationWithItsOwner();
     void mayBeCalledBackByLanguageChanges();
@@ -77,19 +73,15 @@ void TestCatalogTable::cleanup()
     LoggedTest::cleanup();
 }
 
-void TestCatalogTable::languageWinsOverEngineeringEnglish()
-{
-    m_table->addDefinition(a, maps);
-    QCOMPARE(title(), QStringLiteral("Kartat"));
-    QCOMPARE(englishOnly(), QStringLiteral("Maps, English only"));
-}
-
 void TestCatalogTable::sharesOneCatalogAmongItsUsers()
 {
+    m_table->addDefinition(a, maps);
     m_table->addDefinition(a, maps);
     m_table->addDefinition(b, maps);
     QCOMPARE(translators().size(), 2);
 
+    // One removal removes every use of a definition file. The language wins over engineering
+    // English.
     m_table->removeDefinition(a, maps);
     QCOMPARE(title(), QStringLiteral("Kartat"));
     QCOMPARE(englishOnly(), QStringLiteral("Maps, English only"));
@@ -126,22 +118,6 @@ void TestCatalogTable::fallsBackToCatalogsInstalledBefore()
     QCOMPARE(title(), QStringLiteral("Maps, settings"));
 }
 
-void TestCatalogTable::oneRemovalTakesOutEveryUse()
-{
-    m_table->addDefinition(a, maps);
-    m_table->addDefinition(a, maps);
-    m_table->removeDefinition(a, maps);
-    QCOMPARE(title(), QStringLiteral("maps-title"));
-    QCOMPARE(englishOnly(), QStringLiteral("maps-english"));
-}
-
-void TestCatalogTable::emptyNameIsNoCatalog()
-{
-    m_table->addDefinition(a, QString());
-    QCOMPARE(translators().size(), 0);
-    m_table->removeDefinition(a, QString());
-}
-
 void TestCatalogTable::installsCatalogsThatDoNotExist()
 {
     m_table->addDefinition(a, QStringLiteral("nowhere"));
@@ -167,22 +143,17 @@ void TestCatalogTable::laterCatalogsWin()
     QCOMPARE(title(), QStringLiteral("Kartat"));
 }
 
-void TestCatalogTable::keepsItsLanguage()
+void TestCatalogTable::keepsItsLanguageUntilItIsRemoved()
 {
     m_table->addDefinition(a, maps);
     QLocale::setDefault(QLocale(QStringLiteral("de_DE")));
     m_table->addDefinition(b, maps);
     QCOMPARE(title(), QStringLiteral("Kartat"));
-}
 
-void TestCatalogTable::freshTranslatorAfterRemoval()
-{
-    m_table->addDefinition(a, maps);
     m_table->removeDefinition(a, maps);
+    m_table->removeDefinition(b, maps);
     // A caller that is using a translator can continue to use it.
     QCOMPARE(translators().size(), 2);
-
-    QLocale::setDefault(QLocale(QStringLiteral("de_DE")));
     m_table->addDefinition(a, maps);
     QCOMPARE(translators().size(), 4);
     QCOMPARE(title(), QStringLiteral("Karten"));
@@ -190,6 +161,11 @@ void TestCatalogTable::freshTranslatorAfterRemoval()
 
 void TestCatalogTable::removingTheUnknownIsHarmless()
 {
+    // An empty name is no catalog.
+    m_table->addDefinition(a, QString());
+    QCOMPARE(translators().size(), 0);
+    m_table->removeDefinition(a, QString());
+
     m_table->removeDefinition(a, maps);
     m_table->addDefinition(a, maps);
     m_table->removeDefinition(b, maps);

@@ -5,7 +5,7 @@
 // it failed.
 
 #include "cardhelper.h"
-#include "messagelog.h"
+#include "loggedtest.h"
 #include "simulator/diskservicepeer.h"
 
 #include <QQmlComponent>
@@ -37,7 +37,7 @@ QQuickItem *findItem(QQuickItem *item, const QString &text)
 
 } // namespace
 
-class TestCardPage : public QObject
+class TestCardPage : public LoggedTest
 {
     Q_OBJECT
 
@@ -57,12 +57,12 @@ private Q_SLOTS:
     void probesEachCard();
 
 private:
-    bool shows(const QString &text) { return findItem(m_window->contentItem(), text) != nullptr; }
+    QQuickItem *find(const QString &text) { return findItem(m_window->contentItem(), text); }
+    bool shows(const QString &text) { return find(text) != nullptr; }
     void press(const QString &text);
     void openPage();
 
     QQmlEngine m_engine;
-    std::unique_ptr<MessageLog> m_log;
     std::unique_ptr<CardHelper> m_helper;
     std::unique_ptr<QQuickWindow> m_window;
     std::unique_ptr<QObject> m_page;
@@ -70,7 +70,7 @@ private:
 
 void TestCardPage::init()
 {
-    m_log = std::make_unique<MessageLog>();
+    LoggedTest::init();
     m_helper = std::make_unique<CardHelper>();
     m_helper->install(QStringLiteral("done"), "vfat\n");
 }
@@ -80,8 +80,7 @@ void TestCardPage::cleanup()
     m_window.reset(); // which releases what it has drawn of the page
     m_page.reset();
     m_helper.reset();
-    QCOMPARE(m_log->takeReport(), QString());
-    m_log.reset();
+    LoggedTest::cleanup();
 }
 
 // Returns when the first probe has ended.
@@ -103,7 +102,7 @@ void TestCardPage::openPage()
 void TestCardPage::press(const QString &text)
 {
     QQuickItem *button = nullptr;
-    QTRY_VERIFY((button = findItem(m_window->contentItem(), text)) != nullptr);
+    QTRY_VERIFY((button = find(text)) != nullptr);
     QVERIFY2(button->isEnabled(), qPrintable(text));
     QVERIFY(QMetaObject::invokeMethod(button, "clicked"));
 }
@@ -116,22 +115,22 @@ void TestCardPage::showsThatTheDiskServiceHasNotAnswered()
     press(QStringLiteral("Mount"));
     QTRY_COMPARE(service.calls().size(), 1);
     QVERIFY(shows(waiting));
-    QVERIFY(!findItem(m_window->contentItem(), QStringLiteral("Unmount"))->isEnabled());
+    QVERIFY(!find(QStringLiteral("Unmount"))->isEnabled());
     service.replyToKept();
     QTRY_VERIFY(shows(hasVfat));
-    QVERIFY(findItem(m_window->contentItem(), QStringLiteral("Unmount"))->isEnabled());
+    QVERIFY(find(QStringLiteral("Unmount"))->isEnabled());
 }
 
 void TestCardPage::endsAfterEachFailure_data()
 {
     QTest::addColumn<QString>("scenario");
     QTest::addColumn<QString>("problem");
-    QTest::newRow("an error with a code") << "DeviceBusy"
-                                          << "A program uses the card.";
-    QTest::newRow("an error without a code") << "UnknownError"
-                                             << "The disk service did not answer.";
-    QTest::newRow("no disk service") << "absent"
-                                     << "The disk service did not answer.";
+    const auto row = [](const char *name, const char *scenario, const char *problem) {
+        QTest::newRow(name) << scenario << problem;
+    };
+    row("an error with a code", "DeviceBusy", "A program uses the card.");
+    row("an error without a code", "UnknownError", "The disk service did not answer.");
+    row("no disk service", "absent", "The disk service did not answer.");
 }
 
 // The second failure changes no status of a formatter that is in Error already.
@@ -154,12 +153,11 @@ void TestCardPage::showsAForgivenError_data()
     QTest::addColumn<QString>("button");
     QTest::addColumn<QString>("scenario");
     QTest::addColumn<QString>("note");
-    QTest::newRow("mount") << "Mount"
-                           << "AlreadyMounted"
-                           << "The card was mounted already.";
-    QTest::newRow("unmount") << "Unmount"
-                             << "AlreadyUnmounting"
-                             << "The card is already being unmounted.";
+    const auto row = [](const char *button, const char *scenario, const char *note) {
+        QTest::newRow(button) << button << scenario << note;
+    };
+    row("Mount", "AlreadyMounted", "The card was mounted already.");
+    row("Unmount", "AlreadyUnmounting", "The card is already being unmounted.");
 }
 
 void TestCardPage::showsAForgivenError()
@@ -201,10 +199,11 @@ void TestCardPage::namesWhatFailed_data()
     QTest::addColumn<QString>("service");
     QTest::addColumn<QString>("problem");
     QTest::addColumn<int>("messages");
-    QTest::newRow("the helper") << "done"
-                                << "Formatting failed." << 0;
-    QTest::newRow("the disk service") << "NotMounted"
-                                      << "The card is not mounted." << 1;
+    const auto row = [](const char *name, const char *service, const char *problem, int messages) {
+        QTest::newRow(name) << service << problem << messages;
+    };
+    row("the helper", "done", "Formatting failed.", 0);
+    row("the disk service", "NotMounted", "The card is not mounted.", 1);
 }
 
 void TestCardPage::namesWhatFailed()
@@ -228,7 +227,7 @@ void TestCardPage::probesEachCard()
     QVERIFY(shows(hasVfat));
     m_page->setProperty("cardName", QString());
     QVERIFY(shows(QStringLiteral("File system: unknown")));
-    QVERIFY(!findItem(m_window->contentItem(), QStringLiteral("Mount"))->isEnabled());
+    QVERIFY(!find(QStringLiteral("Mount"))->isEnabled());
     m_helper->install(QStringLiteral("done"), "ext4\n");
     m_page->setProperty("cardName", QStringLiteral("mmcblk2p1"));
     QTRY_VERIFY(shows(QStringLiteral("File system: ext4")));

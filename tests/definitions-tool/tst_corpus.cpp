@@ -315,14 +315,10 @@ void TestCorpus::agreesOnEventsWidgets()
         }
     };
     const QStringList fileKeys = {QStringLiteral("translation_catalog"), QStringLiteral("widgets")};
-    const QStringList widgetKeys = {QStringLiteral("path"),
-                                    QStringLiteral("title"),
-                                    QStringLiteral("translation_id"),
-                                    QStringLiteral("description_id"),
-                                    QStringLiteral("icon"),
-                                    QStringLiteral("order"),
-                                    QStringLiteral("default_enabled"),
-                                    QStringLiteral("available_path")};
+    const QStringList widgetKeys =
+        QStringLiteral("path title translation_id description_id icon order default_enabled "
+                       "available_path")
+            .split(QLatin1Char(' '));
     int members = 0;
     if (file) {
         const QJsonObject object = QJsonDocument::fromJson(content).object();
@@ -355,10 +351,9 @@ void TestCorpus::agreesOnEventsWidgets()
             compare(written, "available_path", widget.availablePath);
 
             // The model lists the last widget of each path.
+            const auto exactly = Qt::MatchExactly | Qt::MatchCaseSensitive;
             const QModelIndex row =
-                model
-                    .match(model.index(0), EventsWidgetsModel::PathRole, widget.path, 1,
-                           Qt::MatchExactly | Qt::MatchCaseSensitive)
+                model.match(model.index(0), EventsWidgetsModel::PathRole, widget.path, 1, exactly)
                     .value(0);
             QVERIFY(row.isValid());
             if (widget.translationId.isEmpty()) {

@@ -31,177 +31,129 @@ Gallery {
     readonly property var shots: [
         { page: "start" },
 
-        { page: "quick-actions", steps: [() => shows(qsTrId("camera-take-photo"))] },
+        { page: "quick-actions", steps: [showing("camera-take-photo")] },
         { page: "quick-actions", state: "called", steps: [
-            () => press(qsTrId("camera-take-photo")),
-            () => press(qsTrId("torch-toggle")),
-            () => press(qsTrId("gallery-sample-new-alarm")),
-            () => press(qsTrId("maps-navigate-home")),
-            () => ["camera", "torch", "alarms", "marlostore"].every(
-                      name => shows("com.marlo." + name))] },
+            pressing("camera-take-photo"), pressing("torch-toggle"),
+            pressing("gallery-sample-new-alarm"), pressing("maps-navigate-home"),
+            () => ["camera", "torch", "alarms", "marlostore"]
+                  .every(name => shows("com.marlo." + name))] },
         { page: "quick-actions", state: "failing", steps: [
-            () => simulate(qsTrId("gallery-quick-actions-fail")),
-            () => press(qsTrId("camera-take-photo")),
-            () => Messages.count > 0,
-            () => logOpen = true] },
+            simulating("gallery-quick-actions-fail"), pressing("camera-take-photo"),
+            () => Messages.count > 0, () => logOpen = true] },
         { page: "quick-actions", state: "none", steps: [
-            () => simulate(qsTrId("gallery-quick-actions-installed")),
-            () => shows(qsTrId("gallery-quick-actions-none"))] },
+            simulating("gallery-quick-actions-installed"),
+            showing("gallery-quick-actions-none")] },
 
-        { page: "quick-actions-settings", steps: [() => shows(qsTrId("notes-search"))] },
+        { page: "quick-actions-settings", steps: [showing("notes-search")] },
         { page: "quick-actions-settings", state: "broken", steps: [
-            () => simulate(qsTrId("gallery-quick-actions-broken")),
-            () => shows("empty.conf")] },
+            simulating("gallery-quick-actions-broken"), () => shows("empty.conf")] },
         { page: "quick-actions-settings", state: "none", steps: [
-            () => simulate(qsTrId("gallery-quick-actions-installed")),
-            () => shows(qsTrId("gallery-quick-actions-not-installed"))] },
+            simulating("gallery-quick-actions-installed"),
+            showing("gallery-quick-actions-not-installed")] },
 
-        { page: "events-widgets", steps: [() => shows(qsTrId("outdoors-steps"))] },
+        { page: "events-widgets", steps: [showing("outdoors-steps")] },
         { page: "events-widgets", state: "available", steps: [
-            () => simulate(qsTrId("gallery-events-widgets-step-counter")),
-            () => press(qsTrId("gallery-events-widgets-check")),
-            () => !shows(qsTrId("gallery-events-widgets-unavailable"))] },
+            simulating("gallery-events-widgets-step-counter"),
+            pressing("gallery-events-widgets-check"),
+            notShowing("gallery-events-widgets-unavailable")] },
         { page: "events-widgets", state: "broken", steps: [
-            () => simulate(qsTrId("gallery-events-widgets-broken")),
-            () => Messages.count > 0] },
+            simulating("gallery-events-widgets-broken"), () => Messages.count > 0] },
         { page: "events-widgets", state: "none", steps: [
-            () => simulate(qsTrId("gallery-events-widgets-installed")),
-            () => shows(qsTrId("gallery-events-widgets-none"))] },
+            simulating("gallery-events-widgets-installed"),
+            showing("gallery-events-widgets-none")] },
 
-        { page: "titles", steps: [() => shows(qsTrId("notes-search"))] },
+        { page: "titles", steps: [showing("notes-search")] },
         { page: "titles", state: "none", steps: [
-            () => simulate(qsTrId("gallery-events-widgets-installed")),
-            () => simulate(qsTrId("gallery-quick-actions-installed")),
-            () => !shows(qsTrId("notes-search")) && !shows(qsTrId("outdoors-steps")),
-            () => shows(qsTrId("gallery-titles-none"))] },
+            simulating("gallery-events-widgets-installed"),
+            simulating("gallery-quick-actions-installed"),
+            notShowing("notes-search"), notShowing("outdoors-steps"),
+            showing("gallery-titles-none")] },
 
-        { page: "memory-card", steps: [() => probed()] },
+        { page: "memory-card", steps: [probed] },
         { page: "memory-card", state: "no-card", steps: [
-            () => probed(),
-            () => simulate(qsTrId("gallery-card-inserted")),
+            probed, simulating("gallery-card-inserted"),
             () => shows(qsTrId("gallery-card-none")) && cardIsIdle()] },
         { page: "memory-card", state: "asks-to-format", steps: [
-            () => probed(),
-            () => press(qsTrId("gallery-card-format").arg("ext4")),
-            () => shows(qsTrId("gallery-card-question"))] },
+            probed, pressing("gallery-card-format", "ext4"), showing("gallery-card-question")] },
         { page: "memory-card", state: "asks-to-empty", steps: [
-            () => probed(),
-            () => press(qsTrId("gallery-card-empty")),
-            () => shows(qsTrId("gallery-card-empty-question"))] },
+            probed, pressing("gallery-card-empty"), showing("gallery-card-empty-question")] },
         { page: "memory-card", state: "mounted", steps: [
-            () => probed(),
-            () => press(qsTrId("gallery-card-mount")),
-            () => SimulatedCard.mounted && succeeded(),
-            () => press(qsTrId("gallery-card-fill"))] },
+            probed, pressing("gallery-card-mount"), () => SimulatedCard.mounted && succeeded(),
+            pressing("gallery-card-fill")] },
         { page: "memory-card", state: "in-use", steps: [
-            () => probed(),
-            () => simulate(qsTrId("gallery-card-in-use")),
-            () => press(qsTrId("gallery-card-unmount")),
-            () => shows(qsTrId("gallery-card-device-busy"))] },
+            probed, simulating("gallery-card-in-use"), pressing("gallery-card-unmount"),
+            showing("gallery-card-device-busy")] },
         { page: "memory-card", state: "emptied", steps: [
-            () => probed(),
-            () => press(qsTrId("gallery-card-empty")),
-            () => press(qsTrId("gallery-card-remove")),
+            probed, pressing("gallery-card-empty"), pressing("gallery-card-remove"),
             () => SimulatedCard.fileCount === 0 && succeeded()] },
         { page: "memory-card", state: "formatted", steps: [
-            () => probed(),
-            () => SimulatedCard.mounted || press(qsTrId("gallery-card-mount")),
-            () => SimulatedCard.mounted && succeeded(),
-            () => press(qsTrId("gallery-card-format").arg("ext4")),
-            () => press(qsTrId("gallery-card-erase")),
-            () => succeeded() && shows("ext4")] },
+            probed, () => SimulatedCard.mounted || press(qsTrId("gallery-card-mount")),
+            () => SimulatedCard.mounted && succeeded(), pressing("gallery-card-format", "ext4"),
+            pressing("gallery-card-erase"), () => succeeded() && shows("ext4")] },
         { page: "memory-card", state: "unmounted", steps: [
-            () => probed(),
-            () => press(qsTrId("gallery-card-unmount")),
+            probed, pressing("gallery-card-unmount"),
             () => !SimulatedCard.mounted && succeeded()] },
         { page: "memory-card", state: "not-mounted", steps: [
-            () => probed(),
-            () => press(qsTrId("gallery-card-unmount")),
-            () => shows(qsTrId("gallery-card-not-mounted"))] },
+            probed, pressing("gallery-card-unmount"), showing("gallery-card-not-mounted")] },
         { page: "memory-card", state: "forbidden", steps: [
-            () => probed(),
-            () => press(qsTrId("gallery-card-service-forbids")),
-            () => press(qsTrId("gallery-card-mount")),
-            () => shows(qsTrId("gallery-card-not-authorized"))] },
+            probed, pressing("gallery-card-service-forbids"), pressing("gallery-card-mount"),
+            showing("gallery-card-not-authorized")] },
         { page: "memory-card", state: "silent", steps: [
-            () => probed(),
-            () => press(qsTrId("gallery-card-service-silent")),
-            () => press(qsTrId("gallery-card-mount")),
-            () => shows(qsTrId("gallery-card-waiting"))] },
+            probed, pressing("gallery-card-service-silent"), pressing("gallery-card-mount"),
+            showing("gallery-card-waiting")] },
         { page: "memory-card", state: "absent", steps: [
-            () => probed(),
-            () => press(qsTrId("gallery-card-service-absent")),
-            () => press(qsTrId("gallery-card-mount")),
-            () => shows(qsTrId("gallery-card-no-answer"))] },
+            probed, pressing("gallery-card-service-absent"), pressing("gallery-card-mount"),
+            showing("gallery-card-no-answer")] },
         { page: "memory-card", state: "without-helper", steps: [
-            () => probed(),
-            () => simulate(qsTrId("gallery-card-helper")),
-            () => press(qsTrId("gallery-simulation-reload")),
-            () => shows(qsTrId("gallery-card-probing-failed"))] },
+            probed, simulating("gallery-card-helper"), reload,
+            showing("gallery-card-probing-failed")] },
         // The last state of the card: the helper program outlives the page, and meanwhile no other page
         // may mount the card.
         { page: "memory-card", state: "busy", moving: true, steps: [
-            () => probed(),
-            () => SimulatedCard.mounted || press(qsTrId("gallery-card-mount")),
-            () => SimulatedCard.mounted && succeeded(),
-            () => simulate(qsTrId("gallery-card-helper-waits")),
-            () => press(qsTrId("gallery-card-format").arg("ext4")),
-            () => press(qsTrId("gallery-card-erase")),
+            probed, () => SimulatedCard.mounted || press(qsTrId("gallery-card-mount")),
+            () => SimulatedCard.mounted && succeeded(), simulating("gallery-card-helper-waits"),
+            pressing("gallery-card-format", "ext4"), pressing("gallery-card-erase"),
             () => shows("2. " + qsTrId("gallery-card-formatting"))] },
 
         { page: "location", steps: [] },
         { page: "location", state: "agreed", steps: [
-            () => press(qsTrId("gallery-location-gps")),
-            () => press(qsTrId("gallery-location-agree")),
-            () => press(qsTrId("gallery-location-agree")),
-            () => !shows(qsTrId("gallery-location-agree-first"))] },
+            pressing("gallery-location-gps"), pressing("gallery-location-agree"),
+            pressing("gallery-location-agree"), notShowing("gallery-location-agree-first")] },
         { page: "location", state: "none", steps: [
-            () => simulate(qsTrId("gallery-location-mls-installed")),
-            () => simulate(qsTrId("gallery-location-here-installed")),
-            () => press(qsTrId("gallery-simulation-reload")),
-            () => shows(qsTrId("settings_location-la-no_agreement_text_found"))] },
+            simulating("gallery-location-mls-installed"),
+            simulating("gallery-location-here-installed"), reload,
+            showing("settings_location-la-no_agreement_text_found")] },
 
-        { page: "cover", steps: [() => shows(qsTrId("gallery-cover-none"))] },
+        { page: "cover", steps: [showing("gallery-cover-none")] },
         { page: "cover", state: "attached", steps: [
-            () => press(qsTrId("gallery-cover-attached")),
+            pressing("gallery-cover-attached"),
             () => shows("MARLO-COVER-07") && shows(qsTrId("gallery-cover-not-ready"))] },
         { page: "cover", state: "ready", steps: [
-            () => press(qsTrId("gallery-cover-attached-ready")),
+            pressing("gallery-cover-attached-ready"),
             () => shows("MARLO-COVER-07") && shows(qsTrId("gallery-cover-ready"))] },
         { page: "cover", state: "absent", steps: [
-            () => press(qsTrId("gallery-cover-no-daemon")),
-            () => press(qsTrId("gallery-simulation-reload")),
-            () => shows(qsTrId("gallery-cover-none"))] },
+            pressing("gallery-cover-no-daemon"), reload, showing("gallery-cover-none")] },
 
-        { page: "bluetooth", steps: [() => !shows(qsTrId("gallery-unknown"))] },
+        { page: "bluetooth", steps: [notShowing("gallery-unknown")] },
         { page: "bluetooth", state: "unknown", steps: [
-            () => simulate(qsTrId("gallery-bluetooth-installed")),
-            () => press(qsTrId("gallery-simulation-reload")),
-            () => shows(qsTrId("gallery-unknown"))] },
-        { page: "android", steps: [() => shows(qsTrId("gallery-android-shown"))] },
+            simulating("gallery-bluetooth-installed"), reload, showing("gallery-unknown")] },
+        { page: "android", steps: [showing("gallery-android-shown")] },
         { page: "android", state: "hidden", steps: [
-            () => simulate(qsTrId("gallery-android-installed")),
-            () => press(qsTrId("gallery-simulation-reload")),
-            () => shows(qsTrId("gallery-android-hidden"))] },
-        { page: "modem", steps: [() => !shows(qsTrId("gallery-unknown"))] },
+            simulating("gallery-android-installed"), reload, showing("gallery-android-hidden")] },
+        { page: "modem", steps: [notShowing("gallery-unknown")] },
         { page: "modem", state: "unknown", steps: [
-            () => simulate(qsTrId("gallery-modem-installed")),
-            () => press(qsTrId("gallery-simulation-reload")),
-            () => shows(qsTrId("gallery-unknown"))] },
+            simulating("gallery-modem-installed"), reload, showing("gallery-unknown")] },
 
-        { page: "terms", steps: [() => !shows(qsTrId("gallery-terms-none"))] },
+        { page: "terms", steps: [notShowing("gallery-terms-none")] },
         { page: "terms", state: "none", steps: [
-            () => simulate(qsTrId("gallery-terms-platform-installed")),
-            () => simulate(qsTrId("gallery-terms-vendor-installed")),
-            () => press(qsTrId("gallery-simulation-reload")),
-            () => shows(qsTrId("gallery-terms-none"))] },
+            simulating("gallery-terms-platform-installed"),
+            simulating("gallery-terms-vendor-installed"), reload, showing("gallery-terms-none")] },
 
-        { page: "text-files", steps: [() => !shows(qsTrId("gallery-text-files-none"))] },
+        { page: "text-files", steps: [notShowing("gallery-text-files-none")] },
         { page: "text-files", state: "none", steps: [
-            () => simulate(qsTrId("gallery-text-files-file-installed")),
-            () => simulate(qsTrId("gallery-text-files-folder-installed")),
-            () => press(qsTrId("gallery-simulation-reload")),
-            () => shows(qsTrId("gallery-text-files-none"))] },
+            simulating("gallery-text-files-file-installed"),
+            simulating("gallery-text-files-folder-installed"), reload,
+            showing("gallery-text-files-none")] },
     ]
 
     property int shot: -1
@@ -240,6 +192,27 @@ Gallery {
         }
         simulated.push(text);
         return true;
+    }
+
+    // Each of these returns a step.
+    function showing(id) {
+        return () => shows(qsTrId(id));
+    }
+
+    function notShowing(id) {
+        return () => !shows(qsTrId(id));
+    }
+
+    function pressing(id, argument) {
+        return () => press(argument ? qsTrId(id).arg(argument) : qsTrId(id));
+    }
+
+    function simulating(id) {
+        return () => simulate(qsTrId(id));
+    }
+
+    function reload() {
+        return press(qsTrId("gallery-simulation-reload"));
     }
 
     function probed() {

@@ -119,18 +119,18 @@ void ScreenshotsTest::problemsAreReported_data()
     QTest::addColumn<QByteArray>("replacement");
     QTest::addColumn<QString>("report");
 
-    QTest::newRow("a page that does not load")
-        << QByteArray("QuickActionsModel {") << QByteArray("NoSuchType {") << "NoSuchType";
-    QTest::newRow("a warning of a binding")
-        << QByteArray("visible: actions.count === 0") << QByteArray("visible: nothing.count === 0")
-        << "ReferenceError: nothing is not defined";
-    QTest::newRow("a text without translation")
-        << QByteArray("qsTrId(\"gallery-quick-actions-home\")")
-        << QByteArray("qsTrId(\"gallery-no-such-text\")")
-        << "no translation of gallery-no-such-text";
-    QTest::newRow("a text that is cut off")
-        << QByteArray("qsTrId(\"gallery-quick-actions-home\")")
-        << QByteArray("\"As long as that\".repeat(10)") << "As long as that\" is cut off";
+    const auto row = [](const char *name, const char *old, const char *replacement,
+                        const char *report) {
+        QTest::newRow(name) << QByteArray(old) << QByteArray(replacement) << report;
+    };
+    row("a page that does not load", "QuickActionsModel {", "NoSuchType {", "NoSuchType");
+    row("a warning of a binding", "visible: actions.count === 0", "visible: nothing.count === 0",
+        "ReferenceError: nothing is not defined");
+    const char *const title = "qsTrId(\"gallery-quick-actions-home\")";
+    row("a text without translation", title, "qsTrId(\"gallery-no-such-text\")",
+        "no translation of gallery-no-such-text");
+    row("a text that is cut off", title, "\"As long as that\".repeat(10)",
+        "As long as that\" is cut off");
 }
 
 void ScreenshotsTest::problemsAreReported()

@@ -244,8 +244,11 @@ void TestMarloDefinitions::installedDefinitions()
         run("check"),
         (Result{2, {}, "marlo-definitions: there are no directories of definitions in \"/\"\n"}));
 
-    Files::write(quickActions + QStringLiteral("lamp.conf"), "x\n" + goodAction);
+    // One of the two directories is enough.
     Files::write(eventsWidgets + QStringLiteral("lamp.json"), "{");
+    QCOMPARE(run("check").status, 1);
+
+    Files::write(quickActions + QStringLiteral("lamp.conf"), "x\n" + goodAction);
     const Result result = run("check");
     QCOMPARE(result.status, 1);
     QCOMPARE(result.output.count('\n'), 2);

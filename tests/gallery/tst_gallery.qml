@@ -111,7 +111,11 @@ TestCase {
     }
 
     function shows(text) {
-        return Screen.texts(surface).some(item => item.text === text);
+        return count(text) > 0;
+    }
+
+    function count(text) {
+        return Screen.texts(surface).filter(item => item.text === text).length;
     }
 
     function see(text) {
@@ -548,7 +552,7 @@ TestCase {
         tap("The terms of MLS are installed");
         tap("Open the page again");
         see("The terms of this service could not be found.");
-        compare(Screen.texts(surface).filter(item => item.text === "Withdraw consent").length, 1);
+        compare(count("Withdraw consent"), 1);
         expectMessages(["No agreement found"]);
         tap("The terms of MLS are installed");
         tap("Open the page again");
@@ -576,39 +580,38 @@ TestCase {
         see("No cover");
     }
 
-    function test_bluetooth() {
-        openPage("bluetooth");
-        see("00:1a:7d:da:71:13");
-        tap("The platform has an address file");
-        tap("Open the page again");
-        see("Unknown");
-        expectMessages(["Unable to open file"]);
-        tap("The platform has an address file");
-        tap("Open the page again");
-        see("00:1a:7d:da:71:13");
+    function test_pagesShowWhatIsInstalled_data() {
+        return [
+            { tag: "bluetooth", switches: ["The platform has an address file"],
+              shown: "00:1a:7d:da:71:13", missing: "Unknown", messages: ["Unable to open file"] },
+            { tag: "android", switches: ["Android support is installed"],
+              shown: "Shown: Android support is installed", missing: "Hidden: no Android support" },
+            { tag: "modem", switches: ["The modem software is installed"], missing: "Unknown" },
+            { tag: "terms", switches: ["The vendor has terms", "The platform has terms"],
+              shown: "Platform terms of use", missing: "No terms", messages: ["unable to load"] },
+            { tag: "text-files", switches: ["The file is there", "The folder is there"],
+              missing: "Nothing to read.", times: 2 },
+        ];
     }
 
-    function test_android() {
-        openPage("android");
-        see("Shown: Android support is installed");
-        // The switch has the name that the page shows.
-        tap("Android support is installed");
+    function test_pagesShowWhatIsInstalled(data) {
+        const seeInstalled = () => {
+            seeNot(data.missing);
+            if (data.shown) {
+                see(data.shown);
+            }
+        };
+        openPage(data.tag);
+        seeInstalled();
+        data.switches.forEach(tap);
         tap("Open the page again");
-        see("Hidden: no Android support");
-        tap("Android support is installed");
+        until(() => count(data.missing) >= (data.times || 1), data.missing);
+        if (data.messages) {
+            expectMessages(data.messages);
+        }
+        data.switches.forEach(tap);
         tap("Open the page again");
-        see("Shown: Android support is installed");
-    }
-
-    function test_modem() {
-        openPage("modem");
-        seeNot("Unknown");
-        tap("The modem software is installed");
-        tap("Open the page again");
-        see("Unknown");
-        tap("The modem software is installed");
-        tap("Open the page again");
-        seeNot("Unknown");
+        seeInstalled();
         goBack();
     }
 
@@ -624,29 +627,5 @@ TestCase {
         tap("de_DE.UTF-8");
         see("Platform terms of use");
         expectMessages(["de_DE", "de_DE", "de_DE"]);
-
-        tap("The vendor has terms");
-        tap("The platform has terms");
-        tap("Open the page again");
-        see("No terms");
-        expectMessages(["unable to load"]);
-        tap("The vendor has terms");
-        tap("The platform has terms");
-        tap("Open the page again");
-        seeNot("No terms");
-    }
-
-    function test_textFiles() {
-        openPage("text-files");
-        seeNot("Nothing to read.");
-        tap("The file is there");
-        tap("The folder is there");
-        tap("Open the page again");
-        until(() => Screen.texts(surface).filter(item => item.text === "Nothing to read.")
-                                             .length === 2, "both are empty");
-        tap("The file is there");
-        tap("The folder is there");
-        tap("Open the page again");
-        seeNot("Nothing to read.");
     }
 }

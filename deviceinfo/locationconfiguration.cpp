@@ -123,11 +123,14 @@ LocationConfiguration::LocationConfiguration(QObject *parent)
 /*!
     \qmlproperty string LocationConfiguration::hereAgreementText
     \readonly
+    \qmlproperty string LocationConfiguration::mlsOnlineAgreementText
+    \readonly
 
-    The text that the user agrees to before HERE positioning is used: the file
-    \c{/usr/share/libherepositioning/agreements/here_consent_<locale>.txt}, where \c{<locale>} is
-    the default locale, such as \c fi_FI. If there is no such file, the text of \c en_GB is used and
-    a warning is logged. If the file cannot be read or is larger than 16 MiB, the text is the
+    The texts that the user agrees to before HERE positioning and the online assistance of MLS are
+    used, from \c{/usr/share/libherepositioning/agreements/here_consent_<locale>.txt} and
+    \c{/usr/share/geoclue-provider-mlsdb/agreements/mls_consent_<locale>.txt}, where \c{<locale>} is
+    the default locale, such as \c fi_FI. Without the file the text of \c en_GB is used and a
+    warning is logged. If the file cannot be read or is larger than 16 MiB, the text is the
     translation of \c settings_location-la-no_agreement_text_found.
 */
 QString LocationConfiguration::hereAgreementText() const
@@ -135,13 +138,6 @@ QString LocationConfiguration::hereAgreementText() const
     return agreementText(hereAgreement);
 }
 
-/*!
-    \qmlproperty string LocationConfiguration::mlsOnlineAgreementText
-    \readonly
-
-    Like \l hereAgreementText, but for the online assistance of MLS:
-    \c{/usr/share/geoclue-provider-mlsdb/agreements/mls_consent_<locale>.txt}.
-*/
 QString LocationConfiguration::mlsOnlineAgreementText() const
 {
     return agreementText(mlsAgreement);

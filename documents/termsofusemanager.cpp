@@ -140,33 +140,24 @@ void TermsOfUseManager::setVendorPath(const QString &path)
 
 /*!
     \qmlmethod list<string> TermsOfUseManager::platformTermsOfUse(string localeName)
+    \qmlmethod list<string> TermsOfUseManager::vendorTermsOfUse(string localeName)
+    \qmlmethod list<string> TermsOfUseManager::vendorTermsSummary(string localeName)
 
-    Returns the title and the body of the platform's terms for \a localeName, from
-    \c{/usr/share/marlo-settings/platform-eula/tarnwick_termsofuse-<locale>.txt}. The list is empty,
-    with warnings in the log, if there are no terms or they cannot be read.
+    Return the title and the body of the terms for \a localeName. The list is empty, with warnings
+    in the log, if there are no terms or they cannot be read. The platform's terms are in
+    \c{/usr/share/marlo-settings/platform-eula/tarnwick_termsofuse-<locale>.txt}, the vendor's full
+    terms and their summary in the directories \c full and \c summary below \l vendorPath.
 */
 QStringList TermsOfUseManager::platformTermsOfUse(const QString &localeName) const
 {
     return readTerms(platformPath + platformTerms, localeName);
 }
 
-/*!
-    \qmlmethod list<string> TermsOfUseManager::vendorTermsOfUse(string localeName)
-
-    Like platformTermsOfUse(), for the vendor's full terms in the directory \c full below
-    \l vendorPath, in the language of \a localeName.
-*/
 QStringList TermsOfUseManager::vendorTermsOfUse(const QString &localeName) const
 {
     return readTerms(m_vendorPath + vendorTerms, localeName);
 }
 
-/*!
-    \qmlmethod list<string> TermsOfUseManager::vendorTermsSummary(string localeName)
-
-    Like platformTermsOfUse(), for the summary of the vendor's terms in the directory \c summary
-    below \l vendorPath, in the language of \a localeName.
-*/
 QStringList TermsOfUseManager::vendorTermsSummary(const QString &localeName) const
 {
     return readTerms(m_vendorPath + vendorSummary, localeName);

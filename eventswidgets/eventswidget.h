@@ -24,7 +24,7 @@ struct EventsWidget {
     // Whether a file exists at availablePath now; always if that is empty.
     bool isAvailable() const;
 
-    // Ignores file and translationCatalog on purpose: a change of these is no change of a row.
+    // Ignores file and translationCatalog on purpose: they do not change the row.
     bool operator!=(const EventsWidget &other) const;
 };
 

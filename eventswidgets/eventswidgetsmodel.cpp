@@ -101,7 +101,7 @@ QString translation(const QString &id, const QString &fallback)
     is destroyed: a text that is still on the screen keeps its translation. A loaded catalog does
     not follow a change of the language. A page that follows the language creates its models again.
 
-    \section2 A change of file or catalog is no change of a row
+    \section2 A change of file or catalog does not change the row
     A widget that moves to another file, or whose file names another catalog, is not reported as
     changed, because everything that a row shows is the same.
 */
@@ -176,9 +176,11 @@ void EventsWidgetsModel::componentComplete()
 
 /*!
     \qmlmethod void EventsWidgetsModel::enableWidget(string path)
+    \qmlmethod void EventsWidgetsModel::disableWidget(string path)
 
-    Adds the widget \a path at the end of the user's list, even if the list already contains it. The
-    rows change once dconf reports the change.
+    enableWidget() adds the widget \a path at the end of the user's list, even if the list already
+    contains it. disableWidget() removes every entry of it. The rows change once dconf reports the
+    change.
 */
 void EventsWidgetsModel::enableWidget(const QString &path)
 {
@@ -186,12 +188,6 @@ void EventsWidgetsModel::enableWidget(const QString &path)
     m_requests.choose([this, path] { m_enabledItem.set(enabledList() + QStringList(path)); });
 }
 
-/*!
-    \qmlmethod void EventsWidgetsModel::disableWidget(string path)
-
-    Removes every entry of the widget \a path from the user's list. The rows change once dconf
-    reports the change.
-*/
 void EventsWidgetsModel::disableWidget(const QString &path)
 {
     m_requests.choose([this, path] {
@@ -203,9 +199,10 @@ void EventsWidgetsModel::disableWidget(const QString &path)
 
 /*!
     \qmlmethod void EventsWidgetsModel::directoryChanged()
+    \qmlmethod void EventsWidgetsModel::enabledWidgetsChanged()
 
-    Reads the definition files again. This is not a signal: the model calls it when the directory
-    changes or a file in it has been written, and a page may do so at any time.
+    Read the definition files and the user's list again. These are not signals: the model calls them
+    when the directory or the list has changed, and a page may do so at any time.
 */
 void EventsWidgetsModel::directoryChanged()
 {
@@ -227,11 +224,6 @@ void EventsWidgetsModel::directoryChanged()
     removeStaleRows(stale);
 }
 
-/*!
-    \qmlmethod void EventsWidgetsModel::enabledWidgetsChanged()
-
-    Reads the user's list again. Like directoryChanged(), this is not a signal.
-*/
 void EventsWidgetsModel::enabledWidgetsChanged()
 {
     if (!m_complete || m_requests.defer(&EventsWidgetsModel::enabledWidgetsChanged)) {

@@ -331,8 +331,9 @@ void MemoryCardFormatter::removeAllFiles()
 
 /*!
     \qmlmethod void MemoryCardFormatter::mount()
+    \qmlmethod void MemoryCardFormatter::unmount()
 
-    Mounts the card.
+    Mounts or unmounts the card.
 */
 void MemoryCardFormatter::mount()
 {
@@ -345,11 +346,6 @@ void MemoryCardFormatter::mount()
     startIfNothingRuns();
 }
 
-/*!
-    \qmlmethod void MemoryCardFormatter::unmount()
-
-    Unmounts the card.
-*/
 void MemoryCardFormatter::unmount()
 {
     if (busy()) {

@@ -312,8 +312,10 @@ void QuickActionsModel::componentComplete()
 
 /*!
     \qmlmethod void QuickActionsModel::enableAction(string path)
+    \qmlmethod void QuickActionsModel::disableAction(string path)
 
-    Adds the action of the definition file \a path at the end of the user's list. Also sets
+    enableAction() adds the definition file \a path at the end of the user's list. disableAction()
+    removes every entry of it. Both set
     \c /desktop/glimmera-marlo-home/events_screen_actions_user (dconf, bool) to \c true, which
     records that the user has changed the list.
 */
@@ -322,12 +324,6 @@ void QuickActionsModel::enableAction(const QString &path)
     m_requests.choose([this, path] { writeEnabledList(m_enabledList + QStringList(path)); });
 }
 
-/*!
-    \qmlmethod void QuickActionsModel::disableAction(string path)
-
-    Removes every entry of the definition file \a path from the user's list. Like enableAction(), it
-    records that the user has changed the list.
-*/
 void QuickActionsModel::disableAction(const QString &path)
 {
     m_requests.choose([this, path] {

@@ -23,9 +23,8 @@ const QLatin1String idProperty("KIVID");
 const QLatin1String readyProperty("Ready");
 constexpr int ready = 1;
 
-// What the daemon answers, or the default if it does not answer with just that type. The daemon
-// sends bare values: a variant, which other services would send, is refused as any other type is.
-template<typename Value> Value answer(const QDBusPendingCall &call)
+// The value of a reply, or the default if the reply has another type, such as a variant.
+template<typename Value> Value valueOf(const QDBusPendingCall &call)
 {
     const QDBusPendingReply<Value> reply = call;
     // The value of an error would be its message.
@@ -115,13 +114,13 @@ KivInfo::KivInfo(QObject *parent) : QObject(parent)
 void KivInfo::slotIdFinished(QDBusPendingCallWatcher *watcher)
 {
     watcher->deleteLater();
-    setKivId(answer<QString>(*watcher));
+    setKivId(valueOf<QString>(*watcher));
 }
 
 void KivInfo::slotReadyFinished(QDBusPendingCallWatcher *watcher)
 {
     watcher->deleteLater();
-    setKivReady(answer<int>(*watcher) == ready);
+    setKivReady(valueOf<int>(*watcher) == ready);
 }
 
 void KivInfo::propertiesChanged(const QDBusMessage &message)

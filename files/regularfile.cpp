@@ -88,7 +88,7 @@ RegularFile readWith(Reader reader, const QString &path, qint64 maximumSize)
         file = {State::NotRegular,
                 {},
                 S_ISDIR(entry.st_mode) ? QStringLiteral("file to open is a directory")
-                                       : QStringLiteral("file to open is no regular file")};
+                                       : QStringLiteral("file to open is not a regular file")};
     }
     close(descriptor);
     return file;

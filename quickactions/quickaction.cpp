@@ -116,7 +116,7 @@ QDBusError QuickAction::whyUnsendable() const
         return {QDBusError::InvalidService, QStringLiteral("The call names no service")};
     }
     if (!service().startsWith(QLatin1Char(':')) && !service().contains(QLatin1Char('.'))) {
-        return {QDBusError::InvalidService, QStringLiteral("The service is no bus name")};
+        return {QDBusError::InvalidService, QStringLiteral("The service is not a bus name")};
     }
     if (method().isEmpty()) {
         return {QDBusError::InvalidMember, QStringLiteral("The call names no method")};
@@ -135,7 +135,7 @@ QDBusError QuickAction::whyUnsendable() const
         } else if (argument.userType() == QMetaType::QStringList) {
             signature += 2; // as
         } else {
-            return {QDBusError::InvalidArgs, QStringLiteral("An argument is no text")};
+            return {QDBusError::InvalidArgs, QStringLiteral("An argument is not text")};
         }
     }
     if (signature > maximumSignature) {

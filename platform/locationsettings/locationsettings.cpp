@@ -37,7 +37,7 @@ LocationSettings::OnlineAGpsState toState(const QVariant &stored)
 void store(MGConfItem *item, LocationSettings::OnlineAGpsState state)
 {
     if (!isState(state)) {
-        qWarning("LocationSettings: %d is no state of an online service", int(state));
+        qWarning("LocationSettings: %d is not a state of an online service", int(state));
     } else if (toState(item->value()) != state) {
         item->set(int(state));
     }

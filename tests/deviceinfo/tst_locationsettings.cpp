@@ -202,7 +202,7 @@ void TestLocationSettings::refusesOtherNumbers()
     QCOMPARE(stored(hereKey), QVariant(2));
     QCOMPARE(changes, QStringList());
     const QString warning =
-        QStringLiteral("LocationSettings: %1 is no state of an online service").arg(number);
+        QStringLiteral("LocationSettings: %1 is not a state of an online service").arg(number);
     QCOMPARE(m_log->takeTexts(), QStringList({warning, warning}));
 }
 

@@ -235,10 +235,10 @@ void TestTermsOfUseManager::filesThatCannotBeOpened_data()
         QTest::newRow(name) << make << error;
     };
     row("directory", Files::makeDirectory, "file to open is a directory");
-    row("pipe", Files::makePipe, "file to open is no regular file");
+    row("pipe", Files::makePipe, "file to open is not a regular file");
     row(
         "device", [](const QString &path) { Files::makeLink(QStringLiteral("/dev/zero"), path); },
-        "file to open is no regular file");
+        "file to open is not a regular file");
     row(
         "too large", [](const QString &path) { Files::makeSparse(path, maximumTextSize + 1); },
         "file to open is larger than 16777216 bytes");

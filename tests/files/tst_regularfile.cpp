@@ -78,7 +78,7 @@ void TestRegularFile::refuses_data()
     QTest::addColumn<State>("state");
     QTest::addColumn<QString>("error");
     const QString nothing = QStringLiteral("No such file or directory");
-    const QString irregular = QStringLiteral("file to open is no regular file");
+    const QString irregular = QStringLiteral("file to open is not a regular file");
     QTest::newRow("no path") << QString() << State::NotOpened << nothing;
     QTest::newRow("nothing") << QStringLiteral("%1/nothing") << State::NotOpened << nothing;
     QTest::newRow("NUL in the path") << QStringLiteral("%1/file") + QChar(0) << State::NotOpened

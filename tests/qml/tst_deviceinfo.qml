@@ -130,8 +130,8 @@ TestCase {
         page.hereState = -1;
         compare(switches(page), [false, false, 1, 2]);
         compare(page.heard, []);
-        compare(root.takeMessages(), ["LocationSettings: 3 is no state of an online service",
-                                      "LocationSettings: -1 is no state of an online service"]);
+        compare(root.takeMessages(), ["LocationSettings: 3 is not a state of an online service",
+                                      "LocationSettings: -1 is not a state of an online service"]);
     }
 
     function test_customSettings() {

@@ -647,7 +647,7 @@ void TestQuickAction::refusesBeforeSending_data()
     // These would end the process, or the connection to the bus.
     row("service of one word", lampCall + "remote-service=lamp\n",
         "service=lamp path=/lamp interface=org.example.Lamp method=toggle",
-        "org.qtproject.QtDBus.Error.InvalidService The service is no bus name");
+        "org.qtproject.QtDBus.Error.InvalidService The service is not a bus name");
     row("reserved path", lampCall + "remote-path=/org/freedesktop/DBus/Local\n",
         "service=org.example.lamp path=/org/freedesktop/DBus/Local interface=org.example.Lamp "
         "method=toggle",
@@ -662,7 +662,7 @@ void TestQuickAction::refusesBeforeSending_data()
     const char *lamp =
         "service=org.example.lamp path=/lamp interface=org.example.Lamp method=toggle";
     const char *tooMany = "org.freedesktop.DBus.Error.InvalidArgs The call has too many arguments";
-    const char *noText = "org.freedesktop.DBus.Error.InvalidArgs An argument is no text";
+    const char *noText = "org.freedesktop.DBus.Error.InvalidArgs An argument is not text";
     row("too many arguments", lampCall + arguments(256), lamp, tooMany);
     row("too long a signature", lampCall + arguments(254) + "255\\argument=a, b\nsize=255\n", lamp,
         tooMany);

@@ -320,7 +320,7 @@ case(
 case(
     "bad-key-named-as-the-arguments",
     action() + "remote-arguments=@Invalid(), a\n",
-    "1: error: the call cannot be sent: An argument is no text [call]",
+    "1: error: the call cannot be sent: An argument is not text [call]",
     '9: warning: unknown key "remote-arguments" [unknown-key]',
 )
 case(

@@ -215,12 +215,7 @@ QString MemoryCardFormatter::devicePath() const
 
 void MemoryCardFormatter::setDevicePath(const QString &path)
 {
-    if (m_devicePath == path) {
-        return;
-    }
-    if (busy()) {
-        qCWarning(lcMemoryCardLog)
-            << "Cannot change device path when not idle. Status is" << m_status;
+    if (m_devicePath == path || isRefused("Cannot change device path")) {
         return;
     }
     m_devicePath = path;
@@ -284,24 +279,10 @@ bool MemoryCardFormatter::busy() const
 */
 void MemoryCardFormatter::format(const QString &type)
 {
-    if (busy()) {
-        qCWarning(lcMemoryCardLog) << "format() called when not idle. Status is" << m_status;
-        return;
+    if (!isRefused("format() called") && requireValue("devicePath", m_devicePath)
+        && requireValue("type", type)) {
+        startSequence({Unmounting, Formatting, Mounting}, type);
     }
-    if (m_devicePath.isEmpty()) {
-        qCWarning(lcMemoryCardLog) << "devicePath is empty.";
-        setStatus(Error);
-        return;
-    }
-    if (type.isEmpty()) {
-        qCWarning(lcMemoryCardLog) << "type is empty.";
-        setStatus(Error);
-        return;
-    }
-    enqueue({Unmounting, Formatting, Mounting}, type);
-    // As in the other operations: busy has not changed yet, but users rely on the signal.
-    Q_EMIT busyChanged();
-    startIfNothingRuns();
 }
 
 /*!
@@ -314,19 +295,9 @@ void MemoryCardFormatter::format(const QString &type)
 */
 void MemoryCardFormatter::removeAllFiles()
 {
-    if (busy()) {
-        qCWarning(lcMemoryCardLog)
-            << "removeAllFiles() called when not idle. Status is" << m_status;
-        return;
+    if (!isRefused("removeAllFiles() called") && requireValue("devicePath", m_devicePath)) {
+        startSequence({Mounting, RemovingFiles});
     }
-    if (m_devicePath.isEmpty()) {
-        qCWarning(lcMemoryCardLog) << "devicePath is empty.";
-        setStatus(Error);
-        return;
-    }
-    enqueue({Mounting, RemovingFiles});
-    Q_EMIT busyChanged();
-    startIfNothingRuns();
 }
 
 /*!
@@ -337,24 +308,16 @@ void MemoryCardFormatter::removeAllFiles()
 */
 void MemoryCardFormatter::mount()
 {
-    if (busy()) {
-        qCWarning(lcMemoryCardLog) << "mount() called when not idle. Status is" << m_status;
-        return;
+    if (!isRefused("mount() called")) {
+        startSequence({Mounting});
     }
-    enqueue({Mounting});
-    Q_EMIT busyChanged();
-    startIfNothingRuns();
 }
 
 void MemoryCardFormatter::unmount()
 {
-    if (busy()) {
-        qCWarning(lcMemoryCardLog) << "unmount() called when not idle. Status is" << m_status;
-        return;
+    if (!isRefused("unmount() called")) {
+        startSequence({Unmounting});
     }
-    enqueue({Unmounting});
-    Q_EMIT busyChanged();
-    startIfNothingRuns();
 }
 
 /*!
@@ -438,6 +401,24 @@ void MemoryCardFormatter::fileRemoverError()
     fail();
 }
 
+bool MemoryCardFormatter::isRefused(const char *request) const
+{
+    if (busy()) {
+        qCWarning(lcMemoryCardLog) << request << "when not idle. Status is" << m_status;
+    }
+    return busy();
+}
+
+bool MemoryCardFormatter::requireValue(const char *name, const QString &value)
+{
+    if (!value.isEmpty()) {
+        return true;
+    }
+    qCWarning(lcMemoryCardLog) << name << "is empty.";
+    setStatus(Error);
+    return false;
+}
+
 void MemoryCardFormatter::setStatus(Status status)
 {
     if (m_status == status) {
@@ -459,6 +440,15 @@ void MemoryCardFormatter::enqueue(std::initializer_list<Status> commands, const 
     }
 }
 
+void MemoryCardFormatter::startSequence(std::initializer_list<Status> commands,
+                                        const QString &formatType)
+{
+    enqueue(commands, formatType);
+    // busy has not changed yet, but users rely on the signal.
+    Q_EMIT busyChanged();
+    startIfNothingRuns();
+}
+
 void MemoryCardFormatter::startIfNothingRuns()
 {
     if (m_running == Idle) {
@@ -473,7 +463,7 @@ void MemoryCardFormatter::doNextCommand()
         return;
     }
     const Command command = m_commands.dequeue();
-    if (isMountCommand(command.command)) {
+    if (command.command == Unmounting || command.command == Mounting) {
         startMountOperation(command.command);
         return;
     }
@@ -627,9 +617,4 @@ void MemoryCardFormatter::fail(const QString &diskServiceError)
     if (!m_commands.isEmpty()) {
         startIfNothingRuns();
     }
-}
-
-bool MemoryCardFormatter::isMountCommand(Status command)
-{
-    return command == Unmounting || command == Mounting;
 }

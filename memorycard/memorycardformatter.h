@@ -106,8 +106,13 @@ private:
         QString formatType;
     };
 
+    // Both warn. A missing value also leads to the status Error.
+    bool isRefused(const char *request) const;
+    bool requireValue(const char *name, const QString &value);
     void setStatus(Status status);
     void enqueue(std::initializer_list<Status> commands, const QString &formatType = QString());
+    void startSequence(std::initializer_list<Status> commands,
+                       const QString &formatType = QString());
     void startIfNothingRuns();
     void doNextCommand();
     void startFormatting(const Command &command);
@@ -118,8 +123,8 @@ private:
     void reportDiskServiceError(const QString &name);
     void startRemovingFiles(const Command &command);
     void finishCommand();
-    void fail(const QString &diskServiceError = QString());
-    static bool isMountCommand(Status command);
+    void fail();
+    void endInError();
 
     QProcess *m_process = nullptr;
     QQueue<Command> m_commands;

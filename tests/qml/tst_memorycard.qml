@@ -98,6 +98,17 @@ TestCase {
         compare(formatter.heard, data.heard);
     }
 
+    // The handler of a refused operation sets the missing path, which does not start the operation.
+    function test_refusedOperationStaysRefused() {
+        const formatter = createTemporaryObject(card, test);
+        formatter.statusChanged.connect(() => formatter.devicePath = "/dev/mmcblk1p1");
+        formatter.removeAllFiles();
+        compare(root.takeMessages(), ["devicePath is empty."]);
+        compare(formatter.heard, ["status 6", "path /dev/mmcblk1p1", "status 5", "busy true",
+                                  "busy true"]);
+        tryCompare(formatter, "status", MemoryCardFormatter.Error);
+    }
+
     function test_withoutDiskService() {
         const formatter = createTemporaryObject(card, test, { deviceName: "mmcblk1p1" });
         formatter.heard = [];

@@ -5,9 +5,8 @@
 
 #include <QDBusConnection>
 #include <QDBusError>
+#include <QMetaEnum>
 #include <QVariantMap>
-
-#include <array>
 
 namespace {
 
@@ -21,41 +20,9 @@ const QLatin1String fileSystemTypeOption("fstype");
 // The service writes out all cached data before it replies, which takes long on a slow card.
 constexpr int requestTimeout = 5 * 60 * 1000; // ms
 
-const QLatin1String alreadyMounted("org.freedesktop.UDisks2.Error.AlreadyMounted");
-const QLatin1String alreadyUnmounting("org.freedesktop.UDisks2.Error.AlreadyUnmounting");
-
-struct ErrorName {
-    MemoryCardFormatter::MountError code;
-    QLatin1String name;
-};
-
-const std::array<ErrorName, 15> errorNames = {{
-    {MemoryCardFormatter::ErrorFailed, QLatin1String("org.freedesktop.UDisks2.Error.Failed")},
-    {MemoryCardFormatter::ErrorCancelled, QLatin1String("org.freedesktop.UDisks2.Error.Cancelled")},
-    {MemoryCardFormatter::ErrorAlreadyCancelled,
-     QLatin1String("org.freedesktop.UDisks2.Error.AlreadyCancelled")},
-    {MemoryCardFormatter::ErrorNotAuthorized,
-     QLatin1String("org.freedesktop.UDisks2.Error.NotAuthorized")},
-    {MemoryCardFormatter::ErrorNotAuthorizedCanObtain,
-     QLatin1String("org.freedesktop.UDisks2.Error.NotAuthorizedCanObtain")},
-    {MemoryCardFormatter::ErrorNotAuthorizedDismissed,
-     QLatin1String("org.freedesktop.UDisks2.Error.NotAuthorizedDismissed")},
-    {MemoryCardFormatter::ErrorAlreadyMounted, alreadyMounted},
-    {MemoryCardFormatter::ErrorNotMounted,
-     QLatin1String("org.freedesktop.UDisks2.Error.NotMounted")},
-    {MemoryCardFormatter::ErrorOptionNotPermitted,
-     QLatin1String("org.freedesktop.UDisks2.Error.OptionNotPermitted")},
-    {MemoryCardFormatter::ErrorMountedByOtherUser,
-     QLatin1String("org.freedesktop.UDisks2.Error.MountedByOtherUser")},
-    {MemoryCardFormatter::ErrorAlreadyUnmounting, alreadyUnmounting},
-    {MemoryCardFormatter::ErrorNotSupported,
-     QLatin1String("org.freedesktop.UDisks2.Error.NotSupported")},
-    {MemoryCardFormatter::ErrorTimedout, QLatin1String("org.freedesktop.UDisks2.Error.Timedout")},
-    {MemoryCardFormatter::ErrorWouldWakeup,
-     QLatin1String("org.freedesktop.UDisks2.Error.WouldWakeup")},
-    {MemoryCardFormatter::ErrorDeviceBusy,
-     QLatin1String("org.freedesktop.UDisks2.Error.DeviceBusy")},
-}};
+// The keys of the error codes are the service's names after another prefix.
+const QLatin1String errorPrefix("org.freedesktop.UDisks2.Error.");
+const QLatin1String keyPrefix("Error");
 
 QDBusMessage createCall(const QString &deviceName, QLatin1String method, const QString &option)
 {
@@ -90,16 +57,12 @@ QDBusPendingCall DiskService::send(const QDBusMessage &call)
     return bus.asyncCall(call, requestTimeout);
 }
 
-bool DiskService::isForgiven(const QString &errorName)
-{
-    return errorName == alreadyMounted || errorName == alreadyUnmounting;
-}
-
 std::optional<MemoryCardFormatter::MountError> DiskService::errorCode(const QString &errorName)
 {
-    for (const ErrorName &known : errorNames) {
-        if (errorName == known.name) {
-            return known.code;
+    const auto codes = QMetaEnum::fromType<MemoryCardFormatter::MountError>();
+    for (int i = 0; i < codes.keyCount(); ++i) {
+        if (errorName == errorPrefix + QLatin1String(codes.key(i)).mid(keyPrefix.size())) {
+            return MemoryCardFormatter::MountError(codes.value(i));
         }
     }
     return {};

@@ -21,9 +21,6 @@ QDBusMessage unmountCall(const QString &deviceName);
 // Sends a call without waiting. There is always a reply: an error without a system bus, too.
 QDBusPendingCall send(const QDBusMessage &call);
 
-// Whether an error says that the card is in the requested state, or about to be.
-bool isForgiven(const QString &errorName);
-
 // Nothing for an error that is not the disk service's own.
 std::optional<MemoryCardFormatter::MountError> errorCode(const QString &errorName);
 

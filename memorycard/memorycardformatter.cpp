@@ -560,22 +560,25 @@ void MemoryCardFormatter::mountOperationFinished(const QString &method,
     }
     const QString name = reply->error().name();
     qCWarning(lcMemoryCardLog) << method << "error:" << name.toLatin1().constData();
-    if (DiskService::isForgiven(name)) {
-        reportDiskServiceError(name);
+    const auto code = DiskService::errorCode(name);
+    // The card is already in the requested state, or about to be.
+    const bool isForgiven = code == ErrorAlreadyMounted || code == ErrorAlreadyUnmounting;
+    if (!isForgiven) {
+        // Dropped before any signal is emitted: requests made from handlers start a new sequence. A
+        // path that was set during the request is still probed.
+        const auto isNoProbe = [](const Command &command) { return command.command != Probing; };
+        m_commands.erase(std::remove_if(m_commands.begin(), m_commands.end(), isNoProbe),
+                         m_commands.end());
+    }
+    if (code && m_running == Mounting) {
+        Q_EMIT mountError(*code);
+    } else if (code) {
+        Q_EMIT unmountError(*code);
+    }
+    if (isForgiven) {
         finishCommand();
     } else {
-        fail(name);
-    }
-}
-
-void MemoryCardFormatter::reportDiskServiceError(const QString &name)
-{
-    if (const auto code = DiskService::errorCode(name)) {
-        if (m_running == Mounting) {
-            Q_EMIT mountError(*code);
-        } else {
-            Q_EMIT unmountError(*code);
-        }
+        endInError();
     }
 }
 
@@ -600,18 +603,14 @@ void MemoryCardFormatter::finishCommand()
     doNextCommand();
 }
 
-void MemoryCardFormatter::fail(const QString &diskServiceError)
+void MemoryCardFormatter::fail()
 {
-    // Dropped before any signal is emitted: requests made from handlers start a new sequence.
-    if (diskServiceError.isEmpty()) {
-        m_commands.clear();
-    } else {
-        // A new path can be set while the request is under way, and is probed in any case.
-        const auto isNoProbe = [](const Command &command) { return command.command != Probing; };
-        m_commands.erase(std::remove_if(m_commands.begin(), m_commands.end(), isNoProbe),
-                         m_commands.end());
-    }
-    reportDiskServiceError(diskServiceError);
+    m_commands.clear();
+    endInError();
+}
+
+void MemoryCardFormatter::endInError()
+{
     m_running = Idle;
     setStatus(Error);
     if (!m_commands.isEmpty()) {

@@ -120,7 +120,6 @@ private:
     void runHelper(Status command, const QStringList &arguments);
     void startMountOperation(Status command);
     void mountOperationFinished(const QString &method, QDBusPendingCallWatcher *reply);
-    void reportDiskServiceError(const QString &name);
     void startRemovingFiles(const Command &command);
     void finishCommand();
     void fail();

@@ -14,15 +14,6 @@
 
 namespace {
 
-const QLatin1String titleKey("title");
-const QLatin1String translationCatalogKey("translation-catalog");
-const QLatin1String iconKey("icon");
-const QLatin1String priorityKey("priority");
-const QLatin1String requiresPackageKey("requires-package");
-const QLatin1String serviceKey("remote-service");
-const QLatin1String pathKey("remote-path");
-const QLatin1String interfaceKey("remote-interface");
-const QLatin1String methodKey("remote-method");
 const QLatin1String argumentsKey("remote-arguments");
 // The keys of a QSettings array, whose elements are numbered from 1.
 const QLatin1String argumentsSizeKey("remote-arguments/size");
@@ -57,50 +48,10 @@ QuickAction::QuickAction(const QString &path, bool enabled)
 {
     // Read as text: as a variant, a number that is too large for an integer would wrap around.
     bool isInteger = false;
-    const int priority = text(priorityKey).toInt(&isInteger);
+    const int priority = text("priority").toInt(&isInteger);
     if (isInteger) {
         m_priority = priority;
     }
-}
-
-QString QuickAction::title() const
-{
-    return text(titleKey);
-}
-
-QVariant QuickAction::icon() const
-{
-    return m_config.value(iconKey);
-}
-
-QString QuickAction::translationCatalog() const
-{
-    return text(translationCatalogKey);
-}
-
-QString QuickAction::requiredPackage() const
-{
-    return text(requiresPackageKey);
-}
-
-QString QuickAction::service() const
-{
-    return text(serviceKey);
-}
-
-QString QuickAction::objectPath() const
-{
-    return text(pathKey);
-}
-
-QString QuickAction::interface() const
-{
-    return text(interfaceKey);
-}
-
-QString QuickAction::method() const
-{
-    return text(methodKey);
 }
 
 QVariantList QuickAction::arguments() const
@@ -209,7 +160,7 @@ QVariantMap QuickAction::readActionConfig(const QString &path) const
     return config;
 }
 
-QString QuickAction::text(QLatin1String key) const
+QString QuickAction::text(const char *key) const
 {
-    return m_config.value(key).toString();
+    return m_config.value(QLatin1String(key)).toString();
 }

@@ -23,18 +23,18 @@ public:
     // The keys of the file with their values as QSettings returns them. A value with a comma is a
     // list of strings, whose text is empty.
     QVariantMap config() const { return m_config; }
-    QString title() const;
-    QVariant icon() const;
-    QString translationCatalog() const;
-    QString requiredPackage() const;
+    QString title() const { return text("title"); }
+    QVariant icon() const { return m_config.value(QStringLiteral("icon")); }
+    QString translationCatalog() const { return text("translation-catalog"); }
+    QString requiredPackage() const { return text("requires-package"); }
     // The place among the actions that the user has not ordered.
     std::optional<int> priority() const { return m_priority; }
 
     // The D-Bus call.
-    QString service() const;
-    QString objectPath() const;
-    QString interface() const;
-    QString method() const;
+    QString service() const { return text("remote-service"); }
+    QString objectPath() const { return text("remote-path"); }
+    QString interface() const { return text("remote-interface"); }
+    QString method() const { return text("remote-method"); }
     QVariantList arguments() const;
     // Why the call cannot be sent; an invalid error if it can. QtDBus itself refuses names and
     // paths that D-Bus does not allow.
@@ -52,7 +52,7 @@ public:
     QVariantMap readActionConfig(const QString &path) const;
 
 private:
-    QString text(QLatin1String key) const;
+    QString text(const char *key) const;
 
     QString m_path;
     QVariantMap m_config;

@@ -24,20 +24,14 @@ namespace {
 constexpr int versionMajor = 1;
 constexpr int versionMinor = 0;
 
-// The engine takes ownership.
-QObject *createTextFileReader(QQmlEngine *engine, QJSEngine *scriptEngine)
-{
-    Q_UNUSED(engine)
-    Q_UNUSED(scriptEngine)
-    return new TextFileReader;
-}
-
 } // namespace
 
 void SystemSettingsPlugin::registerTypes(const char *uri)
 {
-    qmlRegisterSingletonType<TextFileReader>(uri, versionMajor, versionMinor, "TextFileReader",
-                                             createTextFileReader);
+    // The engine takes ownership.
+    qmlRegisterSingletonType<TextFileReader>(
+        uri, versionMajor, versionMinor, "TextFileReader",
+        [](QQmlEngine *, QJSEngine *) -> QObject * { return new TextFileReader; });
     qmlRegisterType<AndroidSupport>(uri, versionMajor, versionMinor, "AndroidSupport");
     qmlRegisterType<LocationConfiguration>(uri, versionMajor, versionMinor,
                                            "LocationConfiguration");
@@ -51,13 +45,11 @@ void SystemSettingsPlugin::registerTypes(const char *uri)
     qmlRegisterType<TermsOfUseManager>(uri, versionMajor, versionMinor, "TermsOfUseManager");
 }
 
-void SystemSettingsPlugin::initializeEngine(QQmlEngine *engine, const char *uri)
+void SystemSettingsPlugin::initializeEngine(QQmlEngine *engine, const char * /*uri*/)
 {
-    Q_UNUSED(uri)
-
-    // The translator installed last is asked first, so engineering English is used only for texts that
-    // the catalog of the language lacks. Both are installed while they are empty. The language change
-    // that a loaded catalog announces then arrives through the event loop, not during the import.
+    // The translator installed last is asked first, so engineering English is used only for texts
+    // that the catalog of the language lacks. Both are installed while they are empty, so that the
+    // language change that a loaded catalog announces arrives through the event loop.
     auto *engineeringEnglish = new AppTranslator(engine);
     QCoreApplication::installTranslator(engineeringEnglish);
     engineeringEnglish->loadEngineeringEnglish();

@@ -28,10 +28,6 @@ const QLatin1String runtimeDaemon("/usr/sbin/apkd");
     \image gallery-android.png The gallery's page of this type
 */
 
-AndroidSupport::AndroidSupport(QObject *parent) : QObject(parent)
-{
-}
-
 /*!
     \qmlproperty bool AndroidSupport::dataDirectoriesVisible
     \readonly

@@ -13,7 +13,7 @@ class AndroidSupport : public QObject
     Q_PROPERTY(bool dataDirectoriesVisible READ dataDirectoriesVisible CONSTANT)
 
 public:
-    explicit AndroidSupport(QObject *parent = nullptr);
+    using QObject::QObject;
 
     bool dataDirectoriesVisible() const;
 };

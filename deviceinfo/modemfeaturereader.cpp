@@ -30,10 +30,6 @@ const QLatin1String variantKey("variant");
     \image gallery-modem.png The gallery's page of this type
 */
 
-ModemFeatureReader::ModemFeatureReader(QObject *parent) : QObject(parent)
-{
-}
-
 /*!
     \qmlproperty string ModemFeatures::variant
     \readonly

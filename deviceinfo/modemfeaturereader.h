@@ -13,7 +13,7 @@ class ModemFeatureReader : public QObject
     Q_PROPERTY(QString variant READ variant CONSTANT)
 
 public:
-    explicit ModemFeatureReader(QObject *parent = nullptr);
+    using QObject::QObject;
 
     QString variant() const;
 };

@@ -109,10 +109,6 @@ QStringList readTerms(const QString &base, const QString &localeName)
     file system and return an empty list after warnings. Check \l hasVendorTermsOfUse first.
 */
 
-TermsOfUseManager::TermsOfUseManager(QObject *parent) : QObject(parent)
-{
-}
-
 /*!
     \qmlproperty bool TermsOfUseManager::hasVendorTermsOfUse
     \readonly

@@ -15,7 +15,7 @@ class TermsOfUseManager : public QObject
     Q_PROPERTY(QString vendorPath READ vendorPath WRITE setVendorPath NOTIFY vendorPathChanged)
 
 public:
-    explicit TermsOfUseManager(QObject *parent = nullptr);
+    using QObject::QObject;
 
     bool hasVendorTermsOfUse() const;
     QString vendorPath() const { return m_vendorPath; }

@@ -59,10 +59,6 @@ QString readText(const QString &path, qint64 *maximumSize)
     text without the prefix, so that a page can hide the whole section.
 */
 
-TextFileReader::TextFileReader(QObject *parent) : QObject(parent)
-{
-}
-
 /*!
     \qmlmethod string TextFileReader::readContent(string filePath)
 

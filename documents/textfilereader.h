@@ -14,7 +14,7 @@ class TextFileReader : public QObject
     Q_OBJECT
 
 public:
-    explicit TextFileReader(QObject *parent = nullptr);
+    using QObject::QObject;
 
     // Null if the file cannot be read; the text of an empty file is empty, not null.
     Q_INVOKABLE QString readContent(const QString &filePath) const;

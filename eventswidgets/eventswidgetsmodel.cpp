@@ -163,10 +163,6 @@ QHash<int, QByteArray> EventsWidgetsModel::roleNames() const
     };
 }
 
-void EventsWidgetsModel::classBegin()
-{
-}
-
 void EventsWidgetsModel::componentComplete()
 {
     m_complete = true;

@@ -44,7 +44,7 @@ public:
     QVariant data(const QModelIndex &index, int role) const override;
     QHash<int, QByteArray> roleNames() const override;
 
-    void classBegin() override;
+    void classBegin() override { }
     void componentComplete() override;
 
 public Q_SLOTS:

@@ -121,21 +121,12 @@ void forEachObject(QVariant *value, const std::function<void(QObject *, QVariant
     A row without text gives an empty text. Exclude such rows with \l matchRole.
 */
 
-TitlesView::TitlesView(QObject *parent) : QObject(parent)
-{
-}
-
 /*!
     \qmlproperty object TitlesView::model
 
     The model that is read, a \c QAbstractListModel; null before the first one is set and after a
     model was destroyed. Anything else is refused with a warning and the model stays.
 */
-QObject *TitlesView::model() const
-{
-    return m_model;
-}
-
 void TitlesView::setModel(QObject *model)
 {
     if (model == m_model) {
@@ -168,11 +159,6 @@ void TitlesView::setModel(QObject *model)
 
     The role path whose value selects the rows. Empty, the default, takes every row.
 */
-QString TitlesView::matchRole() const
-{
-    return m_matchRole;
-}
-
 void TitlesView::setMatchRole(const QString &matchRole)
 {
     if (m_matchRole != matchRole) {
@@ -188,11 +174,6 @@ void TitlesView::setMatchRole(const QString &matchRole)
     The value that \l matchRole must have, or a list of the values that it may have. An object that
     is destroyed becomes null.
 */
-QVariant TitlesView::match() const
-{
-    return m_match;
-}
-
 void TitlesView::setMatch(const QVariant &match)
 {
     // A QML array arrives as a QJSValue, which never compares equal.
@@ -218,11 +199,6 @@ void TitlesView::setMatch(const QVariant &match)
 
     The role path whose values are collected. Empty, the default, collects nothing.
 */
-QString TitlesView::role() const
-{
-    return m_role;
-}
-
 void TitlesView::setRole(const QString &role)
 {
     if (m_role != role) {
@@ -233,26 +209,13 @@ void TitlesView::setRole(const QString &role)
 }
 
 /*!
+    \qmlproperty list<string> TitlesView::values
+    \readonly
     \qmlproperty string TitlesView::value
     \readonly
 
-    The texts of \l values, joined as by joined().
+    The texts of the rows that match, in the order of the model, as a list and joined by joined().
 */
-QString TitlesView::value() const
-{
-    return joined(m_values);
-}
-
-/*!
-    \qmlproperty list<string> TitlesView::values
-    \readonly
-
-    The texts of the rows that match, in the order of the model.
-*/
-QStringList TitlesView::values() const
-{
-    return m_values;
-}
 
 /*!
     \qmlmethod string TitlesView::joined(list<string> list)

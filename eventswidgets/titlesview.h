@@ -25,18 +25,18 @@ class TitlesView : public QObject
     Q_PROPERTY(QStringList values READ values NOTIFY valueChanged)
 
 public:
-    explicit TitlesView(QObject *parent = nullptr);
+    using QObject::QObject;
 
-    QObject *model() const;
+    QObject *model() const { return m_model; }
     void setModel(QObject *model);
-    QString matchRole() const;
+    QString matchRole() const { return m_matchRole; }
     void setMatchRole(const QString &matchRole);
-    QVariant match() const;
+    QVariant match() const { return m_match; }
     void setMatch(const QVariant &match);
-    QString role() const;
+    QString role() const { return m_role; }
     void setRole(const QString &role);
-    QString value() const;
-    QStringList values() const;
+    QString value() const { return joined(m_values); }
+    QStringList values() const { return m_values; }
 
     Q_INVOKABLE QString joined(const QStringList &list) const;
 

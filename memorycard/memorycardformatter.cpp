@@ -142,10 +142,6 @@ bool hasDescriptorsLeft()
     card that is half formatted cannot be used. When the process ends, it waits for the removal.
 */
 
-MemoryCardFormatter::MemoryCardFormatter(QObject *parent) : QObject(parent)
-{
-}
-
 MemoryCardFormatter::~MemoryCardFormatter()
 {
     if (m_process == nullptr || m_process->state() == QProcess::NotRunning) {
@@ -176,10 +172,6 @@ MemoryCardFormatter::~MemoryCardFormatter()
     \value MemoryCardFormatter.Probing The helper identifies the file system on the card.
     \value MemoryCardFormatter.Error Nothing runs; the last sequence failed.
 */
-MemoryCardFormatter::Status MemoryCardFormatter::status() const
-{
-    return m_status;
-}
 
 /*!
     \qmlproperty string MemoryCardFormatter::deviceName
@@ -187,11 +179,6 @@ MemoryCardFormatter::Status MemoryCardFormatter::status() const
     The kernel name of the block device, such as \c mmcblk1p1, which the disk service mounts and
     unmounts. It can be set at any time, but must not be empty during an operation.
 */
-QString MemoryCardFormatter::deviceName() const
-{
-    return m_deviceName;
-}
-
 void MemoryCardFormatter::setDeviceName(const QString &name)
 {
     if (m_deviceName != name) {
@@ -208,11 +195,6 @@ void MemoryCardFormatter::setDeviceName(const QString &name)
     one, is probed immediately, or after a request to the disk service that is under way. While the
     formatter is \l busy, the path cannot be changed: trying to do so gives a warning.
 */
-QString MemoryCardFormatter::devicePath() const
-{
-    return m_devicePath;
-}
-
 void MemoryCardFormatter::setDevicePath(const QString &path)
 {
     if (m_devicePath == path || isRefused("Cannot change device path")) {
@@ -232,10 +214,6 @@ void MemoryCardFormatter::setDevicePath(const QString &path)
     last probe. It is usually empty after a probe that exited with an error. A helper that crashes
     or cannot be started leaves it unchanged: it may then be the type of another card.
 */
-QString MemoryCardFormatter::filesystemType() const
-{
-    return m_filesystemType;
-}
 
 /*!
     \qmlproperty list<string> MemoryCardFormatter::supportedFormatTypes
@@ -263,10 +241,6 @@ QStringList MemoryCardFormatter::supportedFormatTypes() const
     Whether \l status is neither \c Idle nor \c Error. While \c true, operations are refused with a
     warning.
 */
-bool MemoryCardFormatter::busy() const
-{
-    return m_status != Idle && m_status != Error;
-}
 
 /*!
     \qmlmethod void MemoryCardFormatter::format(string type)

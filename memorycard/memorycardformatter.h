@@ -64,17 +64,17 @@ public:
     };
     Q_ENUM(MountError)
 
-    explicit MemoryCardFormatter(QObject *parent = nullptr);
+    using QObject::QObject;
     ~MemoryCardFormatter() override;
 
-    Status status() const;
-    QString deviceName() const;
+    Status status() const { return m_status; }
+    QString deviceName() const { return m_deviceName; }
     void setDeviceName(const QString &name);
-    QString devicePath() const;
+    QString devicePath() const { return m_devicePath; }
     void setDevicePath(const QString &path);
-    QString filesystemType() const;
+    QString filesystemType() const { return m_filesystemType; }
     QStringList supportedFormatTypes() const;
-    bool busy() const;
+    bool busy() const { return m_status != Idle && m_status != Error; }
 
     Q_INVOKABLE void format(const QString &type);
     Q_INVOKABLE void removeAllFiles();

@@ -197,11 +197,6 @@ QuickActionsModel::~QuickActionsModel()
     If a handler sets the property while rows are being changed, the rows change, and
     showPotentialChanged() is emitted, when control returns to the event loop.
 */
-bool QuickActionsModel::showPotential() const
-{
-    return m_showPotential;
-}
-
 void QuickActionsModel::setShowPotential(bool showPotential)
 {
     if (m_showPotential != showPotential) {
@@ -216,15 +211,10 @@ void QuickActionsModel::setShowPotential(bool showPotential)
 
     The number of rows.
 */
-int QuickActionsModel::count() const
-{
-    return rowCount();
-}
 
-int QuickActionsModel::rowCount(const QModelIndex &parent) const
+int QuickActionsModel::rowCount(const QModelIndex & /*parent*/) const
 {
     // Every parent has the same rows, on purpose, so that pages need not pass one.
-    Q_UNUSED(parent)
     return m_rows.size();
 }
 
@@ -298,10 +288,6 @@ void QuickActionsModel::triggerAction(int index)
         return;
     }
     m_rows.at(index).trigger(this, nullptr, SLOT(triggerActionError(QDBusError, QDBusMessage)));
-}
-
-void QuickActionsModel::classBegin()
-{
 }
 
 void QuickActionsModel::componentComplete()

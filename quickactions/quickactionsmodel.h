@@ -38,9 +38,9 @@ public:
     explicit QuickActionsModel(QObject *parent = nullptr);
     ~QuickActionsModel() override;
 
-    bool showPotential() const;
+    bool showPotential() const { return m_showPotential; }
     void setShowPotential(bool showPotential);
-    int count() const;
+    int count() const { return rowCount(); }
 
     int rowCount(const QModelIndex &parent = QModelIndex()) const override;
     QVariant data(const QModelIndex &index, int role) const override;
@@ -49,7 +49,7 @@ public:
     Q_INVOKABLE QVariantMap get(int index) const;
     Q_INVOKABLE void triggerAction(int index);
 
-    void classBegin() override;
+    void classBegin() override { }
     void componentComplete() override;
 
 public Q_SLOTS:

@@ -166,11 +166,6 @@ MGConfItem::~MGConfItem()
     }
 }
 
-QString MGConfItem::key() const
-{
-    return m_key;
-}
-
 QVariant MGConfItem::value() const
 {
     if (m_path.isEmpty()) {

@@ -28,7 +28,7 @@ public:
     explicit MGConfItem(const QString &key, QObject *parent = nullptr);
     ~MGConfItem() override;
 
-    QString key() const;
+    QString key() const { return m_key; }
 
     // Invalid if the key is not set.
     QVariant value() const;

@@ -35,10 +35,6 @@ QByteArray digestForDefaultLocale()
 
 } // namespace
 
-AppTranslator::AppTranslator(QObject *parent) : QTranslator(parent)
-{
-}
-
 void AppTranslator::loadEngineeringEnglish()
 {
     static_cast<void>(load(catalog + engineeringEnglishSuffix, directory));

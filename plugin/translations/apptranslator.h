@@ -18,7 +18,7 @@ class AppTranslator : public QTranslator
     Q_OBJECT
 
 public:
-    explicit AppTranslator(QObject *parent);
+    using QTranslator::QTranslator;
 
     // Without its catalog the translator is empty, which is not an error.
     void loadEngineeringEnglish();

@@ -479,8 +479,8 @@ void tst_FileRemover::longLine()
             QByteArray("overlay /run/layers overlay lowerdir=").leftJustified(length, 'x');
         // Blanks, too, are part of the line.
         const QByteArray withBlanks = QByteArray(head).replace("xxxxxxxx", "       x");
-        for (const QByteArray &line : {head, withBlanks}) {
-            writeMountTable(line + tail);
+        for (const QByteArray &front : {head, withBlanks}) {
+            writeMountTable(front + tail);
             QCOMPARE(runHere(device), Error);
             QVERIFY2(exists(path("outside/file")), QByteArray::number(length).constData());
         }
@@ -518,7 +518,6 @@ void tst_FileRemover::lineCutWithinDirectory()
     const int escapes = 3000;
     QByteArray directory = path("directory");
     makeDirectory(directory);
-    QByteArray padding;
     while (directory.size() < escapes) {
         directory += '/' + QByteArray(200, ' ');
         makeDirectory(directory);

@@ -20,6 +20,7 @@ GalleryPage {
 
         Flow {
             Layout.fillWidth: true
+            visible: actions.count > 0
             spacing: 8
 
             Repeater {

@@ -27,6 +27,7 @@ GalleryPage {
 
         ReorderableList {
             Layout.fillWidth: true
+            visible: count > 0
             model: enabledActions
             upText: qsTrId("gallery-move-up")
             downText: qsTrId("gallery-move-down")

@@ -49,6 +49,7 @@ GalleryPage {
         heading: platformTerms[0] || qsTrId("gallery-terms-none")
 
         Paragraph {
+            visible: text !== ""
             text: platformTerms[1] || ""
         }
     }
@@ -58,6 +59,7 @@ GalleryPage {
         heading: vendorSummary[0] || qsTrId("gallery-terms-none")
 
         Paragraph {
+            visible: text !== ""
             text: vendorSummary[1] || ""
         }
     }
@@ -67,6 +69,7 @@ GalleryPage {
         heading: vendorTerms[0] || qsTrId("gallery-terms-none")
 
         Paragraph {
+            visible: text !== ""
             text: vendorTerms[1] || ""
         }
     }

@@ -36,6 +36,12 @@ void DconfTool::write(const QString &key, const QByteArray &value)
     run({QStringLiteral("write"), key, QString::fromUtf8(value)});
 }
 
+void DconfTool::write(const QString &key, const QStringList &value)
+{
+    const QString elements = value.join(QStringLiteral("', '"));
+    write(key, value.isEmpty() ? QByteArray("@as []") : "['" + elements.toUtf8() + "']");
+}
+
 void DconfTool::reset(const QString &path)
 {
     run({QStringLiteral("reset"), QStringLiteral("-f"), path});

@@ -20,7 +20,8 @@ QByteArray run(const QStringList &arguments, const QByteArray &input = {});
 // A value in GVariant's text format; empty if nothing is stored.
 QByteArray read(const QString &key);
 void write(const QString &key, const QByteArray &value);
-// Of a key, or with a slash at its end of a whole directory.
+void write(const QString &key, const QStringList &value);
+// Of a key, or with a slash at its end of a whole folder.
 void reset(const QString &path);
 
 // What this process has set is stored one by one in the background: what another one writes next is

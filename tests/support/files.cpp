@@ -84,6 +84,13 @@ void Files::installCatalog(const QString &name)
     write(catalogPath(name), compiled.readAll());
 }
 
+void Files::installCatalogs(const QStringList &names)
+{
+    for (const QString &name : names) {
+        installCatalog(name);
+    }
+}
+
 void Files::removeCatalog(const QString &name)
 {
     remove(catalogPath(name));

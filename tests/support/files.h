@@ -6,6 +6,7 @@
 
 #include <QByteArray>
 #include <QString>
+#include <QStringList>
 
 /*
     Files of the throw-away root. Each of these ends the test program if it cannot do what it says.
@@ -24,6 +25,7 @@ void makeLink(const QString &target, const QString &path);
 
 // Installs a compiled catalog of tests/catalogs in /usr/share/translations, or removes it.
 void installCatalog(const QString &name);
+void installCatalogs(const QStringList &names);
 void removeCatalog(const QString &name);
 
 } // namespace Files

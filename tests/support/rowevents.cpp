@@ -1,0 +1,56 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "rowevents.h"
+
+namespace {
+
+// Rows below a parent are an error in a list model and must not pass for others.
+QString rows(const QModelIndex &parent, int first, int last)
+{
+    const QString text =
+        QString::number(first) + (last == first ? QString() : QStringLiteral("-%1").arg(last));
+    return parent.isValid() ? text + QStringLiteral(" below a parent") : text;
+}
+
+} // namespace
+
+RowEvents::RowEvents(const QAbstractItemModel *model)
+{
+    using Model = QAbstractItemModel;
+    QObject::connect(model, &Model::rowsInserted, &m_context,
+                     [this](const QModelIndex &parent, int first, int last) {
+                         m_events.append(QStringLiteral("inserted ") + rows(parent, first, last));
+                     });
+    QObject::connect(model, &Model::rowsRemoved, &m_context,
+                     [this](const QModelIndex &parent, int first, int last) {
+                         m_events.append(QStringLiteral("removed ") + rows(parent, first, last));
+                     });
+    QObject::connect(model, &Model::rowsMoved, &m_context,
+                     [this](const QModelIndex &parent, int first, int last, const QModelIndex &,
+                            int destination) {
+                         const int row = destination > first ? destination - 1 : destination;
+                         m_events.append(
+                             QStringLiteral("moved %1 %2").arg(rows(parent, first, last)).arg(row));
+                     });
+    QObject::connect(
+        model, &Model::dataChanged, &m_context,
+        [this](const QModelIndex &top, const QModelIndex &bottom, const QVector<int> &roles) {
+            m_events.append(QStringLiteral("changed ")
+                            + rows(top.parent(), top.row(), bottom.row()));
+            for (const int role : roles) {
+                m_events.last() += QStringLiteral(" (%1)").arg(role);
+            }
+        });
+    QObject::connect(model, &Model::modelReset, &m_context,
+                     [this] { m_events.append(QStringLiteral("reset")); });
+    QObject::connect(model, &Model::layoutChanged, &m_context,
+                     [this] { m_events.append(QStringLiteral("layout")); });
+}
+
+QString RowEvents::take()
+{
+    const QString events = m_events.join(QStringLiteral(", "));
+    m_events.clear();
+    return events;
+}

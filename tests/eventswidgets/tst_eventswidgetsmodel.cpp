@@ -5,20 +5,59 @@
 #include "eventswidgets/eventswidgetsmodel.h"
 #include "files.h"
 #include "interfaceof.h"
-#include "loggedtest.h"
+#include "listmodeltest.h"
+#include "texts.h"
 
-#include <QAbstractItemModelTester>
 #include <QtTest>
 
-#include <functional>
+using Model = EventsWidgetsModel;
 
-class TestEventsWidgetsModel : public LoggedTest
+namespace {
+
+const QString directory = "/usr/share/glimmera/eventswidgets"_s;
+const QString keyName = "/desktop/glimmera-marlo-home/events_screen_widgets"_s;
+const QString needed = "/usr/share/glimmera/needed"_s;
+
+const QString a = "a"_s;
+const QString b = "b"_s;
+const QString c = "c"_s;
+
+QString pathOf(const QString &file)
+{
+    return directory + QLatin1Char('/') + file;
+}
+
+QByteArray fileOf(const QByteArray &widgets, const QByteArray &catalog = {})
+{
+    return R"({ "translation_catalog": ")" + catalog + R"(", "widgets": [)" + widgets + "] }";
+}
+
+void write(const QString &file, const QByteArray &widgets, const QByteArray &catalog = {})
+{
+    Files::write(pathOf(file), fileOf(widgets, catalog));
+}
+
+// The values of a role in all rows.
+QStringList column(const QAbstractListModel &model, Model::Role role)
+{
+    QStringList values;
+    for (int row = 0; row < model.rowCount(); ++row) {
+        values.append(model.data(model.index(row), role).toString());
+    }
+    return values;
+}
+
+} // namespace
+
+class TestEventsWidgetsModel : public ListModelTest
 {
     Q_OBJECT
 
+public:
+    TestEventsWidgetsModel() : ListModelTest(directory, ".json"_s) { }
+
 private Q_SLOTS:
     void init();
-    void cleanup();
 
     // What it is
     void interface();
@@ -28,7 +67,6 @@ private Q_SLOTS:
     void readsNothingBeforeCompletion();
 
     // Reading
-    void missingDirectory();
     void readsJsonFilesOnly();
     void badFilesHideNoGoodOnes();
     void placesByOrder_data();
@@ -37,34 +75,27 @@ private Q_SLOTS:
     void repeatedPathInTwoFiles();
 
     // Following the directory
-    void followsFiles();
     void changedWidgetKeepsItsRow();
-    void placesAnewWhatComesAgain();
     void unchangedWidgetsAreNotAnnounced();
-    void widgetThatMovesToAnotherFile();
     void removesOneRowAtATime();
-    void directoryMadeLater();
-    void directoryMadeAgain();
-    void rewrittenInPlace();
+    void readsHalfWrittenFiles();
     void oneScanPerNotification();
-    void otherFilesAreIgnored();
 
     // Texts
     void translatesTitleAndDescription();
     void looksTextsUpOnEveryCall();
     void catalogWithoutWidgets();
     void catalogsAreOnlyEverAdded();
-    void catalogsGoWithTheModel();
+    void modelsShareNoCatalogs();
 
     // Enabled
     void defaultsWhileNothingIsStored();
-    void emptyListEnablesNothing();
     void valuesOfAnyType_data();
     void valuesOfAnyType();
     void firstChoiceEnablesAllOthers();
-    void enablesAgain();
-    void disablesAll();
-    void unknownPaths();
+    void choices_data();
+    void choices();
+    void choiceOfALaterWidget();
     void listInReadingOrderAfterAScan();
     void listInRowOrderAfterTheKeyChanged();
     void choiceBeforeCompletion();
@@ -77,162 +108,111 @@ private Q_SLOTS:
     // Called back
     void handlersMayCallBack();
     void changesWaitForOneAnother();
+    void choicesMadeInTheMiddleOfAScan_data();
     void choicesMadeInTheMiddleOfAScan();
-    void firstChoiceInTheMiddleOfAScan();
     void requestsInHandlersRunOnce();
     void languageChangesInTheMiddleOfAScan();
-    void languageChangesOfADyingModel();
-    void modelsShareNothing();
 
 private:
-    static QStringList column(const EventsWidgetsModel &model, int role);
-    static QStringList paths(const EventsWidgetsModel &model)
-    {
-        return column(model, EventsWidgetsModel::PathRole);
-    }
-    QStringList storedList() const { return m_key->value().toStringList(); }
+    void makeModel();
+    void loadModel();
+    // A model of one file with these widgets.
+    void loadModel(const QByteArray &widgets, const QByteArray &catalog = {});
+    QStringList column(Model::Role role) const { return ::column(*m_model, role); }
+    // Of each row: true or false.
+    QStringList enabled() const { return column(Model::EnabledRole); }
+    QString storedList() const { return m_key->value().toStringList().join(QLatin1Char(' ')); }
+
+    void loadEverything() override { loadModel(); }
+    void removeModel() override { m_model.reset(); }
+    QString rowsOf(const QAbstractListModel &model) const override;
+    QByteArray definition(const QString &name, const QByteArray &catalog) const override;
 
     std::unique_ptr<MGConfItem> m_key;
+    std::unique_ptr<Model> m_model;
 };
-
-namespace {
-
-const QString directory = QStringLiteral("/usr/share/glimmera/eventswidgets");
-const QString keyName = QStringLiteral("/desktop/glimmera-marlo-home/events_screen_widgets");
-
-const QString a = QStringLiteral("a");
-const QString b = QStringLiteral("b");
-const QString c = QStringLiteral("c");
-
-QString pathOf(const char *name)
-{
-    return directory + QLatin1Char('/') + QLatin1String(name);
-}
-
-void writeFile(const char *name, const QByteArray &widgets, const char *catalog = "")
-{
-    Files::write(pathOf(name),
-                 QByteArray(R"({ "translation_catalog": ")") + catalog + R"(", "widgets": [)"
-                     + widgets + "] }");
-}
-
-// A model under test, complete and watched by a model tester.
-class Model : public EventsWidgetsModel
-{
-public:
-    explicit Model(bool complete = true)
-    {
-        if (complete) {
-            componentComplete();
-        }
-    }
-
-private:
-    QAbstractItemModelTester m_tester{this, QAbstractItemModelTester::FailureReportingMode::QtTest};
-};
-
-// Answers every language change of the application.
-class LanguageListener : public QObject
-{
-public:
-    explicit LanguageListener(std::function<void()> answer) : m_answer(std::move(answer))
-    {
-        QCoreApplication::instance()->installEventFilter(this);
-    }
-    bool eventFilter(QObject *watched, QEvent *event) override
-    {
-        if (event->type() == QEvent::LanguageChange) {
-            ++count;
-            m_answer();
-        }
-        return QObject::eventFilter(watched, event);
-    }
-    int count = 0;
-
-private:
-    std::function<void()> m_answer;
-};
-
-} // namespace
-
-QStringList TestEventsWidgetsModel::column(const EventsWidgetsModel &model, int role)
-{
-    QStringList values;
-    for (int row = 0; row < model.rowCount(); ++row) {
-        values.append(model.data(model.index(row), role).toString());
-    }
-    return values;
-}
 
 void TestEventsWidgetsModel::init()
 {
-    for (const auto *name : {"maps_eng_en", "maps-fi", "atlas_eng_en"}) {
-        Files::installCatalog(QString::fromLatin1(name));
-    }
-    QLocale::setDefault(QLocale(QStringLiteral("fi_FI")));
-    Files::remove(directory);
-    Files::makeDirectory(directory);
     m_key = std::make_unique<MGConfItem>(keyName);
     m_key->unset();
-    LoggedTest::init();
+    Files::remove(needed);
+    ListModelTest::init();
 }
 
-void TestEventsWidgetsModel::cleanup()
+void TestEventsWidgetsModel::makeModel()
 {
-    LoggedTest::cleanup();
-    m_key.reset();
+    m_model = std::make_unique<Model>();
+    watch(m_model.get());
+    m_model->classBegin();
+}
+
+void TestEventsWidgetsModel::loadModel()
+{
+    makeModel();
+    m_model->componentComplete();
+    events();
+}
+
+void TestEventsWidgetsModel::loadModel(const QByteArray &widgets, const QByteArray &catalog)
+{
+    write("test.json"_s, widgets, catalog);
+    loadModel();
+}
+
+QString TestEventsWidgetsModel::rowsOf(const QAbstractListModel &model) const
+{
+    return ::column(model, Model::PathRole).join(QLatin1Char(' '));
+}
+
+QByteArray TestEventsWidgetsModel::definition(const QString &name, const QByteArray &catalog) const
+{
+    return fileOf(R"({ "title": "plain", "path": ")" + name.toUtf8() + "\" }", catalog);
 }
 
 void TestEventsWidgetsModel::interface()
 {
-    EventsWidgetsModel model;
-    const QStringList members{
-        QStringLiteral("void enableWidget(QString)"), QStringLiteral("void disableWidget(QString)"),
-        QStringLiteral("void directoryChanged()"), QStringLiteral("void enabledWidgetsChanged()"),
-        QStringLiteral("void updateAvailable()")};
-    QCOMPARE(interfaceOf(EventsWidgetsModel::staticMetaObject), members);
+    Model model;
+    const QStringList members{"void enableWidget(QString)"_s, "void disableWidget(QString)"_s,
+                              "void directoryChanged()"_s, "void enabledWidgetsChanged()"_s,
+                              "void updateAvailable()"_s};
+    QCOMPARE(interfaceOf(Model::staticMetaObject), members);
     QVERIFY(model.qt_metacast("org.qt-project.Qt.QQmlParserStatus") != nullptr);
     QVERIFY(qobject_cast<QAbstractListModel *>(&model) != nullptr);
 }
 
 void TestEventsWidgetsModel::roles()
 {
-    const EventsWidgetsModel model;
-    QCOMPARE(model.roleNames(),
-             (QHash<int, QByteArray>{{256, "title"},
-                                     {257, "icon"},
-                                     {258, "path"},
-                                     {259, "enabled"},
-                                     {260, "description"},
-                                     {261, "available"}}));
+    const QHash<int, QByteArray> expected{{256, "title"},       {257, "icon"},
+                                          {258, "path"},        {259, "enabled"},
+                                          {260, "description"}, {261, "available"}};
+    QCOMPARE(Model().roleNames(), expected);
 }
 
 void TestEventsWidgetsModel::dataOfRows()
 {
-    writeFile("test.json",
-              R"({ "path": "/a.qml", "title": "Title", "icon": "image://icon", "order": 1,
+    loadModel(R"({ "path": "/a.qml", "title": "Title", "icon": "image://icon", "order": 1,
                    "default_enabled": true, "available_path": "/nowhere/at/all" },
                  { "path": "/b.qml" })");
-    const Model model;
-    QCOMPARE(model.rowCount(), 2);
-    const auto data = [&model](int row, int role) { return model.data(model.index(row), role); };
-    QCOMPARE(data(0, 256), QVariant(QStringLiteral("Title")));
-    QCOMPARE(data(0, 257), QVariant(QStringLiteral("image://icon")));
-    QCOMPARE(data(0, 258), QVariant(QStringLiteral("/a.qml")));
-    QCOMPARE(data(0, 259), QVariant(true));
-    QCOMPARE(data(0, 260), QVariant(QString()));
-    QCOMPARE(data(0, 261), QVariant(false));
-    QCOMPARE(data(1, 259), QVariant(false));
-    QCOMPARE(data(1, 261), QVariant(true));
+    const auto data = [this](int row) {
+        QVariantList values;
+        for (int role = 256; role <= 261; ++role) {
+            values.append(m_model->data(m_model->index(row), role));
+        }
+        return values;
+    };
+    QCOMPARE(m_model->rowCount(), 2);
+    QCOMPARE(data(0),
+             (QVariantList{"Title"_s, "image://icon"_s, "/a.qml"_s, true, QString(), false}));
+    QCOMPARE(data(1), (QVariantList{QString(), QString(), "/b.qml"_s, false, QString(), true}));
     for (const int role : {256, 257, 258, 260}) {
-        QCOMPARE(data(1, role).userType(), int(QMetaType::QString));
+        QCOMPARE(m_model->data(m_model->index(1), role).userType(), int(QMetaType::QString));
     }
 }
 
 void TestEventsWidgetsModel::dataOutsideTheRows()
 {
-    writeFile("test.json", R"({ "path": "a" })");
-    const Model model;
+    loadModel(R"({ "path": "a" })");
     class OtherModel : public QAbstractTableModel
     {
     public:
@@ -241,339 +221,237 @@ void TestEventsWidgetsModel::dataOutsideTheRows()
         QVariant data(const QModelIndex &, int) const override { return {}; }
     };
     const OtherModel other;
-    const int title = EventsWidgetsModel::TitleRole;
-    QVERIFY(model.data(other.index(0, 0), title).isValid());
-    QVERIFY(!model.data(QModelIndex(), title).isValid());
-    QVERIFY(!model.data(other.index(1, 0), title).isValid());
-    QVERIFY(!model.data(other.index(0, 1), title).isValid());
-    for (const int role : {0, 1, 255, 262, -1}) {
-        QVERIFY(!model.data(model.index(0), role).isValid());
+    QVERIFY(m_model->data(other.index(0, 0), Model::TitleRole).isValid());
+    for (const QModelIndex &index : {QModelIndex(), other.index(1, 0), other.index(0, 1)}) {
+        QVERIFY(!m_model->data(index, Model::TitleRole).isValid());
     }
-    QCOMPARE(model.rowCount(model.index(0)), 0);
+    for (const int role : {0, 1, 255, 262, -1}) {
+        QVERIFY(!m_model->data(m_model->index(0), role).isValid());
+    }
+    QCOMPARE(m_model->rowCount(m_model->index(0)), 0);
 }
 
 void TestEventsWidgetsModel::readsNothingBeforeCompletion()
 {
-    writeFile("test.json", R"({ "path": "a" })");
-    Files::write(pathOf("bad.json"), "bad");
-    Model model(false);
-    model.classBegin();
-    model.directoryChanged();
-    model.enabledWidgetsChanged();
-    model.updateAvailable();
-    Files::write(pathOf("more.json"), "bad");
+    write("test.json"_s, R"({ "path": "a" })");
+    writeBroken();
+    makeModel();
+    m_model->directoryChanged();
+    m_model->enabledWidgetsChanged();
+    m_model->updateAvailable();
+    Files::write(pathOf("more.json"_s), "bad");
     m_key->set(QStringList{a});
     QTest::qWait(200);
-    QCOMPARE(model.rowCount(), 0);
-    QCOMPARE(m_log->takeReport(), QString());
+    QCOMPARE(m_model->rowCount(), 0);
+    QCOMPARE(takeMessages(), QStringList());
 
-    model.componentComplete();
-    QCOMPARE(paths(model), QStringList{a});
-    QCOMPARE(m_log->takeAll().size(), 2);
-}
-
-void TestEventsWidgetsModel::missingDirectory()
-{
-    Files::remove(directory);
-    const Model model;
-    QCOMPARE(model.rowCount(), 0);
+    m_model->componentComplete();
+    QCOMPARE(rows(), "a"_s);
+    QCOMPARE(takeMessages().size(), 2);
 }
 
 void TestEventsWidgetsModel::readsJsonFilesOnly()
 {
-    writeFile("plain.json", R"({ "path": "plain" })");
-    writeFile("UPPER.JSON", R"({ "path": "upper" })");
-    writeFile("more.json.bak", R"({ "path": "backup" })");
-    writeFile("json", R"({ "path": "bare" })");
-    writeFile(".hidden.json", R"({ "path": "hidden" })");
-    writeFile("directory.json/below.json", R"({ "path": "below" })");
-    Files::makeLink(pathOf("json"), pathOf("link.json"));
-    Files::makeLink(pathOf("nowhere"), pathOf("broken.json"));
-    Files::makeLink(directory, pathOf("loop.json"));
-    Files::makePipe(pathOf("pipe.json"));
-    Files::makePipe(pathOf("pipe"));
-    Files::makeLink(pathOf("pipe"), pathOf("linked-pipe.json"));
-    Files::makeLink(QStringLiteral("/dev/zero"), pathOf("endless.json"));
-
-    const Model model;
-    QStringList found = paths(model);
+    const QStringList names = "plain.json UPPER.JSON more.json.bak json .hidden.json "
+                              "directory.json/below.json"_words;
+    for (const QString &name : names) {
+        write(name, R"({ "path": ")" + name.toUtf8() + "\" }");
+    }
+    Files::makeLink(pathOf("json"_s), pathOf("link.json"_s));
+    Files::makeLink(pathOf("nowhere"_s), pathOf("broken.json"_s));
+    Files::makeLink(directory, pathOf("loop.json"_s));
+    Files::makePipe(pathOf("pipe.json"_s));
+    Files::makePipe(pathOf("pipe"_s));
+    Files::makeLink(pathOf("pipe"_s), pathOf("linked-pipe.json"_s));
+    Files::makeLink("/dev/zero"_s, pathOf("endless.json"_s));
+    loadModel();
+    QStringList found = column(Model::PathRole);
     found.sort();
-    QCOMPARE(
-        found,
-        (QStringList{QStringLiteral("bare"), QStringLiteral("plain"), QStringLiteral("upper")}));
+    // The link is to the file "json".
+    QCOMPARE(found, "UPPER.JSON json plain.json"_words);
 }
 
 void TestEventsWidgetsModel::badFilesHideNoGoodOnes()
 {
-    writeFile("good-1.json", R"({ "path": "a", "order": 1 })");
-    writeFile("good-2.json", R"({ "path": "b", "order": 2 }, 1, { "path": "c", "order": 3 })");
-    Files::write(pathOf("array.json"), "[]");
-    Files::write(pathOf("deep.json"), QByteArray(100000, '['));
-    Files::write(pathOf("binary.json"), QByteArray(100000, '\x80'));
-    Files::write(pathOf("large.json"), QByteArray(20 * 1024 * 1024, ' '));
-    const Model model;
-    QCOMPARE(paths(model), (QStringList{a, b, c}));
+    write("good-1.json"_s, R"({ "path": "a", "order": 1 })");
+    write("good-2.json"_s, R"({ "path": "b", "order": 2 }, 1, { "path": "c", "order": 3 })");
+    Files::write(pathOf("array.json"_s), "[]");
+    Files::write(pathOf("deep.json"_s), QByteArray(100000, '['));
+    Files::write(pathOf("binary.json"_s), QByteArray(100000, '\x80'));
+    Files::write(pathOf("large.json"_s), QByteArray(20 * 1024 * 1024, ' '));
+    loadModel();
+    QCOMPARE(rows(), "a b c"_s);
 
-    QStringList warnings = m_log->takeTexts();
-    warnings.sort();
     QStringList expected;
-    for (const auto *name : {"array", "binary", "deep", "large"}) {
-        expected.append(QStringLiteral("Invalid Events Widget \"%1/%2.json\"")
-                            .arg(directory, QLatin1String(name)));
+    for (const QString &name : "array binary deep large"_words) {
+        expected.append(
+            "warning [default] Invalid Events Widget \"%1/%2.json\""_s.arg(directory, name));
     }
-    expected.append(QStringLiteral("Invalid widget defined in \"%1\"").arg(pathOf("good-2.json")));
+    expected.append(
+        "warning [default] Invalid widget defined in \"%1\""_s.arg(pathOf("good-2.json"_s)));
+    QStringList warnings = takeMessages();
+    warnings.sort();
     QCOMPARE(warnings, expected);
 }
 
 void TestEventsWidgetsModel::placesByOrder_data()
 {
-    using Orders = QVector<int>;
-    QTest::addColumn<Orders>("orders");
-    QTest::addColumn<Orders>("rows");
-    QTest::newRow("in order") << Orders{1, 3, 7} << Orders{1, 3, 7};
-    QTest::newRow("backwards") << Orders{7, 3, 1} << Orders{1, 3, 7};
-    QTest::newRow("before the first") << Orders{1, 0} << Orders{0, 1};
-    QTest::newRow("none goes last") << Orders{1, -1, 3} << Orders{1, -1, 3};
-    QTest::newRow("none before any") << Orders{-1, -2} << Orders{-1, -2};
-    QTest::newRow("behind what has none") << Orders{-1, 5, 4} << Orders{-1, 4, 5};
-    QTest::newRow("before a higher one only") << Orders{5, -1, 6, 4} << Orders{4, 5, -1, 6};
-    QTest::newRow("first higher one") << Orders{5, -1, 9, 5, 6} << Orders{5, -1, 5, 6, 9};
+    QTest::addColumn<QString>("orders");
+    QTest::addColumn<QString>("rows");
+    const auto row = [](const char *name, const char *orders, const char *rows) {
+        QTest::newRow(name) << orders << rows;
+    };
+    row("in order", "1 3 7", "1 3 7");
+    row("backwards", "7 3 1", "1 3 7");
+    row("before the first", "1 0", "0 1");
+    row("after an equal one", "1 3 7 3", "1 3 3 7");
+    row("none goes last", "1 -1 3", "1 -1 3");
+    row("none before any", "-1 -2", "-1 -2");
+    row("behind what has none", "-1 5 4", "-1 4 5");
+    row("before a higher one only", "5 -1 6 4", "4 5 -1 6");
+    row("first higher one", "5 -1 9 5 6", "5 -1 5 6 9");
 }
 
 void TestEventsWidgetsModel::placesByOrder()
 {
-    QFETCH(QVector<int>, orders);
-    QByteArray widgets;
-    for (int i = 0; i < orders.size(); ++i) {
-        widgets += (i > 0 ? ", " : "") + QByteArray(R"({ "path": ")") + QByteArray::number(i)
-            + R"(", "icon": ")" + QByteArray::number(orders.at(i)) + R"(", "order": )"
-            + QByteArray::number(orders.at(i)) + " }";
+    QFETCH(QString, orders);
+    QByteArrayList widgets;
+    for (const QByteArray &order : orders.toLatin1().split(' ')) {
+        widgets.append(R"({ "path": ")" + QByteArray::number(widgets.size()) + R"(", "icon": ")"
+                       + order + R"(", "order": )" + order + " }");
     }
-    writeFile("test.json", widgets);
-    Model model;
-    QVector<int> rows;
-    for (const QString &icon : column(model, EventsWidgetsModel::IconRole)) {
-        rows.append(icon.toInt());
-    }
-    QTEST(rows, "rows");
+    loadModel(widgets.join(", "));
+    QTEST(column(Model::IconRole).join(QLatin1Char(' ')), "rows");
 
     // A later widget goes behind those of its own order, too.
-    writeFile("test.json", widgets + R"(, { "path": "late", "order": 3 })");
-    model.directoryChanged();
-    if (orders == QVector<int>{1, 3, 7}) {
-        QCOMPARE(paths(model).indexOf(QStringLiteral("late")), 2);
-    }
+    const int last = orders.split(QLatin1Char(' ')).last().toInt();
+    write("more.json"_s, R"({ "path": "late", "order": )" + QByteArray::number(last) + " }");
+    m_model->directoryChanged();
+    const QStringList paths = column(Model::PathRole);
+    QVERIFY(paths.indexOf("late"_s) > paths.indexOf(QString::number(widgets.size() - 1)));
 }
 
 void TestEventsWidgetsModel::repeatedPathInOneFile()
 {
-    writeFile("test.json",
-              R"({ "path": "a", "title": "1", "order": 5 }, { "path": "b", "order": 6 },
-                 { "path": "a", "title": "2", "order": 7 })");
-    Model model(false);
-    QSignalSpy inserted(&model, &Model::rowsInserted);
-    QSignalSpy changed(&model, &Model::dataChanged);
-    model.componentComplete();
-    QCOMPARE(paths(model), (QStringList{a, b}));
-    QCOMPARE(model.data(model.index(0), EventsWidgetsModel::TitleRole).toString(),
-             QStringLiteral("2"));
-    QCOMPARE(inserted.size(), 2);
-    QCOMPARE(changed.size(), 1);
+    write("test.json"_s, R"({ "path": "a", "title": "1", "order": 5 }, { "path": "b", "order": 6 },
+                            { "path": "a", "title": "2", "order": 7 })");
+    makeModel();
+    m_model->componentComplete();
+    QCOMPARE(rows(), "a b"_s);
+    QCOMPARE(column(Model::TitleRole).first(), "2"_s);
+    QCOMPARE(events(), "inserted 0, inserted 1, changed 0"_s);
     // Every scan does the same: the row becomes the first widget and then the second again.
-    model.directoryChanged();
-    QCOMPARE(changed.size(), 3);
-    QCOMPARE(model.data(model.index(0), EventsWidgetsModel::TitleRole).toString(),
-             QStringLiteral("2"));
+    m_model->directoryChanged();
+    QCOMPARE(column(Model::TitleRole).first(), "2"_s);
+    QCOMPARE(events(), "changed 0, changed 0"_s);
 }
 
 void TestEventsWidgetsModel::repeatedPathInTwoFiles()
 {
-    writeFile("1.json", R"({ "path": "a", "title": "1" })");
-    writeFile("2.json", R"({ "path": "a", "title": "2" })");
-    Model model;
-    QCOMPARE(model.rowCount(), 1);
-
+    write("1.json"_s, R"({ "path": "a", "title": "1" })");
+    write("2.json"_s, R"({ "path": "a", "title": "2" })");
+    loadModel();
     // The file that was read last defines the row. Without it, the other one does.
-    const QString title = model.data(model.index(0), EventsWidgetsModel::TitleRole).toString();
-    Files::remove(pathOf((title + QStringLiteral(".json")).toLatin1().constData()));
-    model.directoryChanged();
-    QCOMPARE(model.rowCount(), 1);
-    QVERIFY(model.data(model.index(0), EventsWidgetsModel::TitleRole).toString() != title);
-}
-
-void TestEventsWidgetsModel::followsFiles()
-{
-    const Model model;
-    QCOMPARE(model.rowCount(), 0);
-    writeFile("test.json", R"({ "path": "a", "title": "1" })");
-    QTRY_COMPARE(paths(model), QStringList{a});
-    writeFile("test.json", R"({ "path": "a", "title": "2" })");
-    QTRY_COMPARE(column(model, EventsWidgetsModel::TitleRole), QStringList{QStringLiteral("2")});
-    writeFile("test.json", R"({ "path": "b" })");
-    QTRY_COMPARE(paths(model), QStringList{b});
-    writeFile("another.json", R"({ "path": "a" })");
-    QTRY_COMPARE(paths(model), (QStringList{b, a}));
-    Files::remove(pathOf("test.json"));
-    QTRY_COMPARE(paths(model), QStringList{a});
-    QVERIFY(QFile::rename(pathOf("another.json"), pathOf("another.bak")));
-    QTRY_COMPARE(model.rowCount(), 0);
+    QCOMPARE(rows(), "a"_s);
+    const QString title = column(Model::TitleRole).first();
+    Files::remove(pathOf(title + ".json"_s));
+    m_model->directoryChanged();
+    QCOMPARE(rows(), "a"_s);
+    QVERIFY(column(Model::TitleRole).first() != title);
 }
 
 void TestEventsWidgetsModel::changedWidgetKeepsItsRow()
 {
-    writeFile("test.json", R"({ "path": "a", "order": 3 }, { "path": "b", "order": 5 })");
-    Model model;
-    QSignalSpy moved(&model, &Model::rowsMoved);
-    QSignalSpy inserted(&model, &Model::rowsInserted);
-    QSignalSpy changed(&model, &Model::dataChanged);
-    writeFile("test.json", R"({ "path": "a", "order": 3 }, { "path": "b", "order": 1 })");
-    model.directoryChanged();
-    QCOMPARE(paths(model), (QStringList{a, b}));
-    QCOMPARE(moved.size() + inserted.size(), 0);
-    QCOMPARE(changed.size(), 1);
-    QCOMPARE(changed.first().at(0).toModelIndex(), model.index(1));
-    QCOMPARE(changed.first().at(1).toModelIndex(), model.index(1));
-    QCOMPARE(changed.first().at(2).value<QVector<int>>(), QVector<int>());
+    write("1.json"_s, R"({ "path": "a", "order": 3 })");
+    write("2.json"_s, R"({ "path": "b", "order": 5 })");
+    loadModel();
+    write("2.json"_s, R"({ "path": "b", "order": 1 })");
+    m_model->directoryChanged();
+    QCOMPARE(rows(), "a b"_s);
+    QCOMPARE(events(), "changed 1"_s);
 
-    // The new order counts for the places of later widgets.
-    writeFile("more.json", R"({ "path": "c", "order": 2 })");
-    model.directoryChanged();
-    QCOMPARE(paths(model), (QStringList{c, a, b}));
-}
-
-void TestEventsWidgetsModel::placesAnewWhatComesAgain()
-{
-    writeFile("1.json", R"({ "path": "a", "order": 3 })");
-    Model model;
-    writeFile("2.json", R"({ "path": "b", "order": 5 })");
-    model.directoryChanged();
-    Files::remove(pathOf("2.json"));
-    model.directoryChanged();
-    QCOMPARE(paths(model), QStringList{a});
-    writeFile("2.json", R"({ "path": "b", "order": 1 })");
-    model.directoryChanged();
-    QCOMPARE(paths(model), (QStringList{b, a}));
+    // The new order counts for the places of later widgets, and when the widget comes again.
+    write("2.json"_s, R"({ "path": "b", "order": 9 }, { "path": "c", "order": 6 })");
+    m_model->directoryChanged();
+    QCOMPARE(rows(), "a c b"_s);
+    Files::remove(pathOf("2.json"_s));
+    m_model->directoryChanged();
+    QCOMPARE(rows(), "a"_s);
+    write("2.json"_s, R"({ "path": "b", "order": 1 })");
+    m_model->directoryChanged();
+    QCOMPARE(rows(), "b a"_s);
 }
 
 void TestEventsWidgetsModel::unchangedWidgetsAreNotAnnounced()
 {
-    writeFile("test.json", R"({ "path": "a" }, { "path": "b" })");
-    Model model;
-    QSignalSpy changed(&model, &Model::dataChanged);
-    QSignalSpy inserted(&model, &Model::rowsInserted);
-    QSignalSpy removed(&model, &Model::rowsRemoved);
-    model.directoryChanged();
-    model.enabledWidgetsChanged();
-    model.updateAvailable();
-    QCOMPARE(changed.size() + inserted.size() + removed.size(), 0);
-}
-
-void TestEventsWidgetsModel::widgetThatMovesToAnotherFile()
-{
-    writeFile("1.json", R"({ "path": "a" })");
-    Model model;
-    QSignalSpy changed(&model, &Model::dataChanged);
-    QSignalSpy removed(&model, &Model::rowsRemoved);
-    Files::remove(pathOf("1.json"));
-    writeFile("2.json", R"({ "path": "a" })", "maps");
-    model.directoryChanged();
-    QCOMPARE(paths(model), QStringList{a});
-    QCOMPARE(changed.size() + removed.size(), 0);
+    loadModel(R"({ "path": "a" }, { "path": "b" })");
+    m_model->directoryChanged();
+    m_model->enabledWidgetsChanged();
+    m_model->updateAvailable();
+    QCOMPARE(events(), QString());
+    // Nor are those that move to another file, with another catalog.
+    Files::remove(pathOf("test.json"_s));
+    write("other.json"_s, R"({ "path": "a" }, { "path": "b" })", "maps");
+    m_model->directoryChanged();
+    QCOMPARE(events(), QString());
+    QCOMPARE(rows(), "a b"_s);
 }
 
 void TestEventsWidgetsModel::removesOneRowAtATime()
 {
-    writeFile("1.json", R"({ "path": "a", "order": 1 }, { "path": "c", "order": 3 },
-                           { "path": "d", "order": 4 })");
-    writeFile("2.json", R"({ "path": "b", "order": 2 })");
-    Model model;
-    QSignalSpy removed(&model, &Model::rowsRemoved);
-    Files::remove(pathOf("1.json"));
-    model.directoryChanged();
-    QCOMPARE(paths(model), QStringList{b});
-    QCOMPARE(removed.size(), 3);
-    for (int i = 0; i < removed.size(); ++i) {
-        const int row = i == 0 ? 0 : 1;
-        QCOMPARE(removed.at(i).at(0).toModelIndex(), QModelIndex());
-        QCOMPARE(removed.at(i).at(1).toInt(), row);
-        QCOMPARE(removed.at(i).at(2).toInt(), row);
-    }
+    write("1.json"_s, R"({ "path": "a", "order": 1 }, { "path": "c", "order": 3 },
+                         { "path": "d", "order": 4 })");
+    write("2.json"_s, R"({ "path": "b", "order": 2 })");
+    loadModel();
+    Files::remove(pathOf("1.json"_s));
+    m_model->directoryChanged();
+    QCOMPARE(rows(), "b"_s);
+    QCOMPARE(events(), "removed 0, removed 1, removed 1"_s);
 }
 
-void TestEventsWidgetsModel::directoryMadeLater()
+void TestEventsWidgetsModel::readsHalfWrittenFiles()
 {
-    Files::remove(QStringLiteral("/usr/share/glimmera"));
-    const Model model;
-    writeFile("test.json", R"({ "path": "a" })");
-    QTRY_COMPARE(paths(model), QStringList{a});
-    writeFile("more.json", R"({ "path": "b" })");
-    QTRY_COMPARE(paths(model), (QStringList{a, b}));
-}
-
-void TestEventsWidgetsModel::directoryMadeAgain()
-{
-    writeFile("test.json", R"({ "path": "a" })");
-    const Model model;
-    Files::remove(directory);
-    QTRY_COMPARE(model.rowCount(), 0);
-    writeFile("test.json", R"({ "path": "b" })");
-    QTRY_COMPARE(paths(model), QStringList{b});
-
-    // Files that are rewritten in place are noticed in the new directory, too.
-    QFile file(pathOf("test.json"));
-    QVERIFY(file.open(QIODevice::WriteOnly));
-    file.write(R"({ "widgets": [ { "path": "c" } ] })");
-    file.close();
-    QTRY_COMPARE(paths(model), QStringList{c});
-}
-
-void TestEventsWidgetsModel::rewrittenInPlace()
-{
-    writeFile("test.json", R"({ "path": "a" })");
-    writeFile("other.json", R"({ "path": "b" })");
-    Model model;
-
-    QFile file(pathOf("test.json"));
+    const auto invalid = [](const QFile &file) {
+        return QStringList("warning [default] Invalid Events Widget \"%1\""_s.arg(file.fileName()));
+    };
+    write("other.json"_s, R"({ "path": "b" })");
+    loadModel(R"({ "path": "a" })");
+    QFile file(pathOf("test.json"_s));
     QVERIFY(file.open(QIODevice::WriteOnly));
     file.write(R"({ "widgets": [ )");
     file.flush();
     // A scan of the half-written file finds no definition.
-    model.directoryChanged();
-    QCOMPARE(paths(model), QStringList{b});
-    QCOMPARE(m_log->takeTexts(),
-             QStringList{QStringLiteral("Invalid Events Widget \"%1\"").arg(file.fileName())});
+    m_model->directoryChanged();
+    QCOMPARE(rows(), "b"_s);
+    QCOMPARE(takeMessages(), invalid(file));
     file.write(R"({ "path": "c" } ] })");
     file.close();
-    QTRY_COMPARE(paths(model), (QStringList{b, c}));
+    QTRY_COMPARE(rows(), "b c"_s);
 
     // A new file that is written in place.
-    QFile added(pathOf("added.json"));
+    QFile added(pathOf("added.json"_s));
     QVERIFY(added.open(QIODevice::WriteOnly));
-    QString report;
-    QTRY_VERIFY(!(report += m_log->takeReport()).isEmpty());
-    QCOMPARE(
-        report,
-        QStringLiteral("warning [default] Invalid Events Widget \"%1\"").arg(added.fileName()));
-    added.write(R"({ "widgets": [ { "path": "a" } ] })");
+    QTRY_COMPARE(messages(), invalid(added));
+    takeMessages();
+    added.write(fileOf(R"({ "path": "a" })"));
     added.close();
-    QTRY_COMPARE(paths(model), (QStringList{b, c, a}));
+    QTRY_COMPARE(rows(), "b c a"_s);
 }
 
 void TestEventsWidgetsModel::oneScanPerNotification()
 {
-    // Every scan warns once that this is not a definition.
-    Files::write(pathOf("bad.json"), "bad");
-    const Model model;
-    QCOMPARE(m_log->takeAll().size(), 1);
+    writeBroken();
+    loadModel();
+    QCOMPARE(takeMessages().size(), 1);
 
     // A new file that is complete before the event loop runs causes one scan.
-    QFile added(pathOf("added.json"));
+    QFile added(pathOf("added.json"_s));
     QVERIFY(added.open(QIODevice::WriteOnly));
-    added.write(R"({ "widgets": [ { "path": "a" } ] })");
+    added.write(fileOf(R"({ "path": "a" })"));
     added.close();
-    QTRY_COMPARE(paths(model), QStringList{a});
+    QTRY_COMPARE(rows(), "a"_s);
     QTest::qWait(200);
-    QCOMPARE(m_log->takeAll().size(), 1);
+    QCOMPARE(takeMessages().size(), 1);
 
     // Many writes in place.
     QVERIFY(added.open(QIODevice::WriteOnly));
@@ -582,158 +460,109 @@ void TestEventsWidgetsModel::oneScanPerNotification()
         added.flush();
         QCoreApplication::processEvents();
     }
-    added.write(R"({ "widgets": [ { "path": "b" } ] })");
+    added.write(fileOf(R"({ "path": "b" })"));
     added.close();
-    QTRY_COMPARE(paths(model), QStringList{b});
+    QTRY_COMPARE(rows(), "b"_s);
     QTest::qWait(200);
-    QCOMPARE(m_log->takeAll().size(), 1);
-}
-
-void TestEventsWidgetsModel::otherFilesAreIgnored()
-{
-    // Every scan warns once that this is not a definition.
-    Files::write(pathOf("bad.json"), "bad");
-    const Model model;
-    QCOMPARE(m_log->takeAll().size(), 1);
-    Files::write(pathOf("other.txt"), "x");
-    QFile other(pathOf("other.txt"));
-    QVERIFY(other.open(QIODevice::Append));
-    other.write("more");
-    other.close();
-    QVERIFY(other.remove());
-    QTest::qWait(200);
-    QCOMPARE(m_log->takeAll().size(), 0);
+    QCOMPARE(takeMessages().size(), 1);
 }
 
 void TestEventsWidgetsModel::translatesTitleAndDescription()
 {
-    writeFile("test.json",
-              R"({ "path": "a", "title": "plain", "translation_id": "maps-title",
+    loadModel(R"({ "path": "a", "title": "plain", "translation_id": "maps-title",
                    "description_id": "maps-english" },
                  { "path": "b", "title": "plain", "translation_id": "maps-missing",
                    "description_id": "maps-missing" },
                  { "path": "c", "title": "maps-title" },
                  { "path": "d", "translation_id": "maps-missing" })",
               "maps");
-    const Model model;
-    QCOMPARE(column(model, EventsWidgetsModel::TitleRole),
-             (QStringList{QStringLiteral("Kartat"), QStringLiteral("plain"),
-                          QStringLiteral("maps-title"), QString()}));
-    QCOMPARE(column(model, EventsWidgetsModel::DescriptionRole),
-             (QStringList{QStringLiteral("Maps, English only"), QString(), QString(), QString()}));
+    QCOMPARE(column(Model::TitleRole),
+             (QStringList{"Kartat"_s, "plain"_s, "maps-title"_s, QString()}));
+    QCOMPARE(column(Model::DescriptionRole),
+             (QStringList{"Maps, English only"_s, QString(), QString(), QString()}));
 }
 
 void TestEventsWidgetsModel::looksTextsUpOnEveryCall()
 {
-    writeFile("test.json",
-              R"({ "path": "a", "title": "plain", "translation_id": "maps-title",
+    loadModel(R"({ "path": "a", "title": "plain", "translation_id": "maps-title",
                    "description_id": "maps-title" })");
-    const Model model;
-    const auto text = [&model](int role) { return column(model, role).first(); };
-    QCOMPARE(text(EventsWidgetsModel::TitleRole), QStringLiteral("plain"));
+    const auto texts = [this] { return column(Model::TitleRole) + column(Model::DescriptionRole); };
+    QCOMPARE(texts(), (QStringList{"plain"_s, QString()}));
     {
         QTranslator translator;
-        QVERIFY(
-            translator.load(QStringLiteral("maps-fi"), QStringLiteral("/usr/share/translations")));
+        QVERIFY(translator.load("maps-fi"_s, "/usr/share/translations"_s));
         QCoreApplication::installTranslator(&translator);
-        QCOMPARE(text(EventsWidgetsModel::TitleRole), QStringLiteral("Kartat"));
-        QCOMPARE(text(EventsWidgetsModel::DescriptionRole), QStringLiteral("Kartat"));
+        QCOMPARE(texts(), "Kartat Kartat"_words);
     }
-    QCOMPARE(text(EventsWidgetsModel::TitleRole), QStringLiteral("plain"));
-    QCOMPARE(text(EventsWidgetsModel::DescriptionRole), QString());
+    QCOMPARE(texts(), (QStringList{"plain"_s, QString()}));
 }
 
 void TestEventsWidgetsModel::catalogWithoutWidgets()
 {
-    writeFile("test.json", "", "maps");
-    Files::write(pathOf("array.json"), R"([ { "translation_catalog": "atlas" } ])");
-    const Model model;
-    QCOMPARE(model.findChildren<QTranslator *>().size(), 2);
-    QCOMPARE(qtTrId("maps-title"), QStringLiteral("Kartat"));
-    QCOMPARE(m_log->takeAll().size(), 1);
+    Files::write(pathOf("array.json"_s), R"([ { "translation_catalog": "atlas" } ])");
+    loadModel("", "maps");
+    QCOMPARE(m_model->findChildren<QTranslator *>().size(), 2);
+    QCOMPARE(qtTrId("maps-title"), "Kartat"_s);
+    QCOMPARE(takeMessages().size(), 1);
 }
 
 void TestEventsWidgetsModel::catalogsAreOnlyEverAdded()
 {
-    writeFile("test.json", R"({ "path": "a" })", "maps");
-    Model model;
-    QCOMPARE(qtTrId("maps-title"), QStringLiteral("Kartat"));
+    loadModel(R"({ "path": "a" })", "maps");
+    QCOMPARE(qtTrId("maps-title"), "Kartat"_s);
+    const auto hasBoth = [this] {
+        return qtTrId("maps-title") == "Atlas"_s && qtTrId("maps-english") == "Maps, English only"_s
+            && m_model->findChildren<QTranslator *>().size() == 4;
+    };
     // Another catalog is added; the first one stays and is not loaded again.
-    writeFile("test.json", R"({ "path": "a" })", "atlas");
-    model.directoryChanged();
-    QCOMPARE(qtTrId("maps-title"), QStringLiteral("Atlas"));
-    QCOMPARE(qtTrId("maps-english"), QStringLiteral("Maps, English only"));
-    QCOMPARE(model.findChildren<QTranslator *>().size(), 4);
-
-    Files::remove(pathOf("test.json"));
-    model.directoryChanged();
-    QCOMPARE(model.rowCount(), 0);
-    QCOMPARE(qtTrId("maps-title"), QStringLiteral("Atlas"));
-    QCOMPARE(qtTrId("maps-english"), QStringLiteral("Maps, English only"));
-
-    writeFile("again.json", R"({ "path": "a" })", "maps");
-    model.directoryChanged();
-    QCOMPARE(qtTrId("maps-title"), QStringLiteral("Atlas"));
-    QCOMPARE(model.findChildren<QTranslator *>().size(), 4);
+    write("test.json"_s, R"({ "path": "a" })", "atlas");
+    m_model->directoryChanged();
+    QVERIFY(hasBoth());
+    Files::remove(pathOf("test.json"_s));
+    m_model->directoryChanged();
+    QCOMPARE(m_model->rowCount(), 0);
+    QVERIFY(hasBoth());
+    write("again.json"_s, R"({ "path": "a" })", "maps");
+    m_model->directoryChanged();
+    QVERIFY(hasBoth());
 }
 
-void TestEventsWidgetsModel::catalogsGoWithTheModel()
+void TestEventsWidgetsModel::modelsShareNoCatalogs()
 {
-    writeFile("test.json", R"({ "path": "a" })", "maps");
+    loadModel(R"({ "path": "a" })", "maps");
     {
-        const Model model;
-        QCOMPARE(qtTrId("maps-title"), QStringLiteral("Kartat"));
+        Model other;
+        other.componentComplete();
+        QCOMPARE(other.findChildren<QTranslator *>().size(), 2);
     }
-    QCOMPARE(qtTrId("maps-title"), QStringLiteral("maps-title"));
+    QCOMPARE(m_model->findChildren<QTranslator *>().size(), 2);
+    QCOMPARE(qtTrId("maps-title"), "Kartat"_s);
 }
 
 void TestEventsWidgetsModel::defaultsWhileNothingIsStored()
 {
-    writeFile("test.json",
-              R"({ "path": "a" }, { "path": "b", "default_enabled": true },
+    loadModel(R"({ "path": "a" }, { "path": "b", "default_enabled": true },
                  { "path": "c", "default_enabled": false })");
-    Model model;
-    const QStringList enabled{QStringLiteral("false"), QStringLiteral("true"),
-                              QStringLiteral("false")};
-    QCOMPARE(column(model, EventsWidgetsModel::EnabledRole), enabled);
+    QCOMPARE(enabled(), "false true false"_words);
     // Loading writes nothing, and reading again changes nothing.
-    model.enabledWidgetsChanged();
-    model.directoryChanged();
-    QCOMPARE(column(model, EventsWidgetsModel::EnabledRole), enabled);
+    m_model->enabledWidgetsChanged();
+    m_model->directoryChanged();
+    QCOMPARE(enabled(), "false true false"_words);
     QVERIFY(!m_key->value().isValid());
 
-    writeFile("more.json", R"({ "path": "d", "default_enabled": true })");
-    model.directoryChanged();
-    QCOMPARE(column(model, EventsWidgetsModel::EnabledRole),
-             enabled + QStringList{QStringLiteral("true")});
-}
-
-void TestEventsWidgetsModel::emptyListEnablesNothing()
-{
-    m_key->set(QStringList());
-    QVERIFY(m_key->value().isValid());
-    writeFile("test.json", R"({ "path": "a", "default_enabled": true })");
-    Model model;
-    QCOMPARE(column(model, EventsWidgetsModel::EnabledRole), QStringList{QStringLiteral("false")});
-
-    // An empty list can also be the result of a choice.
-    model.enableWidget(a);
-    QCOMPARE(storedList(), QStringList{a});
-    model.disableWidget(a);
-    QVERIFY(m_key->value().isValid());
-    QCOMPARE(storedList(), QStringList());
-    QCOMPARE(column(model, EventsWidgetsModel::EnabledRole), QStringList{QStringLiteral("false")});
+    write("more.json"_s, R"({ "path": "d", "default_enabled": true })");
+    m_model->directoryChanged();
+    QCOMPARE(enabled(), "false true false true"_words);
 }
 
 void TestEventsWidgetsModel::valuesOfAnyType_data()
 {
     QTest::addColumn<QStringList>("list");
-    QTest::newRow("['a', 'c']") << QStringList{a, c};
-    QTest::newRow("'a'") << QStringList{a};
-    QTest::newRow("[<'a'>, <7>, <true>]")
-        << QStringList{a, QStringLiteral("7"), QStringLiteral("true")};
-    for (const char *value :
-         {"7", "1.5", "true", "{'a': <true>}", "handle 7", "@ms nothing", "()", "@av []"}) {
+    QTest::newRow("['a', 'c']") << "a c"_words;
+    QTest::newRow("'a'") << "a"_words;
+    QTest::newRow("[<'a'>, <7>, <true>]") << "a 7 true"_words;
+    for (const char *value : {"@as []", "7", "1.5", "true", "{'a': <true>}", "handle 7",
+                              "@ms nothing", "()", "@av []"}) {
         QTest::newRow(value) << QStringList();
     }
 }
@@ -742,379 +571,308 @@ void TestEventsWidgetsModel::valuesOfAnyType()
 {
     QFETCH(QStringList, list);
     DconfTool::waitUntilStored();
-    DconfTool::write(keyName, QTest::currentDataTag());
+    DconfTool::write(keyName, QByteArray(QTest::currentDataTag()));
     QTRY_VERIFY(m_key->value().isValid());
     // Any stored value is a choice: the defaults do not count.
-    writeFile("test.json",
-              R"({ "path": "a" }, { "path": "b", "default_enabled": true }, { "path": "c" })");
-    Model model;
-    QStringList enabled;
+    loadModel(R"({ "path": "a" }, { "path": "b", "default_enabled": true }, { "path": "c" })");
+    QStringList expected;
     for (const QString &path : {a, b, c}) {
-        enabled.append(QVariant(list.contains(path)).toString());
+        expected.append(QVariant(list.contains(path)).toString());
     }
-    QCOMPARE(column(model, EventsWidgetsModel::EnabledRole), enabled);
-    model.enableWidget(b);
-    QCOMPARE(storedList(), list + QStringList{b});
+    QCOMPARE(enabled(), expected);
+    m_model->enableWidget(b);
+    QCOMPARE(m_key->value().toStringList(), list + QStringList{b});
 }
 
 void TestEventsWidgetsModel::firstChoiceEnablesAllOthers()
 {
-    writeFile("test.json",
-              R"({ "path": "a", "default_enabled": false },
+    loadModel(R"({ "path": "a", "default_enabled": false },
                  { "path": "b", "default_enabled": true },
                  { "path": "c", "default_enabled": true })");
-    Model model;
-    QSignalSpy changed(&model, &Model::dataChanged);
-    model.disableWidget(b);
-    QTRY_COMPARE(
-        column(model, EventsWidgetsModel::EnabledRole),
-        (QStringList{QStringLiteral("true"), QStringLiteral("false"), QStringLiteral("true")}));
-    QCOMPARE(storedList(), (QStringList{a, c}));
-    // Only the rows that changed, one by one.
-    QCOMPARE(changed.size(), 2);
-    for (int i = 0; i < 2; ++i) {
-        QCOMPARE(changed.at(i).at(0).toModelIndex(), model.index(i));
-        QCOMPARE(changed.at(i).at(1).toModelIndex(), model.index(i));
-        QCOMPARE(changed.at(i).at(2).value<QVector<int>>(), QVector<int>());
-    }
+    m_model->disableWidget(b);
+    QTRY_COMPARE(enabled(), "true false true"_words);
+    QCOMPARE(storedList(), "a c"_s);
+    QCOMPARE(events(), "changed 0, changed 1"_s);
 
     // A later widget is not in the list of the user.
-    writeFile("more.json", R"({ "path": "d", "default_enabled": true })");
-    model.directoryChanged();
-    QCOMPARE(column(model, EventsWidgetsModel::EnabledRole).last(), QStringLiteral("false"));
+    write("more.json"_s, R"({ "path": "d", "default_enabled": true })");
+    m_model->directoryChanged();
+    QCOMPARE(enabled(), "true false true false"_words);
 }
 
-void TestEventsWidgetsModel::enablesAgain()
+void TestEventsWidgetsModel::choices_data()
 {
-    m_key->set(QStringList{a});
-    writeFile("test.json", R"({ "path": "a" })");
-    Model model;
-    QSignalSpy changed(&model, &Model::dataChanged);
-    model.enableWidget(a);
-    QCOMPARE(storedList(), (QStringList{a, a}));
-    QCOMPARE(changed.size(), 0);
-    model.disableWidget(a);
-    QCOMPARE(storedList(), QStringList());
-    QTRY_COMPARE(changed.size(), 1);
+    QTest::addColumn<QString>("before");
+    QTest::addColumn<QByteArray>("method");
+    QTest::addColumn<QString>("path");
+    QTest::addColumn<QString>("list");
+    QTest::addColumn<QString>("enabled");
+    const QByteArray enable("enableWidget");
+    const QByteArray disable("disableWidget");
+    QTest::newRow("enable") << "b" << enable << "a"
+                            << "b a"
+                            << "true true";
+    QTest::newRow("enable again") << "a" << enable << "a"
+                                  << "a a"
+                                  << "true false";
+    QTest::newRow("enable, in upper case") << "b" << enable << "A"
+                                           << "b A"
+                                           << "false true";
+    QTest::newRow("enable what is unknown") << "gone" << enable << "x"
+                                            << "gone x"
+                                            << "false false";
+    QTest::newRow("disable the last one") << "a" << disable << "a"
+                                          << ""
+                                          << "false false";
+    QTest::newRow("disable every entry") << "a b a c" << disable << "a"
+                                         << "b c"
+                                         << "false true";
+    QTest::newRow("disable, in upper case") << "a b" << disable << "B"
+                                            << "a b"
+                                            << "true true";
 }
 
-void TestEventsWidgetsModel::disablesAll()
+// Of two widgets, a and b, which are enabled by default.
+void TestEventsWidgetsModel::choices()
 {
-    m_key->set(QStringList{a, b, a, c});
-    writeFile("test.json", R"({ "path": "a" }, { "path": "b" })");
-    Model model;
-    model.disableWidget(a);
-    QCOMPARE(storedList(), (QStringList{b, c}));
-    // Paths are case-sensitive.
-    model.disableWidget(QStringLiteral("B"));
-    QCOMPARE(storedList(), (QStringList{b, c}));
-    model.enableWidget(QStringLiteral("A"));
-    QTRY_COMPARE(column(model, EventsWidgetsModel::EnabledRole),
-                 (QStringList{QStringLiteral("false"), QStringLiteral("true")}));
+    QFETCH(QString, before);
+    QFETCH(QByteArray, method);
+    QFETCH(QString, path);
+    m_key->set(before.split(QLatin1Char(' ')));
+    loadModel(R"({ "path": "a", "default_enabled": true },
+                 { "path": "b", "default_enabled": true })");
+    QVERIFY(QMetaObject::invokeMethod(m_model.get(), method.constData(), Q_ARG(QString, path)));
+    QVERIFY(m_key->value().isValid());
+    QTEST(storedList(), "list");
+    QTEST(enabled().join(QLatin1Char(' ')), "enabled");
 }
 
-void TestEventsWidgetsModel::unknownPaths()
+void TestEventsWidgetsModel::choiceOfALaterWidget()
 {
-    m_key->set(QStringList{QStringLiteral("gone")});
-    Model model;
-    model.enableWidget(QStringLiteral("later"));
-    model.enableWidget(QString());
-    QCOMPARE(storedList(),
-             (QStringList{QStringLiteral("gone"), QStringLiteral("later"), QString()}));
-    writeFile("test.json", R"({ "path": "later" })");
-    QTRY_COMPARE(column(model, EventsWidgetsModel::EnabledRole),
-                 QStringList{QStringLiteral("true")});
+    m_key->set(QStringList{"gone"_s});
+    loadModel();
+    m_model->enableWidget("later"_s);
+    m_model->enableWidget(QString());
+    QCOMPARE(m_key->value().toStringList(), (QStringList{"gone"_s, "later"_s, QString()}));
+    write("test.json"_s, R"({ "path": "later" })");
+    QTRY_COMPARE(enabled(), "true"_words);
 }
 
 void TestEventsWidgetsModel::listInReadingOrderAfterAScan()
 {
-    writeFile("test.json",
-              R"({ "path": "b", "order": 2 }, { "path": "a", "order": 1 }, { "path": "b" })");
-    Model model;
-    QCOMPARE(paths(model), (QStringList{a, b}));
-    model.directoryChanged();
-    model.enableWidget(c);
-    QCOMPARE(storedList(), (QStringList{b, a, b, c}));
+    loadModel(R"({ "path": "b", "order": 2 }, { "path": "a", "order": 1 }, { "path": "b" })");
+    QCOMPARE(rows(), "a b"_s);
+    m_model->directoryChanged();
+    m_model->enableWidget(c);
+    QCOMPARE(storedList(), "b a b c"_s);
 }
 
 void TestEventsWidgetsModel::listInRowOrderAfterTheKeyChanged()
 {
-    writeFile("test.json",
-              R"({ "path": "b", "order": 2 }, { "path": "a", "order": 1 }, { "path": "b" })");
-    Model model;
-    model.enabledWidgetsChanged();
-    model.enableWidget(c);
-    QCOMPARE(storedList(), (QStringList{a, b, c}));
+    loadModel(R"({ "path": "b", "order": 2 }, { "path": "a", "order": 1 }, { "path": "b" })");
+    m_model->enabledWidgetsChanged();
+    m_model->enableWidget(c);
+    QCOMPARE(storedList(), "a b c"_s);
 }
 
 void TestEventsWidgetsModel::choiceBeforeCompletion()
 {
     m_key->set(QStringList{a, b});
-    writeFile("test.json", R"({ "path": "a" }, { "path": "b" }, { "path": "c" })");
-    Model model(false);
-    model.enableWidget(c);
-    QCOMPARE(storedList(), (QStringList{a, b, c}));
-    model.disableWidget(a);
-    QCOMPARE(storedList(), (QStringList{b, c}));
-    model.componentComplete();
-    QCOMPARE(
-        column(model, EventsWidgetsModel::EnabledRole),
-        (QStringList{QStringLiteral("false"), QStringLiteral("true"), QStringLiteral("true")}));
+    write("test.json"_s, R"({ "path": "a" }, { "path": "b" }, { "path": "c" })");
+    makeModel();
+    m_model->enableWidget(c);
+    QCOMPARE(storedList(), "a b c"_s);
+    m_model->disableWidget(a);
+    QCOMPARE(storedList(), "b c"_s);
+    m_model->componentComplete();
+    QCOMPARE(enabled(), "false true true"_words);
 }
 
 void TestEventsWidgetsModel::firstChoiceBeforeCompletion()
 {
     // No other widget is known yet, so none is stored with it.
-    Model model(false);
-    model.enableWidget(a);
-    QCOMPARE(storedList(), QStringList{a});
+    makeModel();
+    m_model->enableWidget(a);
+    QCOMPARE(storedList(), "a"_s);
 }
 
 void TestEventsWidgetsModel::followsTheKey()
 {
-    writeFile("test.json", R"({ "path": "a" }, { "path": "b", "default_enabled": true })");
-    const Model model;
-    const auto enabled = [&model] { return column(model, EventsWidgetsModel::EnabledRole); };
-    const QString yes = QStringLiteral("true");
-    const QString no = QStringLiteral("false");
-    QCOMPARE(enabled(), (QStringList{no, yes}));
+    loadModel(R"({ "path": "a" }, { "path": "b", "default_enabled": true })");
+    QCOMPARE(enabled(), "false true"_words);
     m_key->set(QStringList{a});
-    QTRY_COMPARE(enabled(), (QStringList{yes, no}));
+    QTRY_COMPARE(enabled(), "true false"_words);
 
     // Another process changes the key.
     DconfTool::waitUntilStored();
-    DconfTool::write(keyName, "['a', 'b']");
-    QTRY_COMPARE(enabled(), (QStringList{yes, yes}));
+    DconfTool::write(keyName, "a b"_words);
+    QTRY_COMPARE(enabled(), "true true"_words);
     DconfTool::reset(keyName);
-    QTRY_COMPARE(enabled(), (QStringList{no, yes}));
+    QTRY_COMPARE(enabled(), "false true"_words);
 }
 
 void TestEventsWidgetsModel::updatesAvailability()
 {
-    const QString needed = QStringLiteral("/usr/share/glimmera/needed");
-    Files::remove(needed);
-    writeFile("test.json",
-              R"({ "path": "a", "available_path": "/usr/share/glimmera/needed" },
+    loadModel(R"({ "path": "a", "available_path": "/usr/share/glimmera/needed" },
                  { "path": "b" }, { "path": "c", "available_path": "/usr/share/glimmera" })");
-    Model model;
-    const auto available = [&model] { return column(model, EventsWidgetsModel::AvailableRole); };
-    const QString yes = QStringLiteral("true");
-    const QString no = QStringLiteral("false");
+    const auto available = [this] { return column(Model::AvailableRole); };
     // An unavailable widget is listed, too.
-    QCOMPARE(available(), (QStringList{no, yes, yes}));
-
-    QSignalSpy changed(&model, &Model::dataChanged);
+    QCOMPARE(available(), "false true true"_words);
     Files::write(needed, "");
-    QCOMPARE(available(), (QStringList{no, yes, yes}));
-    model.updateAvailable();
-    QCOMPARE(available(), (QStringList{yes, yes, yes}));
-    QCOMPARE(changed.size(), 1);
-    QCOMPARE(changed.first().at(0).toModelIndex(), model.index(0));
-    QCOMPARE(changed.first().at(1).toModelIndex(), model.index(0));
-    QCOMPARE(changed.first().at(2).value<QVector<int>>(), QVector<int>{261});
-
+    QCOMPARE(available(), "false true true"_words);
+    m_model->updateAvailable();
+    QCOMPARE(available(), "true true true"_words);
+    QCOMPARE(events(), "changed 0 (261)"_s);
     Files::remove(needed);
-    model.updateAvailable();
-    QCOMPARE(available(), (QStringList{no, yes, yes}));
-    QCOMPARE(changed.size(), 2);
+    m_model->updateAvailable();
+    QCOMPARE(available(), "false true true"_words);
+    QCOMPARE(events(), "changed 0 (261)"_s);
 
     // A scan checks this too, and reports that the whole widget changed.
     Files::write(needed, "");
-    model.directoryChanged();
-    QCOMPARE(available(), (QStringList{yes, yes, yes}));
-    QCOMPARE(changed.last().at(2).value<QVector<int>>(), QVector<int>());
-    Files::remove(needed);
+    m_model->directoryChanged();
+    QCOMPARE(available(), "true true true"_words);
+    QCOMPARE(events(), "changed 0"_s);
 }
 
 void TestEventsWidgetsModel::handlersMayCallBack()
 {
-    writeFile("test.json", R"({ "path": "a", "order": 1 }, { "path": "b", "order": 2 })");
-    Model model;
+    const QByteArray both = R"({ "path": "a", "order": 1 }, { "path": "b", "order": 2 })";
+    loadModel(both);
+    Model *model = m_model.get();
     int answers = 0;
     const auto answer = [&] {
         // Otherwise the answers would never end.
         if (++answers > 20) {
             return;
         }
-        writeFile("test.json",
-                  answers % 2 == 0 ? R"({ "path": "a", "order": 1 }, { "path": "b", "order": 2 })"
-                                   : R"({ "path": "c", "order": 1 }, { "path": "b", "order": 0 })");
-        model.directoryChanged();
-        model.enabledWidgetsChanged();
-        model.updateAvailable();
-        model.disableWidget(b);
-        model.enableWidget(a);
+        write("test.json"_s,
+              answers % 2 == 0 ? both
+                               : R"({ "path": "c", "order": 1 }, { "path": "b", "order": 0 })");
+        model->directoryChanged();
+        model->enabledWidgetsChanged();
+        model->updateAvailable();
+        model->disableWidget(b);
+        model->enableWidget(a);
     };
     const QObject context;
-    connect(&model, &Model::rowsAboutToBeInserted, &context, answer);
-    connect(&model, &Model::rowsInserted, &context, answer);
-    connect(&model, &Model::rowsAboutToBeRemoved, &context, answer);
-    connect(&model, &Model::rowsRemoved, &context, answer);
-    connect(&model, &Model::dataChanged, &context, answer);
+    connect(model, &Model::rowsAboutToBeInserted, &context, answer);
+    connect(model, &Model::rowsInserted, &context, answer);
+    connect(model, &Model::rowsAboutToBeRemoved, &context, answer);
+    connect(model, &Model::rowsRemoved, &context, answer);
+    connect(model, &Model::dataChanged, &context, answer);
 
     while (answers <= 20) {
         const int before = answers;
-        writeFile("test.json",
-                  paths(model).contains(c) ? R"({ "path": "a", "order": 0 })"
-                                           : R"({ "path": "c", "order": 0 })");
+        write("test.json"_s,
+              rows().contains(c) ? R"({ "path": "a", "order": 0 })"
+                                 : R"({ "path": "c", "order": 0 })");
         QTRY_VERIFY(answers > before);
     }
     // Finally the model agrees with the files and the key.
-    Files::remove(pathOf("test.json"));
-    QTRY_COMPARE(model.rowCount(), 0);
-    writeFile("test.json", R"({ "path": "a", "order": 1 }, { "path": "b", "order": 2 })");
-    QTRY_COMPARE(paths(model), (QStringList{a, b}));
+    Files::remove(pathOf("test.json"_s));
+    QTRY_COMPARE(model->rowCount(), 0);
+    write("test.json"_s, both);
+    QTRY_COMPARE(rows(), "a b"_s);
     m_key->set(QStringList{a});
-    QTRY_COMPARE(column(model, EventsWidgetsModel::EnabledRole),
-                 (QStringList{QStringLiteral("true"), QStringLiteral("false")}));
+    QTRY_COMPARE(enabled(), "true false"_words);
 }
 
 void TestEventsWidgetsModel::changesWaitForOneAnother()
 {
-    const QString needed = QStringLiteral("/usr/share/glimmera/needed");
-    Files::remove(needed);
     const QByteArray widget = R"({ "path": "a", "available_path": "/usr/share/glimmera/needed" })";
-    writeFile("test.json", widget);
     m_key->set(QStringList());
-    Model model;
-    QByteArrayList events;
-    const QObject context;
-    connect(&model, &Model::rowsAboutToBeInserted, &context, [&] {
-        events.append("begin");
+    loadModel(widget);
+    connect(m_model.get(), &Model::rowsAboutToBeInserted, this, [this] {
         m_key->set(QStringList{a});
         Files::write(needed, "");
-        model.updateAvailable();
+        m_model->updateAvailable();
+        QCOMPARE(events(), QString());
     });
-    connect(&model, &Model::rowsInserted, &context, [&] { events.append("end"); });
-    connect(&model, &Model::dataChanged, &context, [&] { events.append("change"); });
-    writeFile("test.json", widget + R"(, { "path": "b" })");
-    model.directoryChanged();
-    QTRY_COMPARE(events, (QByteArrayList{"begin", "end", "change", "change"}));
-    Files::remove(needed);
+    write("test.json"_s, widget + R"(, { "path": "b" })");
+    m_model->directoryChanged();
+    QTRY_COMPARE(enabled(), "true false"_words);
+    QCOMPARE(events(), "inserted 1, changed 0, changed 0 (261)"_s);
+}
+
+void TestEventsWidgetsModel::choicesMadeInTheMiddleOfAScan_data()
+{
+    QTest::addColumn<QVariant>("before");
+    QTest::addColumn<QString>("list");
+    QTest::addColumn<QString>("enabled");
+    // The handler sees one row only; the list that is stored names every widget.
+    QTest::newRow("first choice") << QVariant() << "a b c a x"
+                                  << "true true true";
+    QTest::newRow("list") << QVariant("stored"_words) << "stored a x"
+                          << "true false false";
 }
 
 void TestEventsWidgetsModel::choicesMadeInTheMiddleOfAScan()
 {
-    m_key->set(QStringList{QStringLiteral("stored")});
-    writeFile("test.json", R"({ "path": "a" }, { "path": "b" }, { "path": "c" })");
-    Model model(false);
+    QFETCH(QVariant, before);
+    m_key->set(before);
+    write("test.json"_s, R"({ "path": "a" }, { "path": "b" }, { "path": "c" })");
+    makeModel();
     // The second choice starts from the result of the first.
-    QObject context;
-    connect(&model, &Model::rowsInserted, &context, [&] {
-        if (model.rowCount() == 1) {
-            model.enableWidget(a);
-            model.enableWidget(c);
-        }
+    once(m_model.get(), &Model::rowsInserted, [this] {
+        m_model->enabledWidgetsChanged();
+        m_model->enableWidget(a);
+        m_model->enableWidget("x"_s);
     });
-    model.componentComplete();
-    QTRY_COMPARE(storedList(), (QStringList{QStringLiteral("stored"), a, c}));
-    QTRY_COMPARE(
-        column(model, EventsWidgetsModel::EnabledRole),
-        (QStringList{QStringLiteral("true"), QStringLiteral("false"), QStringLiteral("true")}));
-}
-
-void TestEventsWidgetsModel::firstChoiceInTheMiddleOfAScan()
-{
-    // The handler sees one row only; the list that is stored names every widget.
-    writeFile("test.json", R"({ "path": "a" }, { "path": "b" }, { "path": "c" })");
-    Model model(false);
-    QObject context;
-    connect(&model, &Model::rowsInserted, &context, [&] {
-        if (model.rowCount() == 1) {
-            model.enabledWidgetsChanged();
-            model.enableWidget(QStringLiteral("x"));
-        }
-    });
-    model.componentComplete();
-    QTRY_COMPARE(storedList(), (QStringList{a, b, c, QStringLiteral("x")}));
+    m_model->componentComplete();
+    QTRY_VERIFY(m_key->value() != before);
+    QTEST(storedList(), "list");
+    QTEST(enabled().join(QLatin1Char(' ')), "enabled");
 }
 
 void TestEventsWidgetsModel::requestsInHandlersRunOnce()
 {
-    // Every scan warns once that this is not a definition.
-    Files::write(pathOf("bad.json"), "bad");
-    const QString needed = QStringLiteral("/usr/share/glimmera/needed");
-    Files::remove(needed);
-    QByteArray widgets = R"({ "path": "a", "available_path": "/usr/share/glimmera/needed" })";
+    writeBroken();
     constexpr int count = 100;
+    QByteArray widgets = R"({ "path": "a", "available_path": "/usr/share/glimmera/needed" })";
     for (int i = 1; i < count; ++i) {
         widgets += R"(, { "path": ")" + QByteArray::number(i) + R"(" })";
     }
-    writeFile("test.json", widgets);
+    write("test.json"_s, widgets);
     m_key->set(QStringList());
-    Model model(false);
-    QStringList events;
-    connect(&model, &Model::rowsInserted, &model, [&] {
-        events.append(QStringLiteral("inserted"));
-        if (model.rowCount() == count) {
+    makeModel();
+    connect(m_model.get(), &Model::rowsInserted, this, [this] {
+        if (m_model->rowCount() == count) {
             m_key->set(QStringList{a});
             Files::write(needed, "");
         }
-        model.updateAvailable();
-        model.directoryChanged();
-        model.enabledWidgetsChanged();
+        m_model->updateAvailable();
+        m_model->directoryChanged();
+        m_model->enabledWidgetsChanged();
     });
-    connect(&model, &Model::dataChanged, &model,
-            [&](const QModelIndex &, const QModelIndex &, const QVector<int> &roles) {
-                events.append(roles.isEmpty() ? QStringLiteral("changed")
-                                              : QStringLiteral("available"));
-            });
-    model.componentComplete();
-    QCOMPARE(events.size(), count);
-    QTRY_VERIFY(events.size() > count);
+    m_model->componentComplete();
+    QCOMPARE(events().count("inserted"_s), count);
+    QTRY_COMPARE(enabled().first(), "true"_s);
     QTest::qWait(100);
     // In the order in which they were requested first.
-    QCOMPARE(events.mid(count),
-             (QStringList{QStringLiteral("available"), QStringLiteral("changed")}));
-    QCOMPARE(m_log->takeAll().size(), 2);
-    Files::remove(needed);
+    QCOMPARE(events(), "changed 0 (261), changed 0"_s);
+    QCOMPARE(takeMessages().size(), 2);
 }
 
 void TestEventsWidgetsModel::languageChangesInTheMiddleOfAScan()
 {
     // Two files: one may still be unread when the catalog of the other is installed.
-    writeFile("1.json", R"({ "path": "a", "default_enabled": true })", "maps");
-    writeFile("2.json", R"({ "path": "b", "default_enabled": true })", "atlas");
-    Model model(false);
-    LanguageListener listener([&] {
-        if (listener.count == 1) {
-            model.disableWidget(a);
-            model.directoryChanged();
+    write("1.json"_s, R"({ "path": "a", "default_enabled": true })", "maps");
+    write("2.json"_s, R"({ "path": "b", "default_enabled": true })", "atlas");
+    makeModel();
+    const LanguageListener listener([this, isFirst = true]() mutable {
+        if (std::exchange(isFirst, false)) {
+            m_model->disableWidget(a);
+            m_model->directoryChanged();
         }
-        for (int row = 0; row < model.rowCount(); ++row) {
-            model.data(model.index(row), EventsWidgetsModel::TitleRole);
-        }
+        column(Model::TitleRole);
     });
-    model.componentComplete();
+    m_model->componentComplete();
     QVERIFY(listener.count > 0);
     // No widget is forgotten.
-    QTRY_COMPARE(storedList(), QStringList{b});
-    QTRY_COMPARE(column(model, EventsWidgetsModel::EnabledRole).indexOf(QStringLiteral("false")),
-                 paths(model).indexOf(a));
-    QCOMPARE(model.rowCount(), 2);
-}
-
-void TestEventsWidgetsModel::languageChangesOfADyingModel()
-{
-    writeFile("test.json", R"({ "path": "a", "title": "plain" })", "maps");
-    auto model = std::make_unique<Model>();
-    EventsWidgetsModel *dying = model.get();
-    QStringList titles;
-    LanguageListener listener([&] { titles += column(*dying, EventsWidgetsModel::TitleRole); });
-    model.reset();
-    QVERIFY(listener.count > 0);
-    QCOMPARE(titles.size(), listener.count);
-}
-
-void TestEventsWidgetsModel::modelsShareNothing()
-{
-    writeFile("test.json", R"({ "path": "a" })", "maps");
-    auto first = std::make_unique<Model>();
-    const Model second;
-    QCOMPARE(first->findChildren<QTranslator *>().size(), 2);
-    QCOMPARE(second.findChildren<QTranslator *>().size(), 2);
-    first.reset();
-    QCOMPARE(qtTrId("maps-title"), QStringLiteral("Kartat"));
+    QTRY_COMPARE(storedList(), "b"_s);
+    QTRY_COMPARE(enabled().indexOf("false"_s), column(Model::PathRole).indexOf(a));
+    QCOMPARE(m_model->rowCount(), 2);
 }
 
 QTEST_GUILESS_MAIN(TestEventsWidgetsModel)

@@ -698,6 +698,7 @@ void TestQuickActionsModel::moveIsNotReloaded()
     // A reload would notice the changed file.
     add("a"_s, "title=changed\n");
     m_model->move(0, 1);
+    QCoreApplication::processEvents();
     QCOMPARE(events(), "moved 0 1"_s);
     setEnabled("b a a"_s);
     QCOMPARE(events(), "changed 1"_s);
@@ -820,12 +821,12 @@ void TestQuickActionsModel::entryGetsItsRowWithItsDefinition()
 void TestQuickActionsModel::irregularDefinitionsAreListed()
 {
     add("broken"_s, "title=x\n[remote-arguments\n");
-    Files::makeDirectory(path("folder"_s));
+    Files::makeDirectory(path("directory"_s));
     Files::makePipe(inDirectory("pipe"_s));
     Files::makeLink(inDirectory("pipe"_s), path("link"_s));
     add("a"_s);
     loadModel(true);
-    QCOMPARE(rows(), "a broken folder link"_s);
+    QCOMPARE(rows(), "a broken directory link"_s);
     QVERIFY(!data(1, Model::TitleRole).isValid());
     QCOMPARE(takeMessages(),
              QStringList({unreadableWarning, unreadableWarning, unreadableWarning}));

@@ -8,6 +8,7 @@
 #include "mgconfitem.h"
 #include "quickactions/quickactionsmodel.h"
 #include "simulator/recordingservice.h"
+#include "texts.h"
 
 #include <QtTest>
 
@@ -25,13 +26,10 @@ private Q_SLOTS:
     void callsWithoutPathOrInterface();
     void invalidIndex();
     void missingServiceLeadsToTheStore();
-    void missingServiceWithoutPackage();
     void secondRowNamesThePackage();
-    void otherCallsNameNoPackage_data();
-    void otherCallsNameNoPackage();
+    void asksNoStore_data();
+    void asksNoStore();
     void missingStore();
-    void otherErrors();
-    void noReplyIsSilent();
     void errorTextsMayLookLikePlaceholders();
     void invalidNamesAreReported();
     void modelIsGoneBeforeTheError();
@@ -39,6 +37,8 @@ private Q_SLOTS:
 
 private:
     static void add(const char *name, const QByteArray &content);
+    // Loads the model and triggers its first action.
+    void tap();
     // All messages of the test function that is running.
     QStringList messages();
 
@@ -51,9 +51,9 @@ private:
 
 namespace {
 
-const QString directory = QStringLiteral("/usr/share/glimmera/quickactions");
-const QString lampName = QStringLiteral("org.example.lamp");
-const QString storeName = QStringLiteral("com.marlo.marlostore");
+const QString directory = "/usr/share/glimmera/quickactions"_s;
+const QString lampName = "org.example.lamp"_s;
+const QString storeName = "com.marlo.marlostore"_s;
 
 const QByteArray call = "remote-service=org.example.lamp\n"
                         "remote-path=/lamp\n"
@@ -62,15 +62,14 @@ const QByteArray call = "remote-service=org.example.lamp\n"
 
 QString failure(const QString &error)
 {
-    return QStringLiteral("info [default] <Unknown File>: QML QuickActionsModel: Failed to send "
-                          "dbus call to: service=org.example.lamp path=/lamp "
-                          "interface=org.example.Lamp method=toggle. Error was: ")
+    return "info [default] <Unknown File>: QML QuickActionsModel: Failed to send "
+           "dbus call to: service=org.example.lamp path=/lamp "
+           "interface=org.example.Lamp method=toggle. Error was: "_s
         + error;
 }
 
-const QString serviceUnknown =
-    QStringLiteral("org.freedesktop.DBus.Error.ServiceUnknown "
-                   "The name org.example.lamp was not provided by any .service files");
+const QString serviceUnknown = "org.freedesktop.DBus.Error.ServiceUnknown "
+                               "The name org.example.lamp was not provided by any .service files"_s;
 
 // For what must not come: longer than any answer takes.
 constexpr int longEnough = 200;
@@ -79,7 +78,13 @@ constexpr int longEnough = 200;
 
 void TestTriggering::add(const char *name, const QByteArray &content)
 {
-    Files::write(directory + QStringLiteral("/%1.conf").arg(QString::fromLatin1(name)), content);
+    Files::write(directory + "/%1.conf"_s.arg(QString::fromLatin1(name)), content);
+}
+
+void TestTriggering::tap()
+{
+    m_model->componentComplete();
+    m_model->triggerAction(0);
 }
 
 QStringList TestTriggering::messages()
@@ -92,7 +97,7 @@ void TestTriggering::init()
 {
     Files::remove(directory);
     Files::makeDirectory(directory);
-    MGConfItem(QStringLiteral("/desktop/glimmera-marlo-home/events_screen_actions")).unset();
+    MGConfItem("/desktop/glimmera-marlo-home/events_screen_actions"_s).unset();
     m_log = std::make_unique<MessageLog>();
     m_model = std::make_unique<QuickActionsModel>();
     m_model->setShowPotential(true);
@@ -115,9 +120,9 @@ void TestTriggering::callsTheService()
     m_model->componentComplete();
     m_model->triggerAction(1);
     QTRY_COMPARE(lamp.calls().size(), 1);
-    QCOMPARE(lamp.calls().constFirst().path(), QStringLiteral("/lamp"));
-    QCOMPARE(lamp.calls().constFirst().member(), QStringLiteral("toggle"));
-    QCOMPARE(lamp.calls().constFirst().arguments(), QVariantList{QStringLiteral("bright")});
+    QCOMPARE(lamp.calls().constFirst().path(), "/lamp"_s);
+    QCOMPARE(lamp.calls().constFirst().member(), "toggle"_s);
+    QCOMPARE(lamp.calls().constFirst().arguments(), QVariantList{"bright"_s});
 }
 
 void TestTriggering::callsWithoutPathOrInterface()
@@ -128,22 +133,21 @@ void TestTriggering::callsWithoutPathOrInterface()
     add("b",
         "remote-service=org.example.lamp\nremote-interface=org.example.Lamp\n"
         "remote-method=toggle\n");
-    m_model->componentComplete();
-    m_model->triggerAction(0);
+    tap();
     QTRY_COMPARE(lamp.calls().size(), 1);
     QCOMPARE(lamp.calls().constFirst().interface(), QString());
-    QCOMPARE(lamp.calls().constFirst().member(), QStringLiteral("toggle"));
+    QCOMPARE(lamp.calls().constFirst().member(), "toggle"_s);
 
     m_model->triggerAction(1);
     // Qt logs a message too.
     QTRY_COMPARE(messages().size(), 2);
     m_expected = messages();
     QCOMPARE(m_expected.last(),
-             QStringLiteral("info [default] <Unknown File>: QML QuickActionsModel: Failed to send "
-                            "dbus call to: service=org.example.lamp path= "
-                            "interface=org.example.Lamp method=toggle. Error was: "
-                            "org.qtproject.QtDBus.Error.InvalidObjectPath "
-                            "Object path cannot be empty"));
+             "info [default] <Unknown File>: QML QuickActionsModel: Failed to send "
+             "dbus call to: service=org.example.lamp path= "
+             "interface=org.example.Lamp method=toggle. Error was: "
+             "org.qtproject.QtDBus.Error.InvalidObjectPath "
+             "Object path cannot be empty"_s);
     QCOMPARE(lamp.calls().size(), 1);
 }
 
@@ -154,9 +158,8 @@ void TestTriggering::invalidIndex()
     m_model->componentComplete();
     for (const int index : {-1, 1}) {
         m_model->triggerAction(index);
-        m_expected += QStringLiteral("info [default] <Unknown File>: QML QuickActionsModel: "
-                                     "triggerAction() called with invalid index: %1")
-                          .arg(index);
+        m_expected += "info [default] <Unknown File>: QML QuickActionsModel: "
+                      "triggerAction() called with invalid index: %1"_s.arg(index);
         QCOMPARE(messages(), m_expected);
     }
     QTest::qWait(longEnough);
@@ -169,15 +172,14 @@ void TestTriggering::missingServiceLeadsToTheStore()
     QStringList messagesBefore;
     connect(&store, &RecordingService::called, this, [&] { messagesBefore = messages(); });
     add("a", call + "requires-package=lamp-daemon\n");
-    m_model->componentComplete();
-    m_model->triggerAction(0);
+    tap();
     QTRY_COMPARE(store.calls().size(), 1);
     const QDBusMessage show = store.calls().constFirst();
-    QCOMPARE(show.path(), QStringLiteral("/StoreClient"));
-    QCOMPARE(show.interface(), QStringLiteral("com.marlo.marlostore"));
-    QCOMPARE(show.member(), QStringLiteral("showApp"));
-    QCOMPARE(show.signature(), QStringLiteral("s"));
-    QCOMPARE(show.arguments(), QVariantList{QStringLiteral("lamp-daemon")});
+    QCOMPARE(show.path(), "/StoreClient"_s);
+    QCOMPARE(show.interface(), "com.marlo.marlostore"_s);
+    QCOMPARE(show.member(), "showApp"_s);
+    QCOMPARE(show.signature(), "s"_s);
+    QCOMPARE(show.arguments(), QVariantList{"lamp-daemon"_s});
     m_expected = QStringList(failure(serviceUnknown));
     QCOMPARE(messagesBefore, m_expected);
 
@@ -187,52 +189,60 @@ void TestTriggering::missingServiceLeadsToTheStore()
     m_expected += m_expected;
 }
 
-void TestTriggering::missingServiceWithoutPackage()
-{
-    RecordingService store(QDBusConnection::SessionBus, storeName);
-    add("a", call);
-    m_model->componentComplete();
-    m_model->triggerAction(0);
-    m_expected = QStringList(failure(serviceUnknown));
-    QTRY_COMPARE(messages(), m_expected);
-    QTest::qWait(longEnough);
-    QCOMPARE(store.calls().size(), 0);
-}
-
 void TestTriggering::secondRowNamesThePackage()
 {
     RecordingService store(QDBusConnection::SessionBus, storeName);
     add("a", call);
     add("b", call + "requires-package=lamp-daemon\n");
     add("c", call + "requires-package=another\n");
-    m_model->componentComplete();
-    m_model->triggerAction(0);
+    tap();
     QTRY_COMPARE(store.calls().size(), 1);
     QTest::qWait(longEnough);
     QCOMPARE(store.calls().size(), 1);
-    QCOMPARE(store.calls().constFirst().arguments(), QVariantList{QStringLiteral("lamp-daemon")});
+    QCOMPARE(store.calls().constFirst().arguments(), QVariantList{"lamp-daemon"_s});
     m_expected = QStringList(failure(serviceUnknown));
 }
 
-void TestTriggering::otherCallsNameNoPackage_data()
+void TestTriggering::asksNoStore_data()
 {
-    QTest::addColumn<QByteArray>("other");
+    QTest::addColumn<QByteArray>("first");
+    QTest::addColumn<QByteArray>("second");
+    QTest::addColumn<QString>("error"); // that the service answers, if it exists
+    QTest::addColumn<QStringList>("messages");
+    const QByteArray needed = "requires-package=lamp-daemon\n";
+    const QStringList noService(failure(serviceUnknown));
+    QTest::newRow("no package") << call << call << "" << noService;
     for (const char *line : {"remote-service=org.example.other", "remote-path=/other",
                              "remote-interface=org.example.Other", "remote-method=other"}) {
-        QTest::newRow(line) << QByteArray(line) + '\n';
+        QTest::addRow("package of another call: %s", line)
+            << call << call + line + '\n' + needed << "" << noService;
     }
+    QTest::newRow("other error") << call + needed << call
+                                 << "org.freedesktop.DBus.Error.UnknownMethod"
+                                 << QStringList(failure(
+                                        "org.freedesktop.DBus.Error.UnknownMethod as told"_s));
+    QTest::newRow("no reply") << call + needed << call << "org.freedesktop.DBus.Error.NoReply"
+                              << QStringList();
 }
 
-void TestTriggering::otherCallsNameNoPackage()
+void TestTriggering::asksNoStore()
 {
-    QFETCH(QByteArray, other);
-    RecordingService store(QDBusConnection::SessionBus, storeName);
-    add("a", call);
-    add("b", call + other + "requires-package=lamp-daemon\n");
-    m_model->componentComplete();
-    m_model->triggerAction(0);
-    m_expected = QStringList(failure(serviceUnknown));
-    QTRY_COMPARE(messages(), m_expected);
+    QFETCH(QByteArray, first);
+    QFETCH(QByteArray, second);
+    QFETCH(QString, error);
+    QFETCH(QStringList, messages);
+    const RecordingService store(QDBusConnection::SessionBus, storeName);
+    std::unique_ptr<RecordingService> lamp;
+    if (!error.isEmpty()) {
+        lamp = std::make_unique<RecordingService>(QDBusConnection::SessionBus, lampName);
+        lamp->setAnswer(Answer::Error, error);
+    }
+    add("a", first);
+    add("b", second);
+    tap();
+    m_expected = messages;
+    QTRY_COMPARE(this->messages(), m_expected);
+    QTRY_VERIFY(lamp == nullptr || lamp->calls().size() == 1);
     QTest::qWait(longEnough);
     QCOMPARE(store.calls().size(), 0);
 }
@@ -240,50 +250,20 @@ void TestTriggering::otherCallsNameNoPackage()
 void TestTriggering::missingStore()
 {
     add("a", call + "requires-package=lamp-daemon\n");
-    m_model->componentComplete();
-    m_model->triggerAction(0);
-    // Nobody waits for the store, so nobody learns that it is missing.
+    tap();
+    // The model does not wait for the store, so it does not notice that the store is missing.
     m_expected = QStringList(failure(serviceUnknown));
     QTRY_COMPARE(messages(), m_expected);
     QTest::qWait(longEnough);
 }
 
-void TestTriggering::otherErrors()
-{
-    RecordingService store(QDBusConnection::SessionBus, storeName);
-    RecordingService lamp(QDBusConnection::SessionBus, lampName);
-    lamp.setAnswer(Answer::Error, QStringLiteral("org.freedesktop.DBus.Error.UnknownMethod"));
-    add("a", call + "requires-package=lamp-daemon\n");
-    m_model->componentComplete();
-    m_model->triggerAction(0);
-    m_expected =
-        QStringList(failure(QStringLiteral("org.freedesktop.DBus.Error.UnknownMethod as told")));
-    QTRY_COMPARE(messages(), m_expected);
-    QTest::qWait(longEnough);
-    QCOMPARE(store.calls().size(), 0);
-}
-
-void TestTriggering::noReplyIsSilent()
-{
-    RecordingService store(QDBusConnection::SessionBus, storeName);
-    RecordingService lamp(QDBusConnection::SessionBus, lampName);
-    lamp.setAnswer(Answer::Error, QStringLiteral("org.freedesktop.DBus.Error.NoReply"));
-    add("a", call + "requires-package=lamp-daemon\n");
-    m_model->componentComplete();
-    m_model->triggerAction(0);
-    QTRY_COMPARE(lamp.calls().size(), 1);
-    QTest::qWait(longEnough);
-    QCOMPARE(store.calls().size(), 0);
-}
-
 void TestTriggering::errorTextsMayLookLikePlaceholders()
 {
     RecordingService lamp(QDBusConnection::SessionBus, lampName);
-    lamp.setAnswer(Answer::Error, QStringLiteral("org.example.Error"), QStringLiteral("%1 %7"));
+    lamp.setAnswer(Answer::Error, "org.example.Error"_s, "%1 %7"_s);
     add("a", call);
-    m_model->componentComplete();
-    m_model->triggerAction(0);
-    m_expected = QStringList(failure(QStringLiteral("org.example.Error %1 %7")));
+    tap();
+    m_expected = QStringList(failure("org.example.Error %1 %7"_s));
     QTRY_COMPARE(messages(), m_expected);
 }
 
@@ -294,8 +274,7 @@ void TestTriggering::invalidNamesAreReported()
     add("a",
         "remote-service=org.example.lamp\nremote-path=no path\n"
         "remote-interface=%1\nremote-method=%2\nrequires-package=p\n");
-    m_model->componentComplete();
-    m_model->triggerAction(0);
+    tap();
     // Qt logs a message too.
     QTRY_COMPARE(messages().size(), 2);
     m_expected = messages();
@@ -313,8 +292,7 @@ void TestTriggering::modelIsGoneBeforeTheError()
 {
     RecordingService store(QDBusConnection::SessionBus, storeName);
     add("a", call + "requires-package=lamp-daemon\n");
-    m_model->componentComplete();
-    m_model->triggerAction(0);
+    tap();
     m_model.reset();
     QTest::qWait(longEnough);
     QCOMPARE(store.calls().size(), 0);
@@ -324,8 +302,7 @@ void TestTriggering::actionIsGoneBeforeTheError()
 {
     RecordingService store(QDBusConnection::SessionBus, storeName);
     add("a", call + "requires-package=lamp-daemon\n");
-    m_model->componentComplete();
-    m_model->triggerAction(0);
+    tap();
     m_model->setShowPotential(false);
     QCOMPARE(m_model->count(), 0);
     m_expected = QStringList(failure(serviceUnknown));

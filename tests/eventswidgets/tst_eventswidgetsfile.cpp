@@ -6,6 +6,7 @@
 #include "eventswidgets/eventswidgetsfile.h"
 #include "files.h"
 #include "loggedtest.h"
+#include "texts.h"
 
 #include <QTemporaryDir>
 #include <QtTest>
@@ -30,25 +31,16 @@ private Q_SLOTS:
     void wrongTypesReadAsAbsent();
     void order_data();
     void order();
-    void keepsTheOrderOfEntries();
-    void repeatedPathsAreReadAgain();
-    void lastOfARepeatedKeyCounts();
-    void ignoresUnknownKeys();
-    void skipsABOM();
-    void catalogWithoutWidgets_data();
-    void catalogWithoutWidgets();
-    void catalogBehindTheWidgets();
+    void readsWidgets_data();
+    void readsWidgets();
     void entriesThatAreNoWidgets();
     void boundedWarnings();
     void noDefinition_data();
     void noDefinition();
-    void missingFile();
-    void notARegularFile_data();
-    void notARegularFile();
-    void largeFile();
+    void cannotBeOpened_data();
+    void cannotBeOpened();
     void tooLargeFile();
     void tooManyContainers();
-    void deepFile();
     void availability();
     void comparison_data();
     void comparison();
@@ -66,7 +58,7 @@ private:
 void TestEventsWidgetsFile::init()
 {
     m_root = std::make_unique<QTemporaryDir>();
-    m_path = m_root->filePath(QStringLiteral("test.json"));
+    m_path = m_root->filePath("test.json"_s);
     LoggedTest::init();
 }
 
@@ -91,7 +83,7 @@ Widget TestEventsWidgetsFile::readWidget(const QByteArray &members)
 // In the form that MessageLog reports.
 QString TestEventsWidgetsFile::warning(const char *text) const
 {
-    return QStringLiteral("warning [default] %1 \"%2\"").arg(QLatin1String(text), m_path);
+    return "warning [default] %1 \"%2\""_s.arg(QLatin1String(text), m_path);
 }
 
 void TestEventsWidgetsFile::readsEveryKey()
@@ -105,17 +97,17 @@ void TestEventsWidgetsFile::readsEveryKey()
         } ]
     })");
     QVERIFY(file);
-    QCOMPARE(file->translationCatalog, QStringLiteral("maps"));
+    QCOMPARE(file->translationCatalog, "maps"_s);
     QCOMPARE(file->widgets.size(), size_t(1));
     const Widget &widget = file->widgets.front();
     QCOMPARE(widget.file, m_path);
-    QCOMPARE(widget.title, QStringLiteral("Title"));
-    QCOMPARE(widget.translationId, QStringLiteral("t-id"));
-    QCOMPARE(widget.descriptionId, QStringLiteral("d-id"));
-    QCOMPARE(widget.translationCatalog, QStringLiteral("maps"));
-    QCOMPARE(widget.icon, QStringLiteral("image://icon"));
-    QCOMPARE(widget.path, QStringLiteral("/a.qml"));
-    QCOMPARE(widget.availablePath, QStringLiteral("/nowhere/at/all"));
+    QCOMPARE(widget.title, "Title"_s);
+    QCOMPARE(widget.translationId, "t-id"_s);
+    QCOMPARE(widget.descriptionId, "d-id"_s);
+    QCOMPARE(widget.translationCatalog, "maps"_s);
+    QCOMPARE(widget.icon, "image://icon"_s);
+    QCOMPARE(widget.path, "/a.qml"_s);
+    QCOMPARE(widget.availablePath, "/nowhere/at/all"_s);
     QCOMPARE(widget.order, 7);
     QCOMPARE(widget.defaultEnabled, true);
     QCOMPARE(widget.available, false);
@@ -124,7 +116,7 @@ void TestEventsWidgetsFile::readsEveryKey()
 void TestEventsWidgetsFile::defaultsOfAbsentKeys()
 {
     const Widget widget = readWidget("");
-    QCOMPARE(widget.path, QStringLiteral("a"));
+    QCOMPARE(widget.path, "a"_s);
     QCOMPARE(widget.title, QString());
     QCOMPARE(widget.translationId, QString());
     QCOMPARE(widget.descriptionId, QString());
@@ -149,7 +141,7 @@ void TestEventsWidgetsFile::wrongTypesReadAsAbsent()
 {
     QFETCH(QByteArray, value);
     const bool isText = value.startsWith('"');
-    const QString text = isText ? QStringLiteral("text") : QString();
+    const QString text = isText ? "text"_s : QString();
 
     const auto catalog = read(R"({ "widgets": [], "translation_catalog": )" + value + "}");
     QVERIFY(catalog);
@@ -159,7 +151,7 @@ void TestEventsWidgetsFile::wrongTypesReadAsAbsent()
         readWidget(R"(, "title": )" + value + R"(, "translation_id": )" + value
                    + R"(, "description_id": )" + value + R"(, "icon": )" + value
                    + R"(, "available_path": )" + value + R"(, "default_enabled": )" + value);
-    QCOMPARE(widget.path, QStringLiteral("a"));
+    QCOMPARE(widget.path, "a"_s);
     QCOMPARE(widget.title, text);
     QCOMPARE(widget.translationId, text);
     QCOMPARE(widget.descriptionId, text);
@@ -211,83 +203,62 @@ void TestEventsWidgetsFile::order()
 {
     QFETCH(QByteArray, value);
     const Widget widget = readWidget(R"(, "order": )" + value);
-    QCOMPARE(widget.path, QStringLiteral("a"));
+    QCOMPARE(widget.path, "a"_s);
     QTEST(widget.order, "order");
 }
 
-void TestEventsWidgetsFile::keepsTheOrderOfEntries()
-{
-    const auto file = read(R"({ "widgets": [
-        { "path": "c", "order": 9 }, { "path": "a" }, { "path": "b", "order": 1 } ] })");
-    QVERIFY(file);
-    QCOMPARE(file->widgets.size(), size_t(3));
-    QCOMPARE(file->widgets.at(0).path, QStringLiteral("c"));
-    QCOMPARE(file->widgets.at(1).path, QStringLiteral("a"));
-    QCOMPARE(file->widgets.at(2).path, QStringLiteral("b"));
-}
-
-void TestEventsWidgetsFile::repeatedPathsAreReadAgain()
-{
-    const auto file = read(R"({ "widgets": [
-        { "path": "a", "title": "1" }, { "path": "a", "title": "2" } ] })");
-    QVERIFY(file);
-    QCOMPARE(file->widgets.size(), size_t(2));
-    QCOMPARE(file->widgets.at(1).title, QStringLiteral("2"));
-}
-
-void TestEventsWidgetsFile::lastOfARepeatedKeyCounts()
-{
-    const auto file = read(R"({ "widgets": [ 1, { "path": "a" } ], "widgets": [
-        { "path": 1, "title": "1", "order": 1, "path": "b", "title": "2", "order": "3" } ] })");
-    QVERIFY(file);
-    QCOMPARE(file->widgets.size(), size_t(1));
-    QCOMPARE(file->widgets.at(0).path, QStringLiteral("b"));
-    QCOMPARE(file->widgets.at(0).title, QStringLiteral("2"));
-    QCOMPARE(file->widgets.at(0).order, -1);
-
-    const auto none = read(R"({ "widgets": [ { "path": "a" } ], "widgets": 5 })");
-    QVERIFY(none);
-    QCOMPARE(none->widgets.size(), size_t(0));
-}
-
-void TestEventsWidgetsFile::ignoresUnknownKeys()
-{
-    const auto file = read(R"({ "x": [1, {"y": null}], "Widgets": [ 1 ],
-        "widgets": [ { "z": {"path": "b"}, "path": "a", "PATH": "c", "enabled": true } ] })");
-    QVERIFY(file);
-    QCOMPARE(file->widgets.size(), size_t(1));
-    QCOMPARE(file->widgets.at(0).path, QStringLiteral("a"));
-    QCOMPARE(file->widgets.at(0).enabled, false);
-}
-
-void TestEventsWidgetsFile::skipsABOM()
-{
-    const auto file = read("\xef\xbb\xbf{ \"widgets\": [ { \"path\": \"\xc3\xa4\" } ] }");
-    QVERIFY(file);
-    QCOMPARE(file->widgets.at(0).path, QString(QChar(0xe4)));
-}
-
-void TestEventsWidgetsFile::catalogWithoutWidgets_data()
+void TestEventsWidgetsFile::readsWidgets_data()
 {
     QTest::addColumn<QByteArray>("content");
-    QTest::newRow("no array") << QByteArray(R"({ "translation_catalog": "maps" })");
-    QTest::newRow("empty") << QByteArray(R"({ "translation_catalog": "maps", "widgets": [] })");
+    QTest::addColumn<QString>("catalog");
+    QTest::addColumn<QString>("widgets"); // path, title and order of each
+    const auto row = [](const char *name, const QByteArray &content, const char *catalog,
+                        const char *widgets) {
+        QTest::newRow(name) << content << catalog << widgets;
+    };
+    row("several",
+        R"({ "widgets": [ { "path": "c", "order": 9 }, { "path": "a", "title": "A" },
+                          { "path": "b", "order": 1 } ] })",
+        "", "c::9 a:A:-1 b::1");
+    row("repeated path",
+        R"({ "widgets": [ { "path": "a", "title": "1" }, { "path": "a", "title": "2" } ] })", "",
+        "a:1:-1 a:2:-1");
+    row("last of repeated keys",
+        R"({ "widgets": [ 1, { "path": "a" } ], "widgets": [
+             { "path": 1, "title": "1", "order": 1, "path": "b", "title": "2", "order": "3" } ] })",
+        "", "b:2:-1");
+    row("last of repeated keys, of another type",
+        R"({ "widgets": [ { "path": "a" } ], "widgets": 5 })", "", "");
+    row("unknown keys",
+        R"({ "x": [1, {"y": null}], "Widgets": [ 1 ],
+             "widgets": [ { "z": {"path": "b"}, "path": "a", "PATH": "c", "enabled": true } ] })",
+        "", "a::-1");
+    row("byte-order mark", "\xef\xbb\xbf{ \"widgets\": [ { \"path\": \"\xc3\xa4\" } ] }", "",
+        "ä::-1");
+    row("catalog only", R"({ "translation_catalog": "maps" })", "maps", "");
+    row("catalog and no widget", R"({ "translation_catalog": "maps", "widgets": [] })", "maps", "");
+    row("catalog behind the widgets",
+        R"({ "widgets": [ { "path": "a" } ], "translation_catalog": "maps" })", "maps", "a::-1");
+    const QByteArray begin = R"({ "widgets": [ { "path": "a" } ], "x": )";
+    row("large file", begin + '"' + QByteArray(20 * 1024 * 1024, 'x') + "\" }", "", "a::-1");
+    // As deep as QJsonDocument reads; deeper files are in noDefinition().
+    row("deep file", begin + QByteArray(1023, '[') + QByteArray(1023, ']') + "}", "", "a::-1");
 }
 
-void TestEventsWidgetsFile::catalogWithoutWidgets()
+void TestEventsWidgetsFile::readsWidgets()
 {
     QFETCH(QByteArray, content);
+    QFETCH(QString, catalog);
     const auto file = read(content);
     QVERIFY(file);
-    QCOMPARE(file->translationCatalog, QStringLiteral("maps"));
-    QCOMPARE(file->widgets.size(), size_t(0));
-}
-
-void TestEventsWidgetsFile::catalogBehindTheWidgets()
-{
-    const auto file = read(R"({ "widgets": [ { "path": "a" } ], "translation_catalog": "maps" })");
-    QVERIFY(file);
-    QCOMPARE(file->widgets.at(0).translationCatalog, QStringLiteral("maps"));
+    QCOMPARE(file->translationCatalog, catalog);
+    QStringList widgets;
+    for (const Widget &widget : file->widgets) {
+        widgets.append("%1:%2:%3"_s.arg(widget.path, widget.title).arg(widget.order));
+        QCOMPARE(widget.translationCatalog, catalog);
+        QCOMPARE(widget.enabled, false);
+    }
+    QTEST(widgets.join(QLatin1Char(' ')), "widgets");
 }
 
 void TestEventsWidgetsFile::entriesThatAreNoWidgets()
@@ -296,8 +267,8 @@ void TestEventsWidgetsFile::entriesThatAreNoWidgets()
         1, { "path": "a" }, [], { "path": "" }, { }, { "path": "b" }, null ] })");
     QVERIFY(file);
     QCOMPARE(file->widgets.size(), size_t(2));
-    QCOMPARE(file->widgets.at(0).path, QStringLiteral("a"));
-    QCOMPARE(file->widgets.at(1).path, QStringLiteral("b"));
+    QCOMPARE(file->widgets.at(0).path, "a"_s);
+    QCOMPARE(file->widgets.at(1).path, "b"_s);
     const QStringList warnings(QVector<QString>(5, warning("Invalid widget defined in")).toList());
     QCOMPARE(m_log->takeReport(), warnings.join(QLatin1Char('\n')));
 }
@@ -344,45 +315,30 @@ void TestEventsWidgetsFile::noDefinition()
     QCOMPARE(m_log->takeReport(), warning("Invalid Events Widget"));
 }
 
-void TestEventsWidgetsFile::missingFile()
-{
-    QVERIFY(!readEventsWidgetsFile(m_path));
-    QCOMPARE(m_log->takeReport(), warning("Failed to open"));
-}
-
-void TestEventsWidgetsFile::notARegularFile_data()
+void TestEventsWidgetsFile::cannotBeOpened_data()
 {
     QTest::addColumn<QString>("kind");
-    for (const auto *kind : {"pipe", "link to a pipe", "endless device", "directory"}) {
-        QTest::newRow(kind) << QString::fromLatin1(kind);
+    for (const auto *kind : {"nothing", "pipe", "link to a pipe", "endless device", "directory"}) {
+        QTest::newRow(kind) << kind;
     }
 }
 
-void TestEventsWidgetsFile::notARegularFile()
+void TestEventsWidgetsFile::cannotBeOpened()
 {
     // Something else replaced a file after it was listed.
     QFETCH(QString, kind);
-    if (kind == QStringLiteral("pipe")) {
+    if (kind == "pipe"_s) {
         Files::makePipe(m_path);
-    } else if (kind == QStringLiteral("link to a pipe")) {
-        Files::makePipe(m_root->filePath(QStringLiteral("pipe")));
-        Files::makeLink(m_root->filePath(QStringLiteral("pipe")), m_path);
-    } else if (kind == QStringLiteral("endless device")) {
-        Files::makeLink(QStringLiteral("/dev/zero"), m_path);
-    } else {
+    } else if (kind == "link to a pipe"_s) {
+        Files::makePipe(m_root->filePath("pipe"_s));
+        Files::makeLink(m_root->filePath("pipe"_s), m_path);
+    } else if (kind == "endless device"_s) {
+        Files::makeLink("/dev/zero"_s, m_path);
+    } else if (kind == "directory"_s) {
         Files::makeDirectory(m_path);
     }
     QVERIFY(!readEventsWidgetsFile(m_path));
     QCOMPARE(m_log->takeReport(), warning("Failed to open"));
-}
-
-void TestEventsWidgetsFile::largeFile()
-{
-    QByteArray content = R"({ "widgets": [ { "path": "a" } ], "x": ")";
-    content += QByteArray(20 * 1024 * 1024, 'x') + "\" }";
-    const auto file = read(content);
-    QVERIFY(file);
-    QCOMPARE(file->widgets.size(), size_t(1));
 }
 
 void TestEventsWidgetsFile::tooLargeFile()
@@ -407,20 +363,11 @@ void TestEventsWidgetsFile::tooManyContainers()
     QCOMPARE(m_log->takeReport(), warning("Invalid Events Widget"));
 }
 
-void TestEventsWidgetsFile::deepFile()
-{
-    // As deep as QJsonDocument reads; deeper files are in noDefinition().
-    const auto file = read(R"({ "widgets": [ { "path": "a" } ], "x": )" + QByteArray(1023, '[')
-                           + QByteArray(1023, ']') + "}");
-    QVERIFY(file);
-    QCOMPARE(file->widgets.size(), size_t(1));
-}
-
 void TestEventsWidgetsFile::availability()
 {
     Widget widget;
     QVERIFY(widget.isAvailable());
-    widget.availablePath = m_root->filePath(QStringLiteral("needed"));
+    widget.availablePath = m_root->filePath("needed"_s);
     QVERIFY(!widget.isAvailable());
     Files::write(widget.availablePath, "");
     QVERIFY(widget.isAvailable());
@@ -440,7 +387,7 @@ void TestEventsWidgetsFile::comparison_data()
     const auto row = [](const char *name, bool differs, const Change &change) {
         QTest::newRow(name) << change << differs;
     };
-    const QString text = QStringLiteral("other");
+    const QString text = "other"_s;
     row("nothing", false, [](Widget *) {});
     row("file", false, [text](Widget *widget) { widget->file = text; });
     row("catalog", false, [text](Widget *widget) { widget->translationCatalog = text; });

@@ -2,6 +2,7 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 #include "models/requestqueue.h"
+#include "texts.h"
 
 #include <QAbstractEventDispatcher>
 #include <QEventLoop>
@@ -22,7 +23,7 @@ public:
             return;
         }
         const RequestQueue<Model>::Change change(&requests);
-        log.append(QStringLiteral("scan"));
+        log.append("scan"_s);
         handler();
     }
     void check()
@@ -31,7 +32,7 @@ public:
             return;
         }
         const RequestQueue<Model>::Change change(&requests);
-        log.append(QStringLiteral("check"));
+        log.append("check"_s);
     }
     void choose(const QString &name)
     {
@@ -46,11 +47,6 @@ public:
     std::function<void()> handler = [] {};
     std::function<void()> onChoice = [] {};
 };
-
-QStringList list(const char *names)
-{
-    return QString::fromLatin1(names).split(QLatin1Char(' '), Qt::SkipEmptyParts);
-}
 
 } // namespace
 
@@ -74,11 +70,11 @@ void TestRequestQueue::runsAtOnceWhileNothingChanges()
 {
     Model model;
     model.scan();
-    model.choose(QStringLiteral("a"));
+    model.choose("a"_s);
     model.check();
-    QCOMPARE(model.log, list("scan a check"));
+    QCOMPARE(model.log, "scan a check"_words);
     QCoreApplication::processEvents();
-    QCOMPARE(model.log, list("scan a check"));
+    QCOMPARE(model.log, "scan a check"_words);
 }
 
 void TestRequestQueue::updatesRunOnce()
@@ -91,20 +87,20 @@ void TestRequestQueue::updatesRunOnce()
         }
     };
     model.scan();
-    QCOMPARE(model.log, list("scan"));
+    QCOMPARE(model.log, "scan"_words);
     model.handler = [] {};
     QCoreApplication::processEvents();
-    QCOMPARE(model.log, list("scan check scan"));
+    QCOMPARE(model.log, "scan check scan"_words);
 }
 
 void TestRequestQueue::updatesAreAcceptedAgainAfterwards()
 {
     Model model;
     model.handler = [&model] { model.check(); };
-    for (const char *expected : {"scan check", "scan check scan check"}) {
+    for (const QStringList &expected : {"scan check"_words, "scan check scan check"_words}) {
         model.scan();
         QCoreApplication::processEvents();
-        QCOMPARE(model.log, list(expected));
+        QCOMPARE(model.log, expected);
     }
 }
 
@@ -112,44 +108,43 @@ void TestRequestQueue::choicesRunInOrderAfterTheUpdates()
 {
     Model model;
     model.handler = [&model] {
-        model.choose(QStringLiteral("a"));
-        model.choose(QStringLiteral("b"));
-        model.choose(QStringLiteral("a"));
+        model.choose("a"_s);
+        model.choose("b"_s);
+        model.choose("a"_s);
         model.check();
     };
     model.scan();
-    QCOMPARE(model.log, list("scan"));
+    QCOMPARE(model.log, "scan"_words);
     QCoreApplication::processEvents();
-    QCOMPARE(model.log, list("scan check a b a"));
+    QCOMPARE(model.log, "scan check a b a"_words);
 }
 
 void TestRequestQueue::laterChoiceRunsWhatWaits()
 {
     Model model;
     model.handler = [&model] {
-        model.choose(QStringLiteral("a"));
+        model.choose("a"_s);
         model.check();
     };
     model.scan();
-    model.choose(QStringLiteral("b"));
-    QCOMPARE(model.log, list("scan check a b"));
+    model.choose("b"_s);
+    QCOMPARE(model.log, "scan check a b"_words);
     QCoreApplication::processEvents();
-    QCOMPARE(model.log, list("scan check a b"));
+    QCOMPARE(model.log, "scan check a b"_words);
 }
 
 void TestRequestQueue::choiceWithinAChoiceWaits()
 {
     Model model;
     model.onChoice = [&model] {
-        model.choose(QStringLiteral("b"));
-        model.log.append(QStringLiteral("end of a"));
+        model.choose("b"_s);
+        model.log.append("end-of-a"_s);
     };
-    model.choose(QStringLiteral("a"));
+    model.choose("a"_s);
     model.onChoice = [] {};
-    QCOMPARE(model.log, (QStringList{QStringLiteral("a"), QStringLiteral("end of a")}));
+    QCOMPARE(model.log, "a end-of-a"_words);
     QCoreApplication::processEvents();
-    QCOMPARE(model.log.last(), QStringLiteral("b"));
-    QCOMPARE(model.log.size(), 3);
+    QCOMPARE(model.log, "a end-of-a b"_words);
 }
 
 void TestRequestQueue::nestedEventLoopRunsNothing()
@@ -158,7 +153,7 @@ void TestRequestQueue::nestedEventLoopRunsNothing()
     bool busy = true;
     model.handler = [&] {
         model.check();
-        model.choose(QStringLiteral("a"));
+        model.choose("a"_s);
         // What was posted earlier is delivered, and then there is nothing to do.
         QCoreApplication::processEvents();
         busy = QAbstractEventDispatcher::instance()->processEvents(QEventLoop::AllEvents);
@@ -167,10 +162,10 @@ void TestRequestQueue::nestedEventLoopRunsNothing()
     model.scan();
     model.scan();
     QVERIFY(!busy);
-    QCOMPARE(model.log, list("scan scan"));
+    QCOMPARE(model.log, "scan scan"_words);
     model.handler = [] {};
     QCoreApplication::processEvents();
-    QCOMPARE(model.log, list("scan scan check a a"));
+    QCOMPARE(model.log, "scan scan check a a"_words);
 }
 
 void TestRequestQueue::handlersWithoutEndReturnToTheEventLoop()
@@ -178,9 +173,9 @@ void TestRequestQueue::handlersWithoutEndReturnToTheEventLoop()
     Model model;
     model.handler = [&model] {
         model.scan();
-        model.choose(QStringLiteral("a"));
+        model.choose("a"_s);
     };
-    model.onChoice = [&model] { model.choose(QStringLiteral("b")); };
+    model.onChoice = [&model] { model.choose("b"_s); };
     model.scan();
     for (int i = 0; i < 5; ++i) {
         const int before = model.log.size();

@@ -122,6 +122,7 @@ private Q_SLOTS:
     void reportsChanges();
     void reportsWrittenFileOnceItIsClosed();
     void reportsOnceForManyFiles();
+    void reportsAfterLostEvents_data();
     void reportsAfterLostEvents();
     void reportsDirectoryMadeMeanwhile_data();
     void reportsDirectoryMadeMeanwhile();
@@ -193,6 +194,8 @@ void TestDirectoryWatcher::reportsChanges_data()
     row("renamed away", "a/b/c", "mkdir -p a/b/c",
         {"+ mv a/b/c a/b/elsewhere"_s, "- echo new > a/b/elsewhere/file.conf"_s,
          "+ mkdir a/b/c"_s});
+    row("renamed and back at once", "a/b/c", "mkdir -p a/b/c",
+        {"- mv a/b/c a/b/elsewhere; mv a/b/elsewhere a/b/c"_s, rewrite});
     row("parent replaced", "a/b/c", "mkdir -p a/b/c new/c",
         {"+ mv a/b old; mv new a/b"_s, "- echo new > old/c/file.conf"_s, rewrite,
          // By one that does not have the directory, and back.
@@ -260,8 +263,16 @@ void TestDirectoryWatcher::reportsOnceForManyFiles()
     QCOMPARE(spy.size(), 1);
 }
 
+void TestDirectoryWatcher::reportsAfterLostEvents_data()
+{
+    QTest::addColumn<bool>("isReplaced");
+    QTest::newRow("of a file") << false;
+    QTest::newRow("of the directory") << true;
+}
+
 void TestDirectoryWatcher::reportsAfterLostEvents()
 {
+    QFETCH(bool, isReplaced);
     QFile limit("/proc/sys/fs/inotify/max_queued_events"_s);
     QVERIFY(limit.open(QIODevice::ReadOnly));
     const int events = limit.readAll().trimmed().toInt();
@@ -276,7 +287,9 @@ void TestDirectoryWatcher::reportsAfterLostEvents()
     for (int i = 0; i < events; i += 2) {
         QVERIFY(fchmod(one.handle(), 0600) == 0 && fchmod(other.handle(), 0600) == 0);
     }
-    Files::remove(path("a"));
+    if (isReplaced) {
+        Files::remove(path("a"));
+    }
     Files::write(file(), "x");
     QVERIFY(spy.wait());
     QVERIFY(!spy.wait(100));
@@ -397,8 +410,12 @@ void TestDirectoryWatcher::watchersShareOneInstance()
     QSignalSpy spy(watchers.front().get(), &DirectoryWatcher::changed);
     rewrite(path("a/b/file.conf"));
     QVERIFY(spy.wait());
-    // A directory that is replaced leaves none behind.
+    // A directory that is replaced leaves none behind, whether it is removed or only moved away.
     Files::remove(path("a/b"));
+    Files::makeDirectory(path("a/b"));
+    QVERIFY(spy.wait());
+    QCOMPARE(watches(), once - 1);
+    QVERIFY(QDir().rename(path("a/b"), path("old")));
     Files::makeDirectory(path("a/b"));
     QVERIFY(spy.wait());
     QCOMPARE(watches(), once - 1);

@@ -7,6 +7,7 @@
 #include "interfaceof.h"
 #include "listmodeltest.h"
 #include "texts.h"
+#include "words.h"
 
 #include <QtTest>
 
@@ -252,8 +253,8 @@ void TestEventsWidgetsModel::readsNothingBeforeCompletion()
 
 void TestEventsWidgetsModel::readsJsonFilesOnly()
 {
-    const QStringList names = "plain.json UPPER.JSON more.json.bak json .hidden.json "
-                              "directory.json/below.json"_words;
+    const QStringList names = words("plain.json UPPER.JSON more.json.bak json .hidden.json "
+                                    "directory.json/below.json");
     for (const QString &name : names) {
         write(name, R"({ "path": ")" + name.toUtf8() + "\" }");
     }
@@ -268,7 +269,7 @@ void TestEventsWidgetsModel::readsJsonFilesOnly()
     QStringList found = column(Model::PathRole);
     found.sort();
     // The link is to the file "json".
-    QCOMPARE(found, "UPPER.JSON json plain.json"_words);
+    QCOMPARE(found, words("UPPER.JSON json plain.json"));
 }
 
 void TestEventsWidgetsModel::badFilesHideNoGoodOnes()
@@ -283,7 +284,7 @@ void TestEventsWidgetsModel::badFilesHideNoGoodOnes()
     QCOMPARE(rows(), "a b c"_s);
 
     QStringList expected;
-    for (const QString &name : "array binary deep large"_words) {
+    for (const QString &name : words("array binary deep large")) {
         expected.append(
             "warning [default] Invalid Events Widget \"%1/%2.json\""_s.arg(directory, name));
     }
@@ -492,7 +493,7 @@ void TestEventsWidgetsModel::looksTextsUpOnEveryCall()
         QTranslator translator;
         QVERIFY(translator.load("maps-fi"_s, "/usr/share/translations"_s));
         QCoreApplication::installTranslator(&translator);
-        QCOMPARE(texts(), "Kartat Kartat"_words);
+        QCOMPARE(texts(), words("Kartat Kartat"));
     }
     QCOMPARE(texts(), (QStringList{"plain"_s, QString()}));
 }
@@ -543,24 +544,24 @@ void TestEventsWidgetsModel::defaultsWhileNothingIsStored()
 {
     loadModel(R"({ "path": "a" }, { "path": "b", "default_enabled": true },
                  { "path": "c", "default_enabled": false })");
-    QCOMPARE(enabled(), "false true false"_words);
+    QCOMPARE(enabled(), words("false true false"));
     // Loading writes nothing, and reading again changes nothing.
     m_model->enabledWidgetsChanged();
     m_model->directoryChanged();
-    QCOMPARE(enabled(), "false true false"_words);
+    QCOMPARE(enabled(), words("false true false"));
     QVERIFY(!m_key->value().isValid());
 
     write("more.json"_s, R"({ "path": "d", "default_enabled": true })");
     m_model->directoryChanged();
-    QCOMPARE(enabled(), "false true false true"_words);
+    QCOMPARE(enabled(), words("false true false true"));
 }
 
 void TestEventsWidgetsModel::valuesOfAnyType_data()
 {
     QTest::addColumn<QStringList>("list");
-    QTest::newRow("['a', 'c']") << "a c"_words;
-    QTest::newRow("'a'") << "a"_words;
-    QTest::newRow("[<'a'>, <7>, <true>]") << "a 7 true"_words;
+    QTest::newRow("['a', 'c']") << words("a c");
+    QTest::newRow("'a'") << words("a");
+    QTest::newRow("[<'a'>, <7>, <true>]") << words("a 7 true");
     for (const char *value : {"@as []", "7", "1.5", "true", "{'a': <true>}", "handle 7",
                               "@ms nothing", "()", "@av []"}) {
         QTest::newRow(value) << QStringList();
@@ -590,14 +591,14 @@ void TestEventsWidgetsModel::firstChoiceEnablesAllOthers()
                  { "path": "b", "default_enabled": true },
                  { "path": "c", "default_enabled": true })");
     m_model->disableWidget(b);
-    QTRY_COMPARE(enabled(), "true false true"_words);
+    QTRY_COMPARE(enabled(), words("true false true"));
     QCOMPARE(storedList(), "a c"_s);
     QCOMPARE(events(), "changed 0, changed 1"_s);
 
     // A later widget is not in the list of the user.
     write("more.json"_s, R"({ "path": "d", "default_enabled": true })");
     m_model->directoryChanged();
-    QCOMPARE(enabled(), "true false true false"_words);
+    QCOMPARE(enabled(), words("true false true false"));
 }
 
 void TestEventsWidgetsModel::choices_data()
@@ -655,7 +656,7 @@ void TestEventsWidgetsModel::choiceOfALaterWidget()
     m_model->enableWidget(QString());
     QCOMPARE(m_key->value().toStringList(), (QStringList{"gone"_s, "later"_s, QString()}));
     write("test.json"_s, R"({ "path": "later" })");
-    QTRY_COMPARE(enabled(), "true"_words);
+    QTRY_COMPARE(enabled(), words("true"));
 }
 
 void TestEventsWidgetsModel::listInReadingOrderAfterAScan()
@@ -685,7 +686,7 @@ void TestEventsWidgetsModel::choiceBeforeCompletion()
     m_model->disableWidget(a);
     QCOMPARE(storedList(), "b c"_s);
     m_model->componentComplete();
-    QCOMPARE(enabled(), "false true true"_words);
+    QCOMPARE(enabled(), words("false true true"));
 }
 
 void TestEventsWidgetsModel::firstChoiceBeforeCompletion()
@@ -699,16 +700,16 @@ void TestEventsWidgetsModel::firstChoiceBeforeCompletion()
 void TestEventsWidgetsModel::followsTheKey()
 {
     loadModel(R"({ "path": "a" }, { "path": "b", "default_enabled": true })");
-    QCOMPARE(enabled(), "false true"_words);
+    QCOMPARE(enabled(), words("false true"));
     m_key->set(QStringList{a});
-    QTRY_COMPARE(enabled(), "true false"_words);
+    QTRY_COMPARE(enabled(), words("true false"));
 
     // Another process changes the key.
     DconfTool::waitUntilStored();
-    DconfTool::write(keyName, "a b"_words);
-    QTRY_COMPARE(enabled(), "true true"_words);
+    DconfTool::write(keyName, words("a b"));
+    QTRY_COMPARE(enabled(), words("true true"));
     DconfTool::reset(keyName);
-    QTRY_COMPARE(enabled(), "false true"_words);
+    QTRY_COMPARE(enabled(), words("false true"));
 }
 
 void TestEventsWidgetsModel::updatesAvailability()
@@ -717,21 +718,21 @@ void TestEventsWidgetsModel::updatesAvailability()
                  { "path": "b" }, { "path": "c", "available_path": "/usr/share/glimmera" })");
     const auto available = [this] { return column(Model::AvailableRole); };
     // An unavailable widget is listed, too.
-    QCOMPARE(available(), "false true true"_words);
+    QCOMPARE(available(), words("false true true"));
     Files::write(needed, "");
-    QCOMPARE(available(), "false true true"_words);
+    QCOMPARE(available(), words("false true true"));
     m_model->updateAvailable();
-    QCOMPARE(available(), "true true true"_words);
+    QCOMPARE(available(), words("true true true"));
     QCOMPARE(events(), "changed 0 (261)"_s);
     Files::remove(needed);
     m_model->updateAvailable();
-    QCOMPARE(available(), "false true true"_words);
+    QCOMPARE(available(), words("false true true"));
     QCOMPARE(events(), "changed 0 (261)"_s);
 
     // A scan checks this too, and reports that the whole widget changed.
     Files::write(needed, "");
     m_model->directoryChanged();
-    QCOMPARE(available(), "true true true"_words);
+    QCOMPARE(available(), words("true true true"));
     QCOMPARE(events(), "changed 0"_s);
 }
 
@@ -775,7 +776,7 @@ void TestEventsWidgetsModel::handlersMayCallBack()
     write("test.json"_s, both);
     QTRY_COMPARE(rows(), "a b"_s);
     m_key->set(QStringList{a});
-    QTRY_COMPARE(enabled(), "true false"_words);
+    QTRY_COMPARE(enabled(), words("true false"));
 }
 
 void TestEventsWidgetsModel::changesWaitForOneAnother()
@@ -791,7 +792,7 @@ void TestEventsWidgetsModel::changesWaitForOneAnother()
     });
     write("test.json"_s, widget + R"(, { "path": "b" })");
     m_model->directoryChanged();
-    QTRY_COMPARE(enabled(), "true false"_words);
+    QTRY_COMPARE(enabled(), words("true false"));
     QCOMPARE(events(), "inserted 1, changed 0, changed 0 (261)"_s);
 }
 
@@ -803,7 +804,7 @@ void TestEventsWidgetsModel::choicesMadeInTheMiddleOfAScan_data()
     // The handler sees one row only; the list that is stored names every widget.
     QTest::newRow("first choice") << QVariant() << "a b c a x"
                                   << "true true true";
-    QTest::newRow("list") << QVariant("stored"_words) << "stored a x"
+    QTest::newRow("list") << QVariant(words("stored")) << "stored a x"
                           << "true false false";
 }
 

@@ -7,6 +7,7 @@
 #include "naivecatalogs.h"
 #include "randommodeltest.h"
 #include "texts.h"
+#include "words.h"
 
 #include <QDir>
 #include <QJsonArray>
@@ -215,15 +216,15 @@ private:
     QByteArray randomWidget();
 
     QStringList m_files;
-    const QStringList m_paths = "/a /b /c /D /e /f /g /h"_words;
-    const QStringList m_needed = "/usr/share/glimmera/first /usr/share/glimmera/second"_words;
+    const QStringList m_paths = words("/a /b /c /D /e /f /g /h");
+    const QStringList m_needed = words("/usr/share/glimmera/first /usr/share/glimmera/second");
     std::unique_ptr<NaiveWidgets> m_naive;
     std::unique_ptr<EventsWidgetsModel> m_model;
 };
 
 TestRandomWidgets::TestRandomWidgets() : RandomModelTest(directory, key)
 {
-    for (const QString &name : "one two Three four"_words) {
+    for (const QString &name : words("one two Three four")) {
         m_files.append("%1/%2.json"_s.arg(directory, name));
     }
     onScan = [this] {

@@ -5,6 +5,7 @@
 #include "interfaceof.h"
 #include "loggedtest.h"
 #include "texts.h"
+#include "words.h"
 
 #include <QAbstractItemModelTester>
 #include <QIdentityProxyModel>
@@ -243,7 +244,7 @@ void TestTitlesView::takesListModelsOnly()
         QCOMPARE(m_log->takeReport(), "warning [default] Unsupported model type "_s + shown);
     }
     QCOMPARE(changed.size(), 0);
-    QCOMPARE(view.values(), "a"_words);
+    QCOMPARE(view.values(), words("a"));
 }
 
 void TestTitlesView::anotherModel()
@@ -253,7 +254,7 @@ void TestTitlesView::anotherModel()
     NamesView view(&first);
     view.setModel(&second);
     QCOMPARE(view.model(), &second);
-    QCOMPARE(view.values(), "b"_words);
+    QCOMPARE(view.values(), words("b"));
 
     // The view no longer follows the first model.
     second.reads = 0;
@@ -263,7 +264,7 @@ void TestTitlesView::anotherModel()
     first.reset({});
     QCOMPARE(second.reads, 0);
     second.insert(1, named("e"));
-    QCOMPARE(view.values(), "b e"_words);
+    QCOMPARE(view.values(), words("b e"));
 }
 
 void TestTitlesView::destroyedModel()
@@ -284,7 +285,7 @@ void TestTitlesView::destroyedModel()
     view.setModel(nullptr);
     QCOMPARE(valueChanged.size(), 1);
     view.setModel(&other);
-    QCOMPARE(view.values(), "b"_words);
+    QCOMPARE(view.values(), words("b"));
 
     // The destruction of a replaced model changes nothing.
     auto replaced = std::make_unique<ListModel>();
@@ -346,8 +347,8 @@ void TestTitlesView::roleChangedWhileItIsRead()
     object.answer = [&view] { view.setRole(name); };
     view.setRole("object.text"_s);
     QCOMPARE(view.role(), name);
-    QCOMPARE(view.values(), "a"_words);
-    QCOMPARE(shown, "a"_words);
+    QCOMPARE(view.values(), words("a"));
+    QCOMPARE(shown, words("a"));
 }
 
 void TestTitlesView::collects_data()
@@ -357,8 +358,7 @@ void TestTitlesView::collects_data()
     QTest::newRow("none") << "" << QStringList();
     QTest::newRow("texts, in the order of the rows")
         << "name" << QStringList{"c"_s, "a"_s, ""_s, "a"_s};
-    QTest::newRow("other types") << "kind"
-                                 << "7 true 1.5 x"_words;
+    QTest::newRow("other types") << "kind" << words("7 true 1.5 x");
     QTest::newRow("objects and nothing") << "object" << QStringList{""_s, ""_s, ""_s, ""_s};
 }
 
@@ -367,7 +367,7 @@ void TestTitlesView::collects()
     QFETCH(QString, role);
     QObject object;
     ListModel model({named("c", 7, QVariant::fromValue(&object)), named("a", true), named("", 1.5),
-                     named("a", "x"_words)});
+                     named("a", words("x"))});
     TitlesView view;
     view.setModel(&model);
     QCOMPARE(view.values(), QStringList());
@@ -424,27 +424,27 @@ void TestTitlesView::matches_data()
     QTest::addColumn<QVariant>("match");
     QTest::addColumn<QStringList>("values");
     // Of rows: text "1", text "one", number 1, number 2, true, a list of "one", nothing.
-    QTest::newRow("text") << QVariant("one"_s) << "one list"_words;
+    QTest::newRow("text") << QVariant("one"_s) << words("one list");
     QTest::newRow("case") << QVariant("One"_s) << QStringList();
     QTest::newRow("number") << QVariant(1) << QStringList{"text 1"_s, "number 1"_s, "true"_s};
     QTest::newRow("bool") << QVariant(true)
                           << QStringList{"text 1"_s, "one"_s, "number 1"_s, "true"_s};
-    QTest::newRow("texts") << QVariant("one 2"_words)
+    QTest::newRow("texts") << QVariant(words("one 2"))
                            << QStringList{"one"_s, "number 2"_s, "list"_s};
-    QTest::newRow("texts and true") << QVariant("true"_words) << "true"_words;
+    QTest::newRow("texts and true") << QVariant(words("true")) << words("true");
     QTest::newRow("empty text") << QVariant(QStringList{QString()}) << QStringList();
     QTest::newRow("no texts") << QVariant(QStringList()) << QStringList();
     QTest::newRow("values") << QVariant(QVariantList{"one"_s, 2})
                             << QStringList{"one"_s, "number 2"_s, "list"_s};
     QTest::newRow("no values") << QVariant(QVariantList()) << QStringList();
-    QTest::newRow("nothing") << QVariant() << "nothing"_words;
+    QTest::newRow("nothing") << QVariant() << words("nothing");
 }
 
 void TestTitlesView::matches()
 {
     QFETCH(QVariant, match);
     ListModel model({named("text 1", "1"_s), named("one", "one"_s), named("number 1", 1),
-                     named("number 2", 2), named("true", true), named("list", "one"_words),
+                     named("number 2", 2), named("true", true), named("list", words("one")),
                      named("nothing")});
     NamesView view(&model);
     view.setMatch(match);
@@ -461,10 +461,10 @@ void TestTitlesView::unknownMatchRoleTakesAll()
     // The view treats the role with the number 0 as unknown.
     for (const auto *role : {"missing", "missing.kind", ".", "shown"}) {
         view.setMatchRole(QString::fromLatin1(role));
-        QCOMPARE(view.values(), "a b"_words);
+        QCOMPARE(view.values(), words("a b"));
     }
     view.setMatchRole(kind);
-    QCOMPARE(view.values(), "a"_words);
+    QCOMPARE(view.values(), words("a"));
 }
 
 void TestTitlesView::objectsToMatch()
@@ -478,12 +478,12 @@ void TestTitlesView::objectsToMatch()
     ListModel model({named("a", firstValue), named("b", secondValue), named("c", 1)});
     NamesView view(&model, kind);
     view.setMatch(secondValue);
-    QCOMPARE(view.values(), "b"_words);
+    QCOMPARE(view.values(), words("b"));
     view.setMatch(QVariantList{firstValue, 1});
-    QCOMPARE(view.values(), "a c"_words);
+    QCOMPARE(view.values(), words("a c"));
     view.setMatchRole("kind.objectName"_s);
     view.setMatch("second"_s);
-    QCOMPARE(view.values(), "b"_words);
+    QCOMPARE(view.values(), words("b"));
 }
 
 void TestTitlesView::arraysOfQml()
@@ -496,13 +496,13 @@ void TestTitlesView::arraysOfQml()
                          QVariant::fromValue(engine.evaluate(QString::fromLatin1(script))));
     };
     setMatch("['one', 3]");
-    QCOMPARE(view.values(), "a c"_words);
+    QCOMPARE(view.values(), words("a c"));
     QCOMPARE(view.match(), QVariant(QVariantList{"one"_s, 3}));
     QSignalSpy changed(&view, &TitlesView::matchChanged);
     setMatch("['one', 3]");
     QCOMPARE(changed.size(), 0);
     setMatch("2");
-    QCOMPARE(view.values(), "b"_words);
+    QCOMPARE(view.values(), words("b"));
     setMatch("undefined");
     QVERIFY(!view.match().isValid());
     QCOMPARE(view.values(), QStringList());
@@ -542,7 +542,7 @@ void TestTitlesView::destroyedMatch()
     QCOMPARE(view.match(), wrap(QVariant::fromValue<QObject *>(nullptr)));
     view.update();
     view.setMatch(1);
-    QCOMPARE(view.values(), "a"_words);
+    QCOMPARE(view.values(), words("a"));
 }
 
 void TestTitlesView::followsTheModel()
@@ -554,13 +554,13 @@ void TestTitlesView::followsTheModel()
     QCOMPARE(view.value(), QString());
     model.insert(0, named("a"));
     model.insert(0, named("b"));
-    QCOMPARE(view.values(), "b a"_words);
+    QCOMPARE(view.values(), words("b a"));
     model.change(1, named("c"));
-    QCOMPARE(view.values(), "b c"_words);
+    QCOMPARE(view.values(), words("b c"));
     model.remove(0);
-    QCOMPARE(view.values(), "c"_words);
+    QCOMPARE(view.values(), words("c"));
     model.reset({named("d")});
-    QCOMPARE(view.values(), "d"_words);
+    QCOMPARE(view.values(), words("d"));
     QCOMPARE(changed.size(), 5);
     // Equal values are not announced.
     model.change(0, named("d", 2));
@@ -579,12 +579,12 @@ void TestTitlesView::ignoresOtherChanges()
     model.moveFirstToEnd();
     model.moveFirstToEnd();
     model.moveFirstToEnd();
-    QCOMPARE(view.values(), "a b"_words);
+    QCOMPARE(view.values(), words("a b"));
     model.reverseLayout();
     model.reverseLayout();
     QCOMPARE(changed.size(), 0);
     view.update();
-    QCOMPARE(view.values(), "b a"_words);
+    QCOMPARE(view.values(), words("b a"));
     QCOMPARE(changed.size(), 1);
 }
 
@@ -613,7 +613,7 @@ void TestTitlesView::settersAnnounceChangesOnly()
     QCOMPARE(role.size(), 1);
     QCOMPARE(matchRole.size(), 1);
     QCOMPARE(match.size(), 1);
-    QCOMPARE(view.values(), "1"_words);
+    QCOMPARE(view.values(), words("1"));
 }
 
 void TestTitlesView::signalsInOrder()
@@ -656,9 +656,9 @@ void TestTitlesView::handlersMayCallBack()
     view.setRole(name);
     view.setModel(&model);
     QCOMPARE(view.model(), &other);
-    QCOMPARE(view.values(), "2"_words);
+    QCOMPARE(view.values(), words("2"));
     model.insert(0, named("c"));
-    QCOMPARE(view.values(), "2"_words);
+    QCOMPARE(view.values(), words("2"));
 }
 
 void TestTitlesView::joins_data()
@@ -666,12 +666,9 @@ void TestTitlesView::joins_data()
     QTest::addColumn<QStringList>("texts");
     QTest::addColumn<QString>("sentence");
     QTest::newRow("none") << QStringList() << QString();
-    QTest::newRow("one") << "a"_words
-                         << "a"_s;
-    QTest::newRow("two") << "a b"_words
-                         << "a and b"_s;
-    QTest::newRow("three") << "a b c"_words
-                           << "a, b, and c"_s;
+    QTest::newRow("one") << words("a") << "a"_s;
+    QTest::newRow("two") << words("a b") << "a and b"_s;
+    QTest::newRow("three") << words("a b c") << "a, b, and c"_s;
 }
 
 void TestTitlesView::joins()
@@ -689,7 +686,7 @@ void TestTitlesView::joins()
     QSignalSpy changed(&view, &TitlesView::valueChanged);
     const TitlesView another;
     QCOMPARE(another.joined(texts), sentence);
-    QCOMPARE(view.joined("x y"_words), "x and y"_s);
+    QCOMPARE(view.joined(words("x y")), "x and y"_s);
     QCOMPARE(view.values(), texts);
     QCOMPARE(changed.size(), 0);
 }
@@ -701,7 +698,7 @@ void TestTitlesView::joinsByTheCurrentLocale()
     QCOMPARE(view.value(), "a, b, and c"_s);
     QLocale::setDefault(QLocale("de_DE"_s));
     QCOMPARE(view.value(), "a, b und c"_s);
-    QCOMPARE(view.joined("a b"_words), "a und b"_s);
+    QCOMPARE(view.joined(words("a b")), "a und b"_s);
 }
 
 QTEST_GUILESS_MAIN(TestTitlesView)

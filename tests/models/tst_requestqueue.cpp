@@ -3,6 +3,7 @@
 
 #include "models/requestqueue.h"
 #include "texts.h"
+#include "words.h"
 
 #include <QAbstractEventDispatcher>
 #include <QEventLoop>
@@ -72,9 +73,9 @@ void TestRequestQueue::runsAtOnceWhileNothingChanges()
     model.scan();
     model.choose("a"_s);
     model.check();
-    QCOMPARE(model.log, "scan a check"_words);
+    QCOMPARE(model.log, words("scan a check"));
     QCoreApplication::processEvents();
-    QCOMPARE(model.log, "scan a check"_words);
+    QCOMPARE(model.log, words("scan a check"));
 }
 
 void TestRequestQueue::updatesRunOnce()
@@ -87,17 +88,17 @@ void TestRequestQueue::updatesRunOnce()
         }
     };
     model.scan();
-    QCOMPARE(model.log, "scan"_words);
+    QCOMPARE(model.log, words("scan"));
     model.handler = [] {};
     QCoreApplication::processEvents();
-    QCOMPARE(model.log, "scan check scan"_words);
+    QCOMPARE(model.log, words("scan check scan"));
 }
 
 void TestRequestQueue::updatesAreAcceptedAgainAfterwards()
 {
     Model model;
     model.handler = [&model] { model.check(); };
-    for (const QStringList &expected : {"scan check"_words, "scan check scan check"_words}) {
+    for (const QStringList &expected : {words("scan check"), words("scan check scan check")}) {
         model.scan();
         QCoreApplication::processEvents();
         QCOMPARE(model.log, expected);
@@ -114,9 +115,9 @@ void TestRequestQueue::choicesRunInOrderAfterTheUpdates()
         model.check();
     };
     model.scan();
-    QCOMPARE(model.log, "scan"_words);
+    QCOMPARE(model.log, words("scan"));
     QCoreApplication::processEvents();
-    QCOMPARE(model.log, "scan check a b a"_words);
+    QCOMPARE(model.log, words("scan check a b a"));
 }
 
 void TestRequestQueue::laterChoiceRunsWhatWaits()
@@ -128,9 +129,9 @@ void TestRequestQueue::laterChoiceRunsWhatWaits()
     };
     model.scan();
     model.choose("b"_s);
-    QCOMPARE(model.log, "scan check a b"_words);
+    QCOMPARE(model.log, words("scan check a b"));
     QCoreApplication::processEvents();
-    QCOMPARE(model.log, "scan check a b"_words);
+    QCOMPARE(model.log, words("scan check a b"));
 }
 
 void TestRequestQueue::choiceWithinAChoiceWaits()
@@ -142,9 +143,9 @@ void TestRequestQueue::choiceWithinAChoiceWaits()
     };
     model.choose("a"_s);
     model.onChoice = [] {};
-    QCOMPARE(model.log, "a end-of-a"_words);
+    QCOMPARE(model.log, words("a end-of-a"));
     QCoreApplication::processEvents();
-    QCOMPARE(model.log, "a end-of-a b"_words);
+    QCOMPARE(model.log, words("a end-of-a b"));
 }
 
 void TestRequestQueue::nestedEventLoopRunsNothing()
@@ -162,10 +163,10 @@ void TestRequestQueue::nestedEventLoopRunsNothing()
     model.scan();
     model.scan();
     QVERIFY(!busy);
-    QCOMPARE(model.log, "scan scan"_words);
+    QCOMPARE(model.log, words("scan scan"));
     model.handler = [] {};
     QCoreApplication::processEvents();
-    QCOMPARE(model.log, "scan scan check a a"_words);
+    QCOMPARE(model.log, words("scan scan check a a"));
 }
 
 void TestRequestQueue::handlersWithoutEndReturnToTheEventLoop()

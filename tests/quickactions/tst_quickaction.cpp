@@ -9,6 +9,7 @@
 #include "simulator/recordingservice.h"
 #include "texts.h"
 #include "usedupdescriptors.h"
+#include "words.h"
 
 #include <QtTest>
 
@@ -166,7 +167,7 @@ void TestQuickAction::getters()
     write("title=a, b\nicon=a, b\n");
     const Action other(m_path, false);
     QVERIFY(!other.enabled());
-    QCOMPARE(other.icon(), QVariant("a b"_words));
+    QCOMPARE(other.icon(), QVariant(words("a b")));
     QVERIFY(!other.priority());
     for (const QString &text :
          {other.title(), other.translationCatalog(), other.requiredPackage(), other.service(),
@@ -191,8 +192,8 @@ void TestQuickAction::readsKeys_data()
         title("x"_s));
     row("unknown key", "colour=red\n", {{"colour"_s, "red"_s}});
     row("empty value", "title=\n", title(QString()));
-    row("list", "title=a, b\n", title("a b"_words));
-    row("list with an at sign", "title=@a, b\n", title("@a b"_words));
+    row("list", "title=a, b\n", title(words("a b")));
+    row("list with an at sign", "title=@a, b\n", title(words("@a b")));
     row("quoted comma", "title=\"a, b\"\n", title("a, b"_s));
     row("Latin 1", "title=\xe4\n", title("ä"_s));
     row("UTF-8", "title=\xc3\xa4!\n", title("Ã¤!"_s));
@@ -227,13 +228,14 @@ void TestQuickAction::readsArguments_data()
     QTest::newRow("no section") << QByteArray("title=x\n") << QVariant();
     row("in their order", section + "size=2\n2\\argument=b\n1\\argument=a\n", {"a"_s, "b"_s});
     row("always texts", section + "size=2\n1\\argument=1\n2\\argument=true\n", {"1"_s, "true"_s});
-    row("list among them", section + "size=1\n1\\argument=a, b\n", {"a b"_words});
+    row("list among them", section + "size=1\n1\\argument=a, b\n", {words("a b")});
     row("lists with an at sign",
         section
             + "size=5\n1\\argument=me, @home\n2\\argument=@me, home\n3\\argument=\"me\", "
               "\"@home\"\n"
               "4\\argument=@@me, @home\n5\\argument=\"me, @home\"\n",
-        {"me @home"_words, "@me home"_words, "me @home"_words, "@me @home"_words, "me, @home"_s});
+        {words("me @home"), words("@me home"), words("me @home"), words("@me @home"),
+         "me, @home"_s});
     row("list with another type", section + "size=1\n1\\argument=me, @Point(1 2)\n",
         {QVariant(QVariantList{"me"_s, QPoint(1, 2)})});
     row("size 0", section + "size=0\n1\\argument=a\n", {});
@@ -529,7 +531,7 @@ void TestQuickAction::sendsTheCall_data()
     row("texts and lists",
         "[remote-arguments]\nsize=4\n1\\argument=1\n2\\argument=true\n3\\argument=a, b\n"
         "4\\argument=me, @home\n",
-        "ssasas", {"1"_s, "true"_s, "a b"_words, "me @home"_words});
+        "ssasas", {"1"_s, "true"_s, words("a b"), words("me @home")});
 }
 
 void TestQuickAction::sendsTheCall()

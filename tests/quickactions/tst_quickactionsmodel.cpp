@@ -7,6 +7,7 @@
 #include "mgconfitem.h"
 #include "quickactions/quickactionsmodel.h"
 #include "texts.h"
+#include "words.h"
 
 #include <QRegularExpression>
 #include <QtTest>
@@ -427,7 +428,7 @@ void TestQuickActionsModel::ordersByPriority()
 {
     QFETCH(QByteArrayList, priorities);
     QFETCH(QByteArray, priority);
-    const QStringList rowNames = "a b c d"_words.mid(0, priorities.size());
+    const QStringList rowNames = words("a b c d").mid(0, priorities.size());
     for (int i = 0; i < priorities.size(); ++i) {
         add(rowNames.at(i), "priority=" + priorities.at(i) + '\n');
     }
@@ -482,13 +483,13 @@ void TestQuickActionsModel::catalogsOfARowChangeWithIt()
     connect(m_model.get(), &Model::rowsAboutToBeRemoved, this, note);
     connect(m_model.get(), &Model::rowsRemoved, this, note);
     setEnabled("a"_s);
-    QCOMPARE(texts, "maps-title Kartat"_words);
+    QCOMPARE(texts, words("maps-title Kartat"));
     // The catalog stays until its last row goes.
     setEnabled("a b"_s);
     setEnabled("b"_s);
-    QCOMPARE(texts.mid(2), "Kartat Kartat Kartat Kartat"_words);
+    QCOMPARE(texts.mid(2), words("Kartat Kartat Kartat Kartat"));
     setEnabled(QString());
-    QCOMPARE(texts.mid(6), "Kartat maps-title"_words);
+    QCOMPARE(texts.mid(6), words("Kartat maps-title"));
 }
 
 void TestQuickActionsModel::changedCatalogIsAdded()
@@ -834,7 +835,7 @@ void TestQuickActionsModel::irregularDefinitionsAreListed()
 
 void TestQuickActionsModel::definitionFilter()
 {
-    for (const QString &name : "A.CONF a.conf.orig .hidden.conf below/b.conf"_words) {
+    for (const QString &name : words("A.CONF a.conf.orig .hidden.conf below/b.conf")) {
         Files::write(inDirectory(name), "title=x\n");
     }
     loadModel(true);

@@ -7,6 +7,7 @@
 #include "quickactions/quickactionsmodel.h"
 #include "randommodeltest.h"
 #include "texts.h"
+#include "words.h"
 
 #include <QDir>
 #include <QSettings>
@@ -216,7 +217,7 @@ private:
 
 TestRandomActions::TestRandomActions() : RandomModelTest(directory, enabledKey)
 {
-    for (const QString &name : "a b c D e f g h"_words) {
+    for (const QString &name : words("a b c D e f g h")) {
         m_paths.append("%1/%2.conf"_s.arg(directory, name));
     }
 }

@@ -5,6 +5,7 @@
 
 #include "files.h"
 #include "texts.h"
+#include "words.h"
 
 #include <QtTest>
 
@@ -17,7 +18,7 @@ void ListModelTest::init()
 {
     Files::remove(m_directory);
     Files::makeDirectory(m_directory);
-    Files::installCatalogs("maps_eng_en maps-fi atlas_eng_en"_words);
+    Files::installCatalogs(words("maps_eng_en maps-fi atlas_eng_en"));
     QLocale::setDefault(QLocale("fi_FI"_s));
     LoggedTest::init();
 }

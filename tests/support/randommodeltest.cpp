@@ -6,7 +6,9 @@
 #include "dconftool.h"
 #include "files.h"
 #include "mgconfitem.h"
+#include "patience.h"
 #include "texts.h"
+#include "words.h"
 
 #include <QtTest>
 
@@ -17,8 +19,6 @@
 #include <vector>
 
 namespace {
-
-constexpr int patience = 60000; // ms, of a machine that is very busy
 
 // Keeps all processors busy while it lives, so that threads of dconf are interrupted anywhere.
 class BusyMachine
@@ -78,7 +78,7 @@ RandomModelTest::RandomModelTest(const QString &directory, const QString &key)
 
 void RandomModelTest::initTestCase()
 {
-    Files::installCatalogs("maps_eng_en maps-fi atlas_eng_en"_words);
+    Files::installCatalogs(words("maps_eng_en maps-fi atlas_eng_en"));
     QLocale::setDefault(QLocale("fi_FI"_s));
 }
 
@@ -173,7 +173,7 @@ QString RandomModelTest::storeInAnotherProcess(const QStringList &list)
 void RandomModelTest::waitForReload()
 {
     const int before = m_reloads;
-    QTRY_VERIFY_WITH_TIMEOUT(m_reloads > before, patience);
+    TRY(m_reloads > before);
 }
 
 QStringList RandomModelTest::listOf(const QStringList &paths, int size)

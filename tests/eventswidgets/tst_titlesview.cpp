@@ -431,6 +431,7 @@ void TestTitlesView::matches_data()
                           << QStringList{"text 1"_s, "one"_s, "number 1"_s, "true"_s};
     QTest::newRow("texts") << QVariant(words("one 2"))
                            << QStringList{"one"_s, "number 2"_s, "list"_s};
+    QTest::newRow("texts in another case") << QVariant(words("One LIST")) << QStringList();
     QTest::newRow("texts and true") << QVariant(words("true")) << words("true");
     QTest::newRow("empty text") << QVariant(QStringList{QString()}) << QStringList();
     QTest::newRow("no texts") << QVariant(QStringList()) << QStringList();

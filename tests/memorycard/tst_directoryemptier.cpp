@@ -11,6 +11,7 @@
 #include <QFile>
 #include <QHash>
 #include <QTest>
+#include <QThread>
 #include <QVector>
 
 #include <algorithm>
@@ -21,7 +22,6 @@
 
 #include <dirent.h>
 #include <fcntl.h>
-#include <pthread.h>
 #include <sys/mount.h>
 #include <sys/prctl.h>
 #include <sys/wait.h>
@@ -32,7 +32,7 @@ using namespace FileTree;
 namespace {
 
 constexpr int maxOpenDescriptors = 57;
-constexpr std::size_t smallStackSize = 256 * 1024;
+constexpr uint smallStackSize = 256 * 1024;
 // The depth of a tree in which the walk cannot keep all directories open.
 constexpr int deep = 150;
 
@@ -455,30 +455,19 @@ void tst_DirectoryEmptier::wideDirectoriesInDeepTree()
 void tst_DirectoryEmptier::veryDeep()
 {
     makeChain(m_top, 50000);
-    struct Run {
-        QByteArray top;
-        bool emptied = false;
-        int openDescriptors = 0;
-    } run;
-    run.top = m_top;
+    bool emptied = false;
+    int openDescriptors = 0;
+    const std::unique_ptr<QThread> thread(QThread::create([&] {
+        const CallCounter counter;
+        emptied = empty(m_top);
+        openDescriptors = counter.openDescriptors;
+    }));
+    thread->setStackSize(smallStackSize);
+    thread->start();
+    QVERIFY(thread->wait());
 
-    pthread_attr_t attributes = {};
-    QCOMPARE(pthread_attr_init(&attributes), 0);
-    QCOMPARE(pthread_attr_setstacksize(&attributes, smallStackSize), 0);
-    pthread_t thread = {};
-    const auto body = [](void *argument) -> void * {
-        auto *const run = static_cast<Run *>(argument);
-        CallCounter counter;
-        run->emptied = empty(run->top);
-        run->openDescriptors = counter.openDescriptors;
-        return nullptr;
-    };
-    QCOMPARE(pthread_create(&thread, &attributes, body, &run), 0);
-    pthread_join(thread, nullptr);
-    pthread_attr_destroy(&attributes);
-
-    QVERIFY(run.emptied);
-    QCOMPARE(run.openDescriptors, maxOpenDescriptors);
+    QVERIFY(emptied);
+    QCOMPARE(openDescriptors, maxOpenDescriptors);
     QCOMPARE(list(m_top), QByteArrayList());
 }
 

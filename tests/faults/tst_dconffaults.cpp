@@ -25,23 +25,24 @@
 #include <csignal>
 #include <functional>
 #include <memory>
+#include <optional>
 #include <type_traits>
 
 #include <glib.h>
 
-// A type with one choice that it keeps in dconf.
-class User
-{
-public:
-    virtual ~User() = default;
-    virtual void choose(bool on) = 0;
-    virtual bool isOn() const = 0;
-    // The key, and the output of the dconf tool for each of the two choices.
-    virtual QString key() const = 0;
-    virtual QByteArray stored(bool on) const = 0;
+// An object with one choice that it keeps in dconf.
+struct User {
+    QString key;
+    // The output of the dconf tool for each of the two choices.
+    QByteArray on;
+    QByteArray off;
+    std::function<void(bool choice)> choose;
+    std::function<bool()> isOn;
+
+    QByteArray stored(bool choice) const { return choice ? on : off; }
 };
 
-using MakeUser = std::function<std::unique_ptr<User>()>;
+using MakeUser = std::function<User()>;
 Q_DECLARE_METATYPE(MakeUser)
 
 // Every function runs for each type that keeps something in dconf.
@@ -73,7 +74,7 @@ private:
     void takeFailedWrites();
 
     MakeUser m_make;
-    std::unique_ptr<User> m_user;
+    std::optional<User> m_user;
     std::unique_ptr<MessageLog> m_log;
 };
 
@@ -99,55 +100,43 @@ const QStringList allKeys =
             "/settings/location/here_state /settings/location/custom_settings_enabled");
 
 const QString actionPath = QStringLiteral("/usr/share/glimmera/quickactions/lamp.conf");
-const QString widgetPath = QStringLiteral("weather");
 
 // A model that keeps the paths of what is enabled.
-template<typename Model, auto enable, auto disable> class ListUser : public User
+template<typename Model>
+User listUser(const QString &key, const QString &path, void (Model::*enable)(const QString &),
+              void (Model::*disable)(const QString &))
 {
-public:
-    ListUser(QString key, QString path) : m_key(std::move(key)), m_path(std::move(path))
-    {
-        if constexpr (std::is_same_v<Model, QuickActionsModel>) {
-            m_model.setShowPotential(true);
-        } else {
-            // The other model has rows below its rows, which the tester refuses.
-            new QAbstractItemModelTester(&m_model, &m_model);
-        }
-        m_model.componentComplete();
+    const auto model = std::make_shared<Model>();
+    if constexpr (std::is_same_v<Model, QuickActionsModel>) {
+        model->setShowPotential(true);
+    } else {
+        // The other model has rows below its rows, which the tester refuses.
+        new QAbstractItemModelTester(model.get(), model.get());
     }
-    void choose(bool on) override { (m_model.*(on ? enable : disable))(m_path); }
-    bool isOn() const override
-    {
-        return m_model.data(m_model.index(0), Model::EnabledRole).toBool();
-    }
-    QString key() const override { return m_key; }
-    QByteArray stored(bool on) const override
-    {
-        return on ? "['" + m_path.toUtf8() + "']" : "@as []";
-    }
+    model->componentComplete();
+    return {key, "['" + path.toUtf8() + "']", "@as []",
+            [=](bool choice) { (model.get()->*(choice ? enable : disable))(path); },
+            [=] { return model->data(model->index(0), Model::EnabledRole).toBool(); }};
+}
 
-private:
-    const QString m_key;
-    const QString m_path;
-    Model m_model;
-};
-
-using ActionsUser = ListUser<QuickActionsModel, &QuickActionsModel::enableAction,
-                             &QuickActionsModel::disableAction>;
-using WidgetsUser = ListUser<EventsWidgetsModel, &EventsWidgetsModel::enableWidget,
-                             &EventsWidgetsModel::disableWidget>;
-
-class LocationUser : public User
+User actionsUser()
 {
-public:
-    void choose(bool on) override { m_location.setGpsEnabled(on); }
-    bool isOn() const override { return m_location.gpsEnabled(); }
-    QString key() const override { return gpsKey; }
-    QByteArray stored(bool on) const override { return on ? "true" : "false"; }
+    return listUser(actionsKey, actionPath, &QuickActionsModel::enableAction,
+                    &QuickActionsModel::disableAction);
+}
 
-private:
-    LocationConfiguration m_location;
-};
+User widgetsUser()
+{
+    return listUser(widgetsKey, QStringLiteral("weather"), &EventsWidgetsModel::enableWidget,
+                    &EventsWidgetsModel::disableWidget);
+}
+
+User locationUser()
+{
+    const auto location = std::make_shared<LocationConfiguration>();
+    return {gpsKey, "true", "false", [=](bool choice) { location->setGpsEnabled(choice); },
+            [=] { return location->gpsEnabled(); }};
+}
 
 // Several keys in one write, of whatever size.
 void load(const QStringList &keys, const QByteArray &value)
@@ -261,12 +250,9 @@ GLogWriterOutput intoMessageLog(GLogLevelFlags level, const GLogField *fields, g
 void TestDconfFaults::initTestCase_data()
 {
     QTest::addColumn<MakeUser>("make");
-    QTest::newRow("QuickActionsModel")
-        << MakeUser([] { return std::make_unique<ActionsUser>(actionsKey, actionPath); });
-    QTest::newRow("EventsWidgetsModel")
-        << MakeUser([] { return std::make_unique<WidgetsUser>(widgetsKey, widgetPath); });
-    QTest::newRow("LocationConfiguration")
-        << MakeUser([] { return std::make_unique<LocationUser>(); });
+    QTest::newRow("QuickActionsModel") << MakeUser(actionsUser);
+    QTest::newRow("EventsWidgetsModel") << MakeUser(widgetsUser);
+    QTest::newRow("LocationConfiguration") << MakeUser(locationUser);
 }
 
 void TestDconfFaults::init()
@@ -312,7 +298,7 @@ bool TestDconfFaults::stores(bool on)
 
 bool TestDconfFaults::isStored(bool on) const
 {
-    return DconfTool::read(m_user->key()) == m_user->stored(on);
+    return DconfTool::read(m_user->key) == m_user->stored(on);
 }
 
 bool TestDconfFaults::aWriteFails()
@@ -333,7 +319,7 @@ void TestDconfFaults::serviceHangs()
     m_user->choose(true);
     m_user->choose(false);
     TRY(!m_user->isOn());
-    QVERIFY(!m_make()->isOn());
+    QVERIFY(!m_make().isOn());
     QVERIFY(isStored(true));
     service.goOn();
     TRY(isStored(false));
@@ -342,15 +328,15 @@ void TestDconfFaults::serviceHangs()
 
 void TestDconfFaults::goesWhileTheServiceHangs()
 {
-    const QString key = m_user->key();
+    const QString key = m_user->key;
     const QByteArray stored = m_user->stored(true);
     StoppedService service;
     m_user->choose(true);
     m_user.reset();
-    delete m_make().release();
+    m_make();
     service.goOn();
     TRY_COMPARE(DconfTool::read(key), stored);
-    QVERIFY(m_make()->isOn());
+    QVERIFY(m_make().isOn());
 }
 
 void TestDconfFaults::serviceDiesInTheMiddleOfAWrite()
@@ -388,7 +374,7 @@ void TestDconfFaults::serviceIsAbsent()
     m_user->choose(true);
     QVERIFY(aWriteFails());
     TRY_COMPARE(m_user->isOn(), false);
-    QVERIFY(!m_make()->isOn());
+    QVERIFY(!m_make().isOn());
 
     QVERIFY(QFile::rename(away, serviceFile));
     reloadBusConfiguration();
@@ -433,19 +419,19 @@ void TestDconfFaults::everyOtherType()
                                   "@a{sv} {}",
                                   "[{'key': <('a', @mi 7)>}]",
                                   "{'key', <7>}"};
-    Change change(m_user->key());
+    Change change(m_user->key);
     for (const char *value : values) {
         load(allKeys, value);
         QVERIFY2(change.hasCome(), value);
         // Both what follows and what comes only now.
         m_user->isOn();
-        m_make()->isOn();
+        m_make().isOn();
         LocationConfiguration().restoreCustomSettings();
     }
     reset();
     QVERIFY(change.hasCome());
     load({widgetsKey}, "@as []");
-    QVERIFY(m_user->key() != widgetsKey || change.hasCome());
+    QVERIFY(m_user->key != widgetsKey || change.hasCome());
     QVERIFY(stores(true));
     QVERIFY(m_user->isOn());
 }
@@ -469,7 +455,7 @@ void TestDconfFaults::hugeLists()
     QCOMPARE(MGConfItem(actionsKey).value().toStringList().size(), many);
     QCOMPARE(MGConfItem(customKey).value().toMap().size(), many + 1);
     QVERIFY(!m_user->isOn());
-    QVERIFY(!m_make()->isOn());
+    QVERIFY(!m_make().isOn());
     QCOMPARE(LocationConfiguration().gpsEnabled(), false);
     LocationConfiguration().restoreCustomSettings();
     QCOMPARE(LocationConfiguration().gpsEnabled(), true);
@@ -477,10 +463,10 @@ void TestDconfFaults::hugeLists()
 
     // Replacing such a long list is slow, because dconf compares it with the new one. The test
     // therefore removes the list before it makes a choice.
-    Change keyChange(m_user->key());
+    Change keyChange(m_user->key);
     reset();
     QVERIFY(keyChange.hasCome());
-    if (m_user->key() == widgetsKey) {
+    if (m_user->key == widgetsKey) {
         load({widgetsKey}, "@as []");
         QVERIFY(keyChange.hasCome());
     }
@@ -500,7 +486,7 @@ void TestDconfFaults::hugeDatabase()
     QVERIFY(!m_user->isOn());
     QVERIFY(stores(true));
     QVERIFY(m_user->isOn());
-    QVERIFY(m_make()->isOn());
+    QVERIFY(m_make().isOn());
 }
 
 void TestDconfFaults::tenThousandNotifications()
@@ -513,11 +499,11 @@ void TestDconfFaults::tenThousandNotifications()
         QDBusMessage notify = QDBusMessage::createSignal(
             QStringLiteral("/ca/desrt/dconf/Writer/user"), QStringLiteral("ca.desrt.dconf.Writer"),
             QStringLiteral("Notify"));
-        notify.setArguments({m_user->key(), QStringList{QString()}, QStringLiteral("tag")});
+        notify.setArguments({m_user->key, QStringList{QString()}, QStringLiteral("tag")});
         QVERIFY(bus.send(notify));
     }
     // And then there is.
-    load({m_user->key()}, m_user->stored(false));
+    load({m_user->key}, m_user->stored(false));
     TRY(!m_user->isOn());
     QDBusConnection::disconnectFromBus(QStringLiteral("notifications"));
 }

@@ -11,6 +11,7 @@
 #include "loggedtest.h"
 #include "quickactions/quickaction.h"
 #include "quickactions/quickactionsmodel.h"
+#include "words.h"
 
 #include <QDir>
 #include <QJsonArray>
@@ -314,11 +315,10 @@ void TestCorpus::agreesOnEventsWidgets()
             differences.append(QStringLiteral("%1 is another").arg(QLatin1String(key)));
         }
     };
-    const QStringList fileKeys = {QStringLiteral("translation_catalog"), QStringLiteral("widgets")};
+    const QStringList fileKeys = words("translation_catalog widgets");
     const QStringList widgetKeys =
-        QStringLiteral("path title translation_id description_id icon order default_enabled "
-                       "available_path")
-            .split(QLatin1Char(' '));
+        words("path title translation_id description_id icon order default_enabled "
+              "available_path");
     int members = 0;
     if (file) {
         const QJsonObject object = QJsonDocument::fromJson(content).object();

@@ -6,6 +6,7 @@
 #include "files.h"
 #include "loggedtest.h"
 #include "mgconfitem.h"
+#include "patience.h"
 #include "simulator/recordingservice.h"
 
 #include <QDir>
@@ -65,7 +66,6 @@ namespace {
 const QString glimmera = QStringLiteral("/usr/share/glimmera");
 const QString quickActions = QStringLiteral("/usr/share/glimmera/quickactions/");
 const QString eventsWidgets = QStringLiteral("/usr/share/glimmera/eventswidgets/");
-constexpr int timeout = 60000; // ms
 
 // Makes a file of the given name.
 using Make = std::function<void(const QString &)>;
@@ -107,7 +107,7 @@ Result run(const QByteArray &line, const char *locale = "C.UTF-8")
     process.setProcessEnvironment(environment);
     process.start(QStringLiteral(PROGRAM),
                   QString::fromUtf8(line).split(QLatin1Char(' '), Qt::SkipEmptyParts));
-    if (!process.waitForFinished(timeout) || process.exitStatus() != QProcess::NormalExit) {
+    if (!process.waitForFinished(patience) || process.exitStatus() != QProcess::NormalExit) {
         process.kill();
         process.waitForFinished();
         QTest::qFail("the program crashed or did not end", __FILE__, __LINE__);
@@ -432,7 +432,7 @@ void TestMarloDefinitions::outputThatCannotBeWritten()
     QProcess process;
     process.setStandardOutputFile(QStringLiteral("/dev/full"));
     process.start(QStringLiteral(PROGRAM), {QStringLiteral("check"), QStringLiteral("a.conf")});
-    QVERIFY(process.waitForFinished(timeout));
+    QVERIFY(process.waitForFinished(patience));
     QCOMPARE(process.exitStatus(), QProcess::NormalExit);
     QCOMPARE(process.exitCode(), 2);
 }
@@ -535,7 +535,7 @@ void TestMarloDefinitions::showSendsTheSameCall()
 
     QProcess shell;
     shell.start(QStringLiteral("/bin/sh"), {QStringLiteral("-c"), line});
-    QTRY_COMPARE_WITH_TIMEOUT(shell.state(), QProcess::NotRunning, timeout);
+    TRY_COMPARE(shell.state(), QProcess::NotRunning);
     QCOMPARE(shell.exitCode(), 0);
     QCOMPARE(lamp.calls().size(), 1);
     const QDBusMessage message = lamp.calls().constFirst();

@@ -4,6 +4,7 @@
 #include "deviceinfo/kivinfo.h"
 #include "interfaceof.h"
 #include "loggedtest.h"
+#include "patience.h"
 #include "simulator/coverdaemon.h"
 
 #include <QDBusArgument>
@@ -526,7 +527,7 @@ void TestKivInfo::defaultsWithoutABus()
                        QStringLiteral("unix:path=/nowhere"));
     child.setProcessEnvironment(environment);
     child.start(QCoreApplication::applicationFilePath(), {QStringLiteral("--without-a-bus")});
-    QVERIFY(child.waitForFinished(60000));
+    QVERIFY(child.waitForFinished(patience));
     QCOMPARE(child.exitStatus(), QProcess::NormalExit);
     QCOMPARE(child.exitCode(), 0);
     QCOMPARE(child.readAllStandardError(), QByteArray());

@@ -5,6 +5,7 @@
 #include "interfaceof.h"
 #include "locationswitches.h"
 #include "loggedtest.h"
+#include "patience.h"
 
 #include <QProcess>
 #include <QtTest>
@@ -317,21 +318,20 @@ void TestLocationSettings::anotherProcessFollows()
     process.start(QCoreApplication::applicationFilePath(), {QStringLiteral("--another")});
     QByteArray said;
     connect(&process, &QProcess::readyRead, this, [&] { said += process.readAll(); });
-    QTRY_COMPARE_WITH_TIMEOUT(said, QByteArray("1 0 0 0\n"), 60000);
+    TRY_COMPARE(said, QByteArray("1 0 0 0\n"));
     settings.setMlsEnabled(true);
-    QTRY_COMPARE_WITH_TIMEOUT(said, QByteArray("1 0 0 0\n1 1 0 0\n"), 60000);
+    TRY_COMPARE(said, QByteArray("1 0 0 0\n1 1 0 0\n"));
     settings.setMlsOnlineState(State(2));
-    QTRY_COMPARE_WITH_TIMEOUT(said, QByteArray("1 0 0 0\n1 1 0 0\n1 1 2 0\n"), 60000);
+    TRY_COMPARE(said, QByteArray("1 0 0 0\n1 1 0 0\n1 1 2 0\n"));
 
     // And the other way round.
     changes.clear();
     process.write("now you\n");
-    QTRY_COMPARE_WITH_TIMEOUT(changes.join(QLatin1Char(',')), QStringLiteral("gps 0,here 1"),
-                              60000);
+    TRY_COMPARE(changes.join(QLatin1Char(',')), QStringLiteral("gps 0,here 1"));
     QCOMPARE(switchesOf(settings), Switches({0, 1, 2, 1}));
 
     process.closeWriteChannel();
-    QTRY_COMPARE_WITH_TIMEOUT(process.state(), QProcess::NotRunning, 60000);
+    TRY_COMPARE(process.state(), QProcess::NotRunning);
     QCOMPARE(process.exitStatus(), QProcess::NormalExit);
     QCOMPARE(process.exitCode(), 0);
     QCOMPARE(said, QByteArray("1 0 0 0\n1 1 0 0\n1 1 2 0\n0 1 2 0\n0 1 2 1\n"));

@@ -22,6 +22,7 @@
 
 #include <cerrno>
 #include <functional>
+#include <initializer_list>
 
 #include <dlfcn.h>
 #include <sys/mount.h>
@@ -160,7 +161,6 @@ private Q_SLOTS:
 
     void withoutADeviceName();
     void refusedCommandLeavesItsQueueBehind();
-    void leftCommandsKeepTheirPath();
     void emptyTypeDuringARequest();
     void formatsOneAfterTheOther();
     void probeWaitsForTheRequest();
@@ -185,7 +185,6 @@ private Q_SLOTS:
     void goesDuringAFormat_data();
     void goesDuringAFormat();
     void goesWhileFilesAreRemoved();
-    void goesAfterAFailure();
 
 private:
     // The disk service that does what the words say, alone or with a card for the formatter.
@@ -198,6 +197,7 @@ private:
     void request(bool mounts);
     // The scenarios "missing" and "not executable" are helpers that cannot be started.
     void installHelper(const QString &scenario, const QByteArray &output = QByteArray());
+    static void addScenarios(std::initializer_list<const char *> scenarios);
     // A helper that works, and what it finds when it probes.
     void installProbe(const QByteArray &output) { m_helper->install(done, output); }
     std::unique_ptr<QObject> createFromQml(const QByteArray &source);
@@ -269,6 +269,14 @@ void TestMemoryCardFormatter::installHelper(const QString &scenario, const QByte
         m_helper->installNotExecutable();
     } else {
         m_helper->install(scenario, output);
+    }
+}
+
+void TestMemoryCardFormatter::addScenarios(std::initializer_list<const char *> scenarios)
+{
+    QTest::addColumn<QString>("scenario");
+    for (const char *scenario : scenarios) {
+        QTest::newRow(scenario) << QString::fromLatin1(scenario);
     }
 }
 
@@ -673,10 +681,7 @@ void TestMemoryCardFormatter::format()
 
 void TestMemoryCardFormatter::failedFormat_data()
 {
-    QTest::addColumn<QString>("scenario");
-    for (const char *scenario : {"missing", "crash", "exit=1", "exit=255"}) {
-        QTest::newRow(scenario) << QString::fromLatin1(scenario);
-    }
+    addScenarios({"missing", "crash", "exit=1", "exit=255"});
 }
 
 void TestMemoryCardFormatter::failedFormat()
@@ -902,14 +907,13 @@ void TestMemoryCardFormatter::errorEndsTheSequence()
 
 void TestMemoryCardFormatter::alreadyDoneGoesOn_data()
 {
-    QTest::addColumn<QByteArray>("error");
-    QTest::newRow("AlreadyMounted") << QByteArray("AlreadyMounted");
-    QTest::newRow("AlreadyUnmounting") << QByteArray("AlreadyUnmounting");
+    addScenarios({"AlreadyMounted", "AlreadyUnmounting"});
 }
 
 void TestMemoryCardFormatter::alreadyDoneGoesOn()
 {
-    QFETCH(QByteArray, error);
+    QFETCH(QString, scenario);
+    const QByteArray error = scenario.toLatin1();
     start(error.constData());
     m_formatter->format(vfat);
     // The status passes over what was not done.
@@ -995,42 +999,30 @@ void TestMemoryCardFormatter::refusedCommandLeavesItsQueueBehind()
 {
     startDiskService("done");
     setCard(QString(), card);
-    m_formatter->format(vfat);
+    m_formatter->format(ext4);
     QCOMPARE(takeLog(), unmountWithoutName);
     QCOMPARE(events(), QByteArray("not busy"));
     QCOMPARE(m_formatter->status(), Formatter::Idle);
 
-    // The rest of the queue runs first, with the name set since then.
-    m_formatter->setDeviceName(cardName);
-    forgetEvents()->unmount();
-    TRY_EVENTS("not busy, Formatting, busy, Mounting, Unmounting, Idle, not busy");
-    QCOMPARE(m_helper->runs().last(), words("format_vfat testcard1"));
-    QCOMPARE(m_diskService->members(), words("Mount Unmount"));
-    QCOMPARE(m_diskService->calls().first().path, objectPath(cardName));
-}
-
-void TestMemoryCardFormatter::leftCommandsKeepTheirPath()
-{
-    startDiskService("done");
-    setCard(QString(), card);
-    m_formatter->format(ext4);
-    QCOMPARE(takeLog(), unmountWithoutName);
-    // The probe of the new path comes behind what is left of the sequence.
+    // The rest of the queue runs before the next request, with the name set since then and the path
+    // set before.
     m_formatter->setDeviceName(otherCardName);
-    m_formatter->setDevicePath(otherCard);
-    TRY_EVENTS("not busy, name testcard2, path /dev/testcard2, Formatting, busy, Mounting, "
-               "Probing, Idle, not busy");
+    forgetEvents()->setDevicePath(otherCard);
+    TRY_EVENTS("path /dev/testcard2, Formatting, busy, Mounting, Probing, Idle, not busy");
     QCOMPARE(m_helper->runs(),
              (QList<QStringList>{words("probe testcard1"), words("format_ext4 testcard1"),
                                  words("probe testcard2")}));
+    QCOMPARE(m_diskService->members(), words("Mount"));
+    QCOMPARE(m_diskService->calls().first().path, objectPath(otherCardName));
 
-    // If the rest fails, the probe is dropped.
+    // If the rest fails, the next request is dropped.
     m_formatter->setDeviceName(QString());
     m_formatter->removeAllFiles();
     QCOMPARE(takeLog(), mountWithoutName);
-    forgetEvents()->setDevicePath(card);
-    TRY_EVENTS("path /dev/testcard1, RemovingFiles, busy, Error, not busy");
-    QCOMPARE(m_helper->runs().size(), 3);
+    m_formatter->setDeviceName(cardName);
+    forgetEvents()->unmount();
+    TRY_EVENTS("not busy, RemovingFiles, busy, Error, not busy");
+    QCOMPARE(m_diskService->members(), words("Mount"));
 }
 
 void TestMemoryCardFormatter::emptyTypeDuringARequest()
@@ -1334,6 +1326,7 @@ void TestMemoryCardFormatter::statusIsLogged()
 
 void TestMemoryCardFormatter::goesDuringARequest()
 {
+    // Before the disk service replies.
     startWithoutPath("hung");
     m_formatter->mount();
     TRY_COMPARE(m_diskService->members(), words("Mount"));
@@ -1341,19 +1334,29 @@ void TestMemoryCardFormatter::goesDuringARequest()
     m_diskService->replyToKept();
     QTest::qWait(100);
 
+    // Before the request has been sent.
     makeFormatter();
     startWithoutPath("gone");
     m_formatter->mount();
     m_formatter.reset();
     QTest::qWait(100);
+
+    // Right after a failure, when a handler has queued a request.
+    makeFormatter();
+    startWithoutPath("Failed");
+    onStatus(Formatter::Error, [this] { m_formatter->mount(); });
+    m_formatter->mount();
+    while (m_formatter->status() != Formatter::Error) {
+        QCoreApplication::processEvents(QEventLoop::WaitForMoreEvents);
+    }
+    m_formatter.reset();
+    QTest::qWait(100);
+    takeLog();
 }
 
 void TestMemoryCardFormatter::goesDuringAProbe_data()
 {
-    QTest::addColumn<QString>("scenario");
-    for (const char *scenario : {"hung", "held", "crash", "missing"}) {
-        QTest::newRow(scenario) << QString::fromLatin1(scenario);
-    }
+    addScenarios({"hung", "held", "crash", "missing"});
 }
 
 void TestMemoryCardFormatter::goesDuringAProbe()
@@ -1421,20 +1424,6 @@ void TestMemoryCardFormatter::goesWhileFilesAreRemoved()
     // It is not waited for, and does not stop.
     TRY_COMPARE(mountedCard.files(), QStringList());
     TRY(QThreadPool::globalInstance()->activeThreadCount() == 0);
-}
-
-void TestMemoryCardFormatter::goesAfterAFailure()
-{
-    startWithoutPath("Failed");
-    // This request is still queued when the formatter is destroyed.
-    onStatus(Formatter::Error, [this] { m_formatter->mount(); });
-    m_formatter->mount();
-    while (m_formatter->status() != Formatter::Error) {
-        QCoreApplication::processEvents(QEventLoop::WaitForMoreEvents);
-    }
-    m_formatter.reset();
-    QTest::qWait(100);
-    takeLog();
 }
 
 QTEST_GUILESS_MAIN(TestMemoryCardFormatter)

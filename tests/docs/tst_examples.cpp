@@ -7,6 +7,7 @@
 #include "loggedtest.h"
 #include "mgconfitem.h"
 #include "simulator/recordingservice.h"
+#include "words.h"
 
 #include <QAbstractItemModel>
 #include <QDir>
@@ -131,11 +132,11 @@ void TestExamples::definesAWidget()
     auto *model = qobject_cast<QAbstractItemModel *>(object.get());
     QVERIFY(model != nullptr);
     QCOMPARE(model->rowCount(), 1);
-    QCOMPARE(valueAt(*model, 0, "title"), QVariant(QStringLiteral("Weather")));
-    QCOMPARE(valueAt(*model, 0, "description"), QVariant(QString()));
-    QCOMPARE(valueAt(*model, 0, "icon"), QVariant(QStringLiteral("image://theme/weather")));
-    QCOMPARE(valueAt(*model, 0, "path"),
-             QVariant(QStringLiteral("/usr/share/weather/EventsWidget.qml")));
+    const auto text = [model](const char *role) { return valueAt(*model, 0, role).toString(); };
+    QCOMPARE(text("title"), QStringLiteral("Weather"));
+    QCOMPARE(text("description"), QString());
+    QCOMPARE(text("icon"), QStringLiteral("image://theme/weather"));
+    QCOMPARE(text("path"), QStringLiteral("/usr/share/weather/EventsWidget.qml"));
     QCOMPARE(valueAt(*model, 0, "enabled"), QVariant(true));
     QCOMPARE(valueAt(*model, 0, "available"), QVariant(false));
 
@@ -171,9 +172,8 @@ void TestExamples::listsTheActionOnAPage()
 void TestExamples::runsThoseOfTheReference_data()
 {
     QTest::addColumn<QByteArray>("document");
-    const QStringList directories = {QStringLiteral("deviceinfo"), QStringLiteral("documents"),
-                                     QStringLiteral("eventswidgets"), QStringLiteral("memorycard"),
-                                     QStringLiteral("quickactions")};
+    const QStringList directories =
+        words("deviceinfo documents eventswidgets memorycard quickactions");
     int found = 0;
     for (const QString &directory : directories) {
         const QStringList names = QDir(QStringLiteral(SOURCE_DIR "/") + directory)
@@ -219,10 +219,11 @@ void TestExamples::standInTheManualPages_data()
 {
     QTest::addColumn<QString>("page");
     QTest::addColumn<QString>("file");
-    QTest::newRow("quick action") << "docs/man/marlo-quickactions.5"
-                                  << "torch.conf";
-    QTest::newRow("widget") << "docs/man/marlo-eventswidgets.5"
-                            << "weather.json";
+    const auto row = [](const char *page, const char *file) {
+        QTest::newRow(file) << page << file;
+    };
+    row("docs/man/marlo-quickactions.5", "torch.conf");
+    row("docs/man/marlo-eventswidgets.5", "weather.json");
 }
 
 void TestExamples::standInTheManualPages()

@@ -327,25 +327,24 @@ void TestKivInfo::convertsChanges_data()
     QTest::addColumn<QString>("id");
     QTest::addColumn<bool>("ready");
 
-    const QString none;
-    QTest::newRow("number") << QVariant(7) << QStringLiteral("7") << false;
-    QTest::newRow("one") << QVariant(1) << QStringLiteral("1") << true;
-    QTest::newRow("minus one") << QVariant(-1) << QStringLiteral("-1") << false;
-    QTest::newRow("one in the lower 8 bits") << QVariant(257) << QStringLiteral("257") << false;
-    QTest::newRow("one in 64 bits") << QVariant(Q_INT64_C(1)) << QStringLiteral("1") << true;
-    QTest::newRow("one as a byte")
-        << QVariant::fromValue(uchar(1)) << QStringLiteral("\u0001") << true;
-    QTest::newRow("one in the lower 32 bits")
-        << QVariant(Q_INT64_C(0x100000001)) << QStringLiteral("4294967297") << false;
-    QTest::newRow("true") << QVariant(true) << QStringLiteral("true") << true;
-    QTest::newRow("one as text") << QVariant(QStringLiteral("1")) << QStringLiteral("1") << true;
-    QTest::newRow("text") << QVariant(cover) << cover << false;
-    QTest::newRow("structure") << structure(cover, cover) << none << false;
-    QTest::newRow("map") << QVariant(QVariantMap{{idProperty, cover}}) << none << false;
-    QTest::newRow("numbers") << QVariant::fromValue(QList<int>{1}) << none << false;
-    QTest::newRow("object path") << QVariant::fromValue(QDBusObjectPath(QStringLiteral("/1")))
-                                 << none << false;
-    QTest::newRow("variant in a variant") << QVariant::fromValue(QDBusVariant(1)) << none << false;
+    const auto row = [](const char *name, const QVariant &value, const char *id, bool ready) {
+        QTest::newRow(name) << value << id << ready;
+    };
+    row("number", 7, "7", false);
+    row("one", 1, "1", true);
+    row("minus one", -1, "-1", false);
+    row("one in the lower 8 bits", 257, "257", false);
+    row("one in 64 bits", Q_INT64_C(1), "1", true);
+    row("one as a byte", QVariant::fromValue(uchar(1)), "\x01", true);
+    row("one in the lower 32 bits", Q_INT64_C(0x100000001), "4294967297", false);
+    row("true", true, "true", true);
+    row("one as text", QStringLiteral("1"), "1", true);
+    row("text", cover, "cover-7", false);
+    row("structure", structure(cover, cover), "", false);
+    row("map", QVariantMap{{idProperty, cover}}, "", false);
+    row("numbers", QVariant::fromValue(QList<int>{1}), "", false);
+    row("object path", QVariant::fromValue(QDBusObjectPath(QStringLiteral("/1"))), "", false);
+    row("variant in a variant", QVariant::fromValue(QDBusVariant(1)), "", false);
 }
 
 void TestKivInfo::convertsChanges()

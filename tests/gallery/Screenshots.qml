@@ -27,8 +27,12 @@ Gallery {
         { language: "en", width: 1280, height: 800 },
         { language: "fi", width: 360, height: 640 },
     ]
+    // A page without states of its own is shown as it opens.
+    readonly property var shots: ownShots.concat(
+        pages.filter(page => !ownShots.some(shot => shot.page === page.name))
+             .map(page => ({ page: page.name, steps: [] })))
     // The steps of a user. A step is repeated until it returns true.
-    readonly property var shots: [
+    readonly property var ownShots: [
         { page: "start" },
 
         { page: "quick-actions", steps: [showing("camera-take-photo")] },

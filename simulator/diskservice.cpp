@@ -11,6 +11,7 @@
       done            replies
       ERROR           answers with the disk service's error of that name, such as DeviceBusy
       UnknownError    answers with an error that no version of the disk service knows
+      failed          answers with D-Bus's own error Failed
       slow            replies after a second
       hung            does not reply until there is a line on its standard input
       gone            ends without a reply
@@ -64,8 +65,9 @@ const QStringList errors = {
     QStringLiteral("DeviceBusy"),
     QStringLiteral("UnknownError"),
 };
-const QStringList otherScenarios = {QStringLiteral("done"), QStringLiteral("slow"),
-                                    QStringLiteral("hung"), QStringLiteral("gone")};
+const QStringList otherScenarios = {QStringLiteral("done"), QStringLiteral("failed"),
+                                    QStringLiteral("slow"), QStringLiteral("hung"),
+                                    QStringLiteral("gone")};
 const QString absent = QStringLiteral("absent");
 
 void say(const QByteArray &line)
@@ -105,6 +107,8 @@ public:
         const QString scenario = m_scenarios.value(message.member());
         if (errors.contains(scenario)) {
             bus.send(message.createErrorReply(errorPrefix + scenario, QStringLiteral("as told")));
+        } else if (scenario == QLatin1String("failed")) {
+            bus.send(message.createErrorReply(QDBusError::Failed, QStringLiteral("as told")));
         } else if (scenario == QLatin1String("slow")) {
             QTimer::singleShot(slowness, this, [message, bus] { reply(message, bus); });
         } else if (scenario == QLatin1String("hung")) {

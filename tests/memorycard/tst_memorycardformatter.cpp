@@ -857,6 +857,7 @@ void TestMemoryCardFormatter::errorsOfTheDiskService_data()
             row(error, "org.freedesktop.UDisks2.Error." + error, codes.key(i));
         }
         row("UnknownError", "org.freedesktop.UDisks2.Error.UnknownError");
+        row("failed", "org.freedesktop.DBus.Error.Failed");
         row("gone", "org.freedesktop.DBus.Error.NoReply");
         row("absent", "org.freedesktop.DBus.Error.ServiceUnknown");
     }

@@ -41,7 +41,7 @@ for path in sorted((corpus / "eventswidgetsfile").iterdir()):
         value = json.loads(path.read_bytes().decode("utf-8-sig"), strict=False)
     except (ValueError, RecursionError):
         if rules != {"json"}:
-            fail(f"{path.name} is no JSON")
+            fail(f"{path.name} is not JSON")
         continue
     valid = validator.is_valid(value)
     compared[valid] += 1

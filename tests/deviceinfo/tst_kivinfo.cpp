@@ -153,7 +153,7 @@ void TestKivInfo::asksTheDaemonTwice()
     answerBoth(daemon, {cover}, {1});
     QTRY_VERIFY(isSettled(info));
 
-    // Nothing else: no introspection, above all, which would have been waited for.
+    // No other call is sent. In particular, there is no introspection, which would block.
     const QList<QDBusMessage> calls = daemon.calls();
     QCOMPARE(calls.size(), 2);
     for (const QDBusMessage &call : calls) {
@@ -372,7 +372,7 @@ void TestKivInfo::sameValuesEmitNothing()
     sendLast(daemon);
     QTRY_COMPARE(info.report(), QStringLiteral("last ready: 2 1"));
 
-    // Any number but 1 is the same as any other.
+    // All numbers other than 1 have the same meaning.
     daemon.sendChanges({{readyProperty, 0}});
     daemon.sendChanges({{readyProperty, 2}});
     daemon.sendChanges({{idProperty, cover}});

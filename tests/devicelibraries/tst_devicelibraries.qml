@@ -5,8 +5,8 @@ import QtQml 2.15
 import QtTest 1.15
 import com.marlo.settings.system 1.0
 
-// The module built with one or both of a device's libraries. A function is run for each library
-// that is used, and the other one for each stand-in.
+// Tests the module when it is built with one or both of a device's libraries. For each of the two,
+// the test program runs either the function for the library or the one for its stand-in.
 TestCase {
     name: "DeviceLibraries"
 

@@ -1,7 +1,7 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-// The example docs/examples/memory-card.qml always learns that an operation has ended, and says why
+// The example docs/examples/memory-card.qml always detects the end of an operation, and shows why
 // it failed.
 
 #include "cardhelper.h"

@@ -355,7 +355,7 @@ void TestEventsWidgetsFile::tooLargeFile()
 
 void TestEventsWidgetsFile::tooManyContainers()
 {
-    // QJsonDocument takes about 50 times the size of such a text.
+    // For such a text, QJsonDocument needs about 50 times its size in memory.
     const QByteArray entries = QByteArray("[{}],").repeated(499999);
     QVERIFY(!isTooComplex("[{" + entries));
     QVERIFY(isTooComplex("[{[" + entries));

@@ -371,7 +371,7 @@ void TestEventsWidgetsModel::changedWidgetKeepsItsRow()
     QCOMPARE(rows(), "a b"_s);
     QCOMPARE(events(), "changed 1"_s);
 
-    // The new order counts for the places of later widgets, and when the widget comes again.
+    // The new order applies to later widgets, and to this widget when it is added again.
     write("2.json"_s, R"({ "path": "b", "order": 9 }, { "path": "c", "order": 6 })");
     m_model->directoryChanged();
     QCOMPARE(rows(), "a c b"_s);
@@ -743,7 +743,7 @@ void TestEventsWidgetsModel::handlersMayCallBack()
     Model *model = m_model.get();
     int answers = 0;
     const auto answer = [&] {
-        // Otherwise the answers would never end.
+        // Without a limit, the answers would never end.
         if (++answers > 20) {
             return;
         }
@@ -850,7 +850,7 @@ void TestEventsWidgetsModel::requestsInHandlersRunOnce()
     QCOMPARE(events().count("inserted"_s), count);
     QTRY_COMPARE(enabled().first(), "true"_s);
     QTest::qWait(100);
-    // In the order in which they were requested first.
+    // In the order in which they were first requested.
     QCOMPARE(events(), "changed 0 (261), changed 0"_s);
     QCOMPARE(takeMessages().size(), 2);
 }

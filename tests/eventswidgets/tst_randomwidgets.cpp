@@ -182,8 +182,8 @@ private:
     NaiveCatalogs m_catalogs;
 };
 
-// Each scan of the model warns of this file. The naive model then scans as well, so that it follows
-// every scan that the watcher of the directory starts.
+// Each scan of the model warns about this file. The naive model then scans as well, so that it
+// follows every scan that the watcher of the directory starts.
 const QString marker = directory + "/marker.json"_s;
 std::function<void()> onScan;
 QtMessageHandler nextHandler = nullptr;

@@ -25,7 +25,7 @@ public:
     // Definition files, texts and all else that is read, in their places.
     static void installFiles();
 
-    // Ends the test program if the module or a type of it is not to be had.
+    // Ends the test program if the module or one of its types is missing.
     EveryType();
     Q_DISABLE_COPY_MOVE(EveryType)
 
@@ -34,9 +34,9 @@ public:
     // Another object of the type; the singleton again.
     std::unique_ptr<QObject> make(const QString &name) const;
 
-    // What all of them tell: each property, each row, and the texts that methods give, a line each.
+    // The state of all types: each property, row and text that a method returns, one per line.
     QStringList state() const;
-    // That of one, and of those that live of files alone.
+    // The state of one type, and the state of the types that depend only on files.
     QStringList state(const QString &name) const;
     QStringList stateOfFiles() const;
 

@@ -65,7 +65,7 @@ private Q_SLOTS:
     void tenThousandNotifications();
 
 private:
-    // Chooses, and waits until that is stored.
+    // Makes a choice and waits until it is stored.
     bool stores(bool on);
     bool isStored(bool on) const;
     // Waits until dconf reports a failed write.
@@ -138,7 +138,7 @@ User locationUser()
             [=] { return location->gpsEnabled(); }};
 }
 
-// Several keys in one write, of whatever size.
+// Sets the keys in a single write, however large it is.
 void load(const QStringList &keys, const QByteArray &value)
 {
     QByteArray file;
@@ -196,7 +196,7 @@ void signalService(int number)
     }
 }
 
-// Whether the service has read what was sent to it does not matter: stopped is stopped.
+// Stops the service. It does not matter whether the service has read earlier calls.
 class StoppedService
 {
 public:
@@ -228,7 +228,7 @@ void reloadBusConfiguration()
     QCOMPARE(QDBusConnection::sessionBus().call(call).type(), QDBusMessage::ReplyMessage);
 }
 
-// One line for each write that dconf had under way or waiting: as many as it had not joined.
+// dconf logs this for each failed write. Their number varies, because it may merge waiting writes.
 bool isFailedWrite(const QString &message)
 {
     return message.contains(QLatin1String("failed to commit changes to dconf"));
@@ -346,7 +346,7 @@ void TestDconfFaults::serviceDiesInTheMiddleOfAWrite()
     StoppedService service;
     m_user->choose(false);
     TRY(!m_user->isOn());
-    // The call has left.
+    // Gives the process time to send the call.
     QTest::qWait(100);
     service.kill();
     // What was not stored is taken back, once all that is under way has failed or been stored.

@@ -129,8 +129,8 @@ void TestLimits::noDescriptors()
     const EveryType types;
     QTest::qWait(100);
     const QStringList before = types.state();
-    // Once before, too: without descriptors the sanitizer cannot look at an object of a kind that it
-    // has not met yet, and reports it.
+    // Set once while there are descriptors: without them, the sanitizer cannot inspect an object of
+    // a type that it has not seen before, and reports an error.
     QObject *formatter = types.object(QStringLiteral("MemoryCardFormatter"));
     formatter->setProperty("devicePath", QStringLiteral("/dev/first"));
     TRY_COMPARE(formatter->property("filesystemType").toString(), QStringLiteral("vfat"));
@@ -188,7 +188,7 @@ void TestLimits::directoryReplacedByALink()
     // What happens behind the link is followed.
     addFiles(QStringLiteral("third"));
     TRY_COMPARE(rows(model), 3);
-    // The link goes, and with it nothing of what it led to.
+    // The link is removed, but nothing in its target.
     Files::remove(directory);
     TRY_COMPARE(rows(model), 0);
     QCOMPARE(QDir(target).count(), uint(3 + 2)); // with . and ..

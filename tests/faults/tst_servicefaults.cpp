@@ -267,7 +267,7 @@ void TestServiceFaults::goesWhileTheActionServiceHangs()
 void TestServiceFaults::actionServiceSendsOtherThings_data()
 {
     addScenarios();
-    // The bus replies as for a service that does not answer in time: no message is logged.
+    // The bus sends the same error as for a timeout, so no message is logged.
     QTest::newRow("no reply") << QByteArray("gone") << 0;
 }
 

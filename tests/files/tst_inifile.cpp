@@ -33,7 +33,7 @@ bool isUnpacked(const QVariant &value)
     return value.userType() != QMetaType::QString && value.userType() != QMetaType::QStringList;
 }
 
-// The values that can be asked for: not those of a key that QSettings itself does not find again.
+// The values that QSettings returns. It lists some keys that it does not find again itself.
 QVector<QVariant> valuesOf(const QSettings &settings)
 {
     QVector<QVariant> values;
@@ -133,13 +133,13 @@ void TestIniFile::acceptsExactlyWhatQSettingsDoesNotUnpack()
     bool hasSeed = false;
     const int seed = qEnvironmentVariableIntValue("INI_SEED", &hasSeed);
     std::mt19937 random(hasSeed ? uint(seed) : 1U);
-    // QSettings warns of what is packed wrong.
+    // QSettings warns about values that are not packed correctly.
     qInstallMessageHandler([](QtMsgType, const QMessageLogContext &, const QString &) {});
     const QTemporaryDir directory(QStringLiteral("/run/ini-XXXXXX"));
     int unpacked = 0;
     for (int i = 0; i < files; ++i) {
         const QByteArray text = randomFile(&random);
-        // QSettings does not read a file of the same name again that looks unchanged.
+        // QSettings does not reread a file if its name is the same and it looks unchanged.
         const QString path = directory.filePath(QString::number(i));
         Files::write(path, text);
         const bool isPlain = isPlainIni(path);
@@ -147,7 +147,7 @@ void TestIniFile::acceptsExactlyWhatQSettingsDoesNotUnpack()
         const bool unpacks = std::any_of(values.cbegin(), values.cend(), isUnpacked);
         Files::remove(path);
         QVERIFY2(!isPlain || !unpacks, "accepted: " + text.toPercentEncoding(" =@()\"\\,;[]\n"));
-        // Of a key that is there twice only the last value can be seen.
+        // If a key occurs twice, QSettings returns only the last value.
         if (countKeys(text) == values.size()) {
             QVERIFY2(isPlain || unpacks, "refused: " + text.toPercentEncoding(" =@()\"\\,;[]\n"));
         }

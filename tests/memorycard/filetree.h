@@ -14,8 +14,8 @@
 */
 namespace FileTree {
 
-// Creates entries below the directory top, and missing directories on their paths: "directory/",
-// "link -> target", or the name of an empty file.
+// Creates entries below the directory top, with any missing parent directories. An entry is
+// "directory/", "link -> target", or the name of an empty file.
 void makeTree(const QByteArray &top, const QByteArrayList &entries);
 void makeDirectory(const QByteArray &path);
 void makeFile(const QByteArray &path, const QByteArray &content = QByteArray());

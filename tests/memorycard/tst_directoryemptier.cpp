@@ -60,7 +60,7 @@ public:
         SystemCalls::hooks().openat = [this](int directory, const char *name, int flags) {
             ++counts["openat"];
             const int fd = SystemCalls::real().openat(directory, name, flags);
-            // The lowest free one is given out, so that all below are in use.
+            // The kernel returns the lowest free descriptor, so all lower ones are in use.
             openDescriptors = std::max(openDescriptors, m_free.indexOf(fd) + 1);
             return fd;
         };
@@ -180,7 +180,7 @@ void makeDeepTree(const QByteArray &top, int depth, const std::function<void()> 
     beforeRemovalOf("trigger", happening);
 }
 
-// The walk meets changes at every point of its way: a walk by paths lost files in most of 120 runs.
+// Changes happen at every point of the walk. A walk by paths lost files in most of 120 runs.
 constexpr int races = 200;
 
 // Repeats each of the functions in a process of its own while the directory is emptied.
@@ -266,7 +266,7 @@ private Q_SLOTS:
 
 private:
     void checkOutside();
-    // Entries that would be lost if a walk took the outside for a directory of a deep tree.
+    // Adds entries that a walk would remove if it mistook m_outside for a directory of a deep tree.
     void makeBait();
 
     std::unique_ptr<ScratchFileSystem> m_files;

@@ -484,7 +484,7 @@ void TestMemoryCardFormatter::probe_data()
         QTest::addRow("%s %s", scenario, output.trimmed().constData())
             << QString::fromLatin1(scenario) << output << type << QByteArray("Error");
     };
-    // An exit code does not keep the output from being read.
+    // The output is read even if the helper exits with an error.
     fails("exit=1", {}, {});
     fails("exit=255", "swap\n", QStringLiteral("swap"));
     fails("exit=2", "old", old);
@@ -917,7 +917,7 @@ void TestMemoryCardFormatter::alreadyDoneGoesOn()
     const QByteArray error = scenario.toLatin1();
     start(error.constData());
     m_formatter->format(vfat);
-    // The status passes over what was not done.
+    // The status skips the steps that failed.
     TRY_EVENTS("not busy, unmount Error" + error + ", Formatting, busy, mount Error" + error
                + ", Idle, not busy");
     QCOMPARE(takeLog(),
@@ -1299,7 +1299,7 @@ void TestMemoryCardFormatter::oneProcessForAll()
     setCard(cardName, otherCard);
     QCOMPARE(processes(), QList<QProcess *>{process});
     QCOMPARE(process->parent(), m_formatter.get());
-    // The replies have gone.
+    // The objects of the replies have been deleted.
     TRY_COMPARE(m_formatter->children().size(), 1);
 }
 

@@ -155,7 +155,7 @@ void TestRequestQueue::nestedEventLoopRunsNothing()
     model.handler = [&] {
         model.check();
         model.choose("a"_s);
-        // What was posted earlier is delivered, and then there is nothing to do.
+        // The first call delivers earlier events. After it, nothing must be left to do.
         QCoreApplication::processEvents();
         busy = QAbstractEventDispatcher::instance()->processEvents(QEventLoop::AllEvents);
     };

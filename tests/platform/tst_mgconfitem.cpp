@@ -78,7 +78,7 @@ int setAndSeeItFail(QCoreApplication &app)
     return app.exec();
 }
 
-// Prints a line for each change of the key, and runs until it is ended.
+// Prints a line for each change of the key, until the process is ended.
 int follow(QCoreApplication &app)
 {
     MGConfItem item(followedKey);
@@ -248,7 +248,7 @@ QString newKey()
     return QStringLiteral("/test/key%1").arg(++count);
 }
 
-// Stops a process until it is destroyed.
+// Stops a process for the lifetime of this object.
 class Stopped
 {
 public:
@@ -605,8 +605,8 @@ void TestMGConfItem::followsTheResetOfADirectory()
 
 void TestMGConfItem::missesNothingWhileTheBusIsSlow()
 {
-    // The change goes over another bus, so that the item receives no message of it: dconf compares
-    // the values before and after it has started to watch the key.
+    // The change is made over another bus, so the item receives no message about it. dconf compares
+    // the values before and after it starts to watch the key.
     Bus bus;
     auto stopped = std::make_unique<Stopped>(static_cast<pid_t>(bus.processId()));
     Child child({QStringLiteral("follow")}, busVariable, bus.address());

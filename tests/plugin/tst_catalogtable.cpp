@@ -126,7 +126,7 @@ void TestCatalogTable::installsCatalogsThatDoNotExist()
     QVERIFY(translators().at(1)->isEmpty());
     QCOMPARE(title(), QStringLiteral("maps-title"));
 
-    // Installed and counted although they are empty: once loaded by hand, they are asked.
+    // Empty translators are installed, too: once the test loads a file into one, titles use it.
     QVERIFY(translators().at(1)->load(QStringLiteral("maps-fi"),
                                       QStringLiteral("/usr/share/translations")));
     QCOMPARE(title(), QStringLiteral("Kartat"));

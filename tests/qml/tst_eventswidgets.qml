@@ -40,7 +40,7 @@ TestCase {
         }
     }
 
-    // A name that no other test used: the module may yet see what that one stored.
+    // No other test uses the same path: the module may still see what an earlier test stored.
     function path(name) {
         return "/usr/share/widgets/" + name + "-" + serial + ".qml";
     }
@@ -110,7 +110,7 @@ TestCase {
         const choice = pageOf(settings);
         const shown = pageOf(newModel());
         tryAll(shown, "on", [true, false]);
-        // The first choice stores all others with it.
+        // The first choice also enables and stores all other widgets.
         settings.enableWidget(path("b"));
         tryStored(["a", "b", "b"]);
         settings.disableWidget(path("a"));

@@ -111,7 +111,7 @@ TestCase {
         compare(view.value, "Apple, Lime, Plum, and Pear");
         view.role = "size";
         compare(view.values, ["2", "1", "2", "3"]);
-        // Read as the role of number 0.
+        // An unknown role reads role number 0.
         view.role = "unknown";
         compare(view.values, ["1", "2", "3", "4"]);
     }

@@ -423,7 +423,7 @@ void TestQuickActionsModel::ordersByPriority_data()
     row("below a negative priority", {"-3", "10"}, "5", 1);
 }
 
-// The first row is enabled; an action that is not gets its row when it is no longer blocked.
+// The first row is enabled. The new action is not enabled, and gets its row once it is unblocked.
 void TestQuickActionsModel::ordersByPriority()
 {
     QFETCH(QByteArrayList, priorities);
@@ -500,7 +500,7 @@ void TestQuickActionsModel::changedCatalogIsAdded()
     add("a"_s, "title=maps-title\ntranslation-catalog=atlas\n");
     // The later catalog takes precedence, and has no Finnish.
     QTRY_COMPARE(data(0, Model::TitleRole), QVariant("Atlas"_s));
-    // The row's current catalog is removed with it, the earlier one stays.
+    // The row's current catalog is removed together with the row. The earlier catalog is kept.
     setEnabled(QString());
     QCOMPARE(qtTrId("maps-title"), "Kartat"_s);
 }
@@ -578,7 +578,7 @@ void TestQuickActionsModel::choices_data()
                                                  << "b";
 }
 
-// The choice of a.
+// Enables or disables the action "a".
 void TestQuickActionsModel::choices()
 {
     QFETCH(QString, before);

@@ -85,8 +85,8 @@ public:
         for (const Action &action : removed) {
             m_catalogs.remove(action.path, action.catalog());
         }
-        // The order does not matter. Here it is: actions with a row, other enabled actions, the
-        // rest.
+        // Any order is correct. This one is: actions with a row, other enabled actions, all other
+        // actions.
         QStringList order;
         for (const Action &action : qAsConst(rows)) {
             order.append(action.path);

@@ -44,7 +44,7 @@ private:
 
     std::unique_ptr<MessageLog> m_log;
     QStringList m_messages;
-    // What the test has to see.
+    // The messages that the test expects.
     QStringList m_expected;
     std::unique_ptr<QuickActionsModel> m_model;
 };
@@ -71,7 +71,7 @@ QString failure(const QString &error)
 const QString serviceUnknown = "org.freedesktop.DBus.Error.ServiceUnknown "
                                "The name org.example.lamp was not provided by any .service files"_s;
 
-// For what must not come: longer than any answer takes.
+// How long to wait for something that must not happen: longer than any reply takes.
 constexpr int longEnough = 200;
 
 } // namespace

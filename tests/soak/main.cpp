@@ -12,7 +12,7 @@
 
 namespace {
 
-// The module complains of much that it meets here.
+// Much of what happens here makes the module log warnings.
 void keepQuiet(QtMsgType type, const QMessageLogContext &context, const QString &text)
 {
     Q_UNUSED(context)

@@ -71,7 +71,7 @@ const std::array<QByteArray, 6> widgets = {
 
 World::World(QRandomGenerator *random) : m_random(random)
 {
-    // Before anybody may look for cards in the machine's own table.
+    // Done before anything can search the machine's own table for cards.
     Files::remove(mountTable);
     Files::write(mountTable, {});
     settle();

@@ -26,7 +26,7 @@ public:
     explicit World(QRandomGenerator *random);
 
     void changeSomething();
-    // Everything that may hold somebody up, and every peer with what it has kept, goes.
+    // Ends all peers and replaces the helper, so that nothing blocks or keeps recorded calls.
     void settle();
 
     // Values for properties and arguments, some of them of use.

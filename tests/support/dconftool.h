@@ -21,7 +21,7 @@ QByteArray run(const QStringList &arguments, const QByteArray &input = {});
 QByteArray read(const QString &key);
 void write(const QString &key, const QByteArray &value);
 void write(const QString &key, const QStringList &value);
-// Of a key, or with a slash at its end of a whole folder.
+// Resets a key, or everything below a path that ends with a slash.
 void reset(const QString &path);
 
 // What this process has set is stored one by one in the background: what another one writes next is

@@ -95,7 +95,7 @@ protected:
     // The directory of the definition files and the dconf key of the user's list.
     RandomModelTest(const QString &directory, const QString &key);
 
-    // Restores the settings and files besides the directory and the key.
+    // Restores all settings and files except the directory and the key.
     virtual void reset() { }
     virtual void makeModels() = 0;
     virtual void removeModels() = 0;
@@ -113,7 +113,7 @@ protected:
     // The model reloads after a change of the directory, and counts that in m_reloads.
     void waitForReload();
 
-    // True in so many of a hundred cases.
+    // True with this probability.
     bool chance(int percent) { return m_random.bounded(100) < percent; }
     template<typename List> typename List::value_type anyOf(const List &list)
     {

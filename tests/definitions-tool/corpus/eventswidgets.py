@@ -78,7 +78,7 @@ def wrong_type(line, key, what):
 INTEGER = "an integer of 32 bits"
 BOOLEAN = "true or false"
 
-# What is no JSON.
+# Not JSON.
 case("bad-empty", "", no_json(1))
 case("bad-binary", bytes(range(256)), no_json(1))
 case("bad-utf16", '{ "widgets": [] }'.encode("utf-16"), no_json(1))
@@ -104,7 +104,7 @@ case("bad-text", '"widgets"', no_object(1))
 case("bad-number", "\ufeff\n 7", no_object(2))
 case("bad-array", '\n[ { "path": "a" } ]\n', no_object(2))
 
-# What stands in a file.
+# The content of a file.
 case("good", file(widget()))
 case("good-crlf", file(widget()).replace("\n", "\r\n"))
 case("good-mark", "\ufeff" + file(short("maßä")))
@@ -140,7 +140,7 @@ case(
     *(no_widget(line) for line in (4, 6, 7, 8, 9)),
 )
 
-# What stands in a widget.
+# The content of a widget.
 case("good-empty-texts", file(widget(description_id='""', icon='""', available_path='""')))
 case("good-escapes", file(widget(title=r'"L\u00e4mp \"x\" \ud83d\ude00 \/"')))
 case("good-utf8", file(widget(title='"Lämpchen ☀"')))

@@ -4,8 +4,8 @@
 /*
     usage: bus-service-peer system|session SERVICE SCENARIO
 
-    Owns the name SERVICE on a bus and plays any service, in a process that may be stopped and
-    killed. Says "ready" on its standard output, and then the member of each call, a line each.
+    Owns the name SERVICE on a bus and simulates any service, in a process that may be stopped
+    and killed. Says "ready" on its standard output, and then the member of each call, a line each.
     SCENARIO is what it does with calls:
 
       replies       replies; to reads of the properties KIVID and Ready with "cover-0" and 1
@@ -13,9 +13,9 @@
       error         answers with an error that nobody knows
       gone          ends without a reply
 
-    A line with a number on its standard input has it send that many signals: PropertiesChanged with
-    KIVID "cover-1" and so on, and with Ready 1 in the last. An unknown scenario is an error. It ends
-    with its standard input.
+    For a line with a number on its standard input, it sends that many signals: PropertiesChanged
+    with KIVID "cover-1" and so on, and with Ready 1 in the last. An unknown scenario is an error.
+    It ends with its standard input.
 */
 
 #include <QCoreApplication>
@@ -52,7 +52,7 @@ public:
     QString introspect(const QString &path) const override
     {
         Q_UNUSED(path)
-        // Nobody has to ask.
+        // Clients must not introspect: it would take time on the main thread of an application.
         say("Introspect");
         return {};
     }

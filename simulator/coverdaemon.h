@@ -18,13 +18,13 @@ class CoverDaemon : public QDBusVirtualObject
     Q_OBJECT
 
 public:
-    // Ends the test program if the name is not to be had. A new daemon answers nothing.
+    // Ends the test program if it cannot own the name. A new daemon does not reply.
     CoverDaemon();
     ~CoverDaemon() override;
     Q_DISABLE_COPY_MOVE(CoverDaemon)
 
-    // What reads of a property are answered with, those that wait for an answer included. The
-    // arguments are sent as they are: the real daemon sends a bare string for KIVID and a bare
+    // Sets the reply to reads of a property, including reads that already wait for a reply. The
+    // arguments are sent unchanged: the real daemon sends a bare string for KIVID and a bare
     // 32 bit integer for Ready.
     void answer(const QString &property, const QVariantList &arguments);
     void answerWithError(const QString &property);

@@ -4,9 +4,9 @@
 /*
     usage: disk-service-peer [METHOD=]SCENARIO...
 
-    Plays the disk service on the system bus. Says "ready" on its standard output, and then what it
-    is asked, a line of JSON for each call. SCENARIO is what it does when it is asked; with a
-    METHOD, when it is asked for just that:
+    Simulates the disk service on the system bus. Prints "ready" on its standard output, and then a
+    line of JSON for each call. SCENARIO is what it does when it is called. With a METHOD, it
+    applies only to calls of that method:
 
       done            replies
       ERROR           answers with the disk service's error of that name, such as DeviceBusy
@@ -94,7 +94,7 @@ public:
 
     QString introspect(const QString &path) const override
     {
-        // Nobody has to ask: it takes time that the main thread of an application does not have.
+        // Clients must not introspect: it would take time on the main thread of an application.
         QJsonObject line;
         line.insert(QStringLiteral("introspected"), path);
         say(QJsonDocument(line).toJson(QJsonDocument::Compact));

@@ -147,7 +147,7 @@ RealCard::RealCard() : m_image(QStringLiteral("/media/card.img"))
     require(m_image.open(QIODevice::ReadWrite) && m_image.resize(cardSize), "make the image");
     QFile control(loopControl);
     require(control.open(QIODevice::ReadWrite), "open the loop control");
-    // Somebody else may be given the same one and be faster.
+    // Another process may get the same number and attach its image first.
     do {
         m_device.close();
         const int number = ioctl(control.handle(), LOOP_CTL_GET_FREE);
@@ -158,7 +158,7 @@ RealCard::RealCard() : m_image(QStringLiteral("/media/card.img"))
         require(m_device.open(QIODevice::ReadWrite | QIODevice::Unbuffered), "open a loop device");
         loop_config config = {};
         config.fd = __u32(m_image.handle());
-        // It is taken apart by the kernel when the last one who uses it has gone.
+        // The kernel detaches the image when the last user of the device closes it.
         config.info.lo_flags = LO_FLAGS_AUTOCLEAR;
         if (ioctl(m_device.handle(), LOOP_CONFIGURE, &config) == 0) {
             break;

@@ -21,17 +21,17 @@
 class RealCard
 {
 public:
-    // Why there can be none here; empty if there can.
+    // Why a card cannot be created here; empty if it can.
     static QString whyNot();
     // Leaves the namespaces that the process shares with others: to be called once, before there is
     // a second thread.
     static void becomePrivate();
     // Installs a program that formats and probes memory cards for real; it may be run from outside
-    // the network namespace of this process. While the file /usr/libexec/sdcardhelper-waits is there
-    // it takes its time.
+    // the network namespace of this process. While the file /usr/libexec/sdcardhelper-waits
+    // exists, the program waits.
     static void installHelper();
 
-    // Ends the program if something is not to be had that has to be there.
+    // Ends the program if something that it requires is missing.
     RealCard();
     ~RealCard();
     Q_DISABLE_COPY_MOVE(RealCard)

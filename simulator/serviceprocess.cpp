@@ -52,7 +52,7 @@ QStringList ServiceProcess::calls()
 
 void ServiceProcess::signal(int number)
 {
-    // Never to 0, which would be everybody.
+    // Never to process 0: that would signal the whole process group.
     if (m_process.processId() > 0) {
         kill(static_cast<pid_t>(m_process.processId()), number);
     }

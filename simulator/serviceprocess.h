@@ -15,7 +15,7 @@
 class ServiceProcess
 {
 public:
-    // Ends the test program if there is no such scenario, or if the name is not to be had.
+    // Ends the test program if there is no such scenario, or if the service cannot own the name.
     ServiceProcess(const char *bus, const QString &service, const char *scenario);
     ~ServiceProcess();
     Q_DISABLE_COPY_MOVE(ServiceProcess)

@@ -1,7 +1,7 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-// Checking definition files, beside loading the same files with their models.
+// Compares checking definition files with loading the same files with their models.
 
 #include "definitions-tool/definitionschecker.h"
 #include "eventswidgets/eventswidgetsmodel.h"

@@ -1,8 +1,8 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-// Loading and rescanning events widgets, beside the parsing of their files alone, and a titles view
-// beside a bare loop over the data of its rows.
+// Compares loading and rescanning events widgets with only parsing their files, and a titles view
+// with a bare loop over the data of its rows.
 
 #include "eventswidgets/eventswidgetsmodel.h"
 #include "eventswidgets/titlesview.h"

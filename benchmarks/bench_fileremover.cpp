@@ -270,7 +270,7 @@ private:
     QVector<int> m_directories;
 };
 
-// Subtracts what a program takes for nothing from its times.
+// Subtracts what a program needs for an empty directory from its times.
 void subtract(const Rounds::Times &start, Rounds::Times *times)
 {
     const auto median = [&start](double Rounds::Time::*clock) {
@@ -456,7 +456,7 @@ void write(const char *path, const QByteArray &text)
     close(fd);
 }
 
-// Root in a mount namespace of its own; anybody else is made root in a user namespace first.
+// Enters a new mount namespace. Users other than root become root in a new user namespace.
 void enterNamespace()
 {
     const uid_t uid = getuid();

@@ -40,7 +40,7 @@ constexpr int restTime = 10; // s
 
 using Pauses = std::vector<double>;
 
-// The longest but one: the machine may disturb a single round.
+// The second longest, because other programs may disturb a single round.
 double longest(Pauses pauses)
 {
     std::sort(pauses.begin(), pauses.end());
@@ -145,7 +145,7 @@ void measure(std::vector<Pauses> *pauses, QStringList *names)
     QCoreApplication::processEvents();
 }
 
-// A page with an object of each type, until the process is ended.
+// Creates a page with an object of each type, and runs until the process is ended.
 int showPage()
 {
     const EveryType types;

@@ -1,7 +1,7 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-// Loading quick actions, beside reading the same files with QSettings and doing nothing more.
+// Compares loading quick actions with only reading the same files with QSettings.
 
 #include "mgconfitem.h"
 #include "quickactions/quickactionsmodel.h"

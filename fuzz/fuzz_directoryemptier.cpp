@@ -45,7 +45,7 @@ constexpr size_t maximumLength = 1000; // of a path
 constexpr int maximumEvents = 8;
 // Beyond all that a walk over so few nodes can need.
 constexpr int tooManyCalls = 100000;
-// The maximum number of descriptors that the walk promises to hold open.
+// The maximum number of descriptors that the walk may hold open.
 constexpr int maximumOpen = 57;
 
 const char *const hostileNames[] = {"..", ".", "../outside/x", "/outside/x", "../outside",

@@ -43,7 +43,7 @@ QVariant takeValue(Bytes *input, int nesting)
     case 5:
         return QString::fromUtf8(input->takeUntil(';'));
     case 6: {
-        // Half a surrogate pair, as QML's texts may hold.
+        // May contain half a surrogate pair, as texts from QML may.
         const QByteArray text = input->takeUntil(';');
         return QString(reinterpret_cast<const QChar *>(text.constData()), text.size() / 2);
     }

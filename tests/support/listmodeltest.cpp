@@ -9,8 +9,8 @@
 
 #include <QtTest>
 
-ListModelTest::ListModelTest(const QString &directory, const QString &suffix)
-    : m_directory(directory), m_suffix(suffix)
+ListModelTest::ListModelTest(QString directory, QString suffix)
+    : m_directory(std::move(directory)), m_suffix(std::move(suffix))
 {
 }
 

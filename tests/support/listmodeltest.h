@@ -36,7 +36,7 @@ protected Q_SLOTS:
 
 protected:
     // The directory of the definition files, which end in the suffix.
-    ListModelTest(const QString &directory, const QString &suffix);
+    ListModelTest(QString directory, QString suffix);
 
     // Makes and watches a model that lists everything, with loaded rows.
     virtual void loadEverything() = 0;
@@ -45,7 +45,7 @@ protected:
     virtual QString rowsOf(const QAbstractListModel &model) const = 0;
     // The content of a definition file for one row of this name, with a catalog.
     virtual QByteArray definition(const QString &name, const QByteArray &catalog) const = 0;
-    // The messages since the last call; a model may have some that no test is interested in.
+    // The messages since the last call, without complaints of the model tester that are expected.
     virtual QStringList newMessages();
 
     // Begins to check the model and to record its signals.

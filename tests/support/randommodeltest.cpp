@@ -16,6 +16,7 @@
 #include <atomic>
 #include <iostream>
 #include <thread>
+#include <utility>
 #include <vector>
 
 namespace {
@@ -71,8 +72,8 @@ QVariantList shown(const QAbstractListModel &model, int row)
 
 } // namespace
 
-RandomModelTest::RandomModelTest(const QString &directory, const QString &key)
-    : m_directory(directory), m_key(key)
+RandomModelTest::RandomModelTest(QString directory, QString key)
+    : m_directory(std::move(directory)), m_key(std::move(key))
 {
 }
 

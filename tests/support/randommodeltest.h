@@ -93,7 +93,7 @@ private Q_SLOTS:
 
 protected:
     // The directory of the definition files and the dconf key of the user's list.
-    RandomModelTest(const QString &directory, const QString &key);
+    RandomModelTest(QString directory, QString key);
 
     // Restores all settings and files except the directory and the key.
     virtual void reset() { }

@@ -50,7 +50,7 @@ RowEvents::RowEvents(const QAbstractItemModel *model)
 
 QString RowEvents::take()
 {
-    const QString events = m_events.join(QStringLiteral(", "));
+    QString events = m_events.join(QStringLiteral(", "));
     m_events.clear();
     return events;
 }

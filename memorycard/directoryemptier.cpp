@@ -29,7 +29,7 @@ struct CloseDirectory {
 };
 using OpenDirectory = std::unique_ptr<DIR, CloseDirectory>;
 
-// Null if the descriptor is not open, or not one of a directory.
+// Null if the descriptor is not open or does not refer to a directory.
 OpenDirectory openStream(FileDescriptor fd)
 {
     OpenDirectory directory(fd.isOpen() ? fdopendir(fd.get()) : nullptr);

@@ -85,8 +85,8 @@ bool emptyMount(const QByteArray &device, const char *directory)
     if (directory[0] != '/') {
         return false;
     }
-    // The table has real paths: a link is not the card, nor is the directory below a card that has
-    // been unmounted.
+    // The table has real paths. A link is not the card. Neither is the directory that remains after
+    // the card has been unmounted.
     FileDescriptor fd = openDirectory(directory);
     if (!fd.isOpen()) {
         // A card that cannot be read counts as empty, as for removeAllEntries().

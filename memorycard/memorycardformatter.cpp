@@ -54,7 +54,7 @@ bool hasDescriptorsLeft()
 
     The disk service knows a card by its \l deviceName; \l devicePath is the device node of its
     partition. Every operation is a sequence of commands that run one after the other, without
-    blocking. \l status shows which one:
+    blocking. \l status shows the progress:
 
     \table
     \header \li Operation \li Status on success
@@ -71,12 +71,12 @@ bool hasDescriptorsLeft()
     \c /usr/libexec/sdcardhelper formats and probes. Its arguments are \c format_vfat,
     \c format_ext4 or \c probe, and the name of the partition, such as \c mmcblk1p1. It exits with
     0 on success, and writes the type of the file system to its standard output for \c probe.
-    Removing files finds the card by its \l devicePath in \c{/etc/mtab}.
+    removeAllFiles() finds the card by its \l devicePath in \c{/etc/mtab}.
 
     A failed command ends the sequence with the status \c Error, in which every operation is
     accepted. Formatting, removing files and probing use the \l devicePath and the type of their
     request; mounting and unmounting use the \l deviceName that is set when the step starts.
-    Messages are in the logging category \c{org.tarnwickos.settings.memorycard}.
+    The formatter logs messages in the category \c{org.tarnwickos.settings.memorycard}.
 
     \qml
     Label {
@@ -90,7 +90,7 @@ bool hasDescriptorsLeft()
     }
     \endqml
 
-    \image gallery-memory-card.png The gallery's page of this type
+    \image gallery-memory-card.png The gallery's page for this type
 
     \section1 When an operation has ended
 
@@ -107,13 +107,14 @@ bool hasDescriptorsLeft()
     \section2 Mounting and unmounting change the status afterwards
     \c Formatting, \c RemovingFiles and \c Probing are set when the work begins, \c Unmounting and
     \c Mounting when the disk service has reported success. Until then the status is the previous
-    one, and for the first step of a sequence \l busy is \c false. Further operations are queued
-    then, and run afterwards. If the request fails, they are dropped, except the probe of a new
-    \l devicePath. A page must remember that it has requested an operation.
+    one, and for the first step of a sequence \l busy is \c false. Operations that are requested
+    meanwhile are queued and run afterwards. If the request to the disk service fails, they are
+    dropped, except the probe of a new \l devicePath. A page must remember
+    that it has requested an operation.
 
     \section2 Formatting needs a mounted card
-    Only a card that was known to work is formatted: format() on a card that is not mounted ends
-    with \c ErrorNotMounted. Call mount() first; its \c ErrorAlreadyMounted is harmless.
+    On a card that is not mounted, format() ends with \c ErrorNotMounted, so only a card that is
+    known to work is formatted. Call mount() first; its \c ErrorAlreadyMounted is harmless.
 
     \section2 Two errors do not end the sequence
     After \c ErrorAlreadyMounted and \c ErrorAlreadyUnmounting the sequence continues: the card is
@@ -124,7 +125,7 @@ bool hasDescriptorsLeft()
     helper program only lead to the status \c Error. The status before it shows which step failed.
 
     \section2 Without a device name a sequence waits
-    If \l deviceName is empty when a step of mounting or unmounting starts, the step only logs a
+    If \l deviceName is empty when a mounting or unmounting step starts, the step only logs a
     critical message. The rest of the sequence stays in the queue and runs before the next
     operation: after format() without a name, unmount() formats the card. In the middle of a
     sequence, the formatter stays busy and refuses every operation; only a new object helps. The
@@ -132,14 +133,15 @@ bool hasDescriptorsLeft()
     expect exactly these lines.
 
     \section2 Some mount directories are refused, and some count as empty
-    The formatter does not empty a mount directory that is a symbolic link, the root directory or on
-    another device than the card: the card has been unmounted, or the mount table is wrong. A
-    mount directory that cannot be opened counts as empty. If the card is mounted more than once,
-    one mount directory that can be emptied is enough.
+    The formatter does not empty a mount directory that is a symbolic link or the root directory, or
+    that is on a device other than the card. In these cases, the card has been unmounted, or the
+    mount table is wrong. A mount directory that cannot be opened counts as empty. If the card is
+    mounted more than once, the operation succeeds if one mount directory can be emptied.
 
     \section2 Work outlives its formatter
-    Destroying a formatter stops neither the removal of files nor a helper that is formatting: a
-    card that is half formatted cannot be used. When the process ends, it waits for the removal.
+    Destroying a formatter stops neither the removal of files nor a helper that is formatting,
+    because a half-formatted card cannot be used. Before the process exits, it waits for the removal
+    to finish.
 */
 
 MemoryCardFormatter::~MemoryCardFormatter()
@@ -245,7 +247,8 @@ QStringList MemoryCardFormatter::supportedFormatTypes() const
 /*!
     \qmlmethod void MemoryCardFormatter::format(string type)
 
-    Unmounts the card, makes a file system of the \a type \c vfat or \c ext4 on it, and mounts it.
+    Unmounts the card, creates a \c vfat or \c ext4 file system on it, depending on \a type, and
+    mounts it.
     \b {Everything on the card is lost.} For any other type (names are case-sensitive), the helper
     program gets only the name of the partition, and its exit code determines whether the step
     succeeds. An empty type or \l devicePath leads to \c Error with a warning. \b {Set \l deviceName

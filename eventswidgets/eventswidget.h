@@ -21,7 +21,7 @@ struct EventsWidget {
     bool defaultEnabled = false; // While the user has not chosen.
     bool available = false; // As isAvailable() found it last.
 
-    // Whether a file exists at availablePath now; always if that is empty.
+    // Whether a file exists at availablePath now; always true if the path is empty.
     bool isAvailable() const;
 
     // Ignores file and translationCatalog on purpose: they do not change the row.

@@ -24,8 +24,8 @@ struct EventsWidgetsFile {
     std::vector<EventsWidget> widgets;
 };
 
-// Nothing if the file cannot be read or is not a definition file. This, and every entry that is not
-// a widget, is logged as a warning. The other entries are read.
+// Returns nothing if the file cannot be read or is not a definition file. Entries that are not
+// widgets are skipped. Both cases are logged as warnings.
 std::optional<EventsWidgetsFile> readEventsWidgetsFile(const QString &path);
 
 #endif

@@ -78,7 +78,7 @@ QString translation(const QString &id, const QString &fallback)
     until control returns to the event loop. The model then runs each kind of update at most once
     and applies the choices (enableWidget(), disableWidget()) in the order of the calls.
 
-    \image gallery-events-widgets.png The gallery's page of this type
+    \image gallery-events-widgets.png The gallery's page for this type
 
     \section1 What may surprise
     \section2 The first choice enables everything else
@@ -99,7 +99,7 @@ QString translation(const QString &id, const QString &fallback)
     \section2 Catalogs stay
     The catalogs of a file that is removed, or that names another one, remain in use until the model
     is destroyed: a text that is still on the screen keeps its translation. A loaded catalog does
-    not follow a change of the language. A page that follows the language creates its models again.
+    not follow a change of the language. A page that must follow it has to create its models again.
 
     \section2 A change of file or catalog does not change the row
     A widget that moves to another file, or whose file names another catalog, is not reported as

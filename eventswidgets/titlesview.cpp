@@ -76,14 +76,15 @@ void forEachObject(QVariant *value, const std::function<void(QObject *, QVariant
     \inqmlmodule com.marlo.settings.system
     \brief Joins one role of the rows of a list model into a sentence.
 
-    \l values has the texts of \l role, of all rows or of those whose \l matchRole has the value
-    \l match. \l value joins them as the user's language does, in English "Clock, Weather, and
-    Calendar". They follow rows that are inserted, removed or changed and a reset of the model.
+    \l values contains the texts of \l role: those of all rows, or only of the rows whose
+    \l matchRole has the value \l match. \l value joins these texts by the rules of the user's
+    language, for example "Clock, Weather, and Calendar" in English. Both properties are updated
+    when rows are inserted, removed or changed, and when the model is reset.
 
-    \l role and \l matchRole are role paths: the name of a role, or that followed by names of
-    properties, joined by dots, such as \c "contact.name.first" for a role that holds objects. A
-    property that an object lacks has no value. A step from a value that is not an object is
-    skipped, so one path serves rows that hold an object and rows that hold its text.
+    \l role and \l matchRole are role paths. A role path is the name of a role. If the role holds
+    objects, names of properties may follow, separated by dots, as in \c "contact.name.first". A
+    property that does not exist has no value. If a value is not an object, the rest of the path is
+    ignored, so one path can be used for rows that hold an object and for rows that hold its text.
 
     \qml
     Label {
@@ -98,34 +99,35 @@ void forEachObject(QVariant *value, const std::function<void(QObject *, QVariant
     }
     \endqml
 
-    \image gallery-titles.png The gallery's page of this type
+    \image gallery-titles.png The gallery's page for this type
 
     \section1 What may surprise
     \section2 A model cannot be cleared
     Setting \l model to null logs a warning and keeps the old model, so that a page that is being
-    closed keeps its sentence. A model that is destroyed is removed.
+    closed keeps its sentence. If the model is destroyed, the property becomes null.
 
-    \section2 An unknown matchRole takes every row
+    \section2 An unknown matchRole selects every row
     An unknown \l role reads the display role, because a view may be set up before the model has its
-    roles. The role with the number 0 counts as unknown. It is the first role of many list models,
-    such as \c title of QuickActionsModel and the roles of a QML \c ListModel.
+    roles. The role with the number 0 counts as unknown. Many list models give this number to their
+    first role, for example QuickActionsModel to \c title, and a QML \c ListModel.
 
     \section2 Moved rows are not noticed
-    After a move or a new layout call update().
+    Call update() after rows have been moved or the layout of the model has changed.
 
     \section2 A new language is not noticed
-    \l value uses the list format of the default locale at the time of reading, and \l values has
-    the texts of the last update. The engine evaluates the texts of its pages again after a change.
+    \l value uses the list format of the default locale at the time of reading, and \l values
+    contains the texts of the last update. \c{QQmlEngine::retranslate()} evaluates the bindings of
+    pages again, including those that read \l value.
 
-    \section2 Empty texts count
-    A row without text gives an empty text. Exclude such rows with \l matchRole.
+    \section2 Empty texts are included
+    A row without text adds an empty text. Exclude such rows with \l matchRole.
 */
 
 /*!
     \qmlproperty object TitlesView::model
 
-    The model that is read, a \c QAbstractListModel; null before the first one is set and after a
-    model was destroyed. Anything else is refused with a warning and the model stays.
+    The model that is read, a \c QAbstractListModel. It is null until a model is set, and after the
+    model has been destroyed. Any other value is refused with a warning, and the model is kept.
 */
 void TitlesView::setModel(QObject *model)
 {
@@ -157,7 +159,7 @@ void TitlesView::setModel(QObject *model)
 /*!
     \qmlproperty string TitlesView::matchRole
 
-    The role path whose value selects the rows. Empty, the default, takes every row.
+    The role path whose value selects the rows. An empty path, the default, selects every row.
 */
 void TitlesView::setMatchRole(const QString &matchRole)
 {
@@ -197,7 +199,8 @@ void TitlesView::setMatch(const QVariant &match)
 /*!
     \qmlproperty string TitlesView::role
 
-    The role path whose values are collected. Empty, the default, collects nothing.
+    The role path whose values are collected. With an empty path, the default, nothing is
+    collected.
 */
 void TitlesView::setRole(const QString &role)
 {
@@ -236,7 +239,7 @@ void TitlesView::update()
 {
     const uint updates = ++m_updates;
     const QStringList values = collect();
-    // Reading a property may have called update() again; then the values from there are newer.
+    // Reading a property may have called update() again, which has then collected newer values.
     if (updates == m_updates && m_values != values) {
         m_values = values;
         Q_EMIT valueChanged();
@@ -255,7 +258,7 @@ void TitlesView::update()
 /*!
     \qmlsignal TitlesView::valueChanged()
 
-    Emitted after \l values and with it \l value have changed.
+    Emitted after \l values, and therefore \l value, has changed.
 */
 
 QStringList TitlesView::collect() const

@@ -89,7 +89,7 @@ qint64 priorityOfRow(const QuickAction &action)
     until control returns to the event loop. The model then reloads at most once and applies the
     choices (enableAction(), disableAction(), move()) in the order of the calls.
 
-    \image gallery-quick-actions.png The gallery's page of this type
+    \image gallery-quick-actions.png The gallery's page for this type
 
     \section1 What may surprise
     \section2 A file that cannot be read is still a row
@@ -97,9 +97,9 @@ qint64 priorityOfRow(const QuickAction &action)
     user's list may contain the file, and move() relies on rows and entries having the same indexes.
 
     \section2 The roles have the numbers 0 to 3
-    These are also the numbers of Qt's roles for display, decoration, editing and tool tips. They do
-    not change, because existing code may use them. TitlesView treats role 0 as unknown: if \c title
-    is its \c matchRole, every row matches.
+    These are also the numbers of Qt's roles for display, decoration, editing and tool tips. The
+    numbers are fixed, because existing code may use them. TitlesView treats role 0 as unknown: if
+    \c title is its \c matchRole, every row matches.
 
     \section2 An action can be enabled twice
     enableAction() does not check whether the list already contains the path, because the list that
@@ -119,34 +119,34 @@ qint64 priorityOfRow(const QuickAction &action)
     \section2 Existing rows do not move
     Rows keep their places when an action is enabled or disabled with \l showPotential, when the
     priority in a file changes, and when another model or process changes the order. Otherwise a row
-    could move while the user taps it. Models that are created later have the new places.
+    could move while the user taps it. Models that are created later use the new order.
 
     \section2 Other actions may be placed above the enabled ones
-    With \l showPotential, an action that is not enabled goes before the first row that has a
-    greater priority or none. If the first enabled action has no priority, every new action with one
-    is placed above it. Give all actions a priority, or show the enabled ones in a model of their
-    own.
+    With \l showPotential, an action that is not enabled is inserted before the first row that has a
+    greater priority or no priority. If the first enabled action has no priority, every new action
+    with a priority is placed above it. Give all actions a priority, or show the enabled ones in a
+    separate model.
 
     \section2 Reloads are repeated
-    The first change of the directory causes one reload, the second change two, the third change
-    three. The extra reloads have no visible effect.
+    The first change of the directory causes one reload, the second causes two, the third causes
+    three, and so on. The extra reloads have no visible effect.
 
     \section2 Arguments are strings
     Arguments of a call are sent as strings, even \c 1 and \c true, because an INI file has no
     types. A value with an unquoted comma is sent as an array of strings.
 
     \section2 A timeout is not a failure
-    A service that does not answer in time causes no warning: it may be busy opening its window. The
-    warning of a call that could not be sent ends in \c{%6}, because programs that read logs expect
-    exactly this text.
+    A service that does not answer in time causes no message: it may be busy opening its window. The
+    message about a call that could not be sent ends in \c{%6}, because programs that read logs
+    expect exactly this text.
 
     \section2 The store may show the package of another action
     It shows the package of the first row that sends the same call and names a package: actions with
     the same call need the same service.
 
     \section2 Titles do not follow a change of the language
-    A model loads the catalogs that definition files name once. A page that follows the language
-    creates its models again.
+    A model does not load its catalogs again when the language changes. A page that must follow the
+    change has to create its models again.
 */
 
 QuickActionsModel::QuickActionsModel(QObject *parent)
@@ -180,8 +180,8 @@ QuickActionsModel::~QuickActionsModel()
     \qmlproperty bool QuickActionsModel::showPotential
 
     Whether every offered action is listed, enabled or not, for a page on which the user enables and
-    disables actions. The default is false. A model that loads places the enabled actions first, in
-    the user's order.
+    disables actions. The default is false. When a model loads, it places the enabled actions first,
+    in the user's order.
 
     \qml
     Repeater {
@@ -194,8 +194,8 @@ QuickActionsModel::~QuickActionsModel()
     }
     \endqml
 
-    If a handler sets the property while rows are being changed, the rows change, and
-    showPotentialChanged() is emitted, when control returns to the event loop.
+    If a handler sets the property while rows are being changed, the model waits until control
+    returns to the event loop. It then changes the rows and emits showPotentialChanged().
 */
 void QuickActionsModel::setShowPotential(bool showPotential)
 {
@@ -253,8 +253,8 @@ QHash<int, QByteArray> QuickActionsModel::roleNames() const
 /*!
     \qmlmethod object QuickActionsModel::get(int index)
 
-    Returns the row at \a index as an object with a property for each role. An index without a row
-    gives an empty object and a warning.
+    Returns the row at \a index as an object with a property for each role. For an index
+    without a row, it returns an empty object and logs a message.
 */
 QVariantMap QuickActionsModel::get(int index) const
 {
@@ -274,7 +274,7 @@ QVariantMap QuickActionsModel::get(int index) const
     \qmlmethod void QuickActionsModel::triggerAction(int index)
 
     Sends the D-Bus call of the action at \a index on the session bus, without waiting for a reply.
-    Every failure except a timeout is logged as a warning, and so is an index without a row.
+    Every failure except a timeout is logged. An index without a row is logged, too.
 
     If the service does not exist and the action names a package that it needs, the application
     store client is asked to show that package: the method \c showApp of the interface
@@ -301,7 +301,7 @@ void QuickActionsModel::componentComplete()
     \qmlmethod void QuickActionsModel::disableAction(string path)
 
     enableAction() adds the definition file \a path at the end of the user's list. disableAction()
-    removes every entry of it. Both set
+    removes all of its entries. Both methods set
     \c /desktop/glimmera-marlo-home/events_screen_actions_user (dconf, bool) to \c true, which
     records that the user has changed the list.
 */

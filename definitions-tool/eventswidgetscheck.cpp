@@ -148,9 +148,9 @@ private:
     const EventsWidgetsFile &m_file;
     CheckContext *const m_context;
     Findings *const m_findings;
-    // The next of the widgets that the reader has found.
+    // The index of the next widget that the reader found.
     size_t m_next = 0;
-    // Lines are counted from the last position that was asked for.
+    // Lines are counted from the last position that was requested.
     int m_counted = 0;
     int m_line = 1;
 };

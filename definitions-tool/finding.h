@@ -43,7 +43,7 @@ private:
 
 // FILE:LINE: error|warning|note: text [rule], without a line break.
 QString toText(const Finding &finding);
-// An array with an object for each.
+// A JSON array with one object for each finding.
 QByteArray toJson(const std::vector<Finding> &findings);
 
 // In double quotes, on one line, shortened if necessary.

@@ -36,7 +36,7 @@ QString sectionName(const QByteArray &text, const IniLine &line)
     return (isEscapedGeneral ? fromLatin1(name.mid(1)) : unescaped(name)) + QLatin1Char('/');
 }
 
-// Of white space, QSettings removes only these.
+// QSettings removes only these kinds of white space.
 QByteArray withoutTrailingBlanks(QByteArray name)
 {
     while (name.endsWith(' ') || name.endsWith('\t')) {

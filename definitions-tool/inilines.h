@@ -16,8 +16,8 @@
 */
 struct NamedIniLine : IniLine {
     int number = 0; // From 1.
-    // Of a section, the prefix of its keys such as "remote-arguments/", empty for General; of a key,
-    // the name with that prefix, such as "remote-arguments/1/argument"; otherwise the line itself.
+    // For a section, the prefix of its keys, such as "remote-arguments/"; empty for General. For a
+    // key, its name with that prefix, such as "remote-arguments/1/argument". Otherwise the line.
     QString name;
     bool isAscii = true;
     // Whether the byte-order mark in front of a key has become a part of it.

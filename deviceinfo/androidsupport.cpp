@@ -25,7 +25,7 @@ const QLatin1String runtimeDaemon("/usr/sbin/apkd");
     }
     \endqml
 
-    \image gallery-android.png The gallery's page of this type
+    \image gallery-android.png The gallery's page for this type
 */
 
 /*!

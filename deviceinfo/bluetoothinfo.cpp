@@ -26,7 +26,7 @@ const QLatin1String addressFile("/var/lib/bluetooth/board-address");
     }
     \endqml
 
-    \image gallery-bluetooth.png The gallery's page of this type
+    \image gallery-bluetooth.png The gallery's page for this type
 */
 
 BluetoothInfo::BluetoothInfo(QObject *parent) : QObject(parent)

@@ -66,7 +66,7 @@ QVariantMap changedProperties(const QDBusMessage &message)
     }
     \endqml
 
-    \image gallery-cover.png The gallery's page of this type
+    \image gallery-cover.png The gallery's page for this type
 
     \section1 What may surprise
     \section2 Only values of the exact type count

@@ -95,7 +95,7 @@ QString agreementText(QLatin1String base)
     }
     \endqml
 
-    \image gallery-location.png The gallery's page of this type
+    \image gallery-location.png The gallery's page for this type
 
     \section1 What may surprise
     \section2 Services that were not saved are switched off

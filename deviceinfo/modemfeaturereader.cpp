@@ -27,7 +27,7 @@ const QLatin1String variantKey("variant");
     }
     \endqml
 
-    \image gallery-modem.png The gallery's page of this type
+    \image gallery-modem.png The gallery's page for this type
 */
 
 /*!

@@ -98,7 +98,7 @@ QStringList readTerms(const QString &base, const QString &localeName)
     }
     \endqml
 
-    \image gallery-terms.png The gallery's page of this type
+    \image gallery-terms.png The gallery's page for this type
 
     \section1 What may surprise
     \section2 The language goes before the country

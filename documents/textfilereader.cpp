@@ -25,7 +25,7 @@ QString readText(const QString &path, qint64 *maximumSize)
     QTextStream stream(file.content);
     QString line;
     while (!(line = stream.readLine()).isNull()) {
-        // Nothing between the lines, on purpose: pages wrap the text to their own width.
+        // Nothing is added between the lines, on purpose: pages wrap the text to their own width.
         content += line;
     }
     return content;
@@ -47,7 +47,7 @@ QString readText(const QString &path, qint64 *maximumSize)
     }
     \endqml
 
-    \image gallery-text-files.png The gallery's page of this type
+    \image gallery-text-files.png The gallery's page for this type
 
     \section1 What may surprise
     \section2 Lines run together

@@ -7,7 +7,7 @@
 #include <QByteArray>
 #include <QString>
 
-// The limit of texts that pages show: agreements, terms of use, licences.
+// The size limit for texts that pages show: agreements, terms of use, licences.
 constexpr qint64 maximumTextSize = qint64(16) * 1024 * 1024;
 
 // The content of a file. Reading it neither blocks nor takes more memory than allowed, even if
@@ -28,7 +28,7 @@ struct RegularFile {
 
 RegularFile readRegularFile(const QString &path, qint64 maximumSize);
 
-// Reads up to the first newline or NUL, without it. Only this part may not be larger.
+// Reads up to the first newline or NUL, without it. The size limit applies only to this part.
 RegularFile readFirstLine(const QString &path, qint64 maximumSize);
 
 #endif

@@ -32,13 +32,13 @@ public:
 
     explicit LocationSettings(QObject *parent = nullptr);
 
-    // Return the stored values, even before the signal of a change is emitted.
+    // Return the stored values, even before the change signal is emitted.
     bool gpsEnabled() const;
     bool mlsEnabled() const;
     OnlineAGpsState mlsOnlineState() const;
     OnlineAGpsState hereState() const;
 
-    // Emit the signal of a change before they return. A number that is not a state is refused with
+    // Emit the change signal before they return. A number that is not a state is refused with
     // a warning.
     void setGpsEnabled(bool enabled);
     void setMlsEnabled(bool enabled);

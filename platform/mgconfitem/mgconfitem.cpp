@@ -15,7 +15,7 @@
 
 namespace {
 
-// How long an exiting process waits for dconf-service to take what was set last.
+// How long an exiting process waits for dconf-service to accept the last changes.
 constexpr int exitTimeoutMs = 5000;
 
 // How long a key stays watched when no item is left.
@@ -77,7 +77,7 @@ GVariantPtr readStored(const QByteArray &path)
     return sameData(first.get(), second.get()) ? std::move(first) : readOnce();
 }
 
-// Null if nothing is stored, or nothing that can be read.
+// Null if no value is stored, or if the stored value cannot be read.
 GVariantPtr read(const QByteArray &path)
 {
     const GVariantPtr stored = readStored(path);

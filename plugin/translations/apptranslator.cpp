@@ -49,8 +49,8 @@ void AppTranslator::loadDefaultLocale()
 
 bool AppTranslator::eventFilter(QObject *watched, QEvent *event)
 {
-    // Loading a file posts another language change, which a host passes on to the watched object:
-    // only a new file is loaded, or this would never end.
+    // Loading a file posts another language change, which a host passes on to the watched object.
+    // Only a new file is loaded; otherwise this would never end.
     if (event->type() == QEvent::LanguageChange && digestForDefaultLocale() != m_loaded) {
         loadDefaultLocale();
     }

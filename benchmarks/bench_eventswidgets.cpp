@@ -173,8 +173,8 @@ bool compareLoading(Layout layout)
     return kept;
 }
 
-// What a view of these roles has to ask at least: the second one of every row, if there are two,
-// and the first one of those that match.
+// The least that a view of these roles must read: the second role of every row, if there are two,
+// and the first role of the rows that match.
 void readTitles(const QAbstractListModel &model, const QVector<int> &roles)
 {
     const int count = model.rowCount();

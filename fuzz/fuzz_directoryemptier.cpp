@@ -281,7 +281,7 @@ private:
         };
     }
 
-    // What is due before the next call; whether that fails.
+    // Makes the changes that are due before the next call. Returns whether that call fails.
     bool happens()
     {
         Fuzzing::require(++m_calls < tooManyCalls, "the walk comes to an end");

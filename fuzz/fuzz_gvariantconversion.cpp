@@ -11,7 +11,7 @@
 
 namespace {
 
-// What was stored once reads the same for ever.
+// A stored value remains the same however often it is read and stored.
 void store(const QVariant &value)
 {
     QString reason;

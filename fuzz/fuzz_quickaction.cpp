@@ -43,7 +43,7 @@ bool isStillOnTheBus()
     return QDBusConnection::sessionBus().call(ping).type() == QDBusMessage::ReplyMessage;
 }
 
-// Whatever else a file may hold would have been unpacked from it.
+// Any other type in a file would mean that QSettings unpacked a value.
 bool isPlain(const QVariant &value)
 {
     switch (value.userType()) {

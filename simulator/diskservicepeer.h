@@ -29,7 +29,7 @@ public:
     ~DiskServicePeer();
     Q_DISABLE_COPY_MOVE(DiskServicePeer)
 
-    // What it has been asked so far.
+    // The calls that it has received so far.
     QList<Call> calls();
     // The methods of calls().
     QStringList members();

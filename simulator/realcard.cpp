@@ -113,7 +113,7 @@ void RealCard::becomePrivate()
 {
     require(unshare(CLONE_NEWNS | CLONE_NEWNET) == 0, "make namespaces");
     require(mount(nullptr, "/", nullptr, MS_REC | MS_PRIVATE, nullptr) == 0, "make / private");
-    // Where the disk service mounts, and where the image lies.
+    // Contains the mount directories of the disk service, and the image.
     require(mount("tmpfs", "/media", "tmpfs", 0, "mode=755") == 0, "mount /media");
     // The device manager adds links and changes nodes.
     require(QDir().mkpath(QStringLiteral("/media/upper"))

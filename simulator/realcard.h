@@ -46,7 +46,7 @@ public:
     QStringList mountDirectories() const;
     QString file(const QString &name) const;
     QStringList files() const;
-    // What the tools say is on it.
+    // The value of a tag that blkid finds on it.
     QString probe(const char *tag) const;
 
     // Changes to its files wait from here until thaw().

@@ -24,7 +24,7 @@ public:
     ~RecordingService() override;
     Q_DISABLE_COPY_MOVE(RecordingService)
 
-    // What calls are answered with; an error has the given name and text.
+    // Sets the reply to calls; an error has the given name and text.
     void setAnswer(Answer answer, const QString &errorName = QString(),
                    const QString &errorText = QStringLiteral("as told"));
     QList<QDBusMessage> calls() const { return m_calls; }

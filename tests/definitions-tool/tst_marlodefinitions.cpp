@@ -284,7 +284,7 @@ void TestMarloDefinitions::root()
                          + ":2: warning: the catalog \"atlas\" does not hold the text \"Lamp\" "
                            "[text-id]\n"}));
 
-    // Of the root, only the catalogs count for named files.
+    // If files are named, only the catalogs of the root are used.
     installInRoot("maps_eng_en");
     write("other.conf", goodAction);
     QCOMPARE(run(line + " other.conf"), Result{0});

@@ -13,7 +13,7 @@ import sys
 
 import jsonschema
 
-# What a schema cannot express: what comes twice, and what other files hold.
+# The rules that a schema cannot express: duplicates, and the contents of other files.
 BEYOND = re.compile(r"\[(repeated-key|duplicate-path|text-id)\]$| is not installed in ")
 
 schema = json.loads(pathlib.Path(sys.argv[1]).read_text())

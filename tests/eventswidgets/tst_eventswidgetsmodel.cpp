@@ -120,7 +120,7 @@ private:
     // A model of one file with these widgets.
     void loadModel(const QByteArray &widgets, const QByteArray &catalog = {});
     QStringList column(Model::Role role) const { return ::column(*m_model, role); }
-    // Of each row: true or false.
+    // For each row, true or false.
     QStringList enabled() const { return column(Model::EnabledRole); }
     QString storedList() const { return m_key->value().toStringList().join(QLatin1Char(' ')); }
 
@@ -633,7 +633,7 @@ void TestEventsWidgetsModel::choices_data()
                                             << "true true";
 }
 
-// Of two widgets, a and b, which are enabled by default.
+// There are two widgets, a and b, which are enabled by default.
 void TestEventsWidgetsModel::choices()
 {
     QFETCH(QString, before);

@@ -423,7 +423,7 @@ void TestTitlesView::matches_data()
 {
     QTest::addColumn<QVariant>("match");
     QTest::addColumn<QStringList>("values");
-    // Of rows: text "1", text "one", number 1, number 2, true, a list of "one", nothing.
+    // The rows: text "1", text "one", number 1, number 2, true, a list of "one", nothing.
     QTest::newRow("text") << QVariant("one"_s) << words("one list");
     QTest::newRow("case") << QVariant("One"_s) << QStringList();
     QTest::newRow("number") << QVariant(1) << QStringList{"text 1"_s, "number 1"_s, "true"_s};

@@ -186,7 +186,7 @@ QStringList EveryType::state(const QString &name) const
     const QMetaObject *meta = it->metaObject();
     for (int i = base(it)->propertyCount(); i < meta->propertyCount(); ++i) {
         const QMetaProperty property = meta->property(i);
-        // Where a model lies differs from run to run.
+        // The address of a model differs from run to run.
         if (property.userType() != QMetaType::QObjectStar) {
             note(property.name(), property.read(it));
         }

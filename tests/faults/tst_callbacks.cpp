@@ -119,7 +119,7 @@ void TestCallbacks::make(const char *type, const QByteArray &declaration)
         }
         return created;
     };
-    // What it has is asked of one that does nothing.
+    // Members are looked up in an object that has no handlers.
     const std::unique_ptr<QObject> model = create(QByteArray(type) + " { }");
     const bool isModel = qobject_cast<QAbstractListModel *>(model.get()) != nullptr;
     const QMetaObject *base =

@@ -221,7 +221,7 @@ void TestCardFaults::helperThatWritesAHundredMegabytes()
 {
     startProbing(otherDevice, "head -c 100000000 /dev/zero | tr '\\0' x\n");
     TRY_COMPARE(m_formatter->status(), Formatter::Idle);
-    // Whatever it writes is the type.
+    // All of its output becomes the type.
     QCOMPARE(m_formatter->filesystemType().size(), 100000000);
     startProbing(device, "echo vfat\n");
     TRY_COMPARE(m_formatter->filesystemType(), vfat);

@@ -177,7 +177,7 @@ private:
     QSignalSpy m_spy;
 };
 
-// Of dconf-service; 0 if it does not run.
+// The process of dconf-service; 0 if it does not run.
 pid_t servicePid()
 {
     const QDBusReply<uint> pid = QDBusConnection::sessionBus().interface()->servicePid(serviceName);
@@ -349,7 +349,7 @@ void TestDconfFaults::serviceDiesInTheMiddleOfAWrite()
     // Gives the process time to send the call.
     QTest::qWait(100);
     service.kill();
-    // What was not stored is taken back, once all that is under way has failed or been stored.
+    // dconf reverts changes that were not stored, once each pending write has succeeded or failed.
     QVERIFY(aWriteFails());
     TRY_COMPARE(m_user->isOn(), true);
     QVERIFY(isStored(true));

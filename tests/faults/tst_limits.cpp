@@ -1,7 +1,7 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-// What the kernel gives out sparingly, used up; and directories that are not what they were.
+// The module with exhausted kernel resources, and with directories that are replaced.
 
 #include "everytype.h"
 #include "files.h"

@@ -67,8 +67,8 @@ const QByteArray action = "remote-service=org.example.lamp\nremote-path=/lamp\n"
                           "remote-interface=org.example.Lamp\nremote-method=toggle\n"
                           "requires-package=lamp\n";
 
-// QtDBus logs this when two changes of an owner overtake each other between its threads, as they do
-// now and then where a service comes and goes as quickly as here. It goes by the later one.
+// QtDBus logs this when two changes of an owner overtake each other between its threads, as they
+// sometimes do when a service starts and stops as quickly as here. It then uses the later one.
 const QString lateOwner =
     QStringLiteral("QDBusConnection: name '[^']*' had owner '[^']*' but we thought it was");
 

@@ -100,7 +100,7 @@ private:
 
 } // namespace
 
-// Takes the place of the C library's own, in which there is no time to do anything in between.
+// Replaces the function of the C library, because a test cannot act in the middle of that one.
 extern "C" Q_DECL_EXPORT int inotify_add_watch(int inotify, const char *path, uint32_t events)
 {
     using Function = int (*)(int, const char *, uint32_t);

@@ -363,7 +363,7 @@ void tst_FileRemover::entriesOfTheMountTable_data()
                              "/dev/test-card1/", "/dev//test-card1", "/dev/test-card1 "}) {
         fails(path, card, path);
     }
-    // What the device path names is no device.
+    // The device path does not name a device.
     fails("empty device path", card, "");
     for (const char *path : {"tmpfs", "none", "test-card1", "UUID=1234-5678", "./card"}) {
         fails(path, line(path, "@/card"), path);

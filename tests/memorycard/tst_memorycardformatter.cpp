@@ -55,7 +55,7 @@ constexpr char unmounted[] = "not busy, Unmounting, busy, Idle, not busy";
 constexpr char formatted[] = "not busy, Unmounting, busy, Formatting, Mounting, Idle, not busy";
 constexpr char emptied[] = "not busy, Mounting, busy, RemovingFiles, Idle, not busy";
 
-// Of the calls that were sent and wait for a reply, in milliseconds.
+// The timeouts of the calls that were sent and wait for a reply, in milliseconds.
 QList<int> timeouts;
 bool signalledAllProcesses = false;
 
@@ -898,7 +898,7 @@ void TestMemoryCardFormatter::errorEndsTheSequence()
     TRY_EVENTS("not busy, Unmounting, busy, Formatting, mount ErrorDeviceBusy, Error, not busy");
     QCOMPARE(takeLog(), diskServiceError("Mount", "DeviceBusy"));
 
-    // Nothing is left of either.
+    // The queue contains nothing of either sequence.
     startDiskService("done");
     forgetEvents()->unmount();
     TRY_EVENTS(unmounted);

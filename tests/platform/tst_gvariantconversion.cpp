@@ -201,7 +201,7 @@ void TestGVariantConversion::readsForeignTypes_data()
     row("{'a': 'b'}", QVariantMap{{a, b}});
     row("{'a': <{'b': <1>}>}", QVariantMap{{a, QVariantMap{{b, 1}}}});
     row("@a{ss} {}", QVariantMap());
-    // Of equal keys the first one counts.
+    // If a key occurs twice, the first value is used.
     row("{'a': 1, 'b': 2, 'a': 3}", QVariantMap{{a, 1}, {b, 2}});
     // Types that the module never stores are converted, too.
     row("handle 3", nothing);

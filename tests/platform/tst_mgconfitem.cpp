@@ -260,7 +260,7 @@ private:
     const pid_t m_pid;
 };
 
-// Of dconf-service, which runs once a value was stored.
+// The process of dconf-service, which runs once a value has been stored.
 pid_t servicePid()
 {
     const QDBusReply<uint> pid =

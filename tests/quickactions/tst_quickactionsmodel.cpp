@@ -703,7 +703,7 @@ void TestQuickActionsModel::moveIsNotReloaded()
     QCOMPARE(events(), "moved 0 1"_s);
     setEnabled("b a a"_s);
     QCOMPARE(events(), "changed 1"_s);
-    // Rows that stay keep their places; move() goes by the list.
+    // Rows that stay keep their places; move() uses the indexes of the list.
     setEnabled("a b"_s);
     QCOMPARE(rows(), "b a"_s);
     m_model->move(0, 1);

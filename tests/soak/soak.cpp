@@ -27,7 +27,7 @@ const char *const module = "com.marlo.settings.system";
 constexpr std::size_t maximumObjects = 24;
 constexpr int eventTime = 10; // ms, for what a step has led to
 constexpr int measurements = 20;
-// What calls that nobody answers and programs that are ended take to be gone, at most.
+// The longest time until unanswered calls and ended programs have disappeared.
 constexpr int settleTime = 2000; // ms
 constexpr int quietTime = 300; // ms
 
@@ -36,9 +36,9 @@ constexpr bool measuresMemory = false; // what is freed is kept a while, to catc
 #else
 constexpr bool measuresMemory = true;
 #endif
-// Of the heap, whose pieces come to lie differently each time.
+// For the heap, whose layout differs each time.
 constexpr qint64 memoryTolerance = 2048; // KiB
-// What Qt and GLib open when it is first needed, and keep.
+// For files that Qt and GLib open on first use and keep open.
 constexpr int fileTolerance = 2;
 
 void processEvents(int time)

@@ -24,8 +24,8 @@ void write(const QString &key, const QStringList &value);
 // Resets a key, or everything below a path that ends with a slash.
 void reset(const QString &path);
 
-// What this process has set is stored one by one in the background: what another one writes next is
-// really the last only after that.
+// dconf stores the changes of this process one by one in the background. Only after that does a
+// write of another process come last.
 void waitUntilStored();
 
 } // namespace DconfTool

@@ -98,7 +98,7 @@ case("bad-behind", '{ "widgets": [] }\n}\n', no_json(2))
 case("bad-deep", "[" * 2000 + "]" * 2000, no_json(1))
 case("bad-deep-objects", '{"a":' * 2000, no_json(1))
 
-# What is no object.
+# Not an object.
 case("bad-null", "null", no_object(1))
 case("bad-text", '"widgets"', no_object(1))
 case("bad-number", "\ufeff\n 7", no_object(2))

@@ -105,12 +105,12 @@ bool hasDescriptorsLeft()
 
     \section1 What may surprise
     \section2 Mounting and unmounting change the status afterwards
-    \c Formatting, \c RemovingFiles and \c Probing are set when the work begins, \c Unmounting and
-    \c Mounting when the disk service has reported success. Until then the status is the previous
-    one, and for the first step of a sequence \l busy is \c false. Operations that are requested
-    meanwhile are queued and run afterwards. If the request to the disk service fails, they are
-    dropped, except the probe of a new \l devicePath. A page must remember
-    that it has requested an operation.
+    \c Formatting, \c RemovingFiles and \c Probing are set when the work begins. \c Unmounting and
+    \c Mounting are set after the disk service has reported success. Until then the status is the
+    previous one, and for the first step of a sequence \l busy is \c false. Operations that are
+    requested meanwhile are queued and run afterwards. If the request to the disk service fails,
+    they are dropped, except the probe of a new \l devicePath. A page must remember that it has
+    requested an operation.
 
     \section2 Formatting needs a mounted card
     On a card that is not mounted, format() ends with \c ErrorNotMounted, so only a card that is

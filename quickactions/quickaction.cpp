@@ -148,7 +148,7 @@ QVariantMap QuickAction::readActionConfig(const QString &path) const
             hasArguments = true;
         }
     }
-    // An array without elements is an entry, too. All other groups are ignored.
+    // An empty array becomes an entry, too. All other groups are ignored.
     if (hasArguments) {
         QVariantList arguments;
         const int size = qMin(settings.value(argumentsSizeKey).toInt(), enoughArguments);

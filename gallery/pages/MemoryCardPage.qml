@@ -143,7 +143,7 @@ GalleryPage {
         }
     }
 
-    // Lists the types; without a path it does nothing else.
+    // Only lists the supported types, because it has no path.
     MemoryCardFormatter {
         id: types
     }

@@ -237,7 +237,7 @@ int main(int argc, char *argv[])
     std::vector<Pauses> hanging;
     QStringList names;
     {
-        // Starts the service of dconf, and warms up.
+        // Starts dconf-service, and warms up.
         std::vector<Pauses> unused;
         QStringList unusedNames;
         measure(&unused, &unusedNames);

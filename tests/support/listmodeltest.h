@@ -38,7 +38,7 @@ protected:
     // The directory of the definition files, which end in the suffix.
     ListModelTest(QString directory, QString suffix);
 
-    // Makes and watches a model that lists everything, with loaded rows.
+    // Creates a model that lists everything, loads its rows and records its signals.
     virtual void loadEverything() = 0;
     virtual void removeModel() = 0;
     // The names of the rows, separated by blanks.

@@ -22,7 +22,7 @@
 class EveryType
 {
 public:
-    // Definition files, texts and all else that is read, in their places.
+    // Installs definition files, texts and all other files that the types read.
     static void installFiles();
 
     // Ends the test program if the module or one of its types is missing.

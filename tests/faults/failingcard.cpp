@@ -99,7 +99,7 @@ void FailingCard::serve()
     }
 }
 
-// False when the card is to be gone.
+// Returns false when the card must disappear.
 bool FailingCard::answer(const char *request)
 {
     fuse_in_header in = {};

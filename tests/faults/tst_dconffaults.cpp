@@ -313,7 +313,7 @@ void TestDconfFaults::serviceHangs()
     QVERIFY(stores(true));
 
     StoppedService service;
-    // The process itself sees what it has chosen; others once the service goes on.
+    // This process sees its choice immediately. Others see it once the service continues.
     m_user->choose(false);
     TRY(!m_user->isOn());
     m_user->choose(true);

@@ -107,7 +107,7 @@ void TestLimits::noInotifyWatches()
     QCOMPARE(rows(types.object(actions)), 1);
     QCOMPARE(rows(types.object(widgets)), 1);
     addFiles(QStringLiteral("new"));
-    // Not followed, but read by whoever comes, and when asked.
+    // Existing models do not notice the files. New models read them, and so does a requested scan.
     QTest::qWait(100);
     QCOMPARE(rows(types.object(actions)), 1);
     QCOMPARE(rows(it(types.make(actions))), 2);

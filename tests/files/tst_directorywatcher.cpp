@@ -411,7 +411,7 @@ void TestDirectoryWatcher::watchersShareOneInstance()
     QSignalSpy spy(watchers.front().get(), &DirectoryWatcher::changed);
     rewrite(path("a/b/file.conf"));
     QVERIFY(spy.wait());
-    // A directory that is replaced leaves none behind, whether it is removed or only moved away.
+    // Replacing a directory leaves no watch behind, whether it is removed or only moved away.
     Files::remove(path("a/b"));
     Files::makeDirectory(path("a/b"));
     QVERIFY(spy.wait());

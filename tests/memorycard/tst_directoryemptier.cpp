@@ -447,7 +447,7 @@ void tst_DirectoryEmptier::wideDirectoriesInDeepTree()
     QVERIFY(empty(m_top));
     QCOMPARE(list(m_top), QByteArrayList());
     QCOMPARE(counter.openDescriptors, maxOpenDescriptors);
-    // A directory is opened once. Those that are not kept open are opened once more later.
+    // Each directory is opened once. Those that are not kept open are opened a second time later.
     QVERIFY(counter.counts.value("openat") > deep + 2 * (deep + 1));
     QVERIFY(counter.counts.value("openat") < 2 * deep + 2 * (deep + 1));
 }

@@ -43,7 +43,7 @@ const QString held = QStringLiteral("held");
 
 const QString debugRule = QStringLiteral("org.tarnwickos.settings.memorycard.debug=true");
 const QByteArray debug = QByteArrayLiteral("debug [org.tarnwickos.settings.memorycard] ");
-// The verbs are crossed on purpose.
+// The verbs are swapped on purpose.
 const QByteArray mountWithoutName = QByteArrayLiteral(
     "critical [org.tarnwickos.settings.memorycard] Cannot unmount without device name");
 const QByteArray unmountWithoutName = QByteArrayLiteral(

@@ -336,7 +336,7 @@ void TestQuickAction::cannotBeOpened()
 
 void TestQuickAction::withoutAStandardInput()
 {
-    // The lowest descriptor is as good as any other to look for what is packed.
+    // The search for packed values must also work with descriptor 0.
     write("title=@DateTime(\\0\\0\\0\\x10)\n");
     const int input = dup(STDIN_FILENO);
     close(STDIN_FILENO);

@@ -31,7 +31,7 @@ void record(QtMsgType type, const QMessageLogContext &context, const QString &te
 
 MessageLog::MessageLog()
 {
-    // Every test has one, and none may run where what it does to files, keys and services stays.
+    // Every test creates a log, and no test may run where its changes to files and keys persist.
     if (!qEnvironmentVariableIsSet("MARLO_THROW_AWAY_ROOT")) {
         qFatal("this test runs only in the throw-away root of simulator");
     }

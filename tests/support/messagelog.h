@@ -37,13 +37,13 @@ public:
     ~MessageLog();
     Q_DISABLE_COPY_MOVE(MessageLog)
 
-    // All messages so far, the oldest first; they are forgotten.
+    // Returns and clears all messages so far, the oldest first.
     QList<Message> takeAll();
     // The texts of takeAll(), where type and category are of no interest.
     QStringList takeTexts();
-    // takeAll() as a text of a line each.
+    // takeAll() as a text with one line for each message.
     QString takeReport();
-    // The lines of takeReport() but for those that match: what others log and no test has a say in.
+    // The lines of takeReport() except those that match, which other libraries log.
     QStringList takeLinesWithout(const QRegularExpression &ignored);
 };
 

@@ -115,7 +115,7 @@ void RandomModelTest::steps()
         QCoreApplication::processEvents();
         const QString different = difference();
         if (!different.isEmpty()) {
-            // The message of a failure would be cut off.
+            // QFAIL() would truncate such a long message.
             std::cerr << "after step " << done.size() << ":\n"
                       << qPrintable(done.mid(qMax(0, done.size() - 20)).join(QLatin1Char('\n')))
                       << '\n';

@@ -20,7 +20,7 @@ class UsedUpDescriptors
 public:
     explicit UsedUpDescriptors(int left = 0)
     {
-        // A process may wait for no more than it may have: of what it has, all stay usable.
+        // poll() refuses more descriptors than the limit. With 256, all open ones remain usable.
         const rlimit few = {256, m_limit.rlim_max};
         if (setrlimit(RLIMIT_NOFILE, &few) != 0) {
             qFatal("cannot limit the descriptors");

@@ -42,7 +42,7 @@ QByteArray everyType()
         + "property list<QtObject> objects: [" + objects + "]\n}";
 }
 
-// In KiB: what this process has written to and shares with nobody.
+// The private memory, in KiB, that this process has written to.
 int ownMemory()
 {
     QFile file(QStringLiteral("/proc/self/smaps_rollup"));

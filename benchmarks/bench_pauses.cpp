@@ -183,7 +183,7 @@ bool measureRest()
     if (!page.waitForReadyRead()) {
         qFatal("the page is not shown");
     }
-    // Until what its creation started has ended.
+    // Waits until all work that its creation started has ended.
     long before = -1;
     for (int i = 0; i < 30 && switches(page.processId()) != before; ++i) {
         before = switches(page.processId());

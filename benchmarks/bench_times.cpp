@@ -77,7 +77,7 @@ int runRound()
 {
     QQmlEngine engine;
     engine.addImportPath(QStringLiteral(MODULES));
-    // The engine's own start does not count.
+    // The start of the engine is not measured.
     QQmlComponent warm(&engine);
     warm.setData("import QtQml 2.15\nQtObject {}", QUrl(QStringLiteral("page.qml")));
     delete warm.create();

@@ -15,7 +15,7 @@
 namespace Rounds {
 
 // In seconds. Other processes disturb processor time, which includes that of children, the least.
-// Waiting shows in wall time only.
+// Only the wall time includes waiting.
 struct Time {
     double wall = 0;
     double processor = 0;

@@ -20,12 +20,12 @@ public:
     ~ServiceProcess();
     Q_DISABLE_COPY_MOVE(ServiceProcess)
 
-    // It keeps its name and answers nothing until it goes on.
+    // Stops the process. It keeps its name, but does not reply until goOn() is called.
     void stop();
     void goOn();
     void sendSignals(int count);
 
-    // The members that it was called for so far.
+    // The members that have been called so far.
     QStringList calls();
 
 private:

@@ -4,7 +4,7 @@
 #include <QQmlExtensionPlugin>
 #include <qqml.h>
 
-// The least that can be imported: what it costs, every module does.
+// The smallest plugin that can be imported. Every module costs at least as much.
 class EmptyPlugin : public QQmlExtensionPlugin
 {
     Q_OBJECT

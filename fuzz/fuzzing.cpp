@@ -29,7 +29,7 @@ void keepQuiet(QtMsgType type, const QMessageLogContext &context, const QString 
 // Called once, before the first input, by the fuzzer and by replay.cpp.
 int LLVMFuzzerInitialize(int *argc, char ***argv)
 {
-    // Inputs name files and services; they must not reach those of the machine.
+    // Inputs name files and services. They must not reach real files and services of this machine.
     if (!qEnvironmentVariableIsSet("MARLO_THROW_AWAY_ROOT")) {
         qFatal("this program runs only in the throw-away root of simulator");
     }

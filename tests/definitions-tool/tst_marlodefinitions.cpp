@@ -461,7 +461,7 @@ void TestMarloDefinitions::list()
                           "events widgets: 2\n"
                           "  disabled  unavailable  /y.qml  Y\n"
                           "  enabled   available    /x.qml  X\n"};
-    // dconf stores in the background.
+    // dconf stores values in the background.
     QTRY_COMPARE(run("list"), expected);
     enabled.unset();
     blocked.unset();

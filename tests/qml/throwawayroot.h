@@ -44,7 +44,7 @@ public:
     }
     Q_INVOKABLE void unsetKey(const QString &key) const { MGConfItem(key).unset(); }
     Q_INVOKABLE QVariant key(const QString &key) const { return MGConfItem(key).value(); }
-    // The module uses another dconf client than this program. Writes of one may overtake the other's.
+    // The module has its own dconf client. Its writes may overtake those of this program.
     Q_INVOKABLE void waitUntilStored() const { DconfTool::waitUntilStored(); }
 
     // A peer on the session bus, one at a time, and the calls that it has received so far.

@@ -33,9 +33,18 @@ const QLatin1String ext4("ext4");
 const QLatin1String mkfsVfat("/sbin/mkfs.vfat");
 const QLatin1String mkfsExt4("/sbin/mkfs.ext4");
 
-// Whether the process can open enough descriptors to start a helper or a thread. A thread that gets
-// none for its event loop ends the process. Qt 5.15 may treat a helper that never started as
-// running, with the process id -1: killing it would kill all processes of the user.
+// Qt 5.15 starts a plain QProcess with clone(). If that fails, it takes the process for running, with
+// the process id -1: killing it would kill all processes of the user. It starts a subclass with
+// fork(), whose failure it reports.
+class HelperProcess : public QProcess
+{
+public:
+    using QProcess::QProcess;
+};
+
+// Whether the process can open enough descriptors to start a helper or a thread. Without them
+// QProcess does not always report that a helper did not start, and a thread that gets none for its
+// event loop ends the process.
 bool hasDescriptorsLeft()
 {
     std::array<FileDescriptor, 16> spare; // a helper takes up to 8
@@ -445,7 +454,7 @@ void MemoryCardFormatter::doNextCommand()
         return;
     }
     if (m_process == nullptr) {
-        m_process = new QProcess(this);
+        m_process = new HelperProcess(this);
         m_process->setStandardErrorFile(QProcess::nullDevice());
         // Queued: a process cannot be started again from the signal that it did not start.
         connect(m_process, &QProcess::errorOccurred, this, &MemoryCardFormatter::commandError,

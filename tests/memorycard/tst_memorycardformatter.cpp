@@ -58,6 +58,7 @@ constexpr char emptied[] = "not busy, Mounting, busy, RemovingFiles, Idle, not b
 // The timeouts of the calls that were sent and wait for a reply, in milliseconds.
 QList<int> timeouts;
 bool signalledAllProcesses = false;
+bool forkFails = false;
 
 QString objectPath(const QString &name)
 {
@@ -115,6 +116,16 @@ extern "C" Q_DECL_EXPORT int kill(pid_t pid, int signal) noexcept
     return int(syscall(SYS_kill, pid, signal));
 }
 
+extern "C" Q_DECL_EXPORT pid_t fork() noexcept
+{
+    if (forkFails) {
+        errno = EAGAIN;
+        return -1;
+    }
+    static const auto original = reinterpret_cast<pid_t (*)()>(dlsym(RTLD_NEXT, "fork"));
+    return original();
+}
+
 class TestMemoryCardFormatter : public FormatterTest
 {
     Q_OBJECT
@@ -134,6 +145,7 @@ private Q_SLOTS:
     void probe_data();
     void probe();
     void helperWithFewDescriptors();
+    void helperBeyondTheProcessLimit();
     void retriesWhenTheStatusIsError_data();
     void retriesWhenTheStatusIsError();
     void supportedFormatTypes_data();
@@ -549,6 +561,18 @@ void TestMemoryCardFormatter::helperWithFewDescriptors()
     }
     QVERIFY(started && failed);
     QVERIFY(!signalledAllProcesses);
+}
+
+void TestMemoryCardFormatter::helperBeyondTheProcessLimit()
+{
+    installProbe("ext4\n");
+    makeFormatter();
+    forkFails = true;
+    m_formatter->setDevicePath(card);
+    TRY_EVENTS("path /dev/testcard1, Error");
+    forkFails = false;
+    forgetEvents()->setDevicePath(otherCard);
+    TRY_EVENTS("path /dev/testcard2, Probing, busy, type ext4, Idle, not busy");
 }
 
 void TestMemoryCardFormatter::retriesWhenTheStatusIsError_data()

@@ -62,9 +62,11 @@ QString agreementText(QLatin1String base)
     \inqmlmodule com.marlo.settings.system
     \brief Switches the location services, and saves and restores the user's own choice.
 
-    The switches \l gpsEnabled, \l mlsEnabled, \l mlsOnlineState and \l hereState are those of the
-    platform's location settings, which a device's own library implements. Without such a library
-    the module stores them in dconf, and every process sees the same values.
+    The switches are those of the platform's location settings: \l gpsEnabled for satellites;
+    \l mlsEnabled for MLS, a service that finds the position by the radio networks around, and
+    \l mlsOnlineState for its online assistance; \l hereState for HERE, another positioning service.
+    A device's own library implements them. Without such a library the module stores them in dconf,
+    and every process sees the same values.
 
     A page saves the switches when the user changes one, and restores them when the user returns to
     the own choice:

@@ -62,8 +62,24 @@ bool hasDescriptorsLeft()
     \brief Formats, empties, mounts, unmounts and probes a memory card.
 
     The disk service knows a card by its \l deviceName; \l devicePath is the device node of its
-    partition. Every operation is a sequence of commands that run one after the other, without
-    blocking. \l status shows the progress:
+    partition. This shows the type of the file system on a card:
+
+    \qml
+    Label {
+        text: card.filesystemType
+
+        MemoryCardFormatter {
+            id: card
+
+            devicePath: "/dev/mmcblk1p1"
+        }
+    }
+    \endqml
+
+    \image gallery-memory-card.png The gallery's page for this type
+
+    Every operation is a sequence of commands that run one after the other, without blocking.
+    \l status shows the progress:
 
     \table
     \header \li Operation \li Status on success
@@ -86,20 +102,6 @@ bool hasDescriptorsLeft()
     accepted. Formatting, removing files and probing use the \l devicePath and the type of their
     request; mounting and unmounting use the \l deviceName that is set when the step starts.
     The formatter logs messages in the category \c{org.tarnwickos.settings.memorycard}.
-
-    \qml
-    Label {
-        text: card.filesystemType
-
-        MemoryCardFormatter {
-            id: card
-
-            devicePath: "/dev/mmcblk1p1"
-        }
-    }
-    \endqml
-
-    \image gallery-memory-card.png The gallery's page for this type
 
     \section1 When an operation has ended
 

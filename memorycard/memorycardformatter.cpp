@@ -550,7 +550,8 @@ void MemoryCardFormatter::mountOperationFinished(const QString &method,
     qCWarning(lcMemoryCardLog) << method << "error:" << name.toLatin1().constData();
     const auto code = DiskService::errorCode(name);
     // The card is already in the requested state, or about to be.
-    const bool isForgiven = code == ErrorAlreadyMounted || code == ErrorAlreadyUnmounting;
+    const bool isForgiven =
+        code && (*code == ErrorAlreadyMounted || *code == ErrorAlreadyUnmounting);
     if (!isForgiven) {
         // Dropped before any signal is emitted: requests made from handlers start a new sequence. A
         // path that was set during the request is still probed.

@@ -110,7 +110,8 @@ bool hasDescriptorsLeft()
     change \c Idle. A page therefore creates a formatter for each operation, in a Loader, and starts
     the operation in the handler of devicePathChanged(). The probe of the path then runs after the
     operation. When the status becomes \c Idle or \c Error, the operation has ended, and after
-    \c Idle \l filesystemType is up to date. A complete page:
+    \c Idle \l filesystemType is up to date. A complete page, which would empty the card by
+    \c{run(card => card.removeAllFiles())}:
 
     \quotefile memory-card.qml
 

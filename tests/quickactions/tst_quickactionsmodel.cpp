@@ -37,7 +37,7 @@ QString path(const QString &name)
 QStringList paths(const QString &names)
 {
     QStringList paths;
-    for (const QString &name : names.split(QLatin1Char(' '), Qt::SkipEmptyParts)) {
+    for (const QString &name : words(names)) {
         paths.append(path(name));
     }
     return paths;
@@ -892,7 +892,7 @@ void TestQuickActionsModel::handlersMayCallBack()
     QTRY_VERIFY(answers > 0);
     // Finally the rows are those of the list.
     const auto sorted = [](const QString &names) {
-        QStringList list = names.split(QLatin1Char(' '), Qt::SkipEmptyParts);
+        QStringList list = words(names);
         list.removeDuplicates();
         list.sort();
         return list;

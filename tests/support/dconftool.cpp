@@ -4,15 +4,10 @@
 #include "dconftool.h"
 
 #include "mgconfitem.h"
+#include "patience.h"
 
 #include <QProcess>
 #include <QTest>
-
-namespace {
-
-constexpr int patience = 60000; // ms, of a machine that is very busy
-
-} // namespace
 
 QByteArray DconfTool::run(const QStringList &arguments, const QByteArray &input)
 {

@@ -7,9 +7,14 @@
 #include <QStringList>
 
 // The words of a text that are separated by blanks.
+inline QStringList words(const QString &text)
+{
+    return text.split(QLatin1Char(' '), Qt::SkipEmptyParts);
+}
+
 inline QStringList words(const char *text)
 {
-    return QString::fromUtf8(text).split(QLatin1Char(' '), Qt::SkipEmptyParts);
+    return words(QString::fromUtf8(text));
 }
 
 #endif

@@ -5,7 +5,7 @@
 
 #include "eventswidget.h"
 #include "eventswidgetsfile.h"
-#include "models/insertionindex.h"
+#include "models/rownumbers.h"
 
 #include <QDirIterator>
 #include <QFileInfo>
@@ -312,17 +312,18 @@ void EventsWidgetsModel::mergeWidgets(const std::vector<Widget> &widgets)
     // The row of a path is this one or a later one, because insertions only push rows down.
     QHash<QString, int> firstRows;
     firstRows.reserve(m_rows.size() + int(widgets.size()));
-    std::vector<int> orders;
     for (int row = 0; row < m_rows.size(); ++row) {
         firstRows.insert(m_rows.at(row).path, row);
-        orders.push_back(m_rows.at(row).order);
     }
+    RowNumbers<int> orders; // Filled when they are needed: most scans insert nothing.
     for (const Widget &widget : widgets) {
         int row = firstRows.value(widget.path, -1);
         if (row < 0) {
-            row = insertionIndex(orders, widget.order);
+            while (orders.count() < m_rows.size()) {
+                orders.append(m_rows.at(orders.count()).order);
+            }
+            row = orders.insert(widget.order);
             firstRows.insert(widget.path, row);
-            orders.insert(orders.begin() + row, widget.order);
             insertWidget(row, widget);
             continue;
         }
@@ -330,7 +331,7 @@ void EventsWidgetsModel::mergeWidgets(const std::vector<Widget> &widgets)
             ++row;
         }
         if (m_rows.at(row) != widget) {
-            orders[std::size_t(row)] = widget.order;
+            orders.clear();
             updateWidget(row, widget);
         }
     }

@@ -3,7 +3,7 @@
 
 #include "quickactionsmodel.h"
 
-#include "models/insertionindex.h"
+#include "models/rownumbers.h"
 #include "quickaction.h"
 
 #include <QDBusConnection>
@@ -35,7 +35,7 @@ const QLatin1String storePath("/StoreClient");
 const QLatin1String storeInterface("com.marlo.marlostore");
 const QLatin1String storeMethod("showApp");
 
-// The search for the place of a new row stops at a row without a priority, wherever that is.
+// A new row without a priority goes to the end, and one with a priority before rows without one.
 qint64 priorityOfRow(const QuickAction &action)
 {
     return action.priority() ? *action.priority() : std::numeric_limits<qint64>::max();
@@ -377,16 +377,14 @@ void QuickActionsModel::loadActions()
             }
         }
 
-        std::vector<qint64> priorities;
+        RowNumbers<qint64> priorities;
         for (const Action &action : qAsConst(m_rows)) {
-            priorities.push_back(priorityOfRow(action));
+            priorities.append(priorityOfRow(action));
         }
         for (const QString &path : selected) {
             if (missing.contains(path)) {
                 const Action action(path, false);
-                const int row = insertionIndex(priorities, action.priority().value_or(-1));
-                priorities.insert(priorities.begin() + row, priorityOfRow(action));
-                insertAction(row, action);
+                insertAction(priorities.insert(priorityOfRow(action)), action);
             }
         }
     }

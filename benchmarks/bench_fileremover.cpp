@@ -49,7 +49,7 @@
 
 namespace {
 
-constexpr int rounds = 7;
+constexpr int rounds = 5;
 constexpr int depth = 50000;
 constexpr int smallStackSize = 256 * 1024;
 constexpr int photoSize = 16 * 1024;

@@ -122,7 +122,7 @@ Rounds::Work lifetimes(int count)
 
 bool measureLoading(bool enabled)
 {
-    const std::vector<int> counts{few, 1000, 2000, many};
+    const std::vector<int> counts{few, 1000, many};
     std::vector<Rounds::Work> works;
     for (const int count : counts) {
         works.push_back(loading(count, enabled));

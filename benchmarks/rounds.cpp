@@ -49,14 +49,16 @@ void printRow(const char *work, const char *beside, const QString &figure, doubl
 
 } // namespace
 
-std::vector<Rounds::Times> Rounds::times(const std::vector<Work> &works, int rounds)
+std::vector<Rounds::Times> Rounds::times(const std::vector<Work> &works, int rounds, WarmUp warmUp)
 {
     std::vector<Times> times(works.size());
     std::vector<size_t> order(works.size());
     std::iota(order.begin(), order.end(), 0);
     std::mt19937 random(std::random_device{}());
-    for (const Work &work : works) {
-        timeOf(work);
+    if (warmUp == WarmUp::Yes) {
+        for (const Work &work : works) {
+            timeOf(work);
+        }
     }
     for (int round = 0; round < rounds; ++round) {
         std::shuffle(order.begin(), order.end(), random);

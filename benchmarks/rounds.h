@@ -32,8 +32,11 @@ struct Work {
 // For figures that are printed but not checked.
 constexpr double noBar = -1;
 
-// Runs everything once to warm up, then in rounds, each in a random order.
-std::vector<Times> times(const std::vector<Work> &works, int rounds = 9);
+enum class WarmUp { Yes, No };
+
+// Runs everything in rounds, each in a random order, and before that once to warm up.
+std::vector<Times> times(const std::vector<Work> &works, int rounds = 9,
+                         WarmUp warmUp = WarmUp::Yes);
 
 // Prints the median of the rounds' ratios, the lowest and the highest, and the bar. The bar is missed
 // only when all rounds but one miss it: the machine may disturb a single round. Returns whether the

@@ -1,7 +1,8 @@
 # SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 # SPDX-License-Identifier: BSD-3-Clause
 
-# Qt 6 compiles the same catalogs, and Debian has its lrelease without Qt Designer and WebKit.
+# The lrelease of Qt 6 compiles the same catalogs, and on Debian it does not require Qt Designer and
+# WebKit.
 find_program(LRELEASE lrelease HINTS ${QT_BINARY_DIR} /usr/lib/qt6/bin REQUIRED)
 
 # compile_catalogs(<variable> <file.ts>...)

@@ -3,10 +3,10 @@
 
 # add_subsystem(<name> SOURCES <file>... LINK <target>...)
 #
-# A directory of the module: a static library whose dependencies its users inherit. A static library
-# resolves no symbols, so a dependency that a directory uses without declaring it would go unnoticed
-# in the plugin, which links them all. <name>-links links the same objects with the declared
-# dependencies only, and fails to link if one is missing.
+# Builds a directory of the module as a static library whose users inherit its dependencies. A
+# static library resolves no symbols, and the plugin links all of them. An undeclared dependency
+# would therefore go unnoticed. <name>-links links the same objects with the declared dependencies
+# only, and fails to link if one is missing.
 function(add_subsystem name)
     cmake_parse_arguments(PARSE_ARGV 1 arg "" "" "SOURCES;LINK")
     add_library(${name} STATIC ${arg_SOURCES})

@@ -32,10 +32,9 @@ const QLatin1String runtimeDaemon("/usr/sbin/apkd");
     \qmlproperty bool AndroidSupport::dataDirectoriesVisible
     \readonly
 
-    Whether the data directories of Android applications are to be shown: true exactly when
-    \c /usr/sbin/apkd exists, the daemon of the Android support. It is checked on every read. There
-    is no change signal, so a binding keeps the first value: read the property in a function
-    instead.
+    Whether pages should show the data directories of Android applications: true exactly when the
+    daemon of the Android support, \c /usr/sbin/apkd, exists. Every read checks it. There is no
+    change signal, so a binding keeps the first value: read the property in a function instead.
 */
 bool AndroidSupport::dataDirectoriesVisible() const
 {

@@ -27,7 +27,7 @@ constexpr int ready = 1;
 template<typename Value> Value valueOf(const QDBusPendingCall &call)
 {
     const QDBusPendingReply<Value> reply = call;
-    // The value of an error would be its message.
+    // For an error, value() would return the error message.
     return reply.isError() ? Value() : reply.value();
 }
 
@@ -49,9 +49,9 @@ QVariantMap changedProperties(const QDBusMessage &message)
     \inqmlmodule com.marlo.settings.system
     \brief Identifies the smart back cover that is attached to the device.
 
-    The object asks the cover daemon when it is created, and then follows its
-    \c PropertiesChanged signal, even if the daemon starts later. A signal that a daemon sends at
-    the moment of its start may be missed. Without the daemon, or after an error, the properties
+    When the object is created, it asks the cover daemon for both properties. It then follows the
+    daemon's \c PropertiesChanged signal, even if the daemon starts later. It may miss a signal that
+    a daemon sends at the moment of its start. Without the daemon, or after an error, the properties
     keep their defaults. Nothing is logged.
 
     The daemon is the service \c com.marlo.kivd on the system bus. The object calls the method \c
@@ -74,9 +74,9 @@ QVariantMap changedProperties(const QDBusMessage &message)
     variant, counts as an error. Only the number 1 means ready.
 
     \section2 A late reply wins
-    A reply to the first call that arrives after a change signal replaces the value of the signal.
-    The next signal corrects it. A property that a signal only invalidates keeps its value. The
-    interface that a signal names does not matter: the daemon has only one.
+    If a reply to the initial request arrives after a change signal, it replaces the value of the
+    signal. The next signal corrects it. A property that a signal only invalidates keeps its value.
+    The interface that a signal names does not matter: the daemon has only one.
 */
 
 KivInfo::KivInfo(QObject *parent) : QObject(parent)

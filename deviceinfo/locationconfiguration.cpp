@@ -63,13 +63,13 @@ QString agreementText(QLatin1String base)
     \brief Switches the location services, and saves and restores the user's own choice.
 
     The switches are those of the platform's location settings: \l gpsEnabled for satellites;
-    \l mlsEnabled for MLS, a service that finds the position by the radio networks around, and
+    \l mlsEnabled for MLS, a service that finds the position from nearby radio networks, and
     \l mlsOnlineState for its online assistance; \l hereState for HERE, another positioning service.
     A device's own library implements them. Without such a library the module stores them in dconf,
     and every process sees the same values.
 
     A page saves the switches when the user changes one, and restores them when the user returns to
-    the own choice:
+    their own choice:
 
     \qml
     Column {
@@ -102,18 +102,19 @@ QString agreementText(QLatin1String base)
     \section1 What may surprise
     \section2 Services that were not saved are switched off
     restoreCustomSettings() switches off every service that the saved settings do not contain, even
-    if nothing was ever saved: location services are on only if the user wanted them. A service that
-    the user has not agreed to keeps its state: only the user can agree.
+    if nothing was ever saved: location services are on only if the user wanted them. If the user
+    has not agreed to a service, its state does not change: only the user can agree.
 
     \section2 customSettingsEnabled does not change by itself
     It is read when the object is created and does not follow the dconf key. Saving and restoring do
     not change it, and changing it neither saves nor restores.
 
     \section2 The English agreement does not replace one that cannot be opened
-    It would not be the text that this user agrees to.
+    The English text would not be the one that this user agrees to.
 
     \section2 The agreement texts have no change signal
-    Their files are read on every read, so a binding keeps the first text. Read them in a function.
+    Every read of a property reads its file, but a binding keeps the first text. Read the properties
+    in a function instead.
 */
 
 LocationConfiguration::LocationConfiguration(QObject *parent)

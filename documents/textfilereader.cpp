@@ -51,11 +51,11 @@ QString readText(const QString &path, qint64 *maximumSize)
 
     \section1 What may surprise
     \section2 Lines run together
-    The line breaks of a file are removed: pages wrap the text to their own width. To separate its
-    lines, a text ends them with a blank.
+    The line breaks of a file are removed: pages wrap the text to their own width. A text must end
+    its lines with a blank to keep their words apart.
 
-    \section2 Files that cannot be read are silent
-    They read as empty, and collate() skips them. If nothing is left, collate() returns an empty
+    \section2 Files that cannot be read cause no message
+    They count as empty, and collate() skips them. If nothing is left, collate() returns an empty
     text without the prefix, so that a page can hide the whole section.
 */
 
@@ -77,9 +77,9 @@ QString TextFileReader::readContent(const QString &filePath) const
 
     Returns \a prefix and the texts of all files of the local directory \a directory, as
     readContent() reads them, with \a separator between them. The files are sorted by name, upper
-    case before lower case. Hidden files, directories, files without text, and each file with which
-    all would be larger than 16 MiB together are left out. The text is empty if no file has any, or
-    if \a directory is not a local directory.
+    case before lower case. collate() leaves out hidden files, directories, files without text, and
+    each file that would make the total size exceed 16 MiB. The text is empty if no file has any
+    text, or if \a directory is not a local directory.
 */
 QString TextFileReader::collate(const QUrl &directory, const QString &separator,
                                 const QString &prefix) const

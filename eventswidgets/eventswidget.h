@@ -17,9 +17,9 @@ struct EventsWidget {
     QString path;
     QString availablePath;
     int order = -1; // The place among the widgets; negative for none.
-    bool enabled = false; // By the user, or by default; known to the model.
+    bool enabled = false; // By the user or by default. Only the model sets it.
     bool defaultEnabled = false; // While the user has not chosen.
-    bool available = false; // As isAvailable() found it last.
+    bool available = false; // The last result of isAvailable().
 
     // Whether a file exists at availablePath now; always true if the path is empty.
     bool isAvailable() const;

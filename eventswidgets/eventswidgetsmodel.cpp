@@ -82,8 +82,8 @@ QString translation(const QString &id, const QString &fallback)
 
     \section1 What may surprise
     \section2 The first choice enables everything else
-    The first enableWidget() or disableWidget() stores a list of every known widget, plus or minus
-    this one, even of those whose default is off. From then on only the list counts. A page that
+    The first enableWidget() or disableWidget() stores a list of all known widgets, even of those
+    whose default is off, plus or minus this one. From then on only the list counts. A page that
     wants to keep the defaults writes the list first.
 
     \section2 A widget keeps its place
@@ -94,10 +94,10 @@ QString translation(const QString &id, const QString &fallback)
     \section2 Availability is checked only on request
     The model checks whether a widget's file exists when it reads the definition files, and when a
     page calls updateAvailable(). The files may be anywhere, and watching them all would cost more
-    than it gives. A widget that is not available stays listed, so that a page can say so.
+    than it is worth. A widget that is not available stays listed, so that a page can say so.
 
     \section2 Catalogs stay
-    The catalogs of a file that is removed, or that names another one, remain in use until the model
+    When a file is removed or names another catalog, its old catalogs remain in use until the model
     is destroyed: a text that is still on the screen keeps its translation. A loaded catalog does
     not follow a change of the language. A page that must follow it has to create its models again.
 
@@ -309,7 +309,7 @@ std::vector<EventsWidget> EventsWidgetsModel::readWidgets()
 
 void EventsWidgetsModel::mergeWidgets(const std::vector<Widget> &widgets)
 {
-    // The row of a path is this one or a later one, because insertions only push rows down.
+    // Where to start searching for the row of a path: insertions only push rows down.
     QHash<QString, int> firstRows;
     firstRows.reserve(m_rows.size() + int(widgets.size()));
     for (int row = 0; row < m_rows.size(); ++row) {

@@ -11,7 +11,7 @@
 
 namespace {
 
-// A role of a model, and the properties that lead on from its values.
+// A role of a model, and the chain of properties to read from each of its values.
 class RolePath
 {
 public:

@@ -12,8 +12,8 @@
 
 #include <array>
 
-// One role of another list model as a list of texts and as a sentence in the user's language, of
-// all rows or of those that match.
+// Reads one role of another list model, from all rows or from those that match. Provides the texts
+// as a list and as a sentence in the user's language.
 class TitlesView : public QObject
 {
     Q_OBJECT

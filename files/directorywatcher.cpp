@@ -20,7 +20,8 @@
 
 namespace {
 
-// The same for every directory: watchers that share a watch cannot take events from each other.
+// The same for every directory: watchers share watches, and adding a watch again replaces its
+// events.
 constexpr uint32_t watchedEvents =
     IN_CREATE | IN_DELETE | IN_MOVED_FROM | IN_MOVED_TO | IN_ATTRIB | IN_CLOSE_WRITE | IN_MOVE_SELF;
 
@@ -36,7 +37,7 @@ public:
     ~Inotify() override;
     Q_DISABLE_COPY_MOVE(Inotify)
 
-    // Returns the watch of a directory; negative without one.
+    // Returns the watch of the directory, or a negative number if it cannot be watched.
     int add(const QString &directory, DirectoryWatcher *watcher);
     void remove(int watch, DirectoryWatcher *watcher);
 
@@ -135,7 +136,8 @@ DirectoryWatcher::DirectoryWatcher(const QString &directory, const QString &name
     }
     if (m_inotify == nullptr) {
         m_poller = new QFileSystemWatcher(this);
-        // Queued: the poller iterates over its paths as it emits this, and watch() adds paths.
+        // Queued: the poller emits the signal while it iterates over its paths, and watch() adds
+        // paths.
         connect(
             m_poller, &QFileSystemWatcher::directoryChanged, this,
             [this] {

@@ -28,10 +28,10 @@ struct inotify_event;
     No event is lost while the watches are set up: they are set from the root downwards, each before
     the next name is looked up, and changed() is emitted last.
 
-    All watchers share one inotify instance until the application ends, because a user may have only
-    128 of them and closing one blocks for more than 10 ms. If no instance is left,
-    QFileSystemWatcher is used instead. It checks once a second, ignores the filter, and does not
-    notice a file that is rewritten in place.
+    All watchers share one inotify instance until the application ends: a user may have only 128
+    instances, and closing one blocks for more than 10 ms. If no instance is left, the watcher uses
+    QFileSystemWatcher, which checks once a second. It then ignores the filter, and does not notice
+    a file that is rewritten in place.
 
     For the main thread only.
 */
@@ -60,7 +60,7 @@ private:
     };
 
     void watch();
-    // Returns whether this is the first event since the last call of report() that matters.
+    // Returns whether this is the first relevant event since the last call of report().
     bool take(const inotify_event &event);
     void report();
 

@@ -22,7 +22,7 @@ bool isBreak(char character)
     return character == '\n' || character == '\r';
 }
 
-// Two different characters at the position break one line.
+// Whether "\r\n" or "\n\r" is at the position. Such a pair is a single line break.
 bool isBreakOfTwo(const QByteArray &text, int position, int end)
 {
     return position + 1 < end && isBreak(text.at(position)) && isBreak(text.at(position + 1))
@@ -62,7 +62,7 @@ private:
     QString readPlain();
     QString readEscape();
     QChar readNumber(int base);
-    // The value of a digit, or 16.
+    // The value of the next character as a digit, or 16 if it is none.
     int digit() const;
 
     const QByteArray &m_text;
@@ -183,7 +183,7 @@ bool isPackedElement(const QString &element)
 
 bool isPackedValue(const QByteArray &text, int start, int end)
 {
-    // Nearly every value has neither an "@" nor a backslash, which may encode one.
+    // Nearly every value has neither an "@" nor a backslash, which may encode an "@".
     const auto value = text.cbegin();
     if (std::none_of(value + start, value + end,
                      [](char character) { return character == '@' || character == '\\'; })) {

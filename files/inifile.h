@@ -11,7 +11,7 @@ class QString;
 
 constexpr qint64 maximumIniSize = qint64(1024) * 1024;
 
-// With it, QSettings reads values as UTF-8, otherwise as Latin-1.
+// If a file begins with this mark, QSettings reads values as UTF-8, otherwise as Latin-1.
 constexpr const char *iniByteOrderMark = "\xef\xbb\xbf";
 
 /*
@@ -23,8 +23,8 @@ constexpr const char *iniByteOrderMark = "\xef\xbb\xbf";
 */
 bool isPlainIni(const QString &path);
 
-// Whether the file is plain and closes the name of each section. QSettings reports the latter only
-// the first time that it reads a file, and then reads an unchanged file from a cache.
+// Whether the file is plain and closes the name of each section. QSettings reports an unclosed name
+// only the first time that it reads a file. It then reads an unchanged file from a cache.
 bool isWellFormedIni(const QString &path);
 
 // A line of a settings file as QSettings reads it: quotes and backslashes may join several lines of

@@ -71,7 +71,7 @@ RegularFile readLine(int descriptor, const struct stat & /*entry*/, qint64 maxim
 template<typename Reader>
 RegularFile readWith(Reader reader, const QString &path, qint64 maximumSize)
 {
-    // Cut at the NUL, the path would name another file.
+    // open() would cut the path at the NUL and open another file.
     if (path.contains(QChar::Null)) {
         return {State::NotOpened, {}, qt_error_string(EINVAL)};
     }

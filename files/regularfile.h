@@ -10,8 +10,8 @@
 // The size limit for texts that pages show: agreements, terms of use, licences.
 constexpr qint64 maximumTextSize = qint64(16) * 1024 * 1024;
 
-// The content of a file. Reading it neither blocks nor takes more memory than allowed, even if
-// there is a pipe, a device or a file without end instead.
+// The content of a file. Reading it neither blocks nor takes more memory than allowed, even if the
+// path leads to a pipe, a device or an endless file.
 struct RegularFile {
     enum class State {
         Read,

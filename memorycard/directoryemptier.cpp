@@ -241,8 +241,8 @@ private:
     }
 
     dev_t m_device = 0;
-    // From the directory to empty to the current one. The first one and those from m_firstOpen on
-    // are open.
+    // The first directory is the one to empty, the last is the current one. The first one and those
+    // from m_firstOpen on are open.
     std::deque<Directory> m_path;
     std::size_t m_firstOpen = 1;
     std::string m_buffer;

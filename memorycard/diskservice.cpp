@@ -20,7 +20,7 @@ const QLatin1String fileSystemTypeOption("fstype");
 // The service writes out all cached data before it replies, which takes long on a slow card.
 constexpr int requestTimeout = 5 * 60 * 1000; // ms
 
-// The keys of the error codes are the service's names after another prefix.
+// The keys of the error codes are the names of the service's errors with another prefix.
 const QLatin1String errorPrefix("org.freedesktop.UDisks2.Error.");
 const QLatin1String keyPrefix("Error");
 
@@ -36,7 +36,7 @@ QDBusMessage createCall(const QString &deviceName, QLatin1String method, const Q
 
 QDBusMessage DiskService::mountCall(const QString &deviceName)
 {
-    // With an empty type the service finds out the file system by itself.
+    // With an empty type the service detects the file system itself.
     return createCall(deviceName, mountMethod, fileSystemTypeOption);
 }
 
@@ -50,7 +50,7 @@ QDBusPendingCall DiskService::send(const QDBusMessage &call)
 {
     const QDBusConnection bus = QDBusConnection::systemBus();
     if (!bus.isConnected()) {
-        // Qt would never report the end of such a call.
+        // Without a connection Qt would never report the end of the call.
         return QDBusPendingCall::fromError(
             {QDBusError::Disconnected, QStringLiteral("Not connected to the system bus")});
     }

@@ -18,7 +18,7 @@ namespace DiskService {
 QDBusMessage mountCall(const QString &deviceName);
 QDBusMessage unmountCall(const QString &deviceName);
 
-// Sends a call without waiting. There is always a reply: an error without a system bus, too.
+// Sends a call without waiting. There is always a reply: without a system bus, it is an error.
 QDBusPendingCall send(const QDBusMessage &call);
 
 // Nothing for an error that is not the disk service's own.

@@ -31,7 +31,7 @@ struct CloseMountTable {
 };
 using MountTable = std::unique_ptr<FILE, CloseMountTable>;
 
-// glibc replaces the escapes in a field. musl, at least up to 1.2.3, returns them as they are.
+// glibc decodes the escapes in a field. musl, at least up to 1.2.3, returns them unchanged.
 bool libraryDecodesEscapes()
 {
     QByteArray line("device /\\040 type options 0 0\n");
@@ -69,8 +69,9 @@ bool isRootDirectory(const struct stat &directory)
         || (root.st_dev == directory.st_dev && root.st_ino == directory.st_ino);
 }
 
-// Whether the directory may be on the device. This is unknown if the file system has a number of
-// its own (major number 0) instead of that of a block device, or if the device has no node here.
+// Whether the directory may be on the device. This is unknown, and therefore true, if the file
+// system has its own number (major number 0) instead of a block device's, or if the device has no
+// node here.
 bool mayLieOn(const QByteArray &device, const struct stat &directory)
 {
     struct stat node = {};
@@ -85,8 +86,8 @@ bool emptyMount(const QByteArray &device, const char *directory)
     if (directory[0] != '/') {
         return false;
     }
-    // The table has real paths. A link is not the card. Neither is the directory that remains after
-    // the card has been unmounted.
+    // The table has real paths, so a link is not the card. Neither is the directory that remains
+    // after the card has been unmounted.
     FileDescriptor fd = openDirectory(directory);
     if (!fd.isOpen()) {
         // A card that cannot be read counts as empty, as for removeAllEntries().

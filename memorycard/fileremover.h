@@ -20,7 +20,7 @@ class FileRemover : public QObject, public QRunnable
     Q_OBJECT
 
 public:
-    // The card is found in the mount table by this device node, for example /dev/mmcblk1p1.
+    // run() finds the card in the mount table by this device node, for example /dev/mmcblk1p1.
     explicit FileRemover(QString devicePath);
 
     void run() override;

@@ -33,9 +33,9 @@ const QLatin1String ext4("ext4");
 const QLatin1String mkfsVfat("/sbin/mkfs.vfat");
 const QLatin1String mkfsExt4("/sbin/mkfs.ext4");
 
-// Qt 5.15 starts a plain QProcess with clone(). If that fails, it takes the process for running, with
-// the process id -1: killing it would kill all processes of the user. It starts a subclass with
-// fork(), whose failure it reports.
+// Qt 5.15 starts a plain QProcess with clone(). If clone() fails, Qt treats the process as running
+// with the process id -1: killing it would kill all processes of the user. Qt starts a subclass
+// with fork() instead, and reports a failure of fork().
 class HelperProcess : public QProcess
 {
 public:
@@ -43,8 +43,8 @@ public:
 };
 
 // Whether the process can open enough descriptors to start a helper or a thread. Without them
-// QProcess does not always report that a helper did not start, and a thread that gets none for its
-// event loop ends the process.
+// QProcess does not always report that a helper did not start, and a thread that gets no descriptor
+// for its event loop ends the process.
 bool hasDescriptorsLeft()
 {
     std::array<FileDescriptor, 16> spare; // a helper takes up to 8
@@ -110,8 +110,8 @@ bool hasDescriptorsLeft()
     change \c Idle. A page therefore creates a formatter for each operation, in a Loader, and starts
     the operation in the handler of devicePathChanged(). The probe of the path then runs after the
     operation. When the status becomes \c Idle or \c Error, the operation has ended, and after
-    \c Idle \l filesystemType is up to date. A complete page, which would empty the card by
-    \c{run(card => card.removeAllFiles())}:
+    \c Idle \l filesystemType is up to date. The following page is complete. To empty the card, it
+    would call \c{run(card => card.removeAllFiles())}:
 
     \quotefile memory-card.qml
 
@@ -161,8 +161,9 @@ MemoryCardFormatter::~MemoryCardFormatter()
     if (m_process == nullptr || m_process->state() == QProcess::NotRunning) {
         return;
     }
-    // A child process object would kill the helper here and wait for it. A card that is half
-    // formatted cannot be used, so the helper continues, even after the application has ended.
+    // If m_process were deleted with this object, it would kill the helper and wait for it. A card
+    // that is half formatted cannot be used, so a helper that formats continues, even after the
+    // application has ended.
     m_process->setParent(nullptr);
     connect(m_process, &QProcess::stateChanged, m_process, [process = m_process](auto state) {
         if (state == QProcess::NotRunning) {
@@ -459,7 +460,7 @@ void MemoryCardFormatter::doNextCommand()
     if (m_process == nullptr) {
         m_process = new HelperProcess(this);
         m_process->setStandardErrorFile(QProcess::nullDevice());
-        // Queued: a process cannot be started again from the signal that it did not start.
+        // Queued: a QProcess cannot be started again while it reports that its start failed.
         connect(m_process, &QProcess::errorOccurred, this, &MemoryCardFormatter::commandError,
                 Qt::QueuedConnection);
         connect(m_process, QOverload<int, QProcess::ExitStatus>::of(&QProcess::finished), this,
@@ -491,7 +492,7 @@ void MemoryCardFormatter::startFormatting(const Command &command)
         arguments.append(helperFormatExt4);
     }
     arguments.append(QFileInfo(command.devicePath).fileName());
-    // Nobody reads the output. A pipe would end the helper if it outlived the application.
+    // Nobody reads the output. A broken pipe would end a helper that outlives the application.
     m_process->setStandardOutputFile(QProcess::nullDevice());
     runHelper(Formatting, arguments);
 }
@@ -506,7 +507,7 @@ void MemoryCardFormatter::runHelper(Status command, const QStringList &arguments
 {
     m_running = command;
     if (!hasDescriptorsLeft()) {
-        // Reported later, as when the process itself finds that it cannot start.
+        // Reported later, as QProcess does when it finds that the helper cannot start.
         QMetaObject::invokeMethod(
             this, [this] { commandError(QProcess::FailedToStart); }, Qt::QueuedConnection);
         return;
@@ -522,8 +523,8 @@ void MemoryCardFormatter::startMountOperation(Status command)
 {
     const bool mounts = command == Mounting;
     if (m_deviceName.isEmpty()) {
-        // The verbs are crossed on purpose: programs that read logs expect exactly these lines.
-        // The status and the rest of the queue stay as they are, which is intended, too.
+        // The verbs are swapped on purpose: programs that read logs expect exactly these lines.
+        // The status and the rest of the queue do not change, which is intended, too.
         qCCritical(lcMemoryCardLog)
             << "Cannot" << (mounts ? "unmount" : "mount") << "without device name";
         return;

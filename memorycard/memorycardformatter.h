@@ -19,7 +19,7 @@ class QDBusPendingCallWatcher;
     file system.
 
     Requests are queued as commands, which run one at a time: in the helper program, in the disk
-    service or in a FileRemover. Nothing here waits for any of them.
+    service or in a FileRemover. The formatter never blocks while one of them runs.
 */
 class MemoryCardFormatter : public QObject
 {
@@ -44,7 +44,7 @@ public:
     };
     Q_ENUM(Status)
 
-    // The names of the disk service's errors, after "Error".
+    // The names of the disk service's errors, with the prefix "Error".
     enum MountError {
         ErrorFailed,
         ErrorCancelled,
@@ -98,8 +98,8 @@ private Q_SLOTS:
     void fileRemoverError();
 
 private:
-    // The path and the type of the request: devicePath may change before the command starts, and no
-    // card may be formatted or emptied instead of another.
+    // The path and the type of the request: devicePath may change before the command starts, and
+    // the formatter must never format or empty a card other than the requested one.
     struct Command {
         Status command;
         QString devicePath;

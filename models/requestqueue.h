@@ -19,8 +19,8 @@
     views. Such a request waits until control returns to the event loop.
 
     An update reads files or settings again: it runs once, however often it was requested. A choice
-    changes the user's settings: all of them run, in the order of the requests and after the
-    updates, because they start from what is stored.
+    changes the user's settings: all choices run, in the order of the requests. They run after the
+    updates, because each choice starts from the stored settings.
 */
 template<typename Model> class RequestQueue
 {
@@ -67,7 +67,8 @@ public:
 private:
     void run()
     {
-        // A choice that a handler of another choice makes waits until that one is complete.
+        // If a handler requests a choice while another one runs, the new one waits until the other
+        // is complete.
         if (m_changing || m_running) {
             return;
         }

@@ -8,10 +8,10 @@
 #include <vector>
 
 /*
-    The numbers by which the rows of a model are ordered, and where a new row belongs.
+    The numbers that order the rows of a model. insert() finds the place of a new row.
 
-    The rows need not be sorted. What is kept for each row is the highest number up to it: these are
-    sorted, so that a binary search finds the first row with a higher number.
+    The rows need not be sorted. The class keeps the highest number up to each row. These numbers
+    are sorted, so that a binary search finds the first row with a higher number.
 */
 template<typename Number> class RowNumbers
 {

@@ -25,8 +25,8 @@ bool toSwitch(const QVariant &stored)
     return stored.toBool();
 }
 
-// A value that is not a state counts as never agreed to. So does a number of another type, because
-// a large one would wrap around.
+// A value that is not a state counts as OnlineAGpsNotAgreed. So does a number of another type,
+// because a large one would wrap around.
 LocationSettings::OnlineAGpsState toState(const QVariant &stored)
 {
     const int number = stored.userType() == QMetaType::Int ? stored.toInt() : -1;
@@ -62,7 +62,8 @@ LocationSettings::LocationSettings(QObject *parent)
 {
 }
 
-// These use the stored value: another process may have changed it before this one is notified.
+// The accessors use the stored value: another process may have changed it before this process is
+// notified.
 
 bool LocationSettings::gpsEnabled() const
 {

@@ -20,8 +20,9 @@ using GVariantPtr = std::unique_ptr<GVariant, GVariantUnref>;
 GVariantPtr toGVariant(const QVariant &value, QString *reason);
 
 // The value as a QVariant, which is invalid only if the data is damaged. An array of strings
-// becomes a QStringList, a dictionary with strings as keys a QVariantMap, and a variant what it
-// contains. All other containers become a QVariantList, and values of unknown types an empty one.
+// becomes a QStringList, and a dictionary with strings as keys becomes a QVariantMap. A variant is
+// replaced by its content. All other containers become a QVariantList. A value of an unknown type
+// becomes an empty QVariantList.
 QVariant toQVariant(GVariant *value);
 
 // The same value, marked as trusted; null if it is damaged. GLib needs half a minute to read a list

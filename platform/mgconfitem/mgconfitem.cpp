@@ -23,8 +23,8 @@ constexpr int unwatchDelayMs = 1000;
 
 DConfClient *client();
 
-// dconf sends changes in a thread of its own, so the last ones still wait when the process exits.
-// dconf_client_sync() has no time limit and therefore runs in another thread.
+// dconf sends changes in a thread of its own, so the last ones may not be sent yet when the process
+// exits. dconf_client_sync() has no time limit and therefore runs in another thread.
 void flushWrites()
 {
     static auto *const done = new QSemaphore; // for the thread, which may outlast this function
@@ -240,8 +240,8 @@ void MGConfItem::write(GVariant *value)
         g_error_free(error);
         return;
     }
-    // dconf reports the change itself, unless it compares the new value with the result of a wrong
-    // read, as described above, and takes the two for equal. Items that know the value ignore this.
+    // dconf reports the change itself, unless it reads an outdated value, as described at
+    // readStored(), and that equals the new one. Items that know the value ignore this signal.
     const std::array<const char *, 2> changes = {"", nullptr};
     g_signal_emit_by_name(client(), "changed", path.constData(), changes.data(), "");
 }

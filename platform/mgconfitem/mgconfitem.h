@@ -23,8 +23,8 @@ class MGConfItem : public QObject
     Q_OBJECT
 
 public:
-    // Takes an absolute path such as "/settings/location/enabled". Another key gives a warning; the
-    // item then has no value and stores nothing.
+    // Takes an absolute path such as "/settings/location/enabled". For any other key, the item logs
+    // a warning, has no value and stores nothing.
     explicit MGConfItem(const QString &key, QObject *parent = nullptr);
     ~MGConfItem() override;
 

@@ -64,8 +64,8 @@ void CatalogTable::removeCatalogTranslator(const QString &user, const QString &c
     }
     known->users.remove(user);
     if (known->users.isEmpty()) {
-        // The translator is deleted with its owner: this may run in a handler of its language
-        // change.
+        // The translator is not deleted before its owner, because this may run in a handler of the
+        // language change that it caused.
         QTranslator *translator = known->translator;
         m_entries.erase(known);
         QCoreApplication::removeTranslator(translator);

@@ -40,8 +40,8 @@ private:
         QSet<QString> users;
     };
 
-    // Loads and installs the catalog for its first user. A prefix separates its name from the
-    // default locale; without a prefix the file has just that name.
+    // Loads and installs the catalog for its first user. In the file name, the prefix separates the
+    // catalog's name from the default locale; without a prefix the file has the catalog's name.
     void addCatalogTranslator(const QString &user, const QString &catalog, const QString &prefix);
     // Removes the translator with the last user.
     void removeCatalogTranslator(const QString &user, const QString &catalog);

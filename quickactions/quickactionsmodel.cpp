@@ -93,8 +93,9 @@ qint64 priorityOfRow(const QuickAction &action)
 
     \section1 What may surprise
     \section2 A file that cannot be read is still a row
-    After a warning, it is listed without title and icon, and triggering it sends nothing. The
-    user's list may contain the file, and move() relies on rows and entries having the same indexes.
+    The model logs a warning and lists the file without title and icon. Triggering it sends nothing.
+    The user's list may contain the file, and move() relies on rows and entries having the same
+    indexes.
 
     \section2 The roles have the numbers 0 to 3
     These are also the numbers of Qt's roles for display, decoration, editing and tool tips. The
@@ -276,8 +277,8 @@ QVariantMap QuickActionsModel::get(int index) const
     Sends the D-Bus call of the action at \a index on the session bus, without waiting for a reply.
     Every failure except a timeout is logged. An index without a row is logged, too.
 
-    If the service does not exist and the action names a package that it needs, the application
-    store client is asked to show that package: the method \c showApp of the interface
+    If the service does not exist and the action names a package that it needs, the model asks the
+    application store client to show that package. It calls the method \c showApp of the interface
     \c com.marlo.marlostore, at the path \c /StoreClient of the service \c com.marlo.marlostore on
     the session bus.
 */

@@ -10,8 +10,8 @@
     Checks that both kinds of definition files share.
 */
 
-// Reports why a reader refused a file without looking at its content. Returns false, and the content,
-// if the file can be read.
+// Reports why a reader refused a file before it looked at the content. If the file can be read,
+// returns false and sets the content.
 bool reportUnreadable(const QString &path, qint64 maximumSize, QByteArray *content,
                       Findings *findings);
 
@@ -26,7 +26,7 @@ void checkCatalog(const QString &catalog, int line, CheckContext *context, Findi
 void checkTextId(const QString &id, const QString &catalog, int line, CheckContext *context,
                  Findings *findings);
 
-// Warns of an icon whose path is relative. Names and URLs are not.
+// Warns of an icon that is a relative path, and not a name or a URL.
 void checkIcon(const QString &icon, int line, Findings *findings);
 
 #endif

@@ -15,7 +15,7 @@ namespace DefinitionFiles {
 const QLatin1String quickActionsDirectory("/usr/share/glimmera/quickactions");
 const QLatin1String eventsWidgetsDirectory("/usr/share/glimmera/eventswidgets");
 
-// By their names.
+// These look only at the name.
 bool isQuickAction(const QString &path);
 bool isEventsWidgets(const QString &path);
 

@@ -17,7 +17,7 @@ DefinitionsChecker::DefinitionsChecker(const QString &root) : m_root(root), m_co
 bool DefinitionsChecker::check(const QString &path)
 {
     const QFileInfo entry(path);
-    // The model of quick actions lists a directory of such a name like a file.
+    // The model of quick actions lists a directory named *.conf like a file.
     if (entry.isDir() && !DefinitionFiles::isQuickAction(path)) {
         return checkDirectory(path);
     }
@@ -49,8 +49,8 @@ bool DefinitionsChecker::checkDirectory(const QString &path)
 
 void DefinitionsChecker::checkFile(const QString &path)
 {
-    // A second check would report its widgets as duplicates, and would miss errors, because QSettings
-    // caches what it has read.
+    // A second check would report the file's widgets as duplicates. It would also miss errors,
+    // because QSettings caches what it has read.
     const QString canonicalPath = QFileInfo(path).canonicalFilePath();
     if (m_checked.contains(canonicalPath)) {
         return;

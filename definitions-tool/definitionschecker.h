@@ -11,7 +11,7 @@
 #include <QSet>
 
 /*
-    What the checks of several files share.
+    State that the checks of all files share.
 */
 struct CheckContext {
     struct Place {
@@ -22,15 +22,15 @@ struct CheckContext {
     explicit CheckContext(const QString &root) : catalogs(root) { }
 
     InstalledCatalogs catalogs;
-    // Whether it does not matter which catalogs are installed.
+    // Whether the checks ignore which catalogs are installed.
     bool ignoresCatalogs = false;
     // The widgets of the files checked so far.
     QHash<QString, Place> widgets;
 };
 
 /*
-    Finds what a model ignores or misreads in definition files, and probable mistakes of their authors.
-    The files are read by the readers of the models.
+    Finds what a model ignores or misreads in definition files, and probable mistakes of their
+    authors. It uses the models' own readers.
 */
 class DefinitionsChecker
 {
@@ -41,10 +41,11 @@ public:
     // For sources, whose catalogs are not compiled yet.
     void ignoreCatalogs() { m_context.ignoresCatalogs = true; }
 
-    // A file, or all definition files in a directory; the name of any other file is
-    // a finding. Checks each file once. False if the path does not exist.
+    // Checks a file, or all definition files in a directory, but each file only once. A single file
+    // that has another name is a finding. Returns false if the path does not exist.
     bool check(const QString &path);
-    // The definitions that are installed below the root; false if it has no directory for any.
+    // Checks the definitions that are installed below the root. Returns false if the root contains
+    // no directory for definitions.
     bool checkInstalled();
 
     const std::vector<Finding> &findings() const { return m_findings; }

@@ -124,7 +124,7 @@ public:
     void check();
 
 private:
-    // The last member of a known key. Its line is 0 without such a member.
+    // The last member with a known key. The line is 0 if there is no such member.
     struct Member {
         int line = 0;
         int position = 0; // Of the value.
@@ -313,7 +313,7 @@ bool isScalar(const QByteArray &text)
     return QJsonDocument::fromJson('[' + text + ']').array().size() == 1;
 }
 
-// If QJsonDocument stopped at a bracket after a comma: the position of the comma, or -1.
+// The position of the comma if QJsonDocument stopped at a bracket after one, otherwise -1.
 int trailingComma(const QByteArray &text, const QJsonParseError &error)
 {
     if (error.error != QJsonParseError::MissingObject) {
@@ -323,7 +323,7 @@ int trailingComma(const QByteArray &text, const QJsonParseError &error)
     return before.endsWith(',') ? text.lastIndexOf(',', error.offset - 1) : -1;
 }
 
-// A file that the reader has refused.
+// Reports why the reader refused a file.
 void reportRefused(const QByteArray &content, Findings *findings)
 {
     const auto report = [&content, findings](int position, QLatin1String rule, const char *text) {
@@ -349,7 +349,7 @@ void reportRefused(const QByteArray &content, Findings *findings)
         report(comma, jsonRule, "no value follows this comma");
         return;
     }
-    // A file that ends too early is wrong where it ends, not in an empty line after that.
+    // If a file ends too early, the error is where its text ends, not in an empty line after that.
     int end = content.size();
     while (end > 0 && isSpace(content.at(end - 1))) {
         --end;
@@ -367,7 +367,8 @@ void checkEventsWidgets(const QString &path, CheckContext *context, Findings *fi
     if (reportUnreadable(path, maximumEventsWidgetsSize, &content, findings)) {
         return;
     }
-    // The walker relies on what QJsonDocument accepts, and the file may have changed since it was read.
+    // The walker needs a text that QJsonDocument accepts, and the file may have changed since the
+    // reader read it.
     if (file && !isTooComplex(content) && QJsonDocument::fromJson(content).isObject()) {
         EventsWidgetsCheck(path, std::move(content), *file, context, findings).check();
     } else {

@@ -30,7 +30,7 @@ class Findings
 public:
     explicit Findings(QString file) : m_file(std::move(file)) { }
 
-    // Keeps a limited number of each severity, and adds a finding when it is reached.
+    // Keeps a limited number of findings of each severity. If there are more, one finding says so.
     void add(int line, Finding::Severity severity, QLatin1String rule, const QString &text);
     // Returns them in the order of lines.
     std::vector<Finding> take();

@@ -14,7 +14,7 @@ bool isSpace(char character)
     return character == ' ' || character == '\t' || character == '\r' || character == '\n';
 }
 
-// NUL characters included.
+// Keeps NUL characters.
 QString fromLatin1(const QByteArray &text)
 {
     return QString::fromLatin1(text.constData(), text.size());

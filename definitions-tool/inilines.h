@@ -11,16 +11,17 @@
 #include <vector>
 
 /*
-    The lines of a settings file, with the names that QSettings gives to keys, for finding the line
-    of a key that QSettings has read.
+    A line of a settings file, with the name that QSettings gives to its key. The checks use it to
+    find the line of a key that QSettings has read.
 */
 struct NamedIniLine : IniLine {
     int number = 0; // From 1.
     // For a section, the prefix of its keys, such as "remote-arguments/"; empty for General. For a
-    // key, its name with that prefix, such as "remote-arguments/1/argument". Otherwise the line.
+    // key, its name with that prefix, such as "remote-arguments/1/argument". Otherwise the text of
+    // the line.
     QString name;
     bool isAscii = true;
-    // Whether the byte-order mark in front of a key has become a part of it.
+    // Whether the byte-order mark in front of a key has become a part of its name.
     bool isMarked = false;
     // Whether a semicolon that follows no space ends the value.
     bool isCut = false;

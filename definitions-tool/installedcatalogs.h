@@ -19,7 +19,7 @@ class QTranslator;
 class InstalledCatalogs
 {
 public:
-    // Those below a root directory.
+    // Finds the catalogs below a root directory.
     explicit InstalledCatalogs(const QString &root);
     ~InstalledCatalogs();
     Q_DISABLE_COPY_MOVE(InstalledCatalogs)

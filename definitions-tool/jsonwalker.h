@@ -10,7 +10,7 @@
 
 /*
     Visits the members of an object or the elements of an array, one after the other, in a text that
-    QJsonDocument has accepted, because QJsonDocument does not keep where they were.
+    QJsonDocument has accepted. QJsonDocument itself does not keep their positions.
 */
 class JsonWalker
 {

@@ -13,8 +13,8 @@
 // The rows of both models in their order, with their state from dconf.
 QString listDefinitions();
 
-// For each catalog that an installed definition names, the files that a model loads: for engineering
-// English, for the current locale, and for each installed language.
+// For each catalog that an installed definition names, the files that a model loads: for
+// engineering English, for the current locale, and for each installed language.
 QString listCatalogs();
 
 #endif

@@ -192,7 +192,7 @@ QString Command::misplacedOption(const QStringList &allowed) const
 
 int main(int argc, char *argv[])
 {
-    // Findings and file names do not depend on the locale in which a package is built.
+    // Findings and file names must not depend on the locale in which a package is built.
     QTextCodec::setCodecForLocale(QTextCodec::codecForName("UTF-8"));
     const QCoreApplication application(argc, argv);
     QCoreApplication::setApplicationName(QStringLiteral("marlo-definitions"));

@@ -28,7 +28,7 @@ _marlo_definitions() {
         :-*) words='--help --version' ;;
         :*) words='check list show' ;;
         *)
-            # What the models read, and the way there.
+            # Definition files, and the directories that may contain them.
             local file
             COMPREPLY=()
             while IFS= read -r file; do

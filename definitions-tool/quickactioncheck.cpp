@@ -74,7 +74,7 @@ const std::vector<Name> &names()
          QStringLiteral("name of a service")},
         {pathKey, &Action::objectPath, QStringLiteral("/|(/\\w+)+"),
          QStringLiteral("path of an object")},
-        // Optional, as the only one.
+        // Only this name is optional.
         {interfaceKey, &Action::interface, QStringLiteral("([a-zA-Z_]\\w*(\\.[a-zA-Z_]\\w*)+)?"),
          QStringLiteral("name of an interface")},
         {methodKey, &Action::method, QStringLiteral("[a-zA-Z_]\\w*"),
@@ -97,7 +97,7 @@ bool isName(const Name &name, const QString &value)
         && expressions.at(size_t(&name - names().data())).match(value).hasMatch();
 }
 
-// The number of an element of the array, from 1, or 0 for any other key.
+// The number of the argument that a key holds, from 1, or 0 for any other key.
 int argumentNumber(const QString &key)
 {
     static const QRegularExpression element(
@@ -224,7 +224,7 @@ void QuickActionCheck::checkKey(const NamedIniLine &line, const QString &section
                && argumentNumber(line.name) == 0) {
         QString key = line.name.mid(section.size());
         const int number = qMax(1, key.section(QLatin1Char('/'), 0, 0).toInt());
-        // As in the file.
+        // The file separates groups with backslashes.
         key.replace(QLatin1Char('/'), QLatin1Char('\\'));
         reportUnknownKey(QStringLiteral("key"), key,
                          {QStringLiteral("size"), QStringLiteral("%1\\argument").arg(number)},
@@ -299,7 +299,7 @@ void QuickActionCheck::checkArguments()
             highestLine = line.number;
         }
     }
-    // The file may have a key of that name instead of the array.
+    // The file may have a key "remote-arguments" instead of the array.
     const bool hasArray = m_lineOf.contains(sizeKey) || highest > 0;
     const QVariantList arguments = hasArray ? m_action.arguments() : QVariantList();
     const int size = arguments.size();

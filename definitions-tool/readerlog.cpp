@@ -5,7 +5,7 @@
 
 namespace {
 
-// A message handler is a plain function.
+// Global, because a message handler is a plain function.
 int warnings = 0;
 QtMessageHandler previousHandler = nullptr;
 

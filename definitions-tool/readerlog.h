@@ -7,8 +7,8 @@
 #include <QStringList>
 
 /*
-    Intercepts warnings while it exists. The readers of definition files log a warning when they refuse
-    a file, which an empty result does not show.
+    Intercepts warnings while it exists. When the readers of definition files refuse a file, they
+    log a warning. Their empty result alone does not show that.
 */
 class ReaderLog
 {

@@ -36,7 +36,7 @@ QString shellWord(QString text)
     return QLatin1Char('\'') + text + QLatin1Char('\'');
 }
 
-// A text is sent up to its first zero character.
+// QtDBus sends a text only up to its first NUL.
 QString sentText(const QString &text)
 {
     return text.section(QChar(), 0, 0);

@@ -8,8 +8,8 @@
 
 #include <optional>
 
-// A definition file as its model reads it, as text for a terminal; for a quick action also the D-Bus
-// call, as a line for a shell. Nothing if no model reads the file.
+// Returns a definition file as its model reads it, as text for a terminal. For a quick action, a
+// shell command for the D-Bus call follows. Returns nothing if no model reads the file.
 std::optional<QString> showDefinition(const QString &path);
 
 #endif

@@ -5,17 +5,17 @@
     usage: bus-service-peer system|session SERVICE SCENARIO
 
     Owns the name SERVICE on a bus and simulates any service, in a process that may be stopped
-    and killed. Says "ready" on its standard output, and then the member of each call, a line each.
-    SCENARIO is what it does with calls:
+    and killed. Prints "ready" on its standard output, and then a line with the member of each call.
+    SCENARIO is how it handles calls:
 
       replies       replies; to reads of the properties KIVID and Ready with "cover-0" and 1
-      other-types   replies with a structure, a dictionary and an array, whatever was asked
-      error         answers with an error that nobody knows
+      other-types   replies to every call with a structure, a dictionary and an array
+      error         replies with an unknown error
       gone          ends without a reply
 
     For a line with a number on its standard input, it sends that many signals: PropertiesChanged
     with KIVID "cover-1" and so on, and with Ready 1 in the last. An unknown scenario is an error.
-    It ends with its standard input.
+    It exits when its standard input is closed.
 */
 
 #include <QCoreApplication>

@@ -10,15 +10,15 @@
 #include <QHash>
 
 /*
-    The smart back cover's daemon, com.marlo.kivd on the system bus, on a connection of its own. It
-    answers as it is told, right or wrong, and keeps every call to any of its objects.
+    Simulates the smart back cover's daemon, com.marlo.kivd on the system bus, on a connection of
+    its own. A test sets its replies, right or wrong. It keeps every call to any of its objects.
 */
 class CoverDaemon : public QDBusVirtualObject
 {
     Q_OBJECT
 
 public:
-    // Ends the test program if it cannot own the name. A new daemon does not reply.
+    // Ends the test program if it cannot own the name. A new daemon replies to no call.
     CoverDaemon();
     ~CoverDaemon() override;
     Q_DISABLE_COPY_MOVE(CoverDaemon)
@@ -29,9 +29,9 @@ public:
     void answer(const QString &property, const QVariantList &arguments);
     void answerWithError(const QString &property);
 
-    // Sends PropertiesChanged with these arguments, as they are.
+    // Sends PropertiesChanged with these arguments, unchanged.
     void sendPropertiesChanged(const QVariantList &arguments);
-    // As the real daemon does.
+    // Sends PropertiesChanged as the real daemon does.
     void sendChanges(const QVariantMap &changes, const QStringList &invalidated = {});
 
     QList<QDBusMessage> calls() const { return m_calls; }

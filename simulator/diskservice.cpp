@@ -5,7 +5,7 @@
     usage: disk-service-peer [METHOD=]SCENARIO...
 
     Simulates the disk service on the system bus. Prints "ready" on its standard output, and then a
-    line of JSON for each call. SCENARIO is what it does when it is called. With a METHOD, it
+    line of JSON for each call. SCENARIO is how it handles calls. With a METHOD, the scenario
     applies only to calls of that method:
 
       done            replies
@@ -17,7 +17,7 @@
       gone            ends without a reply
       absent          does not own the service's name at all; only without a METHOD
 
-    An unknown scenario is an error. It ends with its standard input.
+    An unknown scenario is an error. The program exits when its standard input is closed.
 */
 
 #include <QCoreApplication>

@@ -10,8 +10,8 @@
 #include <QVariantMap>
 
 /*
-    A disk service in a process of its own, which owns the real name on the private system bus and
-    does what its scenarios say (see diskservice.cpp) for as long as this lives.
+    A disk service in a process of its own, which owns the real name on the private system bus. It
+    does what its scenarios say (see diskservice.cpp) for as long as this object exists.
 */
 class DiskServicePeer
 {

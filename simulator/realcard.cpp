@@ -29,8 +29,8 @@ const QString udevd = QStringLiteral("/lib/systemd/systemd-udevd");
 const QString udisksd = QStringLiteral("/usr/libexec/udisks2/udisksd");
 const QString loopControl = QStringLiteral("/dev/loop-control");
 const QString helper = QStringLiteral("/usr/libexec/sdcardhelper");
-// A helper that waits ends when the program that runs it has ended.
-// The disk service has to know of the new file system before it is asked to mount it.
+// A helper that waits exits when the program that runs it has ended.
+// The disk service has to know of the new file system before a client asks it to mount the card.
 constexpr char helperScript[] = R"(#!/bin/sh
 set -eu
 while [ -e /usr/libexec/sdcardhelper-waits ]; do
@@ -46,9 +46,10 @@ esac
 exec nsenter --net=/proc/%1/ns/net udevadm trigger --settle --action=change "/sys/class/block/$2"
 )";
 constexpr qint64 cardSize = qint64(64) * 1024 * 1024;
-constexpr int patience = 60000; // ms, of a machine that is very busy
+constexpr int patience = 60000; // ms, enough for a machine that is very busy
 
-// As <linux/fs.h> of later kernels has it, and what keeps it from writing anything out.
+// The shutdown request, as <linux/fs.h> of later kernels defines it, and its flag not to write
+// anything out.
 constexpr unsigned long shutdownRequest = _IOR('X', 125, __u32);
 constexpr __u32 withoutFlushing = 2;
 

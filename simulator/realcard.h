@@ -14,20 +14,20 @@
     A block device to format and mount, with the distribution's own disk service, device manager and
     tools: a loop device over a file in memory.
 
-    The system outside takes no notice. Mounts and device nodes are made in a mount namespace of
-    their own, the device manager speaks in a network namespace of its own, and the loop device
-    belongs to whoever has it open. All of it goes with the process, however that ends.
+    The system outside is not affected. Mounts and device nodes are in a mount namespace of their
+    own, the device manager communicates in a network namespace of its own, and the loop device
+    belongs to whoever has it open. When the process ends, in whatever way, all of this disappears.
 */
 class RealCard
 {
 public:
     // Why a card cannot be created here; empty if it can.
     static QString whyNot();
-    // Leaves the namespaces that the process shares with others: to be called once, before there is
-    // a second thread.
+    // Leaves the namespaces that the process shares with others. Call this once, before there is a
+    // second thread.
     static void becomePrivate();
-    // Installs a program that formats and probes memory cards for real; it may be run from outside
-    // the network namespace of this process. While the file /usr/libexec/sdcardhelper-waits
+    // Installs a program that really formats and probes memory cards. Processes outside the network
+    // namespace of this process may run it, too. While the file /usr/libexec/sdcardhelper-waits
     // exists, the program waits.
     static void installHelper();
 
@@ -40,16 +40,16 @@ public:
     QString name() const { return m_name; }
     QString path() const { return m_path; }
 
-    // Makes it an empty, unmounted ext4 card, and waits until the disk service has noticed that.
+    // Turns it into an empty, unmounted ext4 card, and waits until the disk service has noticed.
     void reset();
-    // Where it is mounted.
+    // Where the card is mounted.
     QStringList mountDirectories() const;
     QString file(const QString &name) const;
     QStringList files() const;
-    // The value of a tag that blkid finds on it.
+    // The value of a tag that blkid finds on the card.
     QString probe(const char *tag) const;
 
-    // Changes to its files wait from here until thaw().
+    // Makes changes to the files on the card wait until thaw().
     void freeze();
     void thaw();
     // Removes the device while its file system is mounted; reset() restores it.

@@ -19,7 +19,8 @@ RecordingService::RecordingService(QDBusConnection::BusType bus, const QString &
 RecordingService::~RecordingService()
 {
     m_connection.unregisterService(m_service);
-    // The connection ends in a thread of its own, and lets go there of the objects that it has.
+    // QtDBus ends the connection in a thread of its own, where it would also release the registered
+    // objects.
     m_connection.unregisterObject(QStringLiteral("/"), QDBusConnection::UnregisterTree);
     QDBusConnection::disconnectFromBus(m_connection.name());
 }

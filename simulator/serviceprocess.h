@@ -9,8 +9,8 @@
 #include <QStringList>
 
 /*
-    A D-Bus service in a process of its own, which a test may stop in the middle of anything. It
-    does what its scenario says (see busservice.cpp) for as long as this lives.
+    A D-Bus service in a process of its own, which a test may stop at any moment. It does what its
+    scenario says (see busservice.cpp) for as long as this object exists.
 */
 class ServiceProcess
 {

@@ -55,7 +55,7 @@ const QStringList &knownKeys()
 }
 
 constexpr int maximumName = 255;
-// The reader ignores more arguments: no signature of a call is longer.
+// No signature of a call is longer. The reader stops after one argument more.
 constexpr int maximumArguments = 255;
 
 // The names that D-Bus allows in a call. QtDBus answers other names with an error.

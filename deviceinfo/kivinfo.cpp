@@ -52,7 +52,7 @@ QVariantMap changedProperties(const QDBusMessage &message)
     When the object is created, it asks the cover daemon for both properties. It then follows the
     daemon's \c PropertiesChanged signal, even if the daemon starts later. It may miss a signal that
     a daemon sends at the moment of its start. Without the daemon, or after an error, the properties
-    keep their defaults. Nothing is logged.
+    have their defaults. Nothing is logged.
 
     The daemon is the service \c com.marlo.kivd on the system bus. The object calls the method \c
     Get of \c org.freedesktop.DBus.Properties at the path \c /com/marlo/kivd, for properties of the

@@ -23,8 +23,8 @@ constexpr int languageLength = 2;
 // The path of the best file; empty if there is neither one for the locale nor one in English.
 QString findTerms(const QString &base, const QString &localeName)
 {
-    // Intended: the language alone comes before language and country, and the latter is only tried
-    // if the name has an encoding. Terms are installed by language, and vendors rely on this order.
+    // Intended: after the full name comes the language alone, and only then the name without its
+    // encoding. Terms are installed by language, and vendors rely on this order.
     QStringList candidates = {localeName, localeName.left(languageLength)};
     const int encoding = localeName.indexOf(QLatin1Char('.'));
     if (encoding > 0) {
@@ -101,7 +101,7 @@ QStringList readTerms(const QString &base, const QString &localeName)
     \image gallery-terms.png The gallery's page for this type
 
     \section1 What may surprise
-    \section2 The language goes before the country
+    \section2 The language alone goes before the name without its encoding
     Terms are installed by language, and vendors rely on the order of the files.
 
     \section2 Vendor terms without a path

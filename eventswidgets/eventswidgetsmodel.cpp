@@ -83,8 +83,8 @@ QString translation(const QString &id, const QString &fallback)
     \section1 What may surprise
     \section2 The first choice enables everything else
     The first enableWidget() or disableWidget() stores a list of all known widgets, even of those
-    whose default is off, plus or minus this one. From then on only the list counts. A page that
-    wants to keep the defaults writes the list first.
+    whose default is off, plus or minus this one. From then on only the list counts, so
+    all other widgets are enabled.
 
     \section2 A widget keeps its place
     The \c order of a widget places it when it is first listed: before the first row of a higher

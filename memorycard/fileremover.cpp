@@ -70,8 +70,8 @@ bool isRootDirectory(const struct stat &directory)
 }
 
 // Whether the directory may be on the device. This is unknown, and therefore true, if the file
-// system has its own number (major number 0) instead of a block device's, or if the device has no
-// node here.
+// system has its own number (major number 0) instead of a block device's, or if the path of the
+// device is not a block device here.
 bool mayLieOn(const QByteArray &device, const struct stat &directory)
 {
     struct stat node = {};

@@ -57,7 +57,8 @@ public:
         return m_changing;
     }
 
-    // Runs the choice after all waiting requests: now, or later if rows are being changed.
+    // Runs the choice after all waiting requests: now, or later if rows are being changed or another
+    // choice runs.
     void choose(Choice choice)
     {
         m_choices.push_back(std::move(choice));

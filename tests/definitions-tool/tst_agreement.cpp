@@ -188,7 +188,7 @@ void TestAgreement::linesHaveTheKeysOfQSettings()
         const QString path = write(content, "conf");
         const QSettings settings(path, QSettings::IniFormat);
         if (settings.status() != QSettings::NoError) {
-            continue; // Then the model asks for none.
+            continue; // The model then reads no keys.
         }
         const QStringList keys = settings.allKeys();
         QStringList found;
@@ -218,7 +218,7 @@ void TestAgreement::mutilatedQuickActions()
                                              "\n\r\\\"=;[] ,/#@%x1", &random);
         const QString path = write(content, "conf");
         const std::vector<Finding> findings = check(path);
-        // For the model, under another name.
+        // The model reads a copy under another name.
         const QString another = write(content, "conf");
         const QuickAction action(another, false);
         const bool isRefused = !m_log->takeAll().isEmpty();
@@ -316,7 +316,7 @@ void TestAgreement::namesThatCanBeSent()
         if (isSent) {
             QTRY_VERIFY(receiver.error.isValid());
         }
-        // No service has the name.
+        // No service has this name, so a call that is sent fails with ServiceUnknown.
         const bool arrived = receiver.error.type() == QDBusError::ServiceUnknown;
         (arrived ? sent : refused) += 1;
         m_log->takeAll();

@@ -1,8 +1,8 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-// Good and bad definition files: the checker finds what is expected, in the expected line, and finds an
-// error exactly if the model reads something else than what is written in the file.
+// Good and bad definition files: the checker finds the expected problems in the expected lines. It
+// finds an error if, and only if, the model reads something other than the file says.
 
 #include "definitions-tool/definitionschecker.h"
 #include "eventswidgets/eventswidgetsfile.h"
@@ -82,7 +82,7 @@ std::vector<Finding> check(const QString &path)
     return checker.findings();
 }
 
-// Checks a copy, because QSettings caches the file of a name.
+// Checks a copy, because QSettings caches files by name.
 bool hasErrors(const QString &path)
 {
     const QTemporaryDir directory;
@@ -142,7 +142,7 @@ Reading readPlainly(const QByteArray &content)
     return reading;
 }
 
-// The value of a key in the model, as text; nothing for keys that it does not know.
+// The value of a key in the model, as text; nothing for keys that the model does not know.
 std::optional<QString> modelText(const QuickActionsModel &model, const QuickAction &action,
                                  const QString &key)
 {
@@ -337,7 +337,7 @@ void TestCorpus::agreesOnEventsWidgets()
                 members += written.contains(key) ? 1 : 0;
             }
             if (written.value(QStringLiteral("path")).toString().isEmpty()) {
-                continue; // and the model has said so
+                continue; // the model has logged a message
             }
             QVERIFY(next < file->widgets.size());
             const EventsWidget &widget = file->widgets.at(next++);

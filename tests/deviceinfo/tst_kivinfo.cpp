@@ -119,7 +119,7 @@ void flush(QDBusConnection connection)
     QCOMPARE(connection.call(call).type(), QDBusMessage::ReplyMessage);
 }
 
-// A process of its own, because a process has one system bus.
+// Runs in a process of its own, because a process has only one system bus.
 int withoutABus()
 {
     const MessageLog log;
@@ -179,7 +179,7 @@ void TestKivInfo::readsBothInEitherOrder()
     QTRY_COMPARE(info.report(), QStringLiteral("cover-7 ready: 1 1"));
     QTRY_VERIFY(isSettled(info));
 
-    // Now both are answered at once, and the identifier first.
+    // Now the daemon answers both calls at once, the identifier first.
     const CountingKivInfo another;
     QTRY_COMPARE(another.report(), QStringLiteral("cover-7 ready: 1 1"));
 }
@@ -240,7 +240,7 @@ void TestKivInfo::repliesAreTyped()
     QTRY_VERIFY(isSettled(info));
     QTEST(info.report(), "report");
 
-    // Until the next change signal.
+    // The values stay until the next change signal.
     sendLast(daemon);
     QTRY_COMPARE(info.kivId(), lastCover);
 }
@@ -484,7 +484,7 @@ void TestKivInfo::aHandlerMayCallBack()
     QCOMPARE(info.kivId(), cover);
     QVERIFY(info.kivReady());
 
-    // A page that is left because its cover was taken off.
+    // A page that closes because its cover was taken off.
     QPointer<KivInfo> page = new KivInfo;
     QTRY_VERIFY(isSettled(*page));
     connect(page, &KivInfo::kivIdChanged, page, &QObject::deleteLater);
@@ -511,7 +511,7 @@ void TestKivInfo::followsADaemonThatStartsLater()
         // The properties are not requested again.
         QVERIFY(daemon.calls().isEmpty());
     }
-    // The values stay when the daemon is gone, and a new daemon is followed.
+    // The values stay when the daemon is gone, and signals of a new daemon change them.
     CoverDaemon daemon;
     QCOMPARE(info.report(), QStringLiteral("cover-7 ready: 1 1"));
     sendLast(daemon);

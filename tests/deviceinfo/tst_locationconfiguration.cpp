@@ -344,7 +344,7 @@ void TestLocationConfiguration::sharesWithAnotherProcess()
     LocationConfiguration configuration;
     configuration.saveCustomSettings();
     configuration.setCustomSettingsEnabled(true);
-    // Stored last.
+    // The flag is stored last.
     QTRY_COMPARE(DconfTool::read(flagKey), QByteArray("true"));
     QCOMPARE(DconfTool::read(savedKey),
              QByteArray("{'gps/enabled': <true>, 'here/enabled': <false>, 'mls/enabled': <false>, "
@@ -412,7 +412,7 @@ void TestLocationConfiguration::agreement_data()
             Files::makePipe(base + QStringLiteral("en_GB.txt"));
         },
         noTextId, true);
-    // English does not replace a file that exists.
+    // If the Finnish file exists, the English file is not used instead.
     row("directory", "fi_FI", finnish(Files::makeDirectory), noTextId, false);
     row("pipe", "fi_FI", finnish(Files::makePipe), noTextId, false);
     row("device", "fi_FI",

@@ -155,7 +155,7 @@ void TestLocationSettings::readsStoredValues()
 void TestLocationSettings::nonsenseReadsAsTheDefault_data()
 {
     QTest::addColumn<QByteArray>("value");
-    // 2 in the lower 32 bits of the third one.
+    // The lower 32 bits of the third value are 2.
     for (const char *value :
          {"3", "-1", "int64 4294967298", "'2'", "['2']", "{'a': <1>}", "1e300", "handle 2"}) {
         QTest::newRow(value) << QByteArray(value);
@@ -224,7 +224,7 @@ void TestLocationSettings::emitsOnRealChangesOnly()
     const LocationSettings settings;
     QStringList changes;
     recordChanges(&settings, &changes);
-    store(gpsKey, false); // as good as not set
+    store(gpsKey, false); // the same as not set
     store(hereKey, 0);
     store(hereKey, 7); // counts as 0
     QCOMPARE(changes, QStringList());

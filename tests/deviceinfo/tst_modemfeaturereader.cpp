@@ -68,7 +68,7 @@ void TestModemFeatureReader::readsTheVariant_data()
     row("number", "variant=7\n", "7");
     row("comment", "variant=a;b\n", "a");
     row("Latin-1", "variant=\xE4\n", "ä");
-    // QSettings would unpack the value, and the process might not survive it.
+    // QSettings would unpack the value, which might crash the process.
     row("packed value", "variant=@Variant(\\0\\0\\0\\v\\0\\0\\0\\x1\\0\\0\\0\\x2\\0g)\n", "");
 }
 

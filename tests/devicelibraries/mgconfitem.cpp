@@ -13,7 +13,7 @@ namespace {
 constexpr char filler = 0x5a;
 
 QSet<MGConfItem *> items;
-// The user's choice that the device starts with.
+// The user's settings when the device starts.
 QHash<QString, QVariant> values = {
     {"/desktop/glimmera-marlo-home/events_screen_actions",
      QStringList{"/usr/share/glimmera/quickactions/lamp.conf"}},

@@ -77,7 +77,7 @@ void TestCardPage::init()
 
 void TestCardPage::cleanup()
 {
-    m_window.reset(); // which releases what it has drawn of the page
+    m_window.reset(); // also releases what it has drawn of the page
     m_page.reset();
     m_helper.reset();
     LoggedTest::cleanup();
@@ -133,7 +133,7 @@ void TestCardPage::endsAfterEachFailure_data()
     row("no disk service", "absent", "The disk service did not answer.");
 }
 
-// The second failure changes no status of a formatter that is in Error already.
+// The second failure does not change the formatter's status, which is already Error.
 void TestCardPage::endsAfterEachFailure()
 {
     QFETCH(const QString, scenario);

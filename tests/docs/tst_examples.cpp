@@ -191,7 +191,7 @@ void TestExamples::runsThoseOfTheReference_data()
             }
         }
     }
-    // tst_reference checks that each type has one.
+    // tst_reference checks that each type has an example.
     QVERIFY(found > 0);
 }
 
@@ -200,7 +200,7 @@ void TestExamples::runsThoseOfTheReference()
     QFETCH(const QByteArray, document);
     const auto object = create(document);
     QVERIFY(object != nullptr);
-    // The card of an example is probed: its helper, which is not there, is not to be left behind.
+    // An example may probe its card. The helper does not exist; wait until its start has failed.
     QTRY_VERIFY(!isBusy(*object));
 }
 
@@ -230,7 +230,7 @@ void TestExamples::standInTheManualPages()
 {
     QFETCH(const QString, page);
     QFETCH(const QString, file);
-    // How a manual page writes a backslash.
+    // A manual page writes a backslash as \e.
     const QByteArray text = contentOf(page).replace("\\e", "\\");
     QVERIFY2(text.contains(".Bd -literal -offset indent\n" + example(file) + ".Ed\n"),
              "the manual page has another text than docs/examples");

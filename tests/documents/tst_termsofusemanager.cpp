@@ -105,7 +105,7 @@ void TestTermsOfUseManager::hasVendorTermsOfUse()
     QVERIFY(!manager.hasVendorTermsOfUse());
     manager.setVendorPath(vendorDirectory);
     QVERIFY(!manager.hasVendorTermsOfUse());
-    // Looked up on every read, and any entry will do.
+    // Every read checks the path again. The path may be any kind of entry.
     Files::makeDirectory(vendorDirectory);
     QVERIFY(manager.hasVendorTermsOfUse());
     Files::remove(vendorDirectory);
@@ -251,7 +251,7 @@ void TestTermsOfUseManager::filesThatCannotBeOpened()
 {
     QFETCH(Make, make);
     QFETCH(QString, error);
-    // No other file replaces one that exists.
+    // If fi_FI exists, these files are not used instead.
     Files::write(platformFile(QStringLiteral("fi")), "fi\nbody");
     Files::write(platformFile(QStringLiteral("en_GB")), "en_GB\nbody");
     const QString path = platformFile(QStringLiteral("fi_FI"));

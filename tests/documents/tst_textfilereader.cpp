@@ -237,7 +237,7 @@ void TestTextFileReader::collateLeavesOutFilesAboveTheLimit()
     Files::makeSparse(path("3"), maximumTextSize - 2);
     Files::write(path("4"), "B");
     Files::write(path("5"), "C");
-    // The limit is that of all files together.
+    // The limit applies to all files together.
     const QString text = collate();
     QCOMPARE(text.size(), int(maximumTextSize) + 3);
     QVERIFY(text.startsWith(QStringLiteral(":A,")));

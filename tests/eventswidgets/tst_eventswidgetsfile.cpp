@@ -241,7 +241,7 @@ void TestEventsWidgetsFile::readsWidgets_data()
         R"({ "widgets": [ { "path": "a" } ], "translation_catalog": "maps" })", "maps", "a::-1");
     const QByteArray begin = R"({ "widgets": [ { "path": "a" } ], "x": )";
     row("large file", begin + '"' + QByteArray(20 * 1024 * 1024, 'x') + "\" }", "", "a::-1");
-    // As deep as QJsonDocument reads; deeper files are in noDefinition().
+    // The deepest file that QJsonDocument reads; deeper files are in noDefinition().
     row("deep file", begin + QByteArray(1023, '[') + QByteArray(1023, ']') + "}", "", "a::-1");
 }
 
@@ -343,7 +343,7 @@ void TestEventsWidgetsFile::cannotBeOpened()
 
 void TestEventsWidgetsFile::tooLargeFile()
 {
-    // A sparse file, which takes no space on disk, but would take all memory.
+    // A sparse file takes no space on disk, but reading it would take all memory.
     QFile file(m_path);
     QVERIFY(file.open(QIODevice::WriteOnly));
     file.write("{ \"widgets\": [] }");
@@ -355,7 +355,7 @@ void TestEventsWidgetsFile::tooLargeFile()
 
 void TestEventsWidgetsFile::tooManyContainers()
 {
-    // For such a text, QJsonDocument needs about 50 times its size in memory.
+    // QJsonDocument needs about 50 times the size of such a text in memory.
     const QByteArray entries = QByteArray("[{}],").repeated(499999);
     QVERIFY(!isTooComplex("[{" + entries));
     QVERIFY(isTooComplex("[{[" + entries));

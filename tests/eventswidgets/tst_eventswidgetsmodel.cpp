@@ -60,7 +60,7 @@ public:
 private Q_SLOTS:
     void init();
 
-    // What it is
+    // Interface and data
     void interface();
     void roles();
     void dataOfRows();
@@ -106,7 +106,7 @@ private Q_SLOTS:
     // Available
     void updatesAvailability();
 
-    // Called back
+    // Re-entrant calls
     void handlersMayCallBack();
     void changesWaitForOneAnother();
     void choicesMadeInTheMiddleOfAScan_data();
@@ -324,7 +324,7 @@ void TestEventsWidgetsModel::placesByOrder()
     loadModel(widgets.join(", "));
     QTEST(column(Model::IconRole).join(QLatin1Char(' ')), "rows");
 
-    // A later widget goes behind those of its own order, too.
+    // A widget that is added later also comes after those with the same order.
     const int last = orders.split(QLatin1Char(' ')).last().toInt();
     write("more.json"_s, R"({ "path": "late", "order": )" + QByteArray::number(last) + " }");
     m_model->directoryChanged();
@@ -390,7 +390,7 @@ void TestEventsWidgetsModel::unchangedWidgetsAreNotAnnounced()
     m_model->enabledWidgetsChanged();
     m_model->updateAvailable();
     QCOMPARE(events(), QString());
-    // Nor are those that move to another file, with another catalog.
+    // Widgets that move to another file with another catalog are not announced either.
     Files::remove(pathOf("test.json"_s));
     write("other.json"_s, R"({ "path": "a" }, { "path": "b" })", "maps");
     m_model->directoryChanged();
@@ -574,7 +574,7 @@ void TestEventsWidgetsModel::valuesOfAnyType()
     DconfTool::waitUntilStored();
     DconfTool::write(keyName, QByteArray(QTest::currentDataTag()));
     QTRY_VERIFY(m_key->value().isValid());
-    // Any stored value is a choice: the defaults do not count.
+    // Any stored value counts as a choice, so the defaults do not apply.
     loadModel(R"({ "path": "a" }, { "path": "b", "default_enabled": true }, { "path": "c" })");
     QStringList expected;
     for (const QString &path : {a, b, c}) {

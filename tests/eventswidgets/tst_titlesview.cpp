@@ -34,13 +34,13 @@ private Q_SLOTS:
     void modelDestroyedWhileItIsRead();
     void roleChangedWhileItIsRead();
 
-    // What is collected
+    // Collected values
     void collects_data();
     void collects();
     void followsPaths_data();
     void followsPaths();
 
-    // What matches
+    // Matching
     void matches_data();
     void matches();
     void unknownMatchRoleTakesAll();
@@ -335,7 +335,7 @@ void TestTitlesView::modelDestroyedWhileItIsRead()
     }
 }
 
-// Reading a property may call the view: it still shows the values of its last role.
+// Reading a property may change the view's role. The view then shows the values of the latest role.
 void TestTitlesView::roleChangedWhileItIsRead()
 {
     Answering object;
@@ -683,7 +683,7 @@ void TestTitlesView::joins()
     }
     QCOMPARE(view.value(), sentence);
 
-    // Any list, independent of the state of the view.
+    // joined() takes any list and does not depend on the state of the view.
     QSignalSpy changed(&view, &TitlesView::valueChanged);
     const TitlesView another;
     QCOMPARE(another.joined(texts), sentence);

@@ -243,7 +243,7 @@ std::vector<EveryType::Use> EveryType::uses(const QString &name) const
         const QMetaProperty property = meta->property(i);
         uses.push_back({named(property.name()), [property, it] { property.read(it); }});
     }
-    // Before the writing, after which the rows are others and the formatter is busy.
+    // Methods come before writes, because writes change the rows and make the formatter busy.
     for (int i = base(it)->methodCount(); i < meta->methodCount(); ++i) {
         const QMetaMethod method = meta->method(i);
         if (method.access() == QMetaMethod::Public && method.methodType() != QMetaMethod::Signal) {

@@ -40,7 +40,7 @@ public:
     QStringList state(const QString &name) const;
     QStringList stateOfFiles() const;
 
-    // The reading and writing of each property of a type's own, and the call of each method.
+    // Reads or writes one of a type's own properties, or calls one of its methods.
     struct Use {
         QString name;
         std::function<void()> run;

@@ -212,7 +212,7 @@ bool FailingCard::answer(const char *request)
     }
     out.len = uint32_t(sizeof(out) + data.size());
     const std::array<iovec, 2> parts = {{{&out, sizeof(out)}, {data.data(), data.size()}}};
-    // Fails if the process that asked has ended, which is harmless.
+    // Fails if the process that sent the request has ended, which is harmless.
     const ssize_t written = writev(m_fuse, parts.data(), int(parts.size()));
     Q_UNUSED(written)
     return true;

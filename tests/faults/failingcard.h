@@ -18,7 +18,7 @@
 class FailingCard
 {
 public:
-    // How the removal of a file behaves, and for Unreadable the listing.
+    // How removing a file fails. With Unreadable, listing the directory fails instead.
     enum class Fault { None, Unreadable, Stuck, Waits, Gone };
 
     // Ends the program if it is not allowed to mount; see whyNot().
@@ -26,7 +26,7 @@ public:
     ~FailingCard();
     Q_DISABLE_COPY_MOVE(FailingCard)
 
-    // Why there can be none here; empty if there can.
+    // Why this process cannot mount a card; empty if it can.
     static QString whyNot();
 
     void setFault(Fault fault) { m_fault = fault; }

@@ -9,7 +9,7 @@
 namespace {
 
 constexpr char marker[] = "TEST_IN_A_PROCESS_OF_ITS_OWN";
-constexpr int patience = 120000; // ms, of a machine that is very busy
+constexpr int patience = 120000; // ms, for a very busy machine
 
 } // namespace
 
@@ -36,7 +36,7 @@ QByteArray OwnProcess::runCurrentTest(const QStringList &command)
     if (!ended) {
         return "does not end: " + output;
     }
-    // The test and what Qt Test does before and after all of them.
+    // The test, initTestCase() and cleanupTestCase().
     const bool passed = process.exitStatus() == QProcess::NormalExit && process.exitCode() == 0
         && output.contains("Totals: 3 passed, 0 failed, 0 skipped");
     return passed ? QByteArray()

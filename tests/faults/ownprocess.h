@@ -10,17 +10,17 @@
 #include <QtTest>
 
 /*
-    Runs a test in a process of its own: what a fault does to a process (a bus that is gone, a limit
-    that is reached) the other tests are to be spared.
+    Runs a test in a process of its own, so that a fault that affects the whole process (a missing
+    bus, a limit that is reached) does not affect the other tests.
 */
 namespace OwnProcess {
 
-// Whether this is one.
+// Whether this process runs only one test.
 bool isThis();
 
-// Runs the current test, with its data, in one; the command is what starts it, for example in a
-// namespace of its own. Empty if it passed; else, or if it was skipped, what it wrote, of which
-// skipped() returns the reason.
+// Runs the current test, with its data, in a new process. The command starts the process, for
+// example in a namespace of its own. Returns an empty text if the test passed, and otherwise its
+// output. If the test was skipped, skipped() returns the reason from the output.
 QByteArray runCurrentTest(const QStringList &command = {});
 QByteArray skipped(const QByteArray &output);
 

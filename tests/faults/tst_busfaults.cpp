@@ -1,7 +1,7 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-// Every type in a process whose buses are not there, or die.
+// Tests every type in a process whose buses are missing or die.
 
 #include "everytype.h"
 #include "messagelog.h"
@@ -123,7 +123,7 @@ void TestBusFaults::everyTypeWithoutABus()
     types.useAll();
     TRY(isIdle(types));
     QVERIFY(Buses::areGone());
-    // The path of the vendor's terms was set to another.
+    // useAll() has set another path of the vendor's terms.
     QCOMPARE(missing(before, types.stateOfFiles())
                  .filter(QRegularExpression(QStringLiteral("^(?!TermsOfUseManager)"))),
              QStringList());
@@ -146,7 +146,7 @@ void TestBusFaults::everyTypeOutlivesItsBuses()
     types.useAll();
     TRY(isIdle(types));
 
-    // And so does one that comes only now.
+    // New objects work without their buses, too.
     const EveryType others;
     QTest::qWait(100);
     QCOMPARE(missing(someFacts, others.state()), QStringList());
@@ -191,7 +191,7 @@ void TestBusFaults::everyTypeGoesWhenItsBusesHaveDied()
     auto others = std::make_unique<EveryType>();
     types->useAll();
     buses.kill();
-    // Destroys some objects before Qt notices that the buses are gone, and the others after that.
+    // Destroys some objects before Qt notices that the buses are gone, and the others afterwards.
     types.reset();
     TRY(Buses::areGone());
     others.reset();

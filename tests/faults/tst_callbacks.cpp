@@ -1,8 +1,8 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-// QML that answers each signal of each type by reading and writing all of its properties and
-// calling all of its methods.
+// QML handlers answer each signal of each type: they read and write all of its properties and call
+// all of its methods.
 
 #include "everytype.h"
 #include "files.h"
@@ -39,9 +39,9 @@ private Q_SLOTS:
     void termsOfUseManager();
 
 private:
-    // One object that answers, declared with this in it.
+    // Makes an object whose handlers answer its signals, with this declaration in it.
     void make(const char *type, const QByteArray &declaration = {});
-    // The signals that none of its handlers has been called for.
+    // The signals whose handlers have not been called.
     QStringList unheard() const;
 
     std::unique_ptr<MessageLog> m_log;
@@ -78,7 +78,7 @@ QByteArray handler(QByteArray signal)
     return "on" + signal;
 }
 
-// Those that a type declares itself.
+// The signals that a type declares itself.
 QList<QByteArray> ownSignals(const QMetaObject *meta, const QMetaObject *base)
 {
     QList<QByteArray> names;
@@ -119,7 +119,7 @@ void TestCallbacks::make(const char *type, const QByteArray &declaration)
         }
         return created;
     };
-    // Members are looked up in an object that has no handlers.
+    // Looks up the members in an object that has no handlers.
     const std::unique_ptr<QObject> model = create(QByteArray(type) + " { }");
     const bool isModel = qobject_cast<QAbstractListModel *>(model.get()) != nullptr;
     const QMetaObject *base =
@@ -156,7 +156,7 @@ void TestCallbacks::make(const char *type, const QByteArray &declaration)
     for (const QByteArray &name : qAsConst(names)) {
         handlers += "    " + handler(name) + ": answer('" + name + "')\n";
     }
-    // A page that went on for ever would be its own fault.
+    // The number of answers is limited, because endless answers would be a mistake of the page.
     m_object = create(QByteArray(type)
                       + " {\n    property var heard: []\n"
                         "    property var all: ['"
@@ -219,7 +219,7 @@ void TestCallbacks::memoryCardFormatter()
         QTest::qWait(10);
     }
     QCOMPARE(unheard().join(QLatin1Char(' ')), QString());
-    // It comes to rest once nobody answers, and works.
+    // Once the handlers stop answering, the formatter becomes idle and still works.
     m_object->setProperty("calls", 200);
     TRY(!m_object->property("busy").toBool());
     QTest::qWait(100);

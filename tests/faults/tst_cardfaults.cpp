@@ -111,7 +111,7 @@ void TestCardFaults::cardThatFails_data()
 {
     QTest::addColumn<Fault>("fault");
     QTest::addColumn<QByteArray>("expected");
-    // It counts as empty.
+    // Such a card counts as empty.
     QTest::newRow("cannot be listed") << Fault::Unreadable << QByteArray(emptied);
     QTest::newRow("removes nothing") << Fault::Stuck << QByteArray(notEmptied);
 }
@@ -154,7 +154,7 @@ void TestCardFaults::cardDetachedWhileItIsEmptied()
     NEEDS_FUSE()
     FailingCard card(device, files);
     startEmptying(&card);
-    // The directory below the card is not part of it.
+    // The directory under the mount point is not part of the card.
     card.detach();
     const QString below = card.directory() + QStringLiteral("/file0");
     Files::write(below, "not of the card");
@@ -221,7 +221,7 @@ void TestCardFaults::helperThatWritesAHundredMegabytes()
 {
     startProbing(otherDevice, "head -c 100000000 /dev/zero | tr '\\0' x\n");
     TRY_COMPARE(m_formatter->status(), Formatter::Idle);
-    // All of its output becomes the type.
+    // The whole output becomes the file system type.
     QCOMPARE(m_formatter->filesystemType().size(), 100000000);
     startProbing(device, "echo vfat\n");
     TRY_COMPARE(m_formatter->filesystemType(), vfat);
@@ -245,7 +245,7 @@ void TestCardFaults::helperThatNeverEnds()
     TRY(file.size() > 0);
     QTest::qWait(100);
     QCOMPARE(m_formatter->status(), Formatter::Probing);
-    // Another program ends it.
+    // Another program kills the helper.
     QVERIFY(file.open(QIODevice::ReadOnly));
     const int pid = file.readAll().trimmed().toInt();
     QVERIFY(pid > 1);

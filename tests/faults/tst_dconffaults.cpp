@@ -1,8 +1,8 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-// The types that keep something in dconf, while its service hangs, dies or is not there, and with
-// whatever else may be in their keys.
+// Tests the types that store values in dconf: while its service hangs, dies or is missing, and with
+// unexpected values in their keys.
 
 #include "dconftool.h"
 #include "deviceinfo/locationconfiguration.h"
@@ -30,7 +30,7 @@
 
 #include <glib.h>
 
-// An object with one choice that it keeps in dconf.
+// An object with one choice that it stores in dconf.
 struct User {
     QString key;
     // The output of the dconf tool for each of the two choices.
@@ -45,7 +45,7 @@ struct User {
 using MakeUser = std::function<User()>;
 Q_DECLARE_METATYPE(MakeUser)
 
-// Every function runs for each type that keeps something in dconf.
+// Every function runs for each type that stores values in dconf.
 class TestDconfFaults : public QObject
 {
     Q_OBJECT
@@ -101,7 +101,7 @@ const QStringList allKeys =
 
 const QString actionPath = QStringLiteral("/usr/share/glimmera/quickactions/lamp.conf");
 
-// A model that keeps the paths of what is enabled.
+// A model that stores the paths of its enabled entries.
 template<typename Model>
 User listUser(const QString &key, const QString &path, void (Model::*enable)(const QString &),
               void (Model::*disable)(const QString &))
@@ -110,7 +110,7 @@ User listUser(const QString &key, const QString &path, void (Model::*enable)(con
     if constexpr (std::is_same_v<Model, QuickActionsModel>) {
         model->setShowPotential(true);
     } else {
-        // The other model has rows below its rows, which the tester refuses.
+        // The other model has rows below its rows, which the tester reports as an error.
         new QAbstractItemModelTester(model.get(), model.get());
     }
     model->componentComplete();
@@ -167,7 +167,7 @@ public:
     {
         const bool come = !m_spy.isEmpty() || m_spy.wait(patience);
         m_spy.clear();
-        // And has been to everybody.
+        // Lets the change reach all other objects, too.
         QCoreApplication::processEvents();
         return come;
     }
@@ -184,7 +184,7 @@ pid_t servicePid()
     return static_cast<pid_t>(pid.value());
 }
 
-// Starts it if it does not run.
+// Starts the service if it does not run.
 void signalService(int number)
 {
     if (servicePid() == 0) {
@@ -278,7 +278,7 @@ void TestDconfFaults::cleanup()
 
 QStringList TestDconfFaults::takeMessages()
 {
-    // GLib says so of each connection from a user namespace.
+    // GLib logs this for each connection from a user namespace.
     return m_log->takeLinesWithout(
         QRegularExpression(QStringLiteral("Using cross-namespace EXTERNAL authentication")));
 }
@@ -423,7 +423,7 @@ void TestDconfFaults::everyOtherType()
     for (const char *value : values) {
         load(allKeys, value);
         QVERIFY2(change.hasCome(), value);
-        // Both what follows and what comes only now.
+        // Uses both the existing object and new ones.
         m_user->isOn();
         m_make().isOn();
         LocationConfiguration().restoreCustomSettings();
@@ -502,7 +502,7 @@ void TestDconfFaults::tenThousandNotifications()
         notify.setArguments({m_user->key, QStringList{QString()}, QStringLiteral("tag")});
         QVERIFY(bus.send(notify));
     }
-    // And then there is.
+    // Then the value does change.
     load({m_user->key}, m_user->stored(false));
     TRY(!m_user->isOn());
     QDBusConnection::disconnectFromBus(QStringLiteral("notifications"));

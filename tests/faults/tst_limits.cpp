@@ -185,10 +185,10 @@ void TestLimits::directoryReplacedByALink()
     TRY_COMPARE(rows(model), 0);
     Files::makeLink(target, directory);
     TRY_COMPARE(rows(model), 2);
-    // What happens behind the link is followed.
+    // The model notices changes in the target of the link.
     addFiles(QStringLiteral("third"));
     TRY_COMPARE(rows(model), 3);
-    // The link is removed, but nothing in its target.
+    // This removes the link, but nothing in its target.
     Files::remove(directory);
     TRY_COMPARE(rows(model), 0);
     QCOMPARE(QDir(target).count(), uint(3 + 2)); // with . and ..

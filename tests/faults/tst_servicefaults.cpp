@@ -1,7 +1,7 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-// The types that speak to a D-Bus service, while that service is stopped, dies or floods them.
+// Tests the types that use a D-Bus service, while that service is stopped, dies or floods them.
 
 #include "deviceinfo/kivinfo.h"
 #include "files.h"
@@ -40,7 +40,7 @@ private Q_SLOTS:
     void storeHangs();
 
 private:
-    // Each replaces the service of the test.
+    // Each of these functions replaces the service of the test.
     void start(const char *bus, const char *name, const char *scenario);
     void startCoverDaemon(const char *scenario) { start("system", "com.marlo.kivd", scenario); }
     void startDiskService(const char *scenario)
@@ -149,7 +149,7 @@ void TestServiceFaults::coverDaemonDiesBeforeItReplies()
     QCOMPARE(info.kivId(), QString());
     QVERIFY(!info.kivReady());
 
-    // The next one is followed.
+    // The object follows the next daemon.
     startCoverDaemon("replies");
     m_service->sendSignals(1);
     TRY_COMPARE(info.kivId(), QStringLiteral("cover-1"));
@@ -162,7 +162,7 @@ void TestServiceFaults::coverDaemonFloods()
     const KivInfo info;
     TRY(isSettled(info));
     const QSignalSpy changed(&info, &KivInfo::kivIdChanged);
-    // This one is destroyed meanwhile.
+    // This object is destroyed while signals arrive.
     const QPointer<KivInfo> another = new KivInfo;
     TRY(isSettled(*another));
     connect(another, &KivInfo::kivIdChanged, another, [&another] {

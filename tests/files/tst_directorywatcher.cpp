@@ -30,7 +30,7 @@ namespace {
 
 const QString filter = "*.conf"_s;
 
-// Called once, before the watch of a path that ends like this.
+// Called once, before the watcher adds a watch for a path that ends with beforeWatchOf.
 std::function<void()> beforeWatch;
 QByteArray beforeWatchOf;
 
@@ -74,7 +74,7 @@ int watches()
     return count;
 }
 
-// What a model does: reads the matching files whenever the watcher says so.
+// Like a model, reads the matching files whenever the watcher reports a change.
 class Reader
 {
 public:
@@ -100,7 +100,7 @@ private:
 
 } // namespace
 
-// Replaces the function of the C library, because a test cannot act in the middle of that one.
+// Replaces the function of the C library, so that a test can act right before a watch is added.
 extern "C" Q_DECL_EXPORT int inotify_add_watch(int inotify, const char *path, uint32_t events)
 {
     using Function = int (*)(int, const char *, uint32_t);
@@ -166,8 +166,8 @@ void TestDirectoryWatcher::reportsChanges_data()
     QTest::addColumn<QString>("directory");
     QTest::addColumn<QString>("before");
     QTest::addColumn<QStringList>("steps");
-    // Commands of a shell: one before the watch, and then steps. A step that begins with "+" is
-    // reported once, one that begins with "-" is not.
+    // Shell commands: one that runs before the watch, and then steps. A step that begins with "+"
+    // is reported once, one that begins with "-" is not.
     const auto row = [](const char *name, const char *directory, const char *before,
                         const QStringList &steps) {
         QTest::newRow(name) << directory << before << steps;
@@ -199,7 +199,7 @@ void TestDirectoryWatcher::reportsChanges_data()
         {"- mv a/b/c a/b/elsewhere; mv a/b/elsewhere a/b/c"_s, rewrite});
     row("parent replaced", "a/b/c", "mkdir -p a/b/c new/c",
         {"+ mv a/b old; mv new a/b"_s, "- echo new > old/c/file.conf"_s, rewrite,
-         // By one that does not have the directory, and back.
+         // The parent is replaced by one without the directory, and then put back.
          "+ mkdir new; mv a/b newer; mv new a/b"_s, "+ mv a/b new; mv newer a/b"_s, rewrite});
     row("grandparent replaced", "a/b/c", "mkdir -p a/b/c new/b/c",
         {"+ mv a old; mv new a"_s, "- echo new > old/b/c/file.conf"_s, rewrite,
@@ -332,7 +332,7 @@ void TestDirectoryWatcher::losesNothingToItsParent()
     Files::makeDirectory(path("a/b/sibling"));
     Files::write(file(), "x");
     QVERIFY(spy.wait());
-    // While the watches are looked over because the parent has other permissions.
+    // The file changes while the watcher renews its watches after a change of permissions.
     for (const char *before : {"/a/", "/a/b/", "/a/b/c/"}) {
         beforeWatch = [this] { rewrite(file()); };
         beforeWatchOf = before;
@@ -405,7 +405,7 @@ void TestDirectoryWatcher::watchersShareOneInstance()
     watchers.push_back(std::make_unique<DirectoryWatcher>(path("a/b"), filter));
     QCOMPARE(instances(), used);
     QCOMPARE(watches(), once);
-    // A watch stays for as long as anybody needs it.
+    // A watch stays as long as a watcher needs it.
     watchers.erase(watchers.begin(), watchers.end() - 1);
     QCOMPARE(watches(), once - 1);
     QSignalSpy spy(watchers.front().get(), &DirectoryWatcher::changed);
@@ -497,7 +497,7 @@ void TestDirectoryWatcher::pollsWithoutAnInstance()
     QTRY_VERIFY(follows());
     Files::write(file(), "x");
     QTRY_VERIFY(reports());
-    // Replaced, and followed all the same.
+    // The poller also follows a directory that was replaced.
     for (const bool replaces : {true, false}) {
         spy.clear();
         polledSpy.clear();

@@ -1,7 +1,7 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-// The scanner of settings files next to QSettings, which it guards.
+// Compares the scanner of settings files with QSettings, which it protects.
 
 #include "files.h"
 #include "files/inifile.h"
@@ -33,7 +33,7 @@ bool isUnpacked(const QVariant &value)
     return value.userType() != QMetaType::QString && value.userType() != QMetaType::QStringList;
 }
 
-// The values that QSettings returns. It lists some keys that it does not find again itself.
+// The values that QSettings returns. QSettings lists some keys that it then does not find.
 QVector<QVariant> valuesOf(const QSettings &settings)
 {
     QVector<QVariant> values;
@@ -56,8 +56,8 @@ int countKeys(const QByteArray &text)
     return keys;
 }
 
-// Pieces of text with a meaning, or that look as if they had one. What they pack is harmless in any
-// combination: QSettings has to unpack it here.
+// Pieces of text that have a special meaning, or look like it. Their packed values are harmless in
+// any combination, because QSettings unpacks them here.
 QByteArray randomFile(std::mt19937 *random)
 {
     static const std::vector<QByteArray> pieces = {

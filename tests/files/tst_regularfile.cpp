@@ -60,7 +60,7 @@ void TestRegularFile::readsTheFirstLine()
     QCOMPARE(readFirstLine(QStringLiteral("/proc/self/mem"), 4).state, State::Failed);
 }
 
-// These claim to be empty, and may be of any size.
+// Files of the kernel report a size of 0, but may have content of any size.
 void TestRegularFile::readsFilesOfTheKernel()
 {
     const QString path = QStringLiteral("/proc/version");

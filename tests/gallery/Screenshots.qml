@@ -273,7 +273,7 @@ Gallery {
         step = 0;
     }
 
-    // Shows the page in its present state.
+    // Shows the page in its current state.
     function present() {
         const shown = views[view];
         Simulation.language = shown.language;
@@ -373,7 +373,7 @@ Gallery {
     }
 
     Connections {
-        target: (Simulation) // qmllint crashes at a singleton here, in parentheses it does not
+        target: (Simulation) // in parentheses, because qmllint crashes without them
         function onWarning(text) {
             gallery.fail(text);
         }

@@ -6,8 +6,8 @@ import gallery.simulation 1.0
 import "../../gallery"
 
 /*
-    The gallery while its card is formatted by a helper program that does not end. It quits normally when
-    the file gallery-quits is there.
+    The gallery while its card is formatted by a helper program that does not end. It quits normally
+    when the file gallery-quits exists.
 */
 Gallery {
     id: gallery

@@ -49,7 +49,7 @@ TestCase {
         compare(root.takeMessages(), []);
     }
 
-    // As tryVerify(), but with shorter pauses than 50 ms.
+    // Like tryVerify(), but with pauses shorter than 50 ms.
     function until(condition, otherwise) {
         const end = Date.now() + patience;
         while (!condition()) {
@@ -190,7 +190,7 @@ TestCase {
                 verify(page.height >= 200, "the page has no room");
             }
         }
-        // Some terms are not available in each language.
+        // Some terms are not available in every language.
         root.takeMessages();
     }
 
@@ -286,7 +286,7 @@ TestCase {
         see("com.marlo.camera");
         tap("Torch");
         see("toggle(\"bright\")".replace("\"bright\"", ""));
-        // No service has this name, so the store is asked.
+        // No service has this name, so the model calls the store.
         tap("Navigate home");
         see("showApp(\"marlo-maps\")");
         see("com.marlo.marlostore");
@@ -331,7 +331,7 @@ TestCase {
         const before = ["Take a photo", "Torch", "Navigate home", "New alarm"];
         until(() => rowsOf(list).join() === before.join(), "rows");
 
-        // By the handle, from the first place to the third.
+        // Drags a row by its handle from the first place to the third.
         const x = list.width - list.rowHeight / 2;
         mousePress(list, x, list.rowHeight * 0.5);
         for (let y = list.rowHeight * 0.5; y <= list.rowHeight * 2.5; y += 8) {
@@ -343,7 +343,7 @@ TestCase {
         until(() => root.key("/desktop/glimmera-marlo-home/events_screen_actions")[2]
                     === "/usr/share/glimmera/quickactions/camera.conf", "kept");
 
-        // And back with keys.
+        // Moves it back with keys.
         Screen.visibleItems(list.contentItem).find(item => item.text === "Take a photo"
                                                            && item.forceActiveFocus)
               .forceActiveFocus(Qt.TabFocusReason);
@@ -481,7 +481,7 @@ TestCase {
         see("This is not allowed.");
         expectMessages(["NotAuthorized"]);
         tap("Is not there");
-        // The second failure is a failure, too.
+        // The page also shows the second failure.
         for (let i = 0; i < 2; ++i) {
             tap("Mount");
             see("The disk service is missing or gave no valid answer.");
@@ -530,7 +530,7 @@ TestCase {
         seeSwitch("Network positioning (MLS)", true);
         compare(findControl("MLS online assistance").enabled, false);
 
-        // The first is that of MLS.
+        // The first tap agrees to the terms of MLS.
         tap("I agree");
         tap("I agree");
         until(() => shows("Withdraw consent") && !shows("I agree"), "agreed");

@@ -4,8 +4,8 @@
 #
 # usage: tst_pages.py SOURCES
 #
-# Checks the list of the gallery's pages: each type of plugins.qmltypes has a page that uses it, each
-# page has its panel and its picture in the reference, and no such file belongs to no page.
+# Checks the list of the gallery's pages: each type of plugins.qmltypes has a page that uses it,
+# each page has its panel and its picture in the reference, and every such file belongs to a page.
 
 import pathlib
 import re

@@ -43,7 +43,7 @@ CardHelper::CardHelper()
     Files::remove(directory);
     Files::makeDirectory(directory);
     Files::makePipe(inDirectory("go"));
-    // For reading too: neither this nor writing then waits for the helper.
+    // Opened for reading too, so that neither open() nor write() waits for the helper.
     m_go.setFileName(inDirectory("go"));
     if (!m_go.open(QIODevice::ReadWrite | QIODevice::Unbuffered)) {
         qFatal("cannot open %s", qPrintable(m_go.fileName()));
@@ -71,7 +71,7 @@ void CardHelper::install(const QString &scenario, const QByteArray &output)
         qFatal("no such scenario: %s", qPrintable(scenario));
     }
     Files::write(inDirectory("output"), output);
-    // A new file each time: a program that is running must not be written to.
+    // Creates a new file each time, because nothing may write to a running program.
     remove();
     Files::write(program,
                  QStringLiteral("#!/bin/sh\nexec %1 %2 %3 \"$@\"\n")

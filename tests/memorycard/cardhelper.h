@@ -11,8 +11,9 @@
 #include <QStringList>
 
 /*
-    The program /usr/libexec/sdcardhelper in the throw-away root, which does what a test wants of it
-    (see the script of that name) and keeps what it is run with. None is there before install().
+    The program /usr/libexec/sdcardhelper in the throw-away root. It does what the scenario of a
+    test says (see the script of that name) and records its arguments. It is missing before
+    install().
 */
 class CardHelper
 {
@@ -26,10 +27,10 @@ public:
 
     // Ends the test program if there is no such scenario.
     void install(const QString &scenario, const QByteArray &output = QByteArray());
-    // Something that is there and cannot be run.
+    // Installs a file that cannot be run.
     void installNotExecutable();
     void remove();
-    // Lets a helper that is held go on.
+    // Lets a helper that waits in the scenario "held" continue.
     void release();
 
     // The arguments of each run, the first one first.

@@ -19,7 +19,7 @@ ScratchFileSystem::ScratchFileSystem() : m_path(QFile::encodeName(m_dir.path()))
 
 ScratchFileSystem::~ScratchFileSystem()
 {
-    // With whatever a failed test left mounted in it.
+    // Also unmounts whatever a failed test left mounted in it.
     umount2(m_path.constData(), MNT_DETACH);
 }
 

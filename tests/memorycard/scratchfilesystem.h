@@ -15,7 +15,7 @@
 class ScratchFileSystem
 {
 public:
-    // Ends the program if it may not mount. In the sandbox everybody may.
+    // Ends the program if it is not allowed to mount. In the sandbox, every user is.
     ScratchFileSystem();
     ~ScratchFileSystem();
     Q_DISABLE_COPY_MOVE(ScratchFileSystem)

@@ -37,8 +37,8 @@ const SystemCalls &SystemCalls::real()
     return calls;
 }
 
-// With 64-bit inode numbers the names that follow stand for openat64 and so on. Definitions in the
-// program come before those of the C library.
+// With 64-bit inode numbers the following names mean openat64 and so on. Definitions in the program
+// come before those of the C library.
 extern "C" {
 
 int openat(int directory, const char *path, int flags, ...)

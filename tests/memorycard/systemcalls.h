@@ -10,9 +10,9 @@
 #include <sys/stat.h>
 
 /*
-    The calls of the walk over a card, which this program takes over: a test counts them, changes the
-    tree between two of them, or makes one fail. A hook that is set replaces the call and may forward
-    to the real one.
+    The system calls of the walk over a card. This program replaces them, so that a test can count
+    them, change the tree between two of them, or make one fail. A hook that is set replaces the
+    call and may forward to the real one.
 */
 struct SystemCalls {
     std::function<int(int, const char *, int)> openat;
@@ -21,9 +21,9 @@ struct SystemCalls {
     std::function<int(int, const char *, struct stat *, int)> fstatat;
     std::function<dirent *(DIR *)> readdir;
 
-    // Those of the calling thread.
+    // The hooks of the calling thread.
     static SystemCalls &hooks();
-    // The C library's own.
+    // The functions of the C library.
     static const SystemCalls &real();
 };
 

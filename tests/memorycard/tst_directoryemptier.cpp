@@ -158,8 +158,8 @@ void listWithoutTypes()
     changeListings([](dirent *entry) { entry->d_type = DT_UNKNOWN; });
 }
 
-// A chain of directories. Each has a file and a full directory on both sides of the next one in
-// directory order, whichever way that runs: the walk has work left in all of them on its return.
+// A chain of directories. In directory order, each has a file and a full directory both before and
+// after the next one, so that the walk has work left in all of them on its return.
 void makeDeepTree(const QByteArray &top, int depth)
 {
     for (int level = 0; level <= depth; ++level) {
@@ -172,7 +172,7 @@ void makeDeepTree(const QByteArray &top, int depth)
     }
 }
 
-// Such a tree, and what happens before its deepest file is removed.
+// Makes such a tree. The function is called before the walk removes its deepest file.
 void makeDeepTree(const QByteArray &top, int depth, const std::function<void()> &happening)
 {
     makeDeepTree(top, depth);
@@ -384,7 +384,8 @@ void tst_DirectoryEmptier::callsIntoTheKernel()
 
     const CallCounter counter;
     QVERIFY(empty(m_top));
-    // One removal per entry; a directory is also opened, looked at, and read to its end.
+    // One removal per entry. The walk also opens a directory, calls fstat() and reads it to its
+    // end.
     const int entries = directories == 0 ? files : directories * (files + 1);
     QCOMPARE(counter.counts.value("unlinkat"), entries);
     QCOMPARE(counter.counts.value("fstatat"), 0);
@@ -521,7 +522,8 @@ void tst_DirectoryEmptier::listingThatBreaksOff()
 {
     makeTree(m_top, {"unreadable/file"});
     makeFiles(m_top, 5);
-    // An error in the directory of a card makes its removal fail. In the top, it is like its end.
+    // A read error in a directory of the card makes its removal fail. In the top directory, it
+    // counts as the end of the listing.
     for (const bool inTop : {false, true}) {
         SystemCalls::hooks().readdir = [=](DIR *directory) -> dirent * {
             if (inTop || nameOf(dirfd(directory)).endsWith("/unreadable")) {

@@ -132,7 +132,7 @@ private:
 
 } // namespace
 
-// Takes the place of the C library's own.
+// Replaces the function of the C library.
 extern "C" mntent *getmntent_r(FILE *table, mntent *entry, char *buffer, int size) noexcept
 {
     static const auto original =
@@ -223,7 +223,7 @@ void tst_FileRemover::cleanup()
     LoggedTest::cleanup();
 }
 
-// The table of the system is a link, which must not be written through.
+// The table of the system is a link. This function must not write to its target.
 void tst_FileRemover::writeMountTable(const QByteArray &content)
 {
     const QByteArray draft = mountTable + ".draft";
@@ -291,7 +291,7 @@ void tst_FileRemover::onThreadPool()
         remover, &QObject::destroyed, remover, [&] { deleted.release(); }, Qt::DirectConnection);
     QThreadPool::globalInstance()->start(remover, 0);
 
-    // Nothing arrives before this thread returns to its event loop, though the remover is gone.
+    // The remover is gone, but its signal arrives only when this thread returns to its event loop.
     QVERIFY(deleted.tryAcquire(1, patience));
     QVERIFY(emitter.load() && emitter.load() != QThread::currentThread());
     QCOMPARE(received, QByteArrayList());
@@ -348,7 +348,7 @@ void tst_FileRemover::entriesOfTheMountTable_data()
     completes("mounted twice", card + line(device, "@/other"), "card");
     completes("escape", line("/dev/a\\040card", "@/card"), "card", "/dev/a card");
     completes("encoded", line("/dev/\xc3\xa9", "@/card"), "card", "/dev/\xc3\xa9");
-    // What cannot be opened counts as empty.
+    // A directory that cannot be opened counts as empty.
     completes("missing mount directory", line(device, "@/nowhere"), "");
 
     const auto fails = [](const char *tag, const QByteArray &table,
@@ -368,7 +368,7 @@ void tst_FileRemover::entriesOfTheMountTable_data()
     for (const char *path : {"tmpfs", "none", "test-card1", "UUID=1234-5678", "./card"}) {
         fails(path, line(path, "@/card"), path);
     }
-    // A relative path is no mount directory. A valid entry that follows is used.
+    // A relative path is not a mount directory. The remover uses a valid entry that follows.
     const auto isSkipped = [=](const QByteArray &tag, const QByteArray &rest) {
         fails(tag.constData(), device + rest);
         completes((tag + ", then valid").constData(), device + rest + card, "card");
@@ -445,7 +445,7 @@ void tst_FileRemover::rootMountDirectory_data()
 void tst_FileRemover::rootMountDirectory()
 {
     QFETCH(const QByteArray, directory);
-    // In a child with a root directory of its own, which a wrong remover would empty.
+    // Runs in a child with a root directory of its own, which a wrong remover would empty.
     const QByteArray root = makeCard("root");
     makeTree(root, {"etc/", "card/file"});
     const auto run = [&](const QByteArray &table) {
@@ -471,7 +471,7 @@ void tst_FileRemover::rootMountDirectory()
 
 void tst_FileRemover::longLine()
 {
-    // A line that is longer than the buffer: wherever it is cut, what follows is no entry.
+    // A line that is longer than the buffer: wherever it is cut, the rest is not an entry.
     const QByteArray tail = line(device, path("outside"));
     for (const int length :
          {12280, 12285, 12286, 12287, 12288, 12289, 13000, 13310, 13311, 13312, 24575, 40000}) {
@@ -485,7 +485,7 @@ void tst_FileRemover::longLine()
             QVERIFY2(exists(path("outside/file")), QByteArray::number(length).constData());
         }
     }
-    // The line after it is read again, and so is the front of a line with long options.
+    // The remover does read the line after it, and also the front of a line with long options.
     const QByteArray card = makeCard("card");
     writeMountTable(line("overlay", '/' + QByteArray(30000, 'x')) + line(device, card));
     QCOMPARE(runHere(device), Completed);
@@ -589,7 +589,7 @@ void tst_FileRemover::unreadableMountDirectory()
     const QByteArray card = makeCard("card");
     QCOMPARE(chmod(card.constData(), 0), 0);
     {
-        // It counts as empty.
+        // Such a card counts as empty.
         const WithoutPrivileges guard;
         QCOMPARE(emptyMounted(card), Completed);
         QVERIFY(FileRemover::removeAllEntries(QFile::decodeName(card)));
@@ -624,7 +624,7 @@ void tst_FileRemover::mountDirectoryReplaced()
 
 void tst_FileRemover::directoryOfAnotherDisk()
 {
-    // A block device that has a node, and a directory of another: the card was unmounted meanwhile.
+    // The device has a node, but the directory is on another device, as after an unmount.
     const QTemporaryDir onDisk;
     const QByteArray card = QFile::encodeName(onDisk.path());
     makeFiles(card, 4);
@@ -649,7 +649,7 @@ void tst_FileRemover::directoryOfAnotherDisk()
     QCOMPARE(runHere(node), Error);
     QCOMPARE(list(card).size(), 4);
 
-    // A file system that numbers itself may lie on any device.
+    // A file system with a device number of its own may be on any device.
     const QByteArray onScratch = makeCard("card");
     writeMountTable(line(node, onScratch));
     QCOMPARE(runHere(node), Completed);

@@ -65,7 +65,7 @@ QString objectPath(const QString &name)
     return QStringLiteral("/org/freedesktop/UDisks2/block_devices/") + name;
 }
 
-// A file system in memory with one file, mounted for as long as this lives in the name of a card.
+// A file system in memory with one file, mounted as a card for the lifetime of this object.
 class MountedCard
 {
 public:
@@ -94,7 +94,7 @@ private:
 
 } // namespace
 
-// Takes the place of the D-Bus library's own, for the one thing that cannot be seen on the wire.
+// Replaces the function of the D-Bus library to record timeouts, which messages do not contain.
 extern "C" Q_DECL_EXPORT unsigned dbus_connection_send_with_reply(void *connection, void *message,
                                                                   void **reply, int timeout)
 {
@@ -199,7 +199,7 @@ private Q_SLOTS:
     void goesWhileFilesAreRemoved();
 
 private:
-    // The disk service that does what the words say, alone or with a card for the formatter.
+    // Starts a disk service with these scenarios, alone or with a card for the formatter.
     void startDiskService(const char *scenarios);
     void start(const char *scenarios);
     void startWithoutPath(const char *scenarios);
@@ -210,10 +210,10 @@ private:
     // The scenarios "missing" and "not executable" are helpers that cannot be started.
     void installHelper(const QString &scenario, const QByteArray &output = QByteArray());
     static void addScenarios(std::initializer_list<const char *> scenarios);
-    // A helper that works, and what it finds when it probes.
+    // Installs a helper that works, with the output of its probe.
     void installProbe(const QByteArray &output) { m_helper->install(done, output); }
     std::unique_ptr<QObject> createFromQml(const QByteArray &source);
-    // Answers each change of the status to the given one.
+    // Calls the function on each change to the given status.
     void onStatus(Formatter::Status status, const std::function<void()> &answer);
 
     QQmlEngine m_engine;
@@ -231,7 +231,7 @@ void TestMemoryCardFormatter::init()
 
 void TestMemoryCardFormatter::cleanup()
 {
-    // No more signals are to come.
+    // No more signals may follow.
     const QByteArray before = events();
     QTest::qWait(0);
     const QByteArray after = events();
@@ -555,7 +555,7 @@ void TestMemoryCardFormatter::helperWithFewDescriptors()
         started = started || probed;
         failed = failed || !probed;
 
-        // Its destruction ends a probe, and nothing else.
+        // Destroying this formatter ends its probe and no other process.
         Formatter another;
         another.setDevicePath(card);
     }
@@ -642,7 +642,7 @@ void TestMemoryCardFormatter::supportedFormatTypes()
     install("ext4", ext4Mode);
     QCOMPARE(m_formatter->supportedFormatTypes(), types);
     QCOMPARE(m_formatter->property("supportedFormatTypes").toStringList(), types);
-    // Nothing is kept from one read to the next.
+    // Each read checks the programs again.
     install("vfat", 0755);
     install("ext4", 0755);
     QCOMPARE(m_formatter->supportedFormatTypes(), (QStringList{vfat, ext4}));
@@ -758,7 +758,8 @@ void TestMemoryCardFormatter::removeAllFilesNeedsADescriptor()
         {
             const UsedUpDescriptors none;
             forgetEvents()->removeAllFiles();
-            // It does not begin: a thread without descriptors ends the process.
+            // The removal does not start, because a thread without descriptors would end the
+            // process.
             TRY_EVENTS("not busy, Mounting, busy, Error, not busy");
         }
         QCOMPARE(mountedCard.files(), words("file"));
@@ -1235,7 +1236,7 @@ void TestMemoryCardFormatter::nameThatIsEmptyInTheMiddleOfASequence()
     QCOMPARE(events(), expected + ", name testcard1");
     QCOMPARE(m_diskService->members(), words("Unmount"));
 
-    // A new one works.
+    // A new formatter works.
     makeFormatter();
     m_formatter->setDeviceName(cardName);
     forgetEvents()->mount();
@@ -1285,7 +1286,7 @@ void TestMemoryCardFormatter::retriesFromAHandlerOfAnError()
     request(mounts);
     const QByteArray error = mounts ? "mount ErrorNotAuthorized" : "unmount ErrorDeviceBusy";
     const QByteArray success = mounts ? "Mounting" : "Unmounting";
-    // The new request is not dropped with what had failed.
+    // The failed sequence is dropped without the new request.
     TRY_EVENTS("not busy, " + error + (byStatus ? ", Error, not busy, " : ", not busy, Error, ")
                + success + ", busy, Idle, not busy");
     takeLog();
@@ -1342,7 +1343,7 @@ void TestMemoryCardFormatter::statusIsLogged()
     }
     QCOMPARE(takeLog(), expected.join('\n'));
 
-    // Off unless switched on.
+    // Debug messages are off by default.
     QLoggingCategory::setFilterRules(QString());
     setCard(otherCardName, otherCard);
     QCOMPARE(takeLog(), QByteArray());
@@ -1445,7 +1446,7 @@ void TestMemoryCardFormatter::goesWhileFilesAreRemoved()
     m_formatter->removeAllFiles();
     TRY(removing);
     m_formatter.reset();
-    // It is not waited for, and does not stop.
+    // Destroying the formatter neither waits for the removal nor stops it.
     TRY_COMPARE(mountedCard.files(), QStringList());
     TRY(QThreadPool::globalInstance()->activeThreadCount() == 0);
 }

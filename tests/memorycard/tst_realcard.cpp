@@ -25,7 +25,7 @@ const QString vfat = QStringLiteral("vfat");
 constexpr char mounted[] = "not busy, Mounting, busy, Idle, not busy";
 constexpr char unmounted[] = "not busy, Unmounting, busy, Idle, not busy";
 
-// Whether a thread of this process waits where it cannot be interrupted.
+// Whether a thread of this process is in an uninterruptible wait.
 bool someThreadIsStuck()
 {
     const QDir tasks(QStringLiteral("/proc/self/task"));
@@ -95,7 +95,7 @@ void TestRealCard::cleanupTestCase()
     const QString loop = QStringLiteral("/sys/block/%1/loop").arg(m_card->name());
     QVERIFY(QFileInfo::exists(loop));
     m_card.reset();
-    // Nothing holds on to the device.
+    // Nothing keeps the device in use.
     TRY(!QFileInfo::exists(loop));
 }
 
@@ -285,7 +285,8 @@ void TestRealCard::deviceThatDisappears()
 
 int main(int argc, char *argv[])
 {
-    // The card and its daemons end with this process, even if whoever runs the test is killed.
+    // The card and its daemons end with this process, even if the program that runs the test is
+    // killed.
     prctl(PR_SET_PDEATHSIG, SIGKILL);
     if (RealCard::whyNot().isEmpty()) {
         RealCard::becomePrivate();

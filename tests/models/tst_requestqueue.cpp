@@ -14,7 +14,7 @@
 
 namespace {
 
-// Logs what it does. The handler is what QML does while rows change.
+// Logs its steps. The handler simulates what QML does while rows change.
 class Model : public QObject
 {
 public:

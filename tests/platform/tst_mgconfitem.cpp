@@ -29,7 +29,7 @@
 #include <unistd.h>
 
 /*
-    A test that needs a process of its own (its exit, its bus, its event dispatcher) calls this
+    A test that needs a process of its own (for its exit, its bus, its event dispatcher) runs this
     program with the name of a scenario. A scenario prints lines that the test reads.
 */
 namespace scenarios {
@@ -431,7 +431,7 @@ void TestMGConfItem::equalValueEmitsNothing()
         store(&item, value);
         MGConfItem(key).set(value);
 
-        // Nor if another process stores it.
+        // Another process that stores the same value causes no signal either.
         DconfTool::write(key, DconfTool::read(key));
         QTest::qWait(50);
         QCOMPARE(item.changes(), 0);
@@ -533,7 +533,7 @@ void TestMGConfItem::deletedItemIsNoLongerWatched()
     QTRY_COMPARE(watches.load(), 0);
     QCOMPARE(messages.load(), 2);
 
-    // Items that come and go quickly share one watch, or a message for each would wait to be sent.
+    // Short-lived items share one watch. Otherwise a message for each would wait to be sent.
     for (int i = 0; i < 1000; ++i) {
         const MGConfItem brief(key);
     }
@@ -856,7 +856,7 @@ void TestMGConfItem::failedStoreReverts()
     const QString key = newKey();
     MGConfItem item(key);
     store(&item, 1);
-    QCOMPARE(describe(item.value()), describe(1)); // opens the database, before it goes
+    QCOMPARE(describe(item.value()), describe(1)); // opens the database, before it disappears
     QVariantList seen;
     connect(&item, &MGConfItem::valueChanged, this, [&] { seen.append(item.value()); });
     {
@@ -913,7 +913,7 @@ void TestMGConfItem::exitDoesNotHangOnAStoppedService()
     DconfTool::write(QStringLiteral("/test/key"), "1"); // starts the service, if need be
     const Stopped stopped(servicePid());
     Child child({QStringLiteral("setAndExit"), QStringLiteral("2")});
-    // A missing answer counts as a failure after 25 s; nobody waits that long.
+    // A missing answer counts as a failure after 25 s. The exit must not wait that long.
     QVERIFY(child.waitForFinished(20000));
     QVERIFY(child.succeeds());
 }
@@ -932,7 +932,7 @@ void TestMGConfItem::withoutABusWarnsOnce()
 
 void TestMGConfItem::withoutGlibWarnsOnce()
 {
-    // With GLib, too, to show that a change is seen then.
+    // The run with GLib shows that the item then sees the change.
     for (const bool hasGlib : {false, true}) {
         Child child({QStringLiteral("follow"), QStringLiteral("set")}, QStringLiteral("QT_NO_GLIB"),
                     hasGlib ? QString() : QStringLiteral("1"));
@@ -966,7 +966,7 @@ void TestMGConfItem::outlivesTheBus()
 
 int main(int argc, char *argv[])
 {
-    // A critical message of GLib's means that it was called wrongly.
+    // GLib logs a critical message when a program calls it incorrectly.
     g_log_set_always_fatal(static_cast<GLogLevelFlags>(G_LOG_LEVEL_ERROR | G_LOG_LEVEL_CRITICAL));
     QCoreApplication app(argc, argv);
     if (const auto scenario = scenarios::all.value(app.arguments().value(1))) {

@@ -297,7 +297,7 @@ void TestPlugin::restsAfterEachLanguageChange()
     new LanguageForwarder(&engine);
     const auto object = create(&engine, document);
     QVERIFY(object != nullptr);
-    // Checks that there were so many changes, and that no more follow.
+    // Checks that there were exactly this many changes, and that no more follow.
     const auto restsAfter = [&changes](int count) {
         QTRY_COMPARE(changes.count, count);
         QTest::qWait(100);
@@ -307,7 +307,7 @@ void TestPlugin::restsAfterEachLanguageChange()
     // Each of the two translators announces the catalog that it has loaded.
     restsAfter(2);
 
-    // The one that is sent here, and the one that announces what was loaded.
+    // One change is sent here; the other one announces the catalog that was loaded.
     changeLanguage(QStringLiteral("de_DE"));
     restsAfter(2);
     QCOMPARE(object->property("both").toString(), QStringLiteral("Beide"));

@@ -59,7 +59,7 @@ TestCase {
         }
     }
 
-    // A key that was never stored is as good as one that is off.
+    // A key that was never stored counts as off.
     function tryStored(name, value) {
         tryVerify(() => (root.key(location + name) || value * 0) == value, 5000,
                   name + " is stored as " + value);

@@ -74,7 +74,7 @@ TestCase {
         compare(TextFileReader.collate("file://" + textDirectory, ",", ":"), ":Hyvää✓,B");
     }
 
-    // A null string is an empty one to QML, neither null nor undefined: pages bind texts to it.
+    // QML sees a null string as an empty one, neither null nor undefined: pages bind texts to it.
     function test_whatCannotBeReadIsEmpty() {
         verify(TextFileReader.readContent(textDirectory + "/missing") === "");
         verify(TextFileReader.readContent("") === "");

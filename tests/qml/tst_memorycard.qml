@@ -61,7 +61,7 @@ TestCase {
     function test_supportedFormatTypesIsAnArray() {
         const formatter = createTemporaryObject(card, test);
         verify(formatter.supportedFormatTypes.every(type => ["vfat", "ext4"].includes(type)));
-        // Looked up again: a program that cannot be run does not count.
+        // Each read looks up the programs again. A program that cannot be run does not count.
         root.removeFile("/sbin/mkfs.vfat");
         root.writeFile("/sbin/mkfs.vfat", "");
         root.removeFile("/sbin/mkfs.ext4");
@@ -85,7 +85,7 @@ TestCase {
         return [
             { tag: "format", message: "devicePath is empty.", heard: ["status 6"] },
             { tag: "removeAllFiles", message: "devicePath is empty.", heard: ["status 6"] },
-            // The words are crossed; log readers know them so.
+            // The verbs are swapped on purpose, because readers of logs know these messages.
             { tag: "mount", message: "Cannot unmount without device name", heard: ["busy false"] },
             { tag: "unmount", message: "Cannot mount without device name", heard: ["busy false"] },
         ];

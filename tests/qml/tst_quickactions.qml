@@ -41,7 +41,7 @@ TestCase {
         }
     }
 
-    // A name that no other test used: the module may yet see what that one stored.
+    // No other test uses the same path: the module may still see what an earlier test stored.
     function path(name) {
         return directory + "/" + name + "-" + serial + ".conf";
     }

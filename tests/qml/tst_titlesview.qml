@@ -158,7 +158,7 @@ TestCase {
         model.insert(0, { number: 5, title: "Fig", color: "blue", size: 1, ripe: true });
         compare(view.value, "Fig, Lime, and Plum");
         compare(changes.count, 3);
-        // Nothing that is shown.
+        // The view does not show this role.
         model.setProperty(0, "size", 7);
         compare(changes.count, 3);
         // Moved rows are read when requested.

@@ -1,7 +1,7 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-// A device may lock the list of enabled actions by a dconf profile: nobody can change it then.
+// A device may lock the list of enabled actions with a dconf profile. Then no one can change it.
 
 #include "files.h"
 #include "messagelog.h"

@@ -1,7 +1,7 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-// Quick actions without a session bus: what would have to go out says so, and nothing else breaks.
+// Quick actions without a session bus: calls report that they cannot be sent, and the rest works.
 
 #include "files.h"
 #include "messagelog.h"

@@ -414,7 +414,7 @@ void TestQuickAction::packedValues_data()
     const auto row = [](const char *name, const QByteArray &content) {
         QTest::newRow(name) << content;
     };
-    // Two billion elements, which would be all memory, and a list in a list in a list.
+    // Two billion elements, which would take all memory, and a very deep nesting of lists.
     const QByteArray huge = "@Variant(\\0\\0\\0\\x9\\x7f\\xff\\xff\\xf0)";
     const QByteArray deep = "@Variant(" + QByteArray("\\0\\0\\0\\x9\\0\\0\\0\\x1").repeated(43000);
     row("huge", "title=" + huge + '\n');
@@ -441,7 +441,7 @@ void TestQuickAction::packedValues_data()
     row("repeated key", "title=" + huge + "\ntitle=x\n");
 }
 
-// Each of these would end the process, or might.
+// Each of these values would, or could, crash the process.
 void TestQuickAction::packedValues()
 {
     QFETCH(QByteArray, content);

@@ -137,7 +137,7 @@ private Q_SLOTS:
     void irregularDefinitionsAreListed();
     void definitionFilter();
 
-    // Called back
+    // Re-entrant calls
     void handlersMayCallBack_data();
     void handlersMayCallBack();
     void showPotentialSetInAHandler();
@@ -518,7 +518,7 @@ void TestQuickActionsModel::languageChangesMayChangeTheModel()
         model->setShowPotential(!model->showPotential());
         model->setShowPotential(!model->showPotential());
     });
-    // In the middle of an insertion, and in the destructor of the model.
+    // Language changes come in the middle of an insertion and in the destructor of the model.
     m_model->componentComplete();
     QCOMPARE(listener.count, 3);
     QCOMPARE(rows(), "a b"_s);
@@ -554,7 +554,7 @@ void TestQuickActionsModel::dataOutside()
         QVERIFY(!m_model->data(m_model->index(0), role).isValid());
     }
     QVERIFY(!m_model->data(QModelIndex(), 0).isValid());
-    // With any parent.
+    // rowCount() ignores its parent.
     QCOMPARE(m_model->rowCount(m_model->index(0)), 1);
 }
 
@@ -713,7 +713,7 @@ void TestQuickActionsModel::moveIsNotReloaded()
 
 void TestQuickActionsModel::requestsDuringAMove_data()
 {
-    // A handler of the row's signal, or of the change of the key.
+    // Whether the handler is connected to the row's signal or to the change of the key.
     QTest::addColumn<bool>("ofTheRow");
     QTest::addColumn<Answer>("answer");
     QTest::addColumn<QString>("rowsAtOnce");
@@ -777,7 +777,7 @@ void TestQuickActionsModel::firstChangeStartsTheDelay()
     add("a"_s);
     QTRY_VERIFY(timer->isActive());
     QTRY_VERIFY(timer->remainingTime() < 59500);
-    // A later change does not start it again.
+    // A later change does not restart the timer.
     add("b"_s);
     QTest::qWait(50);
     QVERIFY(timer->isActive());
@@ -890,7 +890,7 @@ void TestQuickActionsModel::handlersMayCallBack()
     model->setShowPotential(false);
     model->enableAction(path("b"_s));
     QTRY_VERIFY(answers > 0);
-    // Finally the rows are those of the list.
+    // In the end, the rows match the list.
     const auto sorted = [](const QString &names) {
         QStringList list = words(names);
         list.removeDuplicates();
@@ -907,12 +907,12 @@ void TestQuickActionsModel::showPotentialSetInAHandler()
     loadEnabled("a"_s);
     connect(m_model.get(), &Model::rowsInserted, this, [&] {
         m_model->setShowPotential(true);
-        // Read back, it is what was set.
+        // The property already has the new value.
         QVERIFY(m_model->showPotential());
     });
     setEnabled("a b"_s);
     QCOMPARE(events(), "inserted 1, count"_s);
-    // Announced after its rows, and once.
+    // The signal is emitted once, after those of the rows.
     QTRY_COMPARE(rows(), "a b c"_s);
     QCoreApplication::processEvents();
     QCOMPARE(events(), "inserted 2, count, potential"_s);

@@ -103,7 +103,8 @@ public:
         }
     }
 
-    // False for an index outside the list. The model writes the list, the caller notes that.
+    // False for an index outside the list. The model writes the list, and the caller records the
+    // write.
     bool move(int index, int newIndex)
     {
         const int size = enabledList.size();
@@ -240,7 +241,7 @@ void TestRandomActions::makeModels()
     auto *timer = m_model->findChild<QTimer *>();
     timer->setInterval(0);
     connect(timer, &QTimer::timeout, m_naive.get(), [this] {
-        // One more load for every earlier timeout, as is intended.
+        // The model loads once more for every earlier timeout, on purpose.
         ++m_reloads;
         for (int i = 0; i < m_reloads; ++i) {
             m_naive->load();

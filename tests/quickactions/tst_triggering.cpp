@@ -183,7 +183,7 @@ void TestTriggering::missingServiceLeadsToTheStore()
     m_expected = QStringList(failure(serviceUnknown));
     QCOMPARE(messagesBefore, m_expected);
 
-    // A second tap asks the store again.
+    // A second tap calls the store again.
     m_model->triggerAction(0);
     QTRY_COMPARE(store.calls().size(), 2);
     m_expected += m_expected;
@@ -269,7 +269,7 @@ void TestTriggering::errorTextsMayLookLikePlaceholders()
 
 void TestTriggering::invalidNamesAreReported()
 {
-    // Names that no message can carry: the error comes back like that of a call that was sent.
+    // No message can contain these names. The error is reported like that of a call that was sent.
     RecordingService store(QDBusConnection::SessionBus, storeName);
     add("a",
         "remote-service=org.example.lamp\nremote-path=no path\n"

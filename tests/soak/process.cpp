@@ -25,7 +25,7 @@ qint64 Process::residentMemory()
 int Process::openFiles()
 {
     const QDir directory(QStringLiteral("/proc/self/fd"));
-    // Not the one that the directory is read with.
+    // Without the descriptor that reads the directory.
     return int(directory.entryList(QDir::AllEntries | QDir::System | QDir::NoDotAndDotDot).size())
         - 1;
 }

@@ -6,10 +6,10 @@
 
 #include <QtGlobal>
 
-// What this process holds.
+// The memory and files that this process uses.
 namespace Process {
 
-// KiB of memory, once what is free has been given back.
+// In KiB, after the process has returned its free memory to the system.
 qint64 residentMemory();
 int openFiles();
 

@@ -25,14 +25,14 @@ namespace {
 const char *const module = "com.marlo.settings.system";
 
 constexpr std::size_t maximumObjects = 24;
-constexpr int eventTime = 10; // ms, for what a step has led to
+constexpr int eventTime = 10; // ms, for the events that a step causes
 constexpr int measurements = 20;
 // The longest time until unanswered calls and ended programs have disappeared.
 constexpr int settleTime = 2000; // ms
 constexpr int quietTime = 300; // ms
 
 #ifdef __SANITIZE_ADDRESS__
-constexpr bool measuresMemory = false; // what is freed is kept a while, to catch who uses it
+constexpr bool measuresMemory = false; // the sanitizer keeps freed memory a while, to catch its use
 #else
 constexpr bool measuresMemory = true;
 #endif
@@ -74,7 +74,7 @@ bool Soak::run(int seconds)
         }
         all.push_back(measure());
     }
-    // By then, everything that is allocated only once has been allocated.
+    // At the start of the comparison, everything that is allocated only once has been allocated.
     const auto start = all.begin() + measurements / 4;
     const auto least = [](auto from, auto to) {
         return std::min_element(from, to,
@@ -237,7 +237,7 @@ void Soak::settle()
     QThreadPool::globalInstance()->waitForDone();
     m_engine.collectGarbage();
     m_engine.clearComponentCache();
-    // Until nothing is closed any more.
+    // Waits until no more files are closed.
     QElapsedTimer timer;
     timer.start();
     int files = 0;

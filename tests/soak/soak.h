@@ -15,9 +15,9 @@
 #include <vector>
 
 /*
-    Makes objects of all the module's types, sets their properties and calls their methods, all of
-    it at random, while the world around them changes. From time to time everything goes, and the
-    process is to hold no more than it did before.
+    At random, makes objects of all the module's types, sets their properties and calls their
+    methods, while their environment changes. From time to time it deletes all objects. The process
+    must then use no more memory and files than before.
 */
 class Soak
 {
@@ -26,7 +26,7 @@ public:
     ~Soak();
     Q_DISABLE_COPY_MOVE(Soak)
 
-    // Prints a line for each measurement; whether nothing has grown.
+    // Prints a line for each measurement. Returns whether nothing has grown.
     bool run(int seconds);
 
 private:

@@ -239,7 +239,7 @@ void World::changeCard()
 
 void World::changeDiskService()
 {
-    m_diskService.reset(); // one owns the name at a time
+    m_diskService.reset(); // only one can own the name at a time
     m_diskService = std::make_unique<DiskServicePeer>(QStringList(anyOf(diskScenarios)));
 }
 

@@ -17,8 +17,8 @@
 #include <memory>
 
 /*
-    What the module finds in the root that it runs in: definition files, catalogs, texts, settings,
-    a memory card, and the services that it calls, all of which come, go and fail at random.
+    The environment of the module: definition files, catalogs, texts, settings, a memory card, and
+    the services that it calls. All of these appear, disappear and fail at random.
 */
 class World
 {
@@ -29,7 +29,7 @@ public:
     // Ends all peers and replaces the helper, so that nothing blocks or keeps recorded calls.
     void settle();
 
-    // Values for properties and arguments, some of them of use.
+    // Values for properties and arguments, some of them valid.
     QString text();
     QVariant value();
 

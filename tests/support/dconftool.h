@@ -9,12 +9,11 @@
 #include <QStringList>
 
 /*
-    What another program does with dconf: that program is the dconf tool. A warning is logged if it
-    fails.
+    Reads and writes dconf from another process, the dconf tool. Logs a warning if the tool fails.
 */
 namespace DconfTool {
 
-// What the tool prints, given the input.
+// Runs the tool with this input and returns what it prints.
 QByteArray run(const QStringList &arguments, const QByteArray &input = {});
 
 // A value in GVariant's text format; empty if nothing is stored.
@@ -24,8 +23,8 @@ void write(const QString &key, const QStringList &value);
 // Resets a key, or everything below a path that ends with a slash.
 void reset(const QString &path);
 
-// dconf stores the changes of this process one by one in the background. Only after that does a
-// write of another process come last.
+// dconf stores the changes of this process one by one in the background. Once this function
+// returns, a write of another process comes after all of them.
 void waitUntilStored();
 
 } // namespace DconfTool

@@ -24,7 +24,7 @@ QString catalogPath(const QString &name)
     return QStringLiteral("/usr/share/translations/%1.qm").arg(name);
 }
 
-// Started by hand, as root even, a test must not write to the root of the machine.
+// A test that is started by hand, even as root, must not change the machine's real files.
 void requireThrowAwayRoot(const QString &path)
 {
     require(qEnvironmentVariableIsSet("MARLO_THROW_AWAY_ROOT"),

@@ -9,7 +9,7 @@
 #include <QStringList>
 
 /*
-    Files of the throw-away root. Each of these ends the test program if it cannot do what it says.
+    Functions for files in the throw-away root. Each ends the test program if it fails.
 */
 namespace Files {
 

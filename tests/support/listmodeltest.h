@@ -16,8 +16,9 @@
 #include <utility>
 
 /*
-    What the tests of the two models of definition files share: an empty directory for the files,
-    catalogs, the recorded signals of the model, and the tests of what both models do alike.
+    The base of the tests for the two models of definition files. It has an empty directory for the
+    files, catalogs, the recorded signals of the model, and tests of behaviour that both models
+    share.
 */
 class ListModelTest : public LoggedTest
 {
@@ -45,14 +46,14 @@ protected:
     virtual QString rowsOf(const QAbstractListModel &model) const = 0;
     // The content of a definition file for one row of this name, with a catalog.
     virtual QByteArray definition(const QString &name, const QByteArray &catalog) const = 0;
-    // The messages since the last call, without complaints of the model tester that are expected.
+    // The messages since the last call, without expected warnings of the model tester.
     virtual QStringList newMessages();
 
     // Begins to check the model and to record its signals.
     void watch(QAbstractListModel *model);
-    // Its recorded signals since the last call.
+    // The model's recorded signals since the last call.
     QString events() { return m_events->take(); }
-    // Records another signal of it under this name.
+    // Records another signal of the model under this name.
     template<typename Model>
     void record(const Model *model, void (Model::*signal)(), const QString &name)
     {
@@ -94,8 +95,8 @@ private:
     std::unique_ptr<QAbstractItemModelTester> m_tester;
 };
 
-// Calls a function with every language change of the application, which a catalog causes when it is
-// installed or removed.
+// Calls a function on every language change of the application. Installing or removing a catalog
+// causes such a change.
 class LanguageListener : public QObject
 {
 public:

@@ -11,8 +11,8 @@
 #include <memory>
 
 /*
-    A test whose functions each fail if they log something that they do not expect. A test that has
-    more to prepare overrides init() or cleanup(), and calls these.
+    A test in which a function fails if it logs a message that it does not expect. A subclass that
+    has more to prepare overrides init() or cleanup(), and calls these.
 */
 class LoggedTest : public QObject
 {

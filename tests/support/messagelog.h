@@ -12,13 +12,14 @@
 class QRegularExpression;
 
 /*
-    Takes every message that is logged while it lives. A test asks for the messages that it expects,
-    in their order; whatever is left is unexpected and should fail it:
+    Captures every message that is logged during its lifetime. A test takes the messages that it
+    expects, in their order. Any message that is left is unexpected and should fail the test:
 
         void init() { m_log = std::make_unique<MessageLog>(); }
         void cleanup() { QCOMPARE(m_log->takeReport(), QString()); m_log.reset(); }
 
-    Debug messages below the threshold of their category never reach it, as anywhere.
+    Debug messages below the threshold of their category never reach it, as with any message
+    handler.
 */
 class MessageLog
 {
@@ -39,11 +40,12 @@ public:
 
     // Returns and clears all messages so far, the oldest first.
     QList<Message> takeAll();
-    // The texts of takeAll(), where type and category are of no interest.
+    // The texts of takeAll(), for tests that ignore type and category.
     QStringList takeTexts();
     // takeAll() as a text with one line for each message.
     QString takeReport();
-    // The lines of takeReport() except those that match, which other libraries log.
+    // The lines of takeReport() except those that match. This leaves out messages of other
+    // libraries.
     QStringList takeLinesWithout(const QRegularExpression &ignored);
 };
 

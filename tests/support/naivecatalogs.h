@@ -13,8 +13,8 @@
 #include <vector>
 
 /*
-    What a model's catalogs give for a text, computed without installing them: the list of
-    translators as the application would hold it.
+    Looks up a text in a model's catalogs without installing them. For this it keeps the list of
+    translators as the application would.
 */
 class NaiveCatalogs
 {

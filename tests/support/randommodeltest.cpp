@@ -21,7 +21,7 @@
 
 namespace {
 
-// Keeps all processors busy while it lives, so that threads of dconf are interrupted anywhere.
+// Keeps all processors busy while it lives, so that threads of dconf are interrupted at any point.
 class BusyMachine
 {
 public:

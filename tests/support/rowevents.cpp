@@ -5,7 +5,7 @@
 
 namespace {
 
-// Rows below a parent are an error in a list model and must not pass for others.
+// Rows below a parent are an error in a list model, so the text must mark them.
 QString rows(const QModelIndex &parent, int first, int last)
 {
     const QString text =

@@ -13,7 +13,7 @@
 #include <unistd.h>
 
 /*
-    Takes every descriptor that this process may still open, except as many as are to be left.
+    Uses up the file descriptors that this process may still open, except the given number.
 */
 class UsedUpDescriptors
 {

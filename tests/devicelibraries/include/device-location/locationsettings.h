@@ -7,8 +7,8 @@
 #include <QObject>
 #include <QString>
 
-// A device's LocationSettings, written like the MGConfItem beside it. The values of its enumeration
-// have names of their own.
+// A device's LocationSettings, in the same style as the device's MGConfItem. Its enumeration values
+// have their own names.
 class LocationSettings : public QObject
 {
     Q_OBJECT

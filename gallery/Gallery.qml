@@ -5,7 +5,7 @@ import QtQuick 2.15
 import QtQuick.Controls 2.15
 import QtQuick.Controls.Universal 2.15
 import QtQuick.Layouts 1.15
-// Importing the module brings the texts of the settings pages.
+// Importing the module installs the texts of the settings pages.
 import com.marlo.settings.system 1.0
 import gallery.simulation 1.0
 
@@ -66,7 +66,8 @@ ApplicationWindow {
     }
 
     header: ToolBar {
-        // The window decides. A width that follows the title is a binding loop at times.
+        // The window sets the width. A width that follows the title sometimes causes a binding
+        // loop.
         contentWidth: 0
         Keys.onReturnPressed: window.pressFocused()
         Keys.onEnterPressed: window.pressFocused()

@@ -42,7 +42,7 @@ ScrollingPage {
             Layout.fillWidth: true
             source: "simulations/" + frame.entry.file.replace("Page", "Simulation")
             onLoaded: {
-                // Some simulations have something for the page, as the application around it would.
+                // Some simulations control the page, as the application around it would.
                 if (item.hasOwnProperty("page")) {
                     item.page = Qt.binding(() => frame.page);
                 }

@@ -101,7 +101,7 @@ int main(int argc, char *argv[])
     }
     if (!whyNot.isEmpty()) {
         std::fprintf(stderr, "gallery: the memory card is simulated: %s\n", qPrintable(whyNot));
-        // What the simulated one mounts must be unmounted with the command, too.
+        // When the command ends, the mounts of the simulated card must end, too.
         if (unshare(CLONE_NEWNS) == 0) {
             mount(nullptr, "/", nullptr, MS_REC | MS_PRIVATE, nullptr);
         }

@@ -26,7 +26,7 @@ GalleryPage {
                 icon.source: Display.icon(model.icon)
                 description: model.description
                 remark: model.available ? "" : qsTrId("gallery-events-widgets-unavailable")
-                // Through the model: an item has a property `enabled` of its own.
+                // Needs "model.", because an item has a property `enabled` of its own.
                 checked: model.enabled
                 onToggled: {
                     if (checked) {

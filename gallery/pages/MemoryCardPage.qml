@@ -71,7 +71,7 @@ GalleryPage {
         }
     }
 
-    // For failures without a code: what failed is the step that was being done.
+    // For failures without a code: the step that was running has failed.
     function causeText(step) {
         switch (step) {
         case MemoryCardFormatter.Formatting:

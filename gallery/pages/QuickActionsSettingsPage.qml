@@ -11,7 +11,7 @@ import "controls/display.js" as Display
     The page on which a user chooses quick actions and puts them in order.
 */
 GalleryPage {
-    // Ordering takes a model of its own: move() expects that the rows are the user's list. With
+    // Ordering needs a model of its own: move() expects that the rows are the user's list. With
     // showPotential, they are not.
     QuickActionsModel {
         id: enabledActions
@@ -48,7 +48,7 @@ GalleryPage {
                 text: Display.title(model.title, model.path)
                 description: model.title ? "" : qsTrId("gallery-untitled")
                 icon.source: Display.icon(model.icon)
-                // Through the model: an item has a property `enabled` of its own.
+                // Needs "model.", because an item has a property `enabled` of its own.
                 checked: model.enabled
                 onToggled: {
                     if (checked) {

@@ -49,7 +49,7 @@ ColumnLayout {
     }
 
     Connections {
-        target: (Simulation) // qmllint crashes at a singleton here, in parentheses it does not
+        target: (Simulation) // in parentheses, because qmllint crashes without them
         function onCallReceived(service, method, args) {
             const list = args.map(argument => '"' + argument + '"').join(", ");
             calls.insert(0, { service: service, call: method + "(" + list + ")" });

@@ -1,7 +1,7 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-// A tree, and what happens to it while it is removed.
+// The input is a tree, and the changes to it while it is removed.
 
 #include "fuzzing.h"
 #include "isolatedthread.h"
@@ -43,7 +43,7 @@ const std::vector<std::string> keptDirectories = {outside, outside + "/y", outsi
 constexpr size_t maximumNodes = 400;
 constexpr size_t maximumLength = 1000; // of a path
 constexpr int maximumEvents = 8;
-// Beyond all that a walk over so few nodes can need.
+// More calls than a walk over so few nodes can need.
 constexpr int tooManyCalls = 100000;
 // The maximum number of descriptors that the walk may hold open.
 constexpr int maximumOpen = 57;
@@ -87,7 +87,7 @@ void clear(const std::string &directory)
     nftw(directory.c_str(), removeOne, 20, FTW_DEPTH | FTW_PHYS | FTW_MOUNT);
 }
 
-// A descriptor above all that are open once as many as given are opened.
+// A number above all descriptors that the next count calls of open() return.
 int beyond(int count)
 {
     int fd = 0;
@@ -219,14 +219,15 @@ private:
         }
     }
 
-    // Deep enough that directories are closed and opened again. Each has a file in it, or none has.
+    // Deep enough that the walk closes and reopens directories. Either each of them has a file, or
+    // none.
     void makeChain(std::vector<std::string> *way, const std::string &name)
     {
         const int byte = m_input.takeByte();
         std::string path = way->back();
         for (int i = byte % 80; i > 0 && path.size() < maximumLength; --i) {
             if (byte >= 128) {
-                // Listed behind the directory, as older.
+                // The file is older than the directory, so it is listed after the directory.
                 touch(path + "/d");
             }
             path += '/' + name;
@@ -320,7 +321,7 @@ private:
             std::remove(node.c_str());
             break;
         case Mount:
-            // Seldom: the kernel takes long to take one off.
+            // Rarely, because the kernel takes long to unmount.
             if (event.argument % 16 == 0) {
                 putMount(node);
             }
@@ -361,14 +362,14 @@ private:
         }
     }
 
-    // File systems need not say what an entry is, and broken ones list anything.
+    // File systems need not report the type of an entry, and broken ones may list any entry.
     dirent *disguise(dirent *entry)
     {
         if (entry && m_untyped) {
             entry->d_type = DT_UNKNOWN;
         }
         if (entry && m_listed != nullptr) {
-            // In place of the real entry, which is then not removed.
+            // Replaces the real entry, which is then not removed.
             entry->d_type = m_calls % 2 == 0 ? DT_DIR : m_calls % 3 == 0 ? DT_REG : DT_UNKNOWN;
             std::strcpy(entry->d_name, m_listed);
             m_listed = nullptr;

@@ -1,7 +1,7 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-// The name of a locale, on the first line, and the text of terms of use.
+// The input is the name of a locale, on the first line, and the text of terms of use.
 
 #include "documents/termsofusemanager.h"
 #include "documents/textfilereader.h"

@@ -1,7 +1,8 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-// A definition file of events widgets, as the model reads it and as marlo-definitions checks it.
+// The input is a definition file of events widgets, which the model reads and marlo-definitions
+// checks.
 
 #include "definitions-tool/definitionschecker.h"
 #include "eventswidgets/eventswidgetsfile.h"
@@ -9,7 +10,7 @@
 
 #include <algorithm>
 
-// The leak sanitizer's own.
+// Functions of the leak sanitizer.
 extern "C" {
 __attribute__((weak)) void __lsan_disable();
 __attribute__((weak)) void __lsan_enable();

@@ -1,8 +1,8 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-// A type, up to the first NUL, and data of that type as a settings database may hold it, damaged or
-// not; and values of QML's, to be stored.
+// The input is a type, up to the first NUL, and data of that type as a settings database may hold
+// it, damaged or not. If the type is empty, the rest is a value from QML, to be stored.
 
 #include "fuzzing.h"
 #include "gvariantconversion.h"

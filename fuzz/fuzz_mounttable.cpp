@@ -1,7 +1,7 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-// The path of a card's device, on the first line, and a mount table.
+// The input is the path of a card's device, on the first line, and a mount table.
 
 #include "fuzzing.h"
 #include "isolatedthread.h"

@@ -1,7 +1,8 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-// A definition file of a quick action: read, asked everything, and sent off.
+// The input is a definition file of a quick action. The target reads it, calls every getter and
+// sends its call.
 
 #include "files/inifile.h"
 #include "fuzzing.h"
@@ -77,7 +78,7 @@ bool hasBrokenSection(const QByteArray &text)
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t *data, std::size_t size)
 {
-    // Another name each time: QSettings keeps what it has read of a file a while.
+    // Uses a new name each time, because QSettings caches what it has read of a file.
     static int number = 0;
     ++number;
     const QByteArray content(reinterpret_cast<const char *>(data), int(size));
@@ -88,7 +89,8 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t *data, std::size_t size
     QFile::remove(path);
     Fuzzing::require(action == again, "a file reads the same twice");
 
-    // QSettings says it of a file that it reads for the first time; it unpacks nothing yet.
+    // QSettings reports a broken file only when it reads it for the first time, and unpacks nothing
+    // yet.
     const QString unread =
         Fuzzing::writeFile((QByteArray::number(number) + ".ini").constData(), content);
     const bool isBroken =

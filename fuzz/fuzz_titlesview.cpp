@@ -1,7 +1,7 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-// Two role paths and a value to match, over rows that hold everything.
+// The input is two role paths and a value to match. The rows hold values of every kind.
 
 #include "eventswidgets/titlesview.h"
 #include "fuzzing.h"
@@ -115,7 +115,7 @@ private:
 QString takePath(Bytes *input)
 {
     const QByteArray path = input->takeUntil('\n');
-    // Half a surrogate pair, as QML's texts may hold.
+    // May contain half a surrogate pair, as texts from QML may.
     return path.startsWith('!')
         ? QString(reinterpret_cast<const QChar *>(path.constData() + 1), (path.size() - 1) / 2)
         : QString::fromUtf8(path);

@@ -23,7 +23,8 @@ namespace {
 const QLatin1String directory("/usr/share/glimmera/eventswidgets");
 
 constexpr double growthBar = 1.5;
-// The model also makes a record and a row of each widget, which weighs more where no file is opened.
+// The model also makes a record and a row of each widget. That matters more if one file has them
+// all.
 constexpr double parsingBarOfOneFile = 2.6;
 constexpr double parsingBarOfOneFileEach = 1.3;
 constexpr double titlesBar = 1.4;
@@ -33,7 +34,8 @@ constexpr int many = 5000;
 
 enum class Layout { OneFile, OneFileEach };
 
-// Keeps what is computed for its time alone.
+// Stores results that only their timing needs, so that the compiler does not drop their
+// computation.
 volatile qint64 sink = 0;
 
 QJsonObject widget(int number)
@@ -93,7 +95,8 @@ void parseAll()
     }
 }
 
-// Both sides read as many widgets as makes the most in all, so that every count takes about as long.
+// Both sides repeat a small count until they have read as many widgets as with the largest, so that
+// every count takes about as long.
 Rounds::Work parsing(Layout layout, int count)
 {
     return {[=] {

@@ -2,18 +2,19 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 /*
-    Removes all files from a card, and compares that with `rm -rf` and with nothing but the unlinkat()
+    Removes all files from a card, and compares that with `rm -rf` and with only the unlinkat()
     calls on a tree that was listed beforehand, on tmpfs and (as root) on ext4.
 
     rm sorts directories of more than 10,000 entries by inode, which spares ext4 much work; the remover
-    keeps directory order. On ext4 such a directory is therefore compared with what keeps that order,
-    too, and rm is there for information only.
+    keeps directory order. On ext4, such a directory is therefore compared with removals that also
+    keep that order. There, rm is for information only.
 
-    Each program removes a tree of its own, fresh and written out. The time that a program takes for
-    an empty directory is subtracted from its times, so that its start does not count.
+    Each program removes a new tree of its own that is already written to the file system. The time
+    that a program takes for an empty directory is subtracted from its times, so that its start does
+    not count.
 
-    All of this happens in a mount namespace of this process: nothing stays mounted and no loop device
-    in use when it ends, in whatever way.
+    All of this happens in a mount namespace of this process. However the process ends, nothing
+    stays mounted and no loop device stays in use.
 */
 
 #include "memorycard/fileremover.h"
@@ -163,7 +164,7 @@ QByteArray treePath(const QByteArray &parent)
     return parent + "/tree";
 }
 
-// A fresh tree, written out, so that nothing of its making is left to do while it is removed.
+// Makes a new tree and writes it out, so that its removal does not include work from its creation.
 QByteArray makeTree(const QByteArray &parent, const Tree &tree)
 {
     const int directory =
@@ -211,7 +212,7 @@ void removeWithStandardLibrary(const QByteArray &path)
     std::filesystem::remove_all(path.constData());
 }
 
-// A tree that was listed: its removal is nothing but calls into the kernel.
+// A tree that was listed, so that its removal consists only of calls into the kernel.
 class BareCalls
 {
 public:
@@ -270,7 +271,7 @@ private:
     QVector<int> m_directories;
 };
 
-// Subtracts what a program needs for an empty directory from its times.
+// Subtracts the time that a program takes for an empty directory.
 void subtract(const Rounds::Times &start, Rounds::Times *times)
 {
     const auto median = [&start](double Rounds::Time::*clock) {
@@ -302,7 +303,7 @@ bool compareTimes(const QByteArray &parent, const char *fileSystem, const Tree &
         {removeWithRm, make},
         {removeWithRm, makeNothing},
     };
-    // A chain this long cannot be held open, which the bare calls need.
+    // The bare calls need all directories open, which a chain this long does not allow.
     std::unique_ptr<BareCalls> bareCalls;
     if (!deep) {
         works.push_back({[&] { bareCalls->remove(); },
@@ -342,7 +343,8 @@ bool compareTimes(const QByteArray &parent, const char *fileSystem, const Tree &
     return kept;
 }
 
-// Traces a child while it removes a tree: counts what strace -c counts, and the open files.
+// Traces a child while it removes a tree. Counts its system calls, as strace -c does, and its open
+// files.
 void countCalls(const QByteArray &path, long &calls, long &openFiles)
 {
     const pid_t child = require(fork(), "fork");

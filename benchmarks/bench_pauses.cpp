@@ -1,9 +1,9 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-// How long the main thread is held up by each constructor, property, method and destructor while
-// every service that a type uses is stopped, next to the same while all of them answer; how often a
-// page of all types wakes up while nothing happens; and how many inotify instances 100 models take.
+// Measures how long each constructor, property, method and destructor blocks the main thread while
+// every service that a type uses is stopped, and while all of them answer; how often a page of all
+// types wakes up while nothing happens; and how many inotify instances 100 models take.
 
 #include "everytype.h"
 #include "rounds.h"
@@ -33,7 +33,7 @@ namespace {
 
 constexpr int rounds = 10;
 constexpr double bar = 4; // ms, a quarter of a frame
-constexpr double shown = 0.005; // ms, what rounds to more than nothing
+constexpr double shown = 0.005; // ms, what rounds to more than 0.00
 
 const QString pageOption = QStringLiteral("--page");
 constexpr int restTime = 10; // s
@@ -79,7 +79,7 @@ template<typename Work> double pauseOf(const Work &work)
     return waits() == waitsBefore ? processorTime() - processorBefore : wall;
 }
 
-// All that the types speak to, dconf's own included.
+// All services that the types use, including that of dconf.
 class Services
 {
 public:
@@ -227,7 +227,7 @@ int main(int argc, char *argv[])
     if (!qEnvironmentVariableIsSet("MARLO_THROW_AWAY_ROOT")) {
         qFatal("runs only in the throw-away root of simulator");
     }
-    // The arguments are any, and the messages about that many.
+    // The calls have arbitrary arguments, which cause many messages.
     qInstallMessageHandler(dropMessage);
     if (QCoreApplication::arguments().contains(pageOption)) {
         return showPage();

@@ -70,7 +70,8 @@ void readWithSettings(const QStringList &paths)
     }
 }
 
-// Both sides read as many files as makes the most in all, so that every count takes about as long.
+// Both sides repeat a small count until they have read as many files as with the largest, so that
+// every count takes about as long.
 Rounds::Work reading(int count)
 {
     const auto paths = std::make_shared<QStringList>();
@@ -104,7 +105,7 @@ Rounds::Work loading(int count, bool enabled)
             }};
 }
 
-// From nothing to nothing again.
+// Models from construction to destruction.
 Rounds::Work lifetimes(int count)
 {
     return {[=] {

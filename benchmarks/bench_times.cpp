@@ -1,8 +1,8 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-// What a page author wants to know: how many milliseconds the module takes on this machine. Each
-// round is a process of its own, as an application is that shows its first page.
+// Measures for authors of pages how many milliseconds the module takes on this machine. Each round
+// is a process of its own, like an application that shows its first page.
 
 #include "files.h"
 #include "memorycard/fileremover.h"

@@ -10,7 +10,7 @@
 /*
     Ratios between works that are timed in one run: a single time depends on the machine.
 
-    The rows of one table in Markdown are printed; ./dev bench prints its head.
+    Prints the rows of a Markdown table; ./dev bench prints its head.
 */
 namespace Rounds {
 

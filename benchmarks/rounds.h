@@ -34,7 +34,7 @@ constexpr double noBar = -1;
 
 enum class WarmUp { Yes, No };
 
-// Runs everything in rounds, each in a random order, and before that once to warm up.
+// Runs everything in rounds, each in a random order, and with WarmUp::Yes once before that.
 std::vector<Times> times(const std::vector<Work> &works, int rounds = 9,
                          WarmUp warmUp = WarmUp::Yes);
 

@@ -219,8 +219,8 @@ private:
         }
     }
 
-    // Deep enough that the walk closes and reopens directories. Either each of them has a file, or
-    // none.
+    // May be so deep that the walk closes and reopens directories. Either each of them has a file,
+    // or none.
     void makeChain(std::vector<std::string> *way, const std::string &name)
     {
         const int byte = m_input.takeByte();

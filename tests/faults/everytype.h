@@ -31,7 +31,7 @@ public:
 
     static QStringList names();
     QObject *object(const QString &name) const;
-    // Another object of the type; the singleton again.
+    // An object whose property "it" is a new object of the type, or the singleton.
     std::unique_ptr<QObject> make(const QString &name) const;
 
     // The state of all types: each property, row and text that a method returns, one per line.

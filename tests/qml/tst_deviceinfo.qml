@@ -115,7 +115,7 @@ TestCase {
         compare(page.heard, ["gps true", "mls true", "mls online 2", "here 1"]);
         compare(switches(other), [true, true, 2, 1]);
         compare(other.heard, page.heard);
-        // Another process.
+        // Another client of dconf.
         root.setKey(location + "gps_enabled", false);
         tryCompare(other, "heard", page.heard.concat("gps false"));
     }

@@ -62,7 +62,7 @@ private:
     QString readPlain();
     QString readEscape();
     QChar readNumber(int base);
-    // The value of the next character as a digit, or 16 if it is none.
+    // The value of the next character as a digit, or 16 for any other character.
     int digit() const;
 
     const QByteArray &m_text;

@@ -83,8 +83,8 @@ QString translation(const QString &id, const QString &fallback)
     \section1 What may surprise
     \section2 The first choice enables everything else
     The first enableWidget() or disableWidget() stores a list of all known widgets, even of those
-    whose default is off, plus or minus this one. From then on only the list counts, so
-    all other widgets are enabled.
+    whose default is off, plus or minus this one. From then on only the list counts, so all
+    other widgets are enabled.
 
     \section2 A widget keeps its place
     The \c order of a widget places it when it is first listed: before the first row of a higher
@@ -330,8 +330,10 @@ void EventsWidgetsModel::mergeWidgets(const std::vector<Widget> &widgets)
         while (m_rows.at(row).path != widget.path) {
             ++row;
         }
-        if (m_rows.at(row) != widget) {
+        if (m_rows.at(row).order != widget.order) {
             orders.clear();
+        }
+        if (m_rows.at(row) != widget) {
             updateWidget(row, widget);
         }
     }

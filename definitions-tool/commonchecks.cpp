@@ -4,7 +4,7 @@
 #include "commonchecks.h"
 
 #include "files/regularfile.h"
-#include "plugin/translations/catalogfiles.h"
+#include "translations/catalogfiles.h"
 
 #include <QRegularExpression>
 

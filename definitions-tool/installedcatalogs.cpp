@@ -3,7 +3,7 @@
 
 #include "installedcatalogs.h"
 
-#include "plugin/translations/catalogfiles.h"
+#include "translations/catalogfiles.h"
 
 #include <QDir>
 #include <QTranslator>

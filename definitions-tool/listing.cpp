@@ -7,10 +7,10 @@
 #include "eventswidgets/eventswidgetsfile.h"
 #include "eventswidgets/eventswidgetsmodel.h"
 #include "installedcatalogs.h"
-#include "plugin/translations/apptranslator.h"
-#include "plugin/translations/catalogfiles.h"
 #include "quickactions/quickaction.h"
 #include "quickactions/quickactionsmodel.h"
+#include "translations/apptranslator.h"
+#include "translations/catalogfiles.h"
 
 #include <QCoreApplication>
 #include <QLocale>

@@ -7,7 +7,7 @@
 #include "files/directorywatcher.h"
 #include "mgconfitem.h"
 #include "models/requestqueue.h"
-#include "plugin/translations/catalogtable.h"
+#include "translations/catalogtable.h"
 
 #include <QAbstractListModel>
 #include <QList>

@@ -3,10 +3,10 @@
 
 // The input is a tree, and the changes to it while it is removed.
 
+#include "files/filedescriptor.h"
 #include "fuzzing.h"
 #include "isolatedthread.h"
 #include "memorycard/directoryemptier.h"
-#include "memorycard/filedescriptor.h"
 #include "systemcalls.h"
 
 #include <algorithm>

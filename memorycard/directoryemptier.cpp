@@ -3,7 +3,7 @@
 
 #include "directoryemptier.h"
 
-#include "filedescriptor.h"
+#include "files/filedescriptor.h"
 
 #include <algorithm>
 #include <cstring>

@@ -4,7 +4,7 @@
 #include "fileremover.h"
 
 #include "directoryemptier.h"
-#include "filedescriptor.h"
+#include "files/filedescriptor.h"
 
 #include <QByteArray>
 #include <QFile>

@@ -4,8 +4,8 @@
 #include "memorycardformatter.h"
 
 #include "diskservice.h"
-#include "filedescriptor.h"
 #include "fileremover.h"
+#include "files/filedescriptor.h"
 
 #include <QDBusError>
 #include <QDBusPendingCall>

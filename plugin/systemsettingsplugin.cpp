@@ -13,8 +13,8 @@
 #include "eventswidgets/eventswidgetsmodel.h"
 #include "eventswidgets/titlesview.h"
 #include "memorycard/memorycardformatter.h"
-#include "plugin/translations/apptranslator.h"
 #include "quickactions/quickactionsmodel.h"
+#include "translations/apptranslator.h"
 
 #include <QCoreApplication>
 #include <QQmlEngine>

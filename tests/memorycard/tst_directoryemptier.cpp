@@ -1,10 +1,10 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
+#include "files/filedescriptor.h"
 #include "filetree.h"
 #include "loggedtest.h"
 #include "memorycard/directoryemptier.h"
-#include "memorycard/filedescriptor.h"
 #include "scratchfilesystem.h"
 #include "systemcalls.h"
 

@@ -3,7 +3,7 @@
 
 #include "files.h"
 #include "loggedtest.h"
-#include "plugin/translations/catalogtable.h"
+#include "translations/catalogtable.h"
 
 #include <QScopedValueRollback>
 #include <QtTest>

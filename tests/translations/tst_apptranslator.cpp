@@ -3,7 +3,7 @@
 
 #include "files.h"
 #include "loggedtest.h"
-#include "plugin/translations/apptranslator.h"
+#include "translations/apptranslator.h"
 
 #include <QtTest>
 

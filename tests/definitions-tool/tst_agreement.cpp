@@ -46,7 +46,6 @@ private Q_SLOTS:
 
     void linesHaveTheKeysOfQSettings();
     void mutilatedQuickActions();
-    void mutilatedEventsWidgets();
     void walkerReadsWhatQJsonDocumentReads();
     void namesThatCanBeSent();
 
@@ -236,32 +235,6 @@ void TestAgreement::mutilatedQuickActions()
         Files::remove(another);
     }
     QVERIFY(refused > 10 && refused < 3000);
-}
-
-void TestAgreement::mutilatedEventsWidgets()
-{
-    Random random(3);
-    const QVector<QByteArray> contents = corpus("eventswidgetsfile");
-    int read = 0;
-    for (int i = 0; i < 4000; ++i) {
-        const QByteArray content = mutilated(contents.at(below(contents.size(), &random)),
-                                             "\n\\\"{}[]:, 019.eE-tfnu\xc3\xa4", &random);
-        const QString path = write(content, "json");
-        const std::vector<Finding> findings = check(path);
-        const auto file = readEventsWidgetsFile(path);
-        const int warnings = m_log->takeAll().size();
-        QCOMPARE(count(findings, {"json"}), file ? 0 : 1);
-        if (file) {
-            ++read;
-            QCOMPARE(count(findings, {"path", "widget"}), warnings);
-        }
-        const int lines = content.count('\n') + 1;
-        for (const Finding &finding : findings) {
-            QVERIFY(finding.line >= 1 && finding.line <= lines);
-        }
-        Files::remove(path);
-    }
-    QVERIFY2(read > 300 && read < 3500, qPrintable(QString::number(read)));
 }
 
 void TestAgreement::walkerReadsWhatQJsonDocumentReads()

@@ -30,12 +30,12 @@ def fail(text):
 
 
 corpus = pathlib.Path(sys.argv[2])
+findings = (corpus / "eventswidgetsfile.findings").read_text().splitlines()
 for path in sorted((corpus / "eventswidgetsfile").iterdir()):
-    findings = (corpus / "findings" / path.name).read_text()
     rules = {
         finding.rpartition("[")[2].rstrip("]")
-        for finding in findings.splitlines()
-        if not BEYOND.search(finding)
+        for finding in findings
+        if finding.startswith(f"{path.name}:") and not BEYOND.search(finding)
     }
     try:
         value = json.loads(path.read_bytes().decode("utf-8-sig"), strict=False)

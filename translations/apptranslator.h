@@ -4,8 +4,10 @@
 #ifndef APPTRANSLATOR_H
 #define APPTRANSLATOR_H
 
-#include <QByteArray>
-#include <QTranslator>
+#include "checkedtranslator.h"
+
+#include <QDateTime>
+#include <QString>
 
 /*
     A translator of the settings pages' catalog, "settings-system" in /usr/share/translations.
@@ -13,12 +15,12 @@
     Installed as an event filter on an object, it reloads the catalog when a language change reaches
     that object, so that pages follow the language of the system without a restart.
 */
-class AppTranslator : public QTranslator
+class AppTranslator : public CheckedTranslator
 {
     Q_OBJECT
 
 public:
-    using QTranslator::QTranslator;
+    using CheckedTranslator::CheckedTranslator;
 
     // Without its catalog the translator is empty, which is not an error.
     void loadEngineeringEnglish();
@@ -27,8 +29,20 @@ public:
     bool eventFilter(QObject *watched, QEvent *event) override;
 
 private:
-    // The digest of the file that loadDefaultLocale() loaded.
-    QByteArray m_loaded;
+    // A file that is replaced or rewritten is another version.
+    struct Version {
+        QString path;
+        qint64 size = 0;
+        QDateTime changed;
+        bool operator==(const Version &other) const
+        {
+            return path == other.path && size == other.size && changed == other.changed;
+        }
+    };
+
+    static Version findDefaultLocale();
+
+    Version m_loaded;
 };
 
 #endif

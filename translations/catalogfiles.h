@@ -5,14 +5,26 @@
 #define CATALOGFILES_H
 
 #include <QLatin1String>
+#include <QString>
+
+class QLocale;
 
 // The directory of the translation catalogs and the names of their files: a catalog "maps" has
 // maps_eng_en.qm for engineering English, and a file such as maps-fi.qm for each language.
 namespace CatalogFiles {
 
-const QLatin1String directory("/usr/share/translations");
-const QLatin1String engineeringEnglishSuffix("_eng_en");
-const QLatin1String localePrefix("-");
+constexpr QLatin1String directory("/usr/share/translations");
+constexpr QLatin1String engineeringEnglishSuffix("_eng_en");
+constexpr QLatin1String localePrefix("-");
+
+// Whether the name keeps the files of the catalog inside the directory.
+bool isCatalogName(const QString &name);
+
+// These return the path of the file that QTranslator::load() would choose, and an empty string if
+// there is none. QTranslator would also parse the file, and thereby trust it.
+QString findEngineeringEnglish(const QString &catalog, const QString &directory = directory);
+QString findLanguage(const QString &catalog, const QLocale &locale,
+                     const QString &directory = directory);
 
 } // namespace CatalogFiles
 

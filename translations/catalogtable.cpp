@@ -4,10 +4,11 @@
 #include "catalogtable.h"
 
 #include "catalogfiles.h"
+#include "checkedtranslator.h"
 
 #include <QCoreApplication>
 #include <QLocale>
-#include <QTranslator>
+#include <QtDebug>
 
 using namespace CatalogFiles;
 
@@ -22,43 +23,47 @@ CatalogTable::~CatalogTable()
 
 void CatalogTable::addDefinition(const QString &user, const QString &catalog)
 {
-    if (!catalog.isEmpty()) {
-        addCatalogTranslator(user, catalog + engineeringEnglishSuffix, QString());
-        addCatalogTranslator(user, catalog, localePrefix);
+    if (catalog.isEmpty()) {
+        return;
     }
+    if (!isCatalogName(catalog)) {
+        if (!m_refused.contains(catalog)) {
+            m_refused.insert(catalog);
+            qWarning() << "The translation catalog" << catalog << "of" << user
+                       << "is not used: its name leads out of" << QString(directory);
+        }
+        return;
+    }
+    add(user, catalog + engineeringEnglishSuffix,
+        [&catalog] { return findEngineeringEnglish(catalog); });
+    add(user, catalog, [&catalog] { return findLanguage(catalog, QLocale()); });
 }
 
 void CatalogTable::removeDefinition(const QString &user, const QString &catalog)
 {
-    if (!catalog.isEmpty()) {
-        removeCatalogTranslator(user, catalog + engineeringEnglishSuffix);
-        removeCatalogTranslator(user, catalog);
-    }
+    remove(user, catalog + engineeringEnglishSuffix);
+    remove(user, catalog);
 }
 
-void CatalogTable::addCatalogTranslator(const QString &user, const QString &catalog,
-                                        const QString &prefix)
+template<typename Find>
+void CatalogTable::add(const QString &user, const QString &key, Find findFile)
 {
-    const auto known = m_entries.find(catalog);
+    const auto known = m_entries.find(key);
     if (known != m_entries.end()) {
         known->users.insert(user);
         return;
     }
 
-    auto *translator = new QTranslator(m_owner);
-    m_entries.insert(catalog, {translator, {user}});
-    if (prefix.isEmpty()) {
-        static_cast<void>(translator->load(catalog, directory));
-    } else {
-        static_cast<void>(translator->load(QLocale(), catalog, prefix, directory));
-    }
+    auto *translator = new CheckedTranslator(m_owner);
+    m_entries.insert(key, {translator, {user}});
+    translator->loadFileIfFound(findFile());
     // Last, because handlers of the language change may call back.
     QCoreApplication::installTranslator(translator);
 }
 
-void CatalogTable::removeCatalogTranslator(const QString &user, const QString &catalog)
+void CatalogTable::remove(const QString &user, const QString &key)
 {
-    const auto known = m_entries.find(catalog);
+    const auto known = m_entries.find(key);
     if (known == m_entries.end()) {
         return;
     }

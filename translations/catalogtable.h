@@ -23,7 +23,8 @@ public:
     Q_DISABLE_COPY_MOVE(CatalogTable)
 
     // Each catalog has two translators: engineering English, and above it the language of the
-    // default locale. A definition without a catalog name uses none.
+    // default locale. A definition without a catalog name uses none, and so does one with a name
+    // that leads out of the directory of catalogs, with one warning for each name.
     void addDefinition(const QString &user, const QString &catalog);
     void removeDefinition(const QString &user, const QString &catalog);
 
@@ -40,14 +41,14 @@ private:
         QSet<QString> users;
     };
 
-    // Loads and installs the catalog for its first user. In the file name, the prefix separates the
-    // catalog's name from the default locale; without a prefix the file has the catalog's name.
-    void addCatalogTranslator(const QString &user, const QString &catalog, const QString &prefix);
+    // Loads and installs a catalog for its first user.
+    template<typename Find> void add(const QString &user, const QString &key, Find findFile);
     // Removes the translator with the last user.
-    void removeCatalogTranslator(const QString &user, const QString &catalog);
+    void remove(const QString &user, const QString &key);
 
     QObject *m_owner;
     QHash<QString, Entry> m_entries;
+    QSet<QString> m_refused; // names that a warning has named
 };
 
 #endif

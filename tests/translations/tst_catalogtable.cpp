@@ -28,6 +28,8 @@ private Q_SLOTS:
     void leavesTheApplicationWithItsOwner();
     void mayBeCalledBackByLanguageChanges();
     void tablesShareNothing();
+    void treatsADamagedCatalogAsMissing();
+    void refusesNamesThatLeaveTheDirectory();
 
 private:
     QList<QTranslator *> translators() const { return m_owner->findChildren<QTranslator *>(); }
@@ -230,6 +232,40 @@ void TestCatalogTable::tablesShareNothing()
 
     m_table->removeDefinition(a, maps);
     QCOMPARE(title(), QStringLiteral("Kartat"));
+}
+
+void TestCatalogTable::treatsADamagedCatalogAsMissing()
+{
+    Files::write(QStringLiteral("/usr/share/translations/maps-fi.qm"), "damaged");
+    m_table->addDefinition(a, maps);
+    m_table->addDefinition(b, maps);
+    QCOMPARE(title(), QStringLiteral("Maps"));
+    QCOMPARE(m_log->takeTexts(),
+             QStringList(QStringLiteral(
+                 "The translation catalog \"/usr/share/translations/maps-fi.qm\" is not used: it "
+                 "does not begin like a catalog")));
+    m_table->clear();
+}
+
+void TestCatalogTable::refusesNamesThatLeaveTheDirectory()
+{
+    // Without the refusal these would be valid paths of a catalog.
+    const QString outside = QStringLiteral("/usr/share/other/maps");
+    Files::write(outside + QStringLiteral("_eng_en.qm"), {});
+    QVERIFY(QFile::remove(outside + QStringLiteral("_eng_en.qm")));
+    QVERIFY(QFile::copy(QStringLiteral("/usr/share/translations/maps-fi.qm"),
+                        outside + QStringLiteral("_eng_en.qm")));
+    for (const QString &name : {outside, QStringLiteral("../../..") + outside}) {
+        m_table->addDefinition(a, name);
+        m_table->addDefinition(b, name);
+        QCOMPARE(title(), QStringLiteral("maps-title"));
+        QCOMPARE(m_log->takeTexts(),
+                 QStringList(QStringLiteral("The translation catalog \"%1\" of \"%2\" is not used: "
+                                            "its name leads out of \"/usr/share/translations\"")
+                                 .arg(name, a)));
+        m_table->removeDefinition(a, name);
+    }
+    QCOMPARE(translators().size(), 0);
 }
 
 QTEST_GUILESS_MAIN(TestCatalogTable)

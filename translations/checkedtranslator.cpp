@@ -1,0 +1,34 @@
+// SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
+// SPDX-License-Identifier: BSD-3-Clause
+
+#include "checkedtranslator.h"
+
+#include "catalogcheck.h"
+#include "files/regularfile.h"
+
+#include <QtDebug>
+
+QString CheckedTranslator::loadFile(const QString &path)
+{
+    RegularFile file = readRegularFile(path, maximumCatalogSize);
+    QString refusal =
+        file.state == RegularFile::State::Read ? whyUnusableCatalog(file.content) : file.error;
+    const int size = refusal.isEmpty() ? file.content.size() : 0;
+    file.content.append(catalogPadding, '\0');
+    // Without content this empties the translator.
+    if (!load(reinterpret_cast<const uchar *>(file.content.constData()), size)
+        && refusal.isEmpty()) {
+        refusal = QStringLiteral("its plural rules are damaged");
+    }
+    // Only now, because the translator has used the content of the last file until here.
+    m_content = file.content;
+    return refusal;
+}
+
+void CheckedTranslator::loadFileIfFound(const QString &path)
+{
+    const QString refusal = loadFile(path);
+    if (!path.isEmpty() && !refusal.isEmpty()) {
+        qWarning() << "The translation catalog" << path << "is not used:" << qPrintable(refusal);
+    }
+}

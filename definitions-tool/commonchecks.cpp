@@ -6,7 +6,9 @@
 #include "files/regularfile.h"
 #include "translations/catalogfiles.h"
 
+#include <QFileInfo>
 #include <QRegularExpression>
+#include <QUrl>
 
 #include <algorithm>
 #include <numeric>
@@ -20,6 +22,17 @@ const QLatin1String unknownKeyRule("unknown-key");
 const QLatin1String catalogRule("catalog");
 const QLatin1String textIdRule("text-id");
 const QLatin1String relativePathRule("relative-path");
+const QLatin1String translationRule("translation");
+const QLatin1String blankRule("blank");
+const QLatin1String schemeRule("scheme");
+const QLatin1String missingFileRule("missing-file");
+const QLatin1String permissionsRule("permissions");
+
+const QLatin1String fileScheme("file");
+const QLatin1String imageScheme("image");
+
+// The number of texts that one finding names.
+constexpr int maximumListed = 5;
 
 // Longer names are not typing errors, and comparing them would take long.
 constexpr int longestName = 64;
@@ -63,6 +76,13 @@ QString nearest(const QString &name, const QStringList &known)
         }
     }
     return best;
+}
+
+// In lower case; empty if the text is not a URL.
+QString schemeOf(const QString &text)
+{
+    static const QRegularExpression scheme(QStringLiteral("^([a-zA-Z][a-zA-Z0-9+.-]*):"));
+    return scheme.match(text).captured(1).toLower();
 }
 
 } // namespace
@@ -113,40 +133,131 @@ void checkCatalog(const QString &catalog, int line, CheckContext *context, Findi
                           .arg(quoted(catalog), quoted(catalog.chopped(suffix.size()))));
         return;
     }
-    InstalledCatalogs &catalogs = context->catalogs;
-    if (catalog.isEmpty() || context->ignoresCatalogs || catalogs.hasEngineeringEnglish(catalog)) {
+    if (catalog.isEmpty() || context->ignoresCatalogs) {
         return;
     }
-    const QString file =
-        quoted(catalog + CatalogFiles::engineeringEnglishSuffix + QStringLiteral(".qm"));
-    findings->add(line, Severity::Warning, catalogRule,
-                  catalogs.languages(catalog).isEmpty()
-                      ? QStringLiteral("the catalog %1 is not installed in %2")
-                            .arg(quoted(catalog), catalogs.directory())
-                      : QStringLiteral("%1 is not installed in %2: languages without a catalog of "
-                                       "their own show identifiers")
-                            .arg(file, catalogs.directory()));
-}
-
-void checkTextId(const QString &id, const QString &catalog, int line, CheckContext *context,
-                 Findings *findings)
-{
-    InstalledCatalogs &catalogs = context->catalogs;
-    const bool isInstalled = !catalog.isEmpty() && !context->ignoresCatalogs
-        && (catalogs.hasEngineeringEnglish(catalog) || !catalogs.languages(catalog).isEmpty());
-    if (!id.isEmpty() && isInstalled && !catalogs.holds(catalog, id)) {
-        findings->add(line, Severity::Warning, textIdRule,
-                      QStringLiteral("the catalog %1 does not hold the text %2")
-                          .arg(quoted(catalog), quoted(id)));
+    const InstalledCatalogs::Catalog &installed = context->catalogs.find(catalog);
+    const QString directory = context->catalogs.directory();
+    if (!installed.isInstalled()) {
+        findings->add(line, Severity::Warning, catalogRule,
+                      QStringLiteral("the catalog %1 is not installed in %2")
+                          .arg(quoted(catalog), directory));
+    } else if (!installed.hasEngineeringEnglish) {
+        findings->add(line, Severity::Warning, catalogRule,
+                      QStringLiteral("%1 is not installed in %2: languages without a catalog of "
+                                     "their own show identifiers")
+                          .arg(quoted(catalog + suffix + QStringLiteral(".qm")), directory));
     }
 }
 
-void checkIcon(const QString &icon, int line, Findings *findings)
+void checkTextIds(const std::vector<TextId> &ids, const QString &catalog, int line,
+                  CheckContext *context, Findings *findings)
 {
-    static const QRegularExpression anywhere(QStringLiteral("^(/|[a-zA-Z][a-zA-Z0-9+.-]*:)"));
+    if (catalog.isEmpty() || context->ignoresCatalogs
+        || !context->catalogs.find(catalog).isInstalled()) {
+        return;
+    }
+    const InstalledCatalogs::Catalog &installed = context->catalogs.find(catalog);
+    QStringList held;
+    for (const TextId &text : ids) {
+        if (text.id.isEmpty() || held.contains(text.id)) {
+            continue;
+        }
+        if (installed.holds(text.id)) {
+            held.append(text.id);
+        } else {
+            findings->add(text.line, Severity::Warning, textIdRule,
+                          QStringLiteral("the catalog %1 does not hold the text %2")
+                              .arg(quoted(catalog), quoted(text.id)));
+        }
+    }
+    for (const InstalledCatalogs::Language &language : installed.languages) {
+        QStringList missing;
+        for (const QString &id : qAsConst(held)) {
+            const QString text = language.text(id);
+            // An unfinished translation is compiled as the engineering English source, or as
+            // nothing.
+            const bool isUnfinished = installed.hasEngineeringEnglish && !language.name.isEmpty()
+                && !language.name.startsWith(QLatin1String("en"))
+                && text == installed.languages.front().text(id);
+            if (text.isEmpty() || isUnfinished) {
+                missing.append(quoted(id));
+            }
+        }
+        if (!missing.isEmpty()) {
+            const int more = missing.size() - maximumListed;
+            QString list = QStringList(missing.mid(0, maximumListed)).join(QLatin1String(", "));
+            if (more > 0) {
+                list += QStringLiteral(" and %1 more").arg(more);
+            }
+            findings->add(
+                line, Severity::Note, translationRule,
+                QStringLiteral("not translated in %1: %2").arg(quoted(language.fileName), list));
+        }
+    }
+}
+
+void checkLocation(const QString &what, const QString &location, const QStringList &schemes,
+                   int line, CheckContext *context, Findings *findings)
+{
+    const auto add = [&](Severity severity, QLatin1String rule, const QString &text) {
+        findings->add(line, severity, rule,
+                      QStringLiteral("the %1 %2 %3").arg(what, quoted(location), text));
+    };
+    if (location != location.trimmed()) {
+        add(Severity::Warning, blankRule, QStringLiteral("begins or ends with a blank"));
+        return;
+    }
+    const QString scheme = schemeOf(location);
+    if (!scheme.isEmpty() && !schemes.contains(scheme)) {
+        const QString meant = nearest(scheme, schemes);
+        add(Severity::Warning, schemeRule,
+            meant.isEmpty() ? QStringLiteral("is a URL that cannot be loaded")
+                            : QStringLiteral("is a URL that cannot be loaded; is %1 meant?")
+                                  .arg(quoted(meant + location.mid(scheme.size()))));
+        return;
+    }
+    const QUrl url(location);
+    if ((scheme == imageScheme && url.host().isEmpty())
+        || (scheme == fileScheme && !url.host().isEmpty())) {
+        add(Severity::Warning, schemeRule,
+            QStringLiteral("must begin with %1")
+                .arg(quoted(scheme == imageScheme ? QStringLiteral("image://PROVIDER/")
+                                                  : QStringLiteral("file:///"))));
+        return;
+    }
+    const QString path = scheme.isEmpty() ? location : url.toLocalFile();
+    if (!context->isInstalled || !path.startsWith(QLatin1Char('/'))) {
+        return;
+    }
+    QFileInfo file(context->root + path);
+    if (file.isSymLink() && !file.exists()) {
+        // The target of an absolute link is below the root, too.
+        file.setFile(context->root + file.symLinkTarget());
+    }
+    if (!file.exists()) {
+        add(Severity::Warning, missingFileRule, QStringLiteral("does not exist"));
+    } else if (file.isDir()) {
+        add(Severity::Warning, missingFileRule, QStringLiteral("is a directory"));
+    } else if (!file.permission(QFile::ReadOther)) {
+        add(Severity::Error, permissionsRule,
+            QStringLiteral("is a file that not every user can read"));
+    }
+}
+
+void checkIcon(const QString &icon, int line, CheckContext *context, Findings *findings)
+{
+    static const QStringList schemes = {imageScheme,
+                                        fileScheme,
+                                        QStringLiteral("qrc"),
+                                        QStringLiteral("data"),
+                                        QStringLiteral("http"),
+                                        QStringLiteral("https")};
     static const QRegularExpression path(QStringLiteral("/|\\.(png|svg|svgz|jpg|jpeg|webp|gif)$"),
                                          QRegularExpression::CaseInsensitiveOption);
-    if (!anywhere.match(icon).hasMatch() && path.match(icon).hasMatch()) {
+    if (icon.startsWith(QLatin1Char('/')) || !schemeOf(icon).isEmpty()) {
+        checkLocation(QStringLiteral("icon"), icon, schemes, line, context, findings);
+    } else if (path.match(icon).hasMatch()) {
         findings->add(line, Severity::Warning, relativePathRule,
                       QStringLiteral("the icon %1 is a relative path").arg(quoted(icon)));
     }

@@ -22,11 +22,21 @@ void reportUnknownKey(const QString &what, const QString &name, const QStringLis
 // Warns of a catalog that is not installed, that lacks engineering English, or whose name is wrong.
 void checkCatalog(const QString &catalog, int line, CheckContext *context, Findings *findings);
 
-// Warns of a text that the catalog does not hold. Without an identifier or a catalog, does nothing.
-void checkTextId(const QString &id, const QString &catalog, int line, CheckContext *context,
-                 Findings *findings);
+struct TextId {
+    QString id; // May be empty.
+    int line;
+};
 
-// Warns of an icon that is a relative path, and not a name or a URL.
-void checkIcon(const QString &icon, int line, Findings *findings);
+// Warns of texts that the catalog does not hold. Names, in the line of the catalog, the texts that a
+// language lacks.
+void checkTextIds(const std::vector<TextId> &ids, const QString &catalog, int line,
+                  CheckContext *context, Findings *findings);
+
+// Warns of an absolute path or URL that leads nowhere.
+void checkLocation(const QString &what, const QString &location, const QStringList &schemes,
+                   int line, CheckContext *context, Findings *findings);
+
+// Warns of an icon that is a relative path, or an absolute path or URL that leads nowhere.
+void checkIcon(const QString &icon, int line, CheckContext *context, Findings *findings);
 
 #endif

@@ -8,9 +8,13 @@
 #include "quickactioncheck.h"
 
 #include <QDir>
+#include <QDirIterator>
 #include <QFileInfo>
 
-DefinitionsChecker::DefinitionsChecker(const QString &root) : m_root(root), m_context(root)
+#include <algorithm>
+#include <iterator>
+
+DefinitionsChecker::DefinitionsChecker(const QString &root) : m_context(root)
 {
 }
 
@@ -30,9 +34,38 @@ bool DefinitionsChecker::check(const QString &path)
 bool DefinitionsChecker::checkInstalled()
 {
     using namespace DefinitionFiles;
-    const bool hasQuickActions = checkDirectory(QDir::cleanPath(m_root + quickActionsDirectory));
-    const bool hasEventsWidgets = checkDirectory(QDir::cleanPath(m_root + eventsWidgetsDirectory));
+    m_context.isInstalled = true;
+    const bool hasQuickActions = checkInstalledDirectory(quickActionsDirectory, isQuickAction);
+    const bool hasEventsWidgets = checkInstalledDirectory(eventsWidgetsDirectory, isEventsWidgets);
+    m_context.isInstalled = false;
     return hasQuickActions || hasEventsWidgets;
+}
+
+bool DefinitionsChecker::checkInstalledDirectory(QLatin1String directory,
+                                                 bool (*isDefinition)(const QString &))
+{
+    const QString path = QDir::cleanPath(m_context.root + directory);
+    QStringList misplaced;
+    QDirIterator files(path, QDir::Files, QDirIterator::Subdirectories);
+    while (files.hasNext()) {
+        const QString file = files.next();
+        const bool isRead = files.fileInfo().path() == path && isDefinition(file);
+        if (!isRead
+            && (DefinitionFiles::isQuickAction(file) || DefinitionFiles::isEventsWidgets(file))) {
+            misplaced.append(file);
+        }
+    }
+    misplaced.sort();
+    for (const QString &file : qAsConst(misplaced)) {
+        Findings findings(file);
+        findings.add(1, Finding::Severity::Error, QLatin1String("place"),
+                     QStringLiteral("no model reads the file here; *.conf belongs in %1, *.json in "
+                                    "%2, and neither in a directory below")
+                         .arg(DefinitionFiles::quickActionsDirectory,
+                              DefinitionFiles::eventsWidgetsDirectory));
+        addFindings(findings.take());
+    }
+    return checkDirectory(path);
 }
 
 bool DefinitionsChecker::checkDirectory(const QString &path)
@@ -58,6 +91,10 @@ void DefinitionsChecker::checkFile(const QString &path)
     m_checked.insert(canonicalPath);
 
     Findings findings(path);
+    if (m_context.isInstalled && !QFileInfo(path).permission(QFile::ReadOther)) {
+        findings.add(1, Finding::Severity::Error, QLatin1String("permissions"),
+                     QStringLiteral("not every user can read this file"));
+    }
     if (DefinitionFiles::isQuickAction(path)) {
         checkQuickAction(path, &m_context, &findings);
     } else if (DefinitionFiles::isEventsWidgets(path)) {
@@ -67,6 +104,11 @@ void DefinitionsChecker::checkFile(const QString &path)
                      QStringLiteral("the name ends neither in \".conf\" nor in \".json\": no model "
                                     "reads the file"));
     }
-    const std::vector<Finding> found = findings.take();
-    m_findings.insert(m_findings.end(), found.cbegin(), found.cend());
+    addFindings(findings.take());
+    addFindings(m_context.catalogs.takeFindings());
+}
+
+void DefinitionsChecker::addFindings(std::vector<Finding> findings)
+{
+    std::move(findings.begin(), findings.end(), std::back_inserter(m_findings));
 }

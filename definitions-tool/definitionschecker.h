@@ -10,6 +10,8 @@
 #include <QHash>
 #include <QSet>
 
+#include <utility>
+
 /*
     State that the checks of all files share.
 */
@@ -19,11 +21,15 @@ struct CheckContext {
         int line;
     };
 
-    explicit CheckContext(const QString &root) : catalogs(root) { }
+    explicit CheckContext(QString directory) : root(std::move(directory)), catalogs(root) { }
 
+    const QString root;
     InstalledCatalogs catalogs;
     // Whether the checks ignore which catalogs are installed.
     bool ignoresCatalogs = false;
+    // Whether the definitions are installed below the root, so that the files that they name must
+    // be there.
+    bool isInstalled = false;
     // The widgets of the files checked so far.
     QHash<QString, Place> widgets;
 };
@@ -52,9 +58,10 @@ public:
 
 private:
     bool checkDirectory(const QString &path);
+    bool checkInstalledDirectory(QLatin1String directory, bool (*isDefinition)(const QString &));
     void checkFile(const QString &path);
+    void addFindings(std::vector<Finding> findings);
 
-    QString m_root;
     CheckContext m_context;
     QSet<QString> m_checked;
     std::vector<Finding> m_findings;

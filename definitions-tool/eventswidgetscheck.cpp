@@ -34,6 +34,7 @@ const QLatin1String pathRule("path");
 const QLatin1String orderRule("order");
 const QLatin1String duplicatePathRule("duplicate-path");
 const QLatin1String relativePathRule("relative-path");
+const QLatin1String remoteUrlRule("remote-url");
 const QLatin1String titleRule("title");
 const QLatin1String catalogRule("catalog");
 
@@ -136,6 +137,7 @@ private:
     Members<count> checkMembers(const std::array<Key, count> &keys, int position);
     void checkEntry(int position);
     void checkWidget(const Widget &widget, const Members<WidgetKeyCount> &members, int line);
+    void checkPath(const QString &path, int line);
     void checkTexts(const Widget &widget, const Members<WidgetKeyCount> &members);
     int lineOf(int position);
     void add(int line, Severity severity, QLatin1String rule, const QString &text)
@@ -150,6 +152,8 @@ private:
     Findings *const m_findings;
     // The index of the next widget that the reader found.
     size_t m_next = 0;
+    // Of the widgets.
+    std::vector<TextId> m_textIds;
     // Lines are counted from the last position that was requested.
     int m_counted = 0;
     int m_line = 1;
@@ -159,7 +163,8 @@ void EventsWidgetsCheck::check()
 {
     const int start = m_content.indexOf('{');
     const auto members = checkMembers(fileKeys, start);
-    checkCatalog(m_file.translationCatalog, members[CatalogKey].line, m_context, m_findings);
+    const int catalogLine = members[CatalogKey].line;
+    checkCatalog(m_file.translationCatalog, catalogLine, m_context, m_findings);
     const Member &widgets = members[WidgetsKey];
     if (widgets.line == 0) {
         add(lineOf(start), Severity::Error, noWidgetRule,
@@ -176,6 +181,7 @@ void EventsWidgetsCheck::check()
                 QStringLiteral("\"widgets\" is empty: no widget is listed"));
         }
     }
+    checkTextIds(m_textIds, m_file.translationCatalog, catalogLine, m_context, m_findings);
 }
 
 template<size_t count>
@@ -248,11 +254,7 @@ void EventsWidgetsCheck::checkWidget(const Widget &widget, const Members<WidgetK
             QStringLiteral("the path %1 is also in %2:%3; only one of the two widgets is listed")
                 .arg(quoted(widget.path), known->file, QString::number(known->line)));
     }
-    static const QRegularExpression absolute(QStringLiteral("^(/|[a-zA-Z][a-zA-Z0-9+.-]*:)"));
-    if (!absolute.match(widget.path).hasMatch()) {
-        add(members[PathKey].line, Severity::Warning, relativePathRule,
-            QStringLiteral("the path %1 is a relative path").arg(quoted(widget.path)));
-    }
+    checkPath(widget.path, members[PathKey].line);
     if (members[OrderKey].line == 0) {
         add(line, Severity::Warning, orderRule,
             QStringLiteral("without \"order\" the widget comes last"));
@@ -265,7 +267,7 @@ void EventsWidgetsCheck::checkWidget(const Widget &widget, const Members<WidgetK
             QStringLiteral("without \"title\" and \"translation_id\" the widget has no title"));
     }
     checkTexts(widget, members);
-    checkIcon(widget.icon, members[IconKey].line, m_findings);
+    checkIcon(widget.icon, members[IconKey].line, m_context, m_findings);
     if (!widget.availablePath.isEmpty() && !widget.availablePath.startsWith(QLatin1Char('/'))) {
         add(members[AvailablePathKey].line, Severity::Warning, relativePathRule,
             QStringLiteral("the available path %1 is a relative path")
@@ -273,13 +275,29 @@ void EventsWidgetsCheck::checkWidget(const Widget &widget, const Members<WidgetK
     }
 }
 
+void EventsWidgetsCheck::checkPath(const QString &path, int line)
+{
+    static const QRegularExpression absolute(QStringLiteral("^(/|[a-zA-Z][a-zA-Z0-9+.-]*:)"));
+    static const QRegularExpression remote(QStringLiteral("^(https?|ftp):"),
+                                           QRegularExpression::CaseInsensitiveOption);
+    if (!absolute.match(path).hasMatch()) {
+        add(line, Severity::Warning, relativePathRule,
+            QStringLiteral("the path %1 is a relative path").arg(quoted(path)));
+    } else if (remote.match(path).hasMatch()) {
+        add(line, Severity::Warning, remoteUrlRule,
+            QStringLiteral("the path %1 makes the home screen run code from the network")
+                .arg(quoted(path)));
+    } else {
+        checkLocation(QStringLiteral("path"), path, {QStringLiteral("file"), QStringLiteral("qrc")},
+                      line, m_context, m_findings);
+    }
+}
+
 // The title and the description.
 void EventsWidgetsCheck::checkTexts(const Widget &widget, const Members<WidgetKeyCount> &members)
 {
-    for (const auto &[id, key] : {std::pair(widget.translationId, TranslationIdKey),
-                                  std::pair(widget.descriptionId, DescriptionIdKey)}) {
-        checkTextId(id, widget.translationCatalog, members.at(key).line, m_context, m_findings);
-    }
+    m_textIds.push_back({widget.translationId, members[TranslationIdKey].line});
+    m_textIds.push_back({widget.descriptionId, members[DescriptionIdKey].line});
     if (widget.translationCatalog.isEmpty()) {
         for (const WidgetKey key : {TitleKey, TranslationIdKey, DescriptionIdKey}) {
             if (!members.at(key).value.toString().isEmpty()) {

@@ -6,41 +6,70 @@
 #include "translations/catalogfiles.h"
 
 #include <QDir>
+#include <QFileInfo>
+#include <QLocale>
 #include <QTranslator>
 
 #include <algorithm>
+#include <utility>
+
+using Severity = Finding::Severity;
 
 namespace {
 
 const QLatin1String suffix(".qm");
 
+// The names of a locale with which Qt looks for its catalogs.
+QStringList localeNames(const QLocale &locale)
+{
+    QStringList names;
+    const QStringList languages = locale.uiLanguages();
+    for (QString name : languages) {
+        name.replace(QLatin1Char('-'), QLatin1Char('_'));
+        for (; !name.isEmpty(); name.truncate(qMax(0, name.lastIndexOf(QLatin1Char('_'))))) {
+            names += {name, name.toLower()};
+        }
+    }
+    return names;
+}
+
+// If a file name differs only a little from that of a file of the catalog, returns the right name.
+QString similarName(const QString &fileName, const QString &catalog)
+{
+    const QString end = fileName.mid(catalog.size()).chopped(suffix.size());
+    if (end.isEmpty() || !QStringLiteral("-_.").contains(end.at(0))) {
+        return {};
+    }
+    const QString name = end.mid(1).replace(QLatin1Char('-'), QLatin1Char('_'));
+    if (name.compare(CatalogFiles::engineeringEnglishSuffix.mid(1), Qt::CaseInsensitive) == 0) {
+        return catalog + CatalogFiles::engineeringEnglishSuffix + suffix;
+    }
+    const QLocale locale(name);
+    if (locale.language() == QLocale::C || name.endsWith(CatalogFiles::engineeringEnglishSuffix)) {
+        return {};
+    }
+    const QStringList names = localeNames(locale);
+    return catalog + CatalogFiles::localePrefix + (names.contains(name) ? name : names.constFirst())
+        + suffix;
+}
+
 } // namespace
+
+QString InstalledCatalogs::Language::text(const QString &id) const
+{
+    return translator->translate(nullptr, id.toUtf8().constData());
+}
+
+bool InstalledCatalogs::Catalog::holds(const QString &id) const
+{
+    return std::any_of(languages.cbegin(), languages.cend(),
+                       [&id](const Language &language) { return !language.text(id).isNull(); });
+}
 
 InstalledCatalogs::InstalledCatalogs(const QString &root)
     : m_directory(QDir::cleanPath(root + CatalogFiles::directory))
 {
     m_fileNames = QDir(m_directory).entryList(QDir::Files);
-}
-
-InstalledCatalogs::~InstalledCatalogs() = default;
-
-bool InstalledCatalogs::hasEngineeringEnglish(const QString &catalog)
-{
-    return find(catalog).hasEngineeringEnglish;
-}
-
-QStringList InstalledCatalogs::languages(const QString &catalog)
-{
-    return find(catalog).languages;
-}
-
-bool InstalledCatalogs::holds(const QString &catalog, const QString &id)
-{
-    const auto &translators = find(catalog).translators;
-    const QByteArray key = id.toUtf8();
-    return std::any_of(translators.cbegin(), translators.cend(), [&key](const auto &translator) {
-        return !translator->translate(nullptr, key.constData()).isNull();
-    });
 }
 
 const InstalledCatalogs::Catalog &InstalledCatalogs::find(const QString &catalog)
@@ -51,23 +80,51 @@ const InstalledCatalogs::Catalog &InstalledCatalogs::find(const QString &catalog
     }
     Catalog found;
     // Loaded as the models load it: Qt also accepts files with shorter names.
-    found.hasEngineeringEnglish = load(&found, catalog + CatalogFiles::engineeringEnglishSuffix);
-    const QString prefix = catalog + CatalogFiles::localePrefix;
+    const QString engineeringEnglish = catalog + CatalogFiles::engineeringEnglishSuffix;
+    addLanguage(&found, {}, engineeringEnglish);
+    found.hasEngineeringEnglish = found.isInstalled();
     for (const QString &fileName : qAsConst(m_fileNames)) {
-        if (fileName.startsWith(prefix) && fileName.endsWith(suffix) && load(&found, fileName)) {
-            found.languages.append(
-                fileName.mid(prefix.size(), fileName.size() - prefix.size() - suffix.size()));
+        if (!fileName.startsWith(catalog, Qt::CaseInsensitive)
+            || !fileName.endsWith(suffix, Qt::CaseInsensitive)) {
+            continue;
+        }
+        const QString rightName = similarName(fileName, catalog);
+        if (fileName == rightName) {
+            if (!QFileInfo(m_directory, fileName).permission(QFile::ReadOther)) {
+                addFinding(fileName, Severity::Error, "permissions",
+                           QStringLiteral("not every user can read this file"));
+            }
+            if (fileName != engineeringEnglish + suffix) {
+                const int start = catalog.size() + CatalogFiles::localePrefix.size();
+                addLanguage(&found, fileName.mid(start).chopped(suffix.size()), fileName);
+            }
+        } else if (!rightName.isEmpty()) {
+            addFinding(fileName, Severity::Warning, "catalog",
+                       QStringLiteral("no model loads a file of this name; is %1 meant?")
+                           .arg(quoted(rightName)));
         }
     }
     return *m_catalogs.insert(catalog, found);
 }
 
-bool InstalledCatalogs::load(Catalog *catalog, const QString &fileName) const
+std::vector<Finding> InstalledCatalogs::takeFindings()
+{
+    return std::exchange(m_findings, {});
+}
+
+void InstalledCatalogs::addLanguage(Catalog *catalog, const QString &name, const QString &fileName)
 {
     auto translator = std::make_shared<QTranslator>();
-    if (!translator->load(fileName, m_directory)) {
-        return false;
+    if (translator->load(fileName, m_directory)) {
+        const QString found = QFileInfo(translator->filePath()).fileName();
+        catalog->languages.push_back({name, found, std::move(translator)});
     }
-    catalog->translators.push_back(std::move(translator));
-    return true;
+}
+
+void InstalledCatalogs::addFinding(const QString &fileName, Severity severity, const char *rule,
+                                   const QString &text)
+{
+    Findings findings(m_directory + QLatin1Char('/') + fileName);
+    findings.add(1, severity, QLatin1String(rule), text);
+    m_findings.push_back(findings.take().front());
 }

@@ -4,6 +4,8 @@
 #ifndef INSTALLEDCATALOGS_H
 #define INSTALLEDCATALOGS_H
 
+#include "finding.h"
+
 #include <QHash>
 #include <QString>
 #include <QStringList>
@@ -19,32 +21,41 @@ class QTranslator;
 class InstalledCatalogs
 {
 public:
-    // Finds the catalogs below a root directory.
-    explicit InstalledCatalogs(const QString &root);
-    ~InstalledCatalogs();
-    Q_DISABLE_COPY_MOVE(InstalledCatalogs)
+    struct Language {
+        QString name; // As in file names: "fi" or "pt_BR".
+        QString fileName;
+        std::shared_ptr<QTranslator> translator;
 
-    QString directory() const { return m_directory; }
-
-    bool hasEngineeringEnglish(const QString &catalog);
-    // As in file names: "fi" or "pt_BR".
-    QStringList languages(const QString &catalog);
-    // Whether the catalog has a text for the identifier in any language.
-    bool holds(const QString &catalog, const QString &id);
-
-private:
-    struct Catalog {
-        bool hasEngineeringEnglish = false;
-        QStringList languages;
-        std::vector<std::shared_ptr<QTranslator>> translators;
+        QString text(const QString &id) const;
     };
 
+    struct Catalog {
+        bool hasEngineeringEnglish = false;
+        // Engineering English comes first, and has no name.
+        std::vector<Language> languages;
+
+        bool isInstalled() const { return !languages.empty(); }
+        // Whether the catalog has a text for the identifier in any language.
+        bool holds(const QString &id) const;
+    };
+
+    // Finds the catalogs below a root directory.
+    explicit InstalledCatalogs(const QString &root);
+
+    QString directory() const { return m_directory; }
     const Catalog &find(const QString &catalog);
-    bool load(Catalog *catalog, const QString &fileName) const;
+    // The findings about the files of the catalogs that were found since the last call.
+    std::vector<Finding> takeFindings();
+
+private:
+    void addLanguage(Catalog *catalog, const QString &name, const QString &fileName);
+    void addFinding(const QString &fileName, Finding::Severity severity, const char *rule,
+                    const QString &text);
 
     QString m_directory;
     QStringList m_fileNames;
     QHash<QString, Catalog> m_catalogs;
+    std::vector<Finding> m_findings;
 };
 
 #endif

@@ -120,9 +120,11 @@ QString listCatalogs()
         text += QStringLiteral("%1\n  engineering English: %2\n  current locale, %3: %4\n")
                     .arg(catalog, fileOf(engineeringEnglish), QLocale().name(),
                          fileFor(QLocale(), catalog));
-        const QStringList languages = installed.languages(catalog);
-        for (const QString &language : languages) {
-            text += QStringLiteral("  %1: %2\n").arg(language, fileFor(QLocale(language), catalog));
+        for (const InstalledCatalogs::Language &language : installed.find(catalog).languages) {
+            if (!language.name.isEmpty()) {
+                text += QStringLiteral("  %1: %2\n")
+                            .arg(language.name, fileFor(QLocale(language.name), catalog));
+            }
         }
     }
     return text;

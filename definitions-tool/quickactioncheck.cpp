@@ -33,9 +33,12 @@ const QLatin1String priorityRule("priority");
 const QLatin1String titleRule("title");
 const QLatin1String catalogRule("catalog");
 const QLatin1String argumentTypeRule("argument-type");
+const QLatin1String packageRule("package");
+const QLatin1String systemServiceRule("system-service");
 
 const QString catalogKey = QStringLiteral("translation-catalog");
 const QString iconKey = QStringLiteral("icon");
+const QString packageKey = QStringLiteral("requires-package");
 const QString priorityKey = QStringLiteral("priority");
 const QString titleKey = QStringLiteral("title");
 const QString serviceKey = QStringLiteral("remote-service");
@@ -48,7 +51,7 @@ const QString sizeKey = QStringLiteral("remote-arguments/size");
 const QStringList &knownKeys()
 {
     static const QStringList keys = {
-        titleKey,   catalogKey, iconKey,      priorityKey, QStringLiteral("requires-package"),
+        titleKey,   catalogKey, iconKey,      priorityKey, packageKey,
         serviceKey, pathKey,    interfaceKey, methodKey,
     };
     return keys;
@@ -251,8 +254,15 @@ void QuickActionCheck::checkTexts()
                            "catalogs that happen to be loaded"));
     }
     checkCatalog(catalog, lineOf(catalogKey), m_context, m_findings);
-    checkTextId(title, catalog, lineOf(titleKey), m_context, m_findings);
-    checkIcon(m_action.icon().toString(), lineOf(iconKey), m_findings);
+    checkTextIds({{title, lineOf(titleKey)}}, catalog, lineOf(catalogKey), m_context, m_findings);
+    checkIcon(m_action.icon().toString(), lineOf(iconKey), m_context, m_findings);
+    static const QRegularExpression package(
+        QRegularExpression::anchoredPattern(QStringLiteral("[\\w.+-]*")));
+    if (!package.match(m_action.requiredPackage()).hasMatch()) {
+        add(lineOf(packageKey), Severity::Warning, packageRule,
+            QStringLiteral("%1 is not the name of a package; write it without a version")
+                .arg(quoted(m_action.requiredPackage())));
+    }
 }
 
 void QuickActionCheck::checkText(const QString &key, const QVariant &value)
@@ -362,6 +372,12 @@ void QuickActionCheck::checkCall()
                     : QStringLiteral("the call cannot be sent: %1 is not a valid %2")
                           .arg(quoted(value), name.what));
         }
+    }
+    if (m_action.service().startsWith(QLatin1String("org.freedesktop."))) {
+        add(lineOf(serviceKey), Severity::Warning, systemServiceRule,
+            QStringLiteral("the service %1 belongs to the system, and executes the call with the "
+                           "rights of the user")
+                .arg(quoted(m_action.service())));
     }
     const QDBusError error = m_action.whyUnsendable();
     if (isSendable && error.isValid()) {

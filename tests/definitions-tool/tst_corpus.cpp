@@ -17,6 +17,7 @@
 #include <QJsonArray>
 #include <QJsonDocument>
 #include <QJsonObject>
+#include <QProcess>
 #include <QRegularExpression>
 #include <QTemporaryDir>
 #include <QtTest>
@@ -34,6 +35,7 @@ private Q_SLOTS:
 
     void findings_data();
     void findings();
+    void findingsOfATree();
     void agreesOnQuickActions_data();
     void agreesOnQuickActions();
     void agreesOnEventsWidgets_data();
@@ -253,6 +255,36 @@ void TestCorpus::findings()
     QCOMPARE(name.startsWith(QStringLiteral("warn")),
              !found.contains(QStringLiteral(": error: "))
                  && found.contains(QStringLiteral(": warning: ")));
+}
+
+void TestCorpus::findingsOfATree()
+{
+    const QTemporaryDir directory;
+    QVERIFY(QDir::setCurrent(directory.path()));
+    QCOMPARE(QProcess::execute(
+                 QStringLiteral("cp"),
+                 {QStringLiteral("-r"), QStringLiteral(CORPUS_DIR "/tree"), QStringLiteral(".")}),
+             0);
+    const QDir catalogs(QStringLiteral(CATALOGS_OF_TREE));
+    const QString share = QStringLiteral("tree/usr/share/");
+    for (const QString &name : catalogs.entryList({QStringLiteral("*.qm")})) {
+        QVERIFY(
+            QFile::copy(catalogs.filePath(name), share + QStringLiteral("translations/") + name));
+    }
+    // Git does not store these permissions.
+    for (const QString &name :
+         words("glimmera/quickactions/private.conf glimmera/eventswidgets/private.json "
+               "kettle/Private.qml translations/kettle-nl.qm")) {
+        QVERIFY(QFile::setPermissions(share + name, QFile::ReadOwner | QFile::WriteOwner));
+    }
+
+    DefinitionsChecker checker(QStringLiteral("tree"));
+    QVERIFY(checker.checkInstalled());
+    QString found;
+    for (const Finding &finding : checker.findings()) {
+        found += toText(finding) + QLatin1Char('\n');
+    }
+    QCOMPARE(found, QString::fromUtf8(read(QStringLiteral(CORPUS_DIR "/tree.findings"))));
 }
 
 void TestCorpus::agreesOnQuickActions_data()

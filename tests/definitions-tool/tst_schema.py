@@ -14,7 +14,7 @@ import sys
 import jsonschema
 
 # The rules that a schema cannot express: duplicates, and the contents of other files.
-BEYOND = re.compile(r"\[(repeated-key|duplicate-path|text-id)\]$| is not installed in ")
+BEYOND = re.compile(r"\[(repeated-key|duplicate-path|text-id|translation)\]$| is not installed in ")
 
 schema = json.loads(pathlib.Path(sys.argv[1]).read_text())
 jsonschema.Draft7Validator.check_schema(schema)

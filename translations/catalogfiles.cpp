@@ -9,7 +9,7 @@
 
 namespace {
 
-const QLatin1String fileSuffix(".qm");
+constexpr QLatin1String fileSuffix = ".qm"_L1;
 
 bool isReadableFile(const QString &path)
 {

@@ -4,7 +4,8 @@
 #ifndef CATALOGFILES_H
 #define CATALOGFILES_H
 
-#include <QLatin1String>
+#include "files/literals.h"
+
 #include <QString>
 
 class QLocale;
@@ -13,18 +14,19 @@ class QLocale;
 // maps_eng_en.qm for engineering English, and a file such as maps-fi.qm for each language.
 namespace CatalogFiles {
 
-constexpr QLatin1String directory("/usr/share/translations");
-constexpr QLatin1String engineeringEnglishSuffix("_eng_en");
-constexpr QLatin1String localePrefix("-");
+constexpr QLatin1String directory = "/usr/share/translations"_L1;
+constexpr QLatin1String engineeringEnglishSuffix = "_eng_en"_L1;
+constexpr QLatin1String localePrefix = "-"_L1;
 
 // Whether the name keeps the files of the catalog inside the directory.
 bool isCatalogName(const QString &name);
 
 // These return the path of the file that QTranslator::load() would choose, and an empty string if
 // there is none. QTranslator would also parse the file, and thereby trust it.
-QString findEngineeringEnglish(const QString &catalog, const QString &directory = directory);
+QString findEngineeringEnglish(const QString &catalog,
+                               const QString &directory = CatalogFiles::directory);
 QString findLanguage(const QString &catalog, const QLocale &locale,
-                     const QString &directory = directory);
+                     const QString &directory = CatalogFiles::directory);
 
 } // namespace CatalogFiles
 

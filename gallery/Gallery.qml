@@ -116,7 +116,6 @@ ApplicationWindow {
         LogPane {
             id: log
             Layout.fillWidth: true
-            open: window.width >= 900 && Messages.count > 0
         }
     }
 

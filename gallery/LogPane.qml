@@ -51,10 +51,9 @@ Rectangle {
                         // The URL of the file would take all the room.
                         text: Messages.latest.replace(/^file:\S+ /, "")
                         textFormat: Text.PlainText
-                        color: "#ffd180"
+                        color: "#cfd8dc"
                         font.pixelSize: 13
-                        // The name of the error is at the end.
-                        elide: Text.ElideMiddle
+                        elide: Text.ElideRight
                         maximumLineCount: 1
                     }
                 }
@@ -91,7 +90,7 @@ Rectangle {
                 rightPadding: 10
                 text: model.text
                 textFormat: Text.PlainText
-                color: "#ffd180"
+                color: "#cfd8dc"
                 font.pixelSize: 12
                 wrapMode: Text.WrapAtWordBoundaryOrAnywhere
             }

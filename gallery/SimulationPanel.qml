@@ -32,14 +32,11 @@ Pane {
             font.weight: Font.Medium
             wrapMode: Text.Wrap
         }
-        Note {
-            text: qsTrId("gallery-simulation-note")
-        }
         ColumnLayout {
             id: column
             spacing: 8
         }
-        Button {
+        SimulationButton {
             text: qsTrId("gallery-simulation-reload")
             onClicked: pane.reloadRequested()
         }

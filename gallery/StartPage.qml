@@ -19,6 +19,12 @@ ScrollingPage {
     title: qsTrId("gallery-title")
     columns: Math.max(1, Math.floor(width / 320))
 
+    Note {
+        Layout.columnSpan: start.columns
+        Layout.margins: 8
+        text: qsTrId("gallery-simulation-note")
+    }
+
     Repeater {
         model: start.pages
 

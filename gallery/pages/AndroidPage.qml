@@ -17,7 +17,7 @@ GalleryPage {
         heading: qsTrId("gallery-android")
 
         Value {
-            name: qsTrId("gallery-android-folders")
+            name: qsTrId("gallery-android-directories")
             value: android.dataDirectoriesVisible ? qsTrId("gallery-android-shown")
                                                   : qsTrId("gallery-android-hidden")
         }

@@ -6,7 +6,8 @@ import com.marlo.settings.system 1.0
 import "controls"
 
 /*
-    The smart back cover, as the cover daemon reports it.
+    The smart back cover. Without an identifier, no cover is attached if the service that recognizes
+    covers is ready. Otherwise nothing is known.
 */
 GalleryPage {
     KivInfo {
@@ -14,15 +15,16 @@ GalleryPage {
     }
 
     Section {
-        heading: qsTrId("gallery-cover-info")
+        heading: qsTrId("gallery-cover")
 
         Value {
             name: qsTrId("gallery-cover-id")
-            value: cover.kivId || qsTrId("gallery-cover-none")
+            value: cover.kivId || (cover.kivReady ? qsTrId("gallery-cover-none") : qsTrId("gallery-unknown"))
         }
         Value {
-            name: qsTrId("gallery-cover-daemon")
-            value: cover.kivReady ? qsTrId("gallery-cover-ready") : qsTrId("gallery-cover-not-ready")
+            name: qsTrId("gallery-cover-recognition")
+            value: cover.kivReady ? qsTrId("gallery-cover-ready")
+                 : cover.kivId ? qsTrId("gallery-cover-not-ready") : qsTrId("gallery-unknown")
         }
     }
 }

@@ -70,13 +70,15 @@ GalleryPage {
             onToggled: location.customSettingsEnabled = checked
         }
         RowLayout {
-            Button {
+            spacing: 8
+
+            PushButton {
                 Layout.fillWidth: true
                 Layout.preferredWidth: 1
                 text: qsTrId("gallery-location-save")
                 onClicked: location.saveCustomSettings()
             }
-            Button {
+            PushButton {
                 Layout.fillWidth: true
                 Layout.preferredWidth: 1
                 text: qsTrId("gallery-location-restore")
@@ -94,8 +96,9 @@ GalleryPage {
         Paragraph {
             text: mlsTerms
         }
-        Button {
-            visible: mlsTerms !== noTerms
+        PushButton {
+            visible: mlsAgreed || mlsTerms !== noTerms
+            highlighted: !mlsAgreed
             text: mlsAgreed ? qsTrId("gallery-location-withdraw") : qsTrId("gallery-location-agree")
             onClicked: location.mlsOnlineState = mlsAgreed ? LocationPage.OnlineState.NotAgreed
                                                            : LocationPage.OnlineState.Enabled
@@ -108,8 +111,9 @@ GalleryPage {
         Paragraph {
             text: hereTerms
         }
-        Button {
-            visible: hereTerms !== noTerms
+        PushButton {
+            visible: hereAgreed || hereTerms !== noTerms
+            highlighted: !hereAgreed
             text: hereAgreed ? qsTrId("gallery-location-withdraw") : qsTrId("gallery-location-agree")
             onClicked: location.hereState = hereAgreed ? LocationPage.OnlineState.NotAgreed
                                                        : LocationPage.OnlineState.Enabled

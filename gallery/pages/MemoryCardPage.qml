@@ -16,19 +16,38 @@ GalleryPage {
     // The kernel's name of the card. Empty without a card.
     property string cardName
     readonly property bool running: operation.active
+    // An application knows this of its package's dependencies. The formatter does not report why the
+    // helper program failed.
+    property bool helperInstalled: true
     property string fileSystem
-    property string note
-    property string problem
-    // How many steps the operation has when it succeeds.
-    property int stepCount
+    // The statuses of the operation in their order. The last one is Probing.
+    property var plan: []
+    property bool failed
+
+    function mount() {
+        run([MemoryCardFormatter.Mounting], card => card.mount());
+    }
+
+    function unmount() {
+        run([MemoryCardFormatter.Unmounting], card => card.unmount());
+    }
+
+    function format(type) {
+        run([MemoryCardFormatter.Unmounting, MemoryCardFormatter.Formatting,
+             MemoryCardFormatter.Mounting], card => card.format(type));
+    }
+
+    function removeAllFiles() {
+        run([MemoryCardFormatter.Mounting, MemoryCardFormatter.RemovingFiles],
+            card => card.removeAllFiles());
+    }
 
     // A formatter serves one operation. The operation starts when the path has been set, so the
     // formatter probes the card afterwards, and its status always changes to Idle or Error.
-    function run(count, start) {
-        note = "";
-        problem = "";
+    function run(statuses, start) {
+        failed = false;
         steps.clear();
-        stepCount = count + 1;
+        plan = statuses.concat(MemoryCardFormatter.Probing);
         operation.active = true;
         operation.item.devicePathChanged.connect(() => start(operation.item));
         operation.item.devicePath = "/dev/" + cardName;
@@ -38,15 +57,23 @@ GalleryPage {
         if (card.status === MemoryCardFormatter.Idle) {
             fileSystem = card.filesystemType;
         } else if (card.status === MemoryCardFormatter.Error) {
-            if (step() !== MemoryCardFormatter.Idle) {
+            // Nothing has changed if the first step failed.
+            if (steps.count > (failed ? 1 : 0)) {
                 fileSystem = "";
             }
-            problem = problem || causeText(step());
+            if (!failed) {
+                failWithoutCode();
+            }
         } else {
-            steps.append({ status: card.status });
+            addStep("");
             return;
         }
         operation.active = false;
+    }
+
+    // Adds the next step of the plan, with what there is to say about it.
+    function addStep(remark) {
+        steps.append({ status: plan[steps.count], remark: remark, failed: failed });
     }
 
     // The latest step. Idle until the disk service has answered the first request.
@@ -71,54 +98,60 @@ GalleryPage {
         }
     }
 
-    // For failures without a code: the step that was running has failed.
-    function causeText(step) {
-        switch (step) {
+    // The steps Unmounting and Mounting are done when they are listed. The others have begun.
+    function failWithoutCode() {
+        failed = true;
+        switch (step()) {
         case MemoryCardFormatter.Formatting:
-            return qsTrId("gallery-card-formatting-failed");
-        case MemoryCardFormatter.RemovingFiles:
-            return qsTrId("gallery-card-removing-failed");
-        case MemoryCardFormatter.Mounting:
-            return qsTrId("gallery-card-mounting-failed");
         case MemoryCardFormatter.Probing:
-            return qsTrId("gallery-card-probing-failed");
+            setRemark(helperInstalled ? "gallery-card-helper-failed" : "gallery-card-helper-missing");
+            break;
+        case MemoryCardFormatter.RemovingFiles:
+            setRemark("gallery-card-removing-failed");
+            break;
         default:
-            return qsTrId("gallery-card-no-answer");
+            addStep("gallery-card-no-answer");
         }
     }
 
+    function setRemark(remark) {
+        steps.set(steps.count - 1, { remark: remark, failed: true });
+    }
+
+    // These two do not stop the operation.
+    function forgives(error) {
+        return error === MemoryCardFormatter.ErrorAlreadyMounted
+            || error === MemoryCardFormatter.ErrorAlreadyUnmounting;
+    }
+
     function fail(error) {
+        failed = !forgives(error);
+        addStep(errorId(error));
+    }
+
+    function errorId(error) {
         switch (error) {
-        // These two do not stop the operation.
         case MemoryCardFormatter.ErrorAlreadyMounted:
-            note = qsTrId("gallery-card-already-mounted");
-            break;
+            return "gallery-card-already-mounted";
         case MemoryCardFormatter.ErrorAlreadyUnmounting:
-            note = qsTrId("gallery-card-already-unmounting");
-            break;
+            return "gallery-card-already-unmounting";
         case MemoryCardFormatter.ErrorDeviceBusy:
-            problem = qsTrId("gallery-card-device-busy");
-            break;
+            return "gallery-card-device-busy";
         case MemoryCardFormatter.ErrorNotMounted:
-            problem = qsTrId("gallery-card-not-mounted");
-            break;
+            return "gallery-card-not-mounted";
         case MemoryCardFormatter.ErrorMountedByOtherUser:
-            problem = qsTrId("gallery-card-other-user");
-            break;
+            return "gallery-card-other-user";
         case MemoryCardFormatter.ErrorNotAuthorized:
         case MemoryCardFormatter.ErrorNotAuthorizedCanObtain:
         case MemoryCardFormatter.ErrorNotAuthorizedDismissed:
         case MemoryCardFormatter.ErrorOptionNotPermitted:
-            problem = qsTrId("gallery-card-not-authorized");
-            break;
+            return "gallery-card-not-authorized";
         case MemoryCardFormatter.ErrorNotSupported:
-            problem = qsTrId("gallery-card-not-supported");
-            break;
+            return "gallery-card-not-supported";
         case MemoryCardFormatter.ErrorTimedout:
-            problem = qsTrId("gallery-card-timed-out");
-            break;
+            return "gallery-card-timed-out";
         default:
-            problem = qsTrId("gallery-card-failed");
+            return "gallery-card-failed";
         }
     }
 
@@ -127,7 +160,7 @@ GalleryPage {
         operation.active = false;
         fileSystem = "";
         if (cardName) {
-            run(0, card => {});
+            run([], card => {});
         }
     }
 
@@ -138,8 +171,8 @@ GalleryPage {
         sourceComponent: MemoryCardFormatter {
             deviceName: page.cardName
             onStatusChanged: page.follow(this)
-            onMountError: page.fail(error)
-            onUnmountError: page.fail(error)
+            onMountError: function(error) { page.fail(error); }
+            onUnmountError: function(error) { page.fail(error); }
         }
     }
 
@@ -161,7 +194,7 @@ GalleryPage {
         text: qsTrId("gallery-card-question-text").arg(type)
         yes: qsTrId("gallery-card-erase")
         no: qsTrId("gallery-card-cancel")
-        onAccepted: page.run(3, card => card.format(type))
+        onAccepted: page.format(type)
     }
 
     Question {
@@ -170,7 +203,7 @@ GalleryPage {
         text: qsTrId("gallery-card-empty-question-text")
         yes: qsTrId("gallery-card-remove")
         no: qsTrId("gallery-card-cancel")
-        onAccepted: page.run(2, card => card.removeAllFiles())
+        onAccepted: page.removeAllFiles()
     }
 
     Section {
@@ -184,7 +217,7 @@ GalleryPage {
             visible: page.cardName !== ""
             name: qsTrId("gallery-card-status")
             value: page.running ? stepText(step())
-                 : page.problem ? qsTrId("gallery-card-error") : qsTrId("gallery-card-idle")
+                 : page.failed ? qsTrId("gallery-card-error") : qsTrId("gallery-card-idle")
         }
         Value {
             visible: page.cardName !== ""
@@ -196,17 +229,18 @@ GalleryPage {
             spacing: 8
             enabled: page.cardName !== "" && !page.running
 
-            Button {
+            PushButton {
                 text: qsTrId("gallery-card-mount")
-                onClicked: page.run(1, card => card.mount())
+                onClicked: page.mount()
             }
-            Button {
+            PushButton {
                 text: qsTrId("gallery-card-unmount")
-                onClicked: page.run(1, card => card.unmount())
+                onClicked: page.unmount()
             }
             Repeater {
                 model: types.supportedFormatTypes
-                Button {
+                PushButton {
+                    tint: "#b00020"
                     text: qsTrId("gallery-card-format").arg(modelData)
                     onClicked: {
                         formatQuestion.type = modelData;
@@ -214,7 +248,8 @@ GalleryPage {
                     }
                 }
             }
-            Button {
+            PushButton {
+                tint: "#b00020"
                 text: qsTrId("gallery-card-empty")
                 onClicked: emptyQuestion.open()
             }
@@ -229,24 +264,17 @@ GalleryPage {
             model: steps
             Paragraph {
                 text: (index + 1) + ". " + stepText(model.status)
+                      + (model.remark ? ": " + qsTrId(model.remark) : "")
+                color: model.failed ? "#b00020" : "black"
             }
         }
         // Shows how many steps of the operation have begun.
         ProgressBar {
             Layout.fillWidth: true
             visible: page.running
-            to: page.stepCount
+            to: page.plan.length
             value: steps.count
             Accessible.name: qsTrId("gallery-card-progress")
-        }
-        Note {
-            visible: text !== ""
-            text: page.note
-        }
-        Paragraph {
-            visible: text !== ""
-            text: page.problem
-            color: "#b00020"
         }
     }
 }

@@ -27,7 +27,7 @@ GalleryPage {
                 model: actions
                 Tile {
                     text: Display.title(model.title, model.path)
-                    icon.source: Display.icon(model.icon)
+                    icon.source: Display.url(model.icon)
                     onClicked: actions.triggerAction(index)
                 }
             }

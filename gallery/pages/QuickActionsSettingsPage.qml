@@ -47,7 +47,7 @@ GalleryPage {
             TextSwitch {
                 text: Display.title(model.title, model.path)
                 description: model.title ? "" : qsTrId("gallery-untitled")
-                icon.source: Display.icon(model.icon)
+                icon.source: Display.url(model.icon)
                 // Needs "model.", because an item has a property `enabled` of its own.
                 checked: model.enabled
                 onToggled: {

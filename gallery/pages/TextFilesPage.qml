@@ -9,9 +9,12 @@ import "controls"
     A text file, and the files of a directory joined into one text.
 */
 GalleryPage {
-    readonly property string about: TextFileReader.readContent("/usr/share/marlo-settings/about.html")
+    // The languages of the sample files.
+    readonly property string language: Qt.locale().name.startsWith("fi") ? "fi" : "en"
+    readonly property string about: TextFileReader.readContent(
+        "/usr/share/marlo-settings/about-" + language + ".html")
     readonly property string licenses: TextFileReader.collate(
-        "file:///usr/share/marlo-settings/licenses", "\n\n",
+        "file:///usr/share/marlo-settings/licenses/" + language, "\n\n",
         qsTrId("gallery-text-files-prefix") + "\n\n")
 
     Section {
@@ -27,7 +30,7 @@ GalleryPage {
     }
 
     Section {
-        heading: qsTrId("gallery-text-files-folder")
+        heading: qsTrId("gallery-text-files-directory")
 
         Paragraph {
             text: licenses || qsTrId("gallery-text-files-none")

@@ -96,7 +96,7 @@ void Simulation::announceCover()
         return;
     }
     const QString id = m_cover == NoCover ? QString() : sampleCover;
-    const int ready = m_cover == CoverReady ? 1 : 0;
+    const int ready = m_cover == CoverStarting ? 0 : 1;
     m_coverDaemon->answer(coverIdProperty, {id});
     m_coverDaemon->answer(coverReadyProperty, {ready});
     m_coverDaemon->sendChanges({{coverIdProperty, id}, {coverReadyProperty, ready}});

@@ -2,14 +2,13 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 import QtQuick 2.15
-import QtQuick.Controls 2.15
 import QtQuick.Layouts 1.15
 import gallery.simulation 1.0
 import ".."
 import "../pages/controls"
 
 /*
-    The cover daemon on the system bus, and the cover that it sees.
+    The service on the system bus that recognizes covers, and the cover that it sees.
 */
 ColumnLayout {
     spacing: 8
@@ -21,10 +20,7 @@ ColumnLayout {
             { cover: Simulation.CoverStarting, text: qsTrId("gallery-cover-attached") },
             { cover: Simulation.CoverReady, text: qsTrId("gallery-cover-attached-ready") },
         ]
-        RadioDelegate {
-            Layout.fillWidth: true
-            focusPolicy: Qt.StrongFocus
-            horizontalPadding: 0
+        Choice {
             text: modelData.text
             checked: Simulation.cover === modelData.cover
             onToggled: Simulation.cover = modelData.cover

@@ -2,7 +2,6 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 import QtQuick 2.15
-import QtQuick.Controls 2.15
 import QtQuick.Layouts 1.15
 import gallery.simulation 1.0
 import ".."
@@ -21,6 +20,11 @@ ColumnLayout {
         property: "cardName"
         value: SimulatedCard.inserted ? SimulatedCard.name : ""
     }
+    Binding {
+        target: page
+        property: "helperInstalled"
+        value: helper.checked
+    }
 
     Paragraph {
         text: SimulatedCard.real ? qsTrId("gallery-card-real").arg(SimulatedCard.name)
@@ -31,7 +35,7 @@ ColumnLayout {
         text: SimulatedCard.mounted ? qsTrId("gallery-card-files").arg(SimulatedCard.fileCount)
                                  : qsTrId("gallery-card-is-unmounted")
     }
-    Button {
+    SimulationButton {
         text: qsTrId("gallery-card-fill")
         enabled: SimulatedCard.mounted
         onClicked: SimulatedCard.fill()
@@ -48,6 +52,7 @@ ColumnLayout {
         onToggled: SimulatedCard.inserted = checked
     }
     SimulatedFilesSwitch {
+        id: helper
         text: qsTrId("gallery-card-helper")
         path: "/usr/libexec/sdcardhelper"
     }
@@ -67,10 +72,7 @@ ColumnLayout {
             { service: SimulatedCard.Silent, text: qsTrId("gallery-card-service-silent") },
             { service: SimulatedCard.Absent, text: qsTrId("gallery-card-service-absent") },
         ]
-        RadioDelegate {
-            Layout.fillWidth: true
-            focusPolicy: Qt.StrongFocus
-            horizontalPadding: 0
+        Choice {
             text: modelData.text
             checked: SimulatedCard.diskService === modelData.service
             onToggled: SimulatedCard.diskService = modelData.service

@@ -14,10 +14,10 @@ ColumnLayout {
 
     SimulatedFilesSwitch {
         text: qsTrId("gallery-text-files-file-installed")
-        path: "/usr/share/marlo-settings/about.html"
+        path: "/usr/share/marlo-settings/about-*.html"
     }
     SimulatedFilesSwitch {
-        text: qsTrId("gallery-text-files-folder-installed")
+        text: qsTrId("gallery-text-files-directory-installed")
         path: "/usr/share/marlo-settings/licenses"
     }
     Note {

@@ -41,9 +41,9 @@ Gallery {
             pressing("gallery-sample-new-alarm"), pressing("maps-navigate-home"),
             () => ["camera", "torch", "alarms", "marlostore"]
                   .every(name => shows("com.marlo." + name))] },
-        { page: "quick-actions", state: "failing", steps: [
+        { page: "quick-actions", state: "failing", log: true, steps: [
             simulating("gallery-quick-actions-fail"), pressing("camera-take-photo"),
-            () => Messages.count > 0, () => logOpen = true] },
+            () => Messages.count > 0] },
         { page: "quick-actions", state: "none", steps: [
             simulating("gallery-quick-actions-installed"),
             showing("gallery-quick-actions-none")] },
@@ -84,9 +84,12 @@ Gallery {
         { page: "memory-card", state: "mounted", steps: [
             probed, pressing("gallery-card-mount"), () => SimulatedCard.mounted && succeeded(),
             pressing("gallery-card-fill")] },
+        { page: "memory-card", state: "mounted-again", steps: [
+            probed, pressing("gallery-card-mount"), () => succeeded() && shows("2. "
+                + qsTrId("gallery-card-probing"))] },
         { page: "memory-card", state: "in-use", steps: [
             probed, simulating("gallery-card-in-use"), pressing("gallery-card-unmount"),
-            showing("gallery-card-device-busy")] },
+            failing("unmounting", "device-busy")] },
         { page: "memory-card", state: "emptied", steps: [
             probed, pressing("gallery-card-empty"), pressing("gallery-card-remove"),
             () => SimulatedCard.fileCount === 0 && succeeded()] },
@@ -98,19 +101,19 @@ Gallery {
             probed, pressing("gallery-card-unmount"),
             () => !SimulatedCard.mounted && succeeded()] },
         { page: "memory-card", state: "not-mounted", steps: [
-            probed, pressing("gallery-card-unmount"), showing("gallery-card-not-mounted")] },
+            probed, pressing("gallery-card-unmount"), failing("unmounting", "not-mounted")] },
         { page: "memory-card", state: "forbidden", steps: [
             probed, pressing("gallery-card-service-forbids"), pressing("gallery-card-mount"),
-            showing("gallery-card-not-authorized")] },
+            failing("mounting", "not-authorized")] },
         { page: "memory-card", state: "silent", steps: [
             probed, pressing("gallery-card-service-silent"), pressing("gallery-card-mount"),
             showing("gallery-card-waiting")] },
         { page: "memory-card", state: "absent", steps: [
             probed, pressing("gallery-card-service-absent"), pressing("gallery-card-mount"),
-            showing("gallery-card-no-answer")] },
+            failing("mounting", "no-answer")] },
         { page: "memory-card", state: "without-helper", steps: [
             probed, simulating("gallery-card-helper"), reload,
-            showing("gallery-card-probing-failed")] },
+            failing("probing", "helper-missing")] },
         // The last state of the card: the helper program outlives the page, and meanwhile no other page
         // may mount the card.
         { page: "memory-card", state: "busy", moving: true, steps: [
@@ -136,7 +139,7 @@ Gallery {
             pressing("gallery-cover-attached-ready"),
             () => shows("MARLO-COVER-07") && shows(qsTrId("gallery-cover-ready"))] },
         { page: "cover", state: "absent", steps: [
-            pressing("gallery-cover-no-daemon"), reload, showing("gallery-cover-none")] },
+            pressing("gallery-cover-no-daemon"), reload, showing("gallery-unknown")] },
 
         { page: "bluetooth", steps: [notShowing("gallery-unknown")] },
         { page: "bluetooth", state: "unknown", steps: [
@@ -156,7 +159,7 @@ Gallery {
         { page: "text-files", steps: [notShowing("gallery-text-files-none")] },
         { page: "text-files", state: "none", steps: [
             simulating("gallery-text-files-file-installed"),
-            simulating("gallery-text-files-folder-installed"), reload,
+            simulating("gallery-text-files-directory-installed"), reload,
             showing("gallery-text-files-none")] },
     ]
 
@@ -213,6 +216,11 @@ Gallery {
 
     function simulating(id) {
         return () => simulate(qsTrId(id));
+    }
+
+    function failing(step, cause) {
+        return () => shows("1. " + qsTrId("gallery-card-" + step) + ": "
+                           + qsTrId("gallery-card-" + cause));
     }
 
     function reload() {
@@ -279,7 +287,7 @@ Gallery {
         Simulation.language = shown.language;
         width = shown.width;
         height = shown.height;
-        logOpen = Qt.binding(() => width >= 900 && Messages.count > 0);
+        logOpen = shots[shot].log === true;
         part = 0;
         grabbing = false;
         still.restart();

@@ -35,10 +35,10 @@ Gallery {
                 return;
             } else if (!gallery.mounted) {
                 gallery.mounted = true;
-                page.run(1, card => card.mount());
+                page.mount();
             } else {
                 waits.present = true;
-                page.run(3, card => card.format("ext4"));
+                page.format("ext4");
             }
         }
     }

@@ -382,10 +382,16 @@ TestCase {
         tap("Check what is available");
         see("Not available on this device");
 
+        // The widgets themselves are below the switches.
+        see("Lunch with Aino");
+        seeNot("6400 of 10000 steps");
+        seeNot("Aino turns 30 on Sunday.");
         seeSwitch("Birthdays", false);
         tap("Weather");
         seeSwitch("Weather", false);
         seeSwitch("Birthdays", true);
+        see("Aino turns 30 on Sunday.");
+        seeNot("4 °C");
         tap("Weather");
         seeSwitch("Weather", true);
 
@@ -394,6 +400,7 @@ TestCase {
         tap("A broken definition file is there");
         tap("Widgets are installed");
         see("No widget is installed.");
+        see("No widget is enabled and available.");
         seeNot("Weather");
         tap("Widgets are installed");
         see("Weather");
@@ -425,13 +432,13 @@ TestCase {
 
         tap("Mount");
         tryCompare(SimulatedCard, "mounted", true, patience);
-        see("The card is mounted. Files and folders at its top: " + SimulatedCard.fileCount);
+        see("The card is mounted. Files and directories at its top: " + SimulatedCard.fileCount);
         see("Ready");
         tap("Put files on the card");
         until(() => SimulatedCard.fileCount >= 2, "filled");
         tap("Mount");
-        see("Note: the card was already mounted.");
-        see("1. Detecting the file system");
+        see("1. Mounting: the card was already mounted");
+        see("2. Detecting the file system");
         see("Ready");
         expectMessages(["AlreadyMounted"]);
 
@@ -439,19 +446,22 @@ TestCase {
         const files = SimulatedCard.fileCount;
         tap("Remove all files");
         see("Remove all files?");
+        const cancel = findControl("Cancel");
+        // "No" comes first, and a thumb does not hit both.
+        until(() => findControl("Remove").mapToItem(cancel, 0, 0).x >= cancel.width + 8, "order");
         tap("Cancel");
         seeNot("Remove all files?");
         compare(SimulatedCard.fileCount, files);
         tap("Remove all files");
         tap("Remove");
         tryCompare(SimulatedCard, "fileCount", 0, patience);
-        see("1. Removing files");
+        see("2. Removing files");
         see("Ready");
         expectMessages(["AlreadyMounted"]);
 
         tap("A program has a file on it open");
         tap("Unmount");
-        see("The card is in use. Close what uses it, and try again.");
+        see("1. Unmounting: the card is in use. Close what uses it, and try again.");
         expectMessages(["DeviceBusy"]);
         tap("A program has a file on it open");
 
@@ -474,17 +484,20 @@ TestCase {
         tap("Format as ext4");
         tap("Erase");
         see("Failed");
+        see("1. Unmounting: the card is not mounted");
         expectMessages(["NotMounted"]);
 
         tap("Forbids everything");
         tap("Mount");
-        see("This is not allowed.");
+        see("1. Mounting: not allowed");
+        // Nothing has changed on the card.
+        see("ext4");
         expectMessages(["NotAuthorized"]);
         tap("Is not there");
         // The page also shows the second failure.
         for (let i = 0; i < 2; ++i) {
             tap("Mount");
-            see("The disk service is missing or gave no valid answer.");
+            see("1. Mounting: the disk service is missing or gave no valid answer");
             expectMessages(["ServiceUnknown"]);
         }
         tap("Does not answer");
@@ -502,7 +515,7 @@ TestCase {
 
         tap("The helper program is installed");
         tap("Open the page again");
-        see("The helper program could not detect a file system.");
+        see("1. Detecting the file system: the helper program is missing");
         see("Unknown");
         tap("The helper program is installed");
         tap("The card is inserted");
@@ -552,32 +565,41 @@ TestCase {
         tap("The terms of MLS are installed");
         tap("Open the page again");
         see("The terms of this service could not be found.");
-        compare(count("Withdraw consent"), 1);
         expectMessages(["No agreement found"]);
+        // Consent can be withdrawn without the terms, too.
+        compare(count("Withdraw consent"), 2);
+        tapItem(Screen.visibleItems(surface).find(item => item.text === "Withdraw consent"
+                                                          && typeof item.clicked === "function"));
+        until(() => count("Withdraw consent") === 1, "withdrawn");
+        compare(findControl("MLS online assistance").enabled, false);
+        until(() => !root.key("/settings/location/mls_online_state"), "stored");
         tap("The terms of MLS are installed");
         tap("Open the page again");
         seeNot("The terms of this service could not be found.");
+        see("I agree");
+        tap("Withdraw consent");
+        until(() => count("I agree") === 2, "both withdrawn");
+        compare(findControl("HERE positioning").enabled, false);
         seeSwitch("Use custom settings", true);
     }
 
     function test_cover() {
         openPage("cover");
-        see("No cover");
-        tap("A cover that is not ready");
+        see("None");
+        tap("A cover, while recognition is not ready");
         see("MARLO-COVER-07");
-        see("Not ready");
-        tap("A cover that is ready");
+        see("Not ready yet");
+        tap("A cover");
         see("Ready");
-        tap("No daemon");
+        tap("Nothing answers");
         tap("Open the page again");
-        see("No cover");
-        see("Not ready");
-        // A daemon that starts while the page is open.
-        tap("A cover that is ready");
+        until(() => count("Unknown") === 2, "unknown");
+        // The service starts while the page is open.
+        tap("A cover");
         see("MARLO-COVER-07");
         see("Ready");
-        tap("No cover attached");
-        see("No cover");
+        tap("No cover");
+        see("None");
     }
 
     function test_pagesShowWhatIsInstalled_data() {
@@ -589,7 +611,7 @@ TestCase {
             { tag: "modem", switches: ["The modem software is installed"], missing: "Unknown" },
             { tag: "terms", switches: ["The vendor has terms", "The platform has terms"],
               shown: "Platform terms of use", missing: "No terms", messages: ["unable to load"] },
-            { tag: "text-files", switches: ["The file is there", "The folder is there"],
+            { tag: "text-files", switches: ["The file is there", "The directory is there"],
               missing: "Nothing to read.", times: 2 },
         ];
     }

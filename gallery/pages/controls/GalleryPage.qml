@@ -8,7 +8,7 @@ import QtQuick.Layouts 1.15
     A page of the gallery: sections in one column, or in two if there is room.
 */
 GridLayout {
-    columns: width >= 640 ? 2 : 1
+    columns: width >= 640 && visibleChildren.length > 1 ? 2 : 1
     columnSpacing: 8
     rowSpacing: 8
 }

@@ -3,7 +3,6 @@
 
 import QtQuick 2.15
 import QtQuick.Controls 2.15
-import QtQuick.Controls.Universal 2.15
 
 /*
     Asks before something is done that cannot be undone.
@@ -31,20 +30,19 @@ Dialog {
         wrapMode: Text.Wrap
     }
     footer: DialogButtonBox {
-        Button {
+        spacing: 8
+        // The same order on every platform: "no" first.
+        buttonLayout: DialogButtonBox.GnomeLayout
+
+        PushButton {
             id: noButton
             DialogButtonBox.buttonRole: DialogButtonBox.RejectRole
-            Keys.onReturnPressed: clicked()
-            Keys.onEnterPressed: clicked()
         }
-        Button {
+        PushButton {
             id: yesButton
             DialogButtonBox.buttonRole: DialogButtonBox.AcceptRole
             highlighted: true
-            Universal.theme: Universal.Dark
-            Universal.accent: "#b00020"
-            Keys.onReturnPressed: clicked()
-            Keys.onEnterPressed: clicked()
+            tint: "#b00020"
         }
     }
 }

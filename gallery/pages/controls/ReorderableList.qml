@@ -43,7 +43,7 @@ ListView {
         rightPadding: buttons.width
         icon.width: 24
         icon.height: 24
-        icon.source: Display.icon(model.icon)
+        icon.source: Display.url(model.icon)
         text: Display.title(model.title, model.path)
         highlighted: handle.pressed
         Keys.onPressed: {

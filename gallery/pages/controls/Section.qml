@@ -7,22 +7,20 @@ import QtQuick.Controls.Universal 2.15
 import QtQuick.Layouts 1.15
 
 /*
-    A part of a page, under a title. All sections of a page have the same width, and on a wide
-    window not more than is easy to read.
+    A part of a page, under a title. All sections of a page have the same width, and sections in a row
+    the same height.
 */
 Pane {
     property alias heading: heading.text
     default property alias content: column.data
 
     Layout.fillWidth: true
+    Layout.fillHeight: true
     Layout.preferredWidth: 1
-    Layout.maximumWidth: parent.columns > 1 ? 520 : -1
-    Layout.alignment: Qt.AlignTop | Qt.AlignLeft
     padding: 12
     background: Card {}
 
     contentItem: ColumnLayout {
-        id: column
         spacing: 8
 
         Label {
@@ -31,6 +29,14 @@ Pane {
             color: Universal.accent
             font.weight: Font.Medium
             elide: Text.ElideRight
+        }
+        ColumnLayout {
+            id: column
+            spacing: 8
+        }
+        // Takes the rest of the height.
+        Item {
+            Layout.fillHeight: true
         }
     }
 }

@@ -4,8 +4,9 @@
 
 // How pages show the rows of the models.
 
-// The URL of an icon. A definition file names its icon by a path or by a URL such as image://theme/name.
-function icon(value) {
+// The URL of an icon or of a widget. A definition file has an absolute path, or for an icon a URL such
+// as image://theme/name.
+function url(value) {
     return /^\//.test(value) ? "file://" + encodeURI(value).replace(/[?#]/g, encodeURIComponent)
                              : value || "";
 }

@@ -19,5 +19,17 @@
         <source></source>
         <translation>Tämän viikon päivänsankarit</translation>
     </message>
+    <message id="calendar-agenda-dentist">
+        <source></source>
+        <translation>Hammaslääkäri</translation>
+    </message>
+    <message id="calendar-agenda-lunch">
+        <source></source>
+        <translation>Lounas Ainon kanssa</translation>
+    </message>
+    <message id="calendar-birthdays-sunday">
+        <source></source>
+        <translation>Aino täyttää sunnuntaina 30 vuotta.</translation>
+    </message>
 </context>
 </TS>

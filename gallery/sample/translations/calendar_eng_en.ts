@@ -19,5 +19,17 @@
         <source></source>
         <translation>Whom to congratulate this week</translation>
     </message>
+    <message id="calendar-agenda-dentist">
+        <source></source>
+        <translation>Dentist</translation>
+    </message>
+    <message id="calendar-agenda-lunch">
+        <source></source>
+        <translation>Lunch with Aino</translation>
+    </message>
+    <message id="calendar-birthdays-sunday">
+        <source></source>
+        <translation>Aino turns 30 on Sunday.</translation>
+    </message>
 </context>
 </TS>

@@ -19,5 +19,9 @@
         <source></source>
         <translation>Laitteen laskemat päivän askeleet</translation>
     </message>
+    <message id="outdoors-steps-done">
+        <source></source>
+        <translation>%1 / %2 askelta</translation>
+    </message>
 </context>
 </TS>

@@ -19,5 +19,9 @@
         <source></source>
         <translation>How far today has led, as counted by the device</translation>
     </message>
+    <message id="outdoors-steps-done">
+        <source></source>
+        <translation>%1 of %2 steps</translation>
+    </message>
 </context>
 </TS>

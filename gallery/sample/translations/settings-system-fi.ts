@@ -69,7 +69,7 @@
     </message>
     <message id="gallery-events-widgets-available">
         <source></source>
-        <translation>Tapahtumanäkymässä</translation>
+        <translation>Tarjolla olevat widgetit</translation>
     </message>
     <message id="gallery-events-widgets-unavailable">
         <source></source>
@@ -165,23 +165,23 @@
     </message>
     <message id="gallery-card-unmounting">
         <source></source>
-        <translation>Irrotetaan</translation>
+        <translation>Irrottaminen</translation>
     </message>
     <message id="gallery-card-formatting">
         <source></source>
-        <translation>Alustetaan</translation>
+        <translation>Alustaminen</translation>
     </message>
     <message id="gallery-card-removing-files">
         <source></source>
-        <translation>Poistetaan tiedostoja</translation>
+        <translation>Tiedostojen poistaminen</translation>
     </message>
     <message id="gallery-card-mounting">
         <source></source>
-        <translation>Liitetään</translation>
+        <translation>Liittäminen</translation>
     </message>
     <message id="gallery-card-probing">
         <source></source>
-        <translation>Tunnistetaan tiedostojärjestelmää</translation>
+        <translation>Tiedostojärjestelmän tunnistaminen</translation>
     </message>
     <message id="gallery-card-error">
         <source></source>
@@ -189,35 +189,35 @@
     </message>
     <message id="gallery-card-failed">
         <source></source>
-        <translation>Levypalvelu ilmoitti virheestä.</translation>
+        <translation>levypalvelu ilmoitti virheestä</translation>
     </message>
     <message id="gallery-card-device-busy">
         <source></source>
-        <translation>Kortti on käytössä. Sulje sitä käyttävät sovellukset ja yritä uudelleen.</translation>
+        <translation>kortti on käytössä. Sulje sitä käyttävät sovellukset ja yritä uudelleen.</translation>
     </message>
     <message id="gallery-card-already-mounted">
         <source></source>
-        <translation>Huomaa: kortti oli jo käytössä.</translation>
+        <translation>kortti oli jo liitetty</translation>
     </message>
     <message id="gallery-card-not-mounted">
         <source></source>
-        <translation>Korttia ei ole liitetty.</translation>
+        <translation>korttia ei ole liitetty</translation>
     </message>
     <message id="gallery-card-other-user">
         <source></source>
-        <translation>Toinen käyttäjä on liittänyt kortin.</translation>
+        <translation>toinen käyttäjä on liittänyt kortin</translation>
     </message>
     <message id="gallery-card-not-authorized">
         <source></source>
-        <translation>Tämä ei ole sallittua.</translation>
+        <translation>ei sallittua</translation>
     </message>
     <message id="gallery-card-not-supported">
         <source></source>
-        <translation>Korttia ei voi liittää tähän laitteeseen.</translation>
+        <translation>tämä laite ei tue sitä</translation>
     </message>
     <message id="gallery-card-timed-out">
         <source></source>
-        <translation>Kortin käsittely kesti liian kauan.</translation>
+        <translation>kortti vastasi liian hitaasti</translation>
     </message>
     <message id="gallery-card-service">
         <source></source>
@@ -309,23 +309,15 @@
     </message>
     <message id="gallery-cover-about">
         <source></source>
-        <translation>Seuraa älykuorta: mikä kuori on kiinni ja onko se valmis.</translation>
-    </message>
-    <message id="gallery-cover-info">
-        <source></source>
-        <translation>Mitä palvelu kertoo</translation>
+        <translation>Seuraa älykuorta: mikä kuori on kiinni ja voiko sen tunnistaa.</translation>
     </message>
     <message id="gallery-cover-id">
         <source></source>
-        <translation>Tunniste</translation>
+        <translation>Kiinnitetty kuori</translation>
     </message>
     <message id="gallery-cover-none">
         <source></source>
-        <translation>Ei kuorta</translation>
-    </message>
-    <message id="gallery-cover-daemon">
-        <source></source>
-        <translation>Kuoripalvelu</translation>
+        <translation>Ei mitään</translation>
     </message>
     <message id="gallery-cover-ready">
         <source></source>
@@ -333,7 +325,7 @@
     </message>
     <message id="gallery-cover-not-ready">
         <source></source>
-        <translation>Ei valmis</translation>
+        <translation>Ei vielä valmis</translation>
     </message>
     <message id="gallery-terms">
         <source></source>
@@ -361,7 +353,7 @@
     </message>
     <message id="gallery-text-files-about">
         <source></source>
-        <translation>Lukee tekstitiedoston ja kansion tiedostot yhtenä tekstinä.</translation>
+        <translation>Lukee tekstitiedoston ja hakemiston tiedostot yhtenä tekstinä.</translation>
     </message>
     <message id="gallery-text-files-file">
         <source></source>
@@ -370,10 +362,6 @@
     <message id="gallery-text-files-note">
         <source></source>
         <translation>Tiedoston rivinvaihdot jäävät pois: kappaleisiin jaettu teksti kirjoitetaan HTML:nä.</translation>
-    </message>
-    <message id="gallery-text-files-folder">
-        <source></source>
-        <translation>Kansio</translation>
     </message>
     <message id="gallery-text-files-prefix">
         <source></source>
@@ -401,11 +389,7 @@
     </message>
     <message id="gallery-android-about">
         <source></source>
-        <translation>Kertoo, näytetäänkö Android-sovellusten kansiot.</translation>
-    </message>
-    <message id="gallery-android-folders">
-        <source></source>
-        <translation>Androidin datakansiot</translation>
+        <translation>Kertoo, näytetäänkö Android-sovellusten hakemistot.</translation>
     </message>
     <message id="gallery-android-shown">
         <source></source>
@@ -447,10 +431,6 @@
         <source></source>
         <translation>Tiedosto on olemassa</translation>
     </message>
-    <message id="gallery-text-files-folder-installed">
-        <source></source>
-        <translation>Kansio on olemassa</translation>
-    </message>
     <message id="gallery-terms-platform-installed">
         <source></source>
         <translation>Alustalla on ehdot</translation>
@@ -465,7 +445,7 @@
     </message>
     <message id="gallery-simulation-note">
         <source></source>
-        <translation>Simuloi sivun ympärillä olevaa laitetta. Oma sivusi ei tarvitse näitä.</translation>
+        <translation>Kullakin sivulla on keltainen paneeli, joka simuloi sivun ympärillä olevaa laitetta. Oma sivusi ei tarvitse paneelia.</translation>
     </message>
     <message id="gallery-simulation-reload">
         <source></source>
@@ -541,7 +521,7 @@
     </message>
     <message id="gallery-card-empty-question-text">
         <source></source>
-        <translation>Kaikki kortin tiedostot ja kansiot katoavat. Tiedostojärjestelmä jää.</translation>
+        <translation>Kaikki kortin tiedostot ja hakemistot katoavat. Tiedostojärjestelmä jää.</translation>
     </message>
     <message id="gallery-card-remove">
         <source></source>
@@ -557,7 +537,7 @@
     </message>
     <message id="gallery-card-files">
         <source></source>
-        <translation>Kortti on liitetty. Tiedostoja ja kansioita ylimmällä tasolla: %1</translation>
+        <translation>Kortti on liitetty. Tiedostoja ja hakemistoja ylimmällä tasolla: %1</translation>
     </message>
     <message id="gallery-card-is-unmounted">
         <source></source>
@@ -605,23 +585,23 @@
     </message>
     <message id="gallery-cover-no-daemon">
         <source></source>
-        <translation>Ei palvelua</translation>
+        <translation>Mikään ei vastaa</translation>
     </message>
     <message id="gallery-cover-removed">
         <source></source>
-        <translation>Kuorta ei ole kiinnitetty</translation>
+        <translation>Ei kuorta</translation>
     </message>
     <message id="gallery-cover-attached">
         <source></source>
-        <translation>Kuori, joka ei ole valmis</translation>
+        <translation>Kuori, kun tunnistus ei ole valmis</translation>
     </message>
     <message id="gallery-cover-attached-ready">
         <source></source>
-        <translation>Kuori, joka on valmis</translation>
+        <translation>Kuori</translation>
     </message>
     <message id="gallery-cover-note">
         <source></source>
-        <translation>Kun palvelu katoaa, avoin sivu muistaa, mitä tiesi.</translation>
+        <translation>Kun vastaukset loppuvat, avoin sivu säilyttää viimeisen tietonsa.</translation>
     </message>
     <message id="gallery-card-waiting">
         <source></source>
@@ -633,27 +613,15 @@
     </message>
     <message id="gallery-card-no-answer">
         <source></source>
-        <translation>Levypalvelu puuttuu tai ei vastannut oikein.</translation>
-    </message>
-    <message id="gallery-card-probing-failed">
-        <source></source>
-        <translation>Apuohjelma ei tunnistanut tiedostojärjestelmää.</translation>
-    </message>
-    <message id="gallery-card-formatting-failed">
-        <source></source>
-        <translation>Apuohjelma ei voinut alustaa korttia.</translation>
+        <translation>levypalvelu puuttuu tai ei vastannut oikein</translation>
     </message>
     <message id="gallery-card-removing-failed">
         <source></source>
-        <translation>Kaikkia tiedostoja ei voitu poistaa.</translation>
-    </message>
-    <message id="gallery-card-mounting-failed">
-        <source></source>
-        <translation>Kortin tiedostoja ei löytynyt.</translation>
+        <translation>kaikkia tiedostoja ei voitu poistaa</translation>
     </message>
     <message id="gallery-card-already-unmounting">
         <source></source>
-        <translation>Huomaa: korttia irrotetaan jo.</translation>
+        <translation>korttia irrotetaan jo</translation>
     </message>
     <message id="gallery-move-up">
         <source></source>
@@ -666,6 +634,38 @@
     <message id="gallery-untitled">
         <source></source>
         <translation>Tässä määrittelytiedostossa ei ole otsikkoa.</translation>
+    </message>
+    <message id="gallery-card-helper-failed">
+        <source></source>
+        <translation>apuohjelma epäonnistui</translation>
+    </message>
+    <message id="gallery-card-helper-missing">
+        <source></source>
+        <translation>apuohjelma puuttuu</translation>
+    </message>
+    <message id="gallery-android-directories">
+        <source></source>
+        <translation>Android-sovellusten datahakemistot</translation>
+    </message>
+    <message id="gallery-text-files-directory">
+        <source></source>
+        <translation>Hakemisto</translation>
+    </message>
+    <message id="gallery-text-files-directory-installed">
+        <source></source>
+        <translation>Hakemisto on olemassa</translation>
+    </message>
+    <message id="gallery-cover-recognition">
+        <source></source>
+        <translation>Kuorten tunnistus</translation>
+    </message>
+    <message id="gallery-events-widgets-live">
+        <source></source>
+        <translation>Tapahtumanäkymässä</translation>
+    </message>
+    <message id="gallery-events-widgets-live-none">
+        <source></source>
+        <translation>Yhtään saatavilla olevaa widgetiä ei ole käytössä.</translation>
     </message>
 </context>
 </TS>

@@ -69,7 +69,7 @@
     </message>
     <message id="gallery-events-widgets-available">
         <source></source>
-        <translation>On the events screen</translation>
+        <translation>Available widgets</translation>
     </message>
     <message id="gallery-events-widgets-unavailable">
         <source></source>
@@ -189,35 +189,35 @@
     </message>
     <message id="gallery-card-failed">
         <source></source>
-        <translation>The disk service reported an error.</translation>
+        <translation>the disk service reported an error</translation>
     </message>
     <message id="gallery-card-device-busy">
         <source></source>
-        <translation>The card is in use. Close what uses it, and try again.</translation>
+        <translation>the card is in use. Close what uses it, and try again.</translation>
     </message>
     <message id="gallery-card-already-mounted">
         <source></source>
-        <translation>Note: the card was already mounted.</translation>
+        <translation>the card was already mounted</translation>
     </message>
     <message id="gallery-card-not-mounted">
         <source></source>
-        <translation>The card is not mounted.</translation>
+        <translation>the card is not mounted</translation>
     </message>
     <message id="gallery-card-other-user">
         <source></source>
-        <translation>Another user has mounted the card.</translation>
+        <translation>another user has mounted the card</translation>
     </message>
     <message id="gallery-card-not-authorized">
         <source></source>
-        <translation>This is not allowed.</translation>
+        <translation>not allowed</translation>
     </message>
     <message id="gallery-card-not-supported">
         <source></source>
-        <translation>The card cannot be mounted on this device.</translation>
+        <translation>not supported on this device</translation>
     </message>
     <message id="gallery-card-timed-out">
         <source></source>
-        <translation>The card took too long.</translation>
+        <translation>the card took too long</translation>
     </message>
     <message id="gallery-card-service">
         <source></source>
@@ -309,23 +309,15 @@
     </message>
     <message id="gallery-cover-about">
         <source></source>
-        <translation>Follows the smart back cover: which one is attached, and whether it is ready.</translation>
-    </message>
-    <message id="gallery-cover-info">
-        <source></source>
-        <translation>Reported by the daemon</translation>
+        <translation>Follows the smart back cover: which cover is attached, and whether it can be recognized.</translation>
     </message>
     <message id="gallery-cover-id">
         <source></source>
-        <translation>Identifier</translation>
+        <translation>Attached cover</translation>
     </message>
     <message id="gallery-cover-none">
         <source></source>
-        <translation>No cover</translation>
-    </message>
-    <message id="gallery-cover-daemon">
-        <source></source>
-        <translation>Cover daemon</translation>
+        <translation>None</translation>
     </message>
     <message id="gallery-cover-ready">
         <source></source>
@@ -333,7 +325,7 @@
     </message>
     <message id="gallery-cover-not-ready">
         <source></source>
-        <translation>Not ready</translation>
+        <translation>Not ready yet</translation>
     </message>
     <message id="gallery-terms">
         <source></source>
@@ -361,7 +353,7 @@
     </message>
     <message id="gallery-text-files-about">
         <source></source>
-        <translation>Reads a text file, and the files of a folder as one text.</translation>
+        <translation>Reads a text file, and the files of a directory as one text.</translation>
     </message>
     <message id="gallery-text-files-file">
         <source></source>
@@ -370,10 +362,6 @@
     <message id="gallery-text-files-note">
         <source></source>
         <translation>Line breaks of a file are dropped: a text with paragraphs is written in HTML.</translation>
-    </message>
-    <message id="gallery-text-files-folder">
-        <source></source>
-        <translation>A folder</translation>
     </message>
     <message id="gallery-text-files-prefix">
         <source></source>
@@ -401,11 +389,7 @@
     </message>
     <message id="gallery-android-about">
         <source></source>
-        <translation>Shows whether the data folders of Android applications are visible.</translation>
-    </message>
-    <message id="gallery-android-folders">
-        <source></source>
-        <translation>Android data folders</translation>
+        <translation>Shows whether the data directories of Android applications are visible.</translation>
     </message>
     <message id="gallery-android-shown">
         <source></source>
@@ -447,10 +431,6 @@
         <source></source>
         <translation>The file is there</translation>
     </message>
-    <message id="gallery-text-files-folder-installed">
-        <source></source>
-        <translation>The folder is there</translation>
-    </message>
     <message id="gallery-terms-platform-installed">
         <source></source>
         <translation>The platform has terms</translation>
@@ -465,7 +445,7 @@
     </message>
     <message id="gallery-simulation-note">
         <source></source>
-        <translation>Simulates the device around the page. A page of your own needs none of this.</translation>
+        <translation>Each page has a yellow panel that simulates the device around it. A page of your own needs no such panel.</translation>
     </message>
     <message id="gallery-simulation-reload">
         <source></source>
@@ -541,7 +521,7 @@
     </message>
     <message id="gallery-card-empty-question-text">
         <source></source>
-        <translation>All files and folders on the card will be lost. Its file system stays.</translation>
+        <translation>All files and directories on the card will be lost. Its file system stays.</translation>
     </message>
     <message id="gallery-card-remove">
         <source></source>
@@ -557,7 +537,7 @@
     </message>
     <message id="gallery-card-files">
         <source></source>
-        <translation>The card is mounted. Files and folders at its top: %1</translation>
+        <translation>The card is mounted. Files and directories at its top: %1</translation>
     </message>
     <message id="gallery-card-is-unmounted">
         <source></source>
@@ -605,23 +585,23 @@
     </message>
     <message id="gallery-cover-no-daemon">
         <source></source>
-        <translation>No daemon</translation>
+        <translation>Nothing answers</translation>
     </message>
     <message id="gallery-cover-removed">
         <source></source>
-        <translation>No cover attached</translation>
+        <translation>No cover</translation>
     </message>
     <message id="gallery-cover-attached">
         <source></source>
-        <translation>A cover that is not ready</translation>
+        <translation>A cover, while recognition is not ready</translation>
     </message>
     <message id="gallery-cover-attached-ready">
         <source></source>
-        <translation>A cover that is ready</translation>
+        <translation>A cover</translation>
     </message>
     <message id="gallery-cover-note">
         <source></source>
-        <translation>When the daemon goes, an open page keeps what it knew.</translation>
+        <translation>When nothing answers any more, an open page keeps what it knew.</translation>
     </message>
     <message id="gallery-card-waiting">
         <source></source>
@@ -633,27 +613,15 @@
     </message>
     <message id="gallery-card-no-answer">
         <source></source>
-        <translation>The disk service is missing or gave no valid answer.</translation>
-    </message>
-    <message id="gallery-card-probing-failed">
-        <source></source>
-        <translation>The helper program could not detect a file system.</translation>
-    </message>
-    <message id="gallery-card-formatting-failed">
-        <source></source>
-        <translation>The helper program could not format the card.</translation>
+        <translation>the disk service is missing or gave no valid answer</translation>
     </message>
     <message id="gallery-card-removing-failed">
         <source></source>
-        <translation>Some files could not be removed.</translation>
-    </message>
-    <message id="gallery-card-mounting-failed">
-        <source></source>
-        <translation>The files on the card could not be found.</translation>
+        <translation>some files could not be removed</translation>
     </message>
     <message id="gallery-card-already-unmounting">
         <source></source>
-        <translation>Note: the card is already being unmounted.</translation>
+        <translation>the card is already being unmounted</translation>
     </message>
     <message id="gallery-move-up">
         <source></source>
@@ -666,6 +634,38 @@
     <message id="gallery-untitled">
         <source></source>
         <translation>This definition file has no title.</translation>
+    </message>
+    <message id="gallery-card-helper-failed">
+        <source></source>
+        <translation>the helper program failed</translation>
+    </message>
+    <message id="gallery-card-helper-missing">
+        <source></source>
+        <translation>the helper program is missing</translation>
+    </message>
+    <message id="gallery-android-directories">
+        <source></source>
+        <translation>Data directories of Android applications</translation>
+    </message>
+    <message id="gallery-text-files-directory">
+        <source></source>
+        <translation>A directory</translation>
+    </message>
+    <message id="gallery-text-files-directory-installed">
+        <source></source>
+        <translation>The directory is there</translation>
+    </message>
+    <message id="gallery-cover-recognition">
+        <source></source>
+        <translation>Recognition of covers</translation>
+    </message>
+    <message id="gallery-events-widgets-live">
+        <source></source>
+        <translation>On the events screen</translation>
+    </message>
+    <message id="gallery-events-widgets-live-none">
+        <source></source>
+        <translation>No widget is enabled and available.</translation>
     </message>
 </context>
 </TS>

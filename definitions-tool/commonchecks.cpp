@@ -78,13 +78,6 @@ QString nearest(const QString &name, const QStringList &known)
     return best;
 }
 
-// In lower case; empty if the text is not a URL.
-QString schemeOf(const QString &text)
-{
-    static const QRegularExpression scheme(QStringLiteral("^([a-zA-Z][a-zA-Z0-9+.-]*):"));
-    return scheme.match(text).captured(1).toLower();
-}
-
 } // namespace
 
 bool reportUnreadable(const QString &path, qint64 maximumSize, QByteArray *content,
@@ -133,6 +126,12 @@ void checkCatalog(const QString &catalog, int line, CheckContext *context, Findi
                           .arg(quoted(catalog), quoted(catalog.chopped(suffix.size()))));
         return;
     }
+    if (!catalog.isEmpty() && !CatalogFiles::isCatalogName(catalog)) {
+        findings->add(line, Severity::Error, catalogRule,
+                      QStringLiteral("the catalog %1 is not used: its name must not have a \"/\"")
+                          .arg(quoted(catalog)));
+        return;
+    }
     if (catalog.isEmpty() || context->ignoresCatalogs) {
         return;
     }
@@ -153,7 +152,7 @@ void checkCatalog(const QString &catalog, int line, CheckContext *context, Findi
 void checkTextIds(const std::vector<TextId> &ids, const QString &catalog, int line,
                   CheckContext *context, Findings *findings)
 {
-    if (catalog.isEmpty() || context->ignoresCatalogs
+    if (!CatalogFiles::isCatalogName(catalog) || context->ignoresCatalogs
         || !context->catalogs.find(catalog).isInstalled()) {
         return;
     }
@@ -197,6 +196,12 @@ void checkTextIds(const std::vector<TextId> &ids, const QString &catalog, int li
     }
 }
 
+QString schemeOf(const QString &text)
+{
+    static const QRegularExpression scheme(QStringLiteral("^([a-zA-Z][a-zA-Z0-9+.-]*):"));
+    return scheme.match(text).captured(1).toLower();
+}
+
 void checkLocation(const QString &what, const QString &location, const QStringList &schemes,
                    int line, CheckContext *context, Findings *findings)
 {
@@ -217,7 +222,7 @@ void checkLocation(const QString &what, const QString &location, const QStringLi
                                   .arg(quoted(meant + location.mid(scheme.size()))));
         return;
     }
-    const QUrl url(location);
+    const QUrl url(scheme.isEmpty() ? QString() : location);
     if ((scheme == imageScheme && url.host().isEmpty())
         || (scheme == fileScheme && !url.host().isEmpty())) {
         add(Severity::Warning, schemeRule,

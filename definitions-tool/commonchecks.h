@@ -32,6 +32,9 @@ struct TextId {
 void checkTextIds(const std::vector<TextId> &ids, const QString &catalog, int line,
                   CheckContext *context, Findings *findings);
 
+// In lower case; empty if the text is not a URL.
+QString schemeOf(const QString &text);
+
 // Warns of an absolute path or URL that leads nowhere.
 void checkLocation(const QString &what, const QString &location, const QStringList &schemes,
                    int line, CheckContext *context, Findings *findings);

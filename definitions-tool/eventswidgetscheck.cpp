@@ -10,7 +10,6 @@
 
 #include <QJsonArray>
 #include <QJsonDocument>
-#include <QRegularExpression>
 #include <QStringList>
 
 #include <algorithm>
@@ -277,13 +276,13 @@ void EventsWidgetsCheck::checkWidget(const Widget &widget, const Members<WidgetK
 
 void EventsWidgetsCheck::checkPath(const QString &path, int line)
 {
-    static const QRegularExpression absolute(QStringLiteral("^(/|[a-zA-Z][a-zA-Z0-9+.-]*:)"));
-    static const QRegularExpression remote(QStringLiteral("^(https?|ftp):"),
-                                           QRegularExpression::CaseInsensitiveOption);
-    if (!absolute.match(path).hasMatch()) {
+    static const QStringList remote = {QStringLiteral("http"), QStringLiteral("https"),
+                                       QStringLiteral("ftp")};
+    const QString scheme = schemeOf(path);
+    if (scheme.isEmpty() && !path.startsWith(QLatin1Char('/'))) {
         add(line, Severity::Warning, relativePathRule,
             QStringLiteral("the path %1 is a relative path").arg(quoted(path)));
-    } else if (remote.match(path).hasMatch()) {
+    } else if (remote.contains(scheme)) {
         add(line, Severity::Warning, remoteUrlRule,
             QStringLiteral("the path %1 makes the home screen run code from the network")
                 .arg(quoted(path)));

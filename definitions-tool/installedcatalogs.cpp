@@ -8,7 +8,6 @@
 #include <QDir>
 #include <QFileInfo>
 #include <QLocale>
-#include <QTranslator>
 
 #include <algorithm>
 #include <utility>
@@ -79,27 +78,30 @@ const InstalledCatalogs::Catalog &InstalledCatalogs::find(const QString &catalog
         return *known;
     }
     Catalog found;
-    // Loaded as the models load it: Qt also accepts files with shorter names.
-    const QString engineeringEnglish = catalog + CatalogFiles::engineeringEnglishSuffix;
-    addLanguage(&found, {}, engineeringEnglish);
-    found.hasEngineeringEnglish = found.isInstalled();
+    // Qt also accepts files with shorter names.
+    const QString engineeringEnglish = CatalogFiles::findEngineeringEnglish(catalog, m_directory);
+    if (!engineeringEnglish.isEmpty()) {
+        addLanguage(&found, {}, engineeringEnglish);
+        found.hasEngineeringEnglish = found.isInstalled();
+    }
     for (const QString &fileName : qAsConst(m_fileNames)) {
         if (!fileName.startsWith(catalog, Qt::CaseInsensitive)
             || !fileName.endsWith(suffix, Qt::CaseInsensitive)) {
             continue;
         }
+        const QString path = m_directory + QLatin1Char('/') + fileName;
         const QString rightName = similarName(fileName, catalog);
         if (fileName == rightName) {
-            if (!QFileInfo(m_directory, fileName).permission(QFile::ReadOther)) {
-                addFinding(fileName, Severity::Error, "permissions",
+            if (!QFileInfo(path).permission(QFile::ReadOther)) {
+                addFinding(path, Severity::Error, "permissions",
                            QStringLiteral("not every user can read this file"));
             }
-            if (fileName != engineeringEnglish + suffix) {
+            if (path != engineeringEnglish) {
                 const int start = catalog.size() + CatalogFiles::localePrefix.size();
-                addLanguage(&found, fileName.mid(start).chopped(suffix.size()), fileName);
+                addLanguage(&found, fileName.mid(start).chopped(suffix.size()), path);
             }
         } else if (!rightName.isEmpty()) {
-            addFinding(fileName, Severity::Warning, "catalog",
+            addFinding(path, Severity::Warning, "catalog",
                        QStringLiteral("no model loads a file of this name; is %1 meant?")
                            .arg(quoted(rightName)));
         }
@@ -112,19 +114,22 @@ std::vector<Finding> InstalledCatalogs::takeFindings()
     return std::exchange(m_findings, {});
 }
 
-void InstalledCatalogs::addLanguage(Catalog *catalog, const QString &name, const QString &fileName)
+void InstalledCatalogs::addLanguage(Catalog *catalog, const QString &name, const QString &path)
 {
-    auto translator = std::make_shared<QTranslator>();
-    if (translator->load(fileName, m_directory)) {
-        const QString found = QFileInfo(translator->filePath()).fileName();
-        catalog->languages.push_back({name, found, std::move(translator)});
+    auto translator = std::make_shared<CheckedTranslator>();
+    const QString refusal = translator->loadFile(path);
+    if (refusal.isEmpty()) {
+        catalog->languages.push_back({name, QFileInfo(path).fileName(), std::move(translator)});
+    } else {
+        addFinding(path, Severity::Error, "catalog",
+                   QStringLiteral("the catalog is not used: %1").arg(refusal));
     }
 }
 
-void InstalledCatalogs::addFinding(const QString &fileName, Severity severity, const char *rule,
+void InstalledCatalogs::addFinding(const QString &path, Severity severity, const char *rule,
                                    const QString &text)
 {
-    Findings findings(m_directory + QLatin1Char('/') + fileName);
+    Findings findings(path);
     findings.add(1, severity, QLatin1String(rule), text);
     m_findings.push_back(findings.take().front());
 }

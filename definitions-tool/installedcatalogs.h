@@ -6,14 +6,14 @@
 
 #include "finding.h"
 
+#include "translations/checkedtranslator.h"
+
 #include <QHash>
 #include <QString>
 #include <QStringList>
 
 #include <memory>
 #include <vector>
-
-class QTranslator;
 
 /*
     The translation catalogs of a system, their languages and the text identifiers that they hold.
@@ -24,7 +24,7 @@ public:
     struct Language {
         QString name; // As in file names: "fi" or "pt_BR".
         QString fileName;
-        std::shared_ptr<QTranslator> translator;
+        std::shared_ptr<CheckedTranslator> translator;
 
         QString text(const QString &id) const;
     };
@@ -43,13 +43,14 @@ public:
     explicit InstalledCatalogs(const QString &root);
 
     QString directory() const { return m_directory; }
+    // The name must not lead out of the directory.
     const Catalog &find(const QString &catalog);
     // The findings about the files of the catalogs that were found since the last call.
     std::vector<Finding> takeFindings();
 
 private:
-    void addLanguage(Catalog *catalog, const QString &name, const QString &fileName);
-    void addFinding(const QString &fileName, Finding::Severity severity, const char *rule,
+    void addLanguage(Catalog *catalog, const QString &name, const QString &path);
+    void addFinding(const QString &path, Finding::Severity severity, const char *rule,
                     const QString &text);
 
     QString m_directory;

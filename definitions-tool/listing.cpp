@@ -15,11 +15,13 @@
 #include <QCoreApplication>
 #include <QLocale>
 #include <QSet>
-#include <QTranslator>
+
+#include <algorithm>
+#include <iterator>
+
+using namespace CatalogFiles;
 
 namespace {
-
-const QString none = QStringLiteral("none");
 
 QString enabledText(bool enabled)
 {
@@ -75,23 +77,22 @@ QStringList namedCatalogs()
             catalogs.insert(widgets->translationCatalog);
         }
     }
-    catalogs.remove(QString());
-    QStringList names = catalogs.values();
+    QStringList names;
+    std::copy_if(catalogs.cbegin(), catalogs.cend(), std::back_inserter(names), isCatalogName);
     names.sort();
     return names;
 }
 
-QString fileOf(const QTranslator &translator)
+// The file that the models load, if they look for the one at the path.
+QString loadedFile(const QString &path)
 {
-    return translator.filePath().isEmpty() ? none : translator.filePath();
+    const bool isLoaded = !path.isEmpty() && CheckedTranslator().loadFile(path).isEmpty();
+    return isLoaded ? path : QStringLiteral("none");
 }
 
 QString fileFor(const QLocale &locale, const QString &catalog)
 {
-    using namespace CatalogFiles;
-    QTranslator translator;
-    static_cast<void>(translator.load(locale, catalog, localePrefix, directory));
-    return fileOf(translator);
+    return loadedFile(findLanguage(catalog, locale));
 }
 
 } // namespace
@@ -110,15 +111,12 @@ QString listDefinitions()
 
 QString listCatalogs()
 {
-    using namespace CatalogFiles;
     InstalledCatalogs installed{QString()};
     QString text;
     const QStringList catalogs = namedCatalogs();
     for (const QString &catalog : catalogs) {
-        QTranslator engineeringEnglish;
-        static_cast<void>(engineeringEnglish.load(catalog + engineeringEnglishSuffix, directory));
         text += QStringLiteral("%1\n  engineering English: %2\n  current locale, %3: %4\n")
-                    .arg(catalog, fileOf(engineeringEnglish), QLocale().name(),
+                    .arg(catalog, loadedFile(findEngineeringEnglish(catalog)), QLocale().name(),
                          fileFor(QLocale(), catalog));
         for (const InstalledCatalogs::Language &language : installed.find(catalog).languages) {
             if (!language.name.isEmpty()) {

@@ -271,6 +271,9 @@ void TestCorpus::findingsOfATree()
         QVERIFY(
             QFile::copy(catalogs.filePath(name), share + QStringLiteral("translations/") + name));
     }
+    QFile damaged(share + QStringLiteral("translations/kettle-da.qm"));
+    QVERIFY(damaged.open(QIODevice::ReadWrite) && damaged.seek(20) && damaged.putChar('\xff'));
+    damaged.close();
     // Git does not store these permissions.
     for (const QString &name :
          words("glimmera/quickactions/private.conf glimmera/eventswidgets/private.json "
@@ -353,7 +356,7 @@ void TestCorpus::agreesOnEventsWidgets()
     EventsWidgetsModel model;
     model.componentComplete();
     QStringList differences = m_log->takeTexts();
-    const int warnings = differences.size();
+    const int warnings = differences.filter(QStringLiteral("Invalid widget defined in")).size();
 
     const std::optional<EventsWidgetsFile> file = readEventsWidgetsFile(installed);
     m_log->takeAll();

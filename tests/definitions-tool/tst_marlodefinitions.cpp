@@ -480,6 +480,10 @@ void TestMarloDefinitions::listCatalogs()
     Files::write(quickActions + QStringLiteral("a.conf"), "translation-catalog=maps\n");
     Files::write(eventsWidgets + QStringLiteral("w.json"),
                  R"({ "translation_catalog": "nowhere" })");
+    // The models load neither of these.
+    Files::write(QStringLiteral("/usr/share/translations/maps-sv.qm"), "damaged");
+    Files::write(quickActions + QStringLiteral("b.conf"),
+                 "translation-catalog=../translations/maps\n");
     QCOMPARE(run("list --catalogs", "fi_FI.UTF-8"),
              (Result{0,
                      "maps\n"

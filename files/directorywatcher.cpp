@@ -4,18 +4,25 @@
 #include "directorywatcher.h"
 
 #include <QCoreApplication>
+#include <QDir>
 #include <QFile>
-#include <QFileSystemWatcher>
-#include <QMultiHash>
+#include <QHash>
+#include <QSet>
 #include <QSocketNotifier>
 #include <QVarLengthArray>
 #include <QVector>
+#include <QtDebug>
 
 #include <algorithm>
+#include <cerrno>
+#include <chrono>
+#include <filesystem>
+#include <iterator>
 #include <utility>
 
 #include <sys/inotify.h>
 #include <sys/ioctl.h>
+#include <sys/stat.h>
 #include <unistd.h>
 
 namespace {
@@ -25,33 +32,50 @@ namespace {
 constexpr uint32_t watchedEvents =
     IN_CREATE | IN_DELETE | IN_MOVED_FROM | IN_MOVED_TO | IN_ATTRIB | IN_CLOSE_WRITE | IN_MOVE_SELF;
 
+constexpr std::chrono::seconds pollInterval(1);
+
+// As many symbolic links as the kernel follows in a path.
+constexpr int maximumLinks = 40;
+
+// Empty if the path is not a symbolic link.
+QByteArray linkTarget(const QByteArray &path)
+{
+    std::error_code none;
+    return QByteArray::fromStdString(
+        std::filesystem::read_symlink(path.toStdString(), none).string());
+}
+
 } // namespace
 
 // The inotify instance of the process. A directory has one watch, whatever path leads to it.
-class Inotify : public QObject
+class DirectoryWatcher::Inotify : public QObject
 {
 public:
-    // Null if the process cannot get one.
+    // Null, and errno is set, if the process cannot get one.
     static Inotify *instance();
 
     ~Inotify() override;
     Q_DISABLE_COPY_MOVE(Inotify)
 
-    // Returns the watch of the directory, or a negative number if it cannot be watched.
-    int add(const QString &directory, DirectoryWatcher *watcher);
+    // Returns the watch of the directory. If it cannot be watched, returns a negative number and
+    // sets errno.
+    int add(const QByteArray &directory, DirectoryWatcher *watcher);
     void remove(int watch, DirectoryWatcher *watcher);
 
 private:
+    using Watchers = QSet<DirectoryWatcher *>;
+
     explicit Inotify(int descriptor);
 
     void readEvents();
+    Watchers watchersOf(const inotify_event &event) const;
 
     const int m_descriptor;
     QSocketNotifier m_notifier;
-    QMultiHash<int, DirectoryWatcher *> m_watchers;
+    QHash<int, Watchers> m_watchers;
 };
 
-Inotify *Inotify::instance()
+DirectoryWatcher::Inotify *DirectoryWatcher::Inotify::instance()
 {
     static QPointer<Inotify> instance;
     if (instance == nullptr) {
@@ -63,38 +87,39 @@ Inotify *Inotify::instance()
     return instance;
 }
 
-Inotify::Inotify(int descriptor)
+DirectoryWatcher::Inotify::Inotify(int descriptor)
     : QObject(QCoreApplication::instance()), m_descriptor(descriptor),
       m_notifier(descriptor, QSocketNotifier::Read)
 {
     connect(&m_notifier, &QSocketNotifier::activated, this, [this] { readEvents(); });
 }
 
-Inotify::~Inotify()
+DirectoryWatcher::Inotify::~Inotify()
 {
     m_notifier.setEnabled(false);
     close(m_descriptor);
 }
 
-int Inotify::add(const QString &directory, DirectoryWatcher *watcher)
+int DirectoryWatcher::Inotify::add(const QByteArray &directory, DirectoryWatcher *watcher)
 {
-    const int watch =
-        inotify_add_watch(m_descriptor, QFile::encodeName(directory).constData(), watchedEvents);
-    if (watch >= 0 && !m_watchers.contains(watch, watcher)) {
-        m_watchers.insert(watch, watcher);
+    const int watch = inotify_add_watch(m_descriptor, directory.constData(), watchedEvents);
+    if (watch >= 0) {
+        m_watchers[watch].insert(watcher);
     }
     return watch;
 }
 
-void Inotify::remove(int watch, DirectoryWatcher *watcher)
+void DirectoryWatcher::Inotify::remove(int watch, DirectoryWatcher *watcher)
 {
-    if (m_watchers.remove(watch, watcher) > 0 && !m_watchers.contains(watch)) {
+    const auto known = m_watchers.find(watch);
+    if (known != m_watchers.end() && known->remove(watcher) && known->isEmpty()) {
+        m_watchers.erase(known);
         // Fails if the directory does not exist any more.
         inotify_rm_watch(m_descriptor, watch);
     }
 }
 
-void Inotify::readEvents()
+void DirectoryWatcher::Inotify::readEvents()
 {
     int pending = 0;
     ioctl(m_descriptor, FIONREAD, &pending);
@@ -106,14 +131,9 @@ void Inotify::readEvents()
     for (ssize_t at = 0; at < size;) {
         const auto &event = *reinterpret_cast<const inotify_event *>(buffer.constData() + at);
         at += ssize_t(sizeof(inotify_event) + event.len);
-        // After an overflow anything may have happened.
-        const bool overflow = (event.mask & IN_Q_OVERFLOW) != 0;
-        auto watcher = overflow ? m_watchers.cbegin() : m_watchers.constFind(event.wd);
-        for (; watcher != m_watchers.cend() && (overflow || watcher.key() == event.wd); ++watcher) {
-            if ((*watcher)->take(event)) {
-                reporting.append(*watcher);
-            }
-        }
+        const Watchers watchers = watchersOf(event);
+        std::copy_if(watchers.cbegin(), watchers.cend(), std::back_inserter(reporting),
+                     [&event](DirectoryWatcher *watcher) { return watcher->take(event); });
     }
     for (const QPointer<DirectoryWatcher> &watcher : qAsConst(reporting)) {
         if (watcher != nullptr) {
@@ -122,31 +142,31 @@ void Inotify::readEvents()
     }
 }
 
+DirectoryWatcher::Inotify::Watchers
+DirectoryWatcher::Inotify::watchersOf(const inotify_event &event) const
+{
+    if ((event.mask & IN_Q_OVERFLOW) == 0) {
+        return m_watchers.value(event.wd);
+    }
+    // Anything may have happened.
+    Watchers all;
+    for (const Watchers &some : m_watchers) {
+        all.unite(some);
+    }
+    return all;
+}
+
 DirectoryWatcher::DirectoryWatcher(const QString &directory, const QString &nameFilter,
                                    QObject *parent)
-    : QObject(parent), m_nameFilter(QRegularExpression::wildcardToRegularExpression(nameFilter),
-                                    QRegularExpression::CaseInsensitiveOption),
-      m_inotify(Inotify::instance())
+    : QObject(parent), m_directory(QFile::encodeName(directory)), m_nameFilter(nameFilter),
+      m_inotify(Inotify::instance()), m_pollTimer(this)
 {
-    const QStringList names = directory.split(QLatin1Char('/'));
-    for (int i = 0; i < names.size(); ++i) {
-        // Only a directory can be reached by a path that ends with a slash.
-        const QString path = names.mid(0, i + 1).join(QLatin1Char('/')) + QLatin1Char('/');
-        m_levels.push_back({path, QFile::encodeName(names.at(i)), -1});
+    connect(&m_pollTimer, &QTimer::timeout, this, &DirectoryWatcher::poll);
+    if (m_inotify != nullptr) {
+        watch();
+    } else {
+        startPolling(errno);
     }
-    if (m_inotify == nullptr) {
-        m_poller = new QFileSystemWatcher(this);
-        // Queued: the poller emits the signal while it iterates over its paths, and watch() adds
-        // paths.
-        connect(
-            m_poller, &QFileSystemWatcher::directoryChanged, this,
-            [this] {
-                watch();
-                Q_EMIT changed();
-            },
-            Qt::QueuedConnection);
-    }
-    watch();
 }
 
 DirectoryWatcher::~DirectoryWatcher()
@@ -158,17 +178,34 @@ DirectoryWatcher::~DirectoryWatcher()
     }
 }
 
+// Follows the path through symbolic links, as the kernel does.
 void DirectoryWatcher::watch()
 {
-    if (m_poller != nullptr) {
-        for (const Level &level : m_levels) {
-            m_poller->addPath(level.path);
+    const std::vector<Level> before = std::exchange(m_levels, {});
+    QByteArrayList names = m_directory.split('/');
+    QByteArray path = "/"; // Only a directory can be reached by a path that ends with a slash.
+    int links = 0;
+    int error = 0;
+    while (error == 0) {
+        names.removeAll(QByteArray());
+        m_levels.push_back({m_inotify->add(path, this), names.value(0)});
+        if (m_levels.back().watch < 0 && (errno == ENOSPC || errno == ENOMEM)) {
+            error = errno;
         }
-        return;
+        if (names.isEmpty()) {
+            break;
+        }
+        const QByteArray name = names.takeFirst();
+        const QByteArray target = linkTarget(path + name);
+        if (target.isEmpty() || ++links > maximumLinks) {
+            path += name + '/';
+        } else {
+            names = target.split('/') + names;
+            path = target.startsWith('/') ? "/" : path;
+        }
     }
-    const std::vector<Level> before = m_levels;
-    for (Level &level : m_levels) {
-        level.watch = m_inotify->add(level.path, this);
+    if (error != 0) {
+        startPolling(error);
     }
     for (const Level &old : before) {
         const auto has = [&old](const Level &level) { return level.watch == old.watch; };
@@ -184,22 +221,22 @@ bool DirectoryWatcher::take(const inotify_event &event)
     if ((event.mask & IN_Q_OVERFLOW) != 0) {
         m_pathChanged = true;
         m_entriesChanged = true;
+        return !reporting;
     }
-    for (auto level = m_levels.cbegin(); level != m_levels.cend(); ++level) {
-        if (level->watch != event.wd) {
+    for (const Level &level : m_levels) {
+        if (level.watch != event.wd) {
             continue;
         }
-        const auto next = level + 1;
-        const bool isDirectory = next == m_levels.cend();
+        const bool isDirectory = &level == &m_levels.back();
         if (event.len == 0) {
             // The directory itself may have been moved away, removed or unmounted.
             m_pathChanged = true;
             m_entriesChanged = m_entriesChanged || (isDirectory && (event.mask & IN_ATTRIB) != 0);
         } else if (isDirectory) {
-            m_entriesChanged =
-                m_entriesChanged || m_nameFilter.match(QFile::decodeName(event.name)).hasMatch();
+            m_entriesChanged = m_entriesChanged || (event.mask & IN_CLOSE_WRITE) == 0
+                || QDir::match(m_nameFilter, QFile::decodeName(event.name));
         } else {
-            m_pathChanged = m_pathChanged || next->name == event.name;
+            m_pathChanged = m_pathChanged || level.name == event.name;
         }
     }
     return !reporting && (m_pathChanged || m_entriesChanged);
@@ -211,9 +248,39 @@ void DirectoryWatcher::report()
     if (std::exchange(m_pathChanged, false)) {
         const int before = m_levels.back().watch;
         watch();
-        isChanged = isChanged || m_levels.back().watch != before;
+        isChanged = isChanged || m_levels.empty() || m_levels.back().watch != before;
     }
     if (isChanged) {
         Q_EMIT changed();
     }
+}
+
+void DirectoryWatcher::startPolling(int error)
+{
+    static bool hasWarned = false;
+    if (!std::exchange(hasWarned, true)) {
+        qWarning().noquote() << "Directories cannot be watched and are checked once a second:"
+                             << qt_error_string(error);
+    }
+    for (const Level &level : std::exchange(m_levels, {})) {
+        m_inotify->remove(level.watch, this);
+    }
+    m_status = status();
+    m_pollTimer.start(pollInterval);
+}
+
+void DirectoryWatcher::poll()
+{
+    if (std::exchange(m_status, status()) != m_status) {
+        Q_EMIT changed();
+    }
+}
+
+DirectoryWatcher::Status DirectoryWatcher::status() const
+{
+    struct stat directory = {};
+    stat(m_directory.constData(), &directory);
+    return {quint64(directory.st_dev),         quint64(directory.st_ino),
+            quint64(directory.st_mtim.tv_sec), quint64(directory.st_mtim.tv_nsec),
+            quint64(directory.st_ctim.tv_sec), quint64(directory.st_ctim.tv_nsec)};
 }

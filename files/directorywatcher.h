@@ -7,31 +7,32 @@
 #include <QByteArray>
 #include <QObject>
 #include <QPointer>
-#include <QRegularExpression>
 #include <QString>
+#include <QTimer>
 
+#include <array>
 #include <vector>
 
-class Inotify;
-class QFileSystemWatcher;
 struct inotify_event;
 
 /*
-    Watches the files with matching names in a directory that need not exist yet.
+    Watches a directory that need not exist yet, and the files in it.
 
     changed() reports three events:
-    - an entry is added, removed, renamed or given other permissions;
-    - a file that was open for writing is closed, which means that it is complete;
-    - the directory appears, disappears or is replaced, alone or together with a directory above it.
-    Writes to the target of a link that leads out of the directory are not noticed.
+    - an entry of any name is added, removed, renamed or given other permissions;
+    - a file with a matching name that was open for writing is closed, which means that it is
+      complete;
+    - the directory appears, disappears or is replaced, alone or together with a directory above it
+      or the target of a symbolic link in its path.
+    Writes to the target of a link in the directory are not noticed.
 
     No event is lost while the watches are set up: they are set from the root downwards, each before
     the next name is looked up, and changed() is emitted last.
 
     All watchers share one inotify instance until the application ends: a user may have only 128
-    instances, and closing one blocks for more than 10 ms. If no instance is left, the watcher uses
-    QFileSystemWatcher, which checks once a second. It then ignores the filter, and does not notice
-    a file that is rewritten in place.
+    instances, and closing one blocks for more than 10 ms. If no instance or no watch is left, the
+    watcher warns and checks the directory once a second. It then does not notice a file that is
+    rewritten in place or given other permissions.
 
     For the main thread only.
 */
@@ -50,26 +51,34 @@ Q_SIGNALS:
     void changed();
 
 private:
-    friend class Inotify;
+    class Inotify;
 
-    // The directory or one of its parents, with its watch if it exists.
+    // A directory on the path, with its watch if it exists, and the name that is looked up in it.
     struct Level {
-        QString path;
-        QByteArray name;
         int watch;
+        QByteArray name;
     };
+    // What stat() returns for the directory: if nothing differs, it is still the same directory with
+    // the same entries. Zeros if there is none.
+    using Status = std::array<quint64, 6>;
 
     void watch();
     // Returns whether this is the first relevant event since the last call of report().
     bool take(const inotify_event &event);
     void report();
 
-    const QRegularExpression m_nameFilter;
-    std::vector<Level> m_levels; // from the root downwards
+    void startPolling(int error);
+    void poll();
+    Status status() const;
+
+    const QByteArray m_directory;
+    const QString m_nameFilter;
+    std::vector<Level> m_levels; // from the root downwards; the last one is the directory
     QPointer<Inotify> m_inotify;
-    QFileSystemWatcher *m_poller = nullptr;
     bool m_pathChanged = false;
     bool m_entriesChanged = false;
+    QTimer m_pollTimer; // does not run unless the watcher polls
+    Status m_status = {};
 };
 
 #endif

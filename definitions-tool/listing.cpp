@@ -9,10 +9,8 @@
 #include "installedcatalogs.h"
 #include "quickactions/quickaction.h"
 #include "quickactions/quickactionsmodel.h"
-#include "translations/apptranslator.h"
 #include "translations/catalogfiles.h"
 
-#include <QCoreApplication>
 #include <QLocale>
 #include <QSet>
 
@@ -99,13 +97,6 @@ QString fileFor(const QLocale &locale, const QString &catalog)
 
 QString listDefinitions()
 {
-    // As the plugin does for its pages: the models' catalogs come before that of the settings.
-    AppTranslator engineeringEnglish(nullptr);
-    engineeringEnglish.loadEngineeringEnglish();
-    QCoreApplication::installTranslator(&engineeringEnglish);
-    AppTranslator language(nullptr);
-    language.loadDefaultLocale();
-    QCoreApplication::installTranslator(&language);
     return listQuickActions() + listEventsWidgets();
 }
 

@@ -6,11 +6,13 @@
 #include "definitionschecker.h"
 #include "listing.h"
 #include "showing.h"
+#include "translations/apptranslator.h"
 
 #include <QCommandLineParser>
 #include <QCoreApplication>
 #include <QFileInfo>
 #include <QHash>
+#include <QLocale>
 #include <QTextCodec>
 
 #include <algorithm>
@@ -26,7 +28,7 @@ const char *const description =
     "\n"
     "  check [--strict] [--no-catalogs] [--format json] [--root DIR] [FILE|DIRECTORY...]\n"
     "  list [--catalogs]\n"
-    "  show FILE";
+    "  show [--locale NAME] FILE";
 
 int fail(const QString &text)
 {
@@ -43,6 +45,24 @@ int print(const QByteArray &text, int status)
     return isWritten ? status : fail(QStringLiteral("cannot write the result"));
 }
 
+// As in the plugin, the catalog of the settings pages is installed before those of definitions, which
+// take precedence.
+class SettingsCatalog
+{
+public:
+    SettingsCatalog()
+    {
+        m_engineeringEnglish.loadEngineeringEnglish();
+        QCoreApplication::installTranslator(&m_engineeringEnglish);
+        m_language.loadDefaultLocale();
+        QCoreApplication::installTranslator(&m_language);
+    }
+
+private:
+    AppTranslator m_engineeringEnglish;
+    AppTranslator m_language;
+};
+
 class Command
 {
 public:
@@ -51,7 +71,7 @@ public:
 private:
     int check(const QStringList &paths);
     int list() const;
-    static int show(const QString &path);
+    int show(const QString &path) const;
     // The first given option that the command does not have, or an empty text.
     QString misplacedOption(const QStringList &allowed) const;
 
@@ -75,6 +95,9 @@ int Command::run(const QStringList &arguments)
          QStringLiteral("dir"), QStringLiteral("/")},
         {QStringLiteral("catalogs"),
          QStringLiteral("list: the catalogs that the models load, instead of the definitions.")},
+        {QStringLiteral("locale"),
+         QStringLiteral("show: the language of the texts, such as fi or pt_BR."),
+         QStringLiteral("name")},
     });
     m_parser.addPositionalArgument(QStringLiteral("command"),
                                    QStringLiteral("check, list or show."));
@@ -102,7 +125,7 @@ int Command::run(const QStringList &arguments)
          {QStringLiteral("strict"), QStringLiteral("no-catalogs"), QStringLiteral("format"),
           QStringLiteral("root")}},
         {QStringLiteral("list"), {QStringLiteral("catalogs")}},
-        {QStringLiteral("show"), {}},
+        {QStringLiteral("show"), {QStringLiteral("locale")}},
     };
     if (!options.contains(command)) {
         return fail(QStringLiteral("the command is check, list or show; see --help"));
@@ -168,12 +191,22 @@ int Command::check(const QStringList &paths)
 
 int Command::list() const
 {
+    const SettingsCatalog settings;
     const bool catalogs = m_parser.isSet(QStringLiteral("catalogs"));
     return print((catalogs ? listCatalogs() : listDefinitions()).toUtf8(), Clean);
 }
 
-int Command::show(const QString &path)
+int Command::show(const QString &path) const
 {
+    if (m_parser.isSet(QStringLiteral("locale"))) {
+        const QString name = m_parser.value(QStringLiteral("locale"));
+        const QLocale locale(name);
+        if (locale.language() == QLocale::C) {
+            return fail(QStringLiteral("there is no locale %1").arg(quoted(name)));
+        }
+        QLocale::setDefault(locale);
+    }
+    const SettingsCatalog settings;
     const std::optional<QString> text = showDefinition(path);
     return text ? print(text->toUtf8(), Clean)
                 : fail(QStringLiteral("no model reads %1").arg(quoted(path)));

@@ -24,6 +24,7 @@ _marlo_definitions() {
     *)
         case $command:$current in
         check:-*) words='--format --no-catalogs --root --strict' ;;
+        show:-*) words='--locale' ;;
         list:*) words='--catalogs' ;;
         :-*) words='--help --version' ;;
         :*) words='check list show' ;;

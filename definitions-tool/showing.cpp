@@ -7,9 +7,11 @@
 #include "eventswidgets/eventswidgetsfile.h"
 #include "quickactions/quickaction.h"
 #include "readerlog.h"
+#include "translations/catalogtable.h"
 
 #include <QDBusError>
 #include <QFileInfo>
+#include <QObject>
 #include <QRegularExpression>
 #include <QStringList>
 
@@ -96,7 +98,12 @@ std::optional<QString> showQuickAction(const QString &path)
     if (log.hasWarnings()) {
         return {};
     }
-    QString text = line("title", action.title())
+    QObject owner;
+    CatalogTable catalogs(&owner);
+    catalogs.addDefinition(path, action.translationCatalog());
+    const QString title = action.title();
+    QString text = line("title", title.isEmpty() ? title : CatalogTable::text(title))
+        + line("title's identifier", title)
         + line("translation catalog", action.translationCatalog())
         + line("icon", valueText(action.icon()))
         + line("priority",
@@ -112,10 +119,16 @@ std::optional<QString> showEventsWidgets(const QString &path)
     if (!file) {
         return {};
     }
+    QObject owner;
+    CatalogTable catalogs(&owner);
+    catalogs.addDefinition(path, file->translationCatalog);
     QString text = line("translation catalog", file->translationCatalog);
     for (const EventsWidget &widget : file->widgets) {
-        text += QLatin1Char('\n') + line("path", widget.path) + line("title", widget.title)
+        text += QLatin1Char('\n') + line("path", widget.path)
+            + line("title", widget.translatedTitle())
             + line("title's identifier", widget.translationId)
+            + line("untranslated title", widget.title)
+            + line("description", widget.translatedDescription())
             + line("description's identifier", widget.descriptionId) + line("icon", widget.icon)
             + line("order", QString::number(widget.order))
             + line("enabled by default", word(widget.defaultEnabled))

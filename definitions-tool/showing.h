@@ -8,8 +8,9 @@
 
 #include <optional>
 
-// Returns a definition file as its model reads it, as text for a terminal. For a quick action, a
-// shell command for the D-Bus call follows. Returns nothing if no model reads the file.
+// Returns a definition file as its model reads it, with the texts of the default locale, as text for
+// a terminal. For a quick action, a shell command for the D-Bus call follows. Returns nothing if no
+// model reads the file.
 std::optional<QString> showDefinition(const QString &path);
 
 #endif

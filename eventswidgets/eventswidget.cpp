@@ -3,7 +3,32 @@
 
 #include "eventswidget.h"
 
+#include "translations/catalogtable.h"
+
 #include <QFileInfo>
+
+namespace {
+
+QString translation(const QString &id, const QString &fallback)
+{
+    if (id.isEmpty()) {
+        return fallback;
+    }
+    const QString text = CatalogTable::text(id);
+    return text == id ? fallback : text;
+}
+
+} // namespace
+
+QString EventsWidget::translatedTitle() const
+{
+    return translation(translationId, title);
+}
+
+QString EventsWidget::translatedDescription() const
+{
+    return translation(descriptionId, QLatin1String(""));
+}
 
 bool EventsWidget::isAvailable() const
 {

@@ -21,6 +21,10 @@ struct EventsWidget {
     bool defaultEnabled = false; // While the user has not chosen.
     bool available = false; // The last result of isAvailable().
 
+    // The texts for the user, from the catalogs that are installed in the application now.
+    QString translatedTitle() const;
+    QString translatedDescription() const;
+
     // Whether a file exists at availablePath now; always true if the path is empty.
     bool isAvailable() const;
 

@@ -20,15 +20,6 @@ const QLatin1String definitionFilter("*.json");
 
 const QLatin1String enabledKey("/desktop/glimmera-marlo-home/events_screen_widgets");
 
-QString translation(const QString &id, const QString &fallback)
-{
-    if (id.isEmpty()) {
-        return fallback;
-    }
-    const QString text = CatalogTable::text(id);
-    return text == id ? fallback : text;
-}
-
 } // namespace
 
 /*!
@@ -135,7 +126,7 @@ QVariant EventsWidgetsModel::data(const QModelIndex &index, int role) const
     const Widget &widget = m_rows.at(index.row());
     switch (role) {
     case TitleRole:
-        return translation(widget.translationId, widget.title);
+        return widget.translatedTitle();
     case IconRole:
         return widget.icon;
     case PathRole:
@@ -143,7 +134,7 @@ QVariant EventsWidgetsModel::data(const QModelIndex &index, int role) const
     case EnabledRole:
         return widget.enabled;
     case DescriptionRole:
-        return translation(widget.descriptionId, QLatin1String(""));
+        return widget.translatedDescription();
     case AvailableRole:
         return widget.available;
     default:

@@ -55,6 +55,7 @@ private Q_SLOTS:
     void showSendsTheSameCall_data();
     void showSendsTheSameCall();
     void showEventsWidgets();
+    void showInALanguage();
     void showNothing();
 
 private:
@@ -76,6 +77,10 @@ const QByteArray goodAction = "title=maps-title\ntranslation-catalog=maps\nprior
 const QByteArray goodWidget =
     R"({ "translation_catalog": "maps", "widgets": [ { "path": "/a.qml", )"
     R"("title": "A", "order": 1 } ] })";
+
+const QByteArray goodWidgetWithTexts =
+    R"({ "translation_catalog": "maps", "widgets": [ { "path": "/a.qml", "title": "A", "order": 1, )"
+    R"("translation_id": "maps-title", "description_id": "maps-english" } ] })";
 
 void write(const char *name, const QByteArray &content)
 {
@@ -166,7 +171,8 @@ void TestMarloDefinitions::wrongUsage_data()
     for (const char *line :
          {"", "verify", "check --verbose a.conf", "check --format xml .", "check --catalogs .",
           "list --strict", "list --format json", "list a.conf", "show", "show a.conf b.conf",
-          "show --root / a.conf", "check --root", "check --root /nowhere", "--strict"}) {
+          "show --root / a.conf", "show --locale xx a.conf", "list --locale fi", "check --root",
+          "check --root /nowhere", "--strict"}) {
         QTest::newRow(line) << QByteArray(line);
     }
 }
@@ -502,6 +508,7 @@ void TestMarloDefinitions::showQuickAction()
     QCOMPARE(run("show a.conf"),
              (Result{0,
                      "title: Lamp\n"
+                     "title's identifier: Lamp\n"
                      "translation catalog: \n"
                      "icon: a list, which is not a text: a, b\n"
                      "priority: none\n"
@@ -552,7 +559,7 @@ void TestMarloDefinitions::showSendsTheSameCall()
 void TestMarloDefinitions::showEventsWidgets()
 {
     write("w.json", R"({ "translation_catalog": "maps", "widgets": [ {
-        "path": "/x.qml", "title": "X", "translation_id": "t", "description_id": "d",
+        "path": "/x.qml", "title": "X", "translation_id": "t", "description_id": "maps-title",
         "icon": "i", "order": "2", "default_enabled": true, "available_path": "/nowhere" }, 5 ] })");
     QCOMPARE(run("show w.json"),
              (Result{0,
@@ -561,12 +568,33 @@ void TestMarloDefinitions::showEventsWidgets()
                      "path: /x.qml\n"
                      "title: X\n"
                      "title's identifier: t\n"
-                     "description's identifier: d\n"
+                     "untranslated title: X\n"
+                     "description: Maps\n"
+                     "description's identifier: maps-title\n"
                      "icon: i\n"
                      "order: -1\n"
                      "enabled by default: true\n"
                      "available path: /nowhere\n"
                      "available: false\n"}));
+}
+
+void TestMarloDefinitions::showInALanguage()
+{
+    Files::installCatalogs({QStringLiteral("maps-fi"), QStringLiteral("settings-system_eng_en"),
+                            QStringLiteral("settings-system-fi")});
+    write("w.json", goodWidgetWithTexts);
+    const QByteArray widget = run("show --locale fi w.json").output;
+    QVERIFY2(widget.contains("\ntitle: Kartat\n"), widget.constData());
+    QVERIFY(widget.contains("\ndescription: Maps, English only\n"));
+
+    write("a.conf", goodAction);
+    QVERIFY(run("show --locale fi_FI a.conf").output.startsWith("title: Kartat\n"));
+    QVERIFY(run("show a.conf").output.startsWith("title: Maps\n"));
+    QVERIFY(run("show a.conf", "fi_FI.UTF-8").output.startsWith("title: Kartat\n"));
+    // The catalog of the settings pages is installed, too.
+    write("b.conf", "title=settings-test-both\n" + call);
+    QVERIFY(run("show --locale fi b.conf").output.startsWith("title: Molemmat\n"));
+    QVERIFY(run("show b.conf").output.startsWith("title: Both, engineering English\n"));
 }
 
 void TestMarloDefinitions::showNothing()

@@ -3,27 +3,74 @@
 
 import QtQuick 2.15
 import QtQuick.Window 2.15
+import "../tests/gallery/screen.js" as Screen
 
 /*
     Takes a picture of a page, without a display:
 
-        QT_QPA_PLATFORM=offscreen QT_QUICK_BACKEND=software qml PagePicture.qml -- "$PWD/PAGE.qml" PICTURE.png
+        QT_QPA_PLATFORM=offscreen QT_QUICK_BACKEND=software qml PagePicture.qml -- [--click TEXT]...
+            [--wait MS] "$PWD/PAGE.qml" PICTURE.png
 
-    The picture shows the page one second after it was opened, in a window of 360 by 640.
+    Clicks the buttons, switches and the like that show the texts, in this order, as soon as each of them
+    is there and enabled. The picture shows the page in a window of 360 by 640, one second or MS
+    milliseconds later.
 */
 Window {
     id: window
 
-    readonly property var files: Qt.application.arguments.slice(-2)
+    property var clicks: []
+    property int pause: 1000
+    property var files: []
+
+    function fail(problem) {
+        console.error("PagePicture: " + problem);
+        Qt.exit(1);
+    }
+
+    function readArguments() {
+        const words = Qt.application.arguments.slice(Qt.application.arguments.indexOf("--") + 1);
+        while (words.length > 2) {
+            const option = words.shift();
+            if (option === "--click") {
+                clicks.push(words.shift());
+            } else if (option === "--wait" && /^\d+$/.test(words[0])) {
+                pause = words.shift();
+            } else {
+                fail("unknown option " + option);
+                return;
+            }
+        }
+        if (words.length < 2) {
+            fail("usage: [--click TEXT]... [--wait MS] PAGE PICTURE");
+            return;
+        }
+        files = words;
+        loader.source = "file://" + files[0];
+    }
+
+    function click() {
+        const control = Screen.control(contentItem, clicks[0]);
+        if (!control || !control.enabled) {
+            return;
+        }
+        clicks.shift();
+        patience.restart();
+        if (control.checkable) {
+            control.toggle();
+            control.toggled();
+        }
+        control.clicked();
+    }
 
     width: 360
     height: 640
     visible: true
 
+    Component.onCompleted: readArguments()
+
     Loader {
         id: loader
         anchors.fill: parent
-        source: "file://" + files[0]
         onStatusChanged: {
             if (status === Loader.Error) {
                 Qt.exit(1);
@@ -32,8 +79,37 @@ Window {
     }
 
     Timer {
-        interval: 1000
+        interval: 50
+        repeat: true
+        running: loader.status === Loader.Ready
+        onTriggered: {
+            if (clicks.length > 0) {
+                click();
+            } else {
+                stop();
+                patience.stop();
+                shutter.start();
+            }
+        }
+    }
+
+    Timer {
+        id: patience
+        interval: 10000
         running: true
-        onTriggered: window.contentItem.grabToImage(image => Qt.exit(image.saveToFile(files[1]) ? 0 : 1))
+        onTriggered: fail("nothing to click shows \"" + clicks[0] + "\", but there is: "
+                          + Screen.texts(window.contentItem).map(item => item.text).join("; "))
+    }
+
+    Timer {
+        id: shutter
+        interval: pause
+        onTriggered: window.contentItem.grabToImage(image => {
+            if (image.saveToFile(files[1])) {
+                Qt.quit();
+            } else {
+                fail("cannot save " + files[1]);
+            }
+        })
     }
 }

@@ -261,6 +261,60 @@ TestCase {
         see("Address of the adapter");
     }
 
+    function focusOn(text) {
+        findControl(text).forceActiveFocus(Qt.TabFocusReason);
+    }
+
+    function test_languageByKeys() {
+        gallery.openPage("location");
+        Screen.visibleItems(surface).find(item => item.text === "EN")
+              .forceActiveFocus(Qt.TabFocusReason);
+        keyClick(Qt.Key_Return);
+        see("Suomi");
+        keyClick(Qt.Key_Down);
+        keyClick(Qt.Key_Down);
+        keyClick(Qt.Key_Return);
+        see("Sijainti");
+    }
+
+    // The keys do not reach the page behind a question.
+    function test_questionsTakeTheKeys() {
+        gallery.openPage("memory-card");
+        waitForCard();
+        focusOn("Format as ext4");
+        keyClick(Qt.Key_Space);
+        see("Erase the card?");
+        tryVerify(() => gallery.activeFocusItem.text === "Cancel");
+        const reached = new Set();
+        [Qt.Key_Tab, Qt.Key_Tab, Qt.Key_Tab, Qt.Key_Backtab, Qt.Key_Backtab].forEach(key => {
+            keyClick(key);
+            reached.add(gallery.activeFocusItem.text);
+        });
+        compare(Array.from(reached).sort(), ["Cancel", "Erase"]);
+        keyClick(Qt.Key_Escape);
+        seeNot("Erase the card?");
+        compare(gallery.currentPage.title, "Memory card");
+
+        focusOn("Format as ext4");
+        keyClick(Qt.Key_Return);
+        see("Erase the card?");
+        tryVerify(() => gallery.activeFocusItem.text === "Cancel");
+        keyClick(Qt.Key_Return);
+        seeNot("Erase the card?");
+        see("1. Detecting the file system");
+        see("Ready");
+
+        // The card is not mounted.
+        focusOn("Format as ext4");
+        keyClick(Qt.Key_Space);
+        see("Erase the card?");
+        tryVerify(() => gallery.activeFocusItem.text === "Cancel");
+        keyClick(Qt.Key_Tab);
+        keyClick(Qt.Key_Space);
+        see("1. Unmounting: the card is not mounted");
+        expectMessages(["NotMounted"]);
+    }
+
     function test_wheelScrollsAPage() {
         const page = gallery.currentPage;
         mouseWheel(page, page.width / 2, page.height / 2, 0, -120);
@@ -350,6 +404,17 @@ TestCase {
         keyClick(Qt.Key_Up, Qt.ControlModifier);
         keyClick(Qt.Key_Up, Qt.ControlModifier);
         until(() => rowsOf(list).join() === before.join(), "moved by keys");
+
+        // The buttons of a row move along with it, and the row keeps the focus at the end of the list.
+        const button = name => Screen.visibleItems(list).find(item => item.Accessible.name === name);
+        button("Move up: Torch").forceActiveFocus(Qt.TabFocusReason);
+        keyClick(Qt.Key_Return);
+        until(() => rowsOf(list)[0] === "Torch", "moved by a button");
+        tryVerify(() => gallery.activeFocusItem.text === "Torch");
+        button("Move down: Torch").forceActiveFocus(Qt.TabFocusReason);
+        keyClick(Qt.Key_Space);
+        until(() => rowsOf(list).join() === before.join(), "moved back");
+        tryVerify(() => gallery.activeFocusItem.Accessible.name === "Move down: Torch");
 
         seeSwitch("New note", false);
         tap("New note");

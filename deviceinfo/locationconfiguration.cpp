@@ -47,6 +47,7 @@ QString agreementText(QLatin1String base)
     }
     RegularFile file = readRegularFile(path, maximumTextSize);
     if (file.state != RegularFile::State::Read) {
+        //% "The terms of this service could not be found."
         return qtTrId("settings_location-la-no_agreement_text_found");
     }
     QBuffer text(&file.content);
@@ -134,7 +135,9 @@ LocationConfiguration::LocationConfiguration(QObject *parent)
     \c{/usr/share/geoclue-provider-mlsdb/agreements/mls_consent_<locale>.txt}, where \c{<locale>} is
     the default locale, such as \c fi_FI. Without the file the text of \c en_GB is used and a
     warning is logged. If the file cannot be read or is larger than 16 MiB, the text is the
-    translation of \c settings_location-la-no_agreement_text_found.
+    translation of \c settings_location-la-no_agreement_text_found in the catalog
+    \c settings-system. The file \c settings-system_eng_en.ts, which is installed next to this
+    reference, is a template of that catalog.
 */
 QString LocationConfiguration::hereAgreementText() const
 {

@@ -40,19 +40,19 @@ Page {
     function fail(error) {
         switch (error) {
         case MemoryCardFormatter.ErrorAlreadyMounted:
-            note = "The card was mounted already.";
+            note = qsTr("The card was mounted already.");
             break;
         case MemoryCardFormatter.ErrorAlreadyUnmounting:
-            note = "The card is already being unmounted.";
+            note = qsTr("The card is already being unmounted.");
             break;
         case MemoryCardFormatter.ErrorDeviceBusy:
-            problem = "A program uses the card.";
+            problem = qsTr("A program uses the card.");
             break;
         case MemoryCardFormatter.ErrorNotMounted:
-            problem = "The card is not mounted.";
+            problem = qsTr("The card is not mounted.");
             break;
         default:
-            problem = "The disk service refused (error " + error + ").";
+            problem = qsTr("The disk service refused (error %1).").arg(error);
         }
     }
 
@@ -60,30 +60,30 @@ Page {
     function cause(step) {
         switch (step) {
         case MemoryCardFormatter.Probing:
-            return "The file system could not be detected.";
+            return qsTr("The file system could not be detected.");
         case MemoryCardFormatter.Formatting:
-            return "Formatting failed.";
+            return qsTr("Formatting failed.");
         case MemoryCardFormatter.RemovingFiles:
-            return "Some files could not be removed.";
+            return qsTr("Some files could not be removed.");
         default:
-            return "The disk service did not answer.";
+            return qsTr("The disk service did not answer.");
         }
     }
 
     function progress(step) {
         switch (step) {
         case MemoryCardFormatter.Unmounting:
-            return "Unmounted…";
+            return qsTr("Unmounted…");
         case MemoryCardFormatter.Formatting:
-            return "Formatting…";
+            return qsTr("Formatting…");
         case MemoryCardFormatter.RemovingFiles:
-            return "Removing files…";
+            return qsTr("Removing files…");
         case MemoryCardFormatter.Mounting:
-            return "Mounted…";
+            return qsTr("Mounted…");
         case MemoryCardFormatter.Probing:
-            return "Detecting the file system…";
+            return qsTr("Detecting the file system…");
         default: // no status for this: the formatter stays Idle until the disk service answers
-            return "Waiting for the disk service…";
+            return qsTr("Waiting for the disk service…");
         }
     }
 
@@ -119,21 +119,21 @@ Page {
         width: parent.width - 32
         modal: true
         focus: true // otherwise keys still reach the page behind the dialog
-        title: "Erase the card?"
+        title: qsTr("Erase the card?")
         onAccepted: page.run(card => card.format(type))
 
         Label {
             width: question.availableWidth
-            text: "All files are lost. The card gets the file system " + question.type + "."
+            text: qsTr("All files are lost. The card gets the file system %1.").arg(question.type)
             wrapMode: Text.Wrap
         }
         footer: DialogButtonBox {
             Button {
-                text: "Cancel"
+                text: qsTr("Cancel")
                 DialogButtonBox.buttonRole: DialogButtonBox.RejectRole
             }
             Button {
-                text: "Erase"
+                text: qsTr("Erase")
                 DialogButtonBox.buttonRole: DialogButtonBox.AcceptRole
             }
         }
@@ -145,7 +145,8 @@ Page {
         Label {
             Layout.fillWidth: true
             text: page.running ? page.progress(page.step)
-                               : page.problem || "File system: " + (page.fileSystem || "unknown")
+                               : page.problem
+                    || qsTr("File system: %1").arg(page.fileSystem || qsTr("unknown"))
             wrapMode: Text.Wrap
         }
         Label {
@@ -156,21 +157,23 @@ Page {
             Layout.fillWidth: true
             opacity: page.running ? 1 : 0
             indeterminate: page.running
+            Accessible.name: page.progress(page.step)
+            Accessible.ignored: !page.running
         }
         Button {
-            text: "Mount"
+            text: qsTr("Mount")
             enabled: page.cardName !== "" && !page.running
             onClicked: page.run(card => card.mount())
         }
         Button {
-            text: "Unmount"
+            text: qsTr("Unmount")
             enabled: page.cardName !== "" && !page.running
             onClicked: page.run(card => card.unmount())
         }
         Repeater {
             model: types.supportedFormatTypes
             Button {
-                text: "Format as " + modelData
+                text: qsTr("Format as %1").arg(modelData)
                 enabled: page.cardName !== "" && !page.running
                 onClicked: {
                     question.type = modelData;

@@ -8,12 +8,15 @@
 #include "loggedtest.h"
 #include "simulator/diskservicepeer.h"
 
+#include <QAccessible>
 #include <QQmlComponent>
 #include <QQmlEngine>
 #include <QQuickItem>
 #include <QQuickWindow>
+#include <QTranslator>
 #include <QtTest>
 
+#include <algorithm>
 #include <memory>
 
 namespace {
@@ -21,18 +24,30 @@ namespace {
 const QString waiting = QStringLiteral("Waiting for the disk service…");
 const QString hasVfat = QStringLiteral("File system: vfat");
 
-QQuickItem *findItem(QQuickItem *item, const QString &text)
+// Puts the texts of the page in brackets.
+class Brackets : public QTranslator
 {
-    if (item->isVisible() && item->property("text") == text) {
-        return item;
+public:
+    bool isEmpty() const override { return false; }
+    QString translate(const char *context, const char *text, const char *, int) const override
+    {
+        return qstrcmp(context, "memory-card") == 0
+            ? QStringLiteral("[%1]").arg(QLatin1String(text))
+            : QString();
+    }
+};
+
+QList<QQuickItem *> visibleItems(QQuickItem *item)
+{
+    QList<QQuickItem *> items;
+    if (item->isVisible()) {
+        items.append(item);
     }
     const auto children = item->childItems();
     for (QQuickItem *child : children) {
-        if (QQuickItem *found = findItem(child, text)) {
-            return found;
-        }
+        items += visibleItems(child);
     }
-    return nullptr;
+    return items;
 }
 
 } // namespace
@@ -55,9 +70,11 @@ private Q_SLOTS:
     void namesWhatFailed_data();
     void namesWhatFailed();
     void probesEachCard();
+    void canBeTranslated();
+    void namesTheProgressForScreenReaders();
 
 private:
-    QQuickItem *find(const QString &text) { return findItem(m_window->contentItem(), text); }
+    QQuickItem *find(const QString &text);
     bool shows(const QString &text) { return find(text) != nullptr; }
     void press(const QString &text);
     void openPage();
@@ -97,6 +114,15 @@ void TestCardPage::openPage()
     m_window->show();
     QVERIFY(QTest::qWaitForWindowExposed(m_window.get()));
     QTRY_VERIFY(!m_page->property("running").toBool());
+}
+
+QQuickItem *TestCardPage::find(const QString &text)
+{
+    const auto items = visibleItems(m_window->contentItem());
+    const auto found = std::find_if(items.begin(), items.end(), [&text](const QQuickItem *item) {
+        return item->property("text") == text;
+    });
+    return found == items.end() ? nullptr : *found;
 }
 
 void TestCardPage::press(const QString &text)
@@ -231,6 +257,44 @@ void TestCardPage::probesEachCard()
     m_helper->install(QStringLiteral("done"), "ext4\n");
     m_page->setProperty("cardName", QStringLiteral("mmcblk2p1"));
     QTRY_VERIFY(shows(QStringLiteral("File system: ext4")));
+}
+
+void TestCardPage::canBeTranslated()
+{
+    Brackets brackets;
+    QCoreApplication::installTranslator(&brackets);
+    const DiskServicePeer service({QStringLiteral("hung")});
+    openPage();
+    const auto isTranslated = [this] {
+        const auto items = visibleItems(m_window->contentItem());
+        return std::all_of(items.begin(), items.end(), [](const QQuickItem *item) {
+            const QString text = item->property("text").toString();
+            return text.isEmpty() || text.startsWith(QLatin1Char('['));
+        });
+    };
+    QVERIFY(isTranslated());
+    press(QStringLiteral("[Format as vfat]"));
+    press(QStringLiteral("[Erase]"));
+    QVERIFY(isTranslated());
+    QTRY_VERIFY(m_page->property("running").toBool());
+    QVERIFY(isTranslated());
+}
+
+// Texts and buttons name themselves.
+void TestCardPage::namesTheProgressForScreenReaders()
+{
+    const DiskServicePeer service({QStringLiteral("hung")});
+    openPage();
+    press(QStringLiteral("Mount"));
+    QTRY_VERIFY(shows(waiting));
+    const auto items = visibleItems(m_window->contentItem());
+    const auto bar = std::find_if(items.begin(), items.end(), [](const QQuickItem *item) {
+        return item->property("indeterminate").toBool();
+    });
+    QVERIFY(bar != items.end());
+    QAccessibleInterface *accessible = QAccessible::queryAccessibleInterface(*bar);
+    QVERIFY(accessible != nullptr);
+    QCOMPARE(accessible->text(QAccessible::Name), waiting);
 }
 
 QTEST_MAIN(TestCardPage)

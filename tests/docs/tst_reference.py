@@ -71,6 +71,19 @@ for name in types:
     for what, command in (("example", r"\\qml$"), ("picture", r"\\image gallery-[\w-]+\.png ")):
         if not re.search(command, comments.get(name, ""), re.MULTILINE):
             failures.append(f"the reference has no {what} for {name}")
+
+# The template of the catalog has the texts that the module itself shows.
+used = set()
+for path in sources.glob("*/*.cpp"):
+    if path.parent.name not in ("definitions-tool", "fuzz", "gallery", "tests"):
+        used |= {(id, text) for text, id in re.findall(
+            r'(?://% "(.*)"\n\s*)?.*\bqtTrId\("(.*?)"\)', path.read_text())}
+template = xml.etree.ElementTree.parse(sources / "docs/settings-system_eng_en.ts")
+for field in "source", "translation":
+    texts = {(message.get("id"), message.find(field).text) for message in template.iter("message")}
+    if texts != used:
+        failures.append(f"the catalog's template has {texts} instead of {used}")
+
 readme = (sources / "README.md").read_text()
 for name in types:
     if not re.search(rf"^\|.*`{name}`", readme, re.MULTILINE):

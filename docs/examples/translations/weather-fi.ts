@@ -1,0 +1,19 @@
+<?xml version="1.0" encoding="utf-8"?>
+<!DOCTYPE TS>
+<TS version="2.1" language="fi">
+<context>
+    <name></name>
+    <message id="weather-widget-title">
+        <source>Weather</source>
+        <translation>Sää</translation>
+    </message>
+    <message id="weather-widget-description">
+        <source>The weather of the day</source>
+        <translation>Päivän sää</translation>
+    </message>
+    <message id="weather-widget-forecast">
+        <source>Sunny, %1 °C</source>
+        <translation>Aurinkoista, %1 °C</translation>
+    </message>
+</context>
+</TS>

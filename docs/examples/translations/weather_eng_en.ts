@@ -1,0 +1,19 @@
+<?xml version="1.0" encoding="utf-8"?>
+<!DOCTYPE TS>
+<TS version="2.1" language="en">
+<context>
+    <name></name>
+    <message id="weather-widget-title">
+        <source>Weather</source>
+        <translation>Weather</translation>
+    </message>
+    <message id="weather-widget-description">
+        <source>The weather of the day</source>
+        <translation>The weather of the day</translation>
+    </message>
+    <message id="weather-widget-forecast">
+        <source>Sunny, %1 °C</source>
+        <translation>Sunny, %1 °C</translation>
+    </message>
+</context>
+</TS>

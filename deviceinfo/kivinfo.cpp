@@ -8,6 +8,7 @@
 #include <QDBusMessage>
 #include <QDBusPendingCallWatcher>
 #include <QDBusPendingReply>
+#include <QPointer>
 
 namespace {
 
@@ -127,11 +128,13 @@ void KivInfo::propertiesChanged(const QDBusMessage &message)
 {
     const QVariantMap changed = changedProperties(message);
     const auto id = changed.constFind(idProperty);
+    // A handler of the change may delete this object.
+    const QPointer<KivInfo> self(this);
     if (id != changed.constEnd()) {
         setKivId(id->toString());
     }
     const auto readiness = changed.constFind(readyProperty);
-    if (readiness != changed.constEnd()) {
+    if (self != nullptr && readiness != changed.constEnd()) {
         // A number that is too large for an int would wrap around.
         setKivReady(readiness->toLongLong() == ready);
     }

@@ -7,8 +7,8 @@
 #include "mgconfitem.h"
 
 #include <QBuffer>
-#include <QFile>
 #include <QLocale>
+#include <QPointer>
 #include <QtDebug>
 
 namespace {
@@ -41,7 +41,7 @@ QString agreementText(QLatin1String base)
 {
     const QString locale = QLocale().name();
     QString path = base + locale + suffix;
-    if (!QFile::exists(path)) {
+    if (!fileExists(path)) {
         qWarning() << "No agreement found for" << locale << ", falling back to english";
         path = base + englishSuffix;
     }
@@ -52,8 +52,7 @@ QString agreementText(QLatin1String base)
     }
     QBuffer text(&file.content);
     text.open(QIODevice::ReadOnly | QIODevice::Text);
-    // The text ends at the first NUL.
-    return QString::fromUtf8(text.readAll().constData());
+    return textUpToNul(text.readAll());
 }
 
 } // namespace
@@ -155,11 +154,16 @@ QString LocationConfiguration::mlsOnlineAgreementText() const
     Whether the user has set each switch individually. Stored in
     \c /settings/location/custom_settings_enabled (dconf, bool). False by default.
 */
-void LocationConfiguration::setCustomSettingsEnabled(bool enabled)
+void LocationConfiguration::setCustomSettingsEnabled(bool isEnabled)
 {
-    if (m_customSettingsEnabled != enabled) {
-        MGConfItem(customSettingsEnabledKey).set(enabled);
-        m_customSettingsEnabled = enabled;
+    if (m_customSettingsEnabled == isEnabled) {
+        return;
+    }
+    // Other items on the key announce the change, and their handlers may delete this object.
+    const QPointer<LocationConfiguration> self(this);
+    MGConfItem(customSettingsEnabledKey).set(isEnabled);
+    if (self != nullptr) {
+        m_customSettingsEnabled = isEnabled;
         Q_EMIT customSettingsEnabledChanged();
     }
 }
@@ -190,13 +194,17 @@ void LocationConfiguration::saveCustomSettings()
 void LocationConfiguration::restoreCustomSettings()
 {
     const QVariantMap settings = MGConfItem(customSettingsKey).value().toMap();
+    // A handler of a change may delete this object.
+    const QPointer<LocationConfiguration> self(this);
     setGpsEnabled(settings.value(gpsEntry).toBool());
-    setMlsEnabled(settings.value(mlsEntry).toBool());
+    if (self != nullptr) {
+        setMlsEnabled(settings.value(mlsEntry).toBool());
+    }
     // Read only now, because setting the other switches may have changed the states.
-    if (mlsOnlineState() != unavailable) {
+    if (self != nullptr && mlsOnlineState() != unavailable) {
         setMlsOnlineState(toState(settings.value(mlsOnlineEntry)));
     }
-    if (hereState() != unavailable) {
+    if (self != nullptr && hereState() != unavailable) {
         setHereState(toState(settings.value(hereEntry)));
     }
 }

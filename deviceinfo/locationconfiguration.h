@@ -22,7 +22,7 @@ public:
     QString hereAgreementText() const;
     QString mlsOnlineAgreementText() const;
     bool customSettingsEnabled() const { return m_customSettingsEnabled; }
-    void setCustomSettingsEnabled(bool enabled);
+    void setCustomSettingsEnabled(bool isEnabled);
 
     Q_INVOKABLE void saveCustomSettings();
     Q_INVOKABLE void restoreCustomSettings();

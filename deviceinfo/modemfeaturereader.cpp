@@ -36,14 +36,18 @@ const QLatin1String variantKey("variant");
 
     The key \c variant of \c /usr/share/modem-software/features.ini, before the first section or in
     the section \c General. Empty if there is no such file or key, if an unquoted comma makes the
-    value a list, or if the file is larger than 1 MiB or has a value that QSettings would unpack.
+    value a list, or if the file is larger than 1 MiB or mentions \c{@Variant(} or \c{@DateTime(}
+    outside a comment.
 
-    Every read of the property reads the file. There is no change signal, so a binding keeps the
-    first value: read the property in a function instead.
+    Every read of the property reads the file, unless its size and modification time are those of
+    the last read: QSettings keeps a file until one of them changes. A file that is replaced by one
+    of the same size and time keeps its old values until the process ends. There is no change
+    signal, so a binding keeps the first value: read the property in a function instead.
 */
 QString ModemFeatureReader::variant() const
 {
-    if (!isPlainIni(featuresFile)) {
+    const IniFault fault = findIniFault(featuresFile);
+    if (fault == IniFault::Unreadable || fault == IniFault::PackedValue) {
         return {};
     }
     const QSettings features(featuresFile, QSettings::IniFormat);

@@ -6,7 +6,6 @@
 #include "files/regularfile.h"
 
 #include <QBuffer>
-#include <QFile>
 #include <QtDebug>
 
 namespace {
@@ -32,7 +31,7 @@ QString findTerms(const QString &base, const QString &localeName)
     }
     for (const QString &candidate : qAsConst(candidates)) {
         QString path = base + candidate + suffix;
-        if (QFile::exists(path)) {
+        if (fileExists(path)) {
             return path;
         }
     }
@@ -43,12 +42,6 @@ QString findTerms(const QString &base, const QString &localeName)
     qWarning() << "TermsOfUseManager: unable to load locale-specific terms for locale"
                << localeName;
     return findTerms(base, english);
-}
-
-// The text ends at its first NUL.
-QString toText(const QByteArray &data)
-{
-    return QString::fromUtf8(data.constData()).trimmed();
 }
 
 QStringList readTerms(const QString &base, const QString &localeName)
@@ -67,8 +60,8 @@ QStringList readTerms(const QString &base, const QString &localeName)
     }
     QBuffer text(&file.content);
     text.open(QIODevice::ReadOnly | QIODevice::Text);
-    const QString title = toText(text.readLine());
-    const QString body = toText(text.readAll());
+    const QString title = textUpToNul(text.readLine()).trimmed();
+    const QString body = textUpToNul(text.readAll()).trimmed();
     return {title, body};
 }
 
@@ -113,12 +106,12 @@ QStringList readTerms(const QString &base, const QString &localeName)
     \qmlproperty bool TermsOfUseManager::hasVendorTermsOfUse
     \readonly
 
-    Whether \l vendorPath is set and exists. Every read checks it again, but the change signal is
+    Whether \l vendorPath is set and exists in the file system. Every read checks it again, but the change signal is
     emitted only when \l vendorPath changes.
 */
 bool TermsOfUseManager::hasVendorTermsOfUse() const
 {
-    return QFile::exists(m_vendorPath);
+    return fileExists(m_vendorPath);
 }
 
 /*!

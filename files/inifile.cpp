@@ -6,7 +6,6 @@
 #include "files/regularfile.h"
 
 #include <QByteArray>
-#include <QTextCodec>
 
 #include <algorithm>
 
@@ -45,128 +44,9 @@ int skipComment(const QByteArray &text, int position)
     return skipSpaces(text, position);
 }
 
-// Reads the elements of a value as QSettings decodes them.
-class ValueReader
+// The value of a character as a digit, or 16 for any other character.
+int digit(char character)
 {
-public:
-    ValueReader(const QByteArray &text, int start, int end, bool isUtf8)
-        : m_text(text), m_position(start), m_end(end), m_isUtf8(isUtf8)
-    {
-    }
-
-    bool atEnd() const { return m_position >= m_end; }
-    QString readElement();
-
-private:
-    void skipBlanks();
-    QString readPlain();
-    QString readEscape();
-    QChar readNumber(int base);
-    // The value of the next character as a digit, or 16 for any other character.
-    int digit() const;
-
-    const QByteArray &m_text;
-    int m_position;
-    const int m_end;
-    const bool m_isUtf8;
-};
-
-QString ValueReader::readElement()
-{
-    QString element;
-    bool hasQuotes = false;
-    bool isQuoted = false;
-    int escaped = 0; // The end of the last escape, up to which blanks are kept.
-    skipBlanks();
-    while (!atEnd()) {
-        const char character = m_text.at(m_position);
-        if (character == ',' && !isQuoted) {
-            ++m_position;
-            break;
-        }
-        if (character == '"') {
-            ++m_position;
-            hasQuotes = true;
-            isQuoted = !isQuoted;
-            if (!isQuoted) {
-                skipBlanks();
-            }
-        } else if (character == '\\') {
-            ++m_position;
-            element += readEscape();
-            escaped = element.size();
-        } else {
-            element += readPlain();
-        }
-    }
-    int size = element.size();
-    while (!hasQuotes && size > escaped
-           && (element.at(size - 1) == QLatin1Char(' ')
-               || element.at(size - 1) == QLatin1Char('\t'))) {
-        --size;
-    }
-    element.truncate(size);
-    return element;
-}
-
-void ValueReader::skipBlanks()
-{
-    while (!atEnd() && isBlank(m_text.at(m_position))) {
-        ++m_position;
-    }
-}
-
-QString ValueReader::readPlain()
-{
-    const auto text = m_text.cbegin();
-    const auto start = text + m_position;
-    const auto end = std::find_if(start + 1, text + m_end, [](char character) {
-        return character == '\\' || character == '"' || character == ',';
-    });
-    m_position = int(end - text);
-    const int size = int(end - start);
-    // The codec also removes a byte-order mark from each piece of text.
-    return m_isUtf8 ? QTextCodec::codecForName("UTF-8")->toUnicode(start, size)
-                    : QString::fromLatin1(start, size);
-}
-
-QString ValueReader::readEscape()
-{
-    if (atEnd()) {
-        return {};
-    }
-    const char character = m_text.at(m_position);
-    if (isBreak(character)) {
-        m_position += isBreakOfTwo(m_text, m_position, m_end) ? 2 : 1;
-        return {};
-    }
-    if (digit() < 8) {
-        return readNumber(8);
-    }
-    ++m_position;
-    if (character == 'x') {
-        return digit() < 16 ? QString(readNumber(16)) : QString();
-    }
-    // QSettings ignores a backslash before any other character, together with that character.
-    const QByteArray letters = QByteArrayLiteral("abfnrtv\"?'\\");
-    const QByteArray meanings = QByteArrayLiteral("\a\b\f\n\r\t\v\"?'\\");
-    const int letter = letters.indexOf(character);
-    return letter < 0 ? QString() : QString(QLatin1Char(meanings.at(letter)));
-}
-
-QChar ValueReader::readNumber(int base)
-{
-    uint number = 0;
-    for (; digit() < base; ++m_position) {
-        number = number * uint(base) + uint(digit());
-    }
-    // QSettings drops the upper bits.
-    return {ushort(number)};
-}
-
-int ValueReader::digit() const
-{
-    const char character = atEnd() ? ' ' : m_text.at(m_position);
     if (character >= '0' && character <= '9') {
         return character - '0';
     }
@@ -174,52 +54,66 @@ int ValueReader::digit() const
     return lower >= 'a' && lower <= 'f' ? lower - 'a' + 10 : 16;
 }
 
-bool isPackedElement(const QString &element)
+// What QSettings would make of a value, without all that it might leave out: quotes, white space,
+// byte-order marks, and escapes that are not numbers.
+QByteArray withoutEscapes(const QByteArray &value)
 {
-    return element.endsWith(QLatin1Char(')'))
-        && (element.startsWith(QLatin1String("@Variant("))
-            || element.startsWith(QLatin1String("@DateTime(")));
+    const QByteArray leftOut = "\" \t\r\n\xef\xbb\xbf";
+    QByteArray plain;
+    for (int at = 0; at < value.size(); ++at) {
+        if (value.at(at) != '\\') {
+            plain += leftOut.contains(value.at(at)) ? QByteArray() : value.mid(at, 1);
+            continue;
+        }
+        ++at; // to the first digit, or to the character that the backslash escapes
+        const bool isHexadecimal = value.mid(at, 1) == "x";
+        const int base = isHexadecimal ? 16 : 8;
+        int next = isHexadecimal ? at + 1 : at;
+        ushort number = 0; // QSettings, too, drops the upper bits.
+        bool isNumber = false;
+        for (; next < value.size() && digit(value.at(next)) < base; ++next) {
+            number = ushort(number * base + digit(value.at(next)));
+            isNumber = true;
+        }
+        if (isNumber) {
+            plain += number < 0x80 ? char(number) : '?';
+            at = next - 1;
+        }
+    }
+    return plain;
 }
 
-bool isPackedValue(const QByteArray &text, int start, int end)
+// QSettings unpacks fewer values: only those that begin and end so, as a whole or in a list.
+bool mentionsPackedValue(const QByteArray &value)
 {
     // Nearly every value has neither an "@" nor a backslash, which may encode an "@".
-    const auto value = text.cbegin();
-    if (std::none_of(value + start, value + end,
-                     [](char character) { return character == '@' || character == '\\'; })) {
+    if (!value.contains('@') && !value.contains('\\')) {
         return false;
     }
-    ValueReader reader(text, start, end, text.startsWith(iniByteOrderMark));
-    bool isPacked = false;
-    while (!isPacked && !reader.atEnd()) {
-        isPacked = isPackedElement(reader.readElement());
-    }
-    return isPacked;
-}
-
-bool isPlain(const RegularFile &file, bool needsClosedSections)
-{
-    if (file.state != RegularFile::State::Read) {
-        return file.state == RegularFile::State::NotOpened;
-    }
-    IniLine line = nextIniLine(file.content, 0);
-    while (line.kind != IniLine::Kind::None && !line.isPacked
-           && (line.isClosed || !needsClosedSections)) {
-        line = nextIniLine(file.content, line.end);
-    }
-    return line.kind == IniLine::Kind::None;
+    const QByteArray plain = withoutEscapes(value);
+    return plain.contains("@Variant(") || plain.contains("@DateTime(");
 }
 
 } // namespace
 
-bool isPlainIni(const QString &path)
+IniFault findIniFault(const QString &path)
 {
-    return isPlain(readRegularFile(path, maximumIniSize), false);
-}
-
-bool isWellFormedIni(const QString &path)
-{
-    return isPlain(readRegularFile(path, maximumIniSize), true);
+    const RegularFile file = readRegularFile(path, maximumIniSize);
+    if (file.state == RegularFile::State::NotOpened) {
+        return IniFault::None;
+    }
+    if (file.state != RegularFile::State::Read) {
+        return IniFault::Unreadable;
+    }
+    IniFault fault = IniFault::None;
+    for (IniLine line = nextIniLine(file.content, 0); line.kind != IniLine::Kind::None;
+         line = nextIniLine(file.content, line.end)) {
+        if (line.isPacked) {
+            return IniFault::PackedValue;
+        }
+        fault = line.isClosed ? fault : IniFault::UnclosedSection;
+    }
+    return fault;
 }
 
 IniLine nextIniLine(const QByteArray &text, int position)
@@ -261,7 +155,7 @@ IniLine nextIniLine(const QByteArray &text, int position)
     } else if (equals >= 0) {
         line.kind = IniLine::Kind::Key;
         line.nameEnd = equals;
-        line.isPacked = isPackedValue(text, equals + 1, line.end);
+        line.isPacked = mentionsPackedValue(text.mid(equals + 1, line.end - equals - 1));
     } else {
         line.kind = IniLine::Kind::Other;
     }

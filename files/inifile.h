@@ -14,18 +14,26 @@ constexpr qint64 maximumIniSize = qint64(1024) * 1024;
 // If a file begins with this mark, QSettings reads values as UTF-8, otherwise as Latin-1.
 constexpr const char *iniByteOrderMark = "\xef\xbb\xbf";
 
+// Why a file is not read with QSettings.
+enum class IniFault {
+    None,
+    Unreadable, // Not a regular file, larger than a mebibyte, or damaged.
+    PackedValue,
+    // QSettings reports it only the first time that it reads a file. It then reads an unchanged file
+    // from a cache.
+    UnclosedSection,
+};
+
 /*
-    Whether QSettings may read the file: it is regular, not larger than a mebibyte, and has no value
-    that QSettings would unpack. A few bytes of @Variant(...) or @DateTime(...) make it allocate all
-    memory, or recurse until the process ends.
+    Returns the worst fault of a file.
 
-    Also true if the file cannot be opened: QSettings reports that.
+    A few bytes of @Variant(...) or @DateTime(...) make QSettings allocate all memory, or recurse
+    until the process ends. The file is refused if a value mentions either, however it is spelt, even
+    where QSettings would not unpack it.
+
+    A file that cannot be opened has no fault: QSettings reports that.
 */
-bool isPlainIni(const QString &path);
-
-// Whether the file is plain and closes the name of each section. QSettings reports an unclosed name
-// only the first time that it reads a file. It then reads an unchanged file from a cache.
-bool isWellFormedIni(const QString &path);
+IniFault findIniFault(const QString &path);
 
 // A line of a settings file as QSettings reads it: quotes and backslashes may join several lines of
 // the text, and a semicolon ends one. Comments and empty lines are left out.
@@ -43,7 +51,7 @@ struct IniLine {
     int nameEnd = 0; // Of a section or a key.
     // Whether the name of a section ends on its line.
     bool isClosed = true;
-    // Whether QSettings would unpack the value of a key, or an element of a list.
+    // Whether the value of a key mentions a packed value.
     bool isPacked = false;
 };
 

@@ -6,7 +6,6 @@
 #include <QFile>
 
 #include <algorithm>
-#include <array>
 #include <cerrno>
 
 #include <fcntl.h>
@@ -27,49 +26,8 @@ RegularFile tooLarge(qint64 maximumSize)
             QStringLiteral("file to open is larger than %1 bytes").arg(maximumSize)};
 }
 
-RegularFile readAll(int descriptor, const struct stat &entry, qint64 maximumSize)
-{
-    if (entry.st_size > maximumSize) {
-        return tooLarge(maximumSize);
-    }
-    // In /proc, files of any size claim to be empty.
-    QByteArray content(int(entry.st_size > 0 ? entry.st_size : maximumSize + 1), Qt::Uninitialized);
-    int size = 0;
-    ssize_t count = 0;
-    // Some file systems return fewer bytes at a time than requested.
-    do {
-        count = read(descriptor, content.data() + size, size_t(content.size() - size));
-        size += int(qMax(count, ssize_t(0)));
-    } while (count > 0 && size < content.size());
-    if (count < 0) {
-        return {State::Failed, {}, qt_error_string(errno)};
-    }
-    content.truncate(size);
-    return size > maximumSize ? tooLarge(maximumSize) : RegularFile{State::Read, content, {}};
-}
-
-RegularFile readLine(int descriptor, const struct stat & /*entry*/, qint64 maximumSize)
-{
-    QByteArray line;
-    std::array<char, 4096> buffer;
-    ssize_t count = 0;
-    while ((count = read(descriptor, buffer.data(), buffer.size())) > 0) {
-        const auto *const end = std::find_if(buffer.data(), buffer.data() + count,
-                                             [](char c) { return c == '\n' || c == '\0'; });
-        line.append(buffer.data(), int(end - buffer.data()));
-        if (line.size() > maximumSize) {
-            return tooLarge(maximumSize);
-        }
-        if (end != buffer.data() + count) {
-            break;
-        }
-    }
-    return count < 0 ? RegularFile{State::Failed, {}, qt_error_string(errno)}
-                     : RegularFile{State::Read, line, {}};
-}
-
-template<typename Reader>
-RegularFile readWith(Reader reader, const QString &path, qint64 maximumSize)
+// The content is empty, and the file is open unless the state is another one than Read.
+RegularFile openRegularFile(QFile *file, const QString &path)
 {
     // open() would cut the path at the NUL and open another file.
     if (path.contains(QChar::Null)) {
@@ -81,27 +39,66 @@ RegularFile readWith(Reader reader, const QString &path, qint64 maximumSize)
         return {State::NotOpened, {}, qt_error_string(errno)};
     }
     struct stat entry = {};
-    RegularFile file;
-    if (fstat(descriptor, &entry) == 0 && S_ISREG(entry.st_mode)) {
-        file = reader(descriptor, entry, maximumSize);
-    } else {
-        file = {State::NotRegular,
-                {},
-                S_ISDIR(entry.st_mode) ? QStringLiteral("file to open is a directory")
-                                       : QStringLiteral("file to open is not a regular file")};
-    }
-    close(descriptor);
-    return file;
+    const bool isRegular = fstat(descriptor, &entry) == 0 && S_ISREG(entry.st_mode);
+    file->open(descriptor, QIODevice::ReadOnly, QFileDevice::AutoCloseHandle);
+    return {isRegular ? State::Read : State::NotRegular,
+            {},
+            isRegular                    ? QString()
+                : S_ISDIR(entry.st_mode) ? QStringLiteral("file to open is a directory")
+                                         : QStringLiteral("file to open is not a regular file")};
 }
 
 } // namespace
 
 RegularFile readRegularFile(const QString &path, qint64 maximumSize)
 {
-    return readWith(readAll, path, maximumSize);
+    QFile file;
+    RegularFile result = openRegularFile(&file, path);
+    if (result.state != State::Read) {
+        return result;
+    }
+    if (file.size() > maximumSize) {
+        return tooLarge(maximumSize);
+    }
+    // In /proc, files of any size claim to be empty.
+    const qint64 size = file.size() > 0 ? file.size() : maximumSize + 1;
+    QByteArray piece;
+    // Some file systems return fewer bytes at a time than requested.
+    do {
+        piece = file.read(size - result.content.size());
+        result.content += piece;
+    } while (!piece.isEmpty() && result.content.size() < size);
+    if (file.error() != QFileDevice::NoError) {
+        return {State::Failed, {}, file.errorString()};
+    }
+    return result.content.size() > maximumSize ? tooLarge(maximumSize) : result;
 }
 
 RegularFile readFirstLine(const QString &path, qint64 maximumSize)
 {
-    return readWith(readLine, path, maximumSize);
+    QFile file;
+    RegularFile result = openRegularFile(&file, path);
+    if (result.state != State::Read) {
+        return result;
+    }
+    // With room for the line break.
+    const QByteArray line = file.readLine(maximumSize + 2);
+    if (file.error() != QFileDevice::NoError) {
+        return {State::Failed, {}, file.errorString()};
+    }
+    const auto end = std::find_if(line.cbegin(), line.cend(), [](char character) {
+        return character == '\n' || character == '\0';
+    });
+    result.content = line.left(int(end - line.cbegin()));
+    return result.content.size() > maximumSize ? tooLarge(maximumSize) : result;
+}
+
+QString textUpToNul(const QByteArray &content)
+{
+    return QString::fromUtf8(content.constData());
+}
+
+bool fileExists(const QString &path)
+{
+    return !path.contains(QChar::Null) && access(QFile::encodeName(path).constData(), F_OK) == 0;
 }

@@ -31,4 +31,11 @@ RegularFile readRegularFile(const QString &path, qint64 maximumSize);
 // Reads up to the first newline or NUL, without it. The size limit applies only to this part.
 RegularFile readFirstLine(const QString &path, qint64 maximumSize);
 
+// Decodes UTF-8 up to the first NUL.
+QString textUpToNul(const QByteArray &content);
+
+// Whether there is an entry of any kind. QFile::exists() would also accept resources of the program,
+// and log messages about a NUL in the path.
+bool fileExists(const QString &path);
+
 #endif

@@ -65,15 +65,6 @@ bool isPlain(const QVariant &value)
     }
 }
 
-bool hasBrokenSection(const QByteArray &text)
-{
-    IniLine line = nextIniLine(text, 0);
-    while (line.kind != IniLine::Kind::None && line.isClosed) {
-        line = nextIniLine(text, line.end);
-    }
-    return !line.isClosed;
-}
-
 } // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t *data, std::size_t size)
@@ -93,10 +84,17 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t *data, std::size_t size
     // yet.
     const QString unread =
         Fuzzing::writeFile((QByteArray::number(number) + ".ini").constData(), content);
-    const bool isBroken =
-        QSettings(unread, QSettings::IniFormat).status() == QSettings::FormatError;
+    const IniFault fault = findIniFault(unread);
+    QSettings settings(unread, QSettings::IniFormat);
+    const bool isBroken = settings.status() == QSettings::FormatError;
     QFile::remove(unread);
-    Fuzzing::require(isBroken == hasBrokenSection(content), "broken files are known");
+    Fuzzing::require(fault == IniFault::PackedValue
+                         || isBroken == (fault == IniFault::UnclosedSection),
+                     "broken files are known");
+    const QStringList keys = fault == IniFault::PackedValue ? QStringList() : settings.allKeys();
+    for (const QString &key : keys) {
+        Fuzzing::require(isPlain(settings.value(key)), "QSettings unpacks nothing");
+    }
 
     const QVariantMap config = action.config();
     Fuzzing::require(std::all_of(config.cbegin(), config.cend(), isPlain), "values are plain");

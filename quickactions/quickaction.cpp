@@ -127,7 +127,7 @@ bool QuickAction::operator==(const QuickAction &other) const
 
 QVariantMap QuickAction::readActionConfig(const QString &path) const
 {
-    if (!isWellFormedIni(path)) {
+    if (findIniFault(path) != IniFault::None) {
         qWarning("Unable to open action file");
         return {};
     }

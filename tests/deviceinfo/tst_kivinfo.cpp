@@ -487,8 +487,13 @@ void TestKivInfo::aHandlerMayCallBack()
     // A page that closes because its cover was taken off.
     QPointer<KivInfo> page = new KivInfo;
     QTRY_VERIFY(isSettled(*page));
-    connect(page, &KivInfo::kivIdChanged, page, &QObject::deleteLater);
+    connect(page, &KivInfo::kivIdChanged, this, [&page] { delete page; });
     daemon.sendChanges({{idProperty, QString()}, {readyProperty, 0}});
+    QTRY_VERIFY(page == nullptr);
+    // The handler of a reply may delete it as well.
+    answerBoth(daemon, {cover}, {1});
+    page = new KivInfo;
+    connect(page, &KivInfo::kivIdChanged, this, [&page] { delete page; });
     QTRY_VERIFY(page == nullptr);
 }
 

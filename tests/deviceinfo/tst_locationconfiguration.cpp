@@ -37,6 +37,7 @@ private Q_SLOTS:
     void restores();
     void statesAreReadAfterTheSwitchesBefore();
     void restoresInOrder();
+    void mayBeDeletedInAnyHandler();
     void anotherObjectRestores();
     void sharesWithAnotherProcess();
     void restoresOverChangesThatAreNotDeliveredYet();
@@ -316,6 +317,31 @@ void TestLocationConfiguration::restoresInOrder()
     recordChanges(&configuration, &changes);
     configuration.restoreCustomSettings();
     QCOMPARE(changes.join(QLatin1Char(',')), QStringLiteral("gps 1,mls 1,mls online 2,here 2"));
+}
+
+void TestLocationConfiguration::mayBeDeletedInAnyHandler()
+{
+    store(savedKey, savedMap(true, true, true, true));
+    using Signal = void (LocationSettings::*)();
+    const QList<Signal> changes = {
+        &LocationSettings::gpsEnabledChanged, &LocationSettings::mlsEnabledChanged,
+        &LocationSettings::mlsOnlineStateChanged, &LocationSettings::hereStateChanged};
+    for (int i = 0; i < changes.size(); ++i) {
+        setSwitches({0, 0, 1, 1});
+        auto *configuration = new LocationConfiguration;
+        connect(configuration, changes.at(i), this, [configuration] { delete configuration; });
+        configuration->restoreCustomSettings();
+        // The later switches stay as they are.
+        const Switches restored = {1, 1, 2, 2};
+        QCOMPARE(switchesOf(LocationSettings()),
+                 restored.mid(0, i + 1) + Switches({0, 0, 1, 1}).mid(i + 1));
+    }
+
+    auto *configuration = new LocationConfiguration;
+    const MGConfItem flag(flagKey);
+    connect(&flag, &MGConfItem::valueChanged, this, [configuration] { delete configuration; });
+    configuration->setCustomSettingsEnabled(true);
+    QCOMPARE(stored(flagKey), QVariant(true));
 }
 
 void TestLocationConfiguration::anotherObjectRestores()

@@ -112,8 +112,11 @@ void TestTermsOfUseManager::hasVendorTermsOfUse()
     QVERIFY(!manager.hasVendorTermsOfUse());
     Files::write(vendorDirectory, {});
     QVERIFY(manager.hasVendorTermsOfUse());
-    manager.setVendorPath(QString());
-    QVERIFY(!manager.hasVendorTermsOfUse());
+    // Qt's resources are not in the file system, and a path ends at no NUL.
+    for (const QString &path : {QString(), QStringLiteral(":/"), vendorDirectory + QChar::Null}) {
+        manager.setVendorPath(path);
+        QVERIFY(!manager.hasVendorTermsOfUse());
+    }
 }
 
 void TestTermsOfUseManager::readsNothingBeforeItIsAsked()

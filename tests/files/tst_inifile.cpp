@@ -1,7 +1,7 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-// Compares the scanner of settings files with QSettings, which it protects.
+// Compares the check of settings files with QSettings, which it protects.
 
 #include "files.h"
 #include "files/inifile.h"
@@ -13,12 +13,16 @@
 #include <algorithm>
 #include <random>
 
+Q_DECLARE_METATYPE(IniFault)
+
 class TestIniFile : public QObject
 {
     Q_OBJECT
 
 private Q_SLOTS:
-    void acceptsExactlyWhatQSettingsDoesNotUnpack();
+    void findsFaults_data();
+    void findsFaults();
+    void acceptsNothingThatQSettingsUnpacks();
 };
 
 namespace {
@@ -44,16 +48,6 @@ QVector<QVariant> valuesOf(const QSettings &settings)
         }
     }
     return values;
-}
-
-int countKeys(const QByteArray &text)
-{
-    int keys = 0;
-    for (IniLine line = nextIniLine(text, 0); line.kind != IniLine::Kind::None;
-         line = nextIniLine(text, line.end)) {
-        keys += line.kind == IniLine::Kind::Key ? 1 : 0;
-    }
-    return keys;
 }
 
 // Pieces of text that have a special meaning, or look like it. Their packed values are harmless in
@@ -125,7 +119,41 @@ QByteArray randomFile(std::mt19937 *random)
 
 } // namespace
 
-void TestIniFile::acceptsExactlyWhatQSettingsDoesNotUnpack()
+void TestIniFile::findsFaults_data()
+{
+    QTest::addColumn<QByteArray>("content");
+    QTest::addColumn<IniFault>("fault");
+    const auto row = [](const char *name, const QByteArray &content, IniFault fault) {
+        QTest::newRow(name) << content << fault;
+    };
+    row("keys and sections", "a=b\n[s]\nc=\"@\", x\n[t]", IniFault::None);
+    row("comment", "; a=@Variant(b)\nc=d ; @DateTime(\n", IniFault::None);
+    row("no value", "@Variant(\n[@DateTime(]\n@Variant(a)=b\n", IniFault::None);
+    row("other at signs", "a=@Vari@ant(, @variant(, @ByteArray(b), @DateTime, Variant(\n",
+        IniFault::None);
+    row("escaped blank", "a=@Va\\x20riant(\n", IniFault::None);
+    row("other character", "a=\\x140Variant(\n", IniFault::None);
+    row("in a text", "a=such as @Variant(b)\n", IniFault::PackedValue);
+    row("not closed", "a=@DateTime(\n", IniFault::PackedValue);
+    row("behind an unclosed section", "[s\na=@Variant(b)\n", IniFault::PackedValue);
+    row("unclosed section", "a=b\n[s\n[t]\n", IniFault::UnclosedSection);
+    row("section closed in the next line", "[s\n]\n", IniFault::UnclosedSection);
+    row("largest", QByteArray(int(maximumIniSize), 'x'), IniFault::None);
+    row("too large", QByteArray(int(maximumIniSize) + 1, 'x'), IniFault::Unreadable);
+}
+
+void TestIniFile::findsFaults()
+{
+    QFETCH(QByteArray, content);
+    const QTemporaryDir directory(QStringLiteral("/run/ini-XXXXXX"));
+    const QString path = directory.filePath(QStringLiteral("file"));
+    QCOMPARE(findIniFault(path), IniFault::None); // QSettings cannot open it, either.
+    QCOMPARE(findIniFault(directory.path()), IniFault::Unreadable);
+    Files::write(path, content);
+    QTEST(findIniFault(path), "fault");
+}
+
+void TestIniFile::acceptsNothingThatQSettingsUnpacks()
 {
     bool isNumber = false;
     const int requested = qEnvironmentVariableIntValue("INI_FILES", &isNumber);
@@ -137,26 +165,25 @@ void TestIniFile::acceptsExactlyWhatQSettingsDoesNotUnpack()
     qInstallMessageHandler([](QtMsgType, const QMessageLogContext &, const QString &) {});
     const QTemporaryDir directory(QStringLiteral("/run/ini-XXXXXX"));
     int unpacked = 0;
+    int accepted = 0;
     for (int i = 0; i < files; ++i) {
         const QByteArray text = randomFile(&random);
         // QSettings does not reread a file if its name is the same and it looks unchanged.
         const QString path = directory.filePath(QString::number(i));
         Files::write(path, text);
-        const bool isPlain = isPlainIni(path);
+        const bool isAccepted = findIniFault(path) != IniFault::PackedValue;
         const QVector<QVariant> values = valuesOf(QSettings(path, QSettings::IniFormat));
         const bool unpacks = std::any_of(values.cbegin(), values.cend(), isUnpacked);
         Files::remove(path);
-        QVERIFY2(!isPlain || !unpacks, "accepted: " + text.toPercentEncoding(" =@()\"\\,;[]\n"));
-        // If a key occurs twice, QSettings returns only the last value.
-        if (countKeys(text) == values.size()) {
-            QVERIFY2(isPlain || unpacks, "refused: " + text.toPercentEncoding(" =@()\"\\,;[]\n"));
-        }
+        QVERIFY2(!isAccepted || !unpacks, "accepted: " + text.toPercentEncoding(" =@()\"\\,;[]\n"));
+        accepted += isAccepted ? 1 : 0;
         unpacked += unpacks ? 1 : 0;
     }
     QVERIFY2(unpacked > files / 50, qPrintable(QString::number(unpacked)));
-    QVERIFY(unpacked < files / 2);
+    // Few files are refused without need.
+    QVERIFY2(accepted > files * 6 / 10, qPrintable(QString::number(accepted)));
     qInstallMessageHandler(nullptr);
-    qInfo("%d files, of which QSettings unpacks %d", files, unpacked);
+    qInfo("%d files, of which %d are accepted and QSettings unpacks %d", files, accepted, unpacked);
 }
 
 QTEST_GUILESS_MAIN(TestIniFile)

@@ -5,8 +5,8 @@ import QtQuick.Controls 2.15
 Column {
     Label {
         width: parent.width
-        //% "Sunny, %1 °C"
-        text: qsTrId("weather-widget-forecast").arg(21)
+        //% "Sunny, with a light wind"
+        text: qsTrId("weather-widget-forecast")
         wrapMode: Text.Wrap
     }
 }

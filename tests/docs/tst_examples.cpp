@@ -67,6 +67,7 @@ private Q_SLOTS:
     void initTestCase();
     void definesAQuickAction();
     void definesAWidget();
+    void loadsTheWidget();
     void listsTheActionOnAPage();
     void runsThoseOfTheReference_data();
     void runsThoseOfTheReference();
@@ -143,6 +144,23 @@ void TestExamples::definesAWidget()
     Files::write(programPath, "");
     QVERIFY(QMetaObject::invokeMethod(model, "updateAvailable"));
     QCOMPARE(valueAt(*model, 0, "available"), QVariant(true));
+}
+
+// As the manual page says, the home screen sets the width, and the widget its height.
+void TestExamples::loadsTheWidget()
+{
+    const QByteArray file = SOURCE_DIR "/docs/examples/EventsWidget.qml";
+    const auto object = create("import QtQuick 2.15\nLoader { source: \"file://" + file + "\" }");
+    auto *loader = qobject_cast<QQuickItem *>(object.get());
+    QVERIFY(loader != nullptr);
+    QQuickWindow window;
+    loader->setParentItem(window.contentItem());
+    window.show();
+    loader->setWidth(1000);
+    QTRY_VERIFY(loader->height() > 0);
+    const qreal height = loader->height();
+    loader->setWidth(20);
+    QTRY_VERIFY(loader->height() > height);
 }
 
 void TestExamples::listsTheActionOnAPage()
@@ -224,6 +242,7 @@ void TestExamples::standInTheManualPages_data()
     };
     row("docs/man/marlo-quickactions.5", "torch.conf");
     row("docs/man/marlo-eventswidgets.5", "weather.json");
+    row("docs/man/marlo-eventswidgets.5", "EventsWidget.qml");
 }
 
 void TestExamples::standInTheManualPages()

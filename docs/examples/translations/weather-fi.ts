@@ -12,8 +12,8 @@
         <translation>Päivän sää</translation>
     </message>
     <message id="weather-widget-forecast">
-        <source>Sunny, %1 °C</source>
-        <translation>Aurinkoista, %1 °C</translation>
+        <source>Sunny, with a light wind</source>
+        <translation>Aurinkoista ja heikkoa tuulta</translation>
     </message>
 </context>
 </TS>

@@ -12,8 +12,8 @@
         <translation>The weather of the day</translation>
     </message>
     <message id="weather-widget-forecast">
-        <source>Sunny, %1 °C</source>
-        <translation>Sunny, %1 °C</translation>
+        <source>Sunny, with a light wind</source>
+        <translation>Sunny, with a light wind</translation>
     </message>
 </context>
 </TS>

@@ -11,10 +11,38 @@ import "controls/display.js" as Display
     The page on which a user chooses quick actions and puts them in order.
 */
 GalleryPage {
+    id: page
+
     // Ordering needs a model of its own: move() expects that the rows are the user's list. With
     // showPotential, they are not.
-    QuickActionsModel {
-        id: enabledActions
+    property QuickActionsModel enabledActions: QuickActionsModel {}
+
+    function paths(model) {
+        return Array.from({ length: model.count }, (none, i) => model.get(i).path);
+    }
+
+    // The list differs from the rows if it names an action that is not installed, or after another
+    // program has changed it. Then move() moves other entries, so the page enables the actions again
+    // in the order of its rows.
+    function move(from, to) {
+        const rows = paths(enabledActions);
+        rows.splice(to, 0, rows.splice(from, 1)[0]);
+        enabledActions.move(from, to);
+        const stored = enabledActionsComponent.createObject(page);
+        if (String(paths(stored)) === String(rows)) {
+            stored.destroy();
+            return;
+        }
+        rows.forEach(path => {
+            stored.disableAction(path);
+            stored.enableAction(path);
+        });
+        enabledActions = stored;
+    }
+
+    Component {
+        id: enabledActionsComponent
+        QuickActionsModel {}
     }
 
     QuickActionsModel {
@@ -31,7 +59,7 @@ GalleryPage {
             model: enabledActions
             upText: qsTrId("gallery-move-up")
             downText: qsTrId("gallery-move-down")
-            onMoved: enabledActions.move(from, to)
+            onMoved: page.move(from, to)
         }
         Note {
             visible: enabledActions.count === 0

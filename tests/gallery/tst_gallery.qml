@@ -3,6 +3,7 @@
 
 import QtQuick 2.15
 import QtTest 1.15
+import com.marlo.settings.system 1.0
 import gallery.simulation 1.0
 import "../../gallery"
 import "screen.js" as Screen
@@ -434,6 +435,51 @@ TestCase {
         see("No quick action is enabled.");
         tap("Quick actions are installed");
         see("Take a photo");
+    }
+
+    Component {
+        id: actionFile
+        SimulatedFiles {}
+    }
+
+    Component {
+        id: otherActions
+        QuickActionsModel {}
+    }
+
+    // The rows are what the user ordered, although the list has an action that is not installed, and
+    // although another model has changed the order.
+    function test_orderWhileTheListDiffers() {
+        const torch = createTemporaryObject(actionFile, test,
+                                            { path: "/usr/share/glimmera/quickactions/torch.conf" });
+        const other = createTemporaryObject(otherActions, test);
+        const key = "/desktop/glimmera-marlo-home/events_screen_actions";
+        const file = path => path.replace(/^.*\/|\.conf$/g, "");
+        const before = root.key(key).map(path => path);
+        openPage("quick-actions-settings");
+        see("Take a photo");
+        const list = Screen.visibleItems(surface).find(item => item.rowHeight);
+        const press = name => {
+            Screen.visibleItems(list).find(item => item.Accessible.name === name)
+                  .forceActiveFocus(Qt.TabFocusReason);
+            keyClick(Qt.Key_Return);
+        };
+        torch.present = false;
+        until(() => rowsOf(list).join() === "Take a photo,Navigate home,New alarm", "removed");
+        press("Move up: Navigate home");
+        until(() => rowsOf(list).join() === "Navigate home,Take a photo,New alarm", "moved");
+        until(() => root.key(key).map(file).join() === "torch,navigate-home,camera,new-alarm", "stored");
+        torch.present = true;
+        until(() => rowsOf(list).join() === "Torch,Navigate home,Take a photo,New alarm", "installed");
+
+        tryCompare(other, "count", 4);
+        other.move(3, 0);
+        until(() => file(root.key(key)[0]) === "new-alarm", "another order");
+        press("Move up: Take a photo");
+        until(() => rowsOf(list).join() === "Torch,Take a photo,Navigate home,New alarm", "moved again");
+        until(() => root.key(key).map(file).join() === "torch,camera,navigate-home,new-alarm", "stored");
+        press("Move up: Take a photo");
+        until(() => root.key(key).join() === before.join(), "as before");
     }
 
     function test_eventsWidgets() {

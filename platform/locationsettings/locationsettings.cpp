@@ -3,16 +3,19 @@
 
 #include "locationsettings.h"
 
+#include "files/literals.h"
 #include "mgconfitem.h"
 
-#include <QtDebug>
+#include <QLoggingCategory>
 
 namespace {
 
-const QLatin1String gpsEnabledKey("/settings/location/gps_enabled");
-const QLatin1String mlsEnabledKey("/settings/location/mls_enabled");
-const QLatin1String mlsOnlineStateKey("/settings/location/mls_online_state");
-const QLatin1String hereStateKey("/settings/location/here_state");
+Q_LOGGING_CATEGORY(lcPlatformLog, "org.tarnwickos.settings.platform", QtWarningMsg)
+
+constexpr QLatin1String gpsEnabledKey = "/settings/location/gps_enabled"_L1;
+constexpr QLatin1String mlsEnabledKey = "/settings/location/mls_enabled"_L1;
+constexpr QLatin1String mlsOnlineStateKey = "/settings/location/mls_online_state"_L1;
+constexpr QLatin1String hereStateKey = "/settings/location/here_state"_L1;
 
 bool isState(int number)
 {
@@ -37,7 +40,8 @@ LocationSettings::OnlineAGpsState toState(const QVariant &stored)
 void store(MGConfItem *item, LocationSettings::OnlineAGpsState state)
 {
     if (!isState(state)) {
-        qWarning("LocationSettings: %d is not a state of an online service", int(state));
+        qCWarning(lcPlatformLog).nospace()
+            << "LocationSettings: " << int(state) << " is not a state of an online service";
     } else if (toState(item->value()) != state) {
         item->set(int(state));
     }
@@ -110,12 +114,13 @@ MGConfItem *LocationSettings::follow(const QString &key, Value (*fromStored)(con
                                      void (LocationSettings::*changed)())
 {
     auto *const item = new MGConfItem(key, this);
-    connect(item, &MGConfItem::valueChanged, this, [=, last = fromStored(item->value())]() mutable {
-        const Value value = fromStored(item->value());
-        if (last != value) {
-            last = value;
-            Q_EMIT(this->*changed)(); // the last step: a slot may delete this object
-        }
-    });
+    connect(item, &MGConfItem::valueChanged, this,
+            [this, item, fromStored, changed, last = fromStored(item->value())]() mutable {
+                const Value value = fromStored(item->value());
+                if (last != value) {
+                    last = value;
+                    Q_EMIT(this->*changed)(); // the last step: a slot may delete this object
+                }
+            });
     return item;
 }

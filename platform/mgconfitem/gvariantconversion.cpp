@@ -80,7 +80,7 @@ GVariantPtr convertMap(const QVariantMap &map, QString *reason)
     for (auto it = map.cbegin(); it != map.cend(); ++it) {
         const GVariantPtr converted =
             isUnicodeWithoutNul(it.key()) ? convertPlain(it.value(), reason) : refuseText(reason);
-        if (!converted) {
+        if (converted == nullptr) {
             g_variant_builder_clear(&builder);
             return nullptr;
         }
@@ -91,14 +91,13 @@ GVariantPtr convertMap(const QVariantMap &map, QString *reason)
 
 QVariant convert(GVariant *value);
 
-QString text(GVariant *value)
+QString toText(GVariant *value)
 {
     gsize length = 0;
     const char *const utf8 = g_variant_get_string(value, &length);
-    const QString text = QString::fromUtf8(utf8, static_cast<int>(length));
+    const QString text = QString::fromUtf8(utf8, int(length));
     // QString takes U+FEFF at the start for a byte order mark and drops it.
-    const bool marked =
-        QByteArray::fromRawData(utf8, static_cast<int>(length)).startsWith("\xEF\xBB\xBF");
+    const bool marked = QByteArray::fromRawData(utf8, int(length)).startsWith("\xEF\xBB\xBF");
     return marked ? QChar(QChar::ByteOrderMark) + text : text;
 }
 
@@ -107,35 +106,35 @@ GVariantPtr childAt(GVariant *container, gsize index)
     return GVariantPtr(g_variant_get_child_value(container, index));
 }
 
-QVariantList list(GVariant *container)
+QVariantList toList(GVariant *container)
 {
     const gsize count = g_variant_n_children(container);
     QVariantList list;
-    list.reserve(static_cast<int>(count));
+    list.reserve(int(count));
     for (gsize i = 0; i < count; ++i) {
         list.append(convert(childAt(container, i).get()));
     }
     return list;
 }
 
-QStringList stringList(GVariant *array)
+QStringList toStringList(GVariant *array)
 {
     const gsize count = g_variant_n_children(array);
     QStringList list;
-    list.reserve(static_cast<int>(count));
+    list.reserve(int(count));
     for (gsize i = 0; i < count; ++i) {
-        list.append(text(childAt(array, i).get()));
+        list.append(toText(childAt(array, i).get()));
     }
     return list;
 }
 
-QVariantMap map(GVariant *dictionary)
+QVariantMap toMap(GVariant *dictionary)
 {
     const gsize count = g_variant_n_children(dictionary);
     QVariantMap map;
     for (gsize i = 0; i < count; ++i) {
         const GVariantPtr entry = childAt(dictionary, i);
-        const QString key = text(childAt(entry.get(), 0).get());
+        const QString key = toText(childAt(entry.get(), 0).get());
         if (!map.contains(key)) { // the first of equal keys counts, as in GLib's own look-up
             map.insert(key, convert(childAt(entry.get(), 1).get()));
         }
@@ -146,12 +145,12 @@ QVariantMap map(GVariant *dictionary)
 QVariant convertContainer(GVariant *container)
 {
     if (g_variant_is_of_type(container, G_VARIANT_TYPE_STRING_ARRAY)) {
-        return stringList(container);
+        return toStringList(container);
     }
     if (g_variant_is_of_type(container, G_VARIANT_TYPE("a{s*}"))) {
-        return map(container);
+        return toMap(container);
     }
-    return list(container);
+    return toList(container);
 }
 
 QVariant convert(GVariant *value)
@@ -160,23 +159,23 @@ QVariant convert(GVariant *value)
     case G_VARIANT_CLASS_BOOLEAN:
         return g_variant_get_boolean(value) != FALSE;
     case G_VARIANT_CLASS_BYTE:
-        return static_cast<int>(g_variant_get_byte(value));
+        return int(g_variant_get_byte(value));
     case G_VARIANT_CLASS_INT16:
-        return static_cast<int>(g_variant_get_int16(value));
+        return int(g_variant_get_int16(value));
     case G_VARIANT_CLASS_UINT16:
-        return static_cast<uint>(g_variant_get_uint16(value));
+        return uint(g_variant_get_uint16(value));
     case G_VARIANT_CLASS_INT32:
         return g_variant_get_int32(value);
     case G_VARIANT_CLASS_UINT32:
         return g_variant_get_uint32(value);
     case G_VARIANT_CLASS_INT64:
-        return static_cast<qlonglong>(g_variant_get_int64(value));
+        return qlonglong(g_variant_get_int64(value));
     case G_VARIANT_CLASS_UINT64:
-        return static_cast<qulonglong>(g_variant_get_uint64(value));
+        return qulonglong(g_variant_get_uint64(value));
     case G_VARIANT_CLASS_DOUBLE:
         return g_variant_get_double(value);
     case G_VARIANT_CLASS_STRING:
-        return text(value);
+        return toText(value);
     case G_VARIANT_CLASS_VARIANT:
         return convert(childAt(value, 0).get());
     default:
@@ -201,11 +200,11 @@ QVariant toQVariant(GVariant *value)
 {
     // Data in normal form is safe to convert: its strings are Unicode, its nesting is limited, and
     // its parts do not overlap, so that it cannot unfold into more than was stored.
-    const GVariantPtr normal = trusted(value);
-    return normal ? convert(normal.get()) : QVariant();
+    const GVariantPtr normal = verified(value);
+    return normal != nullptr ? convert(normal.get()) : QVariant();
 }
 
-GVariantPtr trusted(GVariant *value)
+GVariantPtr verified(GVariant *value)
 {
     if (!g_variant_is_normal_form(value)) {
         return nullptr;

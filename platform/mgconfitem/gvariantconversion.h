@@ -26,7 +26,7 @@ GVariantPtr toGVariant(const QVariant &value, QString *reason);
 QVariant toQVariant(GVariant *value);
 
 // The same value, marked as trusted; null if it is damaged. GLib needs half a minute to read a list
-// of 100,000 elements that it does not trust.
-GVariantPtr trusted(GVariant *value);
+// of 100,000 elements that is not marked.
+GVariantPtr verified(GVariant *value);
 
 #endif

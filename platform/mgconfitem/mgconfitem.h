@@ -4,8 +4,6 @@
 #ifndef MGCONFITEM_H
 #define MGCONFITEM_H
 
-#include "gvariantconversion.h"
-
 #include <QByteArray>
 #include <QObject>
 #include <QString>
@@ -44,13 +42,13 @@ Q_SIGNALS:
     void valueChanged();
 
 private:
-    bool isAmong(const char *prefix, const char *const *changes) const;
+    // A change names a key, or a whole directory if it ends with a slash.
+    bool isOneOf(const char *prefix, const char *const *changes) const;
     void update();
-    void write(GVariant *value);
 
     const QString m_key;
     QByteArray m_path; // of the key in dconf; empty if the key is not valid
-    GVariantPtr m_lastValue;
+    QByteArray m_lastValue;
     unsigned long m_handler = 0;
 };
 

@@ -203,8 +203,9 @@ public:
         QList<QByteArray> own;
         const auto all = readAllStandardError().split('\n');
         for (const QByteArray &line : all) {
-            if (line.startsWith("MGConfItem")) {
-                own.append(line);
+            const QByteArray category = "org.tarnwickos.settings.platform: ";
+            if (line.startsWith(category)) {
+                own.append(line.mid(category.size()));
             }
         }
         return own;
@@ -786,7 +787,7 @@ void TestMGConfItem::refusesOtherValues()
     store(&item, 1);
     item.set(value);
     QCOMPARE(m_log->takeReport(),
-             QStringLiteral("warning [default] MGConfItem: %1 cannot hold %2").arg(key, reason));
+             QStringLiteral("warning [org.tarnwickos.settings.platform] MGConfItem: %1 cannot hold %2").arg(key, reason));
     QCOMPARE(item.changes(), 1);
     QCOMPARE(describe(item.value()), describe(1));
     DconfTool::waitUntilStored();

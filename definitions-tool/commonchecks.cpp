@@ -3,6 +3,7 @@
 
 #include "commonchecks.h"
 
+#include "files/literals.h"
 #include "files/regularfile.h"
 #include "translations/catalogfiles.h"
 
@@ -17,19 +18,19 @@ using Severity = Finding::Severity;
 
 namespace {
 
-const QLatin1String unreadableRule("unreadable");
-const QLatin1String unknownKeyRule("unknown-key");
-const QLatin1String catalogRule("catalog");
-const QLatin1String textIdRule("text-id");
-const QLatin1String relativePathRule("relative-path");
-const QLatin1String translationRule("translation");
-const QLatin1String blankRule("blank");
-const QLatin1String schemeRule("scheme");
-const QLatin1String missingFileRule("missing-file");
-const QLatin1String permissionsRule("permissions");
+constexpr auto unreadableRule = "unreadable"_L1;
+constexpr auto unknownKeyRule = "unknown-key"_L1;
+constexpr auto catalogRule = "catalog"_L1;
+constexpr auto textIdRule = "text-id"_L1;
+constexpr auto relativePathRule = "relative-path"_L1;
+constexpr auto translationRule = "translation"_L1;
+constexpr auto blankRule = "blank"_L1;
+constexpr auto schemeRule = "scheme"_L1;
+constexpr auto missingFileRule = "missing-file"_L1;
+constexpr auto permissionsRule = "permissions"_L1;
 
-const QLatin1String fileScheme("file");
-const QLatin1String imageScheme("image");
+constexpr auto fileScheme = "file"_L1;
+constexpr auto imageScheme = "image"_L1;
 
 // The number of texts that one finding names.
 constexpr int maximumListed = 5;
@@ -177,7 +178,7 @@ void checkTextIds(const std::vector<TextId> &ids, const QString &catalog, int li
             // An unfinished translation is compiled as the engineering English source, or as
             // nothing.
             const bool isUnfinished = installed.hasEngineeringEnglish && !language.name.isEmpty()
-                && !language.name.startsWith(QLatin1String("en"))
+                && !language.name.startsWith("en"_L1)
                 && text == installed.languages.front().text(id);
             if (text.isEmpty() || isUnfinished) {
                 missing.append(quoted(id));
@@ -185,7 +186,7 @@ void checkTextIds(const std::vector<TextId> &ids, const QString &catalog, int li
         }
         if (!missing.isEmpty()) {
             const int more = missing.size() - maximumListed;
-            QString list = QStringList(missing.mid(0, maximumListed)).join(QLatin1String(", "));
+            QString list = QStringList(missing.mid(0, maximumListed)).join(", "_L1);
             if (more > 0) {
                 list += QStringLiteral(" and %1 more").arg(more);
             }

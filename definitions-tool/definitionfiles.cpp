@@ -3,13 +3,15 @@
 
 #include "definitionfiles.h"
 
+#include "files/literals.h"
+
 #include <QDir>
 #include <QFileInfo>
 
 namespace {
 
-const QLatin1String quickActionSuffix(".conf");
-const QLatin1String eventsWidgetsSuffix(".json");
+constexpr auto quickActionSuffix = ".conf"_L1;
+constexpr auto eventsWidgetsSuffix = ".json"_L1;
 
 } // namespace
 

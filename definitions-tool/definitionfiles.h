@@ -4,6 +4,8 @@
 #ifndef DEFINITIONFILES_H
 #define DEFINITIONFILES_H
 
+#include "files/literals.h"
+
 #include <QLatin1String>
 #include <QStringList>
 
@@ -12,8 +14,8 @@
 */
 namespace DefinitionFiles {
 
-const QLatin1String quickActionsDirectory("/usr/share/glimmera/quickactions");
-const QLatin1String eventsWidgetsDirectory("/usr/share/glimmera/eventswidgets");
+inline constexpr auto quickActionsDirectory = "/usr/share/glimmera/quickactions"_L1;
+inline constexpr auto eventsWidgetsDirectory = "/usr/share/glimmera/eventswidgets"_L1;
 
 // These look only at the name.
 bool isQuickAction(const QString &path);

@@ -5,6 +5,7 @@
 
 #include "commonchecks.h"
 #include "eventswidgets/eventswidgetsfile.h"
+#include "files/literals.h"
 #include "jsonwalker.h"
 #include "readerlog.h"
 
@@ -23,21 +24,21 @@ using Widget = EventsWidget;
 
 namespace {
 
-const QLatin1String unreadableRule("unreadable");
-const QLatin1String jsonRule("json");
-const QLatin1String noWidgetRule("no-widget");
-const QLatin1String repeatedKeyRule("repeated-key");
-const QLatin1String typeRule("type");
-const QLatin1String widgetRule("widget");
-const QLatin1String pathRule("path");
-const QLatin1String orderRule("order");
-const QLatin1String duplicatePathRule("duplicate-path");
-const QLatin1String relativePathRule("relative-path");
-const QLatin1String remoteUrlRule("remote-url");
-const QLatin1String titleRule("title");
-const QLatin1String catalogRule("catalog");
+constexpr auto unreadableRule = "unreadable"_L1;
+constexpr auto jsonRule = "json"_L1;
+constexpr auto noWidgetRule = "no-widget"_L1;
+constexpr auto repeatedKeyRule = "repeated-key"_L1;
+constexpr auto typeRule = "type"_L1;
+constexpr auto widgetRule = "widget"_L1;
+constexpr auto pathRule = "path"_L1;
+constexpr auto orderRule = "order"_L1;
+constexpr auto duplicatePathRule = "duplicate-path"_L1;
+constexpr auto relativePathRule = "relative-path"_L1;
+constexpr auto remoteUrlRule = "remote-url"_L1;
+constexpr auto titleRule = "title"_L1;
+constexpr auto catalogRule = "catalog"_L1;
 
-const QByteArray byteOrderMark = QByteArrayLiteral("\xef\xbb\xbf");
+constexpr const char *byteOrderMark = "\xef\xbb\xbf";
 
 enum class Type { Text, Integer, Boolean, Array, Any };
 
@@ -353,7 +354,7 @@ void reportRefused(const QByteArray &content, Findings *findings)
     }
     QJsonParseError error = {};
     const QJsonDocument document = QJsonDocument::fromJson(content, &error);
-    int start = content.startsWith(byteOrderMark) ? byteOrderMark.size() : 0;
+    int start = content.startsWith(byteOrderMark) ? int(qstrlen(byteOrderMark)) : 0;
     while (start < content.size() && isSpace(content.at(start))) {
         ++start;
     }

@@ -3,6 +3,7 @@
 
 #include "installedcatalogs.h"
 
+#include "files/literals.h"
 #include "translations/catalogfiles.h"
 
 #include <QDir>
@@ -16,7 +17,7 @@ using Severity = Finding::Severity;
 
 namespace {
 
-const QLatin1String suffix(".qm");
+constexpr auto suffix = ".qm"_L1;
 
 // The names of a locale with which Qt looks for its catalogs.
 QStringList localeNames(const QLocale &locale)

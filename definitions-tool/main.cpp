@@ -4,6 +4,7 @@
 // Shows authors of definition files how the models read them.
 
 #include "definitionschecker.h"
+#include "files/literals.h"
 #include "listing.h"
 #include "showing.h"
 #include "translations/apptranslator.h"
@@ -134,10 +135,10 @@ int Command::run(const QStringList &arguments)
     if (!misplaced.isEmpty()) {
         return fail(QStringLiteral("%1 has no option --%2").arg(command, misplaced));
     }
-    if (command == QLatin1String("check")) {
+    if (command == "check"_L1) {
         return check(operands);
     }
-    if (command == QLatin1String("list")) {
+    if (command == "list"_L1) {
         return operands.isEmpty() ? list() : fail(QStringLiteral("list takes no files"));
     }
     return operands.size() == 1 ? show(operands.constFirst())
@@ -147,7 +148,7 @@ int Command::run(const QStringList &arguments)
 int Command::check(const QStringList &paths)
 {
     const QString format = m_parser.value(QStringLiteral("format"));
-    if (format != QLatin1String("text") && format != QLatin1String("json")) {
+    if (format != "text"_L1 && format != "json"_L1) {
         return fail(QStringLiteral("the format is text or json"));
     }
     const QString root = m_parser.value(QStringLiteral("root"));
@@ -172,7 +173,7 @@ int Command::check(const QStringList &paths)
 
     const std::vector<Finding> &findings = checker.findings();
     QByteArray text;
-    if (format == QLatin1String("json")) {
+    if (format == "json"_L1) {
         text = toJson(findings);
     } else {
         for (const Finding &finding : findings) {

@@ -5,6 +5,7 @@
 
 #include "commonchecks.h"
 #include "files/inifile.h"
+#include "files/literals.h"
 #include "inilines.h"
 #include "quickactions/quickaction.h"
 #include "readerlog.h"
@@ -14,48 +15,45 @@
 #include <QSet>
 
 #include <algorithm>
+#include <array>
 
 using Action = QuickAction;
 using Severity = Finding::Severity;
 
 namespace {
 
-const QLatin1String unreadableRule("unreadable");
-const QLatin1String noKeyRule("no-key");
-const QLatin1String repeatedKeyRule("repeated-key");
-const QLatin1String encodingRule("encoding");
-const QLatin1String semicolonRule("semicolon");
-const QLatin1String commaRule("comma");
-const QLatin1String typeRule("type");
-const QLatin1String argumentsRule("arguments");
-const QLatin1String callRule("call");
-const QLatin1String priorityRule("priority");
-const QLatin1String titleRule("title");
-const QLatin1String catalogRule("catalog");
-const QLatin1String argumentTypeRule("argument-type");
-const QLatin1String packageRule("package");
-const QLatin1String systemServiceRule("system-service");
+constexpr auto unreadableRule = "unreadable"_L1;
+constexpr auto noKeyRule = "no-key"_L1;
+constexpr auto repeatedKeyRule = "repeated-key"_L1;
+constexpr auto encodingRule = "encoding"_L1;
+constexpr auto semicolonRule = "semicolon"_L1;
+constexpr auto commaRule = "comma"_L1;
+constexpr auto typeRule = "type"_L1;
+constexpr auto argumentsRule = "arguments"_L1;
+constexpr auto callRule = "call"_L1;
+constexpr auto priorityRule = "priority"_L1;
+constexpr auto titleRule = "title"_L1;
+constexpr auto catalogRule = "catalog"_L1;
+constexpr auto argumentTypeRule = "argument-type"_L1;
+constexpr auto packageRule = "package"_L1;
+constexpr auto systemServiceRule = "system-service"_L1;
 
-const QString catalogKey = QStringLiteral("translation-catalog");
-const QString iconKey = QStringLiteral("icon");
-const QString packageKey = QStringLiteral("requires-package");
-const QString priorityKey = QStringLiteral("priority");
-const QString titleKey = QStringLiteral("title");
-const QString serviceKey = QStringLiteral("remote-service");
-const QString pathKey = QStringLiteral("remote-path");
-const QString interfaceKey = QStringLiteral("remote-interface");
-const QString methodKey = QStringLiteral("remote-method");
-const QString argumentsSection = QStringLiteral("remote-arguments/");
-const QString sizeKey = QStringLiteral("remote-arguments/size");
+constexpr auto catalogKey = "translation-catalog"_L1;
+constexpr auto iconKey = "icon"_L1;
+constexpr auto packageKey = "requires-package"_L1;
+constexpr auto priorityKey = "priority"_L1;
+constexpr auto titleKey = "title"_L1;
+constexpr auto serviceKey = "remote-service"_L1;
+constexpr auto pathKey = "remote-path"_L1;
+constexpr auto interfaceKey = "remote-interface"_L1;
+constexpr auto methodKey = "remote-method"_L1;
+constexpr auto argumentsSection = "remote-arguments/"_L1;
+constexpr auto sizeKey = "remote-arguments/size"_L1;
 
-const QStringList &knownKeys()
-{
-    static const QStringList keys = {
-        titleKey,   catalogKey, iconKey,      priorityKey, packageKey,
-        serviceKey, pathKey,    interfaceKey, methodKey,
-    };
-    return keys;
-}
+constexpr std::array knownKeys = {
+    titleKey,   catalogKey, iconKey,      priorityKey, packageKey,
+    serviceKey, pathKey,    interfaceKey, methodKey,
+};
 
 constexpr int maximumName = 255;
 // No signature of a call is longer. The reader stops after one argument more.
@@ -63,41 +61,35 @@ constexpr int maximumArguments = 255;
 
 // The names that D-Bus allows in a call. QtDBus answers other names with an error.
 struct Name {
-    QString key;
+    QLatin1String key;
     QString (Action::*value)() const;
-    QString pattern;
-    QString what;
+    QLatin1String pattern;
+    QLatin1String what;
 };
 
-const std::vector<Name> &names()
-{
-    static const std::vector<Name> names = {
-        {serviceKey, &Action::service,
-         QStringLiteral(":[\\w-]+(\\.[\\w-]+)*|[a-zA-Z_-][\\w-]*(\\.[a-zA-Z_-][\\w-]*)+"),
-         QStringLiteral("name of a service")},
-        {pathKey, &Action::objectPath, QStringLiteral("/|(/\\w+)+"),
-         QStringLiteral("path of an object")},
-        // Only this name is optional.
-        {interfaceKey, &Action::interface, QStringLiteral("([a-zA-Z_]\\w*(\\.[a-zA-Z_]\\w*)+)?"),
-         QStringLiteral("name of an interface")},
-        {methodKey, &Action::method, QStringLiteral("[a-zA-Z_]\\w*"),
-         QStringLiteral("name of a method")},
-    };
-    return names;
-}
+constexpr std::array names = {
+    Name{serviceKey, &Action::service,
+         ":[\\w-]+(\\.[\\w-]+)*|[a-zA-Z_-][\\w-]*(\\.[a-zA-Z_-][\\w-]*)+"_L1,
+         "name of a service"_L1},
+    Name{pathKey, &Action::objectPath, "/|(/\\w+)+"_L1, "path of an object"_L1},
+    // Only this name is optional.
+    Name{interfaceKey, &Action::interface, "([a-zA-Z_]\\w*(\\.[a-zA-Z_]\\w*)+)?"_L1,
+         "name of an interface"_L1},
+    Name{methodKey, &Action::method, "[a-zA-Z_]\\w*"_L1, "name of a method"_L1},
+};
 
 bool isName(const Name &name, const QString &value)
 {
     static const auto expressions = [] {
         std::vector<QRegularExpression> expressions;
-        for (const Name &name : names()) {
-            expressions.emplace_back(QRegularExpression::anchoredPattern(name.pattern));
+        for (const Name &name : names) {
+            expressions.emplace_back(QRegularExpression::anchoredPattern(QString(name.pattern)));
         }
         return expressions;
     }();
     const bool isLimited = name.key != pathKey;
     return (!isLimited || value.size() <= maximumName)
-        && expressions.at(size_t(&name - names().data())).match(value).hasMatch();
+        && expressions.at(size_t(&name - names.data())).match(value).hasMatch();
 }
 
 // The number of the argument that a key holds, from 1, or 0 for any other key.
@@ -218,10 +210,9 @@ void QuickActionCheck::checkKey(const NamedIniLine &line, const QString &section
             QStringLiteral("an unquoted semicolon ends the value; put it in double quotes"));
     }
     if (section.isEmpty()) {
-        if (!knownKeys().contains(line.name) && line.name != sizeKey
-            && argumentNumber(line.name) == 0) {
-            reportUnknownKey(QStringLiteral("key"), line.name, knownKeys(), line.number,
-                             m_findings);
+        const QStringList known(knownKeys.begin(), knownKeys.end());
+        if (!known.contains(line.name) && line.name != sizeKey && argumentNumber(line.name) == 0) {
+            reportUnknownKey(QStringLiteral("key"), line.name, known, line.number, m_findings);
         }
     } else if (section == argumentsSection && line.name != sizeKey
                && argumentNumber(line.name) == 0) {
@@ -237,7 +228,7 @@ void QuickActionCheck::checkKey(const NamedIniLine &line, const QString &section
 
 void QuickActionCheck::checkTexts()
 {
-    for (const QString &key : knownKeys()) {
+    for (const QLatin1String key : knownKeys) {
         if (key != priorityKey && m_config.contains(key)) {
             checkText(key, m_config.value(key));
         }
@@ -358,7 +349,7 @@ void QuickActionCheck::checkArgument(int number, const QVariant &value)
 void QuickActionCheck::checkCall()
 {
     bool isSendable = !m_argumentsAreWrong;
-    for (const Name &name : names()) {
+    for (const Name &name : names) {
         const QString value = (m_action.*name.value)();
         if (isName(name, value)) {
             continue;
@@ -373,7 +364,7 @@ void QuickActionCheck::checkCall()
                           .arg(quoted(value), name.what));
         }
     }
-    if (m_action.service().startsWith(QLatin1String("org.freedesktop."))) {
+    if (m_action.service().startsWith("org.freedesktop."_L1)) {
         add(lineOf(serviceKey), Severity::Warning, systemServiceRule,
             QStringLiteral("the service %1 belongs to the system, and executes the call with the "
                            "rights of the user")
@@ -400,7 +391,9 @@ void reportRefused(const QString &path, Findings *findings)
         if (line.isPacked || !line.isClosed) {
             findings->add(line.number, Severity::Error, unreadableRule,
                           line.isPacked
-                              ? QStringLiteral("a packed value: nothing of the file is read")
+                              ? QStringLiteral(
+                                  "the value mentions @Variant( or @DateTime(: nothing of the file "
+                                  "is read")
                               : QStringLiteral("the header of a section is not closed: nothing of "
                                                "the file is read"));
             return;

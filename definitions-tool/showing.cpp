@@ -5,6 +5,7 @@
 
 #include "definitionfiles.h"
 #include "eventswidgets/eventswidgetsfile.h"
+#include "files/literals.h"
 #include "quickactions/quickaction.h"
 #include "readerlog.h"
 #include "translations/catalogtable.h"
@@ -34,7 +35,7 @@ QString shellWord(QString text)
     if (plain.match(text).hasMatch()) {
         return text;
     }
-    text.replace(QLatin1Char('\''), QLatin1String("'\\''"));
+    text.replace(QLatin1Char('\''), "'\\''"_L1);
     return QLatin1Char('\'') + text + QLatin1Char('\'');
 }
 
@@ -86,8 +87,7 @@ QString callLine(const QuickAction &action)
 QString valueText(const QVariant &value)
 {
     return value.userType() == QMetaType::QStringList
-        ? QStringLiteral("a list, which is not a text: ")
-            + value.toStringList().join(QLatin1String(", "))
+        ? QStringLiteral("a list, which is not a text: ") + value.toStringList().join(", "_L1)
         : value.toString();
 }
 

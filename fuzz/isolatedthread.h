@@ -17,7 +17,7 @@
 class IsolatedThread
 {
 public:
-    // Ends the program if it may not mount; in the sandbox every user may.
+    // Ends the program if it may not mount, as in a container without namespaces.
     IsolatedThread();
     ~IsolatedThread();
     IsolatedThread(const IsolatedThread &) = delete;

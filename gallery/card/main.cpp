@@ -24,7 +24,6 @@
 
 #include <fcntl.h>
 #include <sched.h>
-#include <sys/mount.h>
 #include <sys/prctl.h>
 #include <sys/resource.h>
 #include <unistd.h>
@@ -101,10 +100,6 @@ int main(int argc, char *argv[])
     }
     if (!whyNot.isEmpty()) {
         std::fprintf(stderr, "gallery: the memory card is simulated: %s\n", qPrintable(whyNot));
-        // When the command ends, the mounts of the simulated card must end, too.
-        if (unshare(CLONE_NEWNS) == 0) {
-            mount(nullptr, "/", nullptr, MS_REC | MS_PRIVATE, nullptr);
-        }
     }
     execvp(argv[1], argv + 1);
     std::fprintf(stderr, "gallery: cannot run %s: %s\n", argv[1], std::strerror(errno));

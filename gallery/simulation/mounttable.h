@@ -11,6 +11,9 @@ namespace MountTable {
 
 // Empty if the device is not mounted.
 QString directoryOf(const QByteArray &devicePath);
+// Replaces the table, which is a link to the kernel's, by a copy that lists the directory in memory as
+// where the device is mounted; with an empty directory, one that does not list the device.
+bool setDirectoryOf(const QByteArray &devicePath, const QByteArray &directory);
 
 } // namespace MountTable
 

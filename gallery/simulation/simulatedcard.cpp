@@ -26,6 +26,8 @@ SimulatedCard::SimulatedCard(QObject *parent)
         m_directory = MountTable::directoryOf(QFile::encodeName(devicePath()));
     } else {
         m_name = QStringLiteral("gallerycard1");
+        // A gallery that was killed may have left it mounted.
+        MountTable::setDirectoryOf(QFile::encodeName(devicePath()), {});
         startDiskService();
     }
     auto *owner = new QDBusServiceWatcher(service, QDBusConnection::systemBus(),
@@ -130,6 +132,8 @@ void SimulatedCard::startDiskService()
     if (!m_real) {
         m_simulated = std::make_unique<SimulatedDiskService>(SimulatedDiskService::Manner::Working,
                                                              devicePath());
+        connect(m_simulated.get(), &SimulatedDiskService::mountsChanged, this,
+                &SimulatedCard::followMounts);
         return;
     }
     if (m_daemon != nullptr) {

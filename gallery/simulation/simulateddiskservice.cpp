@@ -10,10 +10,9 @@
 #include <QDebug>
 #include <QDir>
 #include <QFile>
+#include <QFileInfo>
 
-#include <cerrno>
-
-#include <sys/mount.h>
+#include <algorithm>
 
 namespace {
 
@@ -23,6 +22,16 @@ const QLatin1String errorPrefix("org.freedesktop.UDisks2.Error.");
 QDBusMessage errorReply(const QDBusMessage &call, const char *name)
 {
     return call.createErrorReply(errorPrefix + QLatin1String(name), QStringLiteral("simulated"));
+}
+
+// Whether this process has a file in the directory open.
+bool isInUse(const QString &directory)
+{
+    const QFileInfoList descriptors =
+        QDir(QStringLiteral("/proc/self/fd")).entryInfoList(QDir::Files | QDir::System);
+    return std::any_of(descriptors.cbegin(), descriptors.cend(), [&](const QFileInfo &descriptor) {
+        return descriptor.symLinkTarget().startsWith(directory + QLatin1Char('/'));
+    });
 }
 
 } // namespace
@@ -71,29 +80,32 @@ bool SimulatedDiskService::handleMessage(const QDBusMessage &message,
     return true;
 }
 
-QDBusMessage SimulatedDiskService::mountCard(const QDBusMessage &call) const
+QDBusMessage SimulatedDiskService::mountCard(const QDBusMessage &call)
 {
     if (!MountTable::directoryOf(m_devicePath).isEmpty()) {
         return errorReply(call, "AlreadyMounted");
     }
     const QString directory = qEnvironmentVariable("XDG_RUNTIME_DIR") + QStringLiteral("/card");
-    QDir().mkpath(directory);
-    if (mount(m_devicePath.constData(), QFile::encodeName(directory).constData(), "tmpfs",
-              MS_NOSUID | MS_NODEV, "mode=755,size=16m")
-        != 0) {
+    if (!QDir().mkpath(directory)
+        || !MountTable::setDirectoryOf(m_devicePath, QFile::encodeName(directory))) {
         return errorReply(call, "Failed");
     }
+    Q_EMIT mountsChanged();
     return call.createReply(directory);
 }
 
-QDBusMessage SimulatedDiskService::unmountCard(const QDBusMessage &call) const
+QDBusMessage SimulatedDiskService::unmountCard(const QDBusMessage &call)
 {
     const QString directory = MountTable::directoryOf(m_devicePath);
     if (directory.isEmpty()) {
         return errorReply(call, "NotMounted");
     }
-    if (umount2(QFile::encodeName(directory).constData(), 0) != 0) {
-        return errorReply(call, errno == EBUSY ? "DeviceBusy" : "Failed");
+    if (isInUse(directory)) {
+        return errorReply(call, "DeviceBusy");
     }
+    if (!MountTable::setDirectoryOf(m_devicePath, {}) || !QDir(directory).removeRecursively()) {
+        return errorReply(call, "Failed");
+    }
+    Q_EMIT mountsChanged();
     return call.createReply();
 }

@@ -12,7 +12,8 @@
 
 /*
     Simulates the disk service while the object exists, and replaces a real one. It has a bus connection
-    of its own. The card that it mounts is a file system in memory: unmounting removes its files.
+    of its own. The card that it mounts is a directory in memory: unmounting removes it. Real mounts are
+    forbidden in some containers.
 */
 class SimulatedDiskService : public QDBusVirtualObject
 {
@@ -29,9 +30,12 @@ public:
     QString introspect(const QString &path) const override;
     bool handleMessage(const QDBusMessage &message, const QDBusConnection &connection) override;
 
+Q_SIGNALS:
+    void mountsChanged();
+
 private:
-    QDBusMessage mountCard(const QDBusMessage &call) const;
-    QDBusMessage unmountCard(const QDBusMessage &call) const;
+    QDBusMessage mountCard(const QDBusMessage &call);
+    QDBusMessage unmountCard(const QDBusMessage &call);
 
     Manner m_manner;
     QByteArray m_devicePath;

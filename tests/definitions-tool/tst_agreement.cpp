@@ -152,7 +152,8 @@ void TestAgreement::init()
 {
     LoggedTest::init();
     // In memory, because there are many files.
-    m_directory = std::make_unique<QTemporaryDir>(QStringLiteral("/run/agreement-XXXXXX"));
+    m_directory = std::make_unique<QTemporaryDir>(qEnvironmentVariable("XDG_RUNTIME_DIR")
+                                                  + QStringLiteral("/XXXXXX"));
 }
 
 void TestAgreement::cleanup()

@@ -7,12 +7,16 @@
 
 #include <cerrno>
 #include <cstring>
+#include <filesystem>
 
 #include <sys/mount.h>
 
-ScratchFileSystem::ScratchFileSystem() : m_path(QFile::encodeName(m_dir.path()))
+ScratchFileSystem::ScratchFileSystem()
+    : m_dir(qEnvironmentVariable("XDG_RUNTIME_DIR") + QStringLiteral("/XXXXXX")),
+      m_path(QFile::encodeName(m_dir.path())),
+      m_mounted(mount("tmpfs", m_path.constData(), "tmpfs", 0, "mode=700") == 0)
 {
-    if (mount("tmpfs", m_path.constData(), "tmpfs", 0, "mode=700") != 0) {
+    if (!m_mounted && errno != EPERM && errno != EACCES) {
         qFatal("cannot mount on %s: %s", m_path.constData(), std::strerror(errno));
     }
 }
@@ -20,7 +24,13 @@ ScratchFileSystem::ScratchFileSystem() : m_path(QFile::encodeName(m_dir.path()))
 ScratchFileSystem::~ScratchFileSystem()
 {
     // Also unmounts whatever a failed test left mounted in it.
-    umount2(m_path.constData(), MNT_DETACH);
+    if (m_mounted) {
+        umount2(m_path.constData(), MNT_DETACH);
+    } else {
+        // QTemporaryDir cannot remove names that are not UTF-8.
+        std::error_code error;
+        std::filesystem::remove_all(m_path.constData(), error);
+    }
 }
 
 QByteArray ScratchFileSystem::path(const char *name) const

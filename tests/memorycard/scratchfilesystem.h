@@ -10,16 +10,18 @@
 /*
     A file system in memory, mounted on a temporary directory. Trees that are to be removed are created
     in it: a broken remover that leaves its tree reaches another device there, and not the developer's
-    files.
+    files. Where mounts are forbidden, it is a directory of the throw-away root's own file system in
+    memory.
 */
 class ScratchFileSystem
 {
 public:
-    // Ends the program if it is not allowed to mount. In the sandbox, every user is.
     ScratchFileSystem();
     ~ScratchFileSystem();
     Q_DISABLE_COPY_MOVE(ScratchFileSystem)
 
+    // Whether tests may mount something in it.
+    bool isMounted() const { return m_mounted; }
     QByteArray path() const { return m_path; }
     // The path of a name in it.
     QByteArray path(const char *name) const;
@@ -27,6 +29,13 @@ public:
 private:
     QTemporaryDir m_dir;
     const QByteArray m_path;
+    const bool m_mounted;
 };
+
+// For tests of what happens at a mount point.
+#define NEEDS_MOUNTS(files)                                                                        \
+    if (!(files).isMounted()) {                                                                    \
+        QSKIP("this system forbids mounts");                                                       \
+    }
 
 #endif

@@ -553,6 +553,7 @@ void tst_DirectoryEmptier::directoryOfNoKnownDevice()
 
 void tst_DirectoryEmptier::mountInside()
 {
+    NEEDS_MOUNTS(*m_files)
     const QByteArray mounted = m_top + "/directory/mounted";
     makeTree(m_top, {"directory/mounted/"});
     makeFiles(m_top, 5);
@@ -570,6 +571,7 @@ void tst_DirectoryEmptier::mountInside()
 
 void tst_DirectoryEmptier::bindMountInside()
 {
+    NEEDS_MOUNTS(*m_files)
     // The mounted directory is on the same device, so its content is on the card.
     const QByteArray mounted = m_top + "/mounted";
     const QByteArray other = m_top + "/other";
@@ -793,6 +795,7 @@ void tst_DirectoryEmptier::raceOfMovedDirectories()
 
 void tst_DirectoryEmptier::raceOfMounts()
 {
+    NEEDS_MOUNTS(*m_files)
     const ScratchFileSystem otherDevice;
     const QByteArray other = otherDevice.path("other");
     makeTree(other, {"directory/"});

@@ -540,6 +540,7 @@ void tst_FileRemover::lineCutWithinDirectory()
 
 void tst_FileRemover::entriesThatCannotBeRemoved()
 {
+    NEEDS_MOUNTS(*m_files)
     const QByteArray first = makeCard("first");
     const QByteArray second = makeCard("second");
     makeFiles(first, 100);
@@ -576,6 +577,7 @@ void tst_FileRemover::directoryWithoutPermissions()
 
 void tst_FileRemover::readOnlyCard()
 {
+    NEEDS_MOUNTS(*m_files)
     const QByteArray card = makeCard("card");
     const MountPoint mounted(card);
     QCOMPARE(mount(nullptr, card.constData(), nullptr, MS_BIND | MS_REMOUNT | MS_RDONLY, nullptr),
@@ -664,6 +666,7 @@ void tst_FileRemover::removeAllEntries()
     QVERIFY(exists(card));
     QVERIFY(FileRemover::removeAllEntries(QFile::decodeName(card)));
 
+    NEEDS_MOUNTS(*m_files)
     makeFiles(card, 3);
     const MountPoint stuck(card + "/file1");
     QVERIFY(!FileRemover::removeAllEntries(QFile::decodeName(card)));

@@ -25,7 +25,6 @@
 #include <initializer_list>
 
 #include <dlfcn.h>
-#include <sys/mount.h>
 #include <sys/stat.h>
 #include <sys/syscall.h>
 #include <unistd.h>
@@ -34,6 +33,7 @@ namespace {
 
 const QString card = QStringLiteral("/dev/testcard1");
 const QString otherCard = QStringLiteral("/dev/testcard2");
+const QString mountTable = QStringLiteral("/etc/mtab");
 const QString cardName = QStringLiteral("testcard1");
 const QString otherCardName = QStringLiteral("testcard2");
 const QString vfat = QStringLiteral("vfat");
@@ -65,19 +65,18 @@ QString objectPath(const QString &name)
     return QStringLiteral("/org/freedesktop/UDisks2/block_devices/") + name;
 }
 
-// A file system in memory with one file, mounted as a card for the lifetime of this object.
+// A directory in memory with one file, which the mount table lists as a card for the lifetime of this
+// object.
 class MountedCard
 {
 public:
-    explicit MountedCard(const QString &device)
+    explicit MountedCard(const QString &device) : m_tableBefore(readMountTable())
     {
-        const QByteArray name = QFile::encodeName(device);
-        if (mount(name.constData(), directory().constData(), "tmpfs", 0, "mode=700") != 0) {
-            qFatal("cannot mount %s", name.constData());
-        }
+        writeMountTable(m_tableBefore + device.toUtf8() + ' ' + m_dir.path().toUtf8()
+                        + " tmpfs rw 0 0\n");
         write("file");
     }
-    ~MountedCard() { umount2(directory().constData(), MNT_DETACH); }
+    ~MountedCard() { writeMountTable(m_tableBefore); }
     Q_DISABLE_COPY_MOVE(MountedCard)
 
     void write(const char *name) { Files::write(m_dir.filePath(QString::fromLatin1(name)), "x"); }
@@ -87,9 +86,23 @@ public:
     }
 
 private:
-    QByteArray directory() const { return QFile::encodeName(m_dir.path()); }
+    static QByteArray readMountTable()
+    {
+        QFile table(mountTable);
+        if (!table.open(QIODevice::ReadOnly)) {
+            qFatal("cannot read the mount table");
+        }
+        return table.readAll();
+    }
+    // The table of the system is a link to one that cannot be written.
+    static void writeMountTable(const QByteArray &content)
+    {
+        Files::remove(mountTable);
+        Files::write(mountTable, content);
+    }
 
-    QTemporaryDir m_dir;
+    QTemporaryDir m_dir{qEnvironmentVariable("XDG_RUNTIME_DIR") + QStringLiteral("/XXXXXX")};
+    const QByteArray m_tableBefore;
 };
 
 } // namespace

@@ -4,7 +4,6 @@
 // The input is a definition file of a quick action. The target reads it, calls every getter and
 // sends its call.
 
-#include "files/inifile.h"
 #include "fuzzing.h"
 #include "quickactions/quickaction.h"
 
@@ -12,7 +11,6 @@
 #include <QDBusConnection>
 #include <QDBusMessage>
 #include <QFile>
-#include <QSettings>
 
 namespace {
 
@@ -44,27 +42,6 @@ bool isStillOnTheBus()
     return QDBusConnection::sessionBus().call(ping).type() == QDBusMessage::ReplyMessage;
 }
 
-// Any other type in a file would mean that QSettings unpacked a value.
-bool isPlain(const QVariant &value)
-{
-    switch (value.userType()) {
-    case QMetaType::QVariantList: {
-        const QVariantList list = value.toList();
-        return std::all_of(list.cbegin(), list.cend(), isPlain);
-    }
-    case QMetaType::UnknownType:
-    case QMetaType::QString:
-    case QMetaType::QStringList:
-    case QMetaType::QByteArray:
-    case QMetaType::QRect:
-    case QMetaType::QSize:
-    case QMetaType::QPoint:
-        return true;
-    default:
-        return false;
-    }
-}
-
 } // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t *data, std::size_t size)
@@ -80,24 +57,6 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t *data, std::size_t size
     QFile::remove(path);
     Fuzzing::require(action == again, "a file reads the same twice");
 
-    // QSettings reports a broken file only when it reads it for the first time, and unpacks nothing
-    // yet.
-    const QString unread =
-        Fuzzing::writeFile((QByteArray::number(number) + ".ini").constData(), content);
-    const IniFault fault = findIniFault(unread);
-    QSettings settings(unread, QSettings::IniFormat);
-    const bool isBroken = settings.status() == QSettings::FormatError;
-    QFile::remove(unread);
-    Fuzzing::require(fault == IniFault::PackedValue
-                         || isBroken == (fault == IniFault::UnclosedSection),
-                     "broken files are known");
-    const QStringList keys = fault == IniFault::PackedValue ? QStringList() : settings.allKeys();
-    for (const QString &key : keys) {
-        Fuzzing::require(isPlain(settings.value(key)), "QSettings unpacks nothing");
-    }
-
-    const QVariantMap config = action.config();
-    Fuzzing::require(std::all_of(config.cbegin(), config.cend(), isPlain), "values are plain");
     action.title();
     action.icon();
     action.translationCatalog();

@@ -86,7 +86,15 @@ std::string takeWord(const std::string &line, size_t *at)
     return decoded;
 }
 
-// The inodes of the directories that the table names for the device.
+ino_t numberOf(const std::string &path)
+{
+    struct stat info = {};
+    lstat(path.c_str(), &info);
+    return info.st_ino;
+}
+
+// The inodes of the directories that the table names for the device, with the type of this file
+// system. There are none if one is the root directory: then the device is no card.
 std::vector<ino_t> namedDirectories(const std::string &device, const std::string &table)
 {
     std::vector<ino_t> named;
@@ -102,19 +110,19 @@ std::vector<ino_t> namedDirectories(const std::string &device, const std::string
             continue;
         }
         const std::string directory = takeWord(line, &at);
-        if (!directory.empty() && directory[0] == '/'
-            && lstat((directory + "/").c_str(), &info) == 0) {
+        if (directory.empty() || directory[0] != '/'
+            || lstat((directory + "/").c_str(), &info) != 0) {
+            continue;
+        }
+        const std::string type = takeWord(line, &at);
+        if (info.st_ino == numberOf("/") && !type.empty()) {
+            return {};
+        }
+        if (type.compare(0, 5, "tmpfs") == 0) {
             named.push_back(info.st_ino);
         }
     }
     return named;
-}
-
-ino_t numberOf(const std::string &path)
-{
-    struct stat info = {};
-    lstat(path.c_str(), &info);
-    return info.st_ino;
 }
 
 const char *empty(const QString &devicePath, const QByteArray &table)

@@ -4,100 +4,112 @@
 #include "fileremover.h"
 
 #include "directoryemptier.h"
+#include "faultlog.h"
 #include "files/filedescriptor.h"
+#include "mounttable.h"
+#include "processlimits.h"
 
 #include <QByteArray>
 #include <QFile>
+#include <QThreadPool>
 
-#include <array>
+#include <algorithm>
 #include <cerrno>
-#include <cstdio>
-#include <cstring>
-#include <memory>
 #include <utility>
+#include <vector>
 
 #include <fcntl.h>
-#include <mntent.h>
+#include <linux/magic.h>
 #include <sys/stat.h>
 #include <sys/sysmacros.h>
+#include <sys/vfs.h>
 
 namespace {
 
 constexpr const char *mountTablePath = "/etc/mtab";
-constexpr std::size_t mountEntrySize = 12288;
 
-struct CloseMountTable {
-    void operator()(FILE *table) const { endmntent(table); }
+// The file systems whose directories have a device number of their own instead of the number of
+// the block device, with what statfs() returns for them.
+struct Unnumbered {
+    const char *type;
+    unsigned magic;
 };
-using MountTable = std::unique_ptr<FILE, CloseMountTable>;
+constexpr Unnumbered unnumbered[] = {
+    {"btrfs", BTRFS_SUPER_MAGIC},
+    {"fuse", FUSE_SUPER_MAGIC},
+    {"overlay", OVERLAYFS_SUPER_MAGIC},
+    {"tmpfs", TMPFS_MAGIC},
+};
 
-// glibc decodes the escapes in a field. musl, at least up to 1.2.3, returns them unchanged.
-bool libraryDecodesEscapes()
-{
-    QByteArray line("device /\\040 type options 0 0\n");
-    const MountTable table(fmemopen(line.data(), size_t(line.size()), "r"));
-    mntent entry = {};
-    std::array<char, 64> buffer = {};
-    return !table || !getmntent_r(table.get(), &entry, buffer.data(), int(buffer.size()))
-        || std::strcmp(entry.mnt_dir, "/ ") == 0;
-}
-
-void decodeEscapes(char *field)
-{
-    const auto isOctal = [](char c) { return c >= '0' && c <= '7'; };
-    char *out = field;
-    for (const char *in = field; *in != '\0'; ++out) {
-        if (in[0] == '\\' && isOctal(in[1]) && isOctal(in[2]) && isOctal(in[3])) {
-            *out = static_cast<char>((in[1] - '0') * 64 + (in[2] - '0') * 8 + in[3] - '0');
-            in += 4;
-        } else {
-            *out = *in++;
-        }
-    }
-    *out = '\0';
-}
+struct Mount {
+    QByteArray directory; // its name has an unknown encoding
+    QByteArray type; // without a subtype, such as ".exfat"
+};
 
 FileDescriptor openDirectory(const char *path)
 {
     return FileDescriptor(open(path, O_RDONLY | O_DIRECTORY | O_NOFOLLOW | O_CLOEXEC));
 }
 
-bool isRootDirectory(const struct stat &directory)
+// Whether the device has the root directory, which is the system and not a card.
+bool carriesRoot(const QByteArray &device, const std::vector<Mount> &mounts)
 {
     struct stat root = {};
-    return stat("/", &root) != 0
-        || (root.st_dev == directory.st_dev && root.st_ino == directory.st_ino);
-}
-
-// Whether the directory may be on the device. This is unknown, and therefore true, if the file
-// system has its own number (major number 0) instead of a block device's, or if the path of the
-// device is not a block device here.
-bool mayLieOn(const QByteArray &device, const struct stat &directory)
-{
     struct stat node = {};
-    return stat(device.constData(), &node) != 0 || !S_ISBLK(node.st_mode)
-        || major(directory.st_dev) == 0 || directory.st_dev == node.st_rdev;
+    if (stat("/", &root) != 0
+        || (stat(device.constData(), &node) == 0 && S_ISBLK(node.st_mode)
+            && node.st_rdev == root.st_dev)) {
+        return true;
+    }
+    return std::any_of(mounts.cbegin(), mounts.cend(), [&root](const Mount &mount) {
+        struct stat info = {};
+        return stat(mount.directory.constData(), &info) == 0 && info.st_dev == root.st_dev
+            && info.st_ino == root.st_ino;
+    });
 }
 
-// Empties the card that is mounted on the directory, whose name has an unknown encoding.
-bool emptyMount(const QByteArray &device, const char *directory)
+// Whether the directory is on the device. If its file system has a device number of its own, this
+// is unknown, and true if the directory is on a file system of the type in the table.
+bool liesOn(const QByteArray &device, const QByteArray &type, int directory)
+{
+    struct stat info = {};
+    struct stat node = {};
+    if (fstat(directory, &info) != 0) {
+        return false;
+    }
+    if (stat(device.constData(), &node) == 0 && S_ISBLK(node.st_mode)
+        && node.st_rdev == info.st_dev) {
+        return true;
+    }
+    const auto entry = std::find_if(std::cbegin(unnumbered), std::cend(unnumbered),
+                                    [&type](const auto &known) { return type == known.type; });
+    struct statfs system = {};
+    return entry != std::cend(unnumbered) && major(info.st_dev) == 0
+        && fstatfs(directory, &system) == 0 && static_cast<unsigned>(system.f_type) == entry->magic;
+}
+
+// Empties the card that is mounted on the directory. Returns why it is not empty, or nothing.
+QString emptyMount(const QByteArray &device, const Mount &mount)
 {
     // Only an absolute path names a mount directory.
-    if (directory[0] != '/') {
-        return false;
+    if (!mount.directory.startsWith('/')) {
+        return QStringLiteral("not an absolute path");
     }
     // The table has real paths, so a link is not the card. Neither is the directory that remains
     // after the card has been unmounted.
-    FileDescriptor fd = openDirectory(directory);
+    FileDescriptor fd = openDirectory(mount.directory.constData());
     if (!fd.isOpen()) {
         // A card that cannot be read counts as empty, as for removeAllEntries().
-        return errno != ENOTDIR;
+        return errno == ENOTDIR ? QStringLiteral("not a directory") : QString();
     }
-    struct stat info = {};
-    if (fstat(fd.get(), &info) != 0 || isRootDirectory(info) || !mayLieOn(device, info)) {
-        return false;
+    if (!liesOn(device, mount.type, fd.get())) {
+        return QStringLiteral("not on the device");
     }
-    return emptyDirectory(std::move(fd));
+    const Leftovers left = emptyDirectory(std::move(fd));
+    return left.count == 0 ? QString()
+                           : QStringLiteral("%1: %2, and %3 more")
+                                 .arg(QFile::decodeName(left.first.c_str()),
+                                      qt_error_string(left.error), QString::number(left.count - 1));
 }
 
 } // namespace
@@ -106,8 +118,31 @@ FileRemover::FileRemover(QString devicePath) : m_devicePath(std::move(devicePath
 {
 }
 
+FileRemover::~FileRemover()
+{
+    if (m_obstacle) {
+        qCWarning(lcCardFaults) << "Cannot empty" << m_devicePath << "because" << m_obstacle;
+        Q_EMIT error();
+    }
+}
+
+bool FileRemover::start(std::unique_ptr<FileRemover> remover)
+{
+    if (!ProcessLimits::hasDescriptorsLeft()) {
+        remover->m_obstacle = "too many files are open";
+        return false;
+    }
+    if (!ProcessLimits::canStartThread()) {
+        remover->m_obstacle = "no thread can be started";
+        return false;
+    }
+    QThreadPool::globalInstance()->start(remover.release());
+    return true;
+}
+
 void FileRemover::run()
 {
+    m_obstacle = nullptr;
     if (emptyCard()) {
         Q_EMIT completed();
     } else {
@@ -118,41 +153,43 @@ void FileRemover::run()
 bool FileRemover::removeAllEntries(const QString &path)
 {
     FileDescriptor fd = openDirectory(QFile::encodeName(path).constData());
-    return !fd.isOpen() || emptyDirectory(std::move(fd));
+    return !fd.isOpen() || emptyDirectory(std::move(fd)).count == 0;
 }
 
 bool FileRemover::emptyCard() const
 {
+    const auto warn = [this](const char *reason) {
+        qCWarning(lcCardFaults) << "Cannot empty" << m_devicePath << "because" << reason;
+        return false;
+    };
     const QByteArray device = QFile::encodeName(m_devicePath);
     // Sources such as "tmpfs" and "none" are not devices.
     if (!device.startsWith('/')) {
-        return false;
+        return warn("it is not an absolute path");
     }
-    const MountTable table(setmntent(mountTablePath, "r"));
-    if (!table) {
-        return false;
+    MountTable table(mountTablePath);
+    if (!table.isOpen()) {
+        return warn("the mount table cannot be read");
     }
-    const bool decoded = libraryDecodesEscapes();
-    mntent entry = {};
-    std::array<char, mountEntrySize> buffer = {};
-    while (true) {
-        errno = 0;
-        if (!getmntent_r(table.get(), &entry, buffer.data(), static_cast<int>(buffer.size()))) {
-            // musl skips a line that is longer than the buffer, with this error.
-            if (errno == ERANGE) {
-                continue;
-            }
-            return false;
-        }
-        if (!decoded) {
-            decodeEscapes(entry.mnt_fsname);
-            decodeEscapes(entry.mnt_dir);
-        }
-        // glibc cuts such a line instead. A line that is cut within the directory has no type.
-        const bool cut = entry.mnt_type[0] == '\0';
-        // A card that is mounted twice gets a second attempt through its other mount directory.
-        if (!cut && device == entry.mnt_fsname && emptyMount(device, entry.mnt_dir)) {
-            return true;
+    std::vector<Mount> mounts;
+    while (const mntent *entry = table.next()) {
+        if (device == entry->mnt_fsname) {
+            mounts.push_back({entry->mnt_dir, QByteArray(entry->mnt_type).split('.').first()});
         }
     }
+    if (mounts.empty()) {
+        return warn("it is not mounted");
+    }
+    if (carriesRoot(device, mounts)) {
+        return warn("it has the root directory");
+    }
+    // A card that is mounted twice gets a second attempt through its other mount directory.
+    return std::any_of(mounts.cbegin(), mounts.cend(), [&](const Mount &mount) {
+        const QString reason = emptyMount(device, mount);
+        if (!reason.isEmpty()) {
+            qCWarning(lcCardFaults) << "Cannot empty" << m_devicePath << "on"
+                                    << QFile::decodeName(mount.directory) << "because" << reason;
+        }
+        return reason.isEmpty();
+    });
 }

@@ -5,19 +5,17 @@
 
 #include "diskservice.h"
 #include "fileremover.h"
-#include "files/filedescriptor.h"
+#include "processlimits.h"
 
 #include <QDBusError>
 #include <QDBusPendingCall>
 #include <QDBusPendingCallWatcher>
 #include <QFileInfo>
 #include <QLoggingCategory>
-#include <QThreadPool>
 
 #include <algorithm>
-#include <array>
-
-#include <sys/eventfd.h>
+#include <memory>
+#include <utility>
 
 namespace {
 
@@ -41,18 +39,6 @@ class HelperProcess : public QProcess
 public:
     using QProcess::QProcess;
 };
-
-// Whether the process can open enough descriptors to start a helper or a thread. Without them
-// QProcess does not always report that a helper did not start, and a thread that gets no descriptor
-// for its event loop ends the process.
-bool hasDescriptorsLeft()
-{
-    std::array<FileDescriptor, 16> spare; // a helper takes up to 8
-    for (FileDescriptor &descriptor : spare) {
-        descriptor = FileDescriptor(eventfd(0, EFD_CLOEXEC));
-    }
-    return spare.back().isOpen();
-}
 
 } // namespace
 
@@ -101,7 +87,9 @@ bool hasDescriptorsLeft()
     A failed command ends the sequence with the status \c Error, in which every operation is
     accepted. Formatting, removing files and probing use the \l devicePath and the type of their
     request; mounting and unmounting use the \l deviceName that is set when the step starts.
-    The formatter logs messages in the category \c{org.tarnwickos.settings.memorycard}.
+    The formatter logs messages in the category \c{org.tarnwickos.settings.memorycard}. Why files
+    could not be removed is logged as a warning in the category
+    \c{com.marlo.settings.system.memorycard}.
 
     \section1 When an operation has ended
 
@@ -145,10 +133,14 @@ bool hasDescriptorsLeft()
     expect exactly these lines.
 
     \section2 Some mount directories are refused, and some count as empty
-    The formatter does not empty a mount directory that is a symbolic link or the root directory, or
-    that is on a device other than the card. In these cases, the card has been unmounted, or the
-    mount table is wrong. A mount directory that cannot be opened counts as empty. If the card is
-    mounted more than once, the operation succeeds if one mount directory can be emptied.
+    The formatter does not empty a mount directory that is a symbolic link, or that is not on the
+    card: the card has been unmounted, another file system is mounted over it, or the mount table is
+    wrong. The device number of the directory must be that of the device node \l devicePath. Only
+    the file systems btrfs, FUSE, overlay and tmpfs have numbers of their own: there, the type of
+    the file system must be the one in the mount table. A device that has the root directory is not
+    a card: none of its mount directories is emptied. A mount directory that cannot be opened counts
+    as empty. If the card is mounted more than once, the operation succeeds if one mount directory
+    can be emptied.
 
     \section2 Work outlives its formatter
     Destroying a formatter stops neither the removal of files nor a helper that is formatting,
@@ -280,7 +272,8 @@ void MemoryCardFormatter::format(const QString &type)
 
     Mounts the card, unless it is already mounted, and removes all files and directories on it, on a
     thread of the application's global thread pool. If some cannot be removed, the others are
-    removed first, and the status then becomes \c Error. An empty \l devicePath leads to \c Error
+    removed first, and the status then becomes \c Error. It also becomes \c Error if no thread can
+    be started, or if the application clears the thread pool before the removal starts. An empty \l devicePath leads to \c Error
     with a warning.
 */
 void MemoryCardFormatter::removeAllFiles()
@@ -506,7 +499,7 @@ void MemoryCardFormatter::startProbing(const Command &command)
 void MemoryCardFormatter::runHelper(Status command, const QStringList &arguments)
 {
     m_running = command;
-    if (!hasDescriptorsLeft()) {
+    if (!ProcessLimits::hasDescriptorsLeft()) {
         // Reported later, as QProcess does when it finds that the helper cannot start.
         QMetaObject::invokeMethod(
             this, [this] { commandError(QProcess::FailedToStart); }, Qt::QueuedConnection);
@@ -575,17 +568,16 @@ void MemoryCardFormatter::mountOperationFinished(const QString &method,
 
 void MemoryCardFormatter::startRemovingFiles(const Command &command)
 {
-    if (!hasDescriptorsLeft()) {
-        fileRemoverError();
-        return;
-    }
     m_running = RemovingFiles;
-    // The pool deletes it.
-    auto *remover = new FileRemover(command.devicePath);
-    connect(remover, &FileRemover::completed, this, &MemoryCardFormatter::fileRemoverFinished);
-    connect(remover, &FileRemover::error, this, &MemoryCardFormatter::fileRemoverError);
-    QThreadPool::globalInstance()->start(remover);
-    setStatus(RemovingFiles);
+    auto remover = std::make_unique<FileRemover>(command.devicePath);
+    // Queued: QThreadPool::clear() deletes removers on this thread, which then emit error().
+    connect(remover.get(), &FileRemover::completed, this, &MemoryCardFormatter::fileRemoverFinished,
+            Qt::QueuedConnection);
+    connect(remover.get(), &FileRemover::error, this, &MemoryCardFormatter::fileRemoverError,
+            Qt::QueuedConnection);
+    if (FileRemover::start(std::move(remover))) {
+        setStatus(RemovingFiles);
+    }
 }
 
 void MemoryCardFormatter::finishCommand()

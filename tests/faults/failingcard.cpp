@@ -143,6 +143,9 @@ bool FailingCard::answer(const char *request)
         }
         break;
     }
+    case FUSE_STATFS:
+        append(fuse_statfs_out());
+        break;
     case FUSE_OPENDIR:
         append(fuse_open_out());
         break;

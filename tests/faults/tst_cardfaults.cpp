@@ -53,7 +53,7 @@ constexpr int files = 300;
 
 // The signals of removeAllFiles() when it succeeds and when it fails.
 constexpr char emptied[] = "not busy, Mounting, busy, RemovingFiles, Idle, not busy";
-constexpr char notEmptied[] = "not busy, Mounting, busy, RemovingFiles, Error, not busy";
+constexpr char failed[] = "not busy, Mounting, busy, RemovingFiles, Error, not busy";
 
 const QString name = QStringLiteral("testcard1");
 const QString device = QStringLiteral("/dev/testcard1");
@@ -113,7 +113,7 @@ void TestCardFaults::cardThatFails_data()
     QTest::addColumn<QByteArray>("expected");
     // Such a card counts as empty.
     QTest::newRow("cannot be listed") << Fault::Unreadable << QByteArray(emptied);
-    QTest::newRow("removes nothing") << Fault::Stuck << QByteArray(notEmptied);
+    QTest::newRow("removes nothing") << Fault::Stuck << QByteArray(failed);
 }
 
 void TestCardFaults::cardThatFails()
@@ -126,6 +126,13 @@ void TestCardFaults::cardThatFails()
     m_formatter->removeAllFiles();
     TRY_EVENTS(expected);
     QCOMPARE(card.filesLeft(), files);
+    QCOMPARE(takeLog(),
+             fault == Fault::Unreadable
+                 ? QByteArray()
+                 : notEmptied("/dev/testcard1",
+                              "on \"" + card.directory().toUtf8()
+                                  + "\" because \"file0: Input/output error, "
+                                    "and 299 more\""));
 
     card.setFault(Fault::None);
     forgetEvents()->removeAllFiles();
@@ -140,8 +147,9 @@ void TestCardFaults::cardGoneWhileItIsEmptied()
         FailingCard card(device, files);
         startEmptying(&card);
         card.setFault(Fault::Gone);
-        TRY_EVENTS(notEmptied);
+        TRY_EVENTS(failed);
         QCOMPARE(card.filesLeft(), files);
+        QVERIFY(takeLog().endsWith("and 299 more\""));
     }
     const FailingCard another(device, files);
     forgetEvents()->removeAllFiles();
@@ -165,7 +173,8 @@ void TestCardFaults::cardDetachedWhileItIsEmptied()
 
     // And no card is mounted any more.
     forgetEvents()->removeAllFiles();
-    TRY_EVENTS(notEmptied);
+    TRY_EVENTS(failed);
+    QCOMPARE(takeLog(), notEmptied("/dev/testcard1", "because it is not mounted"));
     QVERIFY(QFile::exists(below));
 }
 

@@ -49,6 +49,11 @@ QByteArray FormatterTest::warning(const QByteArray &text)
     return "warning [org.tarnwickos.settings.memorycard] " + text;
 }
 
+QByteArray FormatterTest::notEmptied(const QByteArray &path, const QByteArray &reason)
+{
+    return "warning [com.marlo.settings.system.memorycard] Cannot empty \"" + path + "\" " + reason;
+}
+
 QByteArray FormatterTest::diskServiceError(const QByteArray &method, const QByteArray &name)
 {
     return warning('"' + method + "\" error: org.freedesktop.UDisks2.Error." + name);

@@ -35,6 +35,8 @@ protected:
 
     QByteArray takeLog() { return m_log->takeReport().toUtf8(); }
     static QByteArray warning(const QByteArray &text);
+    // What is logged when the files of the card cannot be removed.
+    static QByteArray notEmptied(const QByteArray &path, const QByteArray &reason);
     // What the formatter logs when the disk service replies with its own error of this name.
     static QByteArray diskServiceError(const QByteArray &method, const QByteArray &name);
 

@@ -16,15 +16,18 @@
 #include <QProcess>
 #include <QQmlComponent>
 #include <QQmlEngine>
+#include <QSemaphore>
 #include <QTemporaryDir>
 #include <QThreadPool>
 #include <QtTest>
 
+#include <atomic>
 #include <cerrno>
 #include <functional>
 #include <initializer_list>
 
 #include <dlfcn.h>
+#include <pthread.h>
 #include <sys/stat.h>
 #include <sys/syscall.h>
 #include <unistd.h>
@@ -59,6 +62,7 @@ constexpr char emptied[] = "not busy, Mounting, busy, RemovingFiles, Idle, not b
 QList<int> timeouts;
 bool signalledAllProcesses = false;
 bool forkFails = false;
+std::atomic<bool> threadsFail = false;
 
 QString objectPath(const QString &name)
 {
@@ -139,6 +143,14 @@ extern "C" Q_DECL_EXPORT pid_t fork() noexcept
     return original();
 }
 
+extern "C" Q_DECL_EXPORT int pthread_create(pthread_t *thread, const pthread_attr_t *attributes,
+                                            void *(*function)(void *), void *argument) noexcept
+{
+    static const auto original =
+        reinterpret_cast<decltype(&pthread_create)>(dlsym(RTLD_NEXT, "pthread_create"));
+    return threadsFail ? EAGAIN : original(thread, attributes, function, argument);
+}
+
 class TestMemoryCardFormatter : public FormatterTest
 {
     Q_OBJECT
@@ -170,6 +182,8 @@ private Q_SLOTS:
     void failedFormat();
     void removeAllFiles();
     void removeAllFilesNeedsADescriptor();
+    void removeAllFilesNeedsAThread();
+    void removalTakenFromThePool();
     void mountAndUnmount();
     void operationsWhileBusy();
     void operationsNeedAPathAndAType();
@@ -754,6 +768,7 @@ void TestMemoryCardFormatter::removeAllFiles()
     // The disk service says that the card is mounted, but it is not.
     forgetEvents()->removeAllFiles();
     TRY_EVENTS("not busy, Mounting, busy, RemovingFiles, Error, not busy");
+    QCOMPARE(takeLog(), notEmptied("/dev/testcard1", "because it is not mounted"));
     forgetEvents()->mount();
     TRY_EVENTS(mounted);
 }
@@ -775,11 +790,48 @@ void TestMemoryCardFormatter::removeAllFilesNeedsADescriptor()
             // process.
             TRY_EVENTS("not busy, Mounting, busy, Error, not busy");
         }
+        QCOMPARE(takeLog(), notEmptied("/dev/testcard1", "because too many files are open"));
         QCOMPARE(mountedCard.files(), words("file"));
         forgetEvents()->removeAllFiles();
         TRY_EVENTS(emptied);
         QCOMPARE(mountedCard.files(), QStringList());
     }
+}
+
+void TestMemoryCardFormatter::removeAllFilesNeedsAThread()
+{
+    MountedCard mountedCard(card);
+    start("done");
+    threadsFail = true;
+    m_formatter->removeAllFiles();
+    TRY_EVENTS("not busy, Mounting, busy, Error, not busy");
+    threadsFail = false;
+    QCOMPARE(takeLog(), notEmptied("/dev/testcard1", "because no thread can be started"));
+    QCOMPARE(mountedCard.files(), words("file"));
+    // The thread pool waits for nothing, so the process can end.
+    QVERIFY(QThreadPool::globalInstance()->waitForDone(patience));
+    forgetEvents()->removeAllFiles();
+    TRY_EVENTS(emptied);
+    QCOMPARE(mountedCard.files(), QStringList());
+}
+
+void TestMemoryCardFormatter::removalTakenFromThePool()
+{
+    const MountedCard mountedCard(card);
+    start("done");
+    QThreadPool *const pool = QThreadPool::globalInstance();
+    QSemaphore end;
+    for (int i = 0; i < pool->maxThreadCount(); ++i) {
+        pool->start([&end] { end.acquire(); });
+    }
+    m_formatter->removeAllFiles();
+    TRY_EVENTS("not busy, Mounting, busy, RemovingFiles");
+    pool->clear();
+    TRY_EVENTS("not busy, Mounting, busy, RemovingFiles, Error, not busy");
+    QCOMPARE(takeLog(), notEmptied("/dev/testcard1", "because it was taken from the thread pool"));
+    end.release(pool->maxThreadCount());
+    QVERIFY(pool->waitForDone(patience));
+    QCOMPARE(mountedCard.files(), words("file"));
 }
 
 void TestMemoryCardFormatter::mountAndUnmount()
@@ -1060,6 +1112,7 @@ void TestMemoryCardFormatter::refusedCommandLeavesItsQueueBehind()
     QCOMPARE(takeLog(), mountWithoutName);
     forgetEvents()->setDevicePath(card);
     TRY_EVENTS("path /dev/testcard1, RemovingFiles, busy, Error, not busy");
+    QCOMPARE(takeLog(), notEmptied("/dev/testcard2", "because it is not mounted"));
     QCOMPARE(m_helper->runs().size(), 3);
 }
 
@@ -1354,7 +1407,10 @@ void TestMemoryCardFormatter::statusIsLogged()
                                "Mounting", "RemovingFiles", "Error"}) {
         expected.append(debug + "New status MemoryCardFormatter::" + status);
     }
-    QCOMPARE(takeLog(), expected.join('\n'));
+    // The remover logs on its thread, before or after the new status.
+    QByteArrayList log = takeLog().split('\n');
+    QVERIFY(log.removeOne(notEmptied("/dev/testcard1", "because it is not mounted")));
+    QCOMPARE(log.join('\n'), expected.join('\n'));
 
     // Debug messages are off by default.
     QLoggingCategory::setFilterRules(QString());

@@ -229,7 +229,7 @@ void World::changeCard()
     if (random(3) == 0) {
         Files::write(
             mountTable,
-            often() ? (device + QLatin1Char(' ') + card + QLatin1String(" vfat rw 0 0\n")).toUtf8()
+            often() ? (device + QLatin1Char(' ') + card + QLatin1String(" tmpfs rw 0 0\n")).toUtf8()
                     : QByteArray());
     }
     Files::write(card + QLatin1Char('/') + anyOf(names) + QLatin1Char('/') + anyOf(names)

@@ -5,6 +5,7 @@
 
 #include "files/literals.h"
 #include "files/regularfile.h"
+#include "rules.h"
 #include "translations/catalogfiles.h"
 
 #include <QFileInfo>
@@ -17,17 +18,6 @@
 using Severity = Finding::Severity;
 
 namespace {
-
-constexpr auto unreadableRule = "unreadable"_L1;
-constexpr auto unknownKeyRule = "unknown-key"_L1;
-constexpr auto catalogRule = "catalog"_L1;
-constexpr auto textIdRule = "text-id"_L1;
-constexpr auto relativePathRule = "relative-path"_L1;
-constexpr auto translationRule = "translation"_L1;
-constexpr auto blankRule = "blank"_L1;
-constexpr auto schemeRule = "scheme"_L1;
-constexpr auto missingFileRule = "missing-file"_L1;
-constexpr auto permissionsRule = "permissions"_L1;
 
 constexpr auto fileScheme = "file"_L1;
 constexpr auto imageScheme = "image"_L1;
@@ -102,7 +92,7 @@ bool reportUnreadable(const QString &path, qint64 maximumSize, QByteArray *conte
                    .arg(maximumSize / 1024 / 1024);
         break;
     }
-    findings->add(1, Severity::Error, unreadableRule, text);
+    findings->add(1, Severity::Error, Rule::unreadable, text);
     return true;
 }
 
@@ -114,21 +104,21 @@ void reportUnknownKey(const QString &what, const QString &name, const QStringLis
     if (!meant.isEmpty()) {
         text += QStringLiteral("; is %1 meant?").arg(quoted(meant));
     }
-    findings->add(line, Severity::Warning, unknownKeyRule, text);
+    findings->add(line, Severity::Warning, Rule::unknownKey, text);
 }
 
 void checkCatalog(const QString &catalog, int line, CheckContext *context, Findings *findings)
 {
     const QLatin1String suffix = CatalogFiles::engineeringEnglishSuffix;
     if (catalog.endsWith(suffix)) {
-        findings->add(line, Severity::Warning, catalogRule,
+        findings->add(line, Severity::Warning, Rule::catalog,
                       QStringLiteral("the catalog %1 is named with the suffix of its engineering "
                                      "English; only with %2 are other languages shown")
                           .arg(quoted(catalog), quoted(catalog.chopped(suffix.size()))));
         return;
     }
     if (!catalog.isEmpty() && !CatalogFiles::isCatalogName(catalog)) {
-        findings->add(line, Severity::Error, catalogRule,
+        findings->add(line, Severity::Error, Rule::catalog,
                       QStringLiteral("the catalog %1 is not used: its name must not have a \"/\"")
                           .arg(quoted(catalog)));
         return;
@@ -139,11 +129,11 @@ void checkCatalog(const QString &catalog, int line, CheckContext *context, Findi
     const InstalledCatalogs::Catalog &installed = context->catalogs.find(catalog);
     const QString directory = context->catalogs.directory();
     if (!installed.isInstalled()) {
-        findings->add(line, Severity::Warning, catalogRule,
+        findings->add(line, Severity::Warning, Rule::catalog,
                       QStringLiteral("the catalog %1 is not installed in %2")
                           .arg(quoted(catalog), directory));
     } else if (!installed.hasEngineeringEnglish) {
-        findings->add(line, Severity::Warning, catalogRule,
+        findings->add(line, Severity::Warning, Rule::catalog,
                       QStringLiteral("%1 is not installed in %2: languages without a catalog of "
                                      "their own show identifiers")
                           .arg(quoted(catalog + suffix + QStringLiteral(".qm")), directory));
@@ -166,7 +156,7 @@ void checkTextIds(const std::vector<TextId> &ids, const QString &catalog, int li
         if (installed.holds(text.id)) {
             held.append(text.id);
         } else {
-            findings->add(text.line, Severity::Warning, textIdRule,
+            findings->add(text.line, Severity::Warning, Rule::textId,
                           QStringLiteral("the catalog %1 does not hold the text %2")
                               .arg(quoted(catalog), quoted(text.id)));
         }
@@ -191,7 +181,7 @@ void checkTextIds(const std::vector<TextId> &ids, const QString &catalog, int li
                 list += QStringLiteral(" and %1 more").arg(more);
             }
             findings->add(
-                line, Severity::Note, translationRule,
+                line, Severity::Note, Rule::translation,
                 QStringLiteral("not translated in %1: %2").arg(quoted(language.fileName), list));
         }
     }
@@ -211,13 +201,13 @@ void checkLocation(const QString &what, const QString &location, const QStringLi
                       QStringLiteral("the %1 %2 %3").arg(what, quoted(location), text));
     };
     if (location != location.trimmed()) {
-        add(Severity::Warning, blankRule, QStringLiteral("begins or ends with a blank"));
+        add(Severity::Warning, Rule::blank, QStringLiteral("begins or ends with a blank"));
         return;
     }
     const QString scheme = schemeOf(location);
     if (!scheme.isEmpty() && !schemes.contains(scheme)) {
         const QString meant = nearest(scheme, schemes);
-        add(Severity::Warning, schemeRule,
+        add(Severity::Warning, Rule::scheme,
             meant.isEmpty() ? QStringLiteral("is a URL that cannot be loaded")
                             : QStringLiteral("is a URL that cannot be loaded; is %1 meant?")
                                   .arg(quoted(meant + location.mid(scheme.size()))));
@@ -226,7 +216,7 @@ void checkLocation(const QString &what, const QString &location, const QStringLi
     const QUrl url(scheme.isEmpty() ? QString() : location);
     if ((scheme == imageScheme && url.host().isEmpty())
         || (scheme == fileScheme && !url.host().isEmpty())) {
-        add(Severity::Warning, schemeRule,
+        add(Severity::Warning, Rule::scheme,
             QStringLiteral("must begin with %1")
                 .arg(quoted(scheme == imageScheme ? QStringLiteral("image://PROVIDER/")
                                                   : QStringLiteral("file:///"))));
@@ -242,11 +232,11 @@ void checkLocation(const QString &what, const QString &location, const QStringLi
         file.setFile(context->root + file.symLinkTarget());
     }
     if (!file.exists()) {
-        add(Severity::Warning, missingFileRule, QStringLiteral("does not exist"));
+        add(Severity::Warning, Rule::missingFile, QStringLiteral("does not exist"));
     } else if (file.isDir()) {
-        add(Severity::Warning, missingFileRule, QStringLiteral("is a directory"));
+        add(Severity::Warning, Rule::missingFile, QStringLiteral("is a directory"));
     } else if (!file.permission(QFile::ReadOther)) {
-        add(Severity::Error, permissionsRule,
+        add(Severity::Error, Rule::permissions,
             QStringLiteral("is a file that not every user can read"));
     }
 }
@@ -264,7 +254,7 @@ void checkIcon(const QString &icon, int line, CheckContext *context, Findings *f
     if (icon.startsWith(QLatin1Char('/')) || !schemeOf(icon).isEmpty()) {
         checkLocation(QStringLiteral("icon"), icon, schemes, line, context, findings);
     } else if (path.match(icon).hasMatch()) {
-        findings->add(line, Severity::Warning, relativePathRule,
+        findings->add(line, Severity::Warning, Rule::relativePath,
                       QStringLiteral("the icon %1 is a relative path").arg(quoted(icon)));
     }
 }

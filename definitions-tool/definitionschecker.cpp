@@ -7,6 +7,7 @@
 #include "eventswidgetscheck.h"
 #include "files/literals.h"
 #include "quickactioncheck.h"
+#include "rules.h"
 
 #include <QDir>
 #include <QDirIterator>
@@ -59,7 +60,7 @@ bool DefinitionsChecker::checkInstalledDirectory(QLatin1String directory,
     misplaced.sort();
     for (const QString &file : qAsConst(misplaced)) {
         Findings findings(file);
-        findings.add(1, Finding::Severity::Error, "place"_L1,
+        findings.add(1, Finding::Severity::Error, Rule::place,
                      QStringLiteral("no model reads the file here; *.conf belongs in %1, *.json in "
                                     "%2, and neither in a directory below")
                          .arg(DefinitionFiles::quickActionsDirectory,
@@ -93,7 +94,7 @@ void DefinitionsChecker::checkFile(const QString &path)
 
     Findings findings(path);
     if (m_context.isInstalled && !QFileInfo(path).permission(QFile::ReadOther)) {
-        findings.add(1, Finding::Severity::Error, "permissions"_L1,
+        findings.add(1, Finding::Severity::Error, Rule::permissions,
                      QStringLiteral("not every user can read this file"));
     }
     if (DefinitionFiles::isQuickAction(path)) {
@@ -101,7 +102,7 @@ void DefinitionsChecker::checkFile(const QString &path)
     } else if (DefinitionFiles::isEventsWidgets(path)) {
         checkEventsWidgets(path, &m_context, &findings);
     } else {
-        findings.add(1, Finding::Severity::Error, "file-name"_L1,
+        findings.add(1, Finding::Severity::Error, Rule::fileName,
                      QStringLiteral("the name ends neither in \".conf\" nor in \".json\": no model "
                                     "reads the file"));
     }

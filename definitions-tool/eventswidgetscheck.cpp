@@ -8,6 +8,7 @@
 #include "files/literals.h"
 #include "jsonwalker.h"
 #include "readerlog.h"
+#include "rules.h"
 
 #include <QJsonArray>
 #include <QJsonDocument>
@@ -23,20 +24,6 @@ using Severity = Finding::Severity;
 using Widget = EventsWidget;
 
 namespace {
-
-constexpr auto unreadableRule = "unreadable"_L1;
-constexpr auto jsonRule = "json"_L1;
-constexpr auto noWidgetRule = "no-widget"_L1;
-constexpr auto repeatedKeyRule = "repeated-key"_L1;
-constexpr auto typeRule = "type"_L1;
-constexpr auto widgetRule = "widget"_L1;
-constexpr auto pathRule = "path"_L1;
-constexpr auto orderRule = "order"_L1;
-constexpr auto duplicatePathRule = "duplicate-path"_L1;
-constexpr auto relativePathRule = "relative-path"_L1;
-constexpr auto remoteUrlRule = "remote-url"_L1;
-constexpr auto titleRule = "title"_L1;
-constexpr auto catalogRule = "catalog"_L1;
 
 constexpr const char *byteOrderMark = "\xef\xbb\xbf";
 
@@ -167,7 +154,7 @@ void EventsWidgetsCheck::check()
     checkCatalog(m_file.translationCatalog, catalogLine, m_context, m_findings);
     const Member &widgets = members[WidgetsKey];
     if (widgets.line == 0) {
-        add(lineOf(start), Severity::Error, noWidgetRule,
+        add(lineOf(start), Severity::Error, Rule::noWidget,
             QStringLiteral("there is no \"widgets\": no widget is listed"));
     } else if (widgets.value.isArray()) {
         JsonWalker entries(m_content, widgets.position);
@@ -177,7 +164,7 @@ void EventsWidgetsCheck::check()
             checkEntry(entries.position());
         }
         if (isEmpty) {
-            add(widgets.line, Severity::Warning, noWidgetRule,
+            add(widgets.line, Severity::Warning, Rule::noWidget,
                 QStringLiteral("\"widgets\" is empty: no widget is listed"));
         }
     }
@@ -206,13 +193,13 @@ EventsWidgetsCheck::checkMembers(const std::array<Key, count> &keys, int positio
         }
         Member &member = members.at(size_t(key - keys.cbegin()));
         if (member.line > 0) {
-            add(member.line, Severity::Error, repeatedKeyRule,
+            add(member.line, Severity::Error, Rule::repeatedKey,
                 QStringLiteral("the key %1 is repeated in line %2, and only that one counts")
                     .arg(quoted(name), QString::number(line)));
         }
         member = {line, walker.position(), walker.value()};
         if (!isOf(key->type, member.value)) {
-            add(line, Severity::Error, typeRule,
+            add(line, Severity::Error, Rule::type,
                 QStringLiteral("the value of %1 is not %2 and is ignored")
                     .arg(quoted(name), nameOf(key->type)));
         }
@@ -224,7 +211,7 @@ void EventsWidgetsCheck::checkEntry(int position)
 {
     const int line = lineOf(position);
     if (m_content.at(position) != '{') {
-        add(line, Severity::Error, widgetRule,
+        add(line, Severity::Error, Rule::widget,
             QStringLiteral("this is not an object and is ignored"));
         return;
     }
@@ -235,7 +222,7 @@ void EventsWidgetsCheck::checkEntry(int position)
         checkWidget(m_file.widgets.at(m_next), members, line);
         ++m_next;
     } else {
-        add(path.line > 0 ? path.line : line, Severity::Error, pathRule,
+        add(path.line > 0 ? path.line : line, Severity::Error, Rule::path,
             path.line == 0 ? QStringLiteral("there is no \"path\": the widget is ignored")
                 : path.value.isString()
                 ? QStringLiteral("\"path\" is empty: the widget is ignored")
@@ -250,26 +237,26 @@ void EventsWidgetsCheck::checkWidget(const Widget &widget, const Members<WidgetK
     if (known == m_context->widgets.constEnd()) {
         m_context->widgets.insert(widget.path, {m_path, members[PathKey].line});
     } else {
-        add(members[PathKey].line, Severity::Warning, duplicatePathRule,
+        add(members[PathKey].line, Severity::Warning, Rule::duplicatePath,
             QStringLiteral("the path %1 is also in %2:%3; only one of the two widgets is listed")
                 .arg(quoted(widget.path), known->file, QString::number(known->line)));
     }
     checkPath(widget.path, members[PathKey].line);
     if (members[OrderKey].line == 0) {
-        add(line, Severity::Warning, orderRule,
+        add(line, Severity::Warning, Rule::order,
             QStringLiteral("without \"order\" the widget comes last"));
     } else if (members[OrderKey].value.toInt() < 0) {
-        add(members[OrderKey].line, Severity::Warning, orderRule,
+        add(members[OrderKey].line, Severity::Warning, Rule::order,
             QStringLiteral("with a negative \"order\" the widget comes last"));
     }
     if (widget.title.isEmpty() && widget.translationId.isEmpty()) {
-        add(line, Severity::Warning, titleRule,
+        add(line, Severity::Warning, Rule::title,
             QStringLiteral("without \"title\" and \"translation_id\" the widget has no title"));
     }
     checkTexts(widget, members);
     checkIcon(widget.icon, members[IconKey].line, m_context, m_findings);
     if (!widget.availablePath.isEmpty() && !widget.availablePath.startsWith(QLatin1Char('/'))) {
-        add(members[AvailablePathKey].line, Severity::Warning, relativePathRule,
+        add(members[AvailablePathKey].line, Severity::Warning, Rule::relativePath,
             QStringLiteral("the available path %1 is a relative path")
                 .arg(quoted(widget.availablePath)));
     }
@@ -281,10 +268,10 @@ void EventsWidgetsCheck::checkPath(const QString &path, int line)
                                        QStringLiteral("ftp")};
     const QString scheme = schemeOf(path);
     if (scheme.isEmpty() && !path.startsWith(QLatin1Char('/'))) {
-        add(line, Severity::Warning, relativePathRule,
+        add(line, Severity::Warning, Rule::relativePath,
             QStringLiteral("the path %1 is a relative path").arg(quoted(path)));
     } else if (remote.contains(scheme)) {
-        add(line, Severity::Warning, remoteUrlRule,
+        add(line, Severity::Warning, Rule::remoteUrl,
             QStringLiteral("the path %1 makes the home screen run code from the network")
                 .arg(quoted(path)));
     } else {
@@ -301,7 +288,7 @@ void EventsWidgetsCheck::checkTexts(const Widget &widget, const Members<WidgetKe
     if (widget.translationCatalog.isEmpty()) {
         for (const WidgetKey key : {TitleKey, TranslationIdKey, DescriptionIdKey}) {
             if (!members.at(key).value.toString().isEmpty()) {
-                add(members.at(key).line, Severity::Warning, catalogRule,
+                add(members.at(key).line, Severity::Warning, Rule::catalog,
                     QStringLiteral("without \"translation_catalog\" this text is not translated"));
                 break;
             }
@@ -349,7 +336,7 @@ void reportRefused(const QByteArray &content, Findings *findings)
                       QStringLiteral("%1: nothing of the file is read").arg(QLatin1String(text)));
     };
     if (isTooComplex(content)) {
-        report(0, unreadableRule, "there are more than a million objects and arrays");
+        report(0, Rule::unreadable, "there are more than a million objects and arrays");
         return;
     }
     QJsonParseError error = {};
@@ -359,12 +346,12 @@ void reportRefused(const QByteArray &content, Findings *findings)
         ++start;
     }
     if (document.isArray() || isScalar(content.mid(start))) {
-        report(start, jsonRule, "this is not an object");
+        report(start, Rule::json, "this is not an object");
         return;
     }
     const int comma = trailingComma(content, error);
     if (comma >= 0) {
-        report(comma, jsonRule, "no value follows this comma");
+        report(comma, Rule::json, "no value follows this comma");
         return;
     }
     // If a file ends too early, the error is where its text ends, not in an empty line after that.
@@ -372,7 +359,7 @@ void reportRefused(const QByteArray &content, Findings *findings)
     while (end > 0 && isSpace(content.at(end - 1))) {
         --end;
     }
-    report(std::min(error.offset, end), jsonRule, "from here on this is not JSON");
+    report(std::min(error.offset, end), Rule::json, "from here on this is not JSON");
 }
 
 } // namespace

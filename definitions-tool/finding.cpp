@@ -3,6 +3,8 @@
 
 #include "finding.h"
 
+#include "rules.h"
+
 #include <QJsonArray>
 #include <QJsonDocument>
 #include <QJsonObject>
@@ -50,7 +52,7 @@ void Findings::add(int line, Finding::Severity severity, QLatin1String rule, con
     if (count <= maximumFindings) {
         m_findings.push_back({m_file, line, severity, rule, text});
     } else if (count == maximumFindings + 1) {
-        m_findings.push_back({m_file, line, severity, QStringLiteral("too-many"),
+        m_findings.push_back({m_file, line, severity, Rule::tooMany,
                               QStringLiteral("further findings of this severity are left out")});
     }
 }

@@ -4,6 +4,7 @@
 #include "installedcatalogs.h"
 
 #include "files/literals.h"
+#include "rules.h"
 #include "translations/catalogfiles.h"
 
 #include <QDir>
@@ -19,15 +20,14 @@ namespace {
 
 constexpr auto suffix = ".qm"_L1;
 
-// The names of a locale with which Qt looks for its catalogs.
-QStringList localeNames(const QLocale &locale)
+// All names under which Qt looks for the catalogs of a locale.
+QStringList fileNames(const QLocale &locale)
 {
     QStringList names;
-    const QStringList languages = locale.uiLanguages();
-    for (QString name : languages) {
-        name.replace(QLatin1Char('-'), QLatin1Char('_'));
+    const QStringList fullNames = CatalogFiles::localeNames(locale);
+    for (QString name : fullNames) {
         for (; !name.isEmpty(); name.truncate(qMax(0, name.lastIndexOf(QLatin1Char('_'))))) {
-            names += {name, name.toLower()};
+            names.append(name);
         }
     }
     return names;
@@ -48,7 +48,7 @@ QString similarName(const QString &fileName, const QString &catalog)
     if (locale.language() == QLocale::C || name.endsWith(CatalogFiles::engineeringEnglishSuffix)) {
         return {};
     }
-    const QStringList names = localeNames(locale);
+    const QStringList names = fileNames(locale);
     return catalog + CatalogFiles::localePrefix + (names.contains(name) ? name : names.constFirst())
         + suffix;
 }
@@ -94,7 +94,7 @@ const InstalledCatalogs::Catalog &InstalledCatalogs::find(const QString &catalog
         const QString rightName = similarName(fileName, catalog);
         if (fileName == rightName) {
             if (!QFileInfo(path).permission(QFile::ReadOther)) {
-                addFinding(path, Severity::Error, "permissions",
+                addFinding(path, Severity::Error, Rule::permissions,
                            QStringLiteral("not every user can read this file"));
             }
             if (path != engineeringEnglish) {
@@ -102,7 +102,7 @@ const InstalledCatalogs::Catalog &InstalledCatalogs::find(const QString &catalog
                 addLanguage(&found, fileName.mid(start).chopped(suffix.size()), path);
             }
         } else if (!rightName.isEmpty()) {
-            addFinding(path, Severity::Warning, "catalog",
+            addFinding(path, Severity::Warning, Rule::catalog,
                        QStringLiteral("no model loads a file of this name; is %1 meant?")
                            .arg(quoted(rightName)));
         }
@@ -122,15 +122,15 @@ void InstalledCatalogs::addLanguage(Catalog *catalog, const QString &name, const
     if (refusal.isEmpty()) {
         catalog->languages.push_back({name, QFileInfo(path).fileName(), std::move(translator)});
     } else {
-        addFinding(path, Severity::Error, "catalog",
+        addFinding(path, Severity::Error, Rule::catalog,
                    QStringLiteral("the catalog is not used: %1").arg(refusal));
     }
 }
 
-void InstalledCatalogs::addFinding(const QString &path, Severity severity, const char *rule,
+void InstalledCatalogs::addFinding(const QString &path, Severity severity, QLatin1String rule,
                                    const QString &text)
 {
     Findings findings(path);
-    findings.add(1, severity, QLatin1String(rule), text);
+    findings.add(1, severity, rule, text);
     m_findings.push_back(findings.take().front());
 }

@@ -50,7 +50,7 @@ public:
 
 private:
     void addLanguage(Catalog *catalog, const QString &name, const QString &path);
-    void addFinding(const QString &path, Finding::Severity severity, const char *rule,
+    void addFinding(const QString &path, Finding::Severity severity, QLatin1String rule,
                     const QString &text);
 
     QString m_directory;

@@ -9,6 +9,7 @@
 #include "inilines.h"
 #include "quickactions/quickaction.h"
 #include "readerlog.h"
+#include "rules.h"
 
 #include <QDBusError>
 #include <QRegularExpression>
@@ -21,22 +22,6 @@ using Action = QuickAction;
 using Severity = Finding::Severity;
 
 namespace {
-
-constexpr auto unreadableRule = "unreadable"_L1;
-constexpr auto noKeyRule = "no-key"_L1;
-constexpr auto repeatedKeyRule = "repeated-key"_L1;
-constexpr auto encodingRule = "encoding"_L1;
-constexpr auto semicolonRule = "semicolon"_L1;
-constexpr auto commaRule = "comma"_L1;
-constexpr auto typeRule = "type"_L1;
-constexpr auto argumentsRule = "arguments"_L1;
-constexpr auto callRule = "call"_L1;
-constexpr auto priorityRule = "priority"_L1;
-constexpr auto titleRule = "title"_L1;
-constexpr auto catalogRule = "catalog"_L1;
-constexpr auto argumentTypeRule = "argument-type"_L1;
-constexpr auto packageRule = "package"_L1;
-constexpr auto systemServiceRule = "system-service"_L1;
 
 constexpr auto catalogKey = "translation-catalog"_L1;
 constexpr auto iconKey = "icon"_L1;
@@ -178,7 +163,7 @@ void QuickActionCheck::checkLines(bool isLatin1)
             checkKey(line, section);
             break;
         default:
-            add(line.number, Severity::Error, noKeyRule,
+            add(line.number, Severity::Error, Rule::noKey,
                 line.name.startsWith(QLatin1Char('#'))
                     ? QStringLiteral("this line is not a key and is ignored; comments begin with "
                                      "\";\"")
@@ -186,7 +171,7 @@ void QuickActionCheck::checkLines(bool isLatin1)
             break;
         }
         if (!line.isAscii && isLatin1) {
-            add(line.number, Severity::Error, encodingRule,
+            add(line.number, Severity::Error, Rule::encoding,
                 QStringLiteral("bytes outside ASCII are read as Latin-1; write \\x and the "
                                "character's number"));
         }
@@ -196,17 +181,17 @@ void QuickActionCheck::checkLines(bool isLatin1)
 void QuickActionCheck::checkKey(const NamedIniLine &line, const QString &section)
 {
     if (line.isMarked) {
-        add(line.number, Severity::Error, encodingRule,
+        add(line.number, Severity::Error, Rule::encoding,
             QStringLiteral("the byte-order mark becomes a part of the key"));
         return;
     }
     if (m_lineOf.value(line.name) != line.number) {
-        add(line.number, Severity::Error, repeatedKeyRule,
+        add(line.number, Severity::Error, Rule::repeatedKey,
             QStringLiteral("the key %1 is repeated in line %2, and only that one counts")
                 .arg(quoted(line.name), QString::number(m_lineOf.value(line.name))));
     }
     if (line.isCut) {
-        add(line.number, Severity::Error, semicolonRule,
+        add(line.number, Severity::Error, Rule::semicolon,
             QStringLiteral("an unquoted semicolon ends the value; put it in double quotes"));
     }
     if (section.isEmpty()) {
@@ -236,11 +221,11 @@ void QuickActionCheck::checkTexts()
     const QString catalog = m_action.translationCatalog();
     const QString title = m_action.title();
     if (title.isEmpty() && !m_misread.contains(titleKey)) {
-        add(lineOf(titleKey), Severity::Warning, titleRule,
+        add(lineOf(titleKey), Severity::Warning, Rule::title,
             QStringLiteral("without \"title\" the action shows no text"));
     }
     if (!title.isEmpty() && catalog.isEmpty() && !m_misread.contains(catalogKey)) {
-        add(lineOf(titleKey), Severity::Warning, catalogRule,
+        add(lineOf(titleKey), Severity::Warning, Rule::catalog,
             QStringLiteral("without \"translation-catalog\" the title is only looked up in "
                            "catalogs that happen to be loaded"));
     }
@@ -250,7 +235,7 @@ void QuickActionCheck::checkTexts()
     static const QRegularExpression package(
         QRegularExpression::anchoredPattern(QStringLiteral("[\\w.+-]*")));
     if (!package.match(m_action.requiredPackage()).hasMatch()) {
-        add(lineOf(packageKey), Severity::Warning, packageRule,
+        add(lineOf(packageKey), Severity::Warning, Rule::package,
             QStringLiteral("%1 is not the name of a package; write it without a version")
                 .arg(quoted(m_action.requiredPackage())));
     }
@@ -264,13 +249,13 @@ void QuickActionCheck::checkText(const QString &key, const QVariant &value)
     }
     m_misread.insert(key);
     if (value.userType() == QMetaType::QStringList) {
-        add(lineOf(key), Severity::Error, commaRule,
+        add(lineOf(key), Severity::Error, Rule::comma,
             QStringLiteral(
                 "an unquoted comma makes %1 a list, which is not a text; put it in double "
                 "quotes")
                 .arg(quoted(key)));
     } else {
-        add(lineOf(key), Severity::Error, typeRule,
+        add(lineOf(key), Severity::Error, Rule::type,
             QStringLiteral("%1 is not read as a text; write a leading @ twice").arg(quoted(key)));
     }
 }
@@ -278,13 +263,13 @@ void QuickActionCheck::checkText(const QString &key, const QVariant &value)
 void QuickActionCheck::checkPriority()
 {
     if (!m_config.contains(priorityKey)) {
-        add(1, Severity::Warning, priorityRule,
+        add(1, Severity::Warning, Rule::priority,
             QStringLiteral("without \"priority\" the action comes last"));
     } else if (!m_action.priority()) {
-        add(lineOf(priorityKey), Severity::Error, typeRule,
+        add(lineOf(priorityKey), Severity::Error, Rule::type,
             QStringLiteral("\"priority\" is not an integer: the action comes last"));
     } else if (*m_action.priority() < 0) {
-        add(lineOf(priorityKey), Severity::Warning, priorityRule,
+        add(lineOf(priorityKey), Severity::Warning, Rule::priority,
             QStringLiteral("\"priority\" is negative: the action comes last"));
     }
 }
@@ -306,14 +291,14 @@ void QuickActionCheck::checkArguments()
     const int size = arguments.size();
     if (highest > size && size <= maximumArguments) {
         const bool hasSize = m_lineOf.contains(sizeKey);
-        add(hasSize ? lineOf(sizeKey) : highestLine, Severity::Error, argumentsRule,
+        add(hasSize ? lineOf(sizeKey) : highestLine, Severity::Error, Rule::arguments,
             hasSize ? QStringLiteral("\"size\" leaves out argument %1").arg(highest)
                     : QStringLiteral("without \"size\" the call has no arguments"));
     }
     for (int i = 0; i < size; ++i) {
         if (!arguments.at(i).isValid() && !m_lineOf.contains(argumentKey(i + 1))) {
             m_argumentsAreWrong = true;
-            add(lineOf(sizeKey), Severity::Error, argumentsRule,
+            add(lineOf(sizeKey), Severity::Error, Rule::arguments,
                 QStringLiteral("\"size\" counts argument %1, which is missing").arg(i + 1));
             break;
         }
@@ -329,17 +314,17 @@ void QuickActionCheck::checkArgument(int number, const QVariant &value)
 {
     const int line = lineOf(argumentKey(number));
     if (value.userType() == QMetaType::QStringList) {
-        add(line, Severity::Note, argumentTypeRule,
+        add(line, Severity::Note, Rule::argumentType,
             QStringLiteral("argument %1 is sent as a list of %2 texts")
                 .arg(number)
                 .arg(value.toStringList().size()));
     } else if (value.userType() != QMetaType::QString) {
         m_argumentsAreWrong = true;
-        add(line, Severity::Error, argumentsRule,
+        add(line, Severity::Error, Rule::arguments,
             QStringLiteral("argument %1 is not read as a text; write a leading @ twice")
                 .arg(number));
     } else if (looksLikeNumberOrBoolean(value.toString())) {
-        add(line, Severity::Note, argumentTypeRule,
+        add(line, Severity::Note, Rule::argumentType,
             QStringLiteral("argument %1 is sent as the text %2")
                 .arg(number)
                 .arg(quoted(value.toString())));
@@ -357,7 +342,7 @@ void QuickActionCheck::checkCall()
         isSendable = false;
         // Unless another finding has reported this value already.
         if (!m_misread.contains(name.key)) {
-            add(lineOf(name.key), Severity::Error, callRule,
+            add(lineOf(name.key), Severity::Error, Rule::call,
                 value.isEmpty()
                     ? QStringLiteral("the call cannot be sent without %1").arg(quoted(name.key))
                     : QStringLiteral("the call cannot be sent: %1 is not a valid %2")
@@ -365,7 +350,7 @@ void QuickActionCheck::checkCall()
         }
     }
     if (m_action.service().startsWith("org.freedesktop."_L1)) {
-        add(lineOf(serviceKey), Severity::Warning, systemServiceRule,
+        add(lineOf(serviceKey), Severity::Warning, Rule::systemService,
             QStringLiteral("the service %1 belongs to the system, and executes the call with the "
                            "rights of the user")
                 .arg(quoted(m_action.service())));
@@ -375,7 +360,7 @@ void QuickActionCheck::checkCall()
         const QString key = error.type() == QDBusError::InvalidObjectPath ? pathKey
             : error.type() == QDBusError::InvalidInterface                ? interfaceKey
                                                                           : sizeKey;
-        add(lineOf(key), Severity::Error, callRule,
+        add(lineOf(key), Severity::Error, Rule::call,
             QStringLiteral("the call cannot be sent: %1").arg(error.message()));
     }
 }
@@ -389,7 +374,7 @@ void reportRefused(const QString &path, Findings *findings)
     }
     for (const NamedIniLine &line : readIniLines(content)) {
         if (line.isPacked || !line.isClosed) {
-            findings->add(line.number, Severity::Error, unreadableRule,
+            findings->add(line.number, Severity::Error, Rule::unreadable,
                           line.isPacked
                               ? QStringLiteral(
                                   "the value mentions @Variant( or @DateTime(: nothing of the file "
@@ -399,7 +384,7 @@ void reportRefused(const QString &path, Findings *findings)
             return;
         }
     }
-    findings->add(1, Severity::Error, unreadableRule,
+    findings->add(1, Severity::Error, Rule::unreadable,
                   QStringLiteral("QSettings cannot read the file"));
 }
 

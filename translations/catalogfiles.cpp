@@ -35,21 +35,6 @@ QString findFile(const QString &base, QString name, const QString &separators)
     return {};
 }
 
-// As in file names. A name in lower case comes after the name itself.
-QStringList localeNames(const QLocale &locale)
-{
-    QStringList names;
-    const QStringList languages = locale.uiLanguages();
-    for (QString name : languages) {
-        name.replace(QLatin1Char('-'), QLatin1Char('_'));
-        names.append(name);
-        if (name.toLower() != name) {
-            names.append(name.toLower());
-        }
-    }
-    return names;
-}
-
 } // namespace
 
 bool CatalogFiles::isCatalogName(const QString &name)
@@ -80,4 +65,18 @@ QString CatalogFiles::findLanguage(const QString &catalog, const QLocale &locale
         }
     }
     return {};
+}
+
+QStringList CatalogFiles::localeNames(const QLocale &locale)
+{
+    QStringList names;
+    const QStringList languages = locale.uiLanguages();
+    for (QString name : languages) {
+        name.replace(QLatin1Char('-'), QLatin1Char('_'));
+        names.append(name);
+        if (name.toLower() != name) {
+            names.append(name.toLower());
+        }
+    }
+    return names;
 }

@@ -6,7 +6,7 @@
 
 #include "files/literals.h"
 
-#include <QString>
+#include <QStringList>
 
 class QLocale;
 
@@ -27,6 +27,9 @@ QString findEngineeringEnglish(const QString &catalog,
                                const QString &directory = CatalogFiles::directory);
 QString findLanguage(const QString &catalog, const QLocale &locale,
                      const QString &directory = CatalogFiles::directory);
+
+// The names of a locale in file names. A name in lower case comes after the name itself.
+QStringList localeNames(const QLocale &locale);
 
 } // namespace CatalogFiles
 

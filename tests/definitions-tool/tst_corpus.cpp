@@ -36,6 +36,7 @@ private Q_SLOTS:
     void findings_data();
     void findings();
     void findingsOfATree();
+    void rulesAreExplained();
     void agreesOnQuickActions_data();
     void agreesOnQuickActions();
     void agreesOnEventsWidgets_data();
@@ -288,6 +289,29 @@ void TestCorpus::findingsOfATree()
         found += toText(finding) + QLatin1Char('\n');
     }
     QCOMPARE(found, QString::fromUtf8(read(QStringLiteral(CORPUS_DIR "/tree.findings"))));
+}
+
+// The corpus has an example of each rule, and the manual page explains it.
+void TestCorpus::rulesAreExplained()
+{
+    static const QRegularExpression rule(QStringLiteral("\\[([a-z-]+)\\]\n"));
+    // tst_marlodefinitions tests these.
+    QSet<QString> found = {QStringLiteral("file-name"), QStringLiteral("too-many")};
+    for (const QString &name : words("quickaction eventswidgetsfile tree")) {
+        const QString findings =
+            QString::fromUtf8(read(QStringLiteral(CORPUS_DIR "/%1.findings").arg(name)));
+        for (auto it = rule.globalMatch(findings); it.hasNext();) {
+            found.insert(it.next().captured(1));
+        }
+    }
+    static const QRegularExpression item(QStringLiteral("\\bSy ([a-z-]+)"));
+    const QString page =
+        QString::fromUtf8(read(QStringLiteral(SOURCE_DIR "/docs/man/marlo-definitions.1")));
+    QSet<QString> explained;
+    for (auto it = item.globalMatch(page); it.hasNext();) {
+        explained.insert(it.next().captured(1));
+    }
+    QCOMPARE(explained, found);
 }
 
 void TestCorpus::agreesOnQuickActions_data()

@@ -20,6 +20,8 @@
     An unknown scenario is an error. The program exits when its standard input is closed.
 */
 
+#include "simulator/diskserviceerrors.h"
+
 #include <QCoreApplication>
 #include <QDBusArgument>
 #include <QDBusConnection>
@@ -47,24 +49,7 @@ const QLatin1String mountPoint("/media/card");
 constexpr int slowness = 1000; // ms
 
 const QStringList methods = {QStringLiteral("Mount"), QStringLiteral("Unmount")};
-const QStringList errors = {
-    QStringLiteral("Failed"),
-    QStringLiteral("Cancelled"),
-    QStringLiteral("AlreadyCancelled"),
-    QStringLiteral("NotAuthorized"),
-    QStringLiteral("NotAuthorizedCanObtain"),
-    QStringLiteral("NotAuthorizedDismissed"),
-    QStringLiteral("AlreadyMounted"),
-    QStringLiteral("NotMounted"),
-    QStringLiteral("OptionNotPermitted"),
-    QStringLiteral("MountedByOtherUser"),
-    QStringLiteral("AlreadyUnmounting"),
-    QStringLiteral("NotSupported"),
-    QStringLiteral("Timedout"),
-    QStringLiteral("WouldWakeup"),
-    QStringLiteral("DeviceBusy"),
-    QStringLiteral("UnknownError"),
-};
+const QStringList errors = diskServiceErrors() + QStringList(QStringLiteral("UnknownError"));
 const QStringList otherScenarios = {QStringLiteral("done"), QStringLiteral("failed"),
                                     QStringLiteral("slow"), QStringLiteral("hung"),
                                     QStringLiteral("gone")};

@@ -156,12 +156,24 @@ GalleryPage {
     }
 
     // A new card is only probed.
-    onCardNameChanged: {
+    function probe() {
         operation.active = false;
         fileSystem = "";
         if (cardName) {
             run([], card => {});
         }
+    }
+
+    // The name may be set before the Loader can make a formatter.
+    property bool complete
+    onCardNameChanged: {
+        if (complete) {
+            probe();
+        }
+    }
+    Component.onCompleted: {
+        complete = true;
+        probe();
     }
 
     Loader {

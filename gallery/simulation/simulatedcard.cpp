@@ -89,9 +89,9 @@ void SimulatedCard::setDiskService(DiskService diskService)
         startDiskService();
     } else if (diskService != Absent || replaces) {
         m_simulated = std::make_unique<SimulatedDiskService>(
-            diskService == Forbidding ? SimulatedDiskService::Manner::Forbidding
+            diskService == Forbidding ? SimulatedDiskService::Manner::Failing
                                       : SimulatedDiskService::Manner::Silent,
-            devicePath());
+            QStringLiteral("NotAuthorized"));
     }
     if (diskService == Absent) {
         m_simulated.reset();
@@ -130,8 +130,7 @@ QString SimulatedCard::devicePath() const
 void SimulatedCard::startDiskService()
 {
     if (!m_real) {
-        m_simulated = std::make_unique<SimulatedDiskService>(SimulatedDiskService::Manner::Working,
-                                                             devicePath());
+        m_simulated = std::make_unique<SimulatedDiskService>(SimulatedDiskService::Manner::Working);
         connect(m_simulated.get(), &SimulatedDiskService::mountsChanged, this,
                 &SimulatedCard::followMounts);
         return;

@@ -11,6 +11,7 @@
 #include <QDir>
 #include <QFile>
 #include <QFileInfo>
+#include <QTimer>
 
 #include <algorithm>
 
@@ -19,9 +20,20 @@ namespace {
 const QString service = QStringLiteral("org.freedesktop.UDisks2");
 const QLatin1String errorPrefix("org.freedesktop.UDisks2.Error.");
 
-QDBusMessage errorReply(const QDBusMessage &call, const char *name)
+QDBusMessage errorReply(const QDBusMessage &call, const QString &name)
 {
-    return call.createErrorReply(errorPrefix + QLatin1String(name), QStringLiteral("simulated"));
+    return call.createErrorReply(errorPrefix + name, QStringLiteral("simulated"));
+}
+
+// The name of the card that a call is for, such as "mmcblk1p1".
+QString cardOf(const QDBusMessage &call)
+{
+    return call.path().section(QLatin1Char('/'), -1);
+}
+
+QByteArray deviceOf(const QDBusMessage &call)
+{
+    return QFile::encodeName(QStringLiteral("/dev/") + cardOf(call));
 }
 
 // Whether this process has a file in the directory open.
@@ -36,8 +48,9 @@ bool isInUse(const QString &directory)
 
 } // namespace
 
-SimulatedDiskService::SimulatedDiskService(Manner manner, const QString &devicePath)
-    : m_manner(manner), m_devicePath(QFile::encodeName(devicePath)),
+SimulatedDiskService::SimulatedDiskService(Manner manner, const QString &error,
+                                           std::chrono::milliseconds delay)
+    : m_manner(manner), m_error(error), m_delay(delay),
       m_connection(QDBusConnection::connectToBus(QDBusConnection::SystemBus,
                                                  QStringLiteral("simulated disk service")))
 {
@@ -66,29 +79,27 @@ QString SimulatedDiskService::introspect(const QString &path) const
 bool SimulatedDiskService::handleMessage(const QDBusMessage &message,
                                          const QDBusConnection &connection)
 {
-    switch (m_manner) {
-    case Manner::Working:
-        connection.send(message.member() == QLatin1String("Mount") ? mountCard(message)
-                                                                   : unmountCard(message));
-        break;
-    case Manner::Forbidding:
-        connection.send(errorReply(message, "NotAuthorized"));
-        break;
-    case Manner::Silent:
-        break;
+    if (m_manner != Manner::Silent) {
+        QTimer::singleShot(m_delay, this, [this, message, connection] {
+            connection.send(m_manner == Manner::Failing ? errorReply(message, m_error)
+                                : message.member() == QLatin1String("Mount")
+                                ? mountCard(message)
+                                : unmountCard(message));
+        });
     }
     return true;
 }
 
 QDBusMessage SimulatedDiskService::mountCard(const QDBusMessage &call)
 {
-    if (!MountTable::directoryOf(m_devicePath).isEmpty()) {
-        return errorReply(call, "AlreadyMounted");
+    if (!MountTable::directoryOf(deviceOf(call)).isEmpty()) {
+        return errorReply(call, QStringLiteral("AlreadyMounted"));
     }
-    const QString directory = qEnvironmentVariable("XDG_RUNTIME_DIR") + QStringLiteral("/card");
+    const QString directory =
+        qEnvironmentVariable("XDG_RUNTIME_DIR") + QStringLiteral("/card-") + cardOf(call);
     if (!QDir().mkpath(directory)
-        || !MountTable::setDirectoryOf(m_devicePath, QFile::encodeName(directory))) {
-        return errorReply(call, "Failed");
+        || !MountTable::setDirectoryOf(deviceOf(call), QFile::encodeName(directory))) {
+        return errorReply(call, QStringLiteral("Failed"));
     }
     Q_EMIT mountsChanged();
     return call.createReply(directory);
@@ -96,15 +107,15 @@ QDBusMessage SimulatedDiskService::mountCard(const QDBusMessage &call)
 
 QDBusMessage SimulatedDiskService::unmountCard(const QDBusMessage &call)
 {
-    const QString directory = MountTable::directoryOf(m_devicePath);
+    const QString directory = MountTable::directoryOf(deviceOf(call));
     if (directory.isEmpty()) {
-        return errorReply(call, "NotMounted");
+        return errorReply(call, QStringLiteral("NotMounted"));
     }
     if (isInUse(directory)) {
-        return errorReply(call, "DeviceBusy");
+        return errorReply(call, QStringLiteral("DeviceBusy"));
     }
-    if (!MountTable::setDirectoryOf(m_devicePath, {}) || !QDir(directory).removeRecursively()) {
-        return errorReply(call, "Failed");
+    if (!MountTable::setDirectoryOf(deviceOf(call), {}) || !QDir(directory).removeRecursively()) {
+        return errorReply(call, QStringLiteral("Failed"));
     }
     Q_EMIT mountsChanged();
     return call.createReply();

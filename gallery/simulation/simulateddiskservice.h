@@ -4,11 +4,12 @@
 #ifndef SIMULATEDDISKSERVICE_H
 #define SIMULATEDDISKSERVICE_H
 
-#include <QByteArray>
 #include <QDBusConnection>
 #include <QDBusMessage>
 #include <QDBusVirtualObject>
 #include <QString>
+
+#include <chrono>
 
 /*
     Simulates the disk service while the object exists, and replaces a real one. It has a bus connection
@@ -20,9 +21,11 @@ class SimulatedDiskService : public QDBusVirtualObject
     Q_OBJECT
 
 public:
-    enum class Manner { Working, Forbidding, Silent };
+    enum class Manner { Working, Failing, Silent };
 
-    SimulatedDiskService(Manner manner, const QString &devicePath);
+    // Replies after the delay. The error is one of the disk service's own, for the manner Failing.
+    explicit SimulatedDiskService(Manner manner, const QString &error = QString(),
+                                  std::chrono::milliseconds delay = {});
     // The callers of unanswered calls get an error.
     ~SimulatedDiskService() override;
     Q_DISABLE_COPY_MOVE(SimulatedDiskService)
@@ -38,7 +41,8 @@ private:
     QDBusMessage unmountCard(const QDBusMessage &call);
 
     Manner m_manner;
-    QByteArray m_devicePath;
+    QString m_error;
+    std::chrono::milliseconds m_delay;
     QDBusConnection m_connection;
 };
 

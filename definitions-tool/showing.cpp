@@ -69,9 +69,11 @@ QString callLine(const QuickAction &action)
             for (const QString &text : list) {
                 values.append(sentText(text));
             }
-        } else {
+        } else if (argument.userType() == QMetaType::QString) {
             signature += QLatin1Char('s');
             values.append(sentText(argument.toString()));
+        } else {
+            return QStringLiteral("# is sent with an argument that is not a text\n");
         }
     }
     if (!signature.isEmpty()) {

@@ -7,26 +7,35 @@
 
 #include <QDBusConnection>
 #include <QDBusMessage>
+#include <QDBusMetaType>
+#include <QFile>
 #include <QQmlInfo>
 #include <QSettings>
 
 #include <algorithm>
+#include <cstring>
+
+#include <sys/stat.h>
 
 namespace {
 
-const QLatin1String argumentsKey("remote-arguments");
-// The keys of a QSettings array, whose elements are numbered from 1.
-const QLatin1String argumentsSizeKey("remote-arguments/size");
-const QLatin1String argumentKey("remote-arguments/%1/argument");
+constexpr auto argumentsKey = "remote-arguments"_L1;
+constexpr auto argumentKey = "argument"_L1; // of an element of the array
 
 // The longest signature that D-Bus allows.
-constexpr int maximumSignature = 255;
+constexpr std::size_t maximumSignature = 255;
 // More arguments than a call can have. A file may claim to have any number of them.
 constexpr int enoughArguments = 256;
 
 // Reserved for D-Bus libraries: the bus disconnects a client that sends a message with one of them.
-const QLatin1String reservedPath("/org/freedesktop/DBus/Local");
-const QLatin1String reservedInterface("org.freedesktop.DBus.Local");
+constexpr auto reservedPath = "/org/freedesktop/DBus/Local"_L1;
+constexpr auto reservedInterface = "org.freedesktop.DBus.Local"_L1;
+
+std::optional<QVariantMap> unreadable()
+{
+    qWarning("Unable to open action file");
+    return {};
+}
 
 // QSettings gives a list of variants, not of strings, if an element begins with "@".
 QVariant withStringList(const QVariant &value)
@@ -41,17 +50,72 @@ QVariant withStringList(const QVariant &value)
     return isStringList ? value.toStringList() : value;
 }
 
+// Empty if the file cannot be read.
+std::optional<QVariantMap> readConfig(const QString &path)
+{
+    if (findIniFault(path) != IniFault::None) {
+        return unreadable();
+    }
+    QSettings settings(path, QSettings::IniFormat);
+    if (settings.status() != QSettings::NoError) {
+        return unreadable();
+    }
+
+    QVariantMap config;
+    const QStringList keys = settings.childKeys(); // sorted
+    for (const QString &key : keys) {
+        config.insert(config.cend(), key, withStringList(settings.value(key)));
+    }
+    // An empty array becomes an entry, too. All other groups are ignored.
+    if (settings.childGroups().contains(argumentsKey)) {
+        QVariantList arguments;
+        const int size = std::min(settings.beginReadArray(argumentsKey), enoughArguments);
+        for (int i = 0; i < size; ++i) {
+            settings.setArrayIndex(i);
+            arguments.append(withStringList(settings.value(argumentKey)));
+        }
+        settings.endArray();
+        config.insert(argumentsKey, arguments);
+    }
+    return config;
+}
+
+// The signature of a value as QSettings returns it, or null if D-Bus cannot carry the value.
+const char *signatureOf(const QVariant &value)
+{
+    if (value.userType() == QMetaType::QVariantList) {
+        const QVariantList list = value.toList();
+        if (!std::all_of(list.cbegin(), list.cend(), signatureOf)) {
+            return nullptr;
+        }
+    }
+    return QDBusMetaType::typeToSignature(value.userType());
+}
+
 } // namespace
 
 QuickAction::QuickAction(const QString &path, bool enabled)
-    : m_path(path), m_config(readActionConfig(path)), m_enabled(enabled)
+    : m_path(path), m_stamp(stampOf(path)), m_enabled(enabled)
 {
+    const std::optional<QVariantMap> config = readConfig(path);
+    m_isRead = config.has_value();
+    m_config = config.value_or(QVariantMap());
     // Read as text: as a variant, a number that is too large for an integer would wrap around.
     bool isInteger = false;
-    const int priority = text("priority").toInt(&isInteger);
+    const int priority = text("priority"_L1).toInt(&isInteger);
     if (isInteger) {
         m_priority = priority;
     }
+}
+
+QuickAction QuickAction::reread(bool enabled) const
+{
+    if (!m_isRead || !m_stamp || m_stamp != stampOf(m_path)) {
+        return QuickAction(m_path, enabled);
+    }
+    QuickAction action(*this);
+    action.m_enabled = enabled;
+    return action;
 }
 
 QVariantList QuickAction::arguments() const
@@ -78,16 +142,14 @@ QDBusError QuickAction::whyUnsendable() const
     if (interface() == reservedInterface) {
         return {QDBusError::InvalidInterface, QStringLiteral("The interface is reserved")};
     }
-    int signature = 0;
+    std::size_t signature = 0;
     const QVariantList arguments = this->arguments();
     for (const QVariant &argument : arguments) {
-        if (argument.userType() == QMetaType::QString) {
-            signature += 1; // s
-        } else if (argument.userType() == QMetaType::QStringList) {
-            signature += 2; // as
-        } else {
-            return {QDBusError::InvalidArgs, QStringLiteral("An argument is not text")};
+        const char *type = signatureOf(argument);
+        if (type == nullptr) {
+            return {QDBusError::InvalidArgs, QStringLiteral("An argument has no D-Bus type")};
         }
+        signature += std::strlen(type);
     }
     if (signature > maximumSignature) {
         return {QDBusError::InvalidArgs, QStringLiteral("The call has too many arguments")};
@@ -127,40 +189,16 @@ bool QuickAction::operator==(const QuickAction &other) const
 
 QVariantMap QuickAction::readActionConfig(const QString &path) const
 {
-    if (findIniFault(path) != IniFault::None) {
-        qWarning("Unable to open action file");
-        return {};
-    }
-    QSettings settings(path, QSettings::IniFormat);
-    if (settings.status() != QSettings::NoError) {
-        qWarning("Unable to open action file");
-        return {};
-    }
-
-    QVariantMap config;
-    bool hasArguments = false;
-    const QStringList keys = settings.allKeys(); // sorted
-    for (const QString &key : keys) {
-        const int groupLength = key.indexOf(QLatin1Char('/'));
-        if (groupLength < 0) {
-            config.insert(config.cend(), key, withStringList(settings.value(key)));
-        } else if (key.leftRef(groupLength) == argumentsKey) {
-            hasArguments = true;
-        }
-    }
-    // An empty array becomes an entry, too. All other groups are ignored.
-    if (hasArguments) {
-        QVariantList arguments;
-        const int size = qMin(settings.value(argumentsSizeKey).toInt(), enoughArguments);
-        for (int i = 1; i <= size; ++i) {
-            arguments.append(withStringList(settings.value(QString(argumentKey).arg(i))));
-        }
-        config.insert(argumentsKey, arguments);
-    }
-    return config;
+    return readConfig(path).value_or(QVariantMap());
 }
 
-QString QuickAction::text(const char *key) const
+std::optional<QuickAction::Stamp> QuickAction::stampOf(const QString &path)
 {
-    return m_config.value(QLatin1String(key)).toString();
+    struct stat file = {};
+    if (stat(QFile::encodeName(path).constData(), &file) != 0) {
+        return {};
+    }
+    return Stamp{qint64(file.st_dev), qint64(file.st_ino),  file.st_size,
+                 file.st_ctim.tv_sec, file.st_ctim.tv_nsec, file.st_mtim.tv_sec,
+                 file.st_mtim.tv_nsec};
 }

@@ -8,7 +8,6 @@
 
 // An events widget as a definition file describes it, and its state. The path is its identity.
 struct EventsWidget {
-    QString file; // The definition file, absolute.
     QString title; // Shown where translationId has no translation.
     QString translationId; // Of the title.
     QString descriptionId;
@@ -28,7 +27,7 @@ struct EventsWidget {
     // Whether a file exists at availablePath now; always true if the path is empty.
     bool isAvailable() const;
 
-    // Ignores file and translationCatalog on purpose: they do not change the row.
+    // Ignores translationCatalog on purpose: it does not change the row.
     bool operator!=(const EventsWidget &other) const;
 };
 

@@ -14,17 +14,17 @@
 
 namespace {
 
-const QLatin1String translationCatalogKey("translation_catalog");
-const QLatin1String widgetsKey("widgets");
+constexpr auto translationCatalogKey = "translation_catalog"_L1;
+constexpr auto widgetsKey = "widgets"_L1;
 
-const QLatin1String pathKey("path");
-const QLatin1String titleKey("title");
-const QLatin1String translationIdKey("translation_id");
-const QLatin1String descriptionIdKey("description_id");
-const QLatin1String iconKey("icon");
-const QLatin1String orderKey("order");
-const QLatin1String defaultEnabledKey("default_enabled");
-const QLatin1String availablePathKey("available_path");
+constexpr auto pathKey = "path"_L1;
+constexpr auto titleKey = "title"_L1;
+constexpr auto translationIdKey = "translation_id"_L1;
+constexpr auto descriptionIdKey = "description_id"_L1;
+constexpr auto iconKey = "icon"_L1;
+constexpr auto orderKey = "order"_L1;
+constexpr auto defaultEnabledKey = "default_enabled"_L1;
+constexpr auto availablePathKey = "available_path"_L1;
 
 constexpr int noOrder = -1;
 
@@ -49,7 +49,7 @@ EventsWidget readWidget(const QJsonObject &object)
 
 bool isTooComplex(const QByteArray &json)
 {
-    // A loop over the characters would take a twentieth of the time that reading a file takes.
+    // memchr(), because a character loop would add 5 % to reading a file.
     const auto next = [&json](const char *from, char bracket) {
         return static_cast<const char *>(
             std::memchr(from, bracket, std::size_t(json.cend() - from)));
@@ -81,6 +81,7 @@ std::optional<EventsWidgetsFile> readEventsWidgetsFile(const QString &path)
     }
 
     EventsWidgetsFile file;
+    file.path = path;
     file.translationCatalog = document[translationCatalogKey].toString();
     int rejected = 0;
     const QJsonArray entries = document[widgetsKey].toArray();
@@ -90,10 +91,11 @@ std::optional<EventsWidgetsFile> readEventsWidgetsFile(const QString &path)
         if (widget.path.isEmpty()) {
             if (++rejected <= maximumWarnings) {
                 qWarning() << "Invalid widget defined in" << path;
+            } else if (rejected == maximumWarnings + 1) {
+                qWarning() << "No further invalid widgets are reported in" << path;
             }
             continue;
         }
-        widget.file = path;
         widget.translationCatalog = file.translationCatalog;
         widget.available = widget.isAvailable();
         file.widgets.push_back(std::move(widget));

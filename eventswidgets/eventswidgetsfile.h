@@ -5,6 +5,7 @@
 #define EVENTSWIDGETSFILE_H
 
 #include "eventswidget.h"
+#include "files/literals.h"
 
 #include <optional>
 #include <vector>
@@ -19,6 +20,11 @@ bool isTooComplex(const QByteArray &json);
 
 // The content of a definition file of events widgets.
 struct EventsWidgetsFile {
+    // Packages install definition files here, under names that match the filter.
+    static constexpr QLatin1String directory = "/usr/share/glimmera/eventswidgets"_L1;
+    static constexpr QLatin1String nameFilter = "*.json"_L1;
+
+    QString path;
     QString translationCatalog; // May be empty.
     // In the order of the file. Only a model knows which ones are enabled.
     std::vector<EventsWidget> widgets;

@@ -5,7 +5,6 @@
 
 #include "eventswidget.h"
 #include "eventswidgetsfile.h"
-#include "models/rownumbers.h"
 
 #include <QDirIterator>
 #include <QFileInfo>
@@ -15,10 +14,54 @@
 
 namespace {
 
-const QLatin1String definitionDirectory("/usr/share/glimmera/eventswidgets");
-const QLatin1String definitionFilter("*.json");
+constexpr auto enabledKey = "/desktop/glimmera-marlo-home/events_screen_widgets"_L1;
 
-const QLatin1String enabledKey("/desktop/glimmera-marlo-home/events_screen_widgets");
+std::vector<EventsWidgetsFile> readFiles()
+{
+    std::vector<EventsWidgetsFile> files;
+    QDirIterator entries(EventsWidgetsFile::directory, {EventsWidgetsFile::nameFilter},
+                         QDir::Files);
+    while (entries.hasNext()) {
+        const QString path = entries.next();
+        // The filter of the iterator accepts links to pipes and devices.
+        if (entries.fileInfo().isFile()) {
+            if (std::optional<EventsWidgetsFile> file = readEventsWidgetsFile(path)) {
+                files.push_back(std::move(*file));
+            }
+        }
+    }
+    return files;
+}
+
+QStringList pathsOf(const std::vector<EventsWidgetsFile> &files)
+{
+    QStringList paths;
+    for (const EventsWidgetsFile &file : files) {
+        for (const EventsWidget &widget : file.widgets) {
+            paths.append(widget.path);
+        }
+    }
+    return paths;
+}
+
+// Which widgets are enabled by the user's list, or by default without a list. An empty list counts.
+class Choice
+{
+public:
+    explicit Choice(const QVariant &stored) : m_isStored(stored.isValid())
+    {
+        const QStringList list = stored.toStringList();
+        m_paths = {list.cbegin(), list.cend()};
+    }
+    bool enables(const EventsWidget &widget) const
+    {
+        return m_isStored ? m_paths.contains(widget.path) : widget.defaultEnabled;
+    }
+
+private:
+    bool m_isStored;
+    QSet<QString> m_paths;
+};
 
 } // namespace
 
@@ -65,9 +108,9 @@ const QLatin1String enabledKey("/desktop/glimmera-marlo-home/events_screen_widge
     }
     \endqml
 
-    \note Handlers may call any method of the model. While rows are being changed, requests wait
-    until control returns to the event loop. The model then runs each kind of update at most once
-    and applies the choices (enableWidget(), disableWidget()) in the order of the calls.
+    \note Handlers may call any method of the model. enableWidget() and disableWidget() store the
+    list at once. While rows are being changed, updates wait until control returns to the event
+    loop. The model then runs each kind of update at most once.
 
     \image gallery-events-widgets.png The gallery's page for this type
 
@@ -99,7 +142,8 @@ const QLatin1String enabledKey("/desktop/glimmera-marlo-home/events_screen_widge
 
 EventsWidgetsModel::EventsWidgetsModel(QObject *parent)
     : QAbstractListModel(parent), m_catalogs(this),
-      m_watcher(definitionDirectory, definitionFilter), m_enabledItem(enabledKey)
+      m_watcher(EventsWidgetsFile::directory, EventsWidgetsFile::nameFilter),
+      m_enabledItem(enabledKey)
 {
     connect(&m_watcher, &DirectoryWatcher::changed, this, &EventsWidgetsModel::directoryChanged);
     connect(&m_enabledItem, &MGConfItem::valueChanged, this,
@@ -108,8 +152,9 @@ EventsWidgetsModel::EventsWidgetsModel(QObject *parent)
 
 EventsWidgetsModel::~EventsWidgetsModel()
 {
-    // Removing the catalogs sends language change events, whose handlers may call data(). The model
-    // still exists here.
+    // Removing the catalogs sends language change events, whose handlers may call the model. It
+    // still exists here, and reads nothing any more.
+    m_complete = false;
     m_catalogs.clear();
 }
 
@@ -166,22 +211,21 @@ void EventsWidgetsModel::componentComplete()
     \qmlmethod void EventsWidgetsModel::disableWidget(string path)
 
     enableWidget() adds the widget \a path at the end of the user's list, even if the list already
-    contains it. disableWidget() removes every entry of it. The rows change once dconf reports the
-    change.
+    contains it. disableWidget() removes every entry of it. Both methods start from the stored list,
+    which another process may just have changed, and store the new list at once. The rows change
+    once dconf reports the change.
 */
 void EventsWidgetsModel::enableWidget(const QString &path)
 {
     // A path may be listed twice, on purpose: disableWidget() removes every occurrence.
-    m_requests.choose([this, path] { m_enabledItem.set(enabledList() + QStringList(path)); });
+    m_enabledItem.set(enabledList() + QStringList(path));
 }
 
 void EventsWidgetsModel::disableWidget(const QString &path)
 {
-    m_requests.choose([this, path] {
-        QStringList list = enabledList();
-        list.removeAll(path);
-        m_enabledItem.set(list);
-    });
+    QStringList list = enabledList();
+    list.removeAll(path);
+    m_enabledItem.set(list);
 }
 
 /*!
@@ -196,19 +240,16 @@ void EventsWidgetsModel::directoryChanged()
     if (!m_complete || m_requests.defer(&EventsWidgetsModel::directoryChanged)) {
         return;
     }
-    const Change change(&m_requests);
-
-    QSet<QString> stale;
-    stale.reserve(m_rows.size());
-    for (const Widget &widget : qAsConst(m_rows)) {
-        stale.insert(widget.path);
+    const ChangeScope change(&m_requests);
+    const std::vector<EventsWidgetsFile> files = readFiles();
+    // First, because a handler of the rest may make the user's first choice.
+    m_knownPaths = pathsOf(files);
+    for (const EventsWidgetsFile &file : files) {
+        // Never removed, on purpose: texts that are still on the screen keep their translation.
+        m_catalogs.addDefinition(file.path, file.translationCatalog);
     }
-    const std::vector<Widget> widgets = readWidgets();
-    for (const Widget &widget : widgets) {
-        stale.remove(widget.path);
-    }
-    mergeWidgets(widgets);
-    removeStaleRows(stale);
+    mergeWidgets(files);
+    removeRowsExcept({m_knownPaths.cbegin(), m_knownPaths.cend()});
 }
 
 void EventsWidgetsModel::enabledWidgetsChanged()
@@ -216,19 +257,14 @@ void EventsWidgetsModel::enabledWidgetsChanged()
     if (!m_complete || m_requests.defer(&EventsWidgetsModel::enabledWidgetsChanged)) {
         return;
     }
-    const Change change(&m_requests);
+    const ChangeScope change(&m_requests);
 
-    const QVariant stored = m_enabledItem.value();
-    m_defaults = !stored.isValid();
-    m_enabledList = stored.toStringList();
-    const QSet<QString> enabledPaths(m_enabledList.cbegin(), m_enabledList.cend());
+    const Choice choice(m_enabledItem.value());
+    m_knownPaths.clear();
     for (int row = 0; row < m_rows.size(); ++row) {
         Widget &widget = m_rows[row];
-        if (m_defaults) {
-            m_enabledList.append(widget.path);
-        }
-        const bool enabled =
-            m_defaults ? widget.defaultEnabled : enabledPaths.contains(widget.path);
+        m_knownPaths.append(widget.path);
+        const bool enabled = choice.enables(widget);
         if (widget.enabled != enabled) {
             widget.enabled = enabled;
             Q_EMIT dataChanged(index(row), index(row));
@@ -247,7 +283,7 @@ void EventsWidgetsModel::updateAvailable()
     if (m_requests.defer(&EventsWidgetsModel::updateAvailable)) {
         return;
     }
-    const Change change(&m_requests);
+    const ChangeScope change(&m_requests);
 
     for (int row = 0; row < m_rows.size(); ++row) {
         Widget &widget = m_rows[row];
@@ -261,104 +297,69 @@ void EventsWidgetsModel::updateAvailable()
 
 QStringList EventsWidgetsModel::enabledList() const
 {
-    // A choice before componentComplete() must not discard the user's other choices.
-    return m_complete ? m_enabledList : m_enabledItem.value().toStringList();
+    const QVariant stored = m_enabledItem.value();
+    return stored.isValid() ? stored.toStringList() : m_knownPaths;
 }
 
-std::vector<EventsWidget> EventsWidgetsModel::readWidgets()
+void EventsWidgetsModel::mergeWidgets(const std::vector<EventsWidgetsFile> &files)
 {
-    std::vector<Widget> widgets;
-    QDirIterator entries(definitionDirectory, {definitionFilter}, QDir::Files);
-    while (entries.hasNext()) {
-        const QString path = entries.next();
-        // The filter of the iterator accepts links to pipes and devices.
-        if (!entries.fileInfo().isFile()) {
-            continue;
-        }
-        std::optional<EventsWidgetsFile> file = readEventsWidgetsFile(path);
-        if (file) {
-            m_catalogs.addDefinition(entries.fileName(), file->translationCatalog);
-            widgets.insert(widgets.end(), std::make_move_iterator(file->widgets.begin()),
-                           std::make_move_iterator(file->widgets.end()));
-        }
-    }
-
-    if (m_defaults) {
-        m_enabledList.clear();
-        for (Widget &widget : widgets) {
-            m_enabledList.append(widget.path);
-            widget.enabled = widget.defaultEnabled;
-        }
-    } else {
-        const QSet<QString> enabledPaths(m_enabledList.cbegin(), m_enabledList.cend());
-        for (Widget &widget : widgets) {
-            widget.enabled = enabledPaths.contains(widget.path);
-        }
-    }
-    return widgets;
-}
-
-void EventsWidgetsModel::mergeWidgets(const std::vector<Widget> &widgets)
-{
-    // Where to start searching for the row of a path: insertions only push rows down.
+    const Choice choice(m_enabledItem.value());
+    // Where the search for the row of a path starts: insertions only push rows down.
     QHash<QString, int> firstRows;
-    firstRows.reserve(m_rows.size() + int(widgets.size()));
     for (int row = 0; row < m_rows.size(); ++row) {
         firstRows.insert(m_rows.at(row).path, row);
     }
-    RowNumbers<int> orders; // Filled when they are needed: most scans insert nothing.
-    for (const Widget &widget : widgets) {
-        int row = firstRows.value(widget.path, -1);
-        if (row < 0) {
-            while (orders.count() < m_rows.size()) {
-                orders.append(m_rows.at(orders.count()).order);
+    for (const EventsWidgetsFile &file : files) {
+        for (Widget widget : file.widgets) {
+            widget.enabled = choice.enables(widget);
+            const auto first = firstRows.constFind(widget.path);
+            if (first == firstRows.cend()) {
+                firstRows.insert(widget.path, insertWidget(widget));
+            } else {
+                updateWidget(findWidget(widget.path, *first), widget);
             }
-            row = orders.insert(widget.order);
-            firstRows.insert(widget.path, row);
-            insertWidget(row, widget);
-            continue;
-        }
-        while (m_rows.at(row).path != widget.path) {
-            ++row;
-        }
-        if (m_rows.at(row).order != widget.order) {
-            orders.clear();
-        }
-        if (m_rows.at(row) != widget) {
-            updateWidget(row, widget);
         }
     }
 }
 
-void EventsWidgetsModel::insertWidget(int row, const Widget &widget)
+int EventsWidgetsModel::findWidget(const QString &path, int firstRow) const
 {
+    const auto found = std::find_if(m_rows.cbegin() + firstRow, m_rows.cend(),
+                                    [&path](const Widget &row) { return row.path == path; });
+    return int(found - m_rows.cbegin());
+}
+
+// Returns the row: before the first one of a higher order, or the last.
+int EventsWidgetsModel::insertWidget(const Widget &widget)
+{
+    const auto place = std::find_if(m_rows.cbegin(), m_rows.cend(), [&widget](const Widget &row) {
+        return widget.order >= 0 && row.order > widget.order;
+    });
+    const int row = int(place - m_rows.cbegin());
     beginInsertRows({}, row, row);
     m_rows.insert(row, widget);
     endInsertRows();
+    return row;
 }
 
 void EventsWidgetsModel::updateWidget(int row, const Widget &widget)
 {
     // The row keeps its place, on purpose, even if its order changes.
-    m_rows[row] = widget;
-    Q_EMIT dataChanged(index(row), index(row));
+    if (m_rows.at(row) != widget) {
+        m_rows[row] = widget;
+        Q_EMIT dataChanged(index(row), index(row));
+    }
 }
 
-void EventsWidgetsModel::removeStaleRows(const QSet<QString> &paths)
+void EventsWidgetsModel::removeRowsExcept(const QSet<QString> &paths)
 {
-    if (paths.isEmpty()) {
-        return;
-    }
     int row = 0;
     while (row < m_rows.size()) {
-        if (!paths.contains(m_rows.at(row).path)) {
+        if (paths.contains(m_rows.at(row).path)) {
             ++row;
             continue;
         }
         beginRemoveRows({}, row, row);
-        // Deliberately without effect, because the users of the catalogs are file names and this is
-        // a path: texts that are still on the screen keep their translation.
-        m_catalogs.removeDefinition(m_rows.at(row).file, m_rows.at(row).translationCatalog);
         m_rows.removeAt(row);
         endRemoveRows();
     }

@@ -18,6 +18,7 @@
 #include <vector>
 
 struct EventsWidget;
+struct EventsWidgetsFile;
 
 // The widgets that packages offer for the events screen, and which of them the user has enabled.
 class EventsWidgetsModel : public QAbstractListModel, public QQmlParserStatus
@@ -41,7 +42,7 @@ public:
     ~EventsWidgetsModel() override;
 
     int rowCount(const QModelIndex &parent = QModelIndex()) const override;
-    QVariant data(const QModelIndex &index, int role) const override;
+    QVariant data(const QModelIndex &index, int role = Qt::DisplayRole) const override;
     QHash<int, QByteArray> roleNames() const override;
 
     void classBegin() override { }
@@ -55,25 +56,22 @@ public Q_SLOTS:
     void updateAvailable();
 
 private:
-    using Change = RequestQueue<EventsWidgetsModel>::Change;
+    using ChangeScope = RequestQueue<EventsWidgetsModel>::ChangeScope;
 
     QStringList enabledList() const;
-    std::vector<Widget> readWidgets();
-    void mergeWidgets(const std::vector<Widget> &widgets);
-    void insertWidget(int row, const Widget &widget);
+    void mergeWidgets(const std::vector<EventsWidgetsFile> &files);
+    int findWidget(const QString &path, int firstRow) const;
+    int insertWidget(const Widget &widget);
     void updateWidget(int row, const Widget &widget);
-    void removeStaleRows(const QSet<QString> &paths);
+    void removeRowsExcept(const QSet<QString> &paths);
 
     CatalogTable m_catalogs;
     QList<Widget> m_rows;
     RequestQueue<EventsWidgetsModel> m_requests{this};
     DirectoryWatcher m_watcher;
     MGConfItem m_enabledItem;
-    // The value of the key. Without a value, the paths of all widgets, on purpose: the user's first
-    // choice stores them.
-    QStringList m_enabledList;
-    // True while the key has no value; an empty list is a choice.
-    bool m_defaults = false;
+    // The paths of all widgets. The user's first choice stores them, on purpose.
+    QStringList m_knownPaths;
     bool m_complete = false;
 };
 

@@ -184,9 +184,6 @@ void TitlesView::setMatch(const QVariant &match)
     if (m_match == plain) {
         return;
     }
-    forEachObject(&m_match, [this](QObject *object, QVariant *) {
-        disconnect(object, &QObject::destroyed, this, &TitlesView::matchDestroyed);
-    });
     forEachObject(&plain, [this](QObject *object, QVariant *) {
         connect(object, &QObject::destroyed, this, &TitlesView::matchDestroyed,
                 Qt::UniqueConnection);
@@ -305,11 +302,15 @@ void TitlesView::modelDestroyed()
 
 void TitlesView::matchDestroyed(QObject *object)
 {
-    forEachObject(&m_match, [object](QObject *held, QVariant *value) {
+    bool isHeld = false; // It may belong to an earlier value.
+    forEachObject(&m_match, [object, &isHeld](QObject *held, QVariant *value) {
         if (held == object) {
             *value = QVariant::fromValue<QObject *>(nullptr);
+            isHeld = true;
         }
     });
-    Q_EMIT matchChanged();
-    update();
+    if (isHeld) {
+        Q_EMIT matchChanged();
+        update();
+    }
 }

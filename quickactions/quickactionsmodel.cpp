@@ -3,7 +3,6 @@
 
 #include "quickactionsmodel.h"
 
-#include "models/rownumbers.h"
 #include "quickaction.h"
 
 #include <QDBusConnection>
@@ -12,33 +11,32 @@
 #include <QDir>
 #include <QQmlInfo>
 #include <QScopedValueRollback>
-#include <QSet>
 
-#include <limits>
-#include <vector>
+#include <algorithm>
+#include <chrono>
+#include <utility>
+
+using namespace std::chrono_literals;
 
 namespace {
 
-const QLatin1String definitionDirectory("/usr/share/glimmera/quickactions");
-const QLatin1String definitionFilter("*.conf");
-constexpr int reloadDelay = 1000; // ms
+constexpr std::chrono::milliseconds reloadDelay = 1s;
 
-const QLatin1String enabledKey("/desktop/glimmera-marlo-home/events_screen_actions");
-const QLatin1String blockedKey("/desktop/glimmera-marlo-home/blocked_actions");
-const QLatin1String userKey("/desktop/glimmera-marlo-home/events_screen_actions_user");
+constexpr auto enabledKey = "/desktop/glimmera-marlo-home/events_screen_actions"_L1;
+constexpr auto blockedKey = "/desktop/glimmera-marlo-home/blocked_actions"_L1;
+constexpr auto userKey = "/desktop/glimmera-marlo-home/events_screen_actions_user"_L1;
 
-const QLatin1String noReplyError("org.freedesktop.DBus.Error.NoReply");
-const QLatin1String serviceUnknownError("org.freedesktop.DBus.Error.ServiceUnknown");
+constexpr auto noReplyError = "org.freedesktop.DBus.Error.NoReply"_L1;
+constexpr auto serviceUnknownError = "org.freedesktop.DBus.Error.ServiceUnknown"_L1;
 
-const QLatin1String storeService("com.marlo.marlostore");
-const QLatin1String storePath("/StoreClient");
-const QLatin1String storeInterface("com.marlo.marlostore");
-const QLatin1String storeMethod("showApp");
+constexpr auto storeService = "com.marlo.marlostore"_L1;
+constexpr auto storePath = "/StoreClient"_L1;
+constexpr auto storeInterface = "com.marlo.marlostore"_L1;
+constexpr auto storeMethod = "showApp"_L1;
 
-// A new row without a priority goes to the end, and one with a priority before rows without one.
-qint64 priorityOfRow(const QuickAction &action)
+QSet<QString> setOf(const QStringList &texts)
 {
-    return action.priority() ? *action.priority() : std::numeric_limits<qint64>::max();
+    return {texts.cbegin(), texts.cend()};
 }
 
 } // namespace
@@ -85,9 +83,9 @@ qint64 priorityOfRow(const QuickAction &action)
     }
     \endqml
 
-    \note Handlers may call any method of the model. While rows are being changed, requests wait
-    until control returns to the event loop. The model then reloads at most once and applies the
-    choices (enableAction(), disableAction(), move()) in the order of the calls.
+    \note Handlers may call any method of the model. enableAction() and disableAction() store the
+    list at once. While rows are being changed, everything else waits until control returns to the
+    event loop. The model then reloads at most once, and the moves follow in the order of the calls.
 
     \image gallery-quick-actions.png The gallery's page for this type
 
@@ -130,11 +128,18 @@ qint64 priorityOfRow(const QuickAction &action)
 
     \section2 Reloads are repeated
     The first change of the directory causes one reload, the second causes two, the third causes
-    three, and so on. The extra reloads have no visible effect.
+    three, and so on. The extra reloads only repeat the warnings about files that cannot be read:
+    a file that has not changed is not read again.
+
+    \section2 A file of the same size and time keeps its old values
+    QSettings keeps what it has read from a file until the size or the modification time of the file
+    changes. A definition that is replaced by one of the same size and time keeps its old values
+    until the process ends.
 
     \section2 Arguments are strings
     Arguments of a call are sent as strings, even \c 1 and \c true, because an INI file has no
-    types. A value with an unquoted comma is sent as an array of strings.
+    types. A value with an unquoted comma is sent as an array of strings. Only a value that QSettings
+    itself reads as another type is sent as that type: \c{@ByteArray(abc)} as an array of bytes.
 
     \section2 A timeout is not a failure
     A service that does not answer in time causes no message: it may be busy opening its window. The
@@ -152,7 +157,7 @@ qint64 priorityOfRow(const QuickAction &action)
 
 QuickActionsModel::QuickActionsModel(QObject *parent)
     : QAbstractListModel(parent), m_catalogs(this),
-      m_watcher(definitionDirectory, definitionFilter), m_reloadTimer(this),
+      m_watcher(Action::directory, Action::nameFilter), m_reloadTimer(this),
       m_enabledItem(enabledKey), m_blockedItem(blockedKey)
 {
     m_reloadTimer.setSingleShot(true);
@@ -161,7 +166,7 @@ QuickActionsModel::QuickActionsModel(QObject *parent)
 
     connect(&m_enabledItem, &MGConfItem::valueChanged, this,
             &QuickActionsModel::updateEnabledActions);
-    m_enabledList = m_enabledItem.value().toStringList();
+    m_enabledList = storedList();
     connect(&m_blockedItem, &MGConfItem::valueChanged, this, [this] {
         m_blockedList = m_blockedItem.value().toStringList();
         loadActions();
@@ -302,22 +307,21 @@ void QuickActionsModel::componentComplete()
     \qmlmethod void QuickActionsModel::disableAction(string path)
 
     enableAction() adds the definition file \a path at the end of the user's list. disableAction()
-    removes all of its entries. Both methods set
+    removes all of its entries. Both methods start from the stored list, which another process may
+    just have changed, and store the new list at once. They also set
     \c /desktop/glimmera-marlo-home/events_screen_actions_user (dconf, bool) to \c true, which
     records that the user has changed the list.
 */
 void QuickActionsModel::enableAction(const QString &path)
 {
-    m_requests.choose([this, path] { writeEnabledList(m_enabledList + QStringList(path)); });
+    storeList(storedList() + QStringList(path));
 }
 
 void QuickActionsModel::disableAction(const QString &path)
 {
-    m_requests.choose([this, path] {
-        QStringList list = m_enabledList;
-        list.removeAll(path);
-        writeEnabledList(list);
-    });
+    QStringList list = storedList();
+    list.removeAll(path);
+    storeList(list);
 }
 
 /*!
@@ -333,7 +337,8 @@ void QuickActionsModel::disableAction(const QString &path)
 */
 void QuickActionsModel::move(int index, int newIndex)
 {
-    m_requests.choose([this, index, newIndex] { moveAction(index, newIndex); });
+    m_moves.append({index, newIndex});
+    applyMoves();
 }
 
 /*!
@@ -348,47 +353,12 @@ void QuickActionsModel::loadActions()
     if (!m_complete || m_requests.defer(&QuickActionsModel::loadActions)) {
         return;
     }
+    const ChangeScope change(&m_requests);
     const int countBefore = count();
-    {
-        const Change change(&m_requests);
-        const QSet<QString> enabled(m_enabledList.cbegin(), m_enabledList.cend());
-        const QStringList selected = selectedPaths(enabled);
-        const QSet<QString> listed(selected.cbegin(), selected.cend());
-
-        removeRowsExcept(listed);
-        QSet<QString> missing = listed;
-        for (int row = 0; row < m_rows.size(); ++row) {
-            const QString path = m_rows.at(row).path();
-            missing.remove(path);
-            const Action action(path, enabled.contains(path));
-            if (m_rows.at(row) != action) {
-                updateAction(row, action);
-            }
-        }
-
-        // Enabled actions keep the order of the list: each goes behind the entries before it that
-        // have a row. A repeated entry counts once.
-        QSet<QString> placed;
-        for (const QString &path : qAsConst(m_enabledList)) {
-            if (listed.contains(path) && !placed.contains(path)) {
-                if (missing.remove(path)) {
-                    insertAction(placed.size(), Action(path, true));
-                }
-                placed.insert(path);
-            }
-        }
-
-        RowNumbers<qint64> priorities;
-        for (const Action &action : qAsConst(m_rows)) {
-            priorities.append(priorityOfRow(action));
-        }
-        for (const QString &path : selected) {
-            if (missing.contains(path)) {
-                const Action action(path, false);
-                insertAction(priorities.insert(priorityOfRow(action)), action);
-            }
-        }
-    }
+    const Selection selected = select();
+    removeRowsExcept(setOf(selected.enabled + selected.others));
+    updateRows(setOf(selected.enabled));
+    insertMissing(selected);
     if (count() != countBefore) {
         Q_EMIT countChanged();
     }
@@ -399,7 +369,7 @@ void QuickActionsModel::updateEnabledActions()
     if (m_moving || m_requests.defer(&QuickActionsModel::updateEnabledActions)) {
         return;
     }
-    m_enabledList = m_enabledItem.value().toStringList();
+    m_enabledList = storedList();
     loadActions();
 }
 
@@ -463,19 +433,89 @@ void QuickActionsModel::applyShowPotential()
     }
 }
 
-// Sorted by name.
-QStringList QuickActionsModel::selectedPaths(const QSet<QString> &enabled) const
+void QuickActionsModel::applyMoves()
 {
-    const QSet<QString> blocked(m_blockedList.cbegin(), m_blockedList.cend());
-    QStringList paths;
-    const QStringList names = QDir(definitionDirectory).entryList({definitionFilter});
-    for (const QString &name : names) {
-        const QString path = definitionDirectory + QLatin1Char('/') + name;
-        if ((m_showPotential || enabled.contains(path)) && !blocked.contains(path)) {
-            paths.append(path);
+    if (!m_requests.defer(&QuickActionsModel::applyMoves)) {
+        for (const auto &[index, newIndex] : std::exchange(m_moves, {})) {
+            applyMove(index, newIndex);
         }
     }
-    return paths;
+}
+
+// The model must list the actions of the stored list, also if a handler or another process has just
+// stored another one.
+void QuickActionsModel::applyMove(int index, int newIndex)
+{
+    if (storedList() != m_enabledList) {
+        updateEnabledActions();
+    }
+    const int size = m_enabledList.size();
+    if (index >= 0 && newIndex >= 0 && index < size && newIndex < size) {
+        storeMove(index, newIndex);
+        if (storedList() != m_enabledList) {
+            updateEnabledActions();
+        }
+    }
+}
+
+void QuickActionsModel::storeMove(int index, int newIndex)
+{
+    const ChangeScope change(&m_requests);
+    // An entry of the list may have no row.
+    const bool movesRow = index != newIndex && hasRow(index) && hasRow(newIndex);
+    if (movesRow) {
+        beginMoveAction(index, newIndex);
+    }
+    const QStringList before = m_enabledList;
+    m_enabledList.move(index, newIndex);
+    // A handler of the announcement may have stored another list, which must not be overwritten.
+    const bool isCurrent = storedList() == before;
+    if (isCurrent) {
+        const QScopedValueRollback<bool> moving(m_moving, true);
+        storeList(m_enabledList);
+    }
+    if (movesRow) {
+        endMoveRows();
+    }
+    const QStringList stored = storedList();
+    const bool isStored = isCurrent && stored != before;
+    // The list was not stored, or the key is locked.
+    if (movesRow && !isStored && stored != m_enabledList) {
+        beginMoveAction(newIndex, index);
+        endMoveRows();
+    }
+}
+
+// The caller calls endMoveRows().
+void QuickActionsModel::beginMoveAction(int index, int newIndex)
+{
+    beginMoveRows({}, index, index, {}, newIndex > index ? newIndex + 1 : newIndex);
+    m_rows.move(index, newIndex);
+}
+
+QuickActionsModel::Selection QuickActionsModel::select() const
+{
+    const QSet<QString> blocked = setOf(m_blockedList);
+    Selection selected;
+    const QStringList names = QDir(Action::directory).entryList({Action::nameFilter});
+    for (const QString &name : names) {
+        const QString path = Action::directory + QLatin1Char('/') + name;
+        if (!blocked.contains(path)) {
+            selected.others.append(path);
+        }
+    }
+    QSet<QString> others = setOf(selected.others);
+    for (const QString &path : m_enabledList) {
+        if (others.remove(path)) {
+            selected.enabled.append(path);
+        }
+    }
+    const auto isDropped = [this, &others](const QString &path) {
+        return !m_showPotential || !others.contains(path);
+    };
+    selected.others.erase(std::remove_if(selected.others.begin(), selected.others.end(), isDropped),
+                          selected.others.end());
+    return selected;
 }
 
 void QuickActionsModel::removeRowsExcept(const QSet<QString> &paths)
@@ -494,6 +534,56 @@ void QuickActionsModel::removeRowsExcept(const QSet<QString> &paths)
     }
 }
 
+void QuickActionsModel::updateRows(const QSet<QString> &enabled)
+{
+    for (int row = 0; row < m_rows.size(); ++row) {
+        const Action old = m_rows.at(row);
+        const Action action = old.reread(enabled.contains(old.path()));
+        m_rows[row] = action;
+        if (action == old) {
+            continue;
+        }
+        // The old catalog is not released, on purpose: its texts remain until the model is destroyed.
+        if (action.translationCatalog() != old.translationCatalog()) {
+            m_catalogs.addDefinition(action.path(), action.translationCatalog());
+        }
+        Q_EMIT dataChanged(index(row), index(row));
+    }
+}
+
+void QuickActionsModel::insertMissing(const Selection &selected)
+{
+    QSet<QString> listed;
+    for (const Action &action : qAsConst(m_rows)) {
+        listed.insert(action.path());
+    }
+    // All enabled actions before this one in the list have a row.
+    for (int i = 0; i < selected.enabled.size(); ++i) {
+        const QString path = selected.enabled.at(i);
+        if (!listed.contains(path)) {
+            insertAction(i, Action(path, true));
+        }
+    }
+    for (const QString &path : selected.others) {
+        if (!listed.contains(path)) {
+            const Action action(path, false);
+            insertAction(rowForPriority(action.priority()), action);
+        }
+    }
+}
+
+// Before the first row of a greater priority or of none.
+int QuickActionsModel::rowForPriority(std::optional<int> priority) const
+{
+    if (!priority || *priority < 0) {
+        return m_rows.size();
+    }
+    const auto place = std::find_if(m_rows.cbegin(), m_rows.cend(), [priority](const Action &row) {
+        return !row.priority() || *row.priority() > *priority;
+    });
+    return int(place - m_rows.cbegin());
+}
+
 void QuickActionsModel::insertAction(int row, const Action &action)
 {
     beginInsertRows({}, row, row);
@@ -502,59 +592,12 @@ void QuickActionsModel::insertAction(int row, const Action &action)
     endInsertRows();
 }
 
-void QuickActionsModel::updateAction(int row, const Action &action)
+QStringList QuickActionsModel::storedList() const
 {
-    const QString oldCatalog = m_rows.at(row).translationCatalog();
-    m_rows[row] = action;
-    // The old catalog is not released, on purpose: its texts remain until the model is destroyed.
-    if (action.translationCatalog() != oldCatalog) {
-        m_catalogs.addDefinition(action.path(), action.translationCatalog());
-    }
-    Q_EMIT dataChanged(index(row), index(row));
+    return m_enabledItem.value().toStringList();
 }
 
-void QuickActionsModel::moveAction(int index, int newIndex)
-{
-    if (index < 0 || newIndex < 0 || index >= m_enabledList.size()
-        || newIndex >= m_enabledList.size()) {
-        return;
-    }
-    {
-        const Change change(&m_requests);
-        // An entry of the list may have no row.
-        const bool movesRow = index != newIndex && hasRow(index) && hasRow(newIndex);
-        if (movesRow) {
-            beginMoveAction(index, newIndex);
-        }
-        m_enabledList.move(index, newIndex);
-        {
-            const QScopedValueRollback<bool> moving(m_moving, true);
-            writeEnabledList(m_enabledList);
-        }
-        if (movesRow) {
-            endMoveRows();
-        }
-        if (m_enabledItem.value().toStringList() == m_enabledList) {
-            return;
-        }
-        // The key is locked, or a handler stored another list. The stored list counts, and the rows
-        // must agree with it.
-        if (movesRow) {
-            beginMoveAction(newIndex, index);
-            endMoveRows();
-        }
-    }
-    updateEnabledActions();
-}
-
-// The caller calls endMoveRows().
-void QuickActionsModel::beginMoveAction(int index, int newIndex)
-{
-    beginMoveRows({}, index, index, {}, newIndex > index ? newIndex + 1 : newIndex);
-    m_rows.move(index, newIndex);
-}
-
-void QuickActionsModel::writeEnabledList(const QStringList &list)
+void QuickActionsModel::storeList(const QStringList &list)
 {
     m_enabledItem.set(list);
     MGConfItem(userKey).set(true);

@@ -11,9 +11,14 @@
 
 #include <QAbstractListModel>
 #include <QList>
+#include <QPair>
 #include <QQmlParserStatus>
+#include <QSet>
 #include <QStringList>
 #include <QTimer>
+#include <QVector>
+
+#include <optional>
 
 class QDBusError;
 class QDBusMessage;
@@ -43,7 +48,7 @@ public:
     int count() const { return rowCount(); }
 
     int rowCount(const QModelIndex &parent = QModelIndex()) const override;
-    QVariant data(const QModelIndex &index, int role) const override;
+    QVariant data(const QModelIndex &index, int role = Qt::DisplayRole) const override;
     QHash<int, QByteArray> roleNames() const override;
 
     Q_INVOKABLE QVariantMap get(int index) const;
@@ -69,17 +74,28 @@ private Q_SLOTS:
     void showStorePackage(const QString &packageName);
 
 private:
-    using Change = RequestQueue<QuickActionsModel>::Change;
+    using ChangeScope = RequestQueue<QuickActionsModel>::ChangeScope;
+
+    // The paths of the actions to list.
+    struct Selection {
+        QStringList enabled; // in the user's order
+        QStringList others; // by name
+    };
 
     bool hasRow(int index) const;
     void applyShowPotential();
-    QStringList selectedPaths(const QSet<QString> &enabled) const;
-    void removeRowsExcept(const QSet<QString> &paths);
-    void insertAction(int row, const Action &action);
-    void updateAction(int row, const Action &action);
-    void moveAction(int index, int newIndex);
+    void applyMoves();
+    void applyMove(int index, int newIndex);
+    void storeMove(int index, int newIndex);
     void beginMoveAction(int index, int newIndex);
-    void writeEnabledList(const QStringList &list);
+    Selection select() const;
+    void removeRowsExcept(const QSet<QString> &paths);
+    void updateRows(const QSet<QString> &enabled);
+    void insertMissing(const Selection &selected);
+    int rowForPriority(std::optional<int> priority) const;
+    void insertAction(int row, const Action &action);
+    QStringList storedList() const;
+    void storeList(const QStringList &list);
 
     CatalogTable m_catalogs;
     QList<Action> m_rows;
@@ -90,6 +106,7 @@ private:
     MGConfItem m_blockedItem;
     QStringList m_enabledList;
     QStringList m_blockedList;
+    QVector<QPair<int, int>> m_moves; // waiting
     bool m_showPotential = false;
     bool m_complete = false;
     // True while move() writes the enabled list.

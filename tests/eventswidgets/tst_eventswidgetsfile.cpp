@@ -97,10 +97,10 @@ void TestEventsWidgetsFile::readsEveryKey()
         } ]
     })");
     QVERIFY(file);
+    QCOMPARE(file->path, m_path);
     QCOMPARE(file->translationCatalog, "maps"_s);
     QCOMPARE(file->widgets.size(), size_t(1));
     const Widget &widget = file->widgets.front();
-    QCOMPARE(widget.file, m_path);
     QCOMPARE(widget.title, "Title"_s);
     QCOMPARE(widget.translationId, "t-id"_s);
     QCOMPARE(widget.descriptionId, "d-id"_s);
@@ -282,7 +282,11 @@ void TestEventsWidgetsFile::boundedWarnings()
     const auto file = read(R"({ "widgets": [ )" + entries + R"({ "path": "a" } ] })");
     QVERIFY(file);
     QCOMPARE(file->widgets.size(), size_t(1));
-    QCOMPARE(m_log->takeAll().size(), 1000);
+    const QStringList warnings = m_log->takeTexts();
+    QCOMPARE(warnings.size(), 1001);
+    const QString path = " \"%1\""_s.arg(m_path);
+    QCOMPARE(warnings.at(999), "Invalid widget defined in"_s + path);
+    QCOMPARE(warnings.at(1000), "No further invalid widgets are reported in"_s + path);
 }
 
 void TestEventsWidgetsFile::noDefinition_data()
@@ -389,7 +393,6 @@ void TestEventsWidgetsFile::comparison_data()
     };
     const QString text = "other"_s;
     row("nothing", false, [](Widget *) {});
-    row("file", false, [text](Widget *widget) { widget->file = text; });
     row("catalog", false, [text](Widget *widget) { widget->translationCatalog = text; });
     row("title", true, [text](Widget *widget) { widget->title = text; });
     row("title id", true, [text](Widget *widget) { widget->translationId = text; });

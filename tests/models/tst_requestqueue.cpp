@@ -23,7 +23,7 @@ public:
         if (requests.defer(&Model::scan)) {
             return;
         }
-        const RequestQueue<Model>::Change change(&requests);
+        const RequestQueue<Model>::ChangeScope change(&requests);
         log.append("scan"_s);
         handler();
     }
@@ -32,21 +32,14 @@ public:
         if (requests.defer(&Model::check)) {
             return;
         }
-        const RequestQueue<Model>::Change change(&requests);
+        const RequestQueue<Model>::ChangeScope change(&requests);
         log.append("check"_s);
+        onCheck();
     }
-    void choose(const QString &name)
-    {
-        requests.choose([this, name] {
-            log.append(name);
-            onChoice();
-        });
-    }
-
     RequestQueue<Model> requests{this};
     QStringList log;
     std::function<void()> handler = [] {};
-    std::function<void()> onChoice = [] {};
+    std::function<void()> onCheck = [] {};
 };
 
 } // namespace
@@ -59,23 +52,19 @@ private Q_SLOTS:
     void runsAtOnceWhileNothingChanges();
     void updatesRunOnce();
     void updatesAreAcceptedAgainAfterwards();
-    void choicesRunInOrderAfterTheUpdates();
-    void laterChoiceRunsWhatWaits();
-    void choiceWithinAChoiceWaits();
     void nestedEventLoopRunsNothing();
     void handlersWithoutEndReturnToTheEventLoop();
-    void requestsOfADestroyedModelAreDropped();
+    void updatesOfADestroyedModelAreDropped();
 };
 
 void TestRequestQueue::runsAtOnceWhileNothingChanges()
 {
     Model model;
     model.scan();
-    model.choose("a"_s);
     model.check();
-    QCOMPARE(model.log, words("scan a check"));
+    QCOMPARE(model.log, words("scan check"));
     QCoreApplication::processEvents();
-    QCOMPARE(model.log, words("scan a check"));
+    QCOMPARE(model.log, words("scan check"));
 }
 
 void TestRequestQueue::updatesRunOnce()
@@ -105,56 +94,12 @@ void TestRequestQueue::updatesAreAcceptedAgainAfterwards()
     }
 }
 
-void TestRequestQueue::choicesRunInOrderAfterTheUpdates()
-{
-    Model model;
-    model.handler = [&model] {
-        model.choose("a"_s);
-        model.choose("b"_s);
-        model.choose("a"_s);
-        model.check();
-    };
-    model.scan();
-    QCOMPARE(model.log, words("scan"));
-    QCoreApplication::processEvents();
-    QCOMPARE(model.log, words("scan check a b a"));
-}
-
-void TestRequestQueue::laterChoiceRunsWhatWaits()
-{
-    Model model;
-    model.handler = [&model] {
-        model.choose("a"_s);
-        model.check();
-    };
-    model.scan();
-    model.choose("b"_s);
-    QCOMPARE(model.log, words("scan check a b"));
-    QCoreApplication::processEvents();
-    QCOMPARE(model.log, words("scan check a b"));
-}
-
-void TestRequestQueue::choiceWithinAChoiceWaits()
-{
-    Model model;
-    model.onChoice = [&model] {
-        model.choose("b"_s);
-        model.log.append("end-of-a"_s);
-    };
-    model.choose("a"_s);
-    model.onChoice = [] {};
-    QCOMPARE(model.log, words("a end-of-a"));
-    QCoreApplication::processEvents();
-    QCOMPARE(model.log, words("a end-of-a b"));
-}
-
 void TestRequestQueue::nestedEventLoopRunsNothing()
 {
     Model model;
     bool busy = true;
     model.handler = [&] {
         model.check();
-        model.choose("a"_s);
         // The first call delivers earlier events. After it, nothing must be left to do.
         QCoreApplication::processEvents();
         busy = QAbstractEventDispatcher::instance()->processEvents(QEventLoop::AllEvents);
@@ -166,17 +111,13 @@ void TestRequestQueue::nestedEventLoopRunsNothing()
     QCOMPARE(model.log, words("scan scan"));
     model.handler = [] {};
     QCoreApplication::processEvents();
-    QCOMPARE(model.log, words("scan scan check a a"));
+    QCOMPARE(model.log, words("scan scan check"));
 }
 
 void TestRequestQueue::handlersWithoutEndReturnToTheEventLoop()
 {
     Model model;
-    model.handler = [&model] {
-        model.scan();
-        model.choose("a"_s);
-    };
-    model.onChoice = [&model] { model.choose("b"_s); };
+    model.handler = [&model] { model.scan(); };
     model.scan();
     for (int i = 0; i < 5; ++i) {
         const int before = model.log.size();
@@ -184,22 +125,22 @@ void TestRequestQueue::handlersWithoutEndReturnToTheEventLoop()
         QVERIFY(model.log.size() > before);
     }
     model.handler = [] {};
-    model.onChoice = [] {};
     QCoreApplication::processEvents();
     const QStringList settled = model.log;
     QCoreApplication::processEvents();
     QCOMPARE(model.log, settled);
 }
 
-void TestRequestQueue::requestsOfADestroyedModelAreDropped()
+void TestRequestQueue::updatesOfADestroyedModelAreDropped()
 {
     auto model = std::make_unique<Model>();
-    bool ran = false;
-    model->handler = [&] { model->requests.choose([&ran] { ran = true; }); };
+    bool isChecked = false;
+    model->onCheck = [&isChecked] { isChecked = true; };
+    model->handler = [&model] { model->check(); };
     model->scan();
     model.reset();
     QCoreApplication::processEvents();
-    QVERIFY(!ran);
+    QVERIFY(!isChecked);
 }
 
 QTEST_GUILESS_MAIN(TestRequestQueue)

@@ -25,29 +25,55 @@ class ListModelTest : public LoggedTest
     Q_OBJECT
 
 private Q_SLOTS:
+    // Following the directory
     void followsTheDirectory();
     void readsWrittenFilesOnceTheyAreClosed();
-    void ignoresOtherFiles();
+    void otherFiles();
+
+    // The user's choices
+    void choices_data();
+    void choices();
+    void choicesBeforeCompletion();
+    void choicesInHandlersAreStoredAtOnce();
+    void choicesKeepOtherProcessesChanges();
+    void followsOtherProcesses();
+
+    // Catalogs
     void catalogsGoWithTheModel();
-    void dyingModelMayBeAsked();
+    void catalogNameWithASlash();
+    void dyingModelMayBeUsed();
 
 protected Q_SLOTS:
     void init();
     void cleanup();
 
 protected:
-    // The directory of the definition files, which end in the suffix.
-    ListModelTest(QString directory, QString suffix);
+    // The directory of the definition files, which end in the suffix, the key of the user's list,
+    // and what enable...() and disable...() take: "Action" or "Widget".
+    ListModelTest(QString directory, QString suffix, QString key, QByteArray kind);
 
-    // Creates a model that lists everything, loads its rows and records its signals.
-    virtual void loadEverything() = 0;
+    // Creates a model that lists everything, and records its signals.
+    virtual void makeModel() = 0;
+    // Loads the rows for the first time, and again.
+    virtual void complete() = 0;
+    virtual void reload() = 0;
     virtual void removeModel() = 0;
-    // The names of the rows, separated by blanks.
-    virtual QString rowsOf(const QAbstractListModel &model) const = 0;
     // The content of a definition file for one row of this name, with a catalog.
     virtual QByteArray definition(const QString &name, const QByteArray &catalog) const = 0;
+    // The identity of the row of this name.
+    virtual QString path(const QString &name) const = 0;
+    QStringList paths(const QString &names) const;
     // The messages since the last call, without expected warnings of the model tester.
     virtual QStringList newMessages();
+
+    // Creates a model and loads its rows.
+    void loadEverything();
+    // Writes a definition file for each name.
+    void define(const QString &names, const QByteArray &catalog = {}) const;
+    // Enables or disables the row of this name.
+    void choose(const char *verb, const QString &name) const;
+    void store(const QString &names) const;
+    QString stored() const;
 
     // Begins to check the model and to record its signals.
     void watch(QAbstractListModel *model);
@@ -59,7 +85,10 @@ protected:
     {
         m_events->record(model, signal, name);
     }
+    // The names of the rows, and the sorted names of those that are enabled, separated by blanks.
     QString rows() const { return rowsOf(*m_watched); }
+    QString rowsOf(const QAbstractListModel &model) const;
+    QString enabledRows() const;
 
     // All messages since takeMessages().
     QStringList messages();
@@ -86,10 +115,13 @@ protected:
         });
     }
 
+    QAbstractListModel *m_watched = nullptr;
+
 private:
     const QString m_directory;
     const QString m_suffix;
-    const QAbstractListModel *m_watched = nullptr;
+    const QString m_key;
+    const QByteArray m_kind;
     QStringList m_messages;
     std::unique_ptr<RowEvents> m_events;
     std::unique_ptr<QAbstractItemModelTester> m_tester;

@@ -24,7 +24,7 @@ constexpr double settingsBar = 1.5;
 constexpr double growthBar = 1.5;
 
 constexpr int few = 100;
-constexpr int many = 5000;
+constexpr int many = 1000;
 
 QStringList write(int count)
 {
@@ -123,7 +123,7 @@ Rounds::Work lifetimes(int count)
 
 bool measureLoading(bool enabled)
 {
-    const std::vector<int> counts{few, 1000, many};
+    const std::vector<int> counts{few, many};
     std::vector<Rounds::Work> works;
     for (const int count : counts) {
         works.push_back(loading(count, enabled));

@@ -23,7 +23,7 @@ constexpr auto fileScheme = "file"_L1;
 constexpr auto imageScheme = "image"_L1;
 
 // The number of texts that one finding names.
-constexpr int maximumListed = 5;
+constexpr int maximumListed = 2;
 
 // Longer names are not typing errors, and comparing them would take long.
 constexpr int longestName = 64;

@@ -7,7 +7,6 @@
 #include "eventswidgets/eventswidgetsfile.h"
 #include "files/literals.h"
 #include "jsonwalker.h"
-#include "readerlog.h"
 #include "rules.h"
 
 #include <QJsonArray>
@@ -366,7 +365,6 @@ void reportRefused(const QByteArray &content, Findings *findings)
 
 void checkEventsWidgets(const QString &path, CheckContext *context, Findings *findings)
 {
-    const ReaderLog log;
     const std::optional<EventsWidgetsFile> file = readEventsWidgetsFile(path);
     QByteArray content;
     if (reportUnreadable(path, maximumEventsWidgetsSize, &content, findings)) {

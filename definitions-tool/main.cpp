@@ -14,6 +14,7 @@
 #include <QFileInfo>
 #include <QHash>
 #include <QLocale>
+#include <QLoggingCategory>
 #include <QTextCodec>
 
 #include <algorithm>
@@ -35,6 +36,12 @@ int fail(const QString &text)
 {
     std::fputs(qPrintable(QStringLiteral("marlo-definitions: %1\n").arg(text)), stderr);
     return CouldNotRun;
+}
+
+// The findings say more than the readers' warnings.
+void silenceReaders()
+{
+    QLoggingCategory::setFilterRules(QStringLiteral("default.warning=false"));
 }
 
 // A result that cannot be written is a failure.
@@ -147,6 +154,7 @@ int Command::run(const QStringList &arguments)
 
 int Command::check(const QStringList &paths)
 {
+    silenceReaders();
     const QString format = m_parser.value(QStringLiteral("format"));
     if (format != "text"_L1 && format != "json"_L1) {
         return fail(QStringLiteral("the format is text or json"));
@@ -199,6 +207,7 @@ int Command::list() const
 
 int Command::show(const QString &path) const
 {
+    silenceReaders();
     if (m_parser.isSet(QStringLiteral("locale"))) {
         const QString name = m_parser.value(QStringLiteral("locale"));
         const QLocale locale(name);

@@ -8,7 +8,6 @@
 #include "files/literals.h"
 #include "inilines.h"
 #include "quickactions/quickaction.h"
-#include "readerlog.h"
 #include "rules.h"
 
 #include <QDBusError>
@@ -318,6 +317,9 @@ void QuickActionCheck::checkArgument(int number, const QVariant &value)
             QStringLiteral("argument %1 is sent as a list of %2 texts")
                 .arg(number)
                 .arg(value.toStringList().size()));
+    } else if (value.userType() == QMetaType::QByteArray) {
+        add(line, Severity::Note, Rule::argumentType,
+            QStringLiteral("argument %1 is sent as bytes").arg(number));
     } else if (value.userType() != QMetaType::QString) {
         m_argumentsAreWrong = true;
         add(line, Severity::Error, Rule::arguments,
@@ -392,9 +394,8 @@ void reportRefused(const QString &path, Findings *findings)
 
 void checkQuickAction(const QString &path, CheckContext *context, Findings *findings)
 {
-    const ReaderLog log;
     const Action action(path, false);
-    if (log.hasWarnings()) {
+    if (!action.isRead()) {
         reportRefused(path, findings);
         return;
     }

@@ -7,7 +7,6 @@
 #include "eventswidgets/eventswidgetsfile.h"
 #include "files/literals.h"
 #include "quickactions/quickaction.h"
-#include "readerlog.h"
 #include "translations/catalogtable.h"
 
 #include <QDBusError>
@@ -72,6 +71,13 @@ QString callLine(const QuickAction &action)
         } else if (argument.userType() == QMetaType::QString) {
             signature += QLatin1Char('s');
             values.append(sentText(argument.toString()));
+        } else if (argument.userType() == QMetaType::QByteArray) {
+            const QByteArray bytes = argument.toByteArray();
+            signature += QStringLiteral("ay");
+            values.append(QString::number(bytes.size()));
+            for (const char byte : bytes) {
+                values.append(QString::number(uchar(byte)));
+            }
         } else {
             return QStringLiteral("# is sent with an argument that is not a text\n");
         }
@@ -95,9 +101,8 @@ QString valueText(const QVariant &value)
 
 std::optional<QString> showQuickAction(const QString &path)
 {
-    const ReaderLog log;
     const QuickAction action(path, false);
-    if (log.hasWarnings()) {
+    if (!action.isRead()) {
         return {};
     }
     QObject owner;
@@ -116,7 +121,6 @@ std::optional<QString> showQuickAction(const QString &path)
 
 std::optional<QString> showEventsWidgets(const QString &path)
 {
-    const ReaderLog log;
     const std::optional<EventsWidgetsFile> file = readEventsWidgetsFile(path);
     if (!file) {
         return {};

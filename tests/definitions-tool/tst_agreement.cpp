@@ -221,7 +221,8 @@ void TestAgreement::mutilatedQuickActions()
         // The model reads a copy under another name.
         const QString another = write(content, "conf");
         const QuickAction action(another, false);
-        const bool isRefused = !m_log->takeAll().isEmpty();
+        const bool isRefused = !action.isRead();
+        m_log->takeAll();
         refused += isRefused ? 1 : 0;
         QCOMPARE(count(findings, {"unreadable"}), isRefused ? 1 : 0);
         if (!isRefused && action.whyUnsendable().isValid()) {

@@ -3,10 +3,6 @@
 <TS version="2.1" language="fi">
 <context>
     <name></name>
-    <message id="kettle-action">
-        <source>Boil</source>
-        <translation>Keitä</translation>
-    </message>
     <message id="kettle-title">
         <source>Kettle</source>
         <translation>Keitin</translation>

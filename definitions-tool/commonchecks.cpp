@@ -25,10 +25,10 @@ constexpr auto imageScheme = "image"_L1;
 // The number of texts that one finding names.
 constexpr int maximumListed = 2;
 
-// Longer names are not typing errors, and comparing them would take long.
+// Longer names are not typing errors, and the time of a comparison grows with the square.
 constexpr int longestName = 64;
 
-// The number of letters to add, remove or replace.
+// Returns how many letters must be added, removed or replaced to turn one name into the other.
 int distance(const QString &left, const QString &right)
 {
     std::vector<int> row(size_t(right.size()) + 1);
@@ -45,7 +45,7 @@ int distance(const QString &left, const QString &right)
     return row.back();
 }
 
-// Keys that differ only in case, or in dashes and underscores, are most similar.
+// Ignores case and the difference between dashes and underscores.
 QString normalised(const QString &name)
 {
     return name.toLower().replace(QLatin1Char('_'), QLatin1Char('-'));
@@ -165,8 +165,8 @@ void checkTextIds(const std::vector<TextId> &ids, const QString &catalog, int li
         QStringList missing;
         for (const QString &id : qAsConst(held)) {
             const QString text = language.text(id);
-            // An unfinished translation is compiled as the engineering English source, or as
-            // nothing.
+            // lrelease compiles an unfinished translation to its source text, which is engineering
+            // English, or to nothing.
             const bool isUnfinished = installed.hasEngineeringEnglish && !language.name.isEmpty()
                 && !language.name.startsWith("en"_L1)
                 && text == installed.languages.front().text(id);
@@ -228,7 +228,7 @@ void checkLocation(const QString &what, const QString &location, const QStringLi
     }
     QFileInfo file(context->root + path);
     if (file.isSymLink() && !file.exists()) {
-        // The target of an absolute link is below the root, too.
+        // In an image, the target of an absolute link is below the root.
         file.setFile(context->root + file.symLinkTarget());
     }
     if (!file.exists()) {

@@ -27,19 +27,19 @@ struct TextId {
     int line;
 };
 
-// Warns of texts that the catalog does not hold. Names, in the line of the catalog, the texts that a
-// language lacks.
+// Warns of texts that the catalog lacks in every language. Adds a note, in the line of the catalog,
+// for each language that lacks some of the texts.
 void checkTextIds(const std::vector<TextId> &ids, const QString &catalog, int line,
                   CheckContext *context, Findings *findings);
 
-// In lower case; empty if the text is not a URL.
+// Returns the scheme in lower case, or an empty text if the text is not a URL.
 QString schemeOf(const QString &text);
 
-// Warns of an absolute path or URL that leads nowhere.
+// Warns of an absolute path or a URL that cannot be loaded. The schemes are those that can.
 void checkLocation(const QString &what, const QString &location, const QStringList &schemes,
                    int line, CheckContext *context, Findings *findings);
 
-// Warns of an icon that is a relative path, or an absolute path or URL that leads nowhere.
+// Warns of an icon that is a relative path or cannot be loaded.
 void checkIcon(const QString &icon, int line, CheckContext *context, Findings *findings);
 
 #endif

@@ -17,7 +17,7 @@ constexpr auto eventsWidgetsSuffix = ".json"_L1;
 
 bool DefinitionFiles::isQuickAction(const QString &path)
 {
-    // The models do not look at the case either.
+    // Like the models, matches suffixes case-insensitively.
     return path.endsWith(quickActionSuffix, Qt::CaseInsensitive);
 }
 
@@ -30,8 +30,8 @@ QStringList DefinitionFiles::inDirectory(const QString &path)
 {
     const QDir directory(path);
     QStringList files;
-    // As in the models: hidden files and broken links are left out, and widgets must be in regular
-    // files.
+    // Like the models, leaves out hidden files and broken links, and for widgets everything but
+    // regular files.
     const QStringList names = directory.entryList();
     for (const QString &name : names) {
         const QString file = directory.filePath(name);

@@ -10,14 +10,14 @@
 #include <QStringList>
 
 /*
-    The files that the models read.
+    The names of the files that the models read.
 */
 namespace DefinitionFiles {
 
 inline constexpr auto quickActionsDirectory = "/usr/share/glimmera/quickactions"_L1;
 inline constexpr auto eventsWidgetsDirectory = "/usr/share/glimmera/eventswidgets"_L1;
 
-// These look only at the name.
+// Whether a model reads files of this name.
 bool isQuickAction(const QString &path);
 bool isEventsWidgets(const QString &path);
 

@@ -44,11 +44,11 @@ public:
     // Looks for catalogs and installed definitions below the root directory.
     explicit DefinitionsChecker(const QString &root);
 
-    // For sources, whose catalogs are not compiled yet.
+    // For source trees, in which catalogs are not compiled yet.
     void ignoreCatalogs() { m_context.ignoresCatalogs = true; }
 
-    // Checks a file, or all definition files in a directory, but each file only once. A single file
-    // that has another name is a finding. Returns false if the path does not exist.
+    // Checks a file, or all definition files in a directory, each file only once. A single file with
+    // another suffix is an error. Returns false if the path does not exist.
     bool check(const QString &path);
     // Checks the definitions that are installed below the root. Returns false if the root contains
     // no directory for definitions.

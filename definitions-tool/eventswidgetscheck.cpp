@@ -37,7 +37,7 @@ enum FileKey { CatalogKey, WidgetsKey, SchemaKey, FileKeyCount };
 constexpr std::array<Key, FileKeyCount> fileKeys = {{
     {"translation_catalog", Type::Text},
     {"widgets", Type::Array},
-    // For editors.
+    // Names the JSON Schema for editors.
     {"$schema", Type::Any},
 }};
 
@@ -114,7 +114,7 @@ private:
     // The last member with a known key. The line is 0 if there is no such member.
     struct Member {
         int line = 0;
-        int position = 0; // Of the value.
+        int position = 0; // Where the value begins.
         QJsonValue value = QJsonValue::Undefined;
     };
     template<size_t count> using Members = std::array<Member, count>;
@@ -136,11 +136,11 @@ private:
     const EventsWidgetsFile &m_file;
     CheckContext *const m_context;
     Findings *const m_findings;
-    // The index of the next widget that the reader found.
+    // The index of the next widget in m_file.
     size_t m_next = 0;
-    // Of the widgets.
+    // The identifiers that the widgets name.
     std::vector<TextId> m_textIds;
-    // Lines are counted from the last position that was requested.
+    // The last position that was passed to lineOf(), and its line.
     int m_counted = 0;
     int m_line = 1;
 };
@@ -216,7 +216,7 @@ void EventsWidgetsCheck::checkEntry(int position)
     }
     const auto members = checkMembers(widgetKeys, position);
     const Member &path = members[PathKey];
-    // The widgets that the reader returned do not include those that it rejected.
+    // The reader leaves out the widgets that it rejects.
     if (m_next < m_file.widgets.size() && m_file.widgets.at(m_next).path == path.value.toString()) {
         checkWidget(m_file.widgets.at(m_next), members, line);
         ++m_next;
@@ -279,7 +279,7 @@ void EventsWidgetsCheck::checkPath(const QString &path, int line)
     }
 }
 
-// The title and the description.
+// Checks the title and the description.
 void EventsWidgetsCheck::checkTexts(const Widget &widget, const Members<WidgetKeyCount> &members)
 {
     m_textIds.push_back({widget.translationId, members[TranslationIdKey].line});
@@ -311,13 +311,14 @@ bool isSpace(char character)
     return std::isspace(static_cast<unsigned char>(character)) != 0;
 }
 
-// Whether a text is JSON that QJsonDocument refuses because it is neither an object nor an array.
+// Whether a text is a JSON value that QJsonDocument refuses: neither an object nor an array.
 bool isScalar(const QByteArray &text)
 {
     return QJsonDocument::fromJson('[' + text + ']').array().size() == 1;
 }
 
-// The position of the comma if QJsonDocument stopped at a bracket after one, otherwise -1.
+// If QJsonDocument stopped at a bracket that follows a comma, returns the position of the comma,
+// otherwise -1.
 int trailingComma(const QByteArray &text, const QJsonParseError &error)
 {
     if (error.error != QJsonParseError::MissingObject) {
@@ -353,7 +354,7 @@ void reportRefused(const QByteArray &content, Findings *findings)
         report(comma, Rule::json, "no value follows this comma");
         return;
     }
-    // If a file ends too early, the error is where its text ends, not in an empty line after that.
+    // If a file ends too early, reports its last line with text, not an empty line after it.
     int end = content.size();
     while (end > 0 && isSpace(content.at(end - 1))) {
         --end;

@@ -18,7 +18,7 @@ struct Finding {
     enum class Severity { Error, Warning, Note };
 
     QString file;
-    int line; // From 1, which is also used for the whole file.
+    int line; // From 1; findings about the whole file have 1, too.
     Severity severity;
     QString rule; // Names the kind of the finding.
     QString text;
@@ -30,7 +30,8 @@ class Findings
 public:
     explicit Findings(QString file) : m_file(std::move(file)) { }
 
-    // Keeps a limited number of findings of each severity. If there are more, one finding says so.
+    // Keeps a limited number of findings of each severity. One more then says that others are left
+    // out.
     void add(int line, Finding::Severity severity, QLatin1String rule, const QString &text);
     // Returns them in the order of lines.
     std::vector<Finding> take();
@@ -46,7 +47,7 @@ QString toText(const Finding &finding);
 // A JSON array with one object for each finding.
 QByteArray toJson(const std::vector<Finding> &findings);
 
-// In double quotes, on one line, shortened if necessary.
+// Returns the text in double quotes and on one line, and shortens long texts.
 QString quoted(const QString &text);
 
 #endif

@@ -14,7 +14,7 @@ bool isSpace(char character)
     return character == ' ' || character == '\t' || character == '\r' || character == '\n';
 }
 
-// Keeps NUL characters.
+// QString::fromLatin1(text) would stop at the first NUL.
 QString fromLatin1(const QByteArray &text)
 {
     return QString::fromLatin1(text.constData(), text.size());
@@ -36,7 +36,7 @@ QString sectionName(const QByteArray &text, const IniLine &line)
     return (isEscapedGeneral ? fromLatin1(name.mid(1)) : unescaped(name)) + QLatin1Char('/');
 }
 
-// QSettings removes only these kinds of white space.
+// QSettings removes only blanks and tabs.
 QByteArray withoutTrailingBlanks(QByteArray name)
 {
     while (name.endsWith(' ') || name.endsWith('\t')) {

@@ -33,7 +33,8 @@ QStringList fileNames(const QLocale &locale)
     return names;
 }
 
-// If a file name differs only a little from that of a file of the catalog, returns the right name.
+// Returns the right name of a file whose name differs from that of a file of the catalog only in case
+// or separators. Returns an empty text for other files.
 QString similarName(const QString &fileName, const QString &catalog)
 {
     const QString end = fileName.mid(catalog.size()).chopped(suffix.size());

@@ -45,7 +45,7 @@ public:
     QString directory() const { return m_directory; }
     // The name must not lead out of the directory.
     const Catalog &find(const QString &catalog);
-    // The findings about the files of the catalogs that were found since the last call.
+    // Returns the findings about the files of all catalogs that find() has read since the last call.
     std::vector<Finding> takeFindings();
 
 private:

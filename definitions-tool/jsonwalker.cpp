@@ -86,8 +86,8 @@ int JsonWalker::endOfString(int position) const
     return position + 1;
 }
 
-// Every value is in an object or an array, so that a comma or a bracket follows it. The returned
-// end is there: spaces after the value do not matter.
+// Returns the position of the comma or bracket that follows the value. One of them does, because every
+// value is in an object or an array.
 int JsonWalker::endOfValue(int position) const
 {
     int depth = 0;

@@ -18,10 +18,10 @@ public:
     // The object or array begins at the position.
     JsonWalker(QByteArray text, int position);
 
-    // Goes to the first item, then to the next one. False after the last one.
+    // Goes to the first item, and with each further call to the next item. Returns false at the end.
     bool next();
 
-    QString key() const; // Of a member.
+    QString key() const; // Only for members of an object.
     int position() const { return m_position; } // Of its value.
     // As QJsonDocument reads it, except that objects and arrays are empty.
     QJsonValue value() const;
@@ -36,7 +36,7 @@ private:
     const bool m_isObject;
     int m_key = 0;
     int m_position = 0;
-    int m_end; // Of the item.
+    int m_end; // Where the item ends.
 };
 
 #endif

@@ -81,7 +81,7 @@ QStringList namedCatalogs()
     return names;
 }
 
-// The file that the models load, if they look for the one at the path.
+// Returns the path, or "none" if the models do not load the file.
 QString loadedFile(const QString &path)
 {
     const bool isLoaded = !path.isEmpty() && CheckedTranslator().loadFile(path).isEmpty();

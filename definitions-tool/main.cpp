@@ -44,7 +44,7 @@ void silenceReaders()
     QLoggingCategory::setFilterRules(QStringLiteral("default.warning=false"));
 }
 
-// A result that cannot be written is a failure.
+// Returns the status, or a failure if the text cannot be written.
 int print(const QByteArray &text, int status)
 {
     const bool isWritten =
@@ -80,7 +80,7 @@ private:
     int check(const QStringList &paths);
     int list() const;
     int show(const QString &path) const;
-    // The first given option that the command does not have, or an empty text.
+    // Returns the first option on the command line that the command does not have, or an empty text.
     QString misplacedOption(const QStringList &allowed) const;
 
     QCommandLineParser m_parser;

@@ -40,7 +40,7 @@ constexpr std::array knownKeys = {
 };
 
 constexpr int maximumName = 255;
-// No signature of a call is longer. The reader stops after one argument more.
+// D-Bus allows no longer signature. The reader returns at most one argument more.
 constexpr int maximumArguments = 255;
 
 // The names that D-Bus allows in a call. QtDBus answers other names with an error.
@@ -56,7 +56,7 @@ constexpr std::array names = {
          ":[\\w-]+(\\.[\\w-]+)*|[a-zA-Z_-][\\w-]*(\\.[a-zA-Z_-][\\w-]*)+"_L1,
          "name of a service"_L1},
     Name{pathKey, &Action::objectPath, "/|(/\\w+)+"_L1, "path of an object"_L1},
-    // Only this name is optional.
+    // The interface is optional.
     Name{interfaceKey, &Action::interface, "([a-zA-Z_]\\w*(\\.[a-zA-Z_]\\w*)+)?"_L1,
          "name of an interface"_L1},
     Name{methodKey, &Action::method, "[a-zA-Z_]\\w*"_L1, "name of a method"_L1},
@@ -76,7 +76,7 @@ bool isName(const Name &name, const QString &value)
         && expressions.at(size_t(&name - names.data())).match(value).hasMatch();
 }
 
-// The number of the argument that a key holds, from 1, or 0 for any other key.
+// Returns the number of the argument that a key holds, from 1, or 0 for other keys.
 int argumentNumber(const QString &key)
 {
     static const QRegularExpression element(
@@ -124,7 +124,7 @@ public:
     void checkCall();
 
 private:
-    // The line of the last such key, or the first line if the file has no such key.
+    // Returns the line of the last such key, or 1 if the file has no such key.
     int lineOf(const QString &key) const { return m_lineOf.value(key, 1); }
     void checkKey(const NamedIniLine &line, const QString &section);
     void checkText(const QString &key, const QVariant &value);
@@ -202,7 +202,7 @@ void QuickActionCheck::checkKey(const NamedIniLine &line, const QString &section
                && argumentNumber(line.name) == 0) {
         QString key = line.name.mid(section.size());
         const int number = qMax(1, key.section(QLatin1Char('/'), 0, 0).toInt());
-        // The file separates groups with backslashes.
+        // In the file, backslashes separate groups.
         key.replace(QLatin1Char('/'), QLatin1Char('\\'));
         reportUnknownKey(QStringLiteral("key"), key,
                          {QStringLiteral("size"), QStringLiteral("%1\\argument").arg(number)},
@@ -242,7 +242,7 @@ void QuickActionCheck::checkTexts()
 
 void QuickActionCheck::checkText(const QString &key, const QVariant &value)
 {
-    // Pages get the icon as it is, and can only use a string.
+    // Pages get the icon unchanged, and can use it only if it is a string.
     if (value.userType() == QMetaType::QString || (key != iconKey && !value.toString().isEmpty())) {
         return;
     }
@@ -342,7 +342,7 @@ void QuickActionCheck::checkCall()
             continue;
         }
         isSendable = false;
-        // Unless another finding has reported this value already.
+        // Another finding may have reported this value already.
         if (!m_misread.contains(name.key)) {
             add(lineOf(name.key), Severity::Error, Rule::call,
                 value.isEmpty()

@@ -53,7 +53,7 @@ QString callLine(const QuickAction &action)
     if (action.interface().isEmpty()) {
         return QStringLiteral("# is sent without an interface, which busctl cannot do\n");
     }
-    // A value may begin with a dash.
+    // "--", because a value may begin with a dash.
     QStringList words = {QStringLiteral("busctl"), QStringLiteral("--user"), QStringLiteral("--"),
                          QStringLiteral("call"),   action.service(),         action.objectPath(),
                          action.interface(),       action.method()};

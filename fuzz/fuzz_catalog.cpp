@@ -20,7 +20,7 @@ namespace {
 
 constexpr int maximumSize = 1024 * 1024;
 
-// The content and its padding between two pages without access.
+// Holds the content and its padding between two pages without access.
 const uchar *guarded(const QByteArray &content)
 {
     static const auto page = int(sysconf(_SC_PAGESIZE));
@@ -41,8 +41,8 @@ const uchar *guarded(const QByteArray &content)
     return reinterpret_cast<const uchar *>(data);
 }
 
-// A text with this hash. QTranslator's hash shifts by four bits and adds the next character, so the
-// characters are the digits of the number, from 1 to 16.
+// Returns a text with this hash. QTranslator's hash shifts by four bits and adds the next character, so
+// the characters are the digits of the number, from 1 to 16.
 QByteArray textWithHash(quint32 hash)
 {
     QByteArray text;

@@ -219,8 +219,8 @@ private:
         }
     }
 
-    // May be so deep that the walk closes and reopens directories. Either each of them has a file,
-    // or none.
+    // Makes a chain of directories, which may be so deep that the walk closes and reopens some. Either
+    // each directory has a file, or none has.
     void makeChain(std::vector<std::string> *way, const std::string &name)
     {
         const int byte = m_input.takeByte();

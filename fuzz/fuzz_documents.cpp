@@ -48,7 +48,7 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t *data, std::size_t size
     terms.platformTermsOfUse(localeName);
     Fuzzing::require(terms.vendorTermsSummary(localeName).isEmpty(), "there is no summary");
     const QStringList full = terms.vendorTermsOfUse(QStringLiteral("en_GB.UTF-8"));
-    // Line ends of any system are read as one.
+    // The line ends of every system are read as a newline.
     QByteArray unified = content;
     unified.replace("\r\n", "\n");
     const int end = unified.indexOf('\n');

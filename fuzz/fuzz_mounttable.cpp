@@ -59,7 +59,7 @@ void writeMountTable(const QByteArray &table)
     close(fd);
 }
 
-// The next word of a line, with its escapes decoded.
+// Returns the next word of a line, with its escapes decoded.
 std::string takeWord(const std::string &line, size_t *at)
 {
     *at = std::min(line.find_first_not_of(" \t", *at), line.size());
@@ -93,8 +93,8 @@ ino_t numberOf(const std::string &path)
     return info.st_ino;
 }
 
-// The inodes of the directories that the table names for the device, with the type of this file
-// system. There are none if one is the root directory: then the device is no card.
+// Returns the inodes of the directories that the table names for the device, with the type of this
+// file system. Returns none if one of them is the root directory: then the device is not a card.
 std::vector<ino_t> namedDirectories(const std::string &device, const std::string &table)
 {
     std::vector<ino_t> named;
@@ -131,7 +131,7 @@ const char *empty(const QString &devicePath, const QByteArray &table)
     writeMountTable(table);
     const std::vector<ino_t> named =
         namedDirectories(QFile::encodeName(devicePath).toStdString(), table.toStdString());
-    // For each directory, whether its files may be removed.
+    // Whether the files of each directory may be removed.
     std::vector<bool> mayLose;
     for (const std::string &directory : directories) {
         bool may = false;

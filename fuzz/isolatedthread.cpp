@@ -14,7 +14,8 @@
 #include <sys/syscall.h>
 #include <unistd.h>
 
-// Provided by the sanitizers. It starts a symbolizer program, which the isolated thread cannot find.
+// The sanitizers provide this function. It starts a symbolizer program, which the isolated thread
+// cannot find.
 extern "C" __attribute__((weak)) void __sanitizer_symbolize_pc(void *pc, const char *format,
                                                                char *buffer, std::size_t size);
 

@@ -83,7 +83,7 @@ QVector<QByteArray> corpus(const char *kind)
     return contents;
 }
 
-// Removes, inserts or replaces some bytes, mostly with meaningful ones.
+// Removes, inserts or replaces some bytes. Most new bytes have a meaning in the format.
 QByteArray mutilated(QByteArray content, const QByteArray &meaningful, Random *random)
 {
     for (int changes = 1 + below(4, random); changes > 0; --changes) {
@@ -118,7 +118,7 @@ std::vector<Finding> check(const QString &path)
     return checker.findings();
 }
 
-// The object or array at a position, as the walker reads it.
+// Reads the object or array at a position with the walker.
 QJsonValue walk(const QByteArray &text, int position)
 {
     JsonWalker walker(text, position);
@@ -162,7 +162,7 @@ void TestAgreement::cleanup()
     m_directory.reset();
 }
 
-// Under a new name each time, because QSettings caches what it has read.
+// Uses a new name each time, because QSettings caches what it has read.
 QString TestAgreement::write(const QByteArray &content, const char *suffix)
 {
     const QString path =
@@ -177,7 +177,7 @@ void TestAgreement::linesHaveTheKeysOfQSettings()
     const QVector<QByteArray> contents = corpus("quickaction");
     int compared = 0;
     for (int i = 0; i < 4000; ++i) {
-        // Only QSettings understands percent signs.
+        // QSettings decodes names with percent signs in its own way.
         const QByteArray content =
             mutilated(contents.at(below(contents.size(), &random)), "\n\r\\\"=;[] ,/#", &random)
                 .replace('%', 'x')

@@ -84,7 +84,7 @@ std::vector<Finding> check(const QString &path)
     return checker.findings();
 }
 
-// The lines that the checker prints for a file of the corpus.
+// Returns the lines that the checker must print for a file of the corpus.
 QString expectedFindings(const QFileInfo &file)
 {
     const QString start = file.fileName() + QLatin1Char(':');
@@ -99,7 +99,7 @@ QString expectedFindings(const QFileInfo &file)
     return expected;
 }
 
-// The errors in a copy, because QSettings caches files by name.
+// Returns the errors in a copy of the file, because QSettings caches files by name.
 std::vector<Finding> errors(const QString &path)
 {
     const QTemporaryDir directory;
@@ -162,7 +162,7 @@ Reading readPlainly(const QByteArray &content)
     return reading;
 }
 
-// The value of a key in the model, as text; nothing for keys that the model does not know.
+// Returns the value of a key in the model as text, or nothing if the model does not know the key.
 std::optional<QString> modelText(const QuickActionsModel &model, const QuickAction &action,
                                  const QString &key)
 {
@@ -199,7 +199,7 @@ std::optional<QString> modelText(const QuickActionsModel &model, const QuickActi
     return {};
 }
 
-// The number of members with these names in a text.
+// Returns the number of members with these names in a text.
 int countMembers(const QString &text, const QStringList &names)
 {
     const QRegularExpression member(
@@ -452,7 +452,7 @@ void TestCorpus::agreesOnEventsWidgets()
     m_log->takeAll(); // of the reader
     QVERIFY2(found.empty() == differences.isEmpty(),
              qPrintable(differences.join(QLatin1Char('\n'))));
-    // The model warns of each widget that it ignores.
+    // The model logs a warning for each widget that it ignores.
     const auto ignored = std::count_if(found.cbegin(), found.cend(), [](const Finding &finding) {
         return finding.rule == QLatin1String("path") || finding.rule == QLatin1String("widget");
     });

@@ -14,6 +14,7 @@
 
 #include <algorithm>
 #include <numeric>
+#include <set>
 
 using Severity = Finding::Severity;
 
@@ -148,13 +149,13 @@ void checkTextIds(const std::vector<TextId> &ids, const QString &catalog, int li
         return;
     }
     const InstalledCatalogs::Catalog &installed = context->catalogs.find(catalog);
-    QStringList held;
+    std::set<QString> held;
     for (const TextId &text : ids) {
-        if (text.id.isEmpty() || held.contains(text.id)) {
+        if (text.id.isEmpty() || held.count(text.id) > 0) {
             continue;
         }
         if (installed.holds(text.id)) {
-            held.append(text.id);
+            held.insert(text.id);
         } else {
             findings->add(text.line, Severity::Warning, Rule::textId,
                           QStringLiteral("the catalog %1 does not hold the text %2")
@@ -163,7 +164,7 @@ void checkTextIds(const std::vector<TextId> &ids, const QString &catalog, int li
     }
     for (const InstalledCatalogs::Language &language : installed.languages) {
         QStringList missing;
-        for (const QString &id : qAsConst(held)) {
+        for (const QString &id : held) {
             const QString text = language.text(id);
             // lrelease compiles an unfinished translation to its source text, which is engineering
             // English, or to nothing.

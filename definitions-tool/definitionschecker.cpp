@@ -39,7 +39,6 @@ bool DefinitionsChecker::checkInstalled()
     m_context.isInstalled = true;
     const bool hasQuickActions = checkInstalledDirectory(quickActionsDirectory, isQuickAction);
     const bool hasEventsWidgets = checkInstalledDirectory(eventsWidgetsDirectory, isEventsWidgets);
-    m_context.isInstalled = false;
     return hasQuickActions || hasEventsWidgets;
 }
 

@@ -51,7 +51,7 @@ public:
     // another suffix is an error. Returns false if the path does not exist.
     bool check(const QString &path);
     // Checks the definitions that are installed below the root. Returns false if the root contains
-    // no directory for definitions.
+    // no directory for definitions. Later checks of files expect installed definitions, too.
     bool checkInstalled();
 
     const std::vector<Finding> &findings() const { return m_findings; }

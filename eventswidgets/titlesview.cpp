@@ -99,6 +99,39 @@ void forEachObject(QVariant *value, const std::function<void(QObject *, QVariant
     }
     \endqml
 
+    A view matches one role. To select rows by two roles, put a model with the matching rows in
+    between. This example joins the titles of the widgets that are both enabled and available:
+
+    \qml
+    Label {
+        text: usableTitles.value
+        TitlesView {
+            id: usableTitles
+            model: ListModel { id: usable }
+            role: "title"
+        }
+        Instantiator {
+            id: rows
+            function select() {
+                usable.clear();
+                for (let i = 0; i < count; ++i) {
+                    if (objectAt(i).isUsable)
+                        usable.append({ title: objectAt(i).text });
+                }
+            }
+            model: EventsWidgetsModel { }
+            delegate: QtObject {
+                readonly property string text: model.title
+                readonly property bool isUsable: model.enabled && model.available
+                onTextChanged: Qt.callLater(rows.select)
+                onIsUsableChanged: Qt.callLater(rows.select)
+            }
+            onObjectAdded: Qt.callLater(select)
+            onObjectRemoved: Qt.callLater(select)
+        }
+    }
+    \endqml
+
     \image gallery-titles.png The gallery's page for this type
 
     \section1 What may surprise

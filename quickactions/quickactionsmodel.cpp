@@ -113,7 +113,7 @@ QSet<QString> setOf(const QStringList &texts)
     It uses the same indexes for the row and for the entry in the list, so call it on a model
     without \l showPotential. Enabled actions that are not installed or are blocked have an entry
     but no row. The entry remains so that the action returns to its place when its package is
-    installed again.
+    installed again. \l{QuickActionsModel::move()}{move()} has an example for such a list.
 
     \section2 Existing rows do not move
     Rows keep their places when an action is enabled or disabled with \l showPotential, when the
@@ -333,7 +333,46 @@ void QuickActionsModel::disableAction(const QString &path)
 
     The rows must begin with the enabled actions in the user's order. Without \l showPotential this
     is true unless an enabled action is missing or blocked, or another model or process has changed
-    the order.
+    the order. While an enabled action is not installed, the indexes after its entry mean other
+    entries than the rows that the user sees. The rows of a new model always have the stored order.
+    A page on which the user orders the actions therefore creates its model again when it is opened,
+    and after a move if the rows then differ from the list:
+
+    \qml
+    ListView {
+        id: list
+
+        function paths(actions) {
+            return Array.from({ length: actions.count }, (none, i) => actions.get(i).path).join();
+        }
+        function showStoredOrder() {
+            const shown = model;
+            const stored = newActions.createObject(list);
+            if (shown && paths(shown) === paths(stored)) {
+                stored.destroy();
+                return;
+            }
+            model = stored;
+            if (shown)
+                shown.destroy();
+        }
+        function moveAction(from, to) {
+            model.move(from, to);
+            showStoredOrder();
+        }
+
+        delegate: ItemDelegate {
+            text: model.title || ""
+            onClicked: list.moveAction(index, 0)
+        }
+        Component.onCompleted: showStoredOrder()
+
+        Component {
+            id: newActions
+            QuickActionsModel { }
+        }
+    }
+    \endqml
 */
 void QuickActionsModel::move(int index, int newIndex)
 {

@@ -50,6 +50,20 @@ QVariant valueAt(const QAbstractItemModel &model, int row, const QByteArray &rol
     return model.data(model.index(row, 0), model.roleNames().key(role, -1));
 }
 
+// The examples that a file of the reference shows, as documents.
+QByteArrayList examplesOf(const QString &file)
+{
+    static const QRegularExpression block(QStringLiteral("(?s)\\\\qml\\n(.*?)\\\\endqml"));
+    QByteArrayList documents;
+    auto blocks = block.globalMatch(QString::fromUtf8(contentOf(file)));
+    while (blocks.hasNext()) {
+        documents.append("import QtQuick 2.15\nimport QtQuick.Controls 2.15\n"
+                         "import com.marlo.settings.system 1.0\n"
+                         + blocks.next().captured(1).toUtf8());
+    }
+    return documents;
+}
+
 bool isBusy(const QObject &example)
 {
     const QList<QObject *> parts = example.findChildren<QObject *>();
@@ -69,6 +83,8 @@ private Q_SLOTS:
     void definesAWidget();
     void loadsTheWidget();
     void listsTheActionOnAPage();
+    void ordersActions();
+    void selectsByTwoRoles();
     void runsThoseOfTheReference_data();
     void runsThoseOfTheReference();
     void areAllThatTheReadmeShows();
@@ -77,6 +93,8 @@ private Q_SLOTS:
 
 private:
     std::unique_ptr<QObject> create(const QByteArray &document);
+    // The example of the reference in this file that contains the text.
+    std::unique_ptr<QObject> createExample(const QString &file, const QByteArray &text);
 
     QQmlEngine m_engine;
 };
@@ -187,6 +205,85 @@ void TestExamples::listsTheActionOnAPage()
     QTRY_COMPARE(torch.calls().size(), 1);
 }
 
+std::unique_ptr<QObject> TestExamples::createExample(const QString &file, const QByteArray &text)
+{
+    for (const QByteArray &document : examplesOf(file)) {
+        if (document.contains(text)) {
+            return create(document);
+        }
+    }
+    return nullptr;
+}
+
+void TestExamples::ordersActions()
+{
+    const QString pattern = QStringLiteral("/usr/share/glimmera/quickactions/order-%1.conf");
+    const auto paths = [&pattern](const char *names) {
+        QStringList paths;
+        for (const QString &name : words(names)) {
+            paths.append(pattern.arg(name));
+        }
+        return paths;
+    };
+    MGConfItem list(enabledKey);
+    const QVariant before = list.value();
+    Files::write(pattern.arg(QLatin1Char('a')), "title=a\n");
+    Files::write(pattern.arg(QLatin1Char('b')), "title=b\n");
+    list.set(paths("a missing b"));
+    const auto page =
+        createExample(QStringLiteral("quickactions/quickactionsmodel.cpp"), "showStoredOrder");
+    QVERIFY(page != nullptr);
+    const auto model = [&page] { return page->property("model").value<QAbstractItemModel *>(); };
+    const auto titles = [&model] {
+        return valueAt(*model(), 0, "title").toString() + valueAt(*model(), 1, "title").toString();
+    };
+    const auto move = [&page](int from, int to) {
+        QMetaObject::invokeMethod(page.get(), "moveAction", Q_ARG(QVariant, from),
+                                  Q_ARG(QVariant, to));
+    };
+    QCOMPARE(titles(), QStringLiteral("ab"));
+    // The entry of the missing action moves, so the rows return to the order of the list.
+    move(1, 0);
+    QCOMPARE(list.value().toStringList(), paths("missing a b"));
+    QCOMPARE(titles(), QStringLiteral("ab"));
+
+    list.set(paths("a b"));
+    const QAbstractItemModel *shown = model();
+    move(1, 0);
+    QCOMPARE(list.value().toStringList(), paths("b a"));
+    QCOMPARE(titles(), QStringLiteral("ba"));
+    QCOMPARE(model(), shown);
+    list.set(before);
+    Files::remove(pattern.arg(QLatin1Char('a')));
+    Files::remove(pattern.arg(QLatin1Char('b')));
+}
+
+void TestExamples::selectsByTwoRoles()
+{
+    const QString path = QStringLiteral("/usr/share/glimmera/eventswidgets/roles.json");
+    const QString needed = QStringLiteral("/usr/share/glimmera/needed");
+    const QString key = QStringLiteral("/desktop/glimmera-marlo-home/events_screen_widgets");
+    Files::write(path, R"({ "widgets": [
+        { "path": "a", "title": "A", "order": 1 },
+        { "path": "b", "title": "B", "order": 2, "available_path": "/usr/share/glimmera/needed" },
+        { "path": "c", "title": "C", "order": 3 } ] })");
+    MGConfItem(key).set(words("a b"));
+    const auto label =
+        createExample(QStringLiteral("eventswidgets/titlesview.cpp"), "Instantiator");
+    QVERIFY(label != nullptr);
+    const auto text = [&label] { return label->property("text").toString(); };
+    QTRY_COMPARE(text(), QStringLiteral("A"));
+    MGConfItem(key).set(words("a b c"));
+    QTRY_COMPARE(text(), QStringLiteral("A and C"));
+    Files::write(needed, "");
+    Files::write(path + QStringLiteral(".json"), "{ \"widgets\": [] }"); // A change: scans again.
+    QTRY_COMPARE(text(), QStringLiteral("A, B and C"));
+    MGConfItem(key).unset();
+    Files::remove(path);
+    Files::remove(path + QStringLiteral(".json"));
+    Files::remove(needed);
+}
+
 void TestExamples::runsThoseOfTheReference_data()
 {
     QTest::addColumn<QByteArray>("document");
@@ -197,15 +294,10 @@ void TestExamples::runsThoseOfTheReference_data()
         const QStringList names = QDir(QStringLiteral(SOURCE_DIR "/") + directory)
                                       .entryList({QStringLiteral("*.cpp")}, QDir::Files);
         for (const QString &name : names) {
-            static const QRegularExpression block(QStringLiteral("(?s)\\\\qml\\n(.*?)\\\\endqml"));
-            auto blocks = block.globalMatch(
-                QString::fromUtf8(contentOf(directory + QLatin1Char('/') + name)));
-            while (blocks.hasNext()) {
+            const QByteArrayList documents = examplesOf(directory + QLatin1Char('/') + name);
+            for (const QByteArray &document : documents) {
                 ++found;
-                QTest::addRow("%s %d", qPrintable(name), found)
-                    << "import QtQuick 2.15\nimport QtQuick.Controls 2.15\n"
-                       "import com.marlo.settings.system 1.0\n"
-                        + blocks.next().captured(1).toUtf8();
+                QTest::addRow("%s %d", qPrintable(name), found) << document;
             }
         }
     }

@@ -282,6 +282,9 @@ void TestMarloDefinitions::catalogsOfSources()
 {
     Files::removeCatalog(QStringLiteral("maps_eng_en"));
     write("lamp.conf", goodAction);
+    // Nor have they the permissions of installed files.
+    QVERIFY(
+        QFile::setPermissions(QStringLiteral("lamp.conf"), QFile::ReadOwner | QFile::WriteOwner));
     QCOMPARE(run("check --strict lamp.conf").status, 1);
     const QByteArray line = "check --strict lamp.conf --no-catalogs";
     QCOMPARE(run(line), Result{0});

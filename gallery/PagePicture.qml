@@ -95,7 +95,7 @@ Window {
 
     Timer {
         id: patience
-        interval: 10000
+        interval: 20000
         running: true
         onTriggered: fail("nothing to click shows \"" + clicks[0] + "\", but there is: "
                           + Screen.texts(window.contentItem).map(item => item.text).join("; "))

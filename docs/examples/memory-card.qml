@@ -102,8 +102,8 @@ Page {
         sourceComponent: MemoryCardFormatter {
             deviceName: page.cardName
             onStatusChanged: page.follow(this)
-            onMountError: page.fail(error)
-            onUnmountError: page.fail(error)
+            onMountError: function(error) { page.fail(error); }
+            onUnmountError: function(error) { page.fail(error); }
         }
     }
 

@@ -28,13 +28,7 @@ GalleryPage {
                 remark: model.available ? "" : qsTrId("gallery-events-widgets-unavailable")
                 // Needs "model.", because an item has a property `enabled` of its own.
                 checked: model.enabled
-                onToggled: {
-                    if (checked) {
-                        widgets.enableWidget(model.path);
-                    } else {
-                        widgets.disableWidget(model.path);
-                    }
-                }
+                onToggled: checked ? widgets.enableWidget(model.path) : widgets.disableWidget(model.path)
             }
         }
         Note {

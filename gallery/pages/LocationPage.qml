@@ -18,12 +18,6 @@ GalleryPage {
     readonly property bool mlsAgreed: location.mlsOnlineState !== LocationPage.OnlineState.NotAgreed
     readonly property bool hereAgreed: location.hereState !== LocationPage.OnlineState.NotAgreed
 
-    // Read once: each read looks for the file.
-    readonly property string mlsTerms: location.mlsOnlineAgreementText
-    readonly property string hereTerms: location.hereAgreementText
-    // The text of a service whose terms are not installed.
-    readonly property string noTerms: qsTrId("settings_location-la-no_agreement_text_found")
-
     LocationConfiguration {
         id: location
     }
@@ -90,33 +84,19 @@ GalleryPage {
         }
     }
 
-    Section {
+    Agreement {
         heading: qsTrId("gallery-location-mls-terms")
-
-        Paragraph {
-            text: mlsTerms
-        }
-        PushButton {
-            visible: mlsAgreed || mlsTerms !== noTerms
-            highlighted: !mlsAgreed
-            text: mlsAgreed ? qsTrId("gallery-location-withdraw") : qsTrId("gallery-location-agree")
-            onClicked: location.mlsOnlineState = mlsAgreed ? LocationPage.OnlineState.NotAgreed
-                                                           : LocationPage.OnlineState.Enabled
-        }
+        terms: location.mlsOnlineAgreementText
+        agreed: mlsAgreed
+        onChosen: location.mlsOnlineState = agrees ? LocationPage.OnlineState.Enabled
+                                                   : LocationPage.OnlineState.NotAgreed
     }
 
-    Section {
+    Agreement {
         heading: qsTrId("gallery-location-here-terms")
-
-        Paragraph {
-            text: hereTerms
-        }
-        PushButton {
-            visible: hereAgreed || hereTerms !== noTerms
-            highlighted: !hereAgreed
-            text: hereAgreed ? qsTrId("gallery-location-withdraw") : qsTrId("gallery-location-agree")
-            onClicked: location.hereState = hereAgreed ? LocationPage.OnlineState.NotAgreed
-                                                       : LocationPage.OnlineState.Enabled
-        }
+        terms: location.hereAgreementText
+        agreed: hereAgreed
+        onChosen: location.hereState = agrees ? LocationPage.OnlineState.Enabled
+                                              : LocationPage.OnlineState.NotAgreed
     }
 }

@@ -78,13 +78,7 @@ GalleryPage {
                 icon.source: Display.url(model.icon)
                 // Needs "model.", because an item has a property `enabled` of its own.
                 checked: model.enabled
-                onToggled: {
-                    if (checked) {
-                        allActions.enableAction(model.path);
-                    } else {
-                        allActions.disableAction(model.path);
-                    }
-                }
+                onToggled: checked ? allActions.enableAction(model.path) : allActions.disableAction(model.path)
             }
         }
         Note {

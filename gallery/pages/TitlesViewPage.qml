@@ -44,13 +44,7 @@ GalleryPage {
             TextSwitch {
                 text: Display.title(model.title, model.path)
                 checked: model.enabled
-                onToggled: {
-                    if (checked) {
-                        widgets.enableWidget(model.path);
-                    } else {
-                        widgets.disableWidget(model.path);
-                    }
-                }
+                onToggled: checked ? widgets.enableWidget(model.path) : widgets.disableWidget(model.path)
             }
         }
     }
@@ -66,13 +60,7 @@ GalleryPage {
             TextSwitch {
                 text: Display.title(model.title, model.path)
                 checked: model.enabled
-                onToggled: {
-                    if (checked) {
-                        actions.enableAction(model.path);
-                    } else {
-                        actions.disableAction(model.path);
-                    }
-                }
+                onToggled: checked ? actions.enableAction(model.path) : actions.disableAction(model.path)
             }
         }
     }

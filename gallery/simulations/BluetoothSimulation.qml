@@ -2,21 +2,14 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 import QtQuick 2.15
-import QtQuick.Layouts 1.15
 import ".."
-import "../pages/controls"
 
 /*
     The file in which the platform stores the address.
 */
-ColumnLayout {
-    spacing: 8
-
+ConstantFiles {
     SimulatedFilesSwitch {
         text: qsTrId("gallery-bluetooth-installed")
         path: "/var/lib/bluetooth/board-address"
-    }
-    Note {
-        text: qsTrId("gallery-simulation-constant")
     }
 }

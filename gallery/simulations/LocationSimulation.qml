@@ -2,16 +2,12 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 import QtQuick 2.15
-import QtQuick.Layouts 1.15
 import ".."
-import "../pages/controls"
 
 /*
     The packages of the online services, with their terms.
 */
-ColumnLayout {
-    spacing: 8
-
+ConstantFiles {
     SimulatedFilesSwitch {
         text: qsTrId("gallery-location-mls-installed")
         path: "/usr/share/geoclue-provider-mlsdb/agreements/*.txt"
@@ -19,8 +15,5 @@ ColumnLayout {
     SimulatedFilesSwitch {
         text: qsTrId("gallery-location-here-installed")
         path: "/usr/share/libherepositioning/agreements/*.txt"
-    }
-    Note {
-        text: qsTrId("gallery-simulation-constant")
     }
 }

@@ -2,16 +2,12 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 import QtQuick 2.15
-import QtQuick.Layouts 1.15
 import ".."
-import "../pages/controls"
 
 /*
     The packages of the platform's and of the vendor's terms.
 */
-ColumnLayout {
-    spacing: 8
-
+ConstantFiles {
     SimulatedFilesSwitch {
         text: qsTrId("gallery-terms-platform-installed")
         path: "/usr/share/marlo-settings/platform-eula/*.txt"
@@ -19,8 +15,5 @@ ColumnLayout {
     SimulatedFilesSwitch {
         text: qsTrId("gallery-terms-vendor-installed")
         path: "/usr/share/marlo-settings/vendor-eula"
-    }
-    Note {
-        text: qsTrId("gallery-simulation-constant")
     }
 }

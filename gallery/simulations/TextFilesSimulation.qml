@@ -2,16 +2,12 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 import QtQuick 2.15
-import QtQuick.Layouts 1.15
 import ".."
-import "../pages/controls"
 
 /*
     The file and the directory.
 */
-ColumnLayout {
-    spacing: 8
-
+ConstantFiles {
     SimulatedFilesSwitch {
         text: qsTrId("gallery-text-files-file-installed")
         path: "/usr/share/marlo-settings/about-*.html"
@@ -19,8 +15,5 @@ ColumnLayout {
     SimulatedFilesSwitch {
         text: qsTrId("gallery-text-files-directory-installed")
         path: "/usr/share/marlo-settings/licenses"
-    }
-    Note {
-        text: qsTrId("gallery-simulation-constant")
     }
 }

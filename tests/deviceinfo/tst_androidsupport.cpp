@@ -3,7 +3,6 @@
 
 #include "deviceinfo/androidsupport.h"
 #include "files.h"
-#include "interfaceof.h"
 #include "loggedtest.h"
 
 #include <QtTest>
@@ -15,7 +14,6 @@ class TestAndroidSupport : public LoggedTest
 private Q_SLOTS:
     void init();
 
-    void isOneConstantProperty();
     void isVisibleWithAnyEntry_data();
     void isVisibleWithAnyEntry();
 };
@@ -33,14 +31,6 @@ void TestAndroidSupport::init()
 {
     Files::remove(daemonPath);
     LoggedTest::init();
-}
-
-void TestAndroidSupport::isOneConstantProperty()
-{
-    const QStringList expected = {
-        QStringLiteral("bool dataDirectoriesVisible readonly constant"),
-    };
-    QCOMPARE(interfaceOf(AndroidSupport::staticMetaObject), expected);
 }
 
 void TestAndroidSupport::isVisibleWithAnyEntry_data()

@@ -4,7 +4,6 @@
 #include "deviceinfo/bluetoothinfo.h"
 #include "files.h"
 #include "files/regularfile.h"
-#include "interfaceof.h"
 #include "loggedtest.h"
 
 #include <QFile>
@@ -17,7 +16,6 @@ class TestBluetoothInfo : public LoggedTest
 private Q_SLOTS:
     void init();
 
-    void isOneConstantProperty();
     void readsTheFirstLine_data();
     void readsTheFirstLine();
     void readsTheFirstLineOfAHugeFile();
@@ -39,14 +37,6 @@ void TestBluetoothInfo::init()
 {
     Files::remove(addressPath);
     LoggedTest::init();
-}
-
-void TestBluetoothInfo::isOneConstantProperty()
-{
-    const QStringList expected = {
-        QStringLiteral("QString adapterAddress readonly constant"),
-    };
-    QCOMPARE(interfaceOf(BluetoothInfo::staticMetaObject), expected);
 }
 
 void TestBluetoothInfo::readsTheFirstLine_data()

@@ -2,7 +2,6 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 #include "deviceinfo/kivinfo.h"
-#include "interfaceof.h"
 #include "loggedtest.h"
 #include "patience.h"
 #include "simulator/coverdaemon.h"
@@ -21,7 +20,6 @@ class TestKivInfo : public LoggedTest
     Q_OBJECT
 
 private Q_SLOTS:
-    void properties();
     void asksTheDaemonTwice();
     void readsBothInEitherOrder();
     void repliesAreTyped_data();
@@ -131,20 +129,6 @@ int withoutABus()
 }
 
 } // namespace
-
-void TestKivInfo::properties()
-{
-    const QStringList expected = {
-        QStringLiteral("QString kivId readonly kivIdChanged()"),
-        QStringLiteral("bool kivReady readonly kivReadyChanged()"),
-        QStringLiteral("signal void kivIdChanged()"),
-        QStringLiteral("signal void kivReadyChanged()"),
-        QStringLiteral("private void slotIdFinished(QDBusPendingCallWatcher*)"),
-        QStringLiteral("private void slotReadyFinished(QDBusPendingCallWatcher*)"),
-        QStringLiteral("private void propertiesChanged(QDBusMessage)"),
-    };
-    QCOMPARE(interfaceOf(KivInfo::staticMetaObject), expected);
-}
 
 void TestKivInfo::asksTheDaemonTwice()
 {

@@ -5,7 +5,6 @@
 #include "deviceinfo/locationconfiguration.h"
 #include "files.h"
 #include "files/regularfile.h"
-#include "interfaceof.h"
 #include "locationswitches.h"
 #include "loggedtest.h"
 
@@ -21,7 +20,6 @@ class TestLocationConfiguration : public LoggedTest
 private Q_SLOTS:
     void init();
 
-    void propertiesAndMethods();
     void hasTheSwitchesOfThePlatform();
 
     void startsWithTheStoredFlag_data();
@@ -108,20 +106,6 @@ void TestLocationConfiguration::init()
     }
     QLocale::setDefault(QLocale(QStringLiteral("fi_FI")));
     LoggedTest::init();
-}
-
-void TestLocationConfiguration::propertiesAndMethods()
-{
-    QCOMPARE(LocationConfiguration::staticMetaObject.superClass()->className(), "LocationSettings");
-    const QStringList expected = {
-        QStringLiteral("QString hereAgreementText readonly constant"),
-        QStringLiteral("QString mlsOnlineAgreementText readonly constant"),
-        QStringLiteral("bool customSettingsEnabled customSettingsEnabledChanged()"),
-        QStringLiteral("signal void customSettingsEnabledChanged()"),
-        QStringLiteral("void saveCustomSettings()"),
-        QStringLiteral("void restoreCustomSettings()"),
-    };
-    QCOMPARE(interfaceOf(LocationConfiguration::staticMetaObject), expected);
 }
 
 void TestLocationConfiguration::hasTheSwitchesOfThePlatform()

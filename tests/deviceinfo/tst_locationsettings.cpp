@@ -2,7 +2,6 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 #include "dconftool.h"
-#include "interfaceof.h"
 #include "locationswitches.h"
 #include "loggedtest.h"
 #include "patience.h"
@@ -19,7 +18,6 @@ class TestLocationSettings : public LoggedTest
 private Q_SLOTS:
     void init();
 
-    void interface();
     void statesAreNumbers();
     void defaults();
     void settersStore();
@@ -78,21 +76,6 @@ void TestLocationSettings::init()
         MGConfItem(key).unset();
     }
     LoggedTest::init();
-}
-
-void TestLocationSettings::interface()
-{
-    const QStringList expected = {
-        QStringLiteral("bool gpsEnabled gpsEnabledChanged()"),
-        QStringLiteral("bool mlsEnabled mlsEnabledChanged()"),
-        QStringLiteral("OnlineAGpsState mlsOnlineState mlsOnlineStateChanged()"),
-        QStringLiteral("OnlineAGpsState hereState hereStateChanged()"),
-        QStringLiteral("signal void gpsEnabledChanged()"),
-        QStringLiteral("signal void mlsEnabledChanged()"),
-        QStringLiteral("signal void mlsOnlineStateChanged()"),
-        QStringLiteral("signal void hereStateChanged()"),
-    };
-    QCOMPARE(interfaceOf(LocationSettings::staticMetaObject), expected);
 }
 
 void TestLocationSettings::statesAreNumbers()

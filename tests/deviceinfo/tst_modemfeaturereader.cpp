@@ -3,7 +3,6 @@
 
 #include "deviceinfo/modemfeaturereader.h"
 #include "files.h"
-#include "interfaceof.h"
 #include "loggedtest.h"
 
 #include <QtTest>
@@ -15,7 +14,6 @@ class TestModemFeatureReader : public LoggedTest
 private Q_SLOTS:
     void init();
 
-    void isOneConstantProperty();
     void readsTheVariant_data();
     void readsTheVariant();
     void readsOnEveryRead();
@@ -33,14 +31,6 @@ void TestModemFeatureReader::init()
 {
     Files::remove(featuresPath);
     LoggedTest::init();
-}
-
-void TestModemFeatureReader::isOneConstantProperty()
-{
-    const QStringList expected = {
-        QStringLiteral("QString variant readonly constant"),
-    };
-    QCOMPARE(interfaceOf(ModemFeatureReader::staticMetaObject), expected);
 }
 
 void TestModemFeatureReader::readsTheVariant_data()

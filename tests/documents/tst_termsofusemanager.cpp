@@ -4,7 +4,6 @@
 #include "documents/termsofusemanager.h"
 #include "files.h"
 #include "files/regularfile.h"
-#include "interfaceof.h"
 #include "loggedtest.h"
 
 #include <QtTest>
@@ -18,7 +17,6 @@ class TestTermsOfUseManager : public LoggedTest
 private Q_SLOTS:
     void init();
 
-    void propertiesAndMethods();
     void vendorPath();
     void hasVendorTermsOfUse();
     void readsNothingBeforeItIsAsked();
@@ -66,19 +64,6 @@ void TestTermsOfUseManager::init()
     Files::remove(platformDirectory);
     Files::remove(vendorDirectory);
     LoggedTest::init();
-}
-
-void TestTermsOfUseManager::propertiesAndMethods()
-{
-    const QStringList expected = {
-        QStringLiteral("bool hasVendorTermsOfUse readonly vendorPathChanged()"),
-        QStringLiteral("QString vendorPath vendorPathChanged()"),
-        QStringLiteral("signal void vendorPathChanged()"),
-        QStringLiteral("QStringList platformTermsOfUse(QString)"),
-        QStringLiteral("QStringList vendorTermsOfUse(QString)"),
-        QStringLiteral("QStringList vendorTermsSummary(QString)"),
-    };
-    QCOMPARE(interfaceOf(TermsOfUseManager::staticMetaObject), expected);
 }
 
 void TestTermsOfUseManager::vendorPath()

@@ -4,7 +4,6 @@
 #include "documents/textfilereader.h"
 #include "files.h"
 #include "files/regularfile.h"
-#include "interfaceof.h"
 #include "loggedtest.h"
 
 #include <QTemporaryDir>
@@ -22,8 +21,6 @@ class TestTextFileReader : public LoggedTest
 private Q_SLOTS:
     void init();
     void cleanup();
-
-    void hasTwoMethods();
 
     void readContent_data();
     void readContent();
@@ -86,15 +83,6 @@ void TestTextFileReader::cleanup()
 {
     LoggedTest::cleanup();
     m_directory.reset();
-}
-
-void TestTextFileReader::hasTwoMethods()
-{
-    const QStringList expected = {
-        QStringLiteral("QString readContent(QString)"),
-        QStringLiteral("QString collate(QUrl,QString,QString)"),
-    };
-    QCOMPARE(interfaceOf(TextFileReader::staticMetaObject), expected);
 }
 
 void TestTextFileReader::readContent_data()

@@ -2,7 +2,6 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 #include "eventswidgets/titlesview.h"
-#include "interfaceof.h"
 #include "loggedtest.h"
 #include "texts.h"
 #include "words.h"
@@ -24,7 +23,6 @@ class TestTitlesView : public LoggedTest
 private Q_SLOTS:
     void init();
 
-    void interface();
     void isEmptyAtFirst();
 
     // The model
@@ -190,24 +188,6 @@ void TestTitlesView::init()
 {
     QLocale::setDefault(QLocale("en_US"_s));
     LoggedTest::init();
-}
-
-void TestTitlesView::interface()
-{
-    const QStringList members{"QObject* model modelChanged()"_s,
-                              "QString matchRole matchRoleChanged()"_s,
-                              "QVariant match matchChanged()"_s,
-                              "QString role roleChanged()"_s,
-                              "QString value readonly valueChanged()"_s,
-                              "QStringList values readonly valueChanged()"_s,
-                              "signal void modelChanged()"_s,
-                              "signal void matchRoleChanged()"_s,
-                              "signal void matchChanged()"_s,
-                              "signal void roleChanged()"_s,
-                              "signal void valueChanged()"_s,
-                              "void update()"_s,
-                              "QString joined(QStringList)"_s};
-    QCOMPARE(interfaceOf(TitlesView::staticMetaObject), members);
 }
 
 void TestTitlesView::isEmptyAtFirst()

@@ -4,7 +4,6 @@
 #include "cardhelper.h"
 #include "files.h"
 #include "formattertest.h"
-#include "interfaceof.h"
 #include "ownprocess.h"
 #include "simulator/diskservicepeer.h"
 #include "usedupdescriptors.h"
@@ -359,28 +358,9 @@ void TestMemoryCardFormatter::interface()
                                    QStringLiteral("commandFinished(int,QProcess::ExitStatus)"),
                                    QStringLiteral("fileRemoverFinished()"),
                                    QStringLiteral("fileRemoverError()")};
-    QStringList members = {
-        QStringLiteral("Status status readonly statusChanged()"),
-        QStringLiteral("QString deviceName deviceNameChanged()"),
-        QStringLiteral("QString devicePath devicePathChanged()"),
-        QStringLiteral("QString filesystemType readonly filesystemTypeChanged()"),
-        QStringLiteral("QStringList supportedFormatTypes readonly constant"),
-        QStringLiteral("bool busy readonly busyChanged()"),
-        QStringLiteral("signal void statusChanged()"),
-        QStringLiteral("signal void deviceNameChanged()"),
-        QStringLiteral("signal void devicePathChanged()"),
-        QStringLiteral("signal void filesystemTypeChanged()"),
-        QStringLiteral("signal void busyChanged()"),
-        QStringLiteral("signal void mountError(MountError)"),
-        QStringLiteral("signal void unmountError(MountError)")};
     for (const QString &name : slotNames) {
         QVERIFY2(meta.indexOfSlot(name.toLatin1()) >= 0, qPrintable(name));
-        members.append(QStringLiteral("private void ") + name);
     }
-    for (const char *name : {"format(QString)", "removeAllFiles()", "mount()", "unmount()"}) {
-        members.append(QStringLiteral("void ") + QLatin1String(name));
-    }
-    QCOMPARE(interfaceOf(meta), members);
 }
 
 void TestMemoryCardFormatter::enumKeysInQml()

@@ -9,6 +9,7 @@
 #include "moduletypes.h"
 
 #include <QJsonObject>
+#include <QMetaProperty>
 #include <QPluginLoader>
 #include <QQmlComponent>
 #include <QQmlEngine>
@@ -27,6 +28,7 @@ private Q_SLOTS:
     void oneInstance();
     void typesAreCreatable_data();
     void typesAreCreatable();
+    void propertiesAnnounceTheirChanges();
     void oneTextFileReaderPerEngine();
     void theTextFileReaderIsNotCreatable();
     void platformSwitchesAreReachable();
@@ -165,6 +167,59 @@ void TestPlugin::typesAreCreatable()
     const auto object = create(&engine, QByteArray(QTest::currentDataTag()) + " {}");
     QVERIFY(object != nullptr);
     QCOMPARE(object->metaObject()->className(), className.constData());
+}
+
+// The file plugins.qmltypes says everything else about the types, and another test compares it with
+// the module.
+void TestPlugin::propertiesAnnounceTheirChanges()
+{
+    QQmlEngine engine;
+    QByteArray properties;
+    for (const ModuleType &type : ModuleType::all()) {
+        const QByteArray declaration = type.isSingleton
+            ? "QtObject { property QtObject it: " + type.name.toUtf8() + " }"
+            : "QtObject { property QtObject it: " + type.name.toUtf8() + " { } }";
+        const auto document = create(&engine, declaration);
+        QVERIFY(document != nullptr);
+        const auto *object = document->property("it").value<QObject *>();
+        const QMetaObject *meta = object->metaObject();
+        for (int i = 1; i < meta->propertyCount(); ++i) { // without objectName
+            const QMetaProperty property = meta->property(i);
+            const QByteArray signal =
+                property.isConstant() ? QByteArray("constant") : property.notifySignal().name();
+            properties += type.name.toUtf8() + '.' + property.name() + ": " + signal + '\n';
+        }
+    }
+    const char *const expected =
+        "AndroidSupport.dataDirectoriesVisible: constant\n"
+        "BluetoothInfo.adapterAddress: constant\n"
+        "KivInfo.kivId: kivIdChanged\n"
+        "KivInfo.kivReady: kivReadyChanged\n"
+        "LocationConfiguration.gpsEnabled: gpsEnabledChanged\n"
+        "LocationConfiguration.mlsEnabled: mlsEnabledChanged\n"
+        "LocationConfiguration.mlsOnlineState: mlsOnlineStateChanged\n"
+        "LocationConfiguration.hereState: hereStateChanged\n"
+        "LocationConfiguration.hereAgreementText: constant\n"
+        "LocationConfiguration.mlsOnlineAgreementText: constant\n"
+        "LocationConfiguration.customSettingsEnabled: customSettingsEnabledChanged\n"
+        "MemoryCardFormatter.status: statusChanged\n"
+        "MemoryCardFormatter.deviceName: deviceNameChanged\n"
+        "MemoryCardFormatter.devicePath: devicePathChanged\n"
+        "MemoryCardFormatter.filesystemType: filesystemTypeChanged\n"
+        "MemoryCardFormatter.supportedFormatTypes: constant\n"
+        "MemoryCardFormatter.busy: busyChanged\n"
+        "ModemFeatures.variant: constant\n"
+        "QuickActionsModel.showPotential: showPotentialChanged\n"
+        "QuickActionsModel.count: countChanged\n"
+        "TermsOfUseManager.hasVendorTermsOfUse: vendorPathChanged\n"
+        "TermsOfUseManager.vendorPath: vendorPathChanged\n"
+        "TitlesView.model: modelChanged\n"
+        "TitlesView.matchRole: matchRoleChanged\n"
+        "TitlesView.match: matchChanged\n"
+        "TitlesView.role: roleChanged\n"
+        "TitlesView.value: valueChanged\n"
+        "TitlesView.values: valueChanged\n";
+    QCOMPARE(properties, QByteArray(expected));
 }
 
 void TestPlugin::oneTextFileReaderPerEngine()

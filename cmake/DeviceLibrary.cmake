@@ -26,7 +26,7 @@ function(use_device_library class variable)
     set(CMAKE_TRY_COMPILE_TARGET_TYPE STATIC_LIBRARY)
     try_compile(compiles ${CMAKE_CURRENT_BINARY_DIR}/check${name}
         SOURCES ${CMAKE_CURRENT_SOURCE_DIR}/check${name}.cpp
-        LINK_LIBRARIES PkgConfig::${class} Qt5::Core
+        LINK_LIBRARIES PkgConfig::${class} Qt::Core
         CXX_STANDARD 17 CXX_STANDARD_REQUIRED ON
         OUTPUT_VARIABLE output)
     set(missing)

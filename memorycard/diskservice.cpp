@@ -3,26 +3,30 @@
 
 #include "diskservice.h"
 
+#include "files/literals.h"
+
 #include <QDBusConnection>
 #include <QDBusError>
 #include <QMetaEnum>
 #include <QVariantMap>
 
+#include <chrono>
+
 namespace {
 
-const QLatin1String service("org.freedesktop.UDisks2");
-const QLatin1String objectPath("/org/freedesktop/UDisks2/block_devices/%1");
-const QLatin1String interface("org.freedesktop.UDisks2.Filesystem");
-const QLatin1String mountMethod("Mount");
-const QLatin1String unmountMethod("Unmount");
-const QLatin1String fileSystemTypeOption("fstype");
+constexpr QLatin1String service = "org.freedesktop.UDisks2"_L1;
+constexpr QLatin1String objectPath = "/org/freedesktop/UDisks2/block_devices/%1"_L1;
+constexpr QLatin1String interface = "org.freedesktop.UDisks2.Filesystem"_L1;
+constexpr QLatin1String mountMethod = "Mount"_L1;
+constexpr QLatin1String unmountMethod = "Unmount"_L1;
+constexpr QLatin1String fileSystemTypeOption = "fstype"_L1;
 
 // The service writes out all cached data before it replies, which takes long on a slow card.
-constexpr int requestTimeout = 5 * 60 * 1000; // ms
+constexpr std::chrono::milliseconds requestTimeout = std::chrono::minutes(5);
 
 // The keys of the error codes are the names of the service's errors with another prefix.
-const QLatin1String errorPrefix("org.freedesktop.UDisks2.Error.");
-const QLatin1String keyPrefix("Error");
+constexpr QLatin1String errorPrefix = "org.freedesktop.UDisks2.Error."_L1;
+constexpr char keyPrefix[] = "Error";
 
 QDBusMessage createCall(const QString &deviceName, QLatin1String method, const QString &option)
 {
@@ -54,16 +58,17 @@ QDBusPendingCall DiskService::send(const QDBusMessage &call)
         return QDBusPendingCall::fromError(
             {QDBusError::Disconnected, QStringLiteral("Not connected to the system bus")});
     }
-    return bus.asyncCall(call, requestTimeout);
+    return bus.asyncCall(call, int(requestTimeout.count()));
 }
 
 std::optional<MemoryCardFormatter::MountError> DiskService::errorCode(const QString &errorName)
 {
-    const auto codes = QMetaEnum::fromType<MemoryCardFormatter::MountError>();
-    for (int i = 0; i < codes.keyCount(); ++i) {
-        if (errorName == errorPrefix + QLatin1String(codes.key(i)).mid(keyPrefix.size())) {
-            return MemoryCardFormatter::MountError(codes.value(i));
-        }
+    if (!errorName.startsWith(errorPrefix)) {
+        return {};
     }
-    return {};
+    const QByteArray key = keyPrefix + errorName.mid(errorPrefix.size()).toLatin1();
+    bool isKnown = false;
+    const int value =
+        QMetaEnum::fromType<MemoryCardFormatter::MountError>().keyToValue(key, &isKnown);
+    return isKnown ? std::optional(MemoryCardFormatter::MountError(value)) : std::nullopt;
 }

@@ -5,13 +5,14 @@
 
 #include "diskservice.h"
 #include "fileremover.h"
-#include "processlimits.h"
+#include "files/literals.h"
 
 #include <QDBusError>
 #include <QDBusPendingCall>
 #include <QDBusPendingCallWatcher>
 #include <QFileInfo>
 #include <QLoggingCategory>
+#include <QPointer>
 
 #include <algorithm>
 #include <memory>
@@ -21,24 +22,14 @@ namespace {
 
 Q_LOGGING_CATEGORY(lcMemoryCardLog, "org.tarnwickos.settings.memorycard", QtWarningMsg)
 
-const QLatin1String helperProgram("/usr/libexec/sdcardhelper");
-const QLatin1String helperFormatVfat("format_vfat");
-const QLatin1String helperFormatExt4("format_ext4");
-const QLatin1String helperProbe("probe");
+constexpr QLatin1String helperFormatVfat = "format_vfat"_L1;
+constexpr QLatin1String helperFormatExt4 = "format_ext4"_L1;
+constexpr QLatin1String helperProbe = "probe"_L1;
 
-const QLatin1String vfat("vfat");
-const QLatin1String ext4("ext4");
-const QLatin1String mkfsVfat("/sbin/mkfs.vfat");
-const QLatin1String mkfsExt4("/sbin/mkfs.ext4");
-
-// Qt 5.15 starts a plain QProcess with clone(). If clone() fails, Qt treats the process as running
-// with the process id -1: killing it would kill all processes of the user. Qt starts a subclass
-// with fork() instead, and reports a failure of fork().
-class HelperProcess : public QProcess
-{
-public:
-    using QProcess::QProcess;
-};
+constexpr QLatin1String vfat = "vfat"_L1;
+constexpr QLatin1String ext4 = "ext4"_L1;
+constexpr QLatin1String mkfsVfat = "/sbin/mkfs.vfat"_L1;
+constexpr QLatin1String mkfsExt4 = "/sbin/mkfs.ext4"_L1;
 
 } // namespace
 
@@ -85,11 +76,12 @@ public:
     removeAllFiles() finds the card by its \l devicePath in \c{/etc/mtab}.
 
     A failed command ends the sequence with the status \c Error, in which every operation is
-    accepted. Formatting, removing files and probing use the \l devicePath and the type of their
+    accepted. Everything that waits in the queue is dropped, except the probe of a new \l devicePath.
+    Formatting, removing files and probing use the \l devicePath and the type of their
     request; mounting and unmounting use the \l deviceName that is set when the step starts.
-    The formatter logs messages in the category \c{org.tarnwickos.settings.memorycard}. Why files
-    could not be removed is logged as a warning in the category
-    \c{com.marlo.settings.system.memorycard}.
+    The formatter logs messages in the category \c{org.tarnwickos.settings.memorycard}. One warning
+    in the category \c{com.marlo.settings.system.memorycard} says why files could not be removed, or
+    how the helper failed: its exit code or signal, and the first line of its standard error.
 
     \section1 When an operation has ended
 
@@ -108,9 +100,8 @@ public:
     \c Formatting, \c RemovingFiles and \c Probing are set when the work begins. \c Unmounting and
     \c Mounting are set after the disk service has reported success. Until then the status is the
     previous one, and for the first step of a sequence \l busy is \c false. Operations that are
-    requested meanwhile are queued and run afterwards. If the request to the disk service fails,
-    they are dropped, except the probe of a new \l devicePath. A page must remember that it has
-    requested an operation.
+    requested meanwhile are queued and run afterwards. A page must remember that it has requested an
+    operation.
 
     \section2 Formatting needs a mounted card
     On a card that is not mounted, format() ends with \c ErrorNotMounted, so only a card that is
@@ -148,23 +139,10 @@ public:
     to finish.
 */
 
-MemoryCardFormatter::~MemoryCardFormatter()
+MemoryCardFormatter::MemoryCardFormatter(QObject *parent) : QObject(parent), m_helper(this)
 {
-    if (m_process == nullptr || m_process->state() == QProcess::NotRunning) {
-        return;
-    }
-    // If m_process were deleted with this object, it would kill the helper and wait for it. A card
-    // that is half formatted cannot be used, so a helper that formats continues, even after the
-    // application has ended.
-    m_process->setParent(nullptr);
-    connect(m_process, &QProcess::stateChanged, m_process, [process = m_process](auto state) {
-        if (state == QProcess::NotRunning) {
-            process->deleteLater();
-        }
-    });
-    if (m_running != Formatting) {
-        m_process->kill();
-    }
+    connect(&m_helper, &HelperProcess::failedToStart, this, &MemoryCardFormatter::commandError);
+    connect(&m_helper, &HelperProcess::finished, this, &MemoryCardFormatter::commandFinished);
 }
 
 /*!
@@ -183,8 +161,11 @@ MemoryCardFormatter::~MemoryCardFormatter()
 /*!
     \qmlproperty string MemoryCardFormatter::deviceName
 
-    The kernel name of the block device, such as \c mmcblk1p1, which the disk service mounts and
-    unmounts. It can be set at any time, but must not be empty during an operation.
+    The name of the block device in the disk service's object path, such as \c mmcblk1p1, which the
+    disk service mounts and unmounts. In this name, each byte of the kernel name that is not an
+    ASCII letter, a digit or an underscore is an underscore and two lower-case hexadecimal digits:
+    for \c dm-0, set \c dm_2d0. With \c dm-0 itself, every request to the disk service fails. The
+    name can be set at any time, but must not be empty during an operation.
 */
 void MemoryCardFormatter::setDeviceName(const QString &name)
 {
@@ -204,13 +185,20 @@ void MemoryCardFormatter::setDeviceName(const QString &name)
 */
 void MemoryCardFormatter::setDevicePath(const QString &path)
 {
-    if (m_devicePath == path || isRefused("Cannot change device path")) {
+    if (m_devicePath == path) {
+        return;
+    }
+    if (busy()) {
+        warnThatBusy("Cannot change device path");
         return;
     }
     m_devicePath = path;
+    const QPointer<MemoryCardFormatter> self(this);
     Q_EMIT devicePathChanged();
-    enqueue({Probing});
-    startIfNothingRuns();
+    if (self) {
+        enqueue({Command::Probe});
+        startIfNothingRuns();
+    }
 }
 
 /*!
@@ -261,9 +249,14 @@ QStringList MemoryCardFormatter::supportedFormatTypes() const
 */
 void MemoryCardFormatter::format(const QString &type)
 {
-    if (!isRefused("format() called") && requireValue("devicePath", m_devicePath)
-        && requireValue("type", type)) {
-        startSequence({Unmounting, Formatting, Mounting}, type);
+    if (busy()) {
+        warnThatBusy("format() called");
+    } else if (m_devicePath.isEmpty()) {
+        failWithout("devicePath");
+    } else if (type.isEmpty()) {
+        failWithout("type");
+    } else {
+        startSequence({Command::Unmount, Command::Format, Command::Mount}, type);
     }
 }
 
@@ -278,8 +271,12 @@ void MemoryCardFormatter::format(const QString &type)
 */
 void MemoryCardFormatter::removeAllFiles()
 {
-    if (!isRefused("removeAllFiles() called") && requireValue("devicePath", m_devicePath)) {
-        startSequence({Mounting, RemovingFiles});
+    if (busy()) {
+        warnThatBusy("removeAllFiles() called");
+    } else if (m_devicePath.isEmpty()) {
+        failWithout("devicePath");
+    } else {
+        startSequence({Command::Mount, Command::RemoveFiles});
     }
 }
 
@@ -291,15 +288,19 @@ void MemoryCardFormatter::removeAllFiles()
 */
 void MemoryCardFormatter::mount()
 {
-    if (!isRefused("mount() called")) {
-        startSequence({Mounting});
+    if (busy()) {
+        warnThatBusy("mount() called");
+    } else {
+        startSequence({Command::Mount});
     }
 }
 
 void MemoryCardFormatter::unmount()
 {
-    if (!isRefused("unmount() called")) {
-        startSequence({Unmounting});
+    if (busy()) {
+        warnThatBusy("unmount() called");
+    } else {
+        startSequence({Command::Unmount});
     }
 }
 
@@ -345,27 +346,25 @@ void MemoryCardFormatter::unmount()
     of \a error are those of mountError().
 */
 
-void MemoryCardFormatter::commandError(QProcess::ProcessError error)
+void MemoryCardFormatter::commandError(QProcess::ProcessError /*error*/)
 {
-    // Handles only failed starts: commandFinished() handles the end of a helper that has started,
-    // even a crash. Qt reports some failed starts twice: the second report must not hit the next
-    // command.
-    const bool startsHelper = m_running == Formatting || m_running == Probing;
-    if (error == QProcess::FailedToStart && startsHelper
-        && m_process->state() == QProcess::NotRunning) {
-        fail();
-    }
+    fail();
 }
 
 void MemoryCardFormatter::commandFinished(int code, QProcess::ExitStatus status)
 {
-    if (m_running == Probing && status == QProcess::NormalExit) {
-        const QByteArray output = m_process->readAllStandardOutput().trimmed();
-        const QString filesystemType = QString::fromLatin1(output);
+    const QPointer<MemoryCardFormatter> self(this);
+    if (m_running == Command::Probe && status == QProcess::NormalExit) {
+        // As a C string: a NUL ends the type.
+        const QByteArray output = m_helper.takeOutput().trimmed();
+        const QString filesystemType = QString::fromLatin1(output.constData());
         if (m_filesystemType != filesystemType) {
             m_filesystemType = filesystemType;
             Q_EMIT filesystemTypeChanged();
         }
+    }
+    if (!self) {
+        return;
     }
     if (code != 0 || status != QProcess::NormalExit) {
         fail();
@@ -384,22 +383,15 @@ void MemoryCardFormatter::fileRemoverError()
     fail();
 }
 
-bool MemoryCardFormatter::isRefused(const char *request) const
+void MemoryCardFormatter::warnThatBusy(const char *request) const
 {
-    if (busy()) {
-        qCWarning(lcMemoryCardLog) << request << "when not idle. Status is" << m_status;
-    }
-    return busy();
+    qCWarning(lcMemoryCardLog) << request << "when not idle. Status is" << m_status;
 }
 
-bool MemoryCardFormatter::requireValue(const char *name, const QString &value)
+void MemoryCardFormatter::failWithout(const char *value)
 {
-    if (!value.isEmpty()) {
-        return true;
-    }
-    qCWarning(lcMemoryCardLog) << name << "is empty.";
+    qCWarning(lcMemoryCardLog) << value << "is empty.";
     setStatus(Error);
-    return false;
 }
 
 void MemoryCardFormatter::setStatus(Status status)
@@ -410,111 +402,96 @@ void MemoryCardFormatter::setStatus(Status status)
     const bool wasBusy = busy();
     m_status = status;
     qCDebug(lcMemoryCardLog) << "New status" << status;
+    const QPointer<MemoryCardFormatter> self(this);
     Q_EMIT statusChanged();
-    if (busy() != wasBusy) {
+    if (self && busy() != wasBusy) {
         Q_EMIT busyChanged();
     }
 }
 
-void MemoryCardFormatter::enqueue(std::initializer_list<Status> commands, const QString &formatType)
+void MemoryCardFormatter::enqueue(std::initializer_list<Command> commands,
+                                  const QString &formatType)
 {
-    for (const Status command : commands) {
-        m_commands.enqueue({command, m_devicePath, formatType});
+    for (const Command command : commands) {
+        m_steps.enqueue({command, m_devicePath, formatType});
     }
 }
 
-void MemoryCardFormatter::startSequence(std::initializer_list<Status> commands,
+void MemoryCardFormatter::startSequence(std::initializer_list<Command> commands,
                                         const QString &formatType)
 {
     enqueue(commands, formatType);
+    const QPointer<MemoryCardFormatter> self(this);
     // busy has not changed yet, but users rely on the signal.
     Q_EMIT busyChanged();
-    startIfNothingRuns();
+    if (self) {
+        startIfNothingRuns();
+    }
 }
 
 void MemoryCardFormatter::startIfNothingRuns()
 {
-    if (m_running == Idle) {
+    if (!m_running) {
         doNextCommand();
     }
 }
 
 void MemoryCardFormatter::doNextCommand()
 {
-    if (m_commands.isEmpty()) {
+    m_startsAfterError = false;
+    if (m_steps.isEmpty()) {
         setStatus(Idle);
         return;
     }
-    const Command command = m_commands.dequeue();
-    if (command.command == Unmounting || command.command == Mounting) {
-        startMountOperation(command.command);
-        return;
-    }
-    if (m_process == nullptr) {
-        m_process = new HelperProcess(this);
-        m_process->setStandardErrorFile(QProcess::nullDevice());
-        // Queued: a QProcess cannot be started again while it reports that its start failed.
-        connect(m_process, &QProcess::errorOccurred, this, &MemoryCardFormatter::commandError,
-                Qt::QueuedConnection);
-        connect(m_process, QOverload<int, QProcess::ExitStatus>::of(&QProcess::finished), this,
-                &MemoryCardFormatter::commandFinished);
-    }
-    switch (command.command) {
-    case Formatting:
-        startFormatting(command);
+    const Step step = m_steps.dequeue();
+    switch (step.command) {
+    case Command::Unmount:
+    case Command::Mount:
+        startMountOperation(step.command);
         break;
-    case RemovingFiles:
-        startRemovingFiles(command);
+    case Command::Format:
+        startFormatting(step);
         break;
-    case Probing:
-        startProbing(command);
+    case Command::Probe:
+        startProbing(step);
+        break;
+    case Command::RemoveFiles:
+        startRemovingFiles(step);
         break;
     default:
-        qCWarning(lcMemoryCardLog) << "Unknown command" << command.command;
+        qCWarning(lcMemoryCardLog) << "Unknown command" << Status(step.command);
         break;
     }
 }
 
-void MemoryCardFormatter::startFormatting(const Command &command)
+void MemoryCardFormatter::startFormatting(const Step &step)
 {
     QStringList arguments;
     // Any other type has no command word, on purpose: the helper's exit code decides.
-    if (command.formatType == vfat) {
+    if (step.formatType == vfat) {
         arguments.append(helperFormatVfat);
-    } else if (command.formatType == ext4) {
+    } else if (step.formatType == ext4) {
         arguments.append(helperFormatExt4);
     }
-    arguments.append(QFileInfo(command.devicePath).fileName());
-    // Nobody reads the output. A broken pipe would end a helper that outlives the application.
-    m_process->setStandardOutputFile(QProcess::nullDevice());
-    runHelper(Formatting, arguments);
-}
-
-void MemoryCardFormatter::startProbing(const Command &command)
-{
-    m_process->setStandardOutputFile(QString());
-    runHelper(Probing, {helperProbe, QFileInfo(command.devicePath).fileName()});
-}
-
-void MemoryCardFormatter::runHelper(Status command, const QStringList &arguments)
-{
-    m_running = command;
-    if (!ProcessLimits::hasDescriptorsLeft()) {
-        // Reported later, as QProcess does when it finds that the helper cannot start.
-        QMetaObject::invokeMethod(
-            this, [this] { commandError(QProcess::FailedToStart); }, Qt::QueuedConnection);
-        return;
-    }
-    m_process->start(helperProgram, arguments);
-    // A missing program is reported later. Until then the process is starting.
-    if (m_process->state() != QProcess::NotRunning) {
-        setStatus(command);
+    arguments.append(QFileInfo(step.devicePath).fileName());
+    m_running = step.command;
+    if (m_helper.start(HelperProcess::Kind::Formatter, arguments)) {
+        setStatus(Formatting);
     }
 }
 
-void MemoryCardFormatter::startMountOperation(Status command)
+void MemoryCardFormatter::startProbing(const Step &step)
 {
-    const bool mounts = command == Mounting;
+    const QString partition = QFileInfo(step.devicePath).fileName();
+    m_running = step.command;
+    if (m_helper.start(HelperProcess::Kind::Prober, {helperProbe, partition})) {
+        setStatus(Probing);
+    }
+}
+
+void MemoryCardFormatter::startMountOperation(Command command)
+{
+    const bool mounts = command == Command::Mount;
     if (m_deviceName.isEmpty()) {
         // The verbs are swapped on purpose: programs that read logs expect exactly these lines.
         // The status and the rest of the queue do not change, which is intended, too.
@@ -536,9 +513,13 @@ void MemoryCardFormatter::mountOperationFinished(const QString &method,
                                                  QDBusPendingCallWatcher *reply)
 {
     reply->deleteLater();
+    const QPointer<MemoryCardFormatter> self(this);
+    const bool mounts = m_running == Command::Mount;
     if (!reply->isError()) {
-        setStatus(m_running);
-        finishCommand();
+        setStatus(mounts ? Mounting : Unmounting);
+        if (self) {
+            finishCommand();
+        }
         return;
     }
     const QString name = reply->error().name();
@@ -548,28 +529,25 @@ void MemoryCardFormatter::mountOperationFinished(const QString &method,
     const bool isForgiven =
         code && (*code == ErrorAlreadyMounted || *code == ErrorAlreadyUnmounting);
     if (!isForgiven) {
-        // Dropped before any signal is emitted: requests made from handlers start a new sequence. A
-        // path that was set during the request is still probed.
-        const auto isNoProbe = [](const Command &command) { return command.command != Probing; };
-        m_commands.erase(std::remove_if(m_commands.begin(), m_commands.end(), isNoProbe),
-                         m_commands.end());
+        // Before any signal is emitted: requests made from handlers start a new sequence.
+        dropSequence();
     }
-    if (code && m_running == Mounting) {
+    if (code && mounts) {
         Q_EMIT mountError(*code);
     } else if (code) {
         Q_EMIT unmountError(*code);
     }
-    if (isForgiven) {
+    if (self && isForgiven) {
         finishCommand();
-    } else {
+    } else if (self) {
         endInError();
     }
 }
 
-void MemoryCardFormatter::startRemovingFiles(const Command &command)
+void MemoryCardFormatter::startRemovingFiles(const Step &step)
 {
-    m_running = RemovingFiles;
-    auto remover = std::make_unique<FileRemover>(command.devicePath);
+    m_running = step.command;
+    auto remover = std::make_unique<FileRemover>(step.devicePath);
     // Queued: QThreadPool::clear() deletes removers on this thread, which then emit error().
     connect(remover.get(), &FileRemover::completed, this, &MemoryCardFormatter::fileRemoverFinished,
             Qt::QueuedConnection);
@@ -582,21 +560,29 @@ void MemoryCardFormatter::startRemovingFiles(const Command &command)
 
 void MemoryCardFormatter::finishCommand()
 {
-    m_running = Idle;
+    m_running.reset();
     doNextCommand();
 }
 
 void MemoryCardFormatter::fail()
 {
-    m_commands.clear();
+    dropSequence();
     endInError();
+}
+
+void MemoryCardFormatter::dropSequence()
+{
+    const auto isNoProbe = [](const Step &step) { return step.command != Command::Probe; };
+    m_steps.erase(std::remove_if(m_steps.begin(), m_steps.end(), isNoProbe), m_steps.end());
 }
 
 void MemoryCardFormatter::endInError()
 {
-    m_running = Idle;
+    m_running.reset();
+    m_startsAfterError = !m_steps.isEmpty();
+    const QPointer<MemoryCardFormatter> self(this);
     setStatus(Error);
-    if (!m_commands.isEmpty()) {
-        startIfNothingRuns();
+    if (self && m_startsAfterError) {
+        doNextCommand();
     }
 }

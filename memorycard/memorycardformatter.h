@@ -4,6 +4,8 @@
 #ifndef MEMORYCARDFORMATTER_H
 #define MEMORYCARDFORMATTER_H
 
+#include "helperprocess.h"
+
 #include <QObject>
 #include <QProcess>
 #include <QQueue>
@@ -11,6 +13,7 @@
 #include <QStringList>
 
 #include <initializer_list>
+#include <optional>
 
 class QDBusPendingCallWatcher;
 
@@ -32,7 +35,6 @@ class MemoryCardFormatter : public QObject
     Q_PROPERTY(bool busy READ busy NOTIFY busyChanged)
 
 public:
-    // The states of the formatter. Those between Idle and Error are also the commands of its queue.
     enum Status {
         Idle,
         Unmounting,
@@ -64,8 +66,7 @@ public:
     };
     Q_ENUM(MountError)
 
-    using QObject::QObject;
-    ~MemoryCardFormatter() override;
+    explicit MemoryCardFormatter(QObject *parent = nullptr);
 
     Status status() const { return m_status; }
     QString deviceName() const { return m_deviceName; }
@@ -98,39 +99,50 @@ private Q_SLOTS:
     void fileRemoverError();
 
 private:
-    // The path and the type of the request: devicePath may change before the command starts, and
-    // the formatter must never format or empty a card other than the requested one.
-    struct Command {
-        Status command;
+    // Each has the number of the status that it leads to.
+    enum class Command {
+        Unmount = Unmounting,
+        Format = Formatting,
+        RemoveFiles = RemovingFiles,
+        Mount = Mounting,
+        Probe = Probing,
+    };
+
+    // The path and the type of the request: devicePath may change before the step starts, and the
+    // formatter must never format or empty a card other than the requested one.
+    struct Step {
+        Command command;
         QString devicePath;
         QString formatType;
     };
 
-    // Both warn. A missing value also leads to the status Error.
-    bool isRefused(const char *request) const;
-    bool requireValue(const char *name, const QString &value);
+    void warnThatBusy(const char *request) const;
+    void failWithout(const char *value);
     void setStatus(Status status);
-    void enqueue(std::initializer_list<Status> commands, const QString &formatType = QString());
-    void startSequence(std::initializer_list<Status> commands,
+    void enqueue(std::initializer_list<Command> commands, const QString &formatType = QString());
+    void startSequence(std::initializer_list<Command> commands,
                        const QString &formatType = QString());
     void startIfNothingRuns();
     void doNextCommand();
-    void startFormatting(const Command &command);
-    void startProbing(const Command &command);
-    void runHelper(Status command, const QStringList &arguments);
-    void startMountOperation(Status command);
+    void startFormatting(const Step &step);
+    void startProbing(const Step &step);
+    void startMountOperation(Command command);
     void mountOperationFinished(const QString &method, QDBusPendingCallWatcher *reply);
-    void startRemovingFiles(const Command &command);
+    void startRemovingFiles(const Step &step);
     void finishCommand();
     void fail();
+    // Drops every step that waits, except probes: each new path is probed.
+    void dropSequence();
     void endInError();
 
-    QProcess *m_process = nullptr;
-    QQueue<Command> m_commands;
+    HelperProcess m_helper;
+    QQueue<Step> m_steps;
     Status m_status = Idle;
-    // The command that is under way, or Idle. The status of a mount command changes only
-    // afterwards.
-    Status m_running = Idle;
+    // The command that is under way. The status of a mount command changes only afterwards.
+    std::optional<Command> m_running;
+    // Whether the queue continues when the handlers of Error have returned. Requests that they make
+    // start by themselves, and one that was refused must not leave its queue to be run.
+    bool m_startsAfterError = false;
     QString m_deviceName;
     QString m_devicePath;
     QString m_filesystemType;

@@ -37,6 +37,7 @@ private Q_SLOTS:
 
     void helperThatWritesAHundredMegabytes();
     void helperThatClosesItsOutputFirst();
+    void helperThatReportsAtLength();
     void helperThatNeverEnds();
 
 private:
@@ -245,6 +246,17 @@ void TestCardFaults::helperThatClosesItsOutputFirst()
     startProbing(device, "exec >&-\nsleep 0.5\nexit 1\n");
     TRY_COMPARE(m_formatter->status(), Formatter::Error);
     QCOMPARE(m_formatter->filesystemType(), QString());
+    QCOMPARE(takeLog(), helperEnded("probe", "testcard1", "exited with 1 and the error \"\""));
+}
+
+void TestCardFaults::helperThatReportsAtLength()
+{
+    // A warning has only the front of the first line.
+    startProbing(otherDevice, "head -c 10000000 /dev/zero | tr '\\0' x >&2\nexit 3\n");
+    TRY_COMPARE(m_formatter->status(), Formatter::Error);
+    QCOMPARE(takeLog(),
+             helperEnded("probe", "testcard2",
+                         "exited with 3 and the error \"" + QByteArray(200, 'x') + '"'));
 }
 
 void TestCardFaults::helperThatNeverEnds()
@@ -260,6 +272,8 @@ void TestCardFaults::helperThatNeverEnds()
     QVERIFY(pid > 1);
     QCOMPARE(kill(pid, SIGKILL), 0);
     TRY_COMPARE(m_formatter->status(), Formatter::Error);
+    QCOMPARE(takeLog(),
+             helperEnded("probe", "testcard2", "was ended by signal 9 with the error \"\""));
     startProbing(device, "echo vfat\n");
     TRY_EVENTS("path /dev/testcard1, Probing, busy, type vfat, Idle, not busy");
 }

@@ -54,6 +54,13 @@ QByteArray FormatterTest::notEmptied(const QByteArray &path, const QByteArray &r
     return "warning [com.marlo.settings.system.memorycard] Cannot empty \"" + path + "\" " + reason;
 }
 
+QByteArray FormatterTest::helperEnded(const QByteArray &command, const QByteArray &partition,
+                                      const QByteArray &end)
+{
+    return "warning [com.marlo.settings.system.memorycard] \"/usr/libexec/sdcardhelper\" (\""
+        + command + "\", \"" + partition + "\") " + end;
+}
+
 QByteArray FormatterTest::diskServiceError(const QByteArray &method, const QByteArray &name)
 {
     return warning('"' + method + "\" error: org.freedesktop.UDisks2.Error." + name);

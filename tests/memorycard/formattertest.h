@@ -37,6 +37,10 @@ protected:
     static QByteArray warning(const QByteArray &text);
     // What is logged when the files of the card cannot be removed.
     static QByteArray notEmptied(const QByteArray &path, const QByteArray &reason);
+    // What is logged when a helper that was started for the partition with "probe" or another
+    // command has ended badly.
+    static QByteArray helperEnded(const QByteArray &command, const QByteArray &partition,
+                                  const QByteArray &end);
     // What the formatter logs when the disk service replies with its own error of this name.
     static QByteArray diskServiceError(const QByteArray &method, const QByteArray &name);
 

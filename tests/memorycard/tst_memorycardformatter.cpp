@@ -20,8 +20,11 @@
 #include <QThreadPool>
 #include <QtTest>
 
+#include <array>
 #include <atomic>
 #include <cerrno>
+#include <csignal>
+#include <cstdarg>
 #include <functional>
 #include <initializer_list>
 
@@ -60,7 +63,7 @@ constexpr char emptied[] = "not busy, Mounting, busy, RemovingFiles, Idle, not b
 // The timeouts of the calls that were sent and wait for a reply, in milliseconds.
 QList<int> timeouts;
 bool signalledAllProcesses = false;
-bool forkFails = false;
+bool cloneFails = false;
 std::atomic<bool> threadsFail = false;
 
 QString objectPath(const QString &name)
@@ -132,14 +135,23 @@ extern "C" Q_DECL_EXPORT int kill(pid_t pid, int signal) noexcept
     return int(syscall(SYS_kill, pid, signal));
 }
 
-extern "C" Q_DECL_EXPORT pid_t fork() noexcept
+// QProcess starts programs with clone(), which it calls in this way.
+extern "C" Q_DECL_EXPORT long syscall(long number, ...) noexcept
 {
-    if (forkFails) {
+    if (cloneFails && number == SYS_clone) {
         errno = EAGAIN;
         return -1;
     }
-    static const auto original = reinterpret_cast<pid_t (*)()>(dlsym(RTLD_NEXT, "fork"));
-    return original();
+    std::array<long, 6> arguments = {};
+    va_list rest;
+    va_start(rest, number);
+    for (long &argument : arguments) {
+        argument = va_arg(rest, long);
+    }
+    va_end(rest);
+    static const auto original = reinterpret_cast<decltype(&syscall)>(dlsym(RTLD_NEXT, "syscall"));
+    return original(number, arguments[0], arguments[1], arguments[2], arguments[3], arguments[4],
+                    arguments[5]);
 }
 
 extern "C" Q_DECL_EXPORT int pthread_create(pthread_t *thread, const pthread_attr_t *attributes,
@@ -170,6 +182,7 @@ private Q_SLOTS:
     void probe();
     void helperWithFewDescriptors();
     void helperBeyondTheProcessLimit();
+    void otherHandlerOfChildren();
     void retriesWhenTheStatusIsError_data();
     void retriesWhenTheStatusIsError();
     void supportedFormatTypes_data();
@@ -204,6 +217,8 @@ private Q_SLOTS:
     void probeWaitsForTheRequest();
     void probeSurvivesAFailedRequest_data();
     void probeSurvivesAFailedRequest();
+    void probeSurvivesAFailedStep();
+    void refusedOperationInAHandler();
     void probeThatIsOverWhenARequestFails();
     void errorsOfARunningHelper();
     void commandsKeepTheirPath();
@@ -217,6 +232,8 @@ private Q_SLOTS:
     void oneProcessForAll();
     void statusIsLogged();
 
+    void goesInAHandler_data();
+    void goesInAHandler();
     void goesDuringARequest();
     void goesDuringAProbe_data();
     void goesDuringAProbe();
@@ -235,10 +252,15 @@ private:
     void request(bool mounts);
     // The scenarios "missing" and "not executable" are helpers that cannot be started.
     void installHelper(const QString &scenario, const QByteArray &output = QByteArray());
+    // What is logged when a helper of a scenario has failed.
+    static QByteArray helperFailed(const QString &scenario, const QByteArray &command,
+                                   const QByteArray &partition);
     static void addScenarios(std::initializer_list<const char *> scenarios);
     // Installs a helper that works, with the output of its probe.
     void installProbe(const QByteArray &output) { m_helper->install(done, output); }
     std::unique_ptr<QObject> createFromQml(const QByteArray &source);
+    // Calls the function after each signal.
+    void onEvent(const std::function<void()> &answer);
     // Calls the function on each change to the given status.
     void onStatus(Formatter::Status status, const std::function<void()> &answer);
 
@@ -257,6 +279,8 @@ void TestMemoryCardFormatter::init()
 
 void TestMemoryCardFormatter::cleanup()
 {
+    cloneFails = false;
+    threadsFail = false;
     // No more signals may follow.
     const QByteArray before = events();
     QTest::qWait(0);
@@ -310,6 +334,25 @@ void TestMemoryCardFormatter::installHelper(const QString &scenario, const QByte
     }
 }
 
+QByteArray TestMemoryCardFormatter::helperFailed(const QString &scenario, const QByteArray &command,
+                                                 const QByteArray &partition)
+{
+    const QByteArray notStarted = "warning [com.marlo.settings.system.memorycard] Cannot start "
+                                  "\"/usr/libexec/sdcardhelper\" because ";
+    if (scenario == QLatin1String("missing")) {
+        return notStarted + "\"execvp: No such file or directory\"";
+    }
+    if (scenario == QLatin1String("not executable")) {
+        return notStarted + "\"execvp: Permission denied\"";
+    }
+    if (scenario == QLatin1String("crash")) {
+        return helperEnded(command, partition, "was ended by signal 11 with the error \"\"");
+    }
+    const QByteArray code = scenario.mid(5).toUtf8(); // of exit=N
+    return helperEnded(command, partition,
+                       "exited with " + code + " and the error \"cannot use the card\"");
+}
+
 void TestMemoryCardFormatter::addScenarios(std::initializer_list<const char *> scenarios)
 {
     QTest::addColumn<QString>("scenario");
@@ -339,6 +382,17 @@ void TestMemoryCardFormatter::onStatus(Formatter::Status status,
             answer();
         }
     });
+}
+
+void TestMemoryCardFormatter::onEvent(const std::function<void()> &answer)
+{
+    connect(m_formatter.get(), &Formatter::statusChanged, this, answer);
+    connect(m_formatter.get(), &Formatter::busyChanged, this, answer);
+    connect(m_formatter.get(), &Formatter::deviceNameChanged, this, answer);
+    connect(m_formatter.get(), &Formatter::devicePathChanged, this, answer);
+    connect(m_formatter.get(), &Formatter::filesystemTypeChanged, this, answer);
+    connect(m_formatter.get(), &Formatter::mountError, this, answer);
+    connect(m_formatter.get(), &Formatter::unmountError, this, answer);
 }
 
 void TestMemoryCardFormatter::startsIdle()
@@ -537,6 +591,8 @@ void TestMemoryCardFormatter::probe()
     TRY_COMPARE(m_formatter->findChild<QProcess *>()->state(), QProcess::NotRunning);
     QTest::qWait(100);
     QCOMPARE(events(), expected);
+    QCOMPARE(takeLog(),
+             status == "Idle" ? QByteArray() : helperFailed(scenario, "probe", "testcard2"));
 
     installProbe("next\n");
     forgetEvents()->setDevicePath(card);
@@ -568,18 +624,46 @@ void TestMemoryCardFormatter::helperWithFewDescriptors()
     }
     QVERIFY(started && failed);
     QVERIFY(!signalledAllProcesses);
+    QVERIFY(
+        takeLog().startsWith("warning [com.marlo.settings.system.memorycard] Cannot start "
+                             "\"/usr/libexec/sdcardhelper\" because \"too many files are open\""));
 }
 
 void TestMemoryCardFormatter::helperBeyondTheProcessLimit()
 {
     installProbe("ext4\n");
-    makeFormatter();
-    forkFails = true;
+    cloneFails = true;
     m_formatter->setDevicePath(card);
     TRY_EVENTS("path /dev/testcard1, Error");
-    forkFails = false;
+    QCOMPARE(takeLog(),
+             QByteArray("warning [com.marlo.settings.system.memorycard] Cannot start "
+                        "\"/usr/libexec/sdcardhelper\" because \"no process can be started\""));
+    // Destroying the formatter signals no process.
+    makeFormatter();
+    m_formatter->setDevicePath(card);
+    m_formatter.reset();
+    QTest::qWait(100);
+    QVERIFY(!signalledAllProcesses);
+
+    makeFormatter();
+    m_formatter->setDevicePath(card);
+    TRY_EVENTS("path /dev/testcard1, Error");
+    takeLog();
+    cloneFails = false;
     forgetEvents()->setDevicePath(otherCard);
     TRY_EVENTS("path /dev/testcard2, Probing, busy, type ext4, Idle, not busy");
+}
+
+void TestMemoryCardFormatter::otherHandlerOfChildren()
+{
+    // Code of the application replaces the handler that Qt may have installed.
+    installProbe("ext4\n");
+    m_formatter->setDevicePath(otherCard);
+    TRY_EVENTS("path /dev/testcard2, Probing, busy, type ext4, Idle, not busy");
+    const auto before = signal(SIGCHLD, SIG_DFL);
+    forgetEvents()->setDevicePath(card);
+    TRY_EVENTS("path /dev/testcard1, Probing, busy, Idle, not busy");
+    signal(SIGCHLD, before);
 }
 
 void TestMemoryCardFormatter::retriesWhenTheStatusIsError_data()
@@ -616,6 +700,7 @@ void TestMemoryCardFormatter::retriesWhenTheStatusIsError()
     QVERIFY2(events().endsWith("Probing, busy, type ext4, Idle, not busy")
                  || events().endsWith("not busy, Probing, busy, type ext4, Idle, not busy"),
              events().constData());
+    QCOMPARE(takeLog().count('\n'), retries - 1);
 }
 
 void TestMemoryCardFormatter::supportedFormatTypes_data()
@@ -726,6 +811,7 @@ void TestMemoryCardFormatter::failedFormat()
     TRY_EVENTS(expected);
     QTest::qWait(100);
     QCOMPARE(events(), expected);
+    QCOMPARE(takeLog(), helperFailed(scenario, "format_vfat", "testcard1"));
     QCOMPARE(m_diskService->members(), words("Unmount"));
     QCOMPARE(m_formatter->deviceName(), cardName);
     QCOMPARE(m_formatter->devicePath(), card);
@@ -1086,14 +1172,15 @@ void TestMemoryCardFormatter::refusedCommandLeavesItsQueueBehind()
     QCOMPARE(m_diskService->members(), words("Mount"));
     QCOMPARE(m_diskService->calls().first().path, objectPath(otherCardName));
 
-    // If the rest fails, the next request is dropped, even if it is a probe.
+    // If the rest fails, the next request is dropped, unless it is a probe.
     m_formatter->setDeviceName(QString());
     m_formatter->removeAllFiles();
     QCOMPARE(takeLog(), mountWithoutName);
     forgetEvents()->setDevicePath(card);
-    TRY_EVENTS("path /dev/testcard1, RemovingFiles, busy, Error, not busy");
+    TRY_EVENTS("path /dev/testcard1, RemovingFiles, busy, Error, not busy, Probing, busy, Idle, "
+               "not busy");
     QCOMPARE(takeLog(), notEmptied("/dev/testcard2", "because it is not mounted"));
-    QCOMPARE(m_helper->runs().size(), 3);
+    QCOMPARE(m_helper->runs().size(), 4);
 }
 
 void TestMemoryCardFormatter::emptyTypeDuringARequest()
@@ -1177,6 +1264,56 @@ void TestMemoryCardFormatter::probeSurvivesAFailedRequest()
     takeLog();
 }
 
+void TestMemoryCardFormatter::probeSurvivesAFailedStep()
+{
+    // The path of the next card is set before the helper or the remover fails, or is the second of
+    // two new paths.
+    start("hung");
+    m_formatter->format(vfat);
+    m_formatter->setDevicePath(otherCard);
+    m_formatter->unmount();
+    m_helper->install(QStringLiteral("exit=1"), "old");
+    replyAfter("Unmount");
+    TRY_EVENTS("not busy, path /dev/testcard2, not busy, Unmounting, busy, Formatting, Error, not "
+               "busy, Probing, busy, type old, Error, not busy");
+    takeLog();
+
+    installProbe("ext4\n");
+    forgetEvents()->removeAllFiles();
+    m_formatter->setDevicePath(card);
+    replyAfter("Unmount Mount");
+    TRY_EVENTS("not busy, path /dev/testcard1, Mounting, busy, RemovingFiles, Error, not busy, "
+               "Probing, busy, type ext4, Idle, not busy");
+    takeLog();
+
+    installHelper(QStringLiteral("missing"));
+    forgetEvents()->mount();
+    m_formatter->setDevicePath(otherCard);
+    m_formatter->setDevicePath(card);
+    onStatus(Formatter::Error, [this] { installProbe("vfat\n"); });
+    replyAfter("Unmount Mount Mount");
+    TRY_EVENTS("not busy, path /dev/testcard2, path /dev/testcard1, Mounting, busy, Probing, "
+               "Error, not busy, Probing, busy, type vfat, Idle, not busy");
+    QCOMPARE(m_helper->runs().last(), words("probe testcard1"));
+    takeLog();
+}
+
+void TestMemoryCardFormatter::refusedOperationInAHandler()
+{
+    // Without a device name, the operation only logs that it is refused.
+    m_helper->install(QStringLiteral("exit=1"));
+    startDiskService("done");
+    onStatus(Formatter::Error, [this] { m_formatter->format(vfat); });
+    m_formatter->setDevicePath(card);
+    TRY_EVENTS("path /dev/testcard1, Probing, busy, Error, not busy, not busy");
+    QTest::qWait(100);
+    QCOMPARE(takeLog(),
+             helperFailed(QStringLiteral("exit=1"), "probe", "testcard1") + '\n'
+                 + unmountWithoutName);
+    QCOMPARE(m_formatter->status(), Formatter::Error);
+    QCOMPARE(m_helper->runs(), (QList<QStringList>{words("probe testcard1")}));
+}
+
 void TestMemoryCardFormatter::probeThatIsOverWhenARequestFails()
 {
     // The status still says that the probe runs while the second request is under way.
@@ -1193,17 +1330,16 @@ void TestMemoryCardFormatter::probeThatIsOverWhenARequestFails()
 
 void TestMemoryCardFormatter::errorsOfARunningHelper()
 {
-    // Only a failed start is handled here: the process reports every other end by finished().
+    // The process reports every end of a helper that has started by finished().
     const auto report = [this](QProcess::ProcessError error) {
-        return QMetaObject::invokeMethod(m_formatter.get(), "commandError",
-                                         Q_ARG(QProcess::ProcessError, error));
+        Q_EMIT m_formatter->findChild<QProcess *>()->errorOccurred(error);
     };
     m_helper->install(held, "ext4\n");
     m_formatter->setDevicePath(card);
     TRY(m_helper->running().size() == 1);
     for (const auto error : {QProcess::FailedToStart, QProcess::Crashed, QProcess::Timedout,
                              QProcess::ReadError, QProcess::WriteError, QProcess::UnknownError}) {
-        QVERIFY(report(error));
+        report(error);
     }
     m_helper->release();
     TRY_EVENTS("path /dev/testcard1, Probing, busy, type ext4, Idle, not busy");
@@ -1211,7 +1347,7 @@ void TestMemoryCardFormatter::errorsOfARunningHelper()
     // A second report of a failed start comes while the next command runs.
     startWithoutPath("hung");
     m_formatter->mount();
-    QVERIFY(report(QProcess::FailedToStart));
+    report(QProcess::FailedToStart);
     replyAfter("Mount");
     TRY_EVENTS(mounted);
 }
@@ -1398,6 +1534,78 @@ void TestMemoryCardFormatter::statusIsLogged()
     QCOMPARE(takeLog(), QByteArray());
 }
 
+void TestMemoryCardFormatter::goesInAHandler_data()
+{
+    QTest::addColumn<QByteArray>("event");
+    QTest::addColumn<QByteArray>("scenarios");
+    QTest::addColumn<QString>("helper");
+    const auto row = [](const char *event, const char *scenarios = "done",
+                        const QString &helper = done) {
+        QTest::addRow("%s, %s, %s", event, scenarios, qPrintable(helper))
+            << QByteArray(event) << QByteArray(scenarios) << helper;
+    };
+    for (const char *event :
+         {"path /dev/testcard2", "name testcard2", "Probing", "type vfat", "Idle", "not busy",
+          "Unmounting", "busy", "Formatting", "Mounting", "RemovingFiles"}) {
+        row(event);
+    }
+    row("Error", "done", QStringLiteral("exit=1"));
+    row("Error", "done", QStringLiteral("missing"));
+    row("unmount ErrorNotMounted", "Unmount=NotMounted");
+    row("unmount ErrorAlreadyUnmounting", "AlreadyUnmounting");
+    row("mount ErrorDeviceBusy", "Mount=DeviceBusy Unmount=done");
+    row("Error", "Mount=DeviceBusy Unmount=done");
+}
+
+void TestMemoryCardFormatter::goesInAHandler()
+{
+    QFETCH(QByteArray, event);
+    QFETCH(QByteArray, scenarios);
+    QFETCH(QString, helper);
+    const MountedCard mountedCard(otherCard);
+    startDiskService(scenarios.constData());
+    installHelper(helper, "vfat");
+    // Every operation runs up to the event, in whose handler its object is deleted.
+    using Operation = std::function<void(Formatter *)>;
+    const QVector<Operation> operations = {
+        [](Formatter *formatter) { formatter->setDeviceName(otherCardName); },
+        [](Formatter *formatter) { formatter->setDevicePath(otherCard); },
+        [](Formatter *formatter) { formatter->mount(); },
+        [](Formatter *formatter) { formatter->format(vfat); },
+        [](Formatter *formatter) { formatter->removeAllFiles(); },
+        [this](Formatter *formatter) {
+            formatter->format(vfat);
+            if (m_formatter) {
+                m_formatter->setDevicePath(card);
+            }
+        },
+        [](Formatter *formatter) { formatter->format(QString()); },
+    };
+    int gone = 0;
+    for (const Operation &operation : operations) {
+        makeFormatter();
+        m_formatter->setDeviceName(cardName);
+        if (&operation > &operations.at(1)) {
+            m_formatter->setDevicePath(otherCard);
+            TRY(!m_formatter->busy());
+        }
+        forgetEvents();
+        onEvent([&] {
+            if (m_formatter && events().endsWith(event)) {
+                ++gone;
+                m_formatter.reset();
+            }
+        });
+        operation(m_formatter.get());
+        TRY(!m_formatter || (!m_formatter->busy() && events() != "not busy"));
+        QTest::qWait(10);
+        m_formatter.reset();
+    }
+    QVERIFY(gone > 0);
+    QVERIFY(QThreadPool::globalInstance()->waitForDone(patience));
+    takeLog();
+}
+
 void TestMemoryCardFormatter::goesDuringARequest()
 {
     // Before the disk service replies.
@@ -1450,6 +1658,9 @@ void TestMemoryCardFormatter::goesDuringAProbe()
         // A probe is stopped when its formatter is destroyed.
         TRY(process == nullptr);
         QCOMPARE(m_helper->running(), QList<qint64>());
+    }
+    if (scenario == QLatin1String("crash")) {
+        m_log->takeAll(); // the probe may have ended before its formatter
     }
 }
 

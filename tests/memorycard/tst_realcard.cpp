@@ -164,6 +164,7 @@ void TestRealCard::probe()
 {
     QCOMPARE(probe(QStringLiteral("/dev/nonexistent")),
              QByteArray("path /dev/nonexistent, Probing, busy, type , Error, not busy"));
+    QCOMPARE(takeLog(), helperEnded("probe", "nonexistent", "exited with 2 and the error \"\""));
     QCOMPARE(probe(m_card->path()),
              "path " + m_card->path().toUtf8() + ", Probing, busy, type ext4, Idle, not busy");
 }
@@ -280,6 +281,7 @@ void TestRealCard::deviceThatDisappears()
     probe(m_card->path() + QLatin1Char(' '));
     QCOMPARE(probe(m_card->path()),
              "path " + m_card->path().toUtf8() + ", Probing, busy, Error, not busy");
+    QVERIFY(takeLog().endsWith("exited with 2 and the error \"\""));
     QCOMPARE(m_formatter->filesystemType(), QString());
 }
 

@@ -3,11 +3,13 @@
 
 #include "androidsupport.h"
 
+#include "files/literals.h"
+
 #include <QFile>
 
 namespace {
 
-const QLatin1String runtimeDaemon("/usr/sbin/apkd");
+constexpr QLatin1String runtimeDaemon = "/usr/sbin/apkd"_L1;
 
 } // namespace
 

@@ -3,13 +3,14 @@
 
 #include "bluetoothinfo.h"
 
+#include "files/literals.h"
 #include "files/regularfile.h"
 
 #include <QtDebug>
 
 namespace {
 
-const QLatin1String addressFile("/var/lib/bluetooth/board-address");
+constexpr QLatin1String addressFile = "/var/lib/bluetooth/board-address"_L1;
 
 } // namespace
 

@@ -3,6 +3,8 @@
 
 #include "kivinfo.h"
 
+#include "files/literals.h"
+
 #include <QDBusArgument>
 #include <QDBusConnection>
 #include <QDBusMessage>
@@ -12,16 +14,16 @@
 
 namespace {
 
-const QLatin1String daemonService("com.marlo.kivd");
-const QLatin1String daemonPath("/com/marlo/kivd");
-const QLatin1String daemonInterface("com.marlo.kivd");
-const QLatin1String propertiesInterface("org.freedesktop.DBus.Properties");
-const QLatin1String getMethod("Get");
-const QLatin1String changedSignal("PropertiesChanged");
-const QLatin1String changedSignature("a{sv}");
+constexpr QLatin1String daemonService = "com.marlo.kivd"_L1;
+constexpr QLatin1String daemonPath = "/com/marlo/kivd"_L1;
+constexpr QLatin1String daemonInterface = "com.marlo.kivd"_L1;
+constexpr QLatin1String propertiesInterface = "org.freedesktop.DBus.Properties"_L1;
+constexpr QLatin1String getMethod = "Get"_L1;
+constexpr QLatin1String changedSignal = "PropertiesChanged"_L1;
+constexpr QLatin1String changedSignature = "a{sv}"_L1;
 
-const QLatin1String idProperty("KIVID");
-const QLatin1String readyProperty("Ready");
+constexpr QLatin1String idProperty = "KIVID"_L1;
+constexpr QLatin1String readyProperty = "Ready"_L1;
 constexpr int ready = 1;
 
 // The value of a reply, or the default if the reply has another type, such as a variant.

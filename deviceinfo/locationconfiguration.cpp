@@ -3,6 +3,7 @@
 
 #include "locationconfiguration.h"
 
+#include "files/literals.h"
 #include "files/regularfile.h"
 #include "mgconfitem.h"
 
@@ -13,13 +14,13 @@
 
 namespace {
 
-const QLatin1String customSettingsEnabledKey("/settings/location/custom_settings_enabled");
-const QLatin1String customSettingsKey("/settings/location/custom_settings");
+constexpr QLatin1String customSettingsEnabledKey = "/settings/location/custom_settings_enabled"_L1;
+constexpr QLatin1String customSettingsKey = "/settings/location/custom_settings"_L1;
 
-const QLatin1String gpsEntry("gps/enabled");
-const QLatin1String mlsEntry("mls/enabled");
-const QLatin1String mlsOnlineEntry("mls/online_enabled");
-const QLatin1String hereEntry("here/enabled");
+constexpr QLatin1String gpsEntry = "gps/enabled"_L1;
+constexpr QLatin1String mlsEntry = "mls/enabled"_L1;
+constexpr QLatin1String mlsOnlineEntry = "mls/online_enabled"_L1;
+constexpr QLatin1String hereEntry = "here/enabled"_L1;
 
 // The platform's library may use other names for the states, but the numbers are always the same.
 using State = LocationSettings::OnlineAGpsState;
@@ -27,10 +28,11 @@ constexpr auto unavailable = State(0);
 constexpr auto disabled = State(1);
 constexpr auto enabled = State(2);
 
-const QLatin1String mlsAgreement("/usr/share/geoclue-provider-mlsdb/agreements/mls_consent_");
-const QLatin1String hereAgreement("/usr/share/libherepositioning/agreements/here_consent_");
-const QLatin1String englishSuffix("en_GB.txt");
-const QLatin1String suffix(".txt");
+constexpr QLatin1String mlsAgreement =
+    "/usr/share/geoclue-provider-mlsdb/agreements/mls_consent_"_L1;
+constexpr QLatin1String hereAgreement = "/usr/share/libherepositioning/agreements/here_consent_"_L1;
+constexpr QLatin1String englishSuffix = "en_GB.txt"_L1;
+constexpr QLatin1String suffix = ".txt"_L1;
 
 State toState(const QVariant &saved)
 {

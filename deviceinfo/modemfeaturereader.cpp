@@ -4,13 +4,14 @@
 #include "modemfeaturereader.h"
 
 #include "files/inifile.h"
+#include "files/literals.h"
 
 #include <QSettings>
 
 namespace {
 
-const QLatin1String featuresFile("/usr/share/modem-software/features.ini");
-const QLatin1String variantKey("variant");
+constexpr QLatin1String featuresFile = "/usr/share/modem-software/features.ini"_L1;
+constexpr QLatin1String variantKey = "variant"_L1;
 
 } // namespace
 

@@ -3,6 +3,7 @@
 
 #include "termsofusemanager.h"
 
+#include "files/literals.h"
 #include "files/regularfile.h"
 
 #include <QBuffer>
@@ -10,13 +11,13 @@
 
 namespace {
 
-const QLatin1String platformPath("/usr/share/marlo-settings/platform-eula");
-const QLatin1String platformTerms("/tarnwick_termsofuse-");
-const QLatin1String vendorTerms("/full/");
-const QLatin1String vendorSummary("/summary/");
-const QLatin1String suffix(".txt");
+constexpr QLatin1String platformPath = "/usr/share/marlo-settings/platform-eula"_L1;
+constexpr QLatin1String platformTerms = "/tarnwick_termsofuse-"_L1;
+constexpr QLatin1String vendorTerms = "/full/"_L1;
+constexpr QLatin1String vendorSummary = "/summary/"_L1;
+constexpr QLatin1String suffix = ".txt"_L1;
 
-const QLatin1String english("en_GB");
+constexpr QLatin1String english = "en_GB"_L1;
 constexpr int languageLength = 2;
 
 // The path of the best file; empty if there is neither one for the locale nor one in English.

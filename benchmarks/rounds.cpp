@@ -4,6 +4,8 @@
 #include "rounds.h"
 
 #include <QElapsedTimer>
+#include <QFile>
+#include <QHash>
 #include <QString>
 
 #include <algorithm>
@@ -38,6 +40,26 @@ Rounds::Time timeOf(const Rounds::Work &work)
     const double wall = double(timer.nsecsElapsed()) / 1e9;
     return {wall, processorTime() - processorBefore};
 }
+
+// The usual ratios by "work | compared with".
+QHash<QByteArray, double> readMedians()
+{
+    QFile file(QStringLiteral(MEDIANS));
+    if (!file.open(QIODevice::ReadOnly)) {
+        qFatal("cannot read %s", MEDIANS);
+    }
+    QHash<QByteArray, double> medians;
+    const QList<QByteArray> lines = file.readAll().split('\n');
+    for (const QByteArray &line : lines) {
+        const int last = line.lastIndexOf(" | ");
+        if (last > 0 && !line.startsWith('#')) {
+            medians.insert(line.left(last), line.mid(last + 3).toDouble());
+        }
+    }
+    return medians;
+}
+
+constexpr double noBar = -1;
 
 void printRow(const char *work, const char *beside, const QString &figure, double bar, bool kept)
 {
@@ -81,15 +103,18 @@ void Rounds::reportTimes(const char *work, std::vector<double> milliseconds)
 }
 
 bool Rounds::report(const char *work, const char *beside, const Times &times,
-                    const Times &references, double bar, double Time::*clock)
+                    const Times &references, double factor, double Time::*clock)
 {
+    static const QHash<QByteArray, double> medians = readMedians();
+    const double usual = medians.value(QByteArray(work) + " | " + beside, noBar);
+    const double bar = usual < 0 ? noBar : usual * factor;
     std::vector<double> ratios;
     for (size_t round = 0; round < times.size(); ++round) {
         ratios.push_back(times[round].*clock / references[round].*clock);
     }
     std::sort(ratios.begin(), ratios.end());
     const double median = ratios[ratios.size() / 2];
-    const bool kept = bar < 0 || median <= bar || ratios[1] <= bar;
+    const bool kept = median <= bar || ratios[1] <= bar;
     printRow(work, beside,
              QStringLiteral("%1 (%2 to %3)")
                  .arg(median, 0, 'f', 2)
@@ -99,7 +124,7 @@ bool Rounds::report(const char *work, const char *beside, const Times &times,
     return kept;
 }
 
-bool Rounds::report(const char *work, const char *unit, double figure, double bar)
+bool Rounds::reportFigure(const char *work, const char *unit, double figure, double bar)
 {
     const bool kept = bar < 0 || figure <= bar;
     printRow(work, unit, QString::number(figure, 'g', 5), bar, kept);

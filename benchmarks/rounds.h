@@ -8,9 +8,11 @@
 #include <vector>
 
 /*
-    Ratios between works that are timed in one run: a single time depends on the machine.
+    Ratios of two workloads timed in the same run; absolute times depend on the machine.
 
-    Prints the rows of a Markdown table; ./dev bench prints its head.
+    Prints the rows of a Markdown table; ./dev bench prints its head. The bar of a ratio is its usual
+    value, which is in medians.txt, times a factor. A ratio that the file does not contain counts as
+    missed.
 */
 namespace Rounds {
 
@@ -29,8 +31,8 @@ struct Work {
     std::function<void()> prepare = [] {};
 };
 
-// For figures that are printed but not checked.
-constexpr double noBar = -1;
+// How far a ratio may be above its usual value.
+constexpr double usualFactor = 1.25;
 
 enum class WarmUp { Yes, No };
 
@@ -40,15 +42,15 @@ std::vector<Times> times(const std::vector<Work> &works, int rounds = 9,
 
 // Prints the median of the rounds' ratios, the lowest and the highest, and the bar. The bar is missed
 // only when all rounds but one miss it: the machine may disturb a single round. Returns whether the
-// bar is kept.
+// ratio is within its bar.
 bool report(const char *work, const char *beside, const Times &times, const Times &references,
-            double bar, double Time::*clock = &Time::processor);
+            double factor = usualFactor, double Time::*clock = &Time::processor);
 
 // Prints the median of times on this machine, the lowest and the highest, which have no bar.
 void reportTimes(const char *work, std::vector<double> milliseconds);
 
 // Prints a figure that is not a ratio. Its bar is missed as soon as the figure is above it.
-bool report(const char *work, const char *unit, double figure, double bar);
+bool reportFigure(const char *work, const char *unit, double figure, double bar);
 
 } // namespace Rounds
 

@@ -48,6 +48,7 @@ GalleryPage {
 
         ColumnLayout {
             id: live
+            Layout.fillHeight: false
             spacing: 16
 
             Repeater {

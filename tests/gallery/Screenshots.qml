@@ -26,6 +26,7 @@ Gallery {
         { language: "en", width: 360, height: 640 },
         { language: "en", width: 1280, height: 800 },
         { language: "fi", width: 360, height: 640 },
+        { language: "fi", width: 1280, height: 800 },
     ]
     // A page without states of its own is shown as it opens.
     readonly property var shots: ownShots.concat(
@@ -374,7 +375,7 @@ Gallery {
 
     Timer {
         id: watchdog
-        interval: 30000
+        interval: 60000
         running: true
         onTriggered: gallery.fail("step %1 is not reached, there is %2".arg(gallery.step + 1).arg(
                                       Screen.texts(gallery.surface).map(item => item.text).join("; ")))

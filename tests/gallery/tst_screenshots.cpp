@@ -18,7 +18,7 @@ const QLatin1String source(SOURCE_DIR);
 // Below the header, a page without content has one colour. Smooth text and icons have many.
 constexpr int headerHeight = 48;
 constexpr int enoughColours = 20;
-constexpr int patience = 120000; // ms; the gallery's own timeout is shorter
+constexpr int patience = 240000; // ms; the gallery's own timeout is shorter
 
 struct Result {
     int exitCode = -1;

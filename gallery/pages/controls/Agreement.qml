@@ -10,12 +10,12 @@ import QtQuick 2.15
 Section {
     id: agreement
 
-    property alias terms: paragraph.text
+    property string terms
     property bool agreed
     signal chosen(bool agrees)
 
     Paragraph {
-        id: paragraph
+        text: terms.trim()
     }
     PushButton {
         // The text of a service whose terms are not installed.

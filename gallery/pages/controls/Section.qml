@@ -32,6 +32,7 @@ Pane {
         }
         ColumnLayout {
             id: column
+            Layout.fillHeight: false
             spacing: 8
         }
         // Takes the rest of the height.

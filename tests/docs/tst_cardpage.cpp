@@ -228,8 +228,9 @@ void TestCardPage::namesWhatFailed_data()
     const auto row = [](const char *name, const char *service, const char *problem, int messages) {
         QTest::newRow(name) << service << problem << messages;
     };
-    row("the helper", "done", "Formatting failed.", 0);
-    row("the disk service", "NotMounted", "The card is not mounted.", 1);
+    // The failed probe logs one of the messages.
+    row("the helper", "done", "Formatting failed.", 2);
+    row("the disk service", "NotMounted", "The card is not mounted.", 2);
 }
 
 void TestCardPage::namesWhatFailed()

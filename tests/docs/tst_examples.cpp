@@ -317,6 +317,10 @@ void TestExamples::runsThoseOfTheReference()
     QVERIFY(object != nullptr);
     // An example may probe its card. The helper does not exist; wait until its start has failed.
     QTRY_VERIFY(!isBusy(*object));
+    for (const QString &text : m_log->takeTexts()) {
+        QVERIFY2(text.startsWith(QStringLiteral("Cannot start \"/usr/libexec/sdcardhelper\"")),
+                 qPrintable(text));
+    }
 }
 
 void TestExamples::areAllThatTheReadmeShows()

@@ -484,6 +484,9 @@ void TestMarloDefinitions::listCatalogs()
                      "nowhere\n"
                      "  engineering English: none\n"
                      "  current locale, fi_FI: none\n"}));
+    QVERIFY(run("list --catalogs", "sv_SE.UTF-8")
+                .output.contains("  current locale, sv_SE: none\n"
+                                 "  de: "));
 }
 
 void TestMarloDefinitions::showQuickAction()

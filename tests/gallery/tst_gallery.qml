@@ -627,6 +627,7 @@ TestCase {
         tap("The helper program is installed");
         tap("Open the page again");
         see("1. Detecting the file system: the helper program is missing");
+        expectMessages(["Cannot start \"/usr/libexec/sdcardhelper\""]);
         see("Unknown");
         tap("The helper program is installed");
         tap("The card is inserted");

@@ -244,6 +244,10 @@ int main(int argc, char *argv[])
     }
     Services services;
     for (int round = 0; round < rounds; ++round) {
+        // Handles what the services answer after the previous round.
+        std::vector<Pauses> unused;
+        QStringList unusedNames;
+        measure(&unused, &unusedNames);
         services.stop();
         measure(&hanging, &names);
         services.goOn();

@@ -6,17 +6,17 @@
 
 #include "locationsettings.h"
 #include "mgconfitem.h"
+#include "texts.h"
 
 #include <QStringList>
 #include <QVariant>
 
 // The four location switches, in the order in which a Switches lists their values.
-const QStringList switchNames = {QStringLiteral("gps"), QStringLiteral("mls"),
-                                 QStringLiteral("mls online"), QStringLiteral("here")};
-const QString gpsKey = QStringLiteral("/settings/location/gps_enabled");
-const QString mlsKey = QStringLiteral("/settings/location/mls_enabled");
-const QString mlsOnlineKey = QStringLiteral("/settings/location/mls_online_state");
-const QString hereKey = QStringLiteral("/settings/location/here_state");
+const QStringList switchNames = {"gps"_s, "mls"_s, "mls online"_s, "here"_s};
+const QString gpsKey = "/settings/location/gps_enabled"_s;
+const QString mlsKey = "/settings/location/mls_enabled"_s;
+const QString mlsOnlineKey = "/settings/location/mls_online_state"_s;
+const QString hereKey = "/settings/location/here_state"_s;
 const QStringList switchKeys = {gpsKey, mlsKey, mlsOnlineKey, hereKey};
 
 using Switches = QList<int>;

@@ -4,6 +4,7 @@
 #include "deviceinfo/androidsupport.h"
 #include "files.h"
 #include "loggedtest.h"
+#include "texts.h"
 
 #include <QtTest>
 
@@ -23,7 +24,7 @@ Q_DECLARE_METATYPE(Make)
 
 namespace {
 
-const QString daemonPath = QStringLiteral("/usr/sbin/apkd");
+const QString daemonPath = "/usr/sbin/apkd"_s;
 
 } // namespace
 
@@ -41,12 +42,10 @@ void TestAndroidSupport::isVisibleWithAnyEntry_data()
                                 << true;
     QTest::newRow("directory") << Make(Files::makeDirectory) << true;
     QTest::newRow("pipe") << Make(Files::makePipe) << true;
-    QTest::newRow("link") << Make([](const QString &path) {
-        Files::makeLink(QStringLiteral("/dev/null"), path);
-    }) << true;
+    QTest::newRow("link") << Make([](const QString &path) { Files::makeLink("/dev/null"_s, path); })
+                          << true;
     QTest::newRow("link to nothing")
-        << Make([](const QString &path) { Files::makeLink(QStringLiteral("/nowhere"), path); })
-        << false;
+        << Make([](const QString &path) { Files::makeLink("/nowhere"_s, path); }) << false;
 }
 
 // The path is checked on every read.

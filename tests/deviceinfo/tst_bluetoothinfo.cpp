@@ -5,6 +5,7 @@
 #include "files.h"
 #include "files/regularfile.h"
 #include "loggedtest.h"
+#include "texts.h"
 
 #include <QFile>
 #include <QtTest>
@@ -29,7 +30,7 @@ Q_DECLARE_METATYPE(Make)
 
 namespace {
 
-const QString addressPath = QStringLiteral("/var/lib/bluetooth/board-address");
+const QString addressPath = "/var/lib/bluetooth/board-address"_s;
 
 } // namespace
 
@@ -76,7 +77,7 @@ void TestBluetoothInfo::readsTheFirstLineOfAHugeFile()
 {
     Files::write(addressPath, "AA\n");
     QVERIFY(QFile::resize(addressPath, qint64(1) << 40));
-    QCOMPARE(BluetoothInfo().adapterAddress(), QStringLiteral("aa"));
+    QCOMPARE(BluetoothInfo().adapterAddress(), "aa"_s);
     Files::write(addressPath, QByteArray(maximumTextSize, 'A'));
     QCOMPARE(BluetoothInfo().adapterAddress().size(), int(maximumTextSize));
 }
@@ -86,9 +87,9 @@ void TestBluetoothInfo::readsOnce()
     Files::write(addressPath, "AA\n");
     const BluetoothInfo info;
     Files::write(addressPath, "BB\n");
-    QCOMPARE(info.adapterAddress(), QStringLiteral("aa"));
+    QCOMPARE(info.adapterAddress(), "aa"_s);
     Files::remove(addressPath);
-    QCOMPARE(info.adapterAddress(), QStringLiteral("aa"));
+    QCOMPARE(info.adapterAddress(), "aa"_s);
 }
 
 void TestBluetoothInfo::warnsIfTheFileCannotBeOpened_data()
@@ -97,8 +98,7 @@ void TestBluetoothInfo::warnsIfTheFileCannotBeOpened_data()
     QTest::newRow("nothing") << Make([] {});
     QTest::newRow("directory") << Make([] { Files::makeDirectory(addressPath); });
     QTest::newRow("pipe") << Make([] { Files::makePipe(addressPath); });
-    QTest::newRow("device") << Make(
-        [] { Files::makeLink(QStringLiteral("/dev/zero"), addressPath); });
+    QTest::newRow("device") << Make([] { Files::makeLink("/dev/zero"_s, addressPath); });
     QTest::newRow("a line above the limit")
         << Make([] { Files::write(addressPath, QByteArray(maximumTextSize + 1, 'A')); });
 }
@@ -109,8 +109,8 @@ void TestBluetoothInfo::warnsIfTheFileCannotBeOpened()
     make();
     const BluetoothInfo info;
     QCOMPARE(m_log->takeReport(),
-             QStringLiteral("warning [default] Unable to open file: "
-                            "\"/var/lib/bluetooth/board-address\""));
+             "warning [default] Unable to open file: "
+             "\"/var/lib/bluetooth/board-address\""_s);
     QCOMPARE(info.adapterAddress(), QString());
 
     Files::remove(addressPath);

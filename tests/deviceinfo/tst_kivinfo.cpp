@@ -5,6 +5,7 @@
 #include "loggedtest.h"
 #include "patience.h"
 #include "simulator/coverdaemon.h"
+#include "texts.h"
 
 #include <QDBusArgument>
 #include <QDBusConnectionInterface>
@@ -58,9 +59,9 @@ Q_DECLARE_METATYPE(QList<QStringList>)
 
 namespace {
 
-const QString idProperty = QStringLiteral("KIVID");
-const QString readyProperty = QStringLiteral("Ready");
-const QString cover = QStringLiteral("cover-7");
+const QString idProperty = "KIVID"_s;
+const QString readyProperty = "Ready"_s;
+const QString cover = "cover-7"_s;
 
 QVariant structure(const QString &first, const QString &second)
 {
@@ -87,8 +88,7 @@ public:
     // The values and the numbers of changes, as "id ready: 1 1".
     QString report() const
     {
-        return QStringLiteral("%1 %2: %3 %4")
-            .arg(kivId(), kivReady() ? QStringLiteral("ready") : QStringLiteral("not ready"))
+        return "%1 %2: %3 %4"_s.arg(kivId(), kivReady() ? "ready"_s : "not ready"_s)
             .arg(idChanged.size())
             .arg(readyChanged.size());
     }
@@ -101,7 +101,7 @@ bool isSettled(const KivInfo &info)
 }
 
 // A last change: when it arrives, everything that was sent before it has arrived.
-const QString lastCover = QStringLiteral("last");
+const QString lastCover = "last"_s;
 
 void sendLast(CoverDaemon &daemon)
 {
@@ -111,9 +111,8 @@ void sendLast(CoverDaemon &daemon)
 // Returns when the bus has received everything that the connection sent.
 void flush(QDBusConnection connection)
 {
-    const QDBusMessage call = QDBusMessage::createMethodCall(
-        QStringLiteral("org.freedesktop.DBus"), QStringLiteral("/"),
-        QStringLiteral("org.freedesktop.DBus"), QStringLiteral("GetId"));
+    const QDBusMessage call = QDBusMessage::createMethodCall("org.freedesktop.DBus"_s, "/"_s,
+                                                             "org.freedesktop.DBus"_s, "GetId"_s);
     QCOMPARE(connection.call(call).type(), QDBusMessage::ReplyMessage);
 }
 
@@ -141,11 +140,11 @@ void TestKivInfo::asksTheDaemonTwice()
     const QList<QDBusMessage> calls = daemon.calls();
     QCOMPARE(calls.size(), 2);
     for (const QDBusMessage &call : calls) {
-        QCOMPARE(call.path(), QStringLiteral("/com/marlo/kivd"));
-        QCOMPARE(call.interface(), QStringLiteral("org.freedesktop.DBus.Properties"));
-        QCOMPARE(call.member(), QStringLiteral("Get"));
-        QCOMPARE(call.signature(), QStringLiteral("ss"));
-        QCOMPARE(call.arguments().at(0).toString(), QStringLiteral("com.marlo.kivd"));
+        QCOMPARE(call.path(), "/com/marlo/kivd"_s);
+        QCOMPARE(call.interface(), "org.freedesktop.DBus.Properties"_s);
+        QCOMPARE(call.member(), "Get"_s);
+        QCOMPARE(call.signature(), "ss"_s);
+        QCOMPARE(call.arguments().at(0).toString(), "com.marlo.kivd"_s);
     }
     QCOMPARE(calls.at(0).arguments().at(1).toString(), idProperty);
     QCOMPARE(calls.at(1).arguments().at(1).toString(), readyProperty);
@@ -155,17 +154,17 @@ void TestKivInfo::readsBothInEitherOrder()
 {
     CoverDaemon daemon;
     const CountingKivInfo info;
-    QCOMPARE(info.report(), QStringLiteral(" not ready: 0 0"));
+    QCOMPARE(info.report(), " not ready: 0 0"_s);
     QTRY_COMPARE(daemon.calls().size(), 2);
     daemon.answer(readyProperty, {1});
-    QTRY_COMPARE(info.report(), QStringLiteral(" ready: 0 1"));
+    QTRY_COMPARE(info.report(), " ready: 0 1"_s);
     daemon.answer(idProperty, {cover});
-    QTRY_COMPARE(info.report(), QStringLiteral("cover-7 ready: 1 1"));
+    QTRY_COMPARE(info.report(), "cover-7 ready: 1 1"_s);
     QTRY_VERIFY(isSettled(info));
 
     // Now the daemon answers both calls at once, the identifier first.
     const CountingKivInfo another;
-    QTRY_COMPARE(another.report(), QStringLiteral("cover-7 ready: 1 1"));
+    QTRY_COMPARE(another.report(), "cover-7 ready: 1 1"_s);
 }
 
 void TestKivInfo::repliesAreTyped_data()
@@ -176,8 +175,7 @@ void TestKivInfo::repliesAreTyped_data()
 
     const auto id = [](const char *name, const QVariantList &reply, bool isTaken = false) {
         QTest::addRow("id: %s", name)
-            << reply << QVariantList{1}
-            << (isTaken ? QStringLiteral("cover-7 ready: 1 1") : QStringLiteral(" ready: 0 1"));
+            << reply << QVariantList{1} << (isTaken ? "cover-7 ready: 1 1"_s : " ready: 0 1"_s);
     };
     id("string", {cover}, true);
     id("string and more", {cover, 1, 2.0}, true);
@@ -185,16 +183,16 @@ void TestKivInfo::repliesAreTyped_data()
     id("nothing", {});
     id("variant", {QVariant::fromValue(QDBusVariant(cover))});
     id("integer", {1});
-    id("object path", {QVariant::fromValue(QDBusObjectPath(QStringLiteral("/cover")))});
+    id("object path", {QVariant::fromValue(QDBusObjectPath("/cover"_s))});
     id("strings", {QStringList(cover)});
     id("bytes", {cover.toUtf8()});
     id("structure", {structure(cover, cover)});
     id("integer, then string", {1, cover});
 
     const auto ready = [](const char *name, const QVariantList &reply, bool isTaken = false) {
-        QTest::addRow("ready: %s", name) << QVariantList{cover} << reply
-                                         << (isTaken ? QStringLiteral("cover-7 ready: 1 1")
-                                                     : QStringLiteral("cover-7 not ready: 1 0"));
+        QTest::addRow("ready: %s", name)
+            << QVariantList{cover} << reply
+            << (isTaken ? "cover-7 ready: 1 1"_s : "cover-7 not ready: 1 0"_s);
     };
     ready("integer", {1}, true);
     ready("integer and more", {1, cover}, true);
@@ -209,7 +207,7 @@ void TestKivInfo::repliesAreTyped_data()
     ready("byte", {QVariant::fromValue(uchar(1))});
     ready("boolean", {true});
     ready("floating point", {1.0});
-    ready("string", {QStringLiteral("1")});
+    ready("string", {"1"_s});
     ready("integers", {QVariant::fromValue(QList<int>{1})});
     ready("string, then integer", {cover, 1});
 }
@@ -236,11 +234,11 @@ void TestKivInfo::errorsKeepTheDefaults()
     daemon.answerWithError(readyProperty);
     const CountingKivInfo info;
     QTRY_VERIFY(isSettled(info));
-    QCOMPARE(info.report(), QStringLiteral(" not ready: 0 0"));
+    QCOMPARE(info.report(), " not ready: 0 0"_s);
 
     // The properties are not requested again, and change signals still arrive.
     daemon.sendChanges({{idProperty, cover}, {readyProperty, 1}});
-    QTRY_COMPARE(info.report(), QStringLiteral("cover-7 ready: 1 1"));
+    QTRY_COMPARE(info.report(), "cover-7 ready: 1 1"_s);
     QCOMPARE(daemon.calls().size(), 2);
 }
 
@@ -249,13 +247,13 @@ void TestKivInfo::lateRepliesOverwriteSignals()
     CoverDaemon daemon;
     const CountingKivInfo info;
     QTRY_COMPARE(daemon.calls().size(), 2);
-    daemon.sendChanges({{idProperty, QStringLiteral("newer")}, {readyProperty, 1}});
-    QTRY_COMPARE(info.report(), QStringLiteral("newer ready: 1 1"));
+    daemon.sendChanges({{idProperty, "newer"_s}, {readyProperty, 1}});
+    QTRY_COMPARE(info.report(), "newer ready: 1 1"_s);
     QVERIFY(!isSettled(info));
 
     answerBoth(daemon, {cover}, {0});
     QTRY_VERIFY(isSettled(info));
-    QCOMPARE(info.report(), QStringLiteral("cover-7 not ready: 2 2"));
+    QCOMPARE(info.report(), "cover-7 not ready: 2 2"_s);
 }
 
 void TestKivInfo::lateErrorsResetToTheDefaults()
@@ -264,12 +262,12 @@ void TestKivInfo::lateErrorsResetToTheDefaults()
     const CountingKivInfo info;
     QTRY_COMPARE(daemon.calls().size(), 2);
     daemon.sendChanges({{idProperty, cover}, {readyProperty, 1}});
-    QTRY_COMPARE(info.report(), QStringLiteral("cover-7 ready: 1 1"));
+    QTRY_COMPARE(info.report(), "cover-7 ready: 1 1"_s);
 
     daemon.answerWithError(idProperty);
     daemon.answer(readyProperty, {QVariant::fromValue(QDBusVariant(1))});
     QTRY_VERIFY(isSettled(info));
-    QCOMPARE(info.report(), QStringLiteral(" not ready: 2 2"));
+    QCOMPARE(info.report(), " not ready: 2 2"_s);
 }
 
 void TestKivInfo::followsChanges()
@@ -279,15 +277,15 @@ void TestKivInfo::followsChanges()
     const CountingKivInfo info;
     const CountingKivInfo another;
     QTRY_VERIFY(isSettled(info) && isSettled(another));
-    QCOMPARE(info.report(), QStringLiteral("cover-7 not ready: 1 0"));
+    QCOMPARE(info.report(), "cover-7 not ready: 1 0"_s);
 
     daemon.sendChanges({{readyProperty, 1}});
-    QTRY_COMPARE(info.report(), QStringLiteral("cover-7 ready: 1 1"));
-    QTRY_COMPARE(another.report(), QStringLiteral("cover-7 ready: 1 1"));
+    QTRY_COMPARE(info.report(), "cover-7 ready: 1 1"_s);
+    QTRY_COMPARE(another.report(), "cover-7 ready: 1 1"_s);
     daemon.sendChanges({{idProperty, QString()}});
-    QTRY_COMPARE(info.report(), QStringLiteral(" ready: 2 1"));
-    daemon.sendChanges({{idProperty, QStringLiteral("another")}, {QStringLiteral("Color"), 3}});
-    QTRY_COMPARE(info.report(), QStringLiteral("another ready: 3 1"));
+    QTRY_COMPARE(info.report(), " ready: 2 1"_s);
+    daemon.sendChanges({{idProperty, "another"_s}, {"Color"_s, 3}});
+    QTRY_COMPARE(info.report(), "another ready: 3 1"_s);
 }
 
 void TestKivInfo::idChangesBeforeReadiness()
@@ -300,9 +298,7 @@ void TestKivInfo::idChangesBeforeReadiness()
     connect(&info, &KivInfo::kivReadyChanged, this, note);
     daemon.sendChanges({{idProperty, cover}, {readyProperty, 1}});
     QTRY_COMPARE(order.size(), 2);
-    QCOMPARE(order,
-             QStringList(
-                 {QStringLiteral("cover-7 not ready: 1 0"), QStringLiteral("cover-7 ready: 1 1")}));
+    QCOMPARE(order, QStringList({"cover-7 not ready: 1 0"_s, "cover-7 ready: 1 1"_s}));
 }
 
 void TestKivInfo::convertsChanges_data()
@@ -322,12 +318,12 @@ void TestKivInfo::convertsChanges_data()
     row("one as a byte", QVariant::fromValue(uchar(1)), "\x01", true);
     row("one in the lower 32 bits", Q_INT64_C(0x100000001), "4294967297", false);
     row("true", true, "true", true);
-    row("one as text", QStringLiteral("1"), "1", true);
+    row("one as text", "1"_s, "1", true);
     row("text", cover, "cover-7", false);
     row("structure", structure(cover, cover), "", false);
     row("map", QVariantMap{{idProperty, cover}}, "", false);
     row("numbers", QVariant::fromValue(QList<int>{1}), "", false);
-    row("object path", QVariant::fromValue(QDBusObjectPath(QStringLiteral("/1"))), "", false);
+    row("object path", QVariant::fromValue(QDBusObjectPath("/1"_s)), "", false);
     row("variant in a variant", QVariant::fromValue(QDBusVariant(1)), "", false);
 }
 
@@ -338,8 +334,8 @@ void TestKivInfo::convertsChanges()
     QFETCH(bool, ready);
     CoverDaemon daemon;
     const KivInfo info;
-    daemon.sendChanges({{idProperty, QStringLiteral("before")}, {readyProperty, ready ? 0 : 1}});
-    QTRY_COMPARE(info.kivId(), QStringLiteral("before"));
+    daemon.sendChanges({{idProperty, "before"_s}, {readyProperty, ready ? 0 : 1}});
+    QTRY_COMPARE(info.kivId(), "before"_s);
     daemon.sendChanges({{idProperty, value}, {readyProperty, value}});
     QTRY_COMPARE(info.kivId(), id);
     QCOMPARE(info.kivReady(), ready);
@@ -354,31 +350,31 @@ void TestKivInfo::sameValuesEmitNothing()
     daemon.sendChanges({{idProperty, cover}, {readyProperty, 1}});
     daemon.sendChanges({{idProperty, cover}});
     sendLast(daemon);
-    QTRY_COMPARE(info.report(), QStringLiteral("last ready: 2 1"));
+    QTRY_COMPARE(info.report(), "last ready: 2 1"_s);
 
     // All numbers other than 1 have the same meaning.
     daemon.sendChanges({{readyProperty, 0}});
     daemon.sendChanges({{readyProperty, 2}});
     daemon.sendChanges({{idProperty, cover}});
-    QTRY_COMPARE(info.report(), QStringLiteral("cover-7 not ready: 3 2"));
+    QTRY_COMPARE(info.report(), "cover-7 not ready: 3 2"_s);
 }
 
 void TestKivInfo::theFirstArgumentIsIgnored()
 {
     CoverDaemon daemon;
     const KivInfo info;
-    daemon.sendPropertiesChanged({QStringLiteral("another.interface"),
-                                  QVariantMap{{idProperty, QStringLiteral("a")}}, QStringList()});
-    QTRY_COMPARE(info.kivId(), QStringLiteral("a"));
-    daemon.sendPropertiesChanged({7, QVariantMap{{idProperty, QStringLiteral("b")}}});
-    QTRY_COMPARE(info.kivId(), QStringLiteral("b"));
+    daemon.sendPropertiesChanged(
+        {"another.interface"_s, QVariantMap{{idProperty, "a"_s}}, QStringList()});
+    QTRY_COMPARE(info.kivId(), "a"_s);
+    daemon.sendPropertiesChanged({7, QVariantMap{{idProperty, "b"_s}}});
+    QTRY_COMPARE(info.kivId(), "b"_s);
 }
 
 void TestKivInfo::nonsenseChangesNothing_data()
 {
     QTest::addColumn<QVariantList>("arguments");
 
-    const QString name = QStringLiteral("com.marlo.kivd");
+    const QString name = "com.marlo.kivd"_s;
     const QVariantMap changes = {{idProperty, cover}, {readyProperty, 0}};
     const auto second = [&name](const QVariant &argument) {
         return QVariantList{name, argument, QStringList()};
@@ -406,8 +402,7 @@ void TestKivInfo::nonsenseChangesNothing_data()
     QTest::newRow("empty a{sv}") << second(QVariantMap());
     QTest::newRow("invalidated properties")
         << QVariantList{name, QVariantMap(), QStringList{idProperty, readyProperty}};
-    QTest::newRow("other keys") << second(
-        QVariantMap{{QStringLiteral("kivid"), cover}, {QStringLiteral("READY"), 0}});
+    QTest::newRow("other keys") << second(QVariantMap{{"kivid"_s, cover}, {"READY"_s, 0}});
 }
 
 void TestKivInfo::nonsenseChangesNothing()
@@ -415,10 +410,10 @@ void TestKivInfo::nonsenseChangesNothing()
     QFETCH(QVariantList, arguments);
     CoverDaemon daemon;
     const CountingKivInfo info;
-    daemon.sendChanges({{idProperty, QStringLiteral("before")}, {readyProperty, 1}});
+    daemon.sendChanges({{idProperty, "before"_s}, {readyProperty, 1}});
     daemon.sendPropertiesChanged(arguments);
     sendLast(daemon);
-    QTRY_COMPARE(info.report(), QStringLiteral("last ready: 2 1"));
+    QTRY_COMPARE(info.report(), "last ready: 2 1"_s);
 }
 
 void TestKivInfo::othersChangeNothing()
@@ -426,29 +421,29 @@ void TestKivInfo::othersChangeNothing()
     CoverDaemon daemon;
     const CountingKivInfo info;
     daemon.sendChanges({{idProperty, cover}});
-    QTRY_COMPARE(info.report(), QStringLiteral("cover-7 not ready: 1 0"));
+    QTRY_COMPARE(info.report(), "cover-7 not ready: 1 0"_s);
 
-    const QString path = QStringLiteral("/com/marlo/kivd");
-    const QString interface = QStringLiteral("org.freedesktop.DBus.Properties");
-    const QString member = QStringLiteral("PropertiesChanged");
+    const QString path = "/com/marlo/kivd"_s;
+    const QString interface = "org.freedesktop.DBus.Properties"_s;
+    const QString member = "PropertiesChanged"_s;
     const auto send = [](QDBusConnection from, QDBusMessage signal) {
-        signal.setArguments({QStringLiteral("com.marlo.kivd"),
-                             QVariantMap{{idProperty, QStringLiteral("other")}}, QStringList()});
+        signal.setArguments(
+            {"com.marlo.kivd"_s, QVariantMap{{idProperty, "other"_s}}, QStringList()});
         QVERIFY(from.send(signal));
     };
     const auto signal = &QDBusMessage::createSignal;
-    send(daemon.connection(), signal(path + QStringLiteral("/other"), interface, member));
-    send(daemon.connection(), signal(QStringLiteral("/"), interface, member));
-    send(daemon.connection(), signal(path, QStringLiteral("com.marlo.kivd"), member));
-    send(daemon.connection(), signal(path, interface, QStringLiteral("Changed")));
+    send(daemon.connection(), signal(path + "/other"_s, interface, member));
+    send(daemon.connection(), signal("/"_s, interface, member));
+    send(daemon.connection(), signal(path, "com.marlo.kivd"_s, member));
+    send(daemon.connection(), signal(path, interface, "Changed"_s));
     const QDBusConnection stranger =
-        QDBusConnection::connectToBus(QDBusConnection::SystemBus, QStringLiteral("stranger"));
+        QDBusConnection::connectToBus(QDBusConnection::SystemBus, "stranger"_s);
     send(stranger, signal(path, interface, member));
     flush(stranger);
     QDBusConnection::disconnectFromBus(stranger.name());
 
     sendLast(daemon);
-    QTRY_COMPARE(info.report(), QStringLiteral("last not ready: 2 0"));
+    QTRY_COMPARE(info.report(), "last not ready: 2 0"_s);
 }
 
 void TestKivInfo::aHandlerMayCallBack()
@@ -486,7 +481,7 @@ void TestKivInfo::defaultsWithoutADaemon()
     const CountingKivInfo info;
     // The text of the bus's error is not an identifier.
     QTRY_VERIFY(isSettled(info));
-    QCOMPARE(info.report(), QStringLiteral(" not ready: 0 0"));
+    QCOMPARE(info.report(), " not ready: 0 0"_s);
 }
 
 void TestKivInfo::followsADaemonThatStartsLater()
@@ -496,25 +491,24 @@ void TestKivInfo::followsADaemonThatStartsLater()
     {
         CoverDaemon daemon;
         daemon.sendChanges({{idProperty, cover}, {readyProperty, 1}});
-        QTRY_COMPARE(info.report(), QStringLiteral("cover-7 ready: 1 1"));
+        QTRY_COMPARE(info.report(), "cover-7 ready: 1 1"_s);
         // The properties are not requested again.
         QVERIFY(daemon.calls().isEmpty());
     }
     // The values stay when the daemon is gone, and signals of a new daemon change them.
     CoverDaemon daemon;
-    QCOMPARE(info.report(), QStringLiteral("cover-7 ready: 1 1"));
+    QCOMPARE(info.report(), "cover-7 ready: 1 1"_s);
     sendLast(daemon);
-    QTRY_COMPARE(info.report(), QStringLiteral("last ready: 2 1"));
+    QTRY_COMPARE(info.report(), "last ready: 2 1"_s);
 }
 
 void TestKivInfo::defaultsWithoutABus()
 {
     QProcess child;
     QProcessEnvironment environment = QProcessEnvironment::systemEnvironment();
-    environment.insert(QStringLiteral("DBUS_SYSTEM_BUS_ADDRESS"),
-                       QStringLiteral("unix:path=/nowhere"));
+    environment.insert("DBUS_SYSTEM_BUS_ADDRESS"_s, "unix:path=/nowhere"_s);
     child.setProcessEnvironment(environment);
-    child.start(QCoreApplication::applicationFilePath(), {QStringLiteral("--without-a-bus")});
+    child.start(QCoreApplication::applicationFilePath(), {"--without-a-bus"_s});
     QVERIFY(child.waitForFinished(patience));
     QCOMPARE(child.exitStatus(), QProcess::NormalExit);
     QCOMPARE(child.exitCode(), 0);
@@ -545,7 +539,7 @@ void TestKivInfo::goesWithRepliesPending()
 int main(int argc, char *argv[])
 {
     QCoreApplication application(argc, argv);
-    if (QCoreApplication::arguments().contains(QStringLiteral("--without-a-bus"))) {
+    if (QCoreApplication::arguments().contains("--without-a-bus"_s)) {
         return withoutABus();
     }
     qDBusRegisterMetaType<StringMap>();

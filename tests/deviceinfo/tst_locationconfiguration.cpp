@@ -7,6 +7,7 @@
 #include "files/regularfile.h"
 #include "locationswitches.h"
 #include "loggedtest.h"
+#include "texts.h"
 
 #include <QTranslator>
 #include <QtTest>
@@ -19,8 +20,6 @@ class TestLocationConfiguration : public LoggedTest
 
 private Q_SLOTS:
     void init();
-
-    void hasTheSwitchesOfThePlatform();
 
     void startsWithTheStoredFlag_data();
     void startsWithTheStoredFlag();
@@ -50,23 +49,21 @@ private Q_SLOTS:
 
 namespace {
 
-const QString flagKey = QStringLiteral("/settings/location/custom_settings_enabled");
-const QString savedKey = QStringLiteral("/settings/location/custom_settings");
-const QString noTextId = QStringLiteral("settings_location-la-no_agreement_text_found");
-const QString mlsAgreements =
-    QStringLiteral("/usr/share/geoclue-provider-mlsdb/agreements/mls_consent_");
-const QString hereAgreements =
-    QStringLiteral("/usr/share/libherepositioning/agreements/here_consent_");
+const QString flagKey = "/settings/location/custom_settings_enabled"_s;
+const QString savedKey = "/settings/location/custom_settings"_s;
+const QString noTextId = "settings_location-la-no_agreement_text_found"_s;
+const QString mlsAgreements = "/usr/share/geoclue-provider-mlsdb/agreements/mls_consent_"_s;
+const QString hereAgreements = "/usr/share/libherepositioning/agreements/here_consent_"_s;
 
 // Makes agreements whose paths begin with the text.
 using Make = std::function<void(const QString &)>;
 
 QVariantMap savedMap(bool gps, bool mls, bool mlsOnline, bool here)
 {
-    return {{QStringLiteral("gps/enabled"), gps},
-            {QStringLiteral("mls/enabled"), mls},
-            {QStringLiteral("mls/online_enabled"), mlsOnline},
-            {QStringLiteral("here/enabled"), here}};
+    return {{"gps/enabled"_s, gps},
+            {"mls/enabled"_s, mls},
+            {"mls/online_enabled"_s, mlsOnline},
+            {"here/enabled"_s, here}};
 }
 
 void setSwitches(const Switches &values)
@@ -77,9 +74,8 @@ void setSwitches(const Switches &values)
 
 QString warning(const QString &locale)
 {
-    return QStringLiteral(
-               "warning [default] No agreement found for \"%1\" , falling back to english")
-        .arg(locale);
+    return "warning [default] No agreement found for \"%1\" , falling back to english"_s.arg(
+        locale);
 }
 
 class Translator : public QTranslator
@@ -88,7 +84,7 @@ public:
     bool isEmpty() const override { return false; }
     QString translate(const char *, const char *sourceText, const char *, int) const override
     {
-        return sourceText == noTextId.toLatin1() ? QStringLiteral("Tekstiä ei ole") : QString();
+        return sourceText == noTextId.toLatin1() ? "Tekstiä ei ole"_s : QString();
     }
 };
 
@@ -104,23 +100,8 @@ void TestLocationConfiguration::init()
     for (const QString &agreements : {mlsAgreements, hereAgreements}) {
         Files::remove(QFileInfo(agreements).path());
     }
-    QLocale::setDefault(QLocale(QStringLiteral("fi_FI")));
+    QLocale::setDefault(QLocale("fi_FI"_s));
     LoggedTest::init();
-}
-
-void TestLocationConfiguration::hasTheSwitchesOfThePlatform()
-{
-    LocationConfiguration configuration;
-    QSignalSpy changed(&configuration, &LocationSettings::mlsOnlineStateChanged);
-    QVERIFY(configuration.setProperty("gpsEnabled", true));
-    QVERIFY(configuration.setProperty("mlsEnabled", true));
-    QVERIFY(configuration.setProperty("mlsOnlineState", 2));
-    QVERIFY(configuration.setProperty("hereState", 1));
-    QCOMPARE(configuration.property("gpsEnabled"), QVariant(true));
-    QCOMPARE(configuration.property("mlsEnabled"), QVariant(true));
-    QCOMPARE(configuration.property("mlsOnlineState").toInt(), 2);
-    QCOMPARE(configuration.property("hereState").toInt(), 1);
-    QCOMPARE(changed.size(), 1);
 }
 
 void TestLocationConfiguration::startsWithTheStoredFlag_data()
@@ -132,10 +113,9 @@ void TestLocationConfiguration::startsWithTheStoredFlag_data()
     QTest::newRow("false") << QVariant(false) << false;
     QTest::newRow("1") << QVariant(1) << true;
     QTest::newRow("0") << QVariant(0) << false;
-    QTest::newRow("\"true\"") << QVariant(QStringLiteral("true")) << true;
-    QTest::newRow("\"false\"") << QVariant(QStringLiteral("false")) << false;
-    QTest::newRow("list") << QVariant(QStringList{QStringLiteral("a"), QStringLiteral("b")})
-                          << false;
+    QTest::newRow("\"true\"") << QVariant("true"_s) << true;
+    QTest::newRow("\"false\"") << QVariant("false"_s) << false;
+    QTest::newRow("list") << QVariant(QStringList{"a"_s, "b"_s}) << false;
     QTest::newRow("map") << QVariant(savedMap(true, true, true, true)) << false;
 }
 
@@ -217,8 +197,7 @@ void TestLocationConfiguration::savesTheSwitches()
 void TestLocationConfiguration::savingReplacesEverything()
 {
     LocationConfiguration configuration;
-    for (const QVariant &before : {QVariant(QVariantMap{{QStringLiteral("another"), 1}}),
-                                   QVariant(QStringLiteral("no map"))}) {
+    for (const QVariant &before : {QVariant(QVariantMap{{"another"_s, 1}}), QVariant("no map"_s)}) {
         store(savedKey, before);
         configuration.saveCustomSettings();
         QCOMPARE(stored(savedKey), QVariant(savedMap(false, false, false, false)));
@@ -249,13 +228,13 @@ void TestLocationConfiguration::restores_data()
     row("here", savedMap(false, false, false, true), {1, 1, 2, 1}, {0, 0, 1, 2});
     row("nothing saved", {}, {1, 1, 2, 2}, {0, 0, 1, 1});
     row("nothing saved, not agreed", {}, {1, 1, 0, 0}, {0, 0, 0, 0});
-    const QString mls = QStringLiteral("mls/enabled");
+    const QString mls = "mls/enabled"_s;
     row("one entry", QVariantMap{{mls, true}}, {1, 0, 2, 2}, {0, 1, 1, 1});
     row("entries of other types",
-        QVariantMap{{QStringLiteral("gps/enabled"), 1},
-                    {mls, QStringLiteral("true")},
-                    {QStringLiteral("mls/online_enabled"), QStringLiteral("false")},
-                    {QStringLiteral("here/enabled"), QStringList{mls, mls}}},
+        QVariantMap{{"gps/enabled"_s, 1},
+                    {mls, "true"_s},
+                    {"mls/online_enabled"_s, "false"_s},
+                    {"here/enabled"_s, QStringList{mls, mls}}},
         {0, 0, 2, 2}, {1, 1, 1, 1});
     row("a boolean, no map", true, {1, 1, 2, 0}, {0, 0, 1, 0});
     row("text, no map", mls, {1, 1, 2, 0}, {0, 0, 1, 0});
@@ -300,7 +279,7 @@ void TestLocationConfiguration::restoresInOrder()
     QStringList changes;
     recordChanges(&configuration, &changes);
     configuration.restoreCustomSettings();
-    QCOMPARE(changes.join(QLatin1Char(',')), QStringLiteral("gps 1,mls 1,mls online 2,here 2"));
+    QCOMPARE(changes.join(QLatin1Char(',')), "gps 1,mls 1,mls online 2,here 2"_s);
 }
 
 void TestLocationConfiguration::mayBeDeletedInAnyHandler()
@@ -371,7 +350,7 @@ void TestLocationConfiguration::restoresOverChangesThatAreNotDeliveredYet()
     LocationConfiguration configuration;
     configuration.saveCustomSettings();
     DconfTool::waitUntilStored();
-    DconfTool::run({QStringLiteral("load"), QStringLiteral("/settings/location/")},
+    DconfTool::run({"load"_s, "/settings/location/"_s},
                    "[/]\ngps_enabled=true\nmls_online_state=2\n");
     configuration.restoreCustomSettings();
     DconfTool::waitUntilStored();
@@ -396,19 +375,19 @@ void TestLocationConfiguration::agreement_data()
                                         << locale << make << text << isWarned;
     };
     const Make english = [](const QString &base) {
-        Files::write(base + QStringLiteral("en_GB.txt"), "Agreement\n");
-        Files::write(base + QStringLiteral("fi.txt"), "not the name of a locale");
+        Files::write(base + "en_GB.txt"_s, "Agreement\n");
+        Files::write(base + "fi.txt"_s, "not the name of a locale");
     };
     const auto finnish = [english](const Make &make) -> Make {
         return [=](const QString &base) {
             english(base);
-            make(base + QStringLiteral("fi_FI.txt"));
+            make(base + "fi_FI.txt"_s);
         };
     };
-    const QString agreement = QStringLiteral("Agreement\n");
+    const QString agreement = "Agreement\n"_s;
     row("in the language", "fi_FI",
-        finnish([](const QString &path) { Files::write(path, "Sopimus\n"); }),
-        QStringLiteral("Sopimus\n"), false);
+        finnish([](const QString &path) { Files::write(path, "Sopimus\n"); }), "Sopimus\n"_s,
+        false);
     row("in English instead", "fi_FI", english, agreement, true);
     row("in English instead of C", "C", english, agreement, true);
     row("in English, the language", "en_GB", english, agreement, false);
@@ -419,15 +398,15 @@ void TestLocationConfiguration::agreement_data()
         "English that cannot be opened", "fi_FI",
         [](const QString &base) {
             Files::makeDirectory(QFileInfo(base).path());
-            Files::makePipe(base + QStringLiteral("en_GB.txt"));
+            Files::makePipe(base + "en_GB.txt"_s);
         },
         noTextId, true);
     // If the Finnish file exists, the English file is not used instead.
     row("directory", "fi_FI", finnish(Files::makeDirectory), noTextId, false);
     row("pipe", "fi_FI", finnish(Files::makePipe), noTextId, false);
     row("device", "fi_FI",
-        finnish([](const QString &path) { Files::makeLink(QStringLiteral("/dev/zero"), path); }),
-        noTextId, false);
+        finnish([](const QString &path) { Files::makeLink("/dev/zero"_s, path); }), noTextId,
+        false);
     row("too large", "fi_FI",
         finnish([](const QString &path) { Files::makeSparse(path, maximumTextSize + 1); }),
         noTextId, false);
@@ -455,8 +434,8 @@ void TestLocationConfiguration::missingAgreementsAreTranslated()
     Translator translator;
     QVERIFY(QCoreApplication::installTranslator(&translator));
     const LocationConfiguration configuration;
-    QCOMPARE(configuration.mlsOnlineAgreementText(), QStringLiteral("Tekstiä ei ole"));
-    QCOMPARE(configuration.hereAgreementText(), QStringLiteral("Tekstiä ei ole"));
+    QCOMPARE(configuration.mlsOnlineAgreementText(), "Tekstiä ei ole"_s);
+    QCOMPARE(configuration.hereAgreementText(), "Tekstiä ei ole"_s);
     QCOMPARE(m_log->takeAll().size(), 2);
 }
 
@@ -464,16 +443,14 @@ void TestLocationConfiguration::agreementContent_data()
 {
     QTest::addColumn<QByteArray>("content");
     QTest::addColumn<QString>("text");
-    QTest::newRow("lines") << QByteArray(" One\n\nTwo \n") << QStringLiteral(" One\n\nTwo \n");
-    QTest::newRow("UTF-8") << QByteArray("Hyv\xC3\xA4ksyn \xE2\x9C\x93")
-                           << QStringLiteral("Hyväksyn ✓");
-    QTest::newRow("byte-order mark") << QByteArray("\xEF\xBB\xBFText") << QStringLiteral("Text");
-    QTest::newRow("no UTF-8") << QByteArray("a\xFF") << QStringLiteral("a\uFFFD");
-    QTest::newRow("NUL") << QByteArray("before\0after", 12) << QStringLiteral("before");
-    QTest::newRow("NUL first") << QByteArray("\0after", 6) << QStringLiteral("");
-    QTest::newRow("carriage returns")
-        << QByteArray("One\r\nTwo\r\n") << QStringLiteral("One\nTwo\n");
-    QTest::newRow("empty") << QByteArray() << QStringLiteral("");
+    QTest::newRow("lines") << QByteArray(" One\n\nTwo \n") << " One\n\nTwo \n"_s;
+    QTest::newRow("UTF-8") << QByteArray("Hyv\xC3\xA4ksyn \xE2\x9C\x93") << "Hyväksyn ✓"_s;
+    QTest::newRow("byte-order mark") << QByteArray("\xEF\xBB\xBFText") << "Text"_s;
+    QTest::newRow("no UTF-8") << QByteArray("a\xFF") << "a\uFFFD"_s;
+    QTest::newRow("NUL") << QByteArray("before\0after", 12) << "before"_s;
+    QTest::newRow("NUL first") << QByteArray("\0after", 6) << ""_s;
+    QTest::newRow("carriage returns") << QByteArray("One\r\nTwo\r\n") << "One\nTwo\n"_s;
+    QTest::newRow("empty") << QByteArray() << ""_s;
     QTest::newRow("long") << QByteArray(300000, 'x') << QString(300000, QLatin1Char('x'));
 }
 
@@ -481,7 +458,7 @@ void TestLocationConfiguration::agreementContent()
 {
     QFETCH(QByteArray, content);
     QFETCH(QString, text);
-    Files::write(hereAgreements + QStringLiteral("fi_FI.txt"), content);
+    Files::write(hereAgreements + "fi_FI.txt"_s, content);
     const LocationConfiguration configuration;
     QCOMPARE(configuration.hereAgreementText(), text);
     QVERIFY(!configuration.hereAgreementText().isNull());
@@ -489,14 +466,14 @@ void TestLocationConfiguration::agreementContent()
 
 void TestLocationConfiguration::agreementsAreReadOnEveryRead()
 {
-    Files::write(mlsAgreements + QStringLiteral("fi_FI.txt"), "one");
-    Files::write(mlsAgreements + QStringLiteral("de_DE.txt"), "zwei");
+    Files::write(mlsAgreements + "fi_FI.txt"_s, "one");
+    Files::write(mlsAgreements + "de_DE.txt"_s, "zwei");
     const LocationConfiguration configuration;
-    QCOMPARE(configuration.mlsOnlineAgreementText(), QStringLiteral("one"));
-    Files::write(mlsAgreements + QStringLiteral("fi_FI.txt"), "two");
-    QCOMPARE(configuration.mlsOnlineAgreementText(), QStringLiteral("two"));
-    QLocale::setDefault(QLocale(QStringLiteral("de_DE")));
-    QCOMPARE(configuration.mlsOnlineAgreementText(), QStringLiteral("zwei"));
+    QCOMPARE(configuration.mlsOnlineAgreementText(), "one"_s);
+    Files::write(mlsAgreements + "fi_FI.txt"_s, "two");
+    QCOMPARE(configuration.mlsOnlineAgreementText(), "two"_s);
+    QLocale::setDefault(QLocale("de_DE"_s));
+    QCOMPARE(configuration.mlsOnlineAgreementText(), "zwei"_s);
 }
 
 QTEST_GUILESS_MAIN(TestLocationConfiguration)

@@ -5,6 +5,7 @@
 #include "locationswitches.h"
 #include "loggedtest.h"
 #include "patience.h"
+#include "texts.h"
 
 #include <QProcess>
 #include <QtTest>
@@ -18,7 +19,6 @@ class TestLocationSettings : public LoggedTest
 private Q_SLOTS:
     void init();
 
-    void statesAreNumbers();
     void defaults();
     void settersStore();
     void sameValuesStoreNothing();
@@ -78,19 +78,6 @@ void TestLocationSettings::init()
     LoggedTest::init();
 }
 
-void TestLocationSettings::statesAreNumbers()
-{
-    const QMetaEnum states = QMetaEnum::fromType<State>();
-    QCOMPARE(states.keyCount(), 3);
-    for (int i = 0; i < states.keyCount(); ++i) {
-        QCOMPARE(states.value(i), i);
-    }
-    LocationSettings settings;
-    QVERIFY(settings.setProperty("hereState", 2));
-    QCOMPARE(settings.property("hereState").toInt(), 2);
-    QCOMPARE(settings.hereState(), LocationSettings::OnlineAGpsEnabled);
-}
-
 void TestLocationSettings::defaults()
 {
     QCOMPARE(switchesOf(LocationSettings()), Switches({0, 0, 0, 0}));
@@ -105,7 +92,7 @@ void TestLocationSettings::settersStore()
 
     setSwitches(&settings, {1, 1, 1, 2});
     QCOMPARE(switchesOf(settings), Switches({1, 1, 1, 2}));
-    QCOMPARE(changes.join(QLatin1Char(',')), QStringLiteral("gps 1,mls 1,mls online 1,here 2"));
+    QCOMPARE(changes.join(QLatin1Char(',')), "gps 1,mls 1,mls online 1,here 2"_s);
     QCOMPARE(stored(gpsKey), QVariant(true));
     QCOMPARE(stored(mlsKey), QVariant(true));
     QCOMPARE(stored(mlsOnlineKey), QVariant(1));
@@ -114,7 +101,7 @@ void TestLocationSettings::settersStore()
     changes.clear();
     setSwitches(&settings, {0, 0, 0, 0});
     QCOMPARE(switchesOf(settings), Switches({0, 0, 0, 0}));
-    QCOMPARE(changes.join(QLatin1Char(',')), QStringLiteral("gps 0,mls 0,mls online 0,here 0"));
+    QCOMPARE(changes.join(QLatin1Char(',')), "gps 0,mls 0,mls online 0,here 0"_s);
 }
 
 void TestLocationSettings::sameValuesStoreNothing()
@@ -154,7 +141,7 @@ void TestLocationSettings::nonsenseReadsAsTheDefault()
     QStringList changes;
     recordChanges(&followed, &changes);
     DconfTool::write(hereKey, value);
-    QTRY_COMPARE(changes, QStringList(QStringLiteral("here 0")));
+    QTRY_COMPARE(changes, QStringList("here 0"_s));
     const LocationSettings fresh;
     QCOMPARE(fresh.hereState(), State(0));
 
@@ -186,7 +173,7 @@ void TestLocationSettings::refusesOtherNumbers()
     QCOMPARE(stored(hereKey), QVariant(2));
     QCOMPARE(changes, QStringList());
     const QString warning =
-        QStringLiteral("LocationSettings: %1 is not a state of an online service").arg(number);
+        "LocationSettings: %1 is not a state of an online service"_s.arg(number);
     QCOMPARE(m_log->takeTexts(), QStringList({warning, warning}));
 }
 
@@ -197,7 +184,7 @@ void TestLocationSettings::objectsAgree()
     QStringList changes;
     recordChanges(&another, &changes);
     one.setMlsEnabled(true);
-    QCOMPARE(changes, QStringList(QStringLiteral("mls 1")));
+    QCOMPARE(changes, QStringList("mls 1"_s));
     another.setMlsEnabled(false);
     QVERIFY(!one.mlsEnabled());
 }
@@ -244,9 +231,8 @@ void TestLocationSettings::otherKeysChangeNothing()
     settings.setGpsEnabled(true);
     QStringList changes;
     recordChanges(&settings, &changes);
-    store(QStringLiteral("/settings/location/custom_settings_enabled"), true);
-    store(QStringLiteral("/settings/location/custom_settings"),
-          QVariantMap{{QStringLiteral("gps/enabled"), false}});
+    store("/settings/location/custom_settings_enabled"_s, true);
+    store("/settings/location/custom_settings"_s, QVariantMap{{"gps/enabled"_s, false}});
     QCOMPARE(switchesOf(settings), Switches({1, 0, 0, 0}));
     QCOMPARE(changes, QStringList());
 }
@@ -260,10 +246,10 @@ void TestLocationSettings::followsAnotherProcess()
     DconfTool::write(gpsKey, "true");
     DconfTool::write(mlsOnlineKey, "2");
     const auto all = [&changes] { return changes.join(QLatin1Char(',')); };
-    QTRY_COMPARE(all(), QStringLiteral("gps 1,mls online 2"));
+    QTRY_COMPARE(all(), "gps 1,mls online 2"_s);
     QCOMPARE(switchesOf(settings), Switches({1, 0, 2, 0}));
-    DconfTool::reset(QStringLiteral("/settings/location/"));
-    QTRY_COMPARE(all(), QStringLiteral("gps 1,mls online 2,gps 0,mls online 0"));
+    DconfTool::reset("/settings/location/"_s);
+    QTRY_COMPARE(all(), "gps 1,mls online 2,gps 0,mls online 0"_s);
     QCOMPARE(switchesOf(settings), Switches({0, 0, 0, 0}));
 }
 
@@ -298,7 +284,7 @@ void TestLocationSettings::anotherProcessFollows()
 
     QProcess process;
     process.setProcessChannelMode(QProcess::ForwardedErrorChannel);
-    process.start(QCoreApplication::applicationFilePath(), {QStringLiteral("--another")});
+    process.start(QCoreApplication::applicationFilePath(), {"--another"_s});
     QByteArray said;
     connect(&process, &QProcess::readyRead, this, [&] { said += process.readAll(); });
     TRY_COMPARE(said, QByteArray("1 0 0 0\n"));
@@ -310,7 +296,7 @@ void TestLocationSettings::anotherProcessFollows()
     // And the other way round.
     changes.clear();
     process.write("now you\n");
-    TRY_COMPARE(changes.join(QLatin1Char(',')), QStringLiteral("gps 0,here 1"));
+    TRY_COMPARE(changes.join(QLatin1Char(',')), "gps 0,here 1"_s);
     QCOMPARE(switchesOf(settings), Switches({0, 1, 2, 1}));
 
     process.closeWriteChannel();
@@ -323,7 +309,7 @@ void TestLocationSettings::anotherProcessFollows()
 int main(int argc, char *argv[])
 {
     QCoreApplication application(argc, argv);
-    if (QCoreApplication::arguments().contains(QStringLiteral("--another"))) {
+    if (QCoreApplication::arguments().contains("--another"_s)) {
         return another(application);
     }
     TestLocationSettings test;

@@ -4,6 +4,7 @@
 #include "deviceinfo/modemfeaturereader.h"
 #include "files.h"
 #include "loggedtest.h"
+#include "texts.h"
 
 #include <QtTest>
 
@@ -23,7 +24,7 @@ private Q_SLOTS:
 
 namespace {
 
-const QString featuresPath = QStringLiteral("/usr/share/modem-software/features.ini");
+const QString featuresPath = "/usr/share/modem-software/features.ini"_s;
 
 } // namespace
 
@@ -75,9 +76,9 @@ void TestModemFeatureReader::readsOnEveryRead()
     const ModemFeatureReader reader;
     QCOMPARE(reader.variant(), QString());
     Files::write(featuresPath, "variant=one\n");
-    QCOMPARE(reader.variant(), QStringLiteral("one"));
+    QCOMPARE(reader.variant(), "one"_s);
     Files::write(featuresPath, "variant=another\n");
-    QCOMPARE(reader.variant(), QStringLiteral("another"));
+    QCOMPARE(reader.variant(), "another"_s);
     Files::remove(featuresPath);
     QCOMPARE(reader.variant(), QString());
 }
@@ -91,7 +92,7 @@ void TestModemFeatureReader::isEmptyIfTheFileCannotBeRead()
     Files::makePipe(featuresPath);
     QCOMPARE(reader.variant(), QString());
     Files::remove(featuresPath);
-    Files::makeLink(QStringLiteral("/dev/zero"), featuresPath);
+    Files::makeLink("/dev/zero"_s, featuresPath);
     QCOMPARE(reader.variant(), QString());
 }
 

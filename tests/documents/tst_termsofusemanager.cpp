@@ -5,6 +5,7 @@
 #include "files.h"
 #include "files/regularfile.h"
 #include "loggedtest.h"
+#include "texts.h"
 
 #include <QtTest>
 
@@ -39,22 +40,21 @@ Q_DECLARE_METATYPE(Make)
 
 namespace {
 
-const QString platformDirectory = QStringLiteral("/usr/share/marlo-settings/platform-eula");
-const QString vendorDirectory = QStringLiteral("/var/lib/marlo-vendor");
-const QString noTerms = QStringLiteral(
+const QString platformDirectory = "/usr/share/marlo-settings/platform-eula"_s;
+const QString vendorDirectory = "/var/lib/marlo-vendor"_s;
+const QString noTerms =
     "warning [default] TermsOfUseManager: unable to load either the specified locale or the "
-    "English terms");
+    "English terms"_s;
 
 QString platformFile(const QString &locale)
 {
-    return platformDirectory + QStringLiteral("/tarnwick_termsofuse-%1.txt").arg(locale);
+    return platformDirectory + "/tarnwick_termsofuse-%1.txt"_s.arg(locale);
 }
 
 QString noLocalTerms(const QString &locale)
 {
-    return QStringLiteral("warning [default] TermsOfUseManager: unable to load locale-specific "
-                          "terms for locale \"%1\"")
-        .arg(locale);
+    return "warning [default] TermsOfUseManager: unable to load locale-specific "
+           "terms for locale \"%1\""_s.arg(locale);
 }
 
 } // namespace
@@ -72,7 +72,7 @@ void TestTermsOfUseManager::vendorPath()
     QSignalSpy changed(&manager, &TermsOfUseManager::vendorPathChanged);
     QCOMPARE(manager.vendorPath(), QString());
     manager.setVendorPath(QString());
-    manager.setVendorPath(QStringLiteral(""));
+    manager.setVendorPath(""_s);
     QVERIFY(changed.isEmpty());
     manager.setVendorPath(vendorDirectory);
     QCOMPARE(manager.vendorPath(), vendorDirectory);
@@ -98,7 +98,7 @@ void TestTermsOfUseManager::hasVendorTermsOfUse()
     Files::write(vendorDirectory, {});
     QVERIFY(manager.hasVendorTermsOfUse());
     // Qt's resources are not in the file system, and a path ends at no NUL.
-    for (const QString &path : {QString(), QStringLiteral(":/"), vendorDirectory + QChar::Null}) {
+    for (const QString &path : {QString(), ":/"_s, vendorDirectory + QChar::Null}) {
         manager.setVendorPath(path);
         QVERIFY(!manager.hasVendorTermsOfUse());
     }
@@ -107,8 +107,8 @@ void TestTermsOfUseManager::hasVendorTermsOfUse()
 void TestTermsOfUseManager::readsNothingBeforeItIsAsked()
 {
     TermsOfUseManager manager;
-    manager.setVendorPath(QStringLiteral("/nowhere"));
-    manager.setVendorPath(QStringLiteral("no path at all"));
+    manager.setVendorPath("/nowhere"_s);
+    manager.setVendorPath("no path at all"_s);
     QVERIFY(!manager.hasVendorTermsOfUse());
 }
 
@@ -170,7 +170,7 @@ void TestTermsOfUseManager::findsTheBestFile()
         Files::write(platformFile(file), file.toUtf8() + "\nbody");
     }
     const QStringList terms = TermsOfUseManager().platformTermsOfUse(locale);
-    QCOMPARE(terms, found.isEmpty() ? QStringList() : QStringList({found, QStringLiteral("body")}));
+    QCOMPARE(terms, found.isEmpty() ? QStringList() : QStringList({found, "body"_s}));
     QStringList warnings;
     if (isWarned) {
         warnings.append(noLocalTerms(locale));
@@ -210,9 +210,8 @@ void TestTermsOfUseManager::readsTitleAndBody()
     QFETCH(QByteArray, content);
     QFETCH(QString, title);
     QFETCH(QString, body);
-    Files::write(platformFile(QStringLiteral("fi")), content);
-    QCOMPARE(TermsOfUseManager().platformTermsOfUse(QStringLiteral("fi")),
-             QStringList({title, body}));
+    Files::write(platformFile("fi"_s), content);
+    QCOMPARE(TermsOfUseManager().platformTermsOfUse("fi"_s), QStringList({title, body}));
 }
 
 void TestTermsOfUseManager::filesThatCannotBeOpened_data()
@@ -225,7 +224,7 @@ void TestTermsOfUseManager::filesThatCannotBeOpened_data()
     row("directory", Files::makeDirectory, "file to open is a directory");
     row("pipe", Files::makePipe, "file to open is not a regular file");
     row(
-        "device", [](const QString &path) { Files::makeLink(QStringLiteral("/dev/zero"), path); },
+        "device", [](const QString &path) { Files::makeLink("/dev/zero"_s, path); },
         "file to open is not a regular file");
     row(
         "too large", [](const QString &path) { Files::makeSparse(path, maximumTextSize + 1); },
@@ -240,33 +239,32 @@ void TestTermsOfUseManager::filesThatCannotBeOpened()
     QFETCH(Make, make);
     QFETCH(QString, error);
     // If fi_FI exists, these files are not used instead.
-    Files::write(platformFile(QStringLiteral("fi")), "fi\nbody");
-    Files::write(platformFile(QStringLiteral("en_GB")), "en_GB\nbody");
-    const QString path = platformFile(QStringLiteral("fi_FI"));
+    Files::write(platformFile("fi"_s), "fi\nbody");
+    Files::write(platformFile("en_GB"_s), "en_GB\nbody");
+    const QString path = platformFile("fi_FI"_s);
     make(path);
-    QCOMPARE(TermsOfUseManager().platformTermsOfUse(QStringLiteral("fi_FI")), QStringList());
+    QCOMPARE(TermsOfUseManager().platformTermsOfUse("fi_FI"_s), QStringList());
     QCOMPARE(m_log->takeReport(),
-             QStringLiteral("warning [default] TermsOfUseManager: unable to load terms from file "
-                            "\"%1\"\nwarning [default] \"%2\"")
-                 .arg(path, error));
+             "warning [default] TermsOfUseManager: unable to load terms from file "
+             "\"%1\"\nwarning [default] \"%2\""_s.arg(path, error));
 }
 
 void TestTermsOfUseManager::vendorTermsAndSummary()
 {
-    Files::write(platformFile(QStringLiteral("fi")), "fi\nbody");
-    Files::write(vendorDirectory + QStringLiteral("/full/fi.txt"), "Full\nfull body\n");
-    Files::write(vendorDirectory + QStringLiteral("/full/en_GB.txt"), "English\n");
-    Files::write(vendorDirectory + QStringLiteral("/summary/fi.txt"), "Summary\nsummary body\n");
+    Files::write(platformFile("fi"_s), "fi\nbody");
+    Files::write(vendorDirectory + "/full/fi.txt"_s, "Full\nfull body\n");
+    Files::write(vendorDirectory + "/full/en_GB.txt"_s, "English\n");
+    Files::write(vendorDirectory + "/summary/fi.txt"_s, "Summary\nsummary body\n");
     TermsOfUseManager manager;
     manager.setVendorPath(vendorDirectory);
     const auto joined = [](const QStringList &terms) { return terms.join(QLatin1Char('|')); };
-    const QString locale = QStringLiteral("fi_FI.UTF-8");
-    QCOMPARE(joined(manager.vendorTermsOfUse(locale)), QStringLiteral("Full|full body"));
-    QCOMPARE(joined(manager.vendorTermsSummary(locale)), QStringLiteral("Summary|summary body"));
-    QCOMPARE(joined(manager.platformTermsOfUse(locale)), QStringLiteral("fi|body"));
+    const QString locale = "fi_FI.UTF-8"_s;
+    QCOMPARE(joined(manager.vendorTermsOfUse(locale)), "Full|full body"_s);
+    QCOMPARE(joined(manager.vendorTermsSummary(locale)), "Summary|summary body"_s);
+    QCOMPARE(joined(manager.platformTermsOfUse(locale)), "fi|body"_s);
 
-    const QString german = QStringLiteral("de_DE");
-    QCOMPARE(joined(manager.vendorTermsOfUse(german)), QStringLiteral("English|"));
+    const QString german = "de_DE"_s;
+    QCOMPARE(joined(manager.vendorTermsOfUse(german)), "English|"_s);
     QCOMPARE(m_log->takeReport(), noLocalTerms(german));
     QCOMPARE(manager.vendorTermsSummary(german), QStringList());
     QCOMPARE(m_log->takeReport(), noLocalTerms(german) + QLatin1Char('\n') + noTerms);
@@ -275,7 +273,7 @@ void TestTermsOfUseManager::vendorTermsAndSummary()
 void TestTermsOfUseManager::vendorTermsWithoutAPath()
 {
     const TermsOfUseManager manager;
-    const QString locale = QStringLiteral("fi");
+    const QString locale = "fi"_s;
     for (const QStringList &terms :
          {manager.vendorTermsOfUse(locale), manager.vendorTermsSummary(locale)}) {
         QCOMPARE(terms, QStringList());
@@ -287,7 +285,7 @@ void TestTermsOfUseManager::vendorTermsWithoutAPath()
 void TestTermsOfUseManager::readsOnEveryCall()
 {
     const TermsOfUseManager manager;
-    const QString locale = QStringLiteral("fi");
+    const QString locale = "fi"_s;
     for (const char *title : {"one", "two"}) {
         Files::write(platformFile(locale), title);
         QCOMPARE(manager.platformTermsOfUse(locale).value(0), QString::fromLatin1(title));

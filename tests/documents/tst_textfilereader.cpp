@@ -5,6 +5,7 @@
 #include "files.h"
 #include "files/regularfile.h"
 #include "loggedtest.h"
+#include "texts.h"
 
 #include <QTemporaryDir>
 #include <QtTest>
@@ -43,8 +44,7 @@ private Q_SLOTS:
 private:
     QString path(const char *name) const { return m_directory->filePath(QString::fromUtf8(name)); }
     QString read(const char *name) const { return TextFileReader().readContent(path(name)); }
-    QString collate(const QString &separator = QStringLiteral(","),
-                    const QString &prefix = QStringLiteral(":")) const
+    QString collate(const QString &separator = ","_s, const QString &prefix = ":"_s) const
     {
         const QUrl directory = QUrl::fromLocalFile(m_directory->path());
         return TextFileReader().collate(directory, separator, prefix);
@@ -55,8 +55,8 @@ private:
 
 namespace {
 
-const QString comma = QStringLiteral(",");
-const QString colon = QStringLiteral(":");
+const QString comma = ","_s;
+const QString colon = ":"_s;
 
 void makeSocket(const QString &path)
 {
@@ -93,20 +93,20 @@ void TestTextFileReader::readContent_data()
     const auto row = [](const char *name, const QByteArray &content, const QString &text) {
         QTest::newRow(name) << content << text;
     };
-    const QString ab = QStringLiteral("ab");
+    const QString ab = "ab"_s;
     row("line", "ab", ab);
     row("lines run together", "a\nb", ab);
     row("last line end", "a\nb\n", ab);
     row("empty lines", "\n\na\n\n\nb\n\n", ab);
     row("carriage returns", "a\r\nb\r\n", ab);
-    row("a carriage return alone", "a\rb", QStringLiteral("a\rb"));
-    row("blanks", " a \n b ", QStringLiteral(" a  b "));
-    row("empty", "", QStringLiteral(""));
-    row("line ends alone", "\n\n", QStringLiteral(""));
-    row("UTF-8", "ä\n✓", QStringLiteral("ä✓"));
+    row("a carriage return alone", "a\rb", "a\rb"_s);
+    row("blanks", " a \n b ", " a  b "_s);
+    row("empty", "", ""_s);
+    row("line ends alone", "\n\n", ""_s);
+    row("UTF-8", "ä\n✓", "ä✓"_s);
     row("byte-order mark", "\uFEFFab", ab);
     row("UTF-16", QByteArray("\xFF\xFE\x61\0\n\0b\0", 8), ab);
-    row("NUL", QByteArray("a\0b", 3), QStringLiteral("a\0b"));
+    row("NUL", QByteArray("a\0b", 3), "a\0b"_s);
     row("a long line", QByteArray(300000, 'x'), QString(300000, QLatin1Char('x')));
     row("many lines", QByteArray("x\n").repeated(100000), QString(100000, QLatin1Char('x')));
 }
@@ -135,9 +135,9 @@ void TestTextFileReader::readContentOfNothing_data()
     QTest::newRow("device") << "/dev/null";
     QTest::newRow("memory, which cannot be read") << "/proc/self/mem";
     QTest::newRow("URL") << "file://%1/file";
-    QTest::newRow("NUL") << QStringLiteral("%1/file\0x");
-    QTest::newRow("NUL first") << QStringLiteral("\0%1/file");
-    QTest::newRow("long") << QStringLiteral("%1/") + QString(100000, QLatin1Char('x'));
+    QTest::newRow("NUL") << "%1/file\0x"_s;
+    QTest::newRow("NUL first") << "\0%1/file"_s;
+    QTest::newRow("long") << "%1/"_s + QString(100000, QLatin1Char('x'));
 }
 
 void TestTextFileReader::readContentOfNothing()
@@ -148,7 +148,7 @@ void TestTextFileReader::readContentOfNothing()
     Files::makeLink(path("pipe"), path("link"));
     Files::makeLink(path("loop"), path("loop"));
     makeSocket(path("socket"));
-    name.replace(QStringLiteral("%1"), m_directory->path());
+    name.replace("%1"_s, m_directory->path());
     QVERIFY(TextFileReader().readContent(name).isNull());
 }
 
@@ -176,9 +176,9 @@ void TestTextFileReader::collateJoinsInOrder()
 {
     Files::write(path("2"), "B");
     Files::write(path("1"), "A");
-    QCOMPARE(collate(), QStringLiteral(":A,B"));
+    QCOMPARE(collate(), ":A,B"_s);
     Files::write(path("10"), "C\nD\n");
-    QCOMPARE(collate(), QStringLiteral(":A,CD,B"));
+    QCOMPARE(collate(), ":A,CD,B"_s);
 }
 
 void TestTextFileReader::collateSortsByCase()
@@ -186,13 +186,13 @@ void TestTextFileReader::collateSortsByCase()
     for (const char *name : {"a", "B", "c", "D", "ä", "_", "1"}) {
         Files::write(path(name), name);
     }
-    QCOMPARE(collate(), QStringLiteral(":1,B,D,_,a,c,ä"));
+    QCOMPARE(collate(), ":1,B,D,_,a,c,ä"_s);
 }
 
 void TestTextFileReader::collateTakesFilesOnly()
 {
     const QTemporaryDir elsewhere;
-    const QString target = elsewhere.filePath(QStringLiteral("target"));
+    const QString target = elsewhere.filePath("target"_s);
     Files::write(target, "link");
     Files::write(path("a"), "a");
     Files::makeLink(target, path("b"));
@@ -202,9 +202,9 @@ void TestTextFileReader::collateTakesFilesOnly()
     Files::makeLink(path("nothing"), path("link to nothing"));
     Files::makePipe(path("pipe"));
     Files::makeLink(path("pipe"), path("link to a pipe"));
-    Files::makeLink(QStringLiteral("/dev/zero"), path("link to a device"));
+    Files::makeLink("/dev/zero"_s, path("link to a device"));
     makeSocket(path("socket"));
-    QCOMPARE(collate(), QStringLiteral(":a,link"));
+    QCOMPARE(collate(), ":a,link"_s);
 }
 
 void TestTextFileReader::collateLeavesOutEmptyFiles()
@@ -215,7 +215,7 @@ void TestTextFileReader::collateLeavesOutEmptyFiles()
     Files::write(path("3"), "A");
     Files::write(path("4"), " ");
     Files::write(path("5"), "");
-    QCOMPARE(collate(), QStringLiteral(":A, "));
+    QCOMPARE(collate(), ":A, "_s);
 }
 
 void TestTextFileReader::collateLeavesOutFilesAboveTheLimit()
@@ -228,8 +228,8 @@ void TestTextFileReader::collateLeavesOutFilesAboveTheLimit()
     // The limit applies to all files together.
     const QString text = collate();
     QCOMPARE(text.size(), int(maximumTextSize) + 3);
-    QVERIFY(text.startsWith(QStringLiteral(":A,")));
-    QVERIFY(text.endsWith(QStringLiteral(",B")));
+    QVERIFY(text.startsWith(":A,"_s));
+    QVERIFY(text.endsWith(",B"_s));
 }
 
 void TestTextFileReader::collateOfNothing()
@@ -262,7 +262,7 @@ void TestTextFileReader::collateOfNoLocalDirectory()
     // The current directory has a text, which must not be found.
     const QString before = QDir::currentPath();
     QVERIFY(QDir::setCurrent(m_directory->path()));
-    url.replace(QStringLiteral("%1"), m_directory->path());
+    url.replace("%1"_s, m_directory->path());
     const QString text = TextFileReader().collate(QUrl(url), comma, colon);
     QVERIFY(QDir::setCurrent(before));
     QVERIFY(text.isNull());
@@ -271,17 +271,16 @@ void TestTextFileReader::collateOfNoLocalDirectory()
 void TestTextFileReader::collateDecodesUrls()
 {
     Files::write(path("a directory #1/file"), "text");
-    const QUrl url(QStringLiteral("file://%1/a%20directory%20%231")
-                       .replace(QStringLiteral("%1"), m_directory->path()));
-    QCOMPARE(TextFileReader().collate(url, comma, colon), QStringLiteral(":text"));
+    const QUrl url("file://%1/a%20directory%20%231"_s.replace("%1"_s, m_directory->path()));
+    QCOMPARE(TextFileReader().collate(url, comma, colon), ":text"_s);
 }
 
 void TestTextFileReader::collateKeepsSeparatorAndPrefix()
 {
     Files::write(path("1"), "%1");
     Files::write(path("2"), "%2");
-    QCOMPARE(collate(QStringLiteral("%1\n"), QStringLiteral("%2")), QStringLiteral("%2%1%1\n%2"));
-    QCOMPARE(collate(QString(), QString()), QStringLiteral("%1%2"));
+    QCOMPARE(collate("%1\n"_s, "%2"_s), "%2%1%1\n%2"_s);
+    QCOMPARE(collate(QString(), QString()), "%1%2"_s);
 }
 
 QTEST_GUILESS_MAIN(TestTextFileReader)

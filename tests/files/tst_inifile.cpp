@@ -5,6 +5,7 @@
 
 #include "files.h"
 #include "files/inifile.h"
+#include "texts.h"
 
 #include <QSettings>
 #include <QTemporaryDir>
@@ -145,8 +146,8 @@ void TestIniFile::findsFaults_data()
 void TestIniFile::findsFaults()
 {
     QFETCH(QByteArray, content);
-    const QTemporaryDir directory(QStringLiteral("/run/ini-XXXXXX"));
-    const QString path = directory.filePath(QStringLiteral("file"));
+    const QTemporaryDir directory("/run/ini-XXXXXX"_s);
+    const QString path = directory.filePath("file"_s);
     QCOMPARE(findIniFault(path), IniFault::None); // QSettings cannot open it, either.
     QCOMPARE(findIniFault(directory.path()), IniFault::Unreadable);
     Files::write(path, content);
@@ -164,8 +165,7 @@ void TestIniFile::acceptsNothingThatQSettingsUnpacks()
     // QSettings warns about values that are not packed correctly.
     qInstallMessageHandler([](QtMsgType, const QMessageLogContext &, const QString &) {});
     // In memory, because there are many files.
-    const QTemporaryDir directory(qEnvironmentVariable("XDG_RUNTIME_DIR")
-                                  + QStringLiteral("/XXXXXX"));
+    const QTemporaryDir directory(qEnvironmentVariable("XDG_RUNTIME_DIR") + "/XXXXXX"_s);
     int unpacked = 0;
     int accepted = 0;
     for (int i = 0; i < files; ++i) {

@@ -3,6 +3,7 @@
 
 #include "files.h"
 #include "files/regularfile.h"
+#include "texts.h"
 #include "usedupdescriptors.h"
 
 #include <QTemporaryDir>
@@ -27,7 +28,7 @@ private Q_SLOTS:
 void TestRegularFile::readsUpToTheLimit()
 {
     const QTemporaryDir directory;
-    const QString path = directory.filePath(QStringLiteral("file"));
+    const QString path = directory.filePath("file"_s);
     Files::write(path, "text");
     const RegularFile file = readRegularFile(path, 4);
     QCOMPARE(file.state, State::Read);
@@ -44,7 +45,7 @@ void TestRegularFile::readsUpToTheLimit()
 void TestRegularFile::readsTheFirstLine()
 {
     const QTemporaryDir directory;
-    const QString path = directory.filePath(QStringLiteral("file"));
+    const QString path = directory.filePath("file"_s);
     Files::write(path, "text\nmore");
     QCOMPARE(readFirstLine(path, 4).state, State::Read);
     QCOMPARE(readFirstLine(path, 4).content, QByteArray("text"));
@@ -57,13 +58,13 @@ void TestRegularFile::readsTheFirstLine()
     QCOMPARE(readFirstLine(path, 8192).content, QByteArray(8192, 'x'));
     QCOMPARE(readFirstLine(path, 8191).state, State::TooLarge);
     QCOMPARE(readFirstLine(directory.path(), 4).state, State::NotRegular);
-    QCOMPARE(readFirstLine(QStringLiteral("/proc/self/mem"), 4).state, State::Failed);
+    QCOMPARE(readFirstLine("/proc/self/mem"_s, 4).state, State::Failed);
 }
 
 // Files of the kernel report a size of 0, but may have content of any size.
 void TestRegularFile::readsFilesOfTheKernel()
 {
-    const QString path = QStringLiteral("/proc/version");
+    const QString path = "/proc/version"_s;
     const RegularFile file = readRegularFile(path, 10000);
     QCOMPARE(file.state, State::Read);
     QVERIFY(file.content.startsWith("Linux"));
@@ -77,20 +78,19 @@ void TestRegularFile::refuses_data()
     QTest::addColumn<QString>("path");
     QTest::addColumn<State>("state");
     QTest::addColumn<QString>("error");
-    const QString nothing = QStringLiteral("No such file or directory");
-    const QString irregular = QStringLiteral("file to open is not a regular file");
+    const QString nothing = "No such file or directory"_s;
+    const QString irregular = "file to open is not a regular file"_s;
     QTest::newRow("no path") << QString() << State::NotOpened << nothing;
-    QTest::newRow("nothing") << QStringLiteral("%1/nothing") << State::NotOpened << nothing;
-    QTest::newRow("NUL in the path") << QStringLiteral("%1/file") + QChar(0) << State::NotOpened
-                                     << QStringLiteral("Invalid argument");
-    QTest::newRow("directory") << QStringLiteral("%1") << State::NotRegular
-                               << QStringLiteral("file to open is a directory");
-    QTest::newRow("pipe") << QStringLiteral("%1/pipe") << State::NotRegular << irregular;
-    QTest::newRow("device") << QStringLiteral("/dev/zero") << State::NotRegular << irregular;
-    QTest::newRow("too large") << QStringLiteral("%1/sparse") << State::TooLarge
-                               << QStringLiteral("file to open is larger than 1000 bytes");
-    QTest::newRow("cannot be read") << QStringLiteral("/proc/self/mem") << State::Failed
-                                    << QStringLiteral("Input/output error");
+    QTest::newRow("nothing") << "%1/nothing"_s << State::NotOpened << nothing;
+    QTest::newRow("NUL in the path")
+        << "%1/file"_s + QChar(0) << State::NotOpened << "Invalid argument"_s;
+    QTest::newRow("directory") << "%1"_s << State::NotRegular << "file to open is a directory"_s;
+    QTest::newRow("pipe") << "%1/pipe"_s << State::NotRegular << irregular;
+    QTest::newRow("device") << "/dev/zero"_s << State::NotRegular << irregular;
+    QTest::newRow("too large") << "%1/sparse"_s << State::TooLarge
+                               << "file to open is larger than 1000 bytes"_s;
+    QTest::newRow("cannot be read")
+        << "/proc/self/mem"_s << State::Failed << "Input/output error"_s;
 }
 
 void TestRegularFile::refuses()
@@ -98,13 +98,12 @@ void TestRegularFile::refuses()
     QFETCH(QString, path);
     QFETCH(State, state);
     const QTemporaryDir directory;
-    Files::write(directory.filePath(QStringLiteral("file")), "text");
-    Files::makePipe(directory.filePath(QStringLiteral("pipe")));
-    Files::makeSparse(directory.filePath(QStringLiteral("sparse")), qint64(1) << 40);
-    const QDir openFiles(QStringLiteral("/proc/self/fd"));
+    Files::write(directory.filePath("file"_s), "text");
+    Files::makePipe(directory.filePath("pipe"_s));
+    Files::makeSparse(directory.filePath("sparse"_s), qint64(1) << 40);
+    const QDir openFiles("/proc/self/fd"_s);
     const uint before = openFiles.count();
-    const RegularFile file =
-        readRegularFile(path.replace(QStringLiteral("%1"), directory.path()), 1000);
+    const RegularFile file = readRegularFile(path.replace("%1"_s, directory.path()), 1000);
     QCOMPARE(file.state, state);
     QTEST(file.error, "error");
     QCOMPARE(file.content, QByteArray());
@@ -114,9 +113,9 @@ void TestRegularFile::refuses()
 void TestRegularFile::withoutDescriptors()
 {
     const UsedUpDescriptors none;
-    const RegularFile file = readRegularFile(QStringLiteral("/proc/version"), 1000);
+    const RegularFile file = readRegularFile("/proc/version"_s, 1000);
     QCOMPARE(file.state, State::NotOpened);
-    QCOMPARE(file.error, QStringLiteral("Too many open files"));
+    QCOMPARE(file.error, "Too many open files"_s);
 }
 
 QTEST_GUILESS_MAIN(TestRegularFile)

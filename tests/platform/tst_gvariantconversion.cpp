@@ -3,6 +3,7 @@
 
 #include "gvariantconversion.h"
 #include "loggedtest.h"
+#include "texts.h"
 
 #include <QDate>
 #include <QDebug>
@@ -75,7 +76,7 @@ void TestGVariantConversion::bothWays_data()
     const auto row = [](const char *name, const QVariant &value, const char *printed) {
         QTest::newRow(name) << value << printed;
     };
-    const QString text = QStringLiteral("text");
+    const QString text = "text"_s;
     const QString marks = QString(2, QChar(QChar::ByteOrderMark));
     row("true", true, "true");
     row("false", false, "false");
@@ -85,13 +86,11 @@ void TestGVariantConversion::bothWays_data()
     row("qulonglong", std::numeric_limits<qulonglong>::max(), "uint64 18446744073709551615");
     row("string", text, "'text'");
     row("empty string", QString(), "''");
-    row("beyond Latin", QStringLiteral("Ünïcödé 日本 😀"), "'Ünïcödé 日本 😀'");
+    row("beyond Latin", "Ünïcödé 日本 😀"_s, "'Ünïcödé 日本 😀'");
     row("byte order mark", marks + text, "'\\ufeff\\ufefftext'");
-    row("string list", QStringList{QStringLiteral("b"), QString(), text}, "['b', '', 'text']");
+    row("string list", QStringList{"b"_s, QString(), text}, "['b', '', 'text']");
     row("empty string list", QStringList(), "@as []");
-    row("map",
-        QVariantMap{
-            {QStringLiteral("b"), 15}, {QStringLiteral("a"), QStringList{text}}, {QString(), true}},
+    row("map", QVariantMap{{"b"_s, 15}, {"a"_s, QStringList{text}}, {QString(), true}},
         "{'': <true>, 'a': <['text']>, 'b': <15>}");
     row("empty map", QVariantMap(), "@a{sv} {}");
 }
@@ -121,10 +120,10 @@ void TestGVariantConversion::refusesOtherTypes_data()
     const auto row = [](const char *name, const QVariant &value, const char *reason) {
         QTest::newRow(name) << value << reason;
     };
-    const QString key = QStringLiteral("k");
+    const QString key = "k"_s;
     row("bytes", QByteArray("bytes"), "a value of type QByteArray");
     row("date", QDate(2026, 1, 2), "a value of type QDate");
-    row("URL", QUrl(QStringLiteral("file:///x")), "a value of type QUrl");
+    row("URL", QUrl("file:///x"_s), "a value of type QUrl");
     row("character", QChar(u'x'), "a value of type QChar");
     row("null pointer", QVariant::fromValue(nullptr), "a value of type std::nullptr_t");
     row("object", QVariant::fromValue<QObject *>(this), "a value of type QObject*");
@@ -151,7 +150,7 @@ void TestGVariantConversion::refusesInvalidText_data()
 {
     QTest::addColumn<QString>("text");
 
-    const QString around = QStringLiteral("x");
+    const QString around = "x"_s;
     QTest::newRow("NUL") << around + QChar(QChar::Null) + around;
     QTest::newRow("NUL at the end") << around + QChar(QChar::Null);
     QTest::newRow("high surrogate") << around + QChar(0xD83D) + around;
@@ -164,7 +163,7 @@ void TestGVariantConversion::refusesInvalidText()
 {
     QFETCH(const QString, text);
 
-    const QString fine = QStringLiteral("fine");
+    const QString fine = "fine"_s;
     const QVariantList carriers = {
         text,
         QStringList{fine, text},
@@ -175,8 +174,7 @@ void TestGVariantConversion::refusesInvalidText()
     for (const QVariant &carrier : carriers) {
         QString reason;
         QVERIFY2(!toGVariant(carrier, &reason), qPrintable(describe(carrier)));
-        QCOMPARE(reason,
-                 QStringLiteral("text of type QString with a NUL or half a surrogate pair"));
+        QCOMPARE(reason, "text of type QString with a NUL or half a surrogate pair"_s);
     }
 }
 
@@ -185,8 +183,8 @@ void TestGVariantConversion::readsForeignTypes_data()
     QTest::addColumn<QVariant>("value");
 
     const auto row = [](const char *text, const QVariant &value) { QTest::newRow(text) << value; };
-    const QString a = QStringLiteral("a");
-    const QString b = QStringLiteral("b");
+    const QString a = "a"_s;
+    const QString b = "b"_s;
     const QVariantList nothing;
     row("byte 0xff", 255);
     row("int16 -5", -5);

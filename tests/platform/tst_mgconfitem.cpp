@@ -6,6 +6,7 @@
 #include "loggedtest.h"
 #include "mgconfitem.h"
 #include "patience.h"
+#include "texts.h"
 
 #include <QDBusConnection>
 #include <QDBusConnectionInterface>
@@ -34,7 +35,7 @@
 */
 namespace scenarios {
 
-const QString followedKey = QStringLiteral("/test/child/followed");
+const QString followedKey = "/test/child/followed"_s;
 
 void say(const char *line)
 {
@@ -46,14 +47,14 @@ void say(const char *line)
 int setAndExit(QCoreApplication &app)
 {
     for (int i = 0; i < app.arguments().at(2).toInt(); ++i) {
-        MGConfItem(QStringLiteral("/test/child/key%1").arg(i)).set(i);
+        MGConfItem("/test/child/key%1"_s.arg(i)).set(i);
     }
     return 0;
 }
 
 int setLocked(QCoreApplication &)
 {
-    MGConfItem item(QStringLiteral("/test/locked"));
+    MGConfItem item("/test/locked"_s);
     item.set(1);
     say(qPrintable(item.value().toString()));
     return 0;
@@ -84,8 +85,8 @@ int follow(QCoreApplication &app)
     MGConfItem item(followedKey);
     const MGConfItem another(followedKey); // a warning must not come twice
     QObject::connect(&item, &MGConfItem::valueChanged, &app, [] { say("changed"); });
-    if (app.arguments().value(2) == QStringLiteral("set")) {
-        item.set(QStringLiteral("own"));
+    if (app.arguments().value(2) == "set"_s) {
+        item.set("own"_s);
     }
     say("ready");
     return app.exec();
@@ -116,17 +117,17 @@ int outliveTheBus(QCoreApplication &app)
 }
 
 const QHash<QString, int (*)(QCoreApplication &)> all = {
-    {QStringLiteral("setAndExit"), setAndExit},           {QStringLiteral("setLocked"), setLocked},
-    {QStringLiteral("setAndSeeItFail"), setAndSeeItFail}, {QStringLiteral("follow"), follow},
-    {QStringLiteral("outliveTheBus"), outliveTheBus},
+    {"setAndExit"_s, setAndExit},           {"setLocked"_s, setLocked},
+    {"setAndSeeItFail"_s, setAndSeeItFail}, {"follow"_s, follow},
+    {"outliveTheBus"_s, outliveTheBus},
 };
 
 } // namespace scenarios
 
 namespace {
 
-const QString busVariable = QStringLiteral("DBUS_SESSION_BUS_ADDRESS");
-const QString noBus = QStringLiteral("unix:path=/nonexistent");
+const QString busVariable = "DBUS_SESSION_BUS_ADDRESS"_s;
+const QString noBus = "unix:path=/nonexistent"_s;
 
 const QByteArray withoutBus =
     "MGConfItem: without a session bus settings can neither be stored nor "
@@ -221,10 +222,9 @@ class Bus : public QProcess
 public:
     Bus()
     {
-        start(QStringLiteral("dbus-daemon"),
-              {QStringLiteral("--session"), QStringLiteral("--nofork"),
-               QStringLiteral("--print-address"),
-               QStringLiteral("--address=unix:dir=") + qEnvironmentVariable("XDG_RUNTIME_DIR")});
+        start("dbus-daemon"_s,
+              {"--session"_s, "--nofork"_s, "--print-address"_s,
+               "--address=unix:dir="_s + qEnvironmentVariable("XDG_RUNTIME_DIR")});
         if (!waitForReadyRead()) {
             qFatal("no session bus starts");
         }
@@ -246,7 +246,7 @@ private:
 QString newKey()
 {
     static int count = 0;
-    return QStringLiteral("/test/key%1").arg(++count);
+    return "/test/key%1"_s.arg(++count);
 }
 
 // Stops a process for the lifetime of this object.
@@ -265,7 +265,7 @@ private:
 pid_t servicePid()
 {
     const QDBusReply<uint> pid =
-        QDBusConnection::sessionBus().interface()->servicePid(QStringLiteral("ca.desrt.dconf"));
+        QDBusConnection::sessionBus().interface()->servicePid("ca.desrt.dconf"_s);
     if (!pid.isValid()) {
         qFatal("dconf-service does not run");
     }
@@ -331,7 +331,7 @@ private Q_SLOTS:
     void cleanup()
     {
         LoggedTest::cleanup();
-        DconfTool::reset(QStringLiteral("/test/"));
+        DconfTool::reset("/test/"_s);
     }
 
     void startsUnset();
@@ -417,11 +417,7 @@ void TestMGConfItem::setIsSeenByEveryItemBeforeItReturns()
 void TestMGConfItem::equalValueEmitsNothing()
 {
     const QVariantList values = {
-        1,
-        QStringLiteral("x"),
-        QStringList{QStringLiteral("x")},
-        QStringList(),
-        QVariantMap{{QStringLiteral("k"), QStringList{QStringLiteral("x")}}},
+        1, "x"_s, QStringList{"x"_s}, QStringList(), QVariantMap{{"k"_s, QStringList{"x"_s}}},
     };
     for (const QVariant &value : values) {
         const QString key = newKey();
@@ -481,10 +477,10 @@ void TestMGConfItem::unsetForgetsTheValue()
 void TestMGConfItem::temporaryItemStores()
 {
     for (int i = 0; i < 20; ++i) {
-        MGConfItem(QStringLiteral("/test/many/key%1").arg(i)).set(i);
+        MGConfItem("/test/many/key%1"_s.arg(i)).set(i);
     }
     for (int i = 0; i < 20; ++i) {
-        const QString key = QStringLiteral("/test/many/key%1").arg(i);
+        const QString key = "/test/many/key%1"_s.arg(i);
         QTRY_COMPARE(DconfTool::read(key), QByteArray::number(i));
     }
 }
@@ -556,7 +552,7 @@ void TestMGConfItem::followsOtherProcesses()
     DconfTool::write(key, "'theirs'");
     QTRY_COMPARE(item.changes(), 1);
     QTRY_COMPARE(another.changes(), 1);
-    QCOMPARE(describe(item.value()), describe(QStringLiteral("theirs")));
+    QCOMPARE(describe(item.value()), describe("theirs"_s));
 
     DconfTool::reset(key);
     QTRY_COMPARE(item.changes(), 2);
@@ -566,16 +562,15 @@ void TestMGConfItem::followsOtherProcesses()
 
 void TestMGConfItem::followsSeveralChangesAtOnce()
 {
-    const Item first(QStringLiteral("/test/directory/first"));
-    const Item second(QStringLiteral("/test/directory/below/second"));
-    Item same(QStringLiteral("/test/directory/same"));
-    const Item untouched(QStringLiteral("/test/directory/untouched"));
-    const Item neighbour(QStringLiteral("/test/directory2"));
+    const Item first("/test/directory/first"_s);
+    const Item second("/test/directory/below/second"_s);
+    Item same("/test/directory/same"_s);
+    const Item untouched("/test/directory/untouched"_s);
+    const Item neighbour("/test/directory2"_s);
     store(&same, 3);
     same.forgetChanges();
 
-    DconfTool::run({QStringLiteral("load"), QStringLiteral("/test/directory/")},
-                   "[/]\nfirst=1\nsame=3\n[below]\nsecond=2\n");
+    DconfTool::run({"load"_s, "/test/directory/"_s}, "[/]\nfirst=1\nsame=3\n[below]\nsecond=2\n");
     QTRY_COMPARE(first.changes(), 1);
     QTRY_COMPARE(second.changes(), 1);
     QCOMPARE(describe(first.value()), describe(1));
@@ -589,13 +584,13 @@ void TestMGConfItem::followsSeveralChangesAtOnce()
 
 void TestMGConfItem::followsTheResetOfADirectory()
 {
-    Item inside(QStringLiteral("/test/directory/inside"));
-    const Item empty(QStringLiteral("/test/directory/empty"));
-    Item neighbour(QStringLiteral("/test/directory2"));
+    Item inside("/test/directory/inside"_s);
+    const Item empty("/test/directory/empty"_s);
+    Item neighbour("/test/directory2"_s);
     inside.set(1);
     store(&neighbour, 2);
 
-    DconfTool::reset(QStringLiteral("/test/directory/"));
+    DconfTool::reset("/test/directory/"_s);
     QTRY_COMPARE(inside.changes(), 2);
     QVERIFY(!inside.value().isValid());
     QTest::qWait(100);
@@ -610,7 +605,7 @@ void TestMGConfItem::missesNothingWhileTheBusIsSlow()
     // the values before and after it starts to watch the key.
     Bus bus;
     auto stopped = std::make_unique<Stopped>(static_cast<pid_t>(bus.processId()));
-    Child child({QStringLiteral("follow")}, busVariable, bus.address());
+    Child child({"follow"_s}, busVariable, bus.address());
     QVERIFY(child.says("ready"));
     DconfTool::write(scenarios::followedKey, "'theirs'");
     QCOMPARE(DconfTool::read(scenarios::followedKey), QByteArray("'theirs'"));
@@ -724,7 +719,7 @@ void TestMGConfItem::storesWhatOthersRead_data()
     QTest::addColumn<QVariant>("value");
     QTest::addColumn<QByteArray>("printed");
 
-    const QString text = QStringLiteral("tëxt");
+    const QString text = "tëxt"_s;
     QTest::newRow("uint") << QVariant(5U) << QByteArray("uint32 5");
     QTest::newRow("empty string list") << QVariant(QStringList()) << QByteArray("@as []");
     QTest::newRow("map") << QVariant(QVariantMap{{text, QStringList{text}}})
@@ -749,8 +744,7 @@ void TestMGConfItem::readsWhatOthersStore_data()
     QTest::addColumn<QVariant>("value");
 
     QTest::newRow("true") << QVariant(true);
-    QTest::newRow("{'a': <[1, 2]>}")
-        << QVariant(QVariantMap{{QStringLiteral("a"), QVariantList{1, 2}}});
+    QTest::newRow("{'a': <[1, 2]>}") << QVariant(QVariantMap{{"a"_s, QVariantList{1, 2}}});
     QTest::newRow("handle 5") << QVariant(QVariantList());
 }
 
@@ -771,7 +765,7 @@ void TestMGConfItem::refusesOtherValues_data()
     QTest::addColumn<QVariant>("value");
     QTest::addColumn<QString>("reason");
 
-    QTest::newRow("type") << QVariant(QUrl(QStringLiteral("file:///x"))) << "a value of type QUrl";
+    QTest::newRow("type") << QVariant(QUrl("file:///x"_s)) << "a value of type QUrl";
     QTest::newRow("lone surrogate in a key")
         << QVariant(QVariantMap{{QString(QChar(0xD83D)), 1}})
         << "text of type QString with a NUL or half a surrogate pair";
@@ -787,7 +781,8 @@ void TestMGConfItem::refusesOtherValues()
     store(&item, 1);
     item.set(value);
     QCOMPARE(m_log->takeReport(),
-             QStringLiteral("warning [org.tarnwickos.settings.platform] MGConfItem: %1 cannot hold %2").arg(key, reason));
+             "warning [org.tarnwickos.settings.platform] MGConfItem: %1 cannot hold %2"_s.arg(
+                 key, reason));
     QCOMPARE(item.changes(), 1);
     QCOMPARE(describe(item.value()), describe(1));
     DconfTool::waitUntilStored();
@@ -803,12 +798,12 @@ void TestMGConfItem::badKeyIsInert_data()
         QTest::newRow(name) << key << QString::fromUtf8(key.toUtf8().constData());
     };
     row("empty", QString());
-    row("relative", QStringLiteral("test/bad/key"));
-    row("directory", QStringLiteral("/test/bad/"));
-    row("root", QStringLiteral("/"));
-    row("two slashes", QStringLiteral("/test/bad//key"));
-    row("NUL", QStringLiteral("/test/bad/key") + QChar(QChar::Null) + QStringLiteral("x"));
-    row("lone surrogate", QStringLiteral("/test/bad/key") + QChar(0xD83D));
+    row("relative", "test/bad/key"_s);
+    row("directory", "/test/bad/"_s);
+    row("root", "/"_s);
+    row("two slashes", "/test/bad//key"_s);
+    row("NUL", "/test/bad/key"_s + QChar(QChar::Null) + "x"_s);
+    row("lone surrogate", "/test/bad/key"_s + QChar(0xD83D));
 }
 
 void TestMGConfItem::badKeyIsInert()
@@ -817,33 +812,31 @@ void TestMGConfItem::badKeyIsInert()
     QFETCH(const QString, named);
 
     Item item(key);
-    QCOMPARE(m_log->takeTexts(),
-             QStringList(QStringLiteral("MGConfItem: \"%1\" is not a dconf key").arg(named)));
+    QCOMPARE(m_log->takeTexts(), QStringList("MGConfItem: \"%1\" is not a dconf key"_s.arg(named)));
     item.set(1);
     item.set(QUrl());
     item.unset();
     QCOMPARE(item.key(), key);
     QVERIFY(!item.value().isValid());
     QCOMPARE(describe(item.value(7)), describe(7));
-    DconfTool::write(QStringLiteral("/test/bad/key"), "1");
+    DconfTool::write("/test/bad/key"_s, "1");
     QTest::qWait(50);
     QCOMPARE(item.changes(), 0);
-    QCOMPARE(DconfTool::run({QStringLiteral("list"), QStringLiteral("/test/bad/")}),
-             QByteArray("key"));
+    QCOMPARE(DconfTool::run({"list"_s, "/test/bad/"_s}), QByteArray("key"));
 }
 
 void TestMGConfItem::lockedKeyStays()
 {
     const QTemporaryDir directory;
-    const QString database = directory.filePath(QStringLiteral("db"));
-    const QString profile = directory.filePath(QStringLiteral("profile"));
-    const QString keys = directory.filePath(QStringLiteral("keys"));
-    Files::write(keys + QStringLiteral("/values"), "[test]\nlocked='vendor'\n");
-    Files::write(keys + QStringLiteral("/locks/locks"), "/test/locked\n");
-    DconfTool::run({QStringLiteral("compile"), database, keys});
+    const QString database = directory.filePath("db"_s);
+    const QString profile = directory.filePath("profile"_s);
+    const QString keys = directory.filePath("keys"_s);
+    Files::write(keys + "/values"_s, "[test]\nlocked='vendor'\n");
+    Files::write(keys + "/locks/locks"_s, "/test/locked\n");
+    DconfTool::run({"compile"_s, database, keys});
     Files::write(profile, "user-db:user\nfile-db:" + database.toUtf8());
 
-    Child child({QStringLiteral("setLocked")}, QStringLiteral("DCONF_PROFILE"), profile);
+    Child child({"setLocked"_s}, "DCONF_PROFILE"_s, profile);
     QVERIFY(child.succeeds());
     QCOMPARE(child.lines(), QList<QByteArray>{"vendor"});
     const QList<QByteArray> warnings = child.warnings();
@@ -863,8 +856,8 @@ void TestMGConfItem::failedStoreReverts()
     {
         // A file in place of the database's directory: nobody can write there, not even root.
         QDir config(qEnvironmentVariable("XDG_CONFIG_HOME"));
-        const QString directory = QStringLiteral("dconf");
-        const QString aside = QStringLiteral("dconf.aside");
+        const QString directory = "dconf"_s;
+        const QString aside = "dconf.aside"_s;
         QVERIFY(config.rename(directory, aside));
         const auto restore = qScopeGuard([&] {
             config.remove(directory);
@@ -898,11 +891,11 @@ void TestMGConfItem::exitLosesNothing()
     QFETCH(const int, count);
 
     for (int round = 0; round < 5; ++round) {
-        DconfTool::reset(QStringLiteral("/test/child/"));
-        Child child({QStringLiteral("setAndExit"), QString::number(count)});
+        DconfTool::reset("/test/child/"_s);
+        Child child({"setAndExit"_s, QString::number(count)});
         QVERIFY(child.succeeds());
         for (int i = 0; i < count; ++i) {
-            const QString key = QStringLiteral("/test/child/key%1").arg(i);
+            const QString key = "/test/child/key%1"_s.arg(i);
             QCOMPARE(DconfTool::read(key), QByteArray::number(i));
         }
         QCOMPARE(child.warnings(), QList<QByteArray>());
@@ -911,9 +904,9 @@ void TestMGConfItem::exitLosesNothing()
 
 void TestMGConfItem::exitDoesNotHangOnAStoppedService()
 {
-    DconfTool::write(QStringLiteral("/test/key"), "1"); // starts the service, if need be
+    DconfTool::write("/test/key"_s, "1"); // starts the service, if need be
     const Stopped stopped(servicePid());
-    Child child({QStringLiteral("setAndExit"), QStringLiteral("2")});
+    Child child({"setAndExit"_s, "2"_s});
     // A missing answer counts as a failure after 25 s. The exit must not wait that long.
     QVERIFY(child.waitForFinished(20000));
     QVERIFY(child.succeeds());
@@ -921,13 +914,13 @@ void TestMGConfItem::exitDoesNotHangOnAStoppedService()
 
 void TestMGConfItem::withoutABusWarnsOnce()
 {
-    Child child({QStringLiteral("setAndSeeItFail")}, busVariable, noBus);
+    Child child({"setAndSeeItFail"_s}, busVariable, noBus);
     QVERIFY(child.succeeds());
     QCOMPARE(child.warnings(), QList<QByteArray>{withoutBus});
     QVERIFY(child.lines().isEmpty() || child.lines().last() == "reverted");
 
     // The exit neither waits for the missing bus nor fails.
-    Child brief({QStringLiteral("setAndExit"), QStringLiteral("2")}, busVariable, noBus);
+    Child brief({"setAndExit"_s, "2"_s}, busVariable, noBus);
     QVERIFY(brief.succeeds());
 }
 
@@ -935,8 +928,7 @@ void TestMGConfItem::withoutGlibWarnsOnce()
 {
     // The run with GLib shows that the item then sees the change.
     for (const bool hasGlib : {false, true}) {
-        Child child({QStringLiteral("follow"), QStringLiteral("set")}, QStringLiteral("QT_NO_GLIB"),
-                    hasGlib ? QString() : QStringLiteral("1"));
+        Child child({"follow"_s, "set"_s}, "QT_NO_GLIB"_s, hasGlib ? QString() : "1"_s);
         QVERIFY(child.says("ready"));
         QTRY_COMPARE(DconfTool::read(scenarios::followedKey), QByteArray("'own'"));
         DconfTool::write(scenarios::followedKey, "'theirs'");
@@ -957,7 +949,7 @@ void TestMGConfItem::withoutGlibWarnsOnce()
 void TestMGConfItem::outlivesTheBus()
 {
     Bus bus;
-    Child child({QStringLiteral("outliveTheBus")}, busVariable, bus.address());
+    Child child({"outliveTheBus"_s}, busVariable, bus.address());
     QVERIFY(child.says("ready"));
     bus.kill();
     QVERIFY(bus.waitForFinished());

@@ -5,8 +5,10 @@
 
 #include "files.h"
 #include "gallery/simulation/languageforwarder.h"
+#include "languagelistener.h"
 #include "loggedtest.h"
 #include "moduletypes.h"
+#include "texts.h"
 
 #include <QJsonObject>
 #include <QMetaProperty>
@@ -60,7 +62,7 @@ QString englishOnly()
 
 QString catalogPath(const char *name)
 {
-    return QStringLiteral("/usr/share/translations/%1.qm").arg(QLatin1String(name));
+    return "/usr/share/translations/%1.qm"_s.arg(QLatin1String(name));
 }
 
 void changeLanguage(const QString &locale)
@@ -69,20 +71,6 @@ void changeLanguage(const QString &locale)
     QEvent change(QEvent::LanguageChange);
     QCoreApplication::sendEvent(QCoreApplication::instance(), &change);
 }
-
-// Counts the language changes of the application.
-class LanguageChanges : public QObject
-{
-public:
-    LanguageChanges() { QCoreApplication::instance()->installEventFilter(this); }
-    bool eventFilter(QObject *watched, QEvent *event) override
-    {
-        const bool counts = watched == QCoreApplication::instance();
-        count += counts && event->type() == QEvent::LanguageChange ? 1 : 0;
-        return QObject::eventFilter(watched, event);
-    }
-    int count = 0;
-};
 
 } // namespace
 
@@ -99,7 +87,7 @@ std::unique_ptr<QObject> TestPlugin::create(QQmlEngine *engine, const QByteArray
     QQmlComponent component(engine);
     component.setData("import QtQml 2.15\nimport com.marlo.settings.system " + version + "\n"
                           + object,
-                      QUrl(QStringLiteral("test.qml")));
+                      QUrl("test.qml"_s));
     std::unique_ptr<QObject> created(component.create());
     if (created == nullptr) {
         qWarning("%s", qPrintable(component.errorString()));
@@ -114,8 +102,8 @@ void TestPlugin::init()
         Files::installCatalog(QString::fromLatin1(name));
     }
     // Without it BluetoothInfo warns.
-    Files::write(QStringLiteral("/var/lib/bluetooth/board-address"), "00:1A:7D:DA:71:13\n");
-    QLocale::setDefault(QLocale(QStringLiteral("fi_FI")));
+    Files::write("/var/lib/bluetooth/board-address"_s, "00:1A:7D:DA:71:13\n");
+    QLocale::setDefault(QLocale("fi_FI"_s));
     LoggedTest::init();
 }
 
@@ -123,11 +111,9 @@ void TestPlugin::metaData()
 {
     const QPluginLoader loader(libraryPath());
     const QJsonObject metaData = loader.metaData();
-    QCOMPARE(metaData.value(QStringLiteral("IID")).toString(),
-             QStringLiteral("com.marlo.settings.system"));
-    QCOMPARE(metaData.value(QStringLiteral("className")).toString(),
-             QStringLiteral("SystemSettingsPlugin"));
-    QCOMPARE(metaData.value(QStringLiteral("MetaData")).toObject(), QJsonObject());
+    QCOMPARE(metaData.value("IID"_s).toString(), "com.marlo.settings.system"_s);
+    QCOMPARE(metaData.value("className"_s).toString(), "SystemSettingsPlugin"_s);
+    QCOMPARE(metaData.value("MetaData"_s).toObject(), QJsonObject());
 }
 
 void TestPlugin::oneInstance()
@@ -258,7 +244,7 @@ void TestPlugin::theTextFileReaderIsNotCreatable()
     QQmlEngine engine;
     QVERIFY(create(&engine, "TextFileReader {}") == nullptr);
     const QString errors = m_log->takeReport();
-    QVERIFY2(errors.contains(QStringLiteral("not creatable")), qPrintable(errors));
+    QVERIFY2(errors.contains("not creatable"_s), qPrintable(errors));
 }
 
 void TestPlugin::platformSwitchesAreReachable()
@@ -286,21 +272,21 @@ void TestPlugin::otherVersionsAreNotThere()
         QQmlEngine engine;
         QVERIFY(create(&engine, "QtObject {}", version) == nullptr);
         const QString errors = m_log->takeReport();
-        QVERIFY2(errors.contains(QStringLiteral("is not installed")), qPrintable(errors));
+        QVERIFY2(errors.contains("is not installed"_s), qPrintable(errors));
     }
 }
 
 void TestPlugin::englishAnswersWithoutACatalog()
 {
-    QLocale::setDefault(QLocale(QStringLiteral("sv_SE")));
+    QLocale::setDefault(QLocale("sv_SE"_s));
     QQmlEngine engine;
     QVERIFY(create(&engine, "QtObject {}") != nullptr);
-    QCOMPARE(both(), QStringLiteral("Both, engineering English"));
+    QCOMPARE(both(), "Both, engineering English"_s);
 }
 
 void TestPlugin::importAnnouncesNothingAtOnce()
 {
-    const LanguageChanges changes;
+    const LanguageListener changes;
     QQmlEngine engine;
     QVERIFY(create(&engine, "QtObject {}") != nullptr);
     QCOMPARE(changes.count, 0);
@@ -327,20 +313,20 @@ void TestPlugin::followsLanguageChanges()
                                "property string english: qsTrId('settings-test-english') }");
     QVERIFY(object != nullptr);
     // The language wins over engineering English.
-    QCOMPARE(object->property("both").toString(), QStringLiteral("Molemmat"));
-    QCOMPARE(object->property("english").toString(), QStringLiteral("English only"));
+    QCOMPARE(object->property("both").toString(), "Molemmat"_s);
+    QCOMPARE(object->property("english").toString(), "English only"_s);
 
-    QLocale::setDefault(QLocale(QStringLiteral("de_DE")));
+    QLocale::setDefault(QLocale("de_DE"_s));
     QEvent change(QEvent::LanguageChange);
     QCoreApplication::sendEvent(&engine, &change);
     QCOMPARE(engine.languageChanges, 1);
     engine.retranslate();
-    QCOMPARE(object->property("both").toString(), QStringLiteral("Beide"));
-    QCOMPARE(object->property("english").toString(), QStringLiteral("English only"));
+    QCOMPARE(object->property("both").toString(), "Beide"_s);
+    QCOMPARE(object->property("english").toString(), "English only"_s);
 
-    QLocale::setDefault(QLocale(QStringLiteral("sv_SE")));
+    QLocale::setDefault(QLocale("sv_SE"_s));
     QCoreApplication::sendEvent(&engine, &change);
-    QCOMPARE(both(), QStringLiteral("Both, engineering English"));
+    QCOMPARE(both(), "Both, engineering English"_s);
 }
 
 void TestPlugin::restsAfterEachLanguageChange()
@@ -348,7 +334,7 @@ void TestPlugin::restsAfterEachLanguageChange()
     QCoreApplication::sendPostedEvents(); // what other tests left
     const QByteArray document = "QtObject { property string both: qsTrId('settings-test-both') }";
     QQmlEngine engine;
-    LanguageChanges changes;
+    LanguageListener changes;
     new LanguageForwarder(&engine);
     const auto object = create(&engine, document);
     QVERIFY(object != nullptr);
@@ -363,44 +349,44 @@ void TestPlugin::restsAfterEachLanguageChange()
     restsAfter(2);
 
     // One change is sent here; the other one announces the catalog that was loaded.
-    changeLanguage(QStringLiteral("de_DE"));
+    changeLanguage("de_DE"_s);
     restsAfter(2);
-    QCOMPARE(object->property("both").toString(), QStringLiteral("Beide"));
+    QCOMPARE(object->property("both").toString(), "Beide"_s);
 
     // The same locale and the same file.
-    changeLanguage(QStringLiteral("de_DE"));
+    changeLanguage("de_DE"_s);
     restsAfter(1);
 
     // A package replaces the file.
     QVERIFY(QFile::remove(catalogPath("settings-system-de")));
     QVERIFY(QFile::rename(catalogPath("settings-system-fi"), catalogPath("settings-system-de")));
-    changeLanguage(QStringLiteral("de_DE"));
+    changeLanguage("de_DE"_s);
     restsAfter(2);
-    QCOMPARE(object->property("both").toString(), QStringLiteral("Molemmat"));
+    QCOMPARE(object->property("both").toString(), "Molemmat"_s);
 
     // A locale without a catalog.
-    changeLanguage(QStringLiteral("sv_SE"));
+    changeLanguage("sv_SE"_s);
     restsAfter(2);
-    QCOMPARE(object->property("both").toString(), QStringLiteral("Both, engineering English"));
+    QCOMPARE(object->property("both").toString(), "Both, engineering English"_s);
 }
 
 void TestPlugin::translatorsGoWithTheirEngine()
 {
     auto first = std::make_unique<QQmlEngine>();
     QVERIFY(create(first.get(), "QtObject {}") != nullptr);
-    QLocale::setDefault(QLocale(QStringLiteral("de_DE")));
+    QLocale::setDefault(QLocale("de_DE"_s));
     auto second = std::make_unique<QQmlEngine>();
     QVERIFY(create(second.get(), "QtObject {}") != nullptr);
 
     // Each engine has a pair. The later engine's language wins; the earlier one stays installed.
     QCOMPARE(first->findChildren<QTranslator *>().size(), 2);
     QCOMPARE(second->findChildren<QTranslator *>().size(), 2);
-    QCOMPARE(both(), QStringLiteral("Beide"));
+    QCOMPARE(both(), "Beide"_s);
     second.reset();
-    QCOMPARE(both(), QStringLiteral("Molemmat"));
+    QCOMPARE(both(), "Molemmat"_s);
     first.reset();
-    QCOMPARE(both(), QStringLiteral("settings-test-both"));
-    QCOMPARE(englishOnly(), QStringLiteral("settings-test-english"));
+    QCOMPARE(both(), "settings-test-both"_s);
+    QCOMPARE(englishOnly(), "settings-test-english"_s);
 }
 
 QTEST_GUILESS_MAIN(TestPlugin)

@@ -365,17 +365,3 @@ void ListModelTest::dyingModelMayBeUsed()
     // Nothing was loaded into the dying model.
     QCOMPARE(qtTrId("maps-title"), "maps-title"_s);
 }
-
-LanguageListener::LanguageListener(std::function<void()> answer) : m_answer(std::move(answer))
-{
-    QCoreApplication::instance()->installEventFilter(this);
-}
-
-bool LanguageListener::eventFilter(QObject *watched, QEvent *event)
-{
-    if (event->type() == QEvent::LanguageChange) {
-        ++count;
-        m_answer();
-    }
-    return QObject::eventFilter(watched, event);
-}

@@ -4,6 +4,7 @@
 #ifndef LISTMODELTEST_H
 #define LISTMODELTEST_H
 
+#include "languagelistener.h"
 #include "loggedtest.h"
 #include "rowevents.h"
 
@@ -125,20 +126,6 @@ private:
     QStringList m_messages;
     std::unique_ptr<RowEvents> m_events;
     std::unique_ptr<QAbstractItemModelTester> m_tester;
-};
-
-// Calls a function on every language change of the application. Installing or removing a catalog
-// causes such a change.
-class LanguageListener : public QObject
-{
-public:
-    explicit LanguageListener(std::function<void()> answer);
-    bool eventFilter(QObject *watched, QEvent *event) override;
-
-    int count = 0;
-
-private:
-    std::function<void()> m_answer;
 };
 
 #endif

@@ -3,6 +3,7 @@
 
 #include "files.h"
 #include "loggedtest.h"
+#include "texts.h"
 #include "translations/apptranslator.h"
 
 #include <QtTest>
@@ -34,8 +35,8 @@ private:
 
 namespace {
 
-const QString finnish = QStringLiteral("Molemmat");
-const QString german = QStringLiteral("Beide");
+const QString finnish = "Molemmat"_s;
+const QString german = "Beide"_s;
 
 // Records the events that pass a filter that was installed later.
 class EventCounter : public QObject
@@ -57,7 +58,7 @@ void TestAppTranslator::init()
          {"settings-system_eng_en", "settings-system-fi", "settings-system-de"}) {
         Files::installCatalog(QString::fromLatin1(name));
     }
-    QLocale::setDefault(QLocale(QStringLiteral("fi_FI")));
+    QLocale::setDefault(QLocale("fi_FI"_s));
     LoggedTest::init();
     m_engine = std::make_unique<QObject>();
     m_translator = new AppTranslator(m_engine.get());
@@ -87,27 +88,26 @@ void TestAppTranslator::loadsEngineeringEnglish()
 {
     AppTranslator translator(nullptr);
     translator.loadEngineeringEnglish();
-    QCOMPARE(translator.translate(nullptr, "settings-test-both"),
-             QStringLiteral("Both, engineering English"));
+    QCOMPARE(translator.translate(nullptr, "settings-test-both"), "Both, engineering English"_s);
 }
 
 void TestAppTranslator::followsLanguageChanges()
 {
-    QLocale::setDefault(QLocale(QStringLiteral("de_DE")));
+    QLocale::setDefault(QLocale("de_DE"_s));
     QCOMPARE(text(), finnish);
     send(QEvent::LanguageChange);
     QCOMPARE(text(), german);
 
     // A language without a catalog.
-    QLocale::setDefault(QLocale(QStringLiteral("sv_SE")));
+    QLocale::setDefault(QLocale("sv_SE"_s));
     send(QEvent::LanguageChange);
     QVERIFY(m_translator->isEmpty());
 }
 
 void TestAppTranslator::loadsWhatIsNew()
 {
-    const QString path = QStringLiteral("/usr/share/translations/settings-system-fi.qm");
-    QFile other(QStringLiteral("/usr/share/translations/settings-system-de.qm"));
+    const QString path = "/usr/share/translations/settings-system-fi.qm"_s;
+    QFile other("/usr/share/translations/settings-system-de.qm"_s);
     QVERIFY(other.open(QIODevice::ReadOnly));
     Files::write(path, other.readAll());
     QCOMPARE(text(), finnish);
@@ -118,7 +118,7 @@ void TestAppTranslator::loadsWhatIsNew()
     Files::remove(path);
     send(QEvent::LanguageChange);
     QVERIFY(m_translator->isEmpty());
-    Files::installCatalog(QStringLiteral("settings-system-fi"));
+    Files::installCatalog("settings-system-fi"_s);
     send(QEvent::LanguageChange);
     QCOMPARE(text(), finnish);
 }
@@ -139,7 +139,7 @@ void TestAppTranslator::passesEveryEventOn()
 
 void TestAppTranslator::otherEventsReadNothing()
 {
-    Files::removeCatalog(QStringLiteral("settings-system-fi"));
+    Files::removeCatalog("settings-system-fi"_s);
     send(QEvent::LocaleChange);
     send(QEvent::User);
     QCOMPARE(text(), finnish);
@@ -152,7 +152,7 @@ void TestAppTranslator::leavesTheApplicationWithItsParent()
     QCoreApplication::installTranslator(m_translator);
     QCOMPARE(qtTrId("settings-test-both"), finnish);
     m_engine.reset();
-    QCOMPARE(qtTrId("settings-test-both"), QStringLiteral("settings-test-both"));
+    QCOMPARE(qtTrId("settings-test-both"), "settings-test-both"_s);
 }
 
 QTEST_GUILESS_MAIN(TestAppTranslator)

@@ -2,13 +2,12 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 #include "files.h"
+#include "languagelistener.h"
 #include "loggedtest.h"
+#include "texts.h"
 #include "translations/catalogtable.h"
 
-#include <QScopedValueRollback>
 #include <QtTest>
-
-#include <functional>
 
 class TestCatalogTable : public LoggedTest
 {
@@ -40,9 +39,9 @@ private:
 
 namespace {
 
-const QString maps = QStringLiteral("maps");
-const QString a = QStringLiteral("/definitions/a");
-const QString b = QStringLiteral("/definitions/b");
+const QString maps = "maps"_s;
+const QString a = "/definitions/a"_s;
+const QString b = "/definitions/b"_s;
 
 QString title()
 {
@@ -61,7 +60,7 @@ void TestCatalogTable::init()
     for (const auto *name : {"maps_eng_en", "maps-fi", "maps-de", "atlas_eng_en"}) {
         Files::installCatalog(QString::fromLatin1(name));
     }
-    QLocale::setDefault(QLocale(QStringLiteral("fi_FI")));
+    QLocale::setDefault(QLocale("fi_FI"_s));
     LoggedTest::init();
     m_owner = std::make_unique<QObject>();
     m_table = std::make_unique<CatalogTable>(m_owner.get());
@@ -71,7 +70,7 @@ void TestCatalogTable::cleanup()
 {
     m_table.reset();
     m_owner.reset();
-    QCOMPARE(title(), QStringLiteral("maps-title"));
+    QCOMPARE(title(), "maps-title"_s);
     LoggedTest::cleanup();
 }
 
@@ -85,72 +84,70 @@ void TestCatalogTable::sharesOneCatalogAmongItsUsers()
     // One removal removes every use of a definition file. The language wins over engineering
     // English.
     m_table->removeDefinition(a, maps);
-    QCOMPARE(title(), QStringLiteral("Kartat"));
-    QCOMPARE(englishOnly(), QStringLiteral("Maps, English only"));
+    QCOMPARE(title(), "Kartat"_s);
+    QCOMPARE(englishOnly(), "Maps, English only"_s);
 
     m_table->removeDefinition(b, maps);
-    QCOMPARE(title(), QStringLiteral("maps-title"));
-    QCOMPARE(englishOnly(), QStringLiteral("maps-english"));
+    QCOMPARE(title(), "maps-title"_s);
+    QCOMPARE(englishOnly(), "maps-english"_s);
 }
 
 void TestCatalogTable::prefersTheCatalogOfTheRegion()
 {
     // Finnish, to distinguish it from the other catalog.
-    const QString regional = QStringLiteral("/usr/share/translations/maps-de_AT.qm");
-    QVERIFY(QFile::copy(QStringLiteral("/usr/share/translations/maps-fi.qm"), regional));
-    QLocale::setDefault(QLocale(QStringLiteral("de_AT")));
+    const QString regional = "/usr/share/translations/maps-de_AT.qm"_s;
+    QVERIFY(QFile::copy("/usr/share/translations/maps-fi.qm"_s, regional));
+    QLocale::setDefault(QLocale("de_AT"_s));
     m_table->addDefinition(a, maps);
-    QCOMPARE(title(), QStringLiteral("Kartat"));
+    QCOMPARE(title(), "Kartat"_s);
     Files::remove(regional);
 }
 
 void TestCatalogTable::fallsBackToCatalogsInstalledBefore()
 {
     // Installed earlier and with the same title, as the catalog of the settings pages may be.
-    Files::installCatalog(QStringLiteral("settings-system_eng_en"));
+    Files::installCatalog("settings-system_eng_en"_s);
     QTranslator settings;
-    QVERIFY(settings.load(QStringLiteral("settings-system_eng_en"),
-                          QStringLiteral("/usr/share/translations")));
+    QVERIFY(settings.load("settings-system_eng_en"_s, "/usr/share/translations"_s));
     QCoreApplication::installTranslator(&settings);
-    m_table->addDefinition(b, QStringLiteral("nowhere"));
-    QCOMPARE(title(), QStringLiteral("Maps, settings"));
+    m_table->addDefinition(b, "nowhere"_s);
+    QCOMPARE(title(), "Maps, settings"_s);
     m_table->addDefinition(a, maps);
-    QCOMPARE(title(), QStringLiteral("Kartat"));
+    QCOMPARE(title(), "Kartat"_s);
     m_table->removeDefinition(a, maps);
-    QCOMPARE(title(), QStringLiteral("Maps, settings"));
+    QCOMPARE(title(), "Maps, settings"_s);
 }
 
 void TestCatalogTable::installsCatalogsThatDoNotExist()
 {
-    m_table->addDefinition(a, QStringLiteral("nowhere"));
+    m_table->addDefinition(a, "nowhere"_s);
     QCOMPARE(translators().size(), 2);
     QVERIFY(translators().at(0)->isEmpty());
     QVERIFY(translators().at(1)->isEmpty());
-    QCOMPARE(title(), QStringLiteral("maps-title"));
+    QCOMPARE(title(), "maps-title"_s);
 
     // Empty translators are installed, too: once the test loads a file into one, titles use it.
-    QVERIFY(translators().at(1)->load(QStringLiteral("maps-fi"),
-                                      QStringLiteral("/usr/share/translations")));
-    QCOMPARE(title(), QStringLiteral("Kartat"));
-    m_table->removeDefinition(a, QStringLiteral("nowhere"));
-    QCOMPARE(title(), QStringLiteral("maps-title"));
+    QVERIFY(translators().at(1)->load("maps-fi"_s, "/usr/share/translations"_s));
+    QCOMPARE(title(), "Kartat"_s);
+    m_table->removeDefinition(a, "nowhere"_s);
+    QCOMPARE(title(), "maps-title"_s);
 }
 
 void TestCatalogTable::laterCatalogsWin()
 {
     m_table->addDefinition(a, maps);
-    m_table->addDefinition(b, QStringLiteral("atlas"));
-    QCOMPARE(title(), QStringLiteral("Atlas"));
-    m_table->removeDefinition(b, QStringLiteral("atlas"));
-    QCOMPARE(title(), QStringLiteral("Kartat"));
+    m_table->addDefinition(b, "atlas"_s);
+    QCOMPARE(title(), "Atlas"_s);
+    m_table->removeDefinition(b, "atlas"_s);
+    QCOMPARE(title(), "Kartat"_s);
 }
 
 void TestCatalogTable::keepsItsLanguageUntilItIsRemoved()
 {
     m_table->addDefinition(a, maps);
-    QLocale::setDefault(QLocale(QStringLiteral("de_DE")));
+    QLocale::setDefault(QLocale("de_DE"_s));
     m_table->addDefinition(b, maps);
-    QCOMPARE(title(), QStringLiteral("Kartat"));
+    QCOMPARE(title(), "Kartat"_s);
 
     m_table->removeDefinition(a, maps);
     m_table->removeDefinition(b, maps);
@@ -158,7 +155,7 @@ void TestCatalogTable::keepsItsLanguageUntilItIsRemoved()
     QCOMPARE(translators().size(), 2);
     m_table->addDefinition(a, maps);
     QCOMPARE(translators().size(), 4);
-    QCOMPARE(title(), QStringLiteral("Karten"));
+    QCOMPARE(title(), "Karten"_s);
 }
 
 void TestCatalogTable::removingTheUnknownIsHarmless()
@@ -171,54 +168,31 @@ void TestCatalogTable::removingTheUnknownIsHarmless()
     m_table->removeDefinition(a, maps);
     m_table->addDefinition(a, maps);
     m_table->removeDefinition(b, maps);
-    m_table->removeDefinition(a, QStringLiteral("atlas"));
-    QCOMPARE(title(), QStringLiteral("Kartat"));
+    m_table->removeDefinition(a, "atlas"_s);
+    QCOMPARE(title(), "Kartat"_s);
 }
 
 void TestCatalogTable::leavesTheApplicationWithItsOwner()
 {
     m_table->addDefinition(a, maps);
     m_table.reset();
-    QCOMPARE(title(), QStringLiteral("maps-title"));
+    QCOMPARE(title(), "maps-title"_s);
     QCOMPARE(translators().size(), 2);
 }
 
 void TestCatalogTable::mayBeCalledBackByLanguageChanges()
 {
     // Installing or removing a catalog with texts sends a language change immediately.
-    class Listener : public QObject
-    {
-    public:
-        explicit Listener(std::function<void()> answer) : m_answer(std::move(answer)) { }
-        bool eventFilter(QObject *watched, QEvent *event) override
-        {
-            // The handler changes the language itself.
-            if (event->type() == QEvent::LanguageChange && !m_answering) {
-                const QScopedValueRollback<bool> answering(m_answering, true);
-                ++count;
-                m_answer();
-            }
-            return QObject::eventFilter(watched, event);
-        }
-        int count = 0;
-
-    private:
-        std::function<void()> m_answer;
-        bool m_answering = false;
-    };
-
-    Listener listener([this] {
-        m_table->addDefinition(b, QStringLiteral("nowhere"));
-        m_table->removeDefinition(b, QStringLiteral("nowhere"));
+    LanguageListener listener([this] {
+        m_table->addDefinition(b, "nowhere"_s);
+        m_table->removeDefinition(b, "nowhere"_s);
         m_table->addDefinition(b, maps);
     });
-    QCoreApplication::instance()->installEventFilter(&listener);
     m_table->addDefinition(a, maps);
     QCOMPARE(listener.count, 1);
     m_table->removeDefinition(a, maps);
-    QCOMPARE(title(), QStringLiteral("Kartat"));
+    QCOMPARE(title(), "Kartat"_s);
     m_table->clear();
-    QCoreApplication::instance()->removeEventFilter(&listener);
 }
 
 void TestCatalogTable::tablesShareNothing()
@@ -231,38 +205,36 @@ void TestCatalogTable::tablesShareNothing()
     QCOMPARE(translators().size(), 2);
 
     m_table->removeDefinition(a, maps);
-    QCOMPARE(title(), QStringLiteral("Kartat"));
+    QCOMPARE(title(), "Kartat"_s);
 }
 
 void TestCatalogTable::treatsADamagedCatalogAsMissing()
 {
-    Files::write(QStringLiteral("/usr/share/translations/maps-fi.qm"), "damaged");
+    Files::write("/usr/share/translations/maps-fi.qm"_s, "damaged");
     m_table->addDefinition(a, maps);
     m_table->addDefinition(b, maps);
-    QCOMPARE(title(), QStringLiteral("Maps"));
+    QCOMPARE(title(), "Maps"_s);
     QCOMPARE(m_log->takeTexts(),
-             QStringList(QStringLiteral(
+             QStringList(
                  "The translation catalog \"/usr/share/translations/maps-fi.qm\" is not used: it "
-                 "does not begin like a catalog")));
+                 "does not begin like a catalog"_s));
     m_table->clear();
 }
 
 void TestCatalogTable::refusesNamesThatLeaveTheDirectory()
 {
     // Without the refusal these would be valid paths of a catalog.
-    const QString outside = QStringLiteral("/usr/share/other/maps");
-    Files::write(outside + QStringLiteral("_eng_en.qm"), {});
-    QVERIFY(QFile::remove(outside + QStringLiteral("_eng_en.qm")));
-    QVERIFY(QFile::copy(QStringLiteral("/usr/share/translations/maps-fi.qm"),
-                        outside + QStringLiteral("_eng_en.qm")));
-    for (const QString &name : {outside, QStringLiteral("../../..") + outside}) {
+    const QString outside = "/usr/share/other/maps"_s;
+    Files::write(outside + "_eng_en.qm"_s, {});
+    QVERIFY(QFile::remove(outside + "_eng_en.qm"_s));
+    QVERIFY(QFile::copy("/usr/share/translations/maps-fi.qm"_s, outside + "_eng_en.qm"_s));
+    for (const QString &name : {outside, "../../.."_s + outside}) {
         m_table->addDefinition(a, name);
         m_table->addDefinition(b, name);
-        QCOMPARE(title(), QStringLiteral("maps-title"));
+        QCOMPARE(title(), "maps-title"_s);
         QCOMPARE(m_log->takeTexts(),
-                 QStringList(QStringLiteral("The translation catalog \"%1\" of \"%2\" is not used: "
-                                            "its name leads out of \"/usr/share/translations\"")
-                                 .arg(name, a)));
+                 QStringList("The translation catalog \"%1\" of \"%2\" is not used: "
+                             "its name leads out of \"/usr/share/translations\""_s.arg(name, a)));
         m_table->removeDefinition(a, name);
     }
     QCOMPARE(translators().size(), 0);

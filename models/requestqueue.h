@@ -56,11 +56,9 @@ public:
 private:
     void run()
     {
-        // In the event loop of a handler, the updates continue to wait for the end of the change.
-        if (!m_changing) {
-            for (const Update update : std::exchange(m_updates, {})) {
-                (m_model->*update)();
-            }
+        // In the event loop of a handler, the updates defer themselves again.
+        for (const Update update : std::exchange(m_updates, {})) {
+            (m_model->*update)();
         }
     }
 

@@ -135,6 +135,11 @@ void TestIniFile::findsFaults_data()
     row("escaped blank", "a=@Va\\x20riant(\n", IniFault::None);
     row("other character", "a=\\x140Variant(\n", IniFault::None);
     row("in a text", "a=such as @Variant(b)\n", IniFault::PackedValue);
+    row("escaped at sign", "a=\\x40Variant(b)\n", IniFault::PackedValue);
+    row("octal, with upper bits", "a=\\200100Variant(b)\n", IniFault::PackedValue);
+    row("quotes and escapes", "a=@V\"a\"\\qriant\\x28 \\\n(b)\n", IniFault::PackedValue);
+    row("byte-order marks", "\xef\xbb\xbf\na=@Date\"\xef\xbb\xbfTime(b)\"\n",
+        IniFault::PackedValue);
     row("not closed", "a=@DateTime(\n", IniFault::PackedValue);
     row("behind an unclosed section", "[s\na=@Variant(b)\n", IniFault::PackedValue);
     row("unclosed section", "a=b\n[s\n[t]\n", IniFault::UnclosedSection);

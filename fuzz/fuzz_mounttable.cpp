@@ -115,7 +115,9 @@ std::vector<ino_t> namedDirectories(const std::string &device, const std::string
             continue;
         }
         const std::string type = takeWord(line, &at);
-        if (info.st_ino == numberOf("/") && !type.empty()) {
+        // The C library skips the line after one with a NUL.
+        if (info.st_ino == numberOf("/") && !type.empty()
+            && table.find('\0') == std::string::npos) {
             return {};
         }
         if (type.compare(0, 5, "tmpfs") == 0) {

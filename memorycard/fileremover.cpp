@@ -21,7 +21,6 @@
 #include <fcntl.h>
 #include <linux/magic.h>
 #include <sys/stat.h>
-#include <sys/sysmacros.h>
 #include <sys/vfs.h>
 
 namespace {
@@ -84,8 +83,8 @@ bool liesOn(const QByteArray &device, const QByteArray &type, int directory)
     const auto entry = std::find_if(std::cbegin(unnumbered), std::cend(unnumbered),
                                     [&type](const auto &known) { return type == known.type; });
     struct statfs system = {};
-    return entry != std::cend(unnumbered) && major(info.st_dev) == 0
-        && fstatfs(directory, &system) == 0 && static_cast<unsigned>(system.f_type) == entry->magic;
+    return entry != std::cend(unnumbered) && fstatfs(directory, &system) == 0
+        && static_cast<unsigned>(system.f_type) == entry->magic;
 }
 
 // Empties the card that is mounted on the directory. Returns why it is not empty, or nothing.

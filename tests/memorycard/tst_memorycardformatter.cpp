@@ -172,7 +172,6 @@ private Q_SLOTS:
 
     void startsIdle();
     void interface();
-    void enumKeysInQml();
     void errorsInQml();
 
     void deviceName();
@@ -415,23 +414,6 @@ void TestMemoryCardFormatter::interface()
     for (const QString &name : slotNames) {
         QVERIFY2(meta.indexOfSlot(name.toLatin1()) >= 0, qPrintable(name));
     }
-}
-
-void TestMemoryCardFormatter::enumKeysInQml()
-{
-    const auto object = createFromQml(R"(
-        QtObject {
-            property var status: ['Idle', 'Unmounting', 'Formatting', 'RemovingFiles', 'Mounting',
-                'Probing', 'Error'].map(function(key) { return MemoryCardFormatter[key] })
-            property var errors: ['Failed', 'Cancelled', 'AlreadyCancelled', 'NotAuthorized',
-                'NotAuthorizedCanObtain', 'NotAuthorizedDismissed', 'AlreadyMounted', 'NotMounted',
-                'OptionNotPermitted', 'MountedByOtherUser', 'AlreadyUnmounting', 'NotSupported',
-                'Timedout', 'WouldWakeup', 'DeviceBusy']
-                .map(function(key) { return MemoryCardFormatter['Error' + key] })
-        })");
-    QCOMPARE(object->property("status").toList(), (QVariantList{0, 1, 2, 3, 4, 5, 6}));
-    QCOMPARE(object->property("errors").toList(),
-             (QVariantList{0, 1, 2, 3, 4, 5, 6, 7, 8, 9, 10, 11, 12, 13, 14}));
 }
 
 void TestMemoryCardFormatter::errorsInQml()

@@ -266,8 +266,8 @@ void MemoryCardFormatter::format(const QString &type)
     Mounts the card, unless it is already mounted, and removes all files and directories on it, on a
     thread of the application's global thread pool. If some cannot be removed, the others are
     removed first, and the status then becomes \c Error. It also becomes \c Error if no thread can
-    be started, or if the application clears the thread pool before the removal starts. An empty \l devicePath leads to \c Error
-    with a warning.
+    be started, or if the application clears the thread pool before the removal starts. An empty
+    \l devicePath leads to \c Error with a warning.
 */
 void MemoryCardFormatter::removeAllFiles()
 {

@@ -102,7 +102,7 @@ source_files() {
         return
     fi
     git ls-files -z --cached --others --exclude-standard \
-        | while IFS= read -r -d '' file; do [[ ! -e $file ]] || printf '%s\0' "$file"; done
+        | while IFS= read -r -d '' file; do [[ ! -e $file && ! -L $file ]] || printf '%s\0' "$file"; done
 }
 
 configure() { # configure PRESET

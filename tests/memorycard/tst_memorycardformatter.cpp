@@ -218,6 +218,7 @@ private Q_SLOTS:
     void probeSurvivesAFailedRequest();
     void probeSurvivesAFailedStep();
     void refusedOperationInAHandler();
+    void requestInAHandlerWhileAProbeWaits();
     void probeThatIsOverWhenARequestFails();
     void errorsOfARunningHelper();
     void commandsKeepTheirPath();
@@ -1294,6 +1295,26 @@ void TestMemoryCardFormatter::refusedOperationInAHandler()
                  + unmountWithoutName);
     QCOMPARE(m_formatter->status(), Formatter::Error);
     QCOMPARE(m_helper->runs(), (QList<QStringList>{words("probe testcard1")}));
+}
+
+void TestMemoryCardFormatter::requestInAHandlerWhileAProbeWaits()
+{
+    // The request starts the probe that waits. No second command may start next to it.
+    start("hung");
+    m_formatter->format(vfat);
+    m_formatter->setDevicePath(otherCard);
+    m_helper->install(QStringLiteral("exit=1"));
+    onStatus(Formatter::Error, [this] {
+        installProbe("ext4\n");
+        m_formatter->unmount();
+    });
+    replyAfter("Unmount");
+    TRY_EVENTS("not busy, path /dev/testcard2, Unmounting, busy, Formatting, Error, not busy, "
+               "Probing, busy, type ext4");
+    replyAfter("Unmount Unmount");
+    TRY_EVENTS("not busy, path /dev/testcard2, Unmounting, busy, Formatting, Error, not busy, "
+               "Probing, busy, type ext4, Unmounting, Idle, not busy");
+    takeLog();
 }
 
 void TestMemoryCardFormatter::probeThatIsOverWhenARequestFails()

@@ -16,7 +16,7 @@
 #include <algorithm>
 #include <cerrno>
 #include <chrono>
-#include <filesystem>
+#include <climits>
 #include <iterator>
 #include <utility>
 
@@ -40,9 +40,10 @@ constexpr int maximumLinks = 40;
 // Empty if the path is not a symbolic link.
 QByteArray linkTarget(const QByteArray &path)
 {
-    std::error_code none;
-    return QByteArray::fromStdString(
-        std::filesystem::read_symlink(path.toStdString(), none).string());
+    QByteArray target(PATH_MAX, Qt::Uninitialized);
+    const ssize_t size = readlink(path.constData(), target.data(), size_t(target.size()));
+    target.truncate(int(std::max<ssize_t>(size, 0)));
+    return target;
 }
 
 } // namespace

@@ -475,7 +475,8 @@ void QuickActionsModel::applyShowPotential()
 void QuickActionsModel::applyMoves()
 {
     if (!m_requests.defer(&QuickActionsModel::applyMoves)) {
-        for (const auto &[index, newIndex] : std::exchange(m_moves, {})) {
+        const auto moves = std::exchange(m_moves, {});
+        for (const auto &[index, newIndex] : moves) {
             applyMove(index, newIndex);
         }
     }

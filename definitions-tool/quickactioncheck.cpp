@@ -53,19 +53,19 @@ struct Name {
 
 constexpr std::array names = {
     Name{serviceKey, &Action::service,
-         ":[\\w-]+(\\.[\\w-]+)*|[a-zA-Z_-][\\w-]*(\\.[a-zA-Z_-][\\w-]*)+"_L1,
-         "name of a service"_L1},
-    Name{pathKey, &Action::objectPath, "/|(/\\w+)+"_L1, "path of an object"_L1},
+         R"(:[\w-]+(\.[\w-]+)*|[a-zA-Z_-][\w-]*(\.[a-zA-Z_-][\w-]*)+)"_L1, "name of a service"_L1},
+    Name{pathKey, &Action::objectPath, R"(/|(/\w+)+)"_L1, "path of an object"_L1},
     // The interface is optional.
-    Name{interfaceKey, &Action::interface, "([a-zA-Z_]\\w*(\\.[a-zA-Z_]\\w*)+)?"_L1,
+    Name{interfaceKey, &Action::interface, R"(([a-zA-Z_]\w*(\.[a-zA-Z_]\w*)+)?)"_L1,
          "name of an interface"_L1},
-    Name{methodKey, &Action::method, "[a-zA-Z_]\\w*"_L1, "name of a method"_L1},
+    Name{methodKey, &Action::method, R"([a-zA-Z_]\w*)"_L1, "name of a method"_L1},
 };
 
 bool isName(const Name &name, const QString &value)
 {
     static const auto expressions = [] {
         std::vector<QRegularExpression> expressions;
+        expressions.reserve(names.size());
         for (const Name &name : names) {
             expressions.emplace_back(QRegularExpression::anchoredPattern(QString(name.pattern)));
         }

@@ -34,7 +34,7 @@ QString shellWord(QString text)
     if (plain.match(text).hasMatch()) {
         return text;
     }
-    text.replace(QLatin1Char('\''), "'\\''"_L1);
+    text.replace(QLatin1Char('\''), R"('\'')"_L1);
     return QLatin1Char('\'') + text + QLatin1Char('\'');
 }
 

@@ -157,10 +157,9 @@ DirectoryWatcher::Inotify::watchersOf(const inotify_event &event) const
     return all;
 }
 
-DirectoryWatcher::DirectoryWatcher(const QString &directory, const QString &nameFilter,
-                                   QObject *parent)
-    : QObject(parent), m_directory(QFile::encodeName(directory)), m_nameFilter(nameFilter),
-      m_inotify(Inotify::instance()), m_pollTimer(this)
+DirectoryWatcher::DirectoryWatcher(const QString &directory, QString nameFilter, QObject *parent)
+    : QObject(parent), m_directory(QFile::encodeName(directory)),
+      m_nameFilter(std::move(nameFilter)), m_inotify(Inotify::instance()), m_pollTimer(this)
 {
     connect(&m_pollTimer, &QTimer::timeout, this, &DirectoryWatcher::poll);
     if (m_inotify != nullptr) {

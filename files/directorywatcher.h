@@ -42,8 +42,7 @@ class DirectoryWatcher : public QObject
 
 public:
     // Takes an absolute path and a filter such as "*.conf", which works as for QDir.
-    DirectoryWatcher(const QString &directory, const QString &nameFilter,
-                     QObject *parent = nullptr);
+    DirectoryWatcher(const QString &directory, QString nameFilter, QObject *parent = nullptr);
     ~DirectoryWatcher() override;
     Q_DISABLE_COPY_MOVE(DirectoryWatcher)
 

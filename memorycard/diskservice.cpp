@@ -26,7 +26,7 @@ constexpr std::chrono::milliseconds requestTimeout = std::chrono::minutes(5);
 
 // The keys of the error codes are the names of the service's errors with another prefix.
 constexpr QLatin1String errorPrefix = "org.freedesktop.UDisks2.Error."_L1;
-constexpr char keyPrefix[] = "Error";
+constexpr const char *keyPrefix = "Error";
 
 QDBusMessage createCall(const QString &deviceName, QLatin1String method, const QString &option)
 {

@@ -14,6 +14,7 @@
 #include <QThreadPool>
 
 #include <algorithm>
+#include <array>
 #include <cerrno>
 #include <utility>
 #include <vector>
@@ -33,11 +34,11 @@ struct Unnumbered {
     const char *type;
     unsigned magic;
 };
-constexpr Unnumbered unnumbered[] = {
-    {"btrfs", BTRFS_SUPER_MAGIC},
-    {"fuse", FUSE_SUPER_MAGIC},
-    {"overlay", OVERLAYFS_SUPER_MAGIC},
-    {"tmpfs", TMPFS_MAGIC},
+constexpr std::array unnumbered = {
+    Unnumbered{"btrfs", BTRFS_SUPER_MAGIC},
+    Unnumbered{"fuse", FUSE_SUPER_MAGIC},
+    Unnumbered{"overlay", OVERLAYFS_SUPER_MAGIC},
+    Unnumbered{"tmpfs", TMPFS_MAGIC},
 };
 
 struct Mount {

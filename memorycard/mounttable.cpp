@@ -45,6 +45,7 @@ const mntent *MountTable::next()
             }
             return nullptr;
         }
+        // NOLINTNEXTLINE(readability-simplify-boolean-expr): a macro
         if constexpr (!LIBRARY_DECODES_ESCAPES) {
             decodeEscapes(m_entry.mnt_fsname);
             decodeEscapes(m_entry.mnt_dir);

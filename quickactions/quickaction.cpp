@@ -111,7 +111,7 @@ QuickAction::QuickAction(const QString &path, bool enabled)
 QuickAction QuickAction::reread(bool enabled) const
 {
     if (!m_isRead || !m_stamp || m_stamp != stampOf(m_path)) {
-        return QuickAction(m_path, enabled);
+        return {m_path, enabled};
     }
     QuickAction action(*this);
     action.m_enabled = enabled;

@@ -7,14 +7,16 @@
 #include <QString>
 #include <QtEndian>
 
+#include <array>
 #include <utility>
 #include <vector>
 
 namespace {
 
 // A literal would end with a NUL.
-constexpr char magic[] = {'\x3c', '\xb8', '\x64', '\x18', '\xca', '\xef', '\x9c', '\x95',
-                          '\xcd', '\x21', '\x1c', '\xbf', '\x60', '\xa1', '\xbd', '\xdd'};
+constexpr std::array<char, 16> magic = {'\x3c', '\xb8', '\x64', '\x18', '\xca', '\xef',
+                                        '\x9c', '\x95', '\xcd', '\x21', '\x1c', '\xbf',
+                                        '\x60', '\xa1', '\xbd', '\xdd'};
 
 enum SectionTag : uchar {
     ContextsTag = 0x2f,
@@ -79,7 +81,7 @@ bool markMessages(Section messages, std::vector<bool> *starts)
     while (!messages.atEnd()) {
         (*starts)[messages.position()] = true;
         // A message that is too short ends with the tag 0.
-        for (uchar tag = messages.takeNumber<uchar>(); tag != EndTag;
+        for (auto tag = messages.takeNumber<uchar>(); tag != EndTag;
              tag = messages.takeNumber<uchar>()) {
             switch (tag) {
             case TranslationTag: {
@@ -144,10 +146,10 @@ bool areContextsSound(Section contexts)
 QString whyUnusableCatalog(const QByteArray &content)
 {
     Section file(reinterpret_cast<const uchar *>(content.constData()), quint32(content.size()));
-    if (!content.startsWith(QByteArray::fromRawData(magic, sizeof(magic)))) {
+    if (!content.startsWith(QByteArray::fromRawData(magic.data(), int(magic.size())))) {
         return QStringLiteral("it does not begin like a catalog");
     }
-    file.take(sizeof(magic));
+    file.take(magic.size());
 
     Section contexts;
     Section hashes;

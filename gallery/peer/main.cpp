@@ -19,6 +19,7 @@
 #include <chrono>
 #include <cstdio>
 #include <memory>
+#include <utility>
 
 namespace {
 
@@ -40,8 +41,9 @@ QStringList texts(const QVariantList &arguments)
 class SampleService : public RecordingService
 {
 public:
-    SampleService(const QString &name, const QString &error, std::chrono::milliseconds delay)
-        : RecordingService(QDBusConnection::SessionBus, name), m_error(error), m_delay(delay)
+    SampleService(const QString &name, QString error, std::chrono::milliseconds delay)
+        : RecordingService(QDBusConnection::SessionBus, name), m_error(std::move(error)),
+          m_delay(delay)
     {
         connect(this, &RecordingService::called, [this, name](const QDBusMessage &call) {
             QDBusMessage signal = QDBusMessage::createSignal(

@@ -11,8 +11,8 @@
 
 namespace {
 
-constexpr char path[] = "/etc/mtab";
-constexpr char draftPath[] = "/etc/mtab.draft";
+constexpr const char *path = "/etc/mtab";
+constexpr const char *draftPath = "/etc/mtab.draft";
 
 } // namespace
 

@@ -14,6 +14,7 @@
 #include <QTimer>
 
 #include <algorithm>
+#include <utility>
 
 namespace {
 
@@ -48,9 +49,9 @@ bool isInUse(const QString &directory)
 
 } // namespace
 
-SimulatedDiskService::SimulatedDiskService(Manner manner, const QString &error,
+SimulatedDiskService::SimulatedDiskService(Manner manner, QString error,
                                            std::chrono::milliseconds delay)
-    : m_manner(manner), m_error(error), m_delay(delay),
+    : m_manner(manner), m_error(std::move(error)), m_delay(delay),
       m_connection(QDBusConnection::connectToBus(QDBusConnection::SystemBus,
                                                  QStringLiteral("simulated disk service")))
 {

@@ -24,7 +24,7 @@ public:
     enum class Manner { Working, Failing, Silent };
 
     // Replies after the delay. The error is one of the disk service's own, for the manner Failing.
-    explicit SimulatedDiskService(Manner manner, const QString &error = QString(),
+    explicit SimulatedDiskService(Manner manner, QString error = QString(),
                                   std::chrono::milliseconds delay = {});
     // The callers of unanswered calls get an error.
     ~SimulatedDiskService() override;

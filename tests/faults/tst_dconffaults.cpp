@@ -25,10 +25,12 @@
 #include <csignal>
 #include <functional>
 #include <memory>
+#include <mutex>
 #include <optional>
+#include <set>
 #include <type_traits>
 
-#include <glib.h>
+#include <gio/gio.h>
 
 // An object with one choice that it stores in dconf.
 struct User {
@@ -220,6 +222,50 @@ private:
     bool m_stopped = true;
 };
 
+// Follows the writes of this process to their replies, on the connection that dconf uses as well.
+class Writes
+{
+public:
+    Writes() { g_dbus_connection_add_filter(m_bus, follow, this, nullptr); }
+    Q_DISABLE_COPY_MOVE(Writes)
+
+    bool areAnswered()
+    {
+        const std::lock_guard lock(m_mutex);
+        return m_unanswered.empty();
+    }
+
+    // Waits until the bus has read what this process has sent.
+    bool reachTheBus()
+    {
+        GVariant *reply = g_dbus_connection_call_sync(
+            m_bus, "org.freedesktop.DBus", "/org/freedesktop/DBus", "org.freedesktop.DBus", "GetId",
+            nullptr, nullptr, G_DBUS_CALL_FLAGS_NONE, patience, nullptr, nullptr);
+        const bool read = reply != nullptr;
+        g_clear_pointer(&reply, g_variant_unref);
+        return read;
+    }
+
+private:
+    // Runs in a thread of GLib's.
+    static GDBusMessage *follow(GDBusConnection *, GDBusMessage *message, gboolean incoming,
+                                gpointer writes)
+    {
+        auto *const self = static_cast<Writes *>(writes);
+        const std::lock_guard lock(self->m_mutex);
+        if (incoming) {
+            self->m_unanswered.erase(g_dbus_message_get_reply_serial(message));
+        } else if (qstrcmp(g_dbus_message_get_member(message), "Change") == 0) {
+            self->m_unanswered.insert(g_dbus_message_get_serial(message));
+        }
+        return message;
+    }
+
+    GDBusConnection *const m_bus = g_bus_get_sync(G_BUS_TYPE_SESSION, nullptr, nullptr);
+    std::mutex m_mutex;
+    std::set<guint32> m_unanswered;
+};
+
 void reloadBusConfiguration()
 {
     const QDBusMessage call = QDBusMessage::createMethodCall(
@@ -341,13 +387,17 @@ void TestDconfFaults::goesWhileTheServiceHangs()
 
 void TestDconfFaults::serviceDiesInTheMiddleOfAWrite()
 {
+    static auto &writes = *new Writes; // GLib uses it until the process ends
     QVERIFY(stores(true));
+    // A value is stored before its write is answered. If the service died in between, the next
+    // write would reach its successor.
+    TRY(writes.areAnswered());
 
     StoppedService service;
     m_user->choose(false);
     TRY(!m_user->isOn());
-    // Gives the process time to send the call.
-    QTest::qWait(100);
+    TRY(!writes.areAnswered());
+    QVERIFY(writes.reachTheBus());
     service.kill();
     // dconf reverts changes that were not stored, once each pending write has succeeded or failed.
     QVERIFY(aWriteFails());
@@ -428,6 +478,7 @@ void TestDconfFaults::everyOtherType()
         m_make().isOn();
         LocationConfiguration().restoreCustomSettings();
     }
+    DconfTool::waitUntilStored();
     reset();
     QVERIFY(change.hasCome());
     load({widgetsKey}, "@as []");

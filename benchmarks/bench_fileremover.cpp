@@ -57,7 +57,7 @@ constexpr double factor = 1.10;
 constexpr double barOfCallsFlat = 1.01;
 constexpr double barOfCallsNested = 1.10;
 constexpr double barOfMemory = 8.0; // MiB
-constexpr int barOfOpenFiles = 72;
+constexpr int barOfOpenFiles = 16;
 
 constexpr char measureOption[] = "--measure";
 

@@ -4,6 +4,7 @@
 #include "cardhelper.h"
 
 #include "files.h"
+#include "texts.h"
 
 #include <QFile>
 #include <QProcess>
@@ -13,9 +14,9 @@
 
 namespace {
 
-const QString program = QStringLiteral("/usr/libexec/sdcardhelper");
-const QString directory = QStringLiteral("/usr/libexec/sdcardhelper.d");
-const QString script = QStringLiteral(SDCARDHELPER);
+const QString program = "/usr/libexec/sdcardhelper"_s;
+const QString directory = "/usr/libexec/sdcardhelper.d"_s;
+const QString script = QLatin1String(SDCARDHELPER);
 
 constexpr auto executable = QFile::ReadOwner | QFile::ExeOwner;
 
@@ -27,7 +28,7 @@ QString inDirectory(const char *name)
 // A zombie process does not count as running.
 bool isRunning(qint64 pid)
 {
-    QFile file(QStringLiteral("/proc/%1/stat").arg(pid));
+    QFile file("/proc/%1/stat"_s.arg(pid));
     if (!file.open(QIODevice::ReadOnly)) {
         return false;
     }
@@ -67,16 +68,14 @@ QString CardHelper::path()
 
 void CardHelper::install(const QString &scenario, const QByteArray &output)
 {
-    if (QProcess::execute(script, {QStringLiteral("--check"), scenario}) != 0) {
+    if (QProcess::execute(script, {"--check"_s, scenario}) != 0) {
         qFatal("no such scenario: %s", qPrintable(scenario));
     }
     Files::write(inDirectory("output"), output);
     // Creates a new file each time, because nothing may write to a running program.
     remove();
     Files::write(program,
-                 QStringLiteral("#!/bin/sh\nexec %1 %2 %3 \"$@\"\n")
-                     .arg(script, directory, scenario)
-                     .toUtf8());
+                 "#!/bin/sh\nexec %1 %2 %3 \"$@\"\n"_s.arg(script, directory, scenario).toUtf8());
     QFile::setPermissions(program, executable);
 }
 

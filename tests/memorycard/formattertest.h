@@ -24,6 +24,10 @@ class FormatterTest : public LoggedTest
 protected:
     using Formatter = MemoryCardFormatter;
 
+    // The signals of operations that succeed. The first one says that the request was accepted.
+    static constexpr char mounted[] = "not busy, Mounting, busy, Idle, not busy";
+    static constexpr char unmounted[] = "not busy, Unmounting, busy, Idle, not busy";
+
     void makeFormatter();
     // Sets the card, waits until it has been probed, and forgets the signals so far.
     void setCard(const QString &name, const QString &path);

@@ -3,6 +3,8 @@
 
 #include "scratchfilesystem.h"
 
+#include "texts.h"
+
 #include <QFile>
 
 #include <cerrno>
@@ -12,7 +14,7 @@
 #include <sys/mount.h>
 
 ScratchFileSystem::ScratchFileSystem()
-    : m_dir(qEnvironmentVariable("XDG_RUNTIME_DIR") + QStringLiteral("/XXXXXX")),
+    : m_dir(qEnvironmentVariable("XDG_RUNTIME_DIR") + "/XXXXXX"_s),
       m_path(QFile::encodeName(m_dir.path())),
       m_mounted(mount("tmpfs", m_path.constData(), "tmpfs", 0, "mode=700") == 0)
 {

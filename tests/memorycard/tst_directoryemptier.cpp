@@ -7,6 +7,7 @@
 #include "memorycard/directoryemptier.h"
 #include "scratchfilesystem.h"
 #include "systemcalls.h"
+#include "texts.h"
 
 #include <QFile>
 #include <QHash>
@@ -94,7 +95,7 @@ private:
 
 QByteArray nameOf(int directory)
 {
-    return QFile::symLinkTarget(QStringLiteral("/proc/self/fd/%1").arg(directory)).toLocal8Bit();
+    return QFile::symLinkTarget("/proc/self/fd/%1"_s.arg(directory)).toLocal8Bit();
 }
 
 // Makes each removal of the name fail.

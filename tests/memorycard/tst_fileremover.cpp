@@ -6,6 +6,7 @@
 #include "memorycard/fileremover.h"
 #include "patience.h"
 #include "scratchfilesystem.h"
+#include "texts.h"
 
 #include <QDir>
 #include <QFile>
@@ -33,9 +34,9 @@ using namespace FileTree;
 
 namespace {
 
-const QByteArray mountTable = QByteArrayLiteral("/etc/mtab");
+const QByteArray mountTable = "/etc/mtab";
 // No such node exists: the tests' cards are directories.
-const QByteArray device = QByteArrayLiteral("/dev/test-card1");
+const QByteArray device = "/dev/test-card1";
 
 // What makeCard() creates.
 const QByteArrayList cardEntries = {".hidden", "directory", "directory/file", "file", "link"};
@@ -172,7 +173,7 @@ void tst_FileRemover::init()
 
 void tst_FileRemover::cleanup()
 {
-    QDir::setCurrent(QStringLiteral("/"));
+    QDir::setCurrent("/"_s);
     QCOMPARE(read(path("outside/file")), QByteArray("precious"));
     m_files.reset();
     LoggedTest::cleanup();
@@ -634,7 +635,7 @@ void tst_FileRemover::directoriesOnTheDevice()
     QFETCH(const QByteArray, type);
     QFETCH(const QByteArray, reason);
     // The throw-away root has overlays.
-    const QTemporaryDir onOverlay(QStringLiteral("/etc/card"));
+    const QTemporaryDir onOverlay("/etc/card"_s);
     const bool inMemory = directory == "tmpfs";
     const QByteArray card = inMemory ? makeCard("card") : QFile::encodeName(onOverlay.path());
     makeFiles(card, 4);
@@ -671,8 +672,8 @@ void tst_FileRemover::notRun()
     remover.reset();
     QCOMPARE(errors, 1);
     QCOMPARE(m_log->takeReport(),
-             QStringLiteral("warning [com.marlo.settings.system.memorycard] Cannot empty "
-                            "\"/dev/test-card1\" because it was taken from the thread pool"));
+             "warning [com.marlo.settings.system.memorycard] Cannot empty "
+             "\"/dev/test-card1\" because it was taken from the thread pool"_s);
 }
 
 void tst_FileRemover::removeAllEntries()

@@ -7,6 +7,7 @@
 #include "files.h"
 #include "formattertest.h"
 #include "simulator/realcard.h"
+#include "texts.h"
 
 #include <QDir>
 #include <QFile>
@@ -18,20 +19,16 @@
 
 namespace {
 
-const QString ext4 = QStringLiteral("ext4");
-const QString vfat = QStringLiteral("vfat");
-
-// The signals of operations that succeed. The first one says that the request was accepted.
-constexpr char mounted[] = "not busy, Mounting, busy, Idle, not busy";
-constexpr char unmounted[] = "not busy, Unmounting, busy, Idle, not busy";
+const QString ext4 = "ext4"_s;
+const QString vfat = "vfat"_s;
 
 // Whether a thread of this process is in an uninterruptible wait.
 bool someThreadIsStuck()
 {
-    const QDir tasks(QStringLiteral("/proc/self/task"));
+    const QDir tasks("/proc/self/task"_s);
     const QStringList ids = tasks.entryList(QDir::Dirs | QDir::NoDotAndDotDot);
     for (const QString &id : ids) {
-        QFile file(tasks.filePath(id + QStringLiteral("/stat")));
+        QFile file(tasks.filePath(id + "/stat"_s));
         if (file.open(QIODevice::ReadOnly)) {
             const QByteArray stat = file.readAll();
             if (stat.mid(stat.lastIndexOf(')') + 2, 1) == "D") {
@@ -79,7 +76,7 @@ void TestRealCard::initTestCase()
     const QString reason = RealCard::whyNot();
     if (!reason.isEmpty()) {
         if (!qEnvironmentVariableIsEmpty("CI")) {
-            QFAIL(qPrintable(QStringLiteral("may not be skipped here, but ") + reason));
+            QFAIL(qPrintable("may not be skipped here, but "_s + reason));
         }
         QSKIP(qPrintable(reason));
     }
@@ -92,7 +89,7 @@ void TestRealCard::cleanupTestCase()
     if (m_card == nullptr) {
         return;
     }
-    const QString loop = QStringLiteral("/sys/block/%1/loop").arg(m_card->name());
+    const QString loop = "/sys/block/%1/loop"_s.arg(m_card->name());
     QVERIFY(QFileInfo::exists(loop));
     m_card.reset();
     // Nothing keeps the device in use.
@@ -150,19 +147,18 @@ void TestRealCard::fill()
 {
     for (int i = 0; i < 20; ++i) {
         for (int j = 0; j < 20; ++j) {
-            Files::write(m_card->file(QStringLiteral("directory %1/deep/.file%2").arg(i).arg(j)),
-                         "content");
+            Files::write(m_card->file("directory %1/deep/.file%2"_s.arg(i).arg(j)), "content");
         }
     }
-    Files::write(m_card->file(QStringLiteral(u"été")), QByteArray(1000000, 'x'));
-    Files::makeLink(QStringLiteral("/etc"), m_card->file(QStringLiteral("link")));
-    Files::makePipe(m_card->file(QStringLiteral(".pipe")));
+    Files::write(m_card->file("été"_s), QByteArray(1000000, 'x'));
+    Files::makeLink("/etc"_s, m_card->file("link"_s));
+    Files::makePipe(m_card->file(".pipe"_s));
     QVERIFY(m_card->files().size() > 20);
 }
 
 void TestRealCard::probe()
 {
-    QCOMPARE(probe(QStringLiteral("/dev/nonexistent")),
+    QCOMPARE(probe("/dev/nonexistent"_s),
              QByteArray("path /dev/nonexistent, Probing, busy, type , Error, not busy"));
     QCOMPARE(takeLog(), helperEnded("probe", "nonexistent", "exited with 2 and the error \"\""));
     QCOMPARE(probe(m_card->path()),
@@ -173,7 +169,7 @@ void TestRealCard::mountAndUnmount()
 {
     QCOMPARE(run(&Formatter::mount), QByteArray(mounted));
     QCOMPARE(m_card->mountDirectories().size(), 1);
-    QCOMPARE(m_card->files(), QStringList(QStringLiteral("lost+found")));
+    QCOMPARE(m_card->files(), QStringList("lost+found"_s));
     QCOMPARE(run(&Formatter::mount), QByteArray("not busy, mount ErrorAlreadyMounted"));
     QCOMPARE(takeLog(), diskServiceError("Mount", "AlreadyMounted"));
 
@@ -198,7 +194,7 @@ void TestRealCard::format()
              QByteArray("not busy, Unmounting, busy, Formatting, Mounting, Idle, not busy"));
     QVERIFY(m_card->probe("UUID") != before);
     QCOMPARE(m_card->mountDirectories().size(), 1);
-    QCOMPARE(m_card->files(), QStringList(QStringLiteral("lost+found")));
+    QCOMPARE(m_card->files(), QStringList("lost+found"_s));
     QCOMPARE(run(&Formatter::unmount), QByteArray(unmounted));
 }
 
@@ -227,7 +223,7 @@ void TestRealCard::removeAllFiles()
     QCOMPARE(run(&Formatter::removeAllFiles),
              QByteArray("not busy, Mounting, busy, RemovingFiles, Idle, not busy"));
     QCOMPARE(m_card->files(), QStringList());
-    QVERIFY(QFileInfo::exists(QStringLiteral("/etc/passwd")));
+    QVERIFY(QFileInfo::exists("/etc/passwd"_s));
 
     // The card is still mounted.
     fill();
@@ -242,7 +238,7 @@ void TestRealCard::busyCard()
 {
     run(&Formatter::mount);
     const QString before = m_card->probe("UUID");
-    const QString path = m_card->file(QStringLiteral("file"));
+    const QString path = m_card->file("file"_s);
     Files::write(path, "content");
     QFile file(path);
     QVERIFY(file.open(QIODevice::ReadOnly));

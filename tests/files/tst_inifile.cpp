@@ -144,6 +144,17 @@ void TestIniFile::findsFaults_data()
     row("behind an unclosed section", "[s\na=@Variant(b)\n", IniFault::PackedValue);
     row("unclosed section", "a=b\n[s\n[t]\n", IniFault::UnclosedSection);
     row("section closed in the next line", "[s\n]\n", IniFault::UnclosedSection);
+    row("unclosed at the end", "a=b\n[s", IniFault::UnclosedSection);
+    row("unclosed behind a byte-order mark", "\xef\xbb\xbf[s\na=b\n", IniFault::UnclosedSection);
+    row("unclosed behind a comment", "a=b\n;c\n \t[s\n", IniFault::UnclosedSection);
+    row("unclosed behind a semicolon", "a=b;[s\n[t\n", IniFault::UnclosedSection);
+    row("closed in a comment", "[s;]\n", IniFault::UnclosedSection);
+    row("text behind a section", "[s]t\n", IniFault::None);
+    row("section in a comment", ";[s\n", IniFault::None);
+    row("section in quotes", "a=\"\n[s\n\"\n", IniFault::None);
+    row("section in a continued line", "a=\\\n[s\nb=\\\r\n[s\n", IniFault::None);
+    row("section closed behind quotes", "[\"s\n\"]\n", IniFault::None);
+    row("backslash at the end", "a=\\", IniFault::None);
     row("largest", QByteArray(int(maximumIniSize), 'x'), IniFault::None);
     row("too large", QByteArray(int(maximumIniSize) + 1, 'x'), IniFault::Unreadable);
 }

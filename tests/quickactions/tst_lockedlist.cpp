@@ -6,15 +6,14 @@
 #include "files.h"
 #include "messagelog.h"
 #include "mgconfitem.h"
+#include "places.h"
 #include "quickactions/quickactionsmodel.h"
+#include "words.h"
 
 #include <QProcess>
 #include <QtTest>
 
 namespace {
-
-const QString directory = QStringLiteral("/usr/share/glimmera/quickactions");
-const QString enabledKey = QStringLiteral("/desktop/glimmera-marlo-home/events_screen_actions");
 
 QStringList names(const QuickActionsModel &model)
 {
@@ -40,21 +39,18 @@ private Q_SLOTS:
 void TestLockedList::initTestCase()
 {
     // Before dconf is used for the first time in this process.
-    const QString source = QStringLiteral("/etc/dconf/db/device.d");
+    const QString source = "/etc/dconf/db/device.d"_s;
     QByteArray paths;
     for (const char *name : {"a", "b", "c"}) {
-        const QString path = QStringLiteral("%1/%2.conf").arg(directory, QLatin1String(name));
+        const QString path = "%1/%2.conf"_s.arg(Places::quickActions, QLatin1String(name));
         Files::write(path, "title=x\n");
         paths += (paths.isEmpty() ? "'" : ", '") + path.toUtf8() + '\'';
     }
-    Files::write(source + QStringLiteral("/actions"),
+    Files::write(source + "/actions"_s,
                  "[desktop/glimmera-marlo-home]\nevents_screen_actions=[" + paths + "]\n");
-    Files::write(source + QStringLiteral("/locks/actions"), enabledKey.toUtf8() + '\n');
-    Files::write(QStringLiteral("/etc/dconf/profile/user"), "user-db:user\nsystem-db:device\n");
-    QCOMPARE(QProcess::execute(
-                 QStringLiteral("dconf"),
-                 {QStringLiteral("compile"), QStringLiteral("/etc/dconf/db/device"), source}),
-             0);
+    Files::write(source + "/locks/actions"_s, Places::enabledActions.toUtf8() + '\n');
+    Files::write("/etc/dconf/profile/user"_s, "user-db:user\nsystem-db:device\n");
+    QCOMPARE(QProcess::execute("dconf"_s, {"compile"_s, "/etc/dconf/db/device"_s, source}), 0);
 }
 
 void TestLockedList::moveChangesNothing()
@@ -62,17 +58,17 @@ void TestLockedList::moveChangesNothing()
     MessageLog log;
     QuickActionsModel model;
     model.componentComplete();
-    const QStringList listed{QStringLiteral("a"), QStringLiteral("b"), QStringLiteral("c")};
+    const QStringList listed = words("a b c");
     QCOMPARE(names(model), listed);
 
     // Twice: the second call must find the rows and the list as they were.
     for (int i = 0; i < 2; ++i) {
         model.move(0, 2);
         QCOMPARE(names(model), listed);
-        QCOMPARE(MGConfItem(enabledKey).value().toStringList().size(), 3);
+        QCOMPARE(MGConfItem(Places::enabledActions).value().toStringList().size(), 3);
         const QStringList messages = log.takeTexts();
         QCOMPARE(messages.size(), 1);
-        QVERIFY2(messages.first().contains(enabledKey), qPrintable(messages.first()));
+        QVERIFY2(messages.first().contains(Places::enabledActions), qPrintable(messages.first()));
         QCoreApplication::processEvents();
         QCOMPARE(names(model), listed);
     }

@@ -4,6 +4,7 @@
 #include "files.h"
 #include "mgconfitem.h"
 #include "naivecatalogs.h"
+#include "places.h"
 #include "quickactions/quickactionsmodel.h"
 #include "randommodeltest.h"
 #include "texts.h"
@@ -17,11 +18,6 @@
 #include <optional>
 
 namespace {
-
-const QString directory = "/usr/share/glimmera/quickactions"_s;
-const QString enabledKey = "/desktop/glimmera-marlo-home/events_screen_actions"_s;
-const QString blockedKey = "/desktop/glimmera-marlo-home/blocked_actions"_s;
-const QString userKey = "/desktop/glimmera-marlo-home/events_screen_actions_user"_s;
 
 struct Action {
     QString path;
@@ -74,9 +70,9 @@ public:
     {
         const int countBefore = rows.size();
         QStringList selected;
-        const QStringList names = QDir(directory).entryList({"*.conf"_s});
+        const QStringList names = QDir(Places::quickActions).entryList({"*.conf"_s});
         for (const QString &name : names) {
-            const QString path = directory + QLatin1Char('/') + name;
+            const QString path = Places::quickActions + QLatin1Char('/') + name;
             if ((showPotential || enabledList.contains(path)) && !m_blockedList.contains(path)) {
                 selected.append(path);
             }
@@ -185,8 +181,8 @@ private:
         return rows.size();
     }
 
-    MGConfItem m_enabledItem{enabledKey};
-    MGConfItem m_blockedItem{blockedKey};
+    MGConfItem m_enabledItem{Places::enabledActions};
+    MGConfItem m_blockedItem{Places::blockedActions};
     QStringList m_blockedList;
     NaiveCatalogs m_catalogs;
 };
@@ -216,17 +212,18 @@ private:
     bool m_userHasChosen = false;
 };
 
-TestRandomActions::TestRandomActions() : RandomModelTest(directory, enabledKey)
+TestRandomActions::TestRandomActions()
+    : RandomModelTest(Places::quickActions, Places::enabledActions)
 {
     for (const QString &name : words("a b c D e f g h")) {
-        m_paths.append("%1/%2.conf"_s.arg(directory, name));
+        m_paths.append("%1/%2.conf"_s.arg(Places::quickActions, name));
     }
 }
 
 void TestRandomActions::reset()
 {
-    MGConfItem(blockedKey).unset();
-    MGConfItem(userKey).unset();
+    MGConfItem(Places::blockedActions).unset();
+    MGConfItem(Places::userActions).unset();
     m_userHasChosen = false;
 }
 
@@ -320,11 +317,11 @@ QString TestRandomActions::step()
     }
     if (kind < 740) {
         const QStringList list = listOf(m_paths, 3);
-        MGConfItem(blockedKey).set(list);
+        MGConfItem(Places::blockedActions).set(list);
         return "block "_s + list.join(QLatin1Char(' '));
     }
     if (kind < 760) {
-        MGConfItem(blockedKey).unset();
+        MGConfItem(Places::blockedActions).unset();
         return "block nothing"_s;
     }
     if (kind < 880) {
@@ -339,9 +336,9 @@ QString TestRandomActions::step()
         return "remove "_s + path;
     }
     if (kind < 955) {
-        Files::remove(directory);
+        Files::remove(m_directory);
         waitForReload();
-        Files::makeDirectory(directory);
+        Files::makeDirectory(m_directory);
         waitForReload();
         return "another directory"_s;
     }
@@ -352,7 +349,7 @@ QString TestRandomActions::step()
         makeModels();
         return "new models"_s;
     }
-    MGConfItem(userKey).unset();
+    MGConfItem(Places::userActions).unset();
     m_userHasChosen = false;
     return "no choice of the user"_s;
 }
@@ -365,7 +362,7 @@ QString TestRandomActions::difference()
     if (m_naive->enabledList != m_stored.toStringList()) {
         return "the list that the naive model read: "_s + m_naive->enabledList.join(" "_s);
     }
-    if (MGConfItem(userKey).value().toBool() != m_userHasChosen) {
+    if (MGConfItem(Places::userActions).value().toBool() != m_userHasChosen) {
         return "the note that the user has chosen"_s;
     }
     return RandomModelTest::difference();

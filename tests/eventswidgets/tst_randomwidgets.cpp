@@ -5,6 +5,7 @@
 #include "files.h"
 #include "mgconfitem.h"
 #include "naivecatalogs.h"
+#include "places.h"
 #include "randommodeltest.h"
 #include "texts.h"
 #include "words.h"
@@ -19,9 +20,6 @@
 #include <tuple>
 
 namespace {
-
-const QString directory = "/usr/share/glimmera/eventswidgets"_s;
-const QString key = "/desktop/glimmera-marlo-home/events_screen_widgets"_s;
 
 struct Widget {
     QString title;
@@ -76,7 +74,7 @@ public:
         }
         QList<Widget> widgets;
         const QStringList names =
-            QDir(directory).entryList({"*.json"_s}, QDir::Files, QDir::Unsorted);
+            QDir(Places::eventsWidgets).entryList({"*.json"_s}, QDir::Files, QDir::Unsorted);
         for (const QString &name : names) {
             readFile(name, &widgets);
         }
@@ -116,7 +114,7 @@ public:
 private:
     void readFile(const QString &name, QList<Widget> *widgets)
     {
-        const QString path = directory + QLatin1Char('/') + name;
+        const QString path = Places::eventsWidgets + QLatin1Char('/') + name;
         QFile file(path);
         if (!file.open(QIODevice::ReadOnly)) {
             warnings.append("Failed to open \"%1\""_s.arg(path));
@@ -176,7 +174,7 @@ private:
         return text == id ? fallback : text;
     }
 
-    MGConfItem m_item{key};
+    MGConfItem m_item{Places::enabledWidgets};
     bool m_defaults = false;
     // Catalogs are added but never removed.
     NaiveCatalogs m_catalogs;
@@ -184,7 +182,7 @@ private:
 
 // Each scan of the model warns about this file. The naive model then scans as well, so that it
 // follows every scan that the watcher of the directory starts.
-const QString marker = directory + "/marker.json"_s;
+const QString marker = Places::eventsWidgets + "/marker.json"_s;
 std::function<void()> onScan;
 QtMessageHandler nextHandler = nullptr;
 
@@ -222,10 +220,11 @@ private:
     std::unique_ptr<EventsWidgetsModel> m_model;
 };
 
-TestRandomWidgets::TestRandomWidgets() : RandomModelTest(directory, key)
+TestRandomWidgets::TestRandomWidgets()
+    : RandomModelTest(Places::eventsWidgets, Places::enabledWidgets)
 {
     for (const QString &name : words("one two Three four")) {
-        m_files.append("%1/%2.json"_s.arg(directory, name));
+        m_files.append("%1/%2.json"_s.arg(Places::eventsWidgets, name));
     }
     onScan = [this] {
         ++m_reloads;

@@ -52,7 +52,6 @@ private Q_SLOTS:
     void ignoresOtherChanges();
     void settersAnnounceChangesOnly();
     void signalsInOrder();
-    void handlersMayCallBack();
 
     // Sentences
     void joins_data();
@@ -623,24 +622,6 @@ void TestTitlesView::signalsInOrder()
     QCOMPARE(seen.join(", "_s),
              "role:, model:, value:a, matchRole:a, value:, match:, value:a, "
              "role:a, value:, role:, value:a"_s);
-}
-
-void TestTitlesView::handlersMayCallBack()
-{
-    ListModel model({named("a", 1)});
-    ListModel other({named("b", 2)});
-    TitlesView view;
-    connect(&view, &TitlesView::modelChanged, this, [&] { view.setModel(&other); });
-    connect(&view, &TitlesView::valueChanged, this, [&] {
-        view.setRole(kind);
-        view.update();
-    });
-    view.setRole(name);
-    view.setModel(&model);
-    QCOMPARE(view.model(), &other);
-    QCOMPARE(view.values(), words("2"));
-    model.insert(0, named("c"));
-    QCOMPARE(view.values(), words("2"));
 }
 
 void TestTitlesView::joins_data()

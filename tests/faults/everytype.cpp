@@ -4,26 +4,23 @@
 #include "everytype.h"
 
 #include "files.h"
+#include "members.h"
 #include "moduletypes.h"
+#include "texts.h"
 
 #include <QAbstractListModel>
 #include <QDebug>
 #include <QFile>
-#include <QMetaMethod>
-#include <QMetaProperty>
 #include <QUrl>
-
-#include <array>
 
 namespace {
 
 const QStringList typesOfFiles = {
-    QStringLiteral("AndroidSupport"), QStringLiteral("BluetoothInfo"),
-    QStringLiteral("ModemFeatures"),  QStringLiteral("TermsOfUseManager"),
-    QStringLiteral("TextFileReader"),
+    "AndroidSupport"_s,    "BluetoothInfo"_s,  "ModemFeatures"_s,
+    "TermsOfUseManager"_s, "TextFileReader"_s,
 };
 
-const QString textFile = QStringLiteral("/usr/share/marlo-settings/texts/text.txt");
+const QString textFile = "/usr/share/marlo-settings/texts/text.txt"_s;
 
 QString describe(const QVariant &value)
 {
@@ -54,51 +51,24 @@ QByteArray document(const ModuleType &type)
         + it + " }\n";
 }
 
-// Some value of the type, to set a property or to call a method.
-QVariant anyValue(int type, const QVariant &current)
+// Some value of the type, to set a property or to call a method. It differs from the current one.
+QVariant anyValue(int type, const QVariant &current = {})
 {
+    const bool hasAny = current.toString() == "any"_s;
     switch (type) {
     case QMetaType::Bool:
         return !current.toBool();
     case QMetaType::Int:
         return current.isValid() ? 1 : 0;
     case QMetaType::QString:
-        return QStringLiteral("any");
+        return hasAny ? "other"_s : "any"_s;
     case QMetaType::QStringList:
-        return QStringList{QStringLiteral("any"), QStringLiteral("other")};
+        return QStringList{"any"_s, "other"_s};
     case QMetaType::QUrl:
-        return QUrl(QStringLiteral("file:///nonexistent"));
+        return QUrl("file:///nonexistent"_s);
     default:
         return {};
     }
-}
-
-void call(QObject *object, const QMetaMethod &method)
-{
-    std::array<QVariant, 3> values;
-    std::array<QGenericArgument, 3> arguments;
-    if (method.parameterCount() > int(values.size())) {
-        qFatal("%s takes too many arguments", method.methodSignature().constData());
-    }
-    const QList<QByteArray> types = method.parameterTypes();
-    for (int i = 0; i < types.size(); ++i) {
-        auto &value = values.at(size_t(i));
-        value = anyValue(method.parameterType(i), {});
-        if (!value.isValid()) {
-            qFatal("no argument for %s", method.methodSignature().constData());
-        }
-        arguments.at(size_t(i)) = QGenericArgument(types.at(i).constData(), value.constData());
-    }
-    if (!method.invoke(object, arguments[0], arguments[1], arguments[2])) {
-        qFatal("cannot call %s", method.methodSignature().constData());
-    }
-}
-
-// The base class whose properties and methods are not part of the type.
-const QMetaObject *base(const QObject *object)
-{
-    return qobject_cast<const QAbstractListModel *>(object) ? &QAbstractListModel::staticMetaObject
-                                                            : &QObject::staticMetaObject;
 }
 
 } // namespace
@@ -125,19 +95,18 @@ void EveryType::installFiles()
     write("/usr/share/libherepositioning/agreements/here_consent_en_GB.txt", "here");
     Files::write(textFile, "text\n");
     write("/usr/libexec/sdcardhelper", "#!/bin/sh\necho vfat\n");
-    if (!QFile::setPermissions(QStringLiteral("/usr/libexec/sdcardhelper"),
-                               QFile::ReadOwner | QFile::ExeOwner)) {
+    if (!QFile::setPermissions("/usr/libexec/sdcardhelper"_s, QFile::ReadOwner | QFile::ExeOwner)) {
         qFatal("cannot make the helper executable");
     }
 }
 
 EveryType::EveryType()
 {
-    m_engine.addImportPath(QStringLiteral(QML_BUILD_DIR));
+    m_engine.addImportPath(QLatin1String(QML_BUILD_DIR));
     for (const ModuleType &type : ModuleType::all()) {
         m_names.append(type.name);
         auto component = std::make_unique<QQmlComponent>(&m_engine);
-        component->setData(document(type), QUrl(QStringLiteral("test.qml")));
+        component->setData(document(type), QUrl("test.qml"_s));
         m_components.emplace(type.name, std::move(component));
         m_objects.emplace(type.name, make(type.name));
     }
@@ -180,12 +149,10 @@ QStringList EveryType::state(const QString &name) const
 {
     QStringList lines;
     QObject *it = object(name);
-    const auto note = [&lines, &name](const char *what, const QVariant &value) {
-        lines.append(QStringLiteral("%1.%2 %3").arg(name, QLatin1String(what), describe(value)));
+    const auto note = [&](const char *what, const QVariant &value) {
+        lines.append("%1.%2 %3"_s.arg(name, QLatin1String(what), describe(value)));
     };
-    const QMetaObject *meta = it->metaObject();
-    for (int i = base(it)->propertyCount(); i < meta->propertyCount(); ++i) {
-        const QMetaProperty property = meta->property(i);
+    for (const QMetaProperty &property : Members::properties(*it)) {
         // The address of a model differs from run to run.
         if (property.userType() != QMetaType::QObjectStar) {
             note(property.name(), property.read(it));
@@ -201,9 +168,9 @@ QStringList EveryType::state(const QString &name) const
     }
     for (const char *terms : {"platformTermsOfUse", "vendorTermsOfUse", "vendorTermsSummary"}) {
         QStringList text;
-        if (meta->indexOfMethod(QByteArray(terms) + "(QString)") >= 0) {
+        if (it->metaObject()->indexOfMethod(QByteArray(terms) + "(QString)") >= 0) {
             QMetaObject::invokeMethod(it, terms, Q_RETURN_ARG(QStringList, text),
-                                      Q_ARG(QString, QStringLiteral("en_GB")));
+                                      Q_ARG(QString, "en_GB"_s));
             note(terms, text);
         }
     }
@@ -234,27 +201,23 @@ std::vector<EveryType::Use> EveryType::uses(const QString &name) const
 {
     std::vector<Use> uses;
     QObject *it = object(name);
-    const QMetaObject *meta = it->metaObject();
-    const int firstProperty = base(it)->propertyCount();
     const auto named = [&name](const char *member) {
         return name + QLatin1Char('.') + QLatin1String(member);
     };
-    for (int i = firstProperty; i < meta->propertyCount(); ++i) {
-        const QMetaProperty property = meta->property(i);
+    const auto properties = Members::properties(*it);
+    for (const QMetaProperty &property : properties) {
         uses.push_back({named(property.name()), [property, it] { property.read(it); }});
     }
     // Methods come before writes, because writes change the rows and make the formatter busy.
-    for (int i = base(it)->methodCount(); i < meta->methodCount(); ++i) {
-        const QMetaMethod method = meta->method(i);
-        if (method.access() == QMetaMethod::Public && method.methodType() != QMetaMethod::Signal) {
-            uses.push_back({named(method.methodSignature()), [method, it] { call(it, method); }});
-        }
+    for (const QMetaMethod &method : Members::methods(*it)) {
+        uses.push_back({named(method.methodSignature()), [method, it] {
+                            Members::call(it, method, [](int type) { return anyValue(type); });
+                        }});
     }
-    for (int i = firstProperty; i < meta->propertyCount(); ++i) {
-        const QMetaProperty property = meta->property(i);
+    for (const QMetaProperty &property : properties) {
         const int type = property.isEnumType() ? int(QMetaType::Int) : property.userType();
-        if (property.isWritable() && anyValue(type, {}).isValid()) {
-            uses.push_back({named(property.name()) + QStringLiteral(" ="), [property, type, it] {
+        if (property.isWritable() && anyValue(type).isValid()) {
+            uses.push_back({named(property.name()) + " ="_s, [property, type, it] {
                                 property.write(it, anyValue(type, property.read(it)));
                             }});
         }
@@ -265,8 +228,7 @@ std::vector<EveryType::Use> EveryType::uses(const QString &name) const
 void EveryType::useAll() const
 {
     for (const QString &name : m_names) {
-        const std::vector<Use> all = uses(name);
-        for (const Use &use : all) {
+        for (const Use &use : uses(name)) {
             use.run();
         }
     }

@@ -2,6 +2,7 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 #include "failingcard.h"
+#include "texts.h"
 
 #include <QFile>
 
@@ -47,8 +48,7 @@ fuse_attr attributes(uint64_t node)
 
 QString FailingCard::whyNot()
 {
-    return access(fuseDevice, R_OK | W_OK) == 0 ? QString()
-                                                : QStringLiteral("/dev/fuse cannot be opened");
+    return access(fuseDevice, R_OK | W_OK) == 0 ? QString() : "/dev/fuse cannot be opened"_s;
 }
 
 FailingCard::FailingCard(const QString &device, int files)

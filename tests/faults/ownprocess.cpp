@@ -2,6 +2,7 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 #include "ownprocess.h"
+#include "texts.h"
 
 #include <QCoreApplication>
 #include <QProcess>
@@ -26,7 +27,7 @@ QByteArray OwnProcess::runCurrentTest(const QStringList &command)
     }
     QProcess process;
     QProcessEnvironment environment = QProcessEnvironment::systemEnvironment();
-    environment.insert(QLatin1String(marker), QStringLiteral("1"));
+    environment.insert(QLatin1String(marker), "1"_s);
     process.setProcessEnvironment(environment);
     process.setProcessChannelMode(QProcess::MergedChannels);
     const QStringList words = command + QStringList{QCoreApplication::applicationFilePath(), test};

@@ -8,6 +8,7 @@
 #include "ownprocess.h"
 #include "patience.h"
 #include "simulator/serviceprocess.h"
+#include "texts.h"
 
 #include <QDBusConnection>
 #include <QProcess>
@@ -37,11 +38,9 @@ public:
     Buses()
     {
         for (size_t i = 0; i < 2; ++i) {
-            m_daemons[i].start(
-                QStringLiteral("dbus-daemon"),
-                {QStringLiteral("--session"), QStringLiteral("--nofork"),
-                 QStringLiteral("--print-address"),
-                 QStringLiteral("--address=unix:dir=") + qEnvironmentVariable("XDG_RUNTIME_DIR")});
+            m_daemons[i].start("dbus-daemon"_s,
+                               {"--session"_s, "--nofork"_s, "--print-address"_s,
+                                "--address=unix:dir="_s + qEnvironmentVariable("XDG_RUNTIME_DIR")});
             if (!m_daemons[i].waitForReadyRead()) {
                 qFatal("no bus daemon");
             }
@@ -70,19 +69,20 @@ private:
 
 // Values that need no service.
 const QStringList someFacts = {
-    QStringLiteral("AndroidSupport.dataDirectoriesVisible QVariant(bool, true)"),
-    QStringLiteral("BluetoothInfo.adapterAddress QVariant(QString, \"00:1a:7d:da:71:13\")"),
-    QStringLiteral("EventsWidgetsModel.path QVariant(QString, \"weather\")"),
-    QStringLiteral("KivInfo.kivReady QVariant(bool, false)"),
-    QStringLiteral("LocationConfiguration.gpsEnabled QVariant(bool, false)"),
-    QStringLiteral("LocationConfiguration.hereAgreementText QVariant(QString, \"here\")"),
-    QStringLiteral("MemoryCardFormatter.busy QVariant(bool, false)"),
-    QStringLiteral("ModemFeatures.variant QVariant(QString, \"europe\")"),
-    QStringLiteral("QuickActionsModel.count QVariant(int, 1)"),
-    QStringLiteral("TermsOfUseManager.vendorTermsSummary QVariant(QStringList, "
-                   "(\"Summary\", \"of the terms\"))"),
-    QStringLiteral("TextFileReader.collate QVariant(QString, \"text\")"),
-    QStringLiteral("TitlesView.value QVariant(QString, \"Weather\")"),
+    "AndroidSupport.dataDirectoriesVisible QVariant(bool, true)"_s,
+    "BluetoothInfo.adapterAddress QVariant(QString, \"00:1a:7d:da:71:13\")"_s,
+    "EventsWidgetsModel.path QVariant(QString, \"weather\")"_s,
+    "KivInfo.kivId QVariant(QString, \"\")"_s,
+    "KivInfo.kivReady QVariant(bool, false)"_s,
+    "LocationConfiguration.gpsEnabled QVariant(bool, false)"_s,
+    "LocationConfiguration.hereAgreementText QVariant(QString, \"here\")"_s,
+    "MemoryCardFormatter.busy QVariant(bool, false)"_s,
+    "ModemFeatures.variant QVariant(QString, \"europe\")"_s,
+    "QuickActionsModel.count QVariant(int, 1)"_s,
+    "TermsOfUseManager.vendorTermsSummary QVariant(QStringList, "
+    "(\"Summary\", \"of the terms\"))"_s,
+    "TextFileReader.collate QVariant(QString, \"text\")"_s,
+    "TitlesView.value QVariant(QString, \"Weather\")"_s,
 };
 
 QStringList missing(const QStringList &facts, const QStringList &state)
@@ -99,7 +99,7 @@ QStringList missing(const QStringList &facts, const QStringList &state)
 // Whether the formatter has finished everything that useAll() requested.
 bool isIdle(const EveryType &types)
 {
-    return !types.object(QStringLiteral("MemoryCardFormatter"))->property("busy").toBool();
+    return !types.object("MemoryCardFormatter"_s)->property("busy").toBool();
 }
 
 } // namespace
@@ -107,7 +107,7 @@ bool isIdle(const EveryType &types)
 void TestBusFaults::initTestCase()
 {
     EveryType::installFiles();
-    QLocale::setDefault(QLocale(QStringLiteral("en_GB")));
+    QLocale::setDefault(QLocale("en_GB"_s));
 }
 
 void TestBusFaults::everyTypeWithoutABus()
@@ -125,7 +125,7 @@ void TestBusFaults::everyTypeWithoutABus()
     QVERIFY(Buses::areGone());
     // useAll() has set another path of the vendor's terms.
     QCOMPARE(missing(before, types.stateOfFiles())
-                 .filter(QRegularExpression(QStringLiteral("^(?!TermsOfUseManager)"))),
+                 .filter(QRegularExpression("^(?!TermsOfUseManager)"_s)),
              QStringList());
 }
 
@@ -156,26 +156,25 @@ void TestBusFaults::busesDieBeforeServicesReply()
 {
     IN_A_PROCESS_OF_ITS_OWN()
     Buses buses;
-    ServiceProcess cover("system", QStringLiteral("com.marlo.kivd"), "replies");
-    ServiceProcess disk("system", QStringLiteral("org.freedesktop.UDisks2"), "replies");
-    ServiceProcess lamp("session", QStringLiteral("org.example.lamp"), "replies");
+    ServiceProcess cover("system", "com.marlo.kivd"_s, "replies");
+    ServiceProcess disk("system", "org.freedesktop.UDisks2"_s, "replies");
+    ServiceProcess lamp("session", "org.example.lamp"_s, "replies");
     for (ServiceProcess *service : {&cover, &disk, &lamp}) {
         service->stop();
     }
     const EveryType types;
-    QObject *formatter = types.object(QStringLiteral("MemoryCardFormatter"));
-    formatter->setProperty("deviceName", QStringLiteral("card"));
+    QObject *formatter = types.object("MemoryCardFormatter"_s);
+    formatter->setProperty("deviceName", "card"_s);
     QMetaObject::invokeMethod(formatter, "mount");
-    QMetaObject::invokeMethod(types.object(QStringLiteral("QuickActionsModel")), "triggerAction",
-                              Q_ARG(int, 0));
+    QMetaObject::invokeMethod(types.object("QuickActionsModel"_s), "triggerAction", Q_ARG(int, 0));
     QTest::qWait(100);
-    const QStringList before = types.state(QStringLiteral("KivInfo"));
+    const QStringList before = types.state("KivInfo"_s);
 
     const MessageLog log;
     buses.kill();
     TRY_COMPARE(formatter->property("status").toInt(), 6); // Error
     QVERIFY(Buses::areGone());
-    QCOMPARE(types.state(QStringLiteral("KivInfo")), before);
+    QCOMPARE(types.state("KivInfo"_s), before);
     for (ServiceProcess *service : {&cover, &disk, &lamp}) {
         service->goOn();
     }

@@ -7,6 +7,7 @@
 #include "files.h"
 #include "formattertest.h"
 #include "simulator/serviceprocess.h"
+#include "texts.h"
 
 #include <QDir>
 #include <QThreadPool>
@@ -56,10 +57,10 @@ constexpr int files = 300;
 constexpr char emptied[] = "not busy, Mounting, busy, RemovingFiles, Idle, not busy";
 constexpr char failed[] = "not busy, Mounting, busy, RemovingFiles, Error, not busy";
 
-const QString name = QStringLiteral("testcard1");
-const QString device = QStringLiteral("/dev/testcard1");
-const QString otherDevice = QStringLiteral("/dev/testcard2");
-const QString vfat = QStringLiteral("vfat");
+const QString name = "testcard1"_s;
+const QString device = "/dev/testcard1"_s;
+const QString otherDevice = "/dev/testcard2"_s;
+const QString vfat = "vfat"_s;
 
 #define NEEDS_FUSE()                                                                               \
     if (!FailingCard::whyNot().isEmpty()) {                                                        \
@@ -68,7 +69,7 @@ const QString vfat = QStringLiteral("vfat");
 
 void installHelper(const QByteArray &script)
 {
-    const QString path = QStringLiteral("/usr/libexec/sdcardhelper");
+    const QString path = "/usr/libexec/sdcardhelper"_s;
     Files::write(path, "#!/bin/sh\n" + script);
     QVERIFY(QFile::setPermissions(path, QFile::ReadOwner | QFile::ExeOwner));
 }
@@ -79,11 +80,11 @@ void TestCardFaults::init()
 {
     FormatterTest::init();
     installHelper("echo ext4\n");
-    m_diskService = std::make_unique<ServiceProcess>(
-        "system", QStringLiteral("org.freedesktop.UDisks2"), "replies");
+    m_diskService =
+        std::make_unique<ServiceProcess>("system", "org.freedesktop.UDisks2"_s, "replies");
     makeFormatter();
     setCard(name, device);
-    QCOMPARE(m_formatter->filesystemType(), QStringLiteral("ext4"));
+    QCOMPARE(m_formatter->filesystemType(), "ext4"_s);
 }
 
 void TestCardFaults::cleanup()
@@ -165,7 +166,7 @@ void TestCardFaults::cardDetachedWhileItIsEmptied()
     startEmptying(&card);
     // The directory under the mount point is not part of the card.
     card.detach();
-    const QString below = card.directory() + QStringLiteral("/file0");
+    const QString below = card.directory() + "/file0"_s;
     Files::write(below, "not of the card");
     card.setFault(Fault::None);
     TRY_EVENTS(emptied);
@@ -262,7 +263,7 @@ void TestCardFaults::helperThatReportsAtLength()
 void TestCardFaults::helperThatNeverEnds()
 {
     startProbing(otherDevice, "echo $$ >/run/helper\nexec sleep 600\n");
-    QFile file(QStringLiteral("/run/helper"));
+    QFile file("/run/helper"_s);
     TRY(file.size() > 0);
     QTest::qWait(100);
     QCOMPARE(m_formatter->status(), Formatter::Probing);

@@ -8,6 +8,8 @@
 #include "messagelog.h"
 #include "ownprocess.h"
 #include "patience.h"
+#include "places.h"
+#include "texts.h"
 #include "usedupdescriptors.h"
 
 #include <QAbstractListModel>
@@ -31,25 +33,21 @@ private Q_SLOTS:
 
 namespace {
 
-const QString actions = QStringLiteral("QuickActionsModel");
-const QString widgets = QStringLiteral("EventsWidgetsModel");
-const QString actionsDirectory = QStringLiteral("/usr/share/glimmera/quickactions");
-const QString widgetsDirectory = QStringLiteral("/usr/share/glimmera/eventswidgets");
+const QString actions = "QuickActionsModel"_s;
+const QString widgets = "EventsWidgetsModel"_s;
 
 // A user namespace has limits of its own, below those of the machine.
-const QStringList ownNamespace = {QStringLiteral("unshare"), QStringLiteral("--user"),
-                                  QStringLiteral("--map-root-user")};
+const QStringList ownNamespace = {"unshare"_s, "--user"_s, "--map-root-user"_s};
 
 bool mayMakeNamespaces()
 {
-    return QProcess::execute(ownNamespace.first(),
-                             ownNamespace.mid(1) + QStringList{QStringLiteral("true")})
+    return QProcess::execute(ownNamespace.first(), ownNamespace.mid(1) + QStringList{"true"_s})
         == 0;
 }
 
 void setLimit(const char *name, int value)
 {
-    QFile file(QStringLiteral("/proc/sys/user/") + QLatin1String(name));
+    QFile file("/proc/sys/user/"_s + QLatin1String(name));
     QVERIFY2(file.open(QIODevice::WriteOnly | QIODevice::Unbuffered), name);
     const QByteArray text = QByteArray::number(value);
     QCOMPARE(file.write(text), qint64(text.size()));
@@ -57,8 +55,8 @@ void setLimit(const char *name, int value)
 
 void addFiles(const QString &name)
 {
-    Files::write(actionsDirectory + QLatin1Char('/') + name + QStringLiteral(".conf"), "title=a\n");
-    Files::write(widgetsDirectory + QLatin1Char('/') + name + QStringLiteral(".json"),
+    Files::write(Places::quickActions + QLatin1Char('/') + name + ".conf"_s, "title=a\n");
+    Files::write(Places::eventsWidgets + QLatin1Char('/') + name + ".json"_s,
                  R"({ "widgets": [ { "path": ")" + name.toUtf8() + R"(" } ] })");
 }
 
@@ -76,13 +74,13 @@ QObject *it(const std::unique_ptr<QObject> &created)
 
 void TestLimits::initTestCase()
 {
-    QLocale::setDefault(QLocale(QStringLiteral("en_GB")));
+    QLocale::setDefault(QLocale("en_GB"_s));
 }
 
 void TestLimits::init()
 {
-    Files::remove(actionsDirectory);
-    Files::remove(widgetsDirectory);
+    Files::remove(Places::quickActions);
+    Files::remove(Places::eventsWidgets);
     EveryType::installFiles();
 }
 
@@ -98,14 +96,14 @@ void TestLimits::noInotifyInstances()
     QCOMPARE(rows(types.object(widgets)), 1);
     // The models poll the directories instead, which does not show files that are written in place.
     for (int i = 0; i < 3; ++i) {
-        addFiles(QStringLiteral("new%1").arg(i));
+        addFiles("new%1"_s.arg(i));
         TRY_COMPARE(rows(types.object(actions)), 2 + i);
         TRY_COMPARE(rows(types.object(widgets)), 2 + i);
     }
 
     setLimit("max_inotify_instances", 128);
     const auto model = types.make(widgets);
-    Files::write(widgetsDirectory + QStringLiteral("/new0.json"), "{ \"widgets\": [ ] }");
+    Files::write(Places::eventsWidgets + "/new0.json"_s, "{ \"widgets\": [ ] }");
     TRY_COMPARE(rows(it(model)), 3);
 }
 
@@ -120,14 +118,14 @@ void TestLimits::noInotifyWatches()
     QCOMPARE(rows(types.object(actions)), 1);
     QCOMPARE(rows(types.object(widgets)), 1);
     // The models poll the directories, as without an instance.
-    addFiles(QStringLiteral("new"));
+    addFiles("new"_s);
     TRY_COMPARE(rows(types.object(actions)), 2);
     TRY_COMPARE(rows(types.object(widgets)), 2);
 
     setLimit("max_inotify_watches", 1000);
     const auto actionsModel = types.make(actions);
     const auto widgetsModel = types.make(widgets);
-    addFiles(QStringLiteral("newer"));
+    addFiles("newer"_s);
     TRY_COMPARE(rows(it(actionsModel)), 3);
     TRY_COMPARE(rows(it(widgetsModel)), 3);
 }
@@ -140,20 +138,20 @@ void TestLimits::noDescriptors()
     const QStringList before = types.state();
     // Set once while there are descriptors: without them, the sanitizer cannot inspect an object of
     // a type that it has not seen before, and reports an error.
-    QObject *formatter = types.object(QStringLiteral("MemoryCardFormatter"));
-    formatter->setProperty("devicePath", QStringLiteral("/dev/first"));
-    TRY_COMPARE(formatter->property("filesystemType").toString(), QStringLiteral("vfat"));
+    QObject *formatter = types.object("MemoryCardFormatter"_s);
+    formatter->setProperty("devicePath", "/dev/first"_s);
+    TRY_COMPARE(formatter->property("filesystemType").toString(), "vfat"_s);
     std::vector<std::unique_ptr<QObject>> made;
     {
         const MessageLog log;
         const UsedUpDescriptors none;
-        QCOMPARE(types.state().filter(QStringLiteral("TextFileReader.readContent")),
-                 QStringList{QStringLiteral("TextFileReader.readContent QVariant(QString, \"\")")});
+        QCOMPARE(types.state().filter("TextFileReader.readContent"_s),
+                 QStringList{"TextFileReader.readContent QVariant(QString, \"\")"_s});
         for (const QString &name : EveryType::names()) {
             made.push_back(types.make(name));
         }
         // The formatter's helper cannot be started.
-        formatter->setProperty("devicePath", QStringLiteral("/dev/card"));
+        formatter->setProperty("devicePath", "/dev/card"_s);
         TRY_COMPARE(formatter->property("status").toInt(), 6); // Error
         QTest::qWait(100);
     }
@@ -163,9 +161,9 @@ void TestLimits::noDescriptors()
         QVERIFY2(after.contains(line) || line.startsWith(QLatin1String("MemoryCardFormatter")),
                  qPrintable(line));
     }
-    formatter->setProperty("devicePath", QStringLiteral("/dev/other"));
-    TRY_COMPARE(formatter->property("filesystemType").toString(), QStringLiteral("vfat"));
-    addFiles(QStringLiteral("new"));
+    formatter->setProperty("devicePath", "/dev/other"_s);
+    TRY_COMPARE(formatter->property("filesystemType").toString(), "vfat"_s);
+    addFiles("new"_s);
     TRY_COMPARE(rows(types.object(actions)), 2);
     TRY_COMPARE(rows(types.object(widgets)), 2);
 }
@@ -174,8 +172,8 @@ void TestLimits::directoryReplacedByALink_data()
 {
     QTest::addColumn<QString>("type");
     QTest::addColumn<QString>("directory");
-    QTest::newRow("QuickActionsModel") << actions << actionsDirectory;
-    QTest::newRow("EventsWidgetsModel") << widgets << widgetsDirectory;
+    QTest::newRow("QuickActionsModel") << actions << Places::quickActions;
+    QTest::newRow("EventsWidgetsModel") << widgets << Places::eventsWidgets;
 }
 
 void TestLimits::directoryReplacedByALink()
@@ -185,24 +183,24 @@ void TestLimits::directoryReplacedByALink()
     const EveryType types;
     QObject *model = types.object(type);
     QCOMPARE(rows(model), 1);
-    addFiles(QStringLiteral("other"));
+    addFiles("other"_s);
     TRY_COMPARE(rows(model), 2);
 
-    const QString target = directory + QStringLiteral("-target");
+    const QString target = directory + "-target"_s;
     Files::remove(target);
     QVERIFY(QDir().rename(directory, target));
     TRY_COMPARE(rows(model), 0);
     Files::makeLink(target, directory);
     TRY_COMPARE(rows(model), 2);
     // The model notices changes in the target of the link.
-    addFiles(QStringLiteral("third"));
+    addFiles("third"_s);
     TRY_COMPARE(rows(model), 3);
     // This removes the link, but nothing in its target.
     Files::remove(directory);
     TRY_COMPARE(rows(model), 0);
     QCOMPARE(QDir(target).count(), uint(3 + 2)); // with . and ..
     Files::makeDirectory(directory);
-    addFiles(QStringLiteral("last"));
+    addFiles("last"_s);
     TRY_COMPARE(rows(model), 1);
     Files::remove(target);
 }

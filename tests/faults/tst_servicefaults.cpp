@@ -6,8 +6,10 @@
 #include "deviceinfo/kivinfo.h"
 #include "files.h"
 #include "formattertest.h"
+#include "places.h"
 #include "quickactions/quickactionsmodel.h"
 #include "simulator/serviceprocess.h"
+#include "texts.h"
 #include "words.h"
 
 #include <QDBusPendingCallWatcher>
@@ -62,15 +64,13 @@ namespace {
 
 constexpr int flood = 10000; // signals
 
-const QString directory = QStringLiteral("/usr/share/glimmera/quickactions");
 const QByteArray action = "remote-service=org.example.lamp\nremote-path=/lamp\n"
                           "remote-interface=org.example.Lamp\nremote-method=toggle\n"
                           "requires-package=lamp\n";
 
 // QtDBus logs this when two changes of an owner overtake each other between its threads, as they
 // sometimes do when a service starts and stops as quickly as here. It then uses the later one.
-const QString lateOwner =
-    QStringLiteral("QDBusConnection: name '[^']*' had owner '[^']*' but we thought it was");
+const QString lateOwner = "QDBusConnection: name '[^']*' had owner '[^']*' but we thought it was"_s;
 
 // Shows that nothing more changes.
 void letEverythingArrive()
@@ -88,13 +88,13 @@ bool isSettled(const KivInfo &info)
 void TestServiceFaults::init()
 {
     FormatterTest::init();
-    Files::remove(directory);
-    Files::write(directory + QStringLiteral("/lamp.conf"), action);
+    Files::remove(Places::quickActions);
+    Files::write(Places::quickActions + "/lamp.conf"_s, action);
     m_model = std::make_unique<QuickActionsModel>();
     m_model->setShowPotential(true);
     m_model->componentComplete();
     makeFormatter();
-    m_formatter->setDeviceName(QStringLiteral("testcard1"));
+    m_formatter->setDeviceName("testcard1"_s);
 }
 
 void TestServiceFaults::cleanup()
@@ -135,9 +135,9 @@ void TestServiceFaults::coverDaemonHangs()
     QVERIFY(!isSettled(info));
 
     m_service->goOn();
-    TRY_COMPARE(info.kivId(), QStringLiteral("cover-0"));
+    TRY_COMPARE(info.kivId(), "cover-0"_s);
     TRY(info.kivReady());
-    QVERIFY(!m_service->calls().contains(QStringLiteral("Introspect")));
+    QVERIFY(!m_service->calls().contains("Introspect"_s));
 }
 
 void TestServiceFaults::coverDaemonDiesBeforeItReplies()
@@ -152,7 +152,7 @@ void TestServiceFaults::coverDaemonDiesBeforeItReplies()
     // The object follows the next daemon.
     startCoverDaemon("replies");
     m_service->sendSignals(1);
-    TRY_COMPARE(info.kivId(), QStringLiteral("cover-1"));
+    TRY_COMPARE(info.kivId(), "cover-1"_s);
     QVERIFY(info.kivReady());
 }
 
@@ -171,7 +171,7 @@ void TestServiceFaults::coverDaemonFloods()
         }
     });
     m_service->sendSignals(flood);
-    TRY_COMPARE(info.kivId(), QStringLiteral("cover-%1").arg(flood));
+    TRY_COMPARE(info.kivId(), "cover-%1"_s.arg(flood));
     QVERIFY(info.kivReady());
     QCOMPARE(changed.count(), flood);
     QVERIFY(another == nullptr);

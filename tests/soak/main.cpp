@@ -4,6 +4,7 @@
 // usage: soak [--seed NUMBER] SECONDS
 
 #include "soak.h"
+#include "texts.h"
 
 #include <QCommandLineParser>
 #include <QCoreApplication>
@@ -30,10 +31,9 @@ int main(int argc, char *argv[])
     }
     const QCoreApplication application(argc, argv);
     QCommandLineParser parser;
-    const QCommandLineOption seedOption(QStringLiteral("seed"), QStringLiteral("of all chance"),
-                                        QStringLiteral("number"));
+    const QCommandLineOption seedOption("seed"_s, "of all chance"_s, "number"_s);
     parser.addOption(seedOption);
-    parser.addPositionalArgument(QStringLiteral("seconds"), QStringLiteral("how long to run"));
+    parser.addPositionalArgument("seconds"_s, "how long to run"_s);
     parser.process(application);
 
     bool isNumber = false;

@@ -2,6 +2,7 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 #include "process.h"
+#include "texts.h"
 
 #include <QByteArray>
 #include <QDir>
@@ -13,7 +14,7 @@
 qint64 Process::residentMemory()
 {
     malloc_trim(0);
-    QFile file(QStringLiteral("/proc/self/statm"));
+    QFile file("/proc/self/statm"_s);
     if (!file.open(QIODevice::ReadOnly)) {
         qFatal("cannot read %s", qPrintable(file.fileName()));
     }
@@ -24,7 +25,7 @@ qint64 Process::residentMemory()
 
 int Process::openFiles()
 {
-    const QDir directory(QStringLiteral("/proc/self/fd"));
+    const QDir directory("/proc/self/fd"_s);
     // Without the descriptor that reads the directory.
     return int(directory.entryList(QDir::AllEntries | QDir::System | QDir::NoDotAndDotDot).size())
         - 1;

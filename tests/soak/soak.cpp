@@ -3,20 +3,20 @@
 
 #include "soak.h"
 
+#include "members.h"
 #include "moduletypes.h"
 #include "process.h"
+#include "texts.h"
 
 #include <QAbstractItemModel>
 #include <QCoreApplication>
 #include <QEvent>
 #include <QLocale>
-#include <QMetaProperty>
 #include <QQmlComponent>
 #include <QThreadPool>
 #include <QUrl>
 
 #include <algorithm>
-#include <array>
 #include <cstdio>
 #include <memory>
 
@@ -55,7 +55,7 @@ void processEvents(int time)
 
 Soak::Soak(quint32 seed) : m_random(seed), m_world(&m_random)
 {
-    m_engine.addImportPath(QStringLiteral(QML_BUILD_DIR));
+    m_engine.addImportPath(QLatin1String(QML_BUILD_DIR));
     for (const ModuleType &type : ModuleType::all()) {
         (type.isSingleton ? m_singletons : m_creatable).append(type.name);
     }
@@ -126,7 +126,7 @@ void Soak::makeObject()
     if (m_objects.size() >= maximumObjects) {
         return;
     }
-    const QString &type = m_creatable.at(random(m_creatable.size()));
+    const QString type = anyOf(m_creatable);
     QQmlComponent component(&m_engine);
     component.setData(QByteArray("import ") + module + " 1.0\n" + type.toLatin1() + " { }", QUrl());
     QObject *const object = component.create();
@@ -139,16 +139,18 @@ void Soak::makeObject()
 
 void Soak::changeLanguage()
 {
-    static const std::array<const char *, 3> locales = {"fi_FI", "de_DE", "en_GB"};
-    QLocale::setDefault(QLocale(QLatin1String(locales[std::size_t(random(3))])));
+    QLocale::setDefault(QLocale(anyOf(QStringList{"fi_FI"_s, "de_DE"_s, "en_GB"_s})));
     QEvent change(QEvent::LanguageChange);
     QCoreApplication::sendEvent(&m_engine, &change);
 }
 
 void Soak::useProperty(QObject *object)
 {
-    const QMetaObject *const meta = object->metaObject();
-    const QMetaProperty property = meta->property(random(meta->propertyCount()));
+    const auto properties = Members::properties(*object);
+    if (properties.empty()) {
+        return;
+    }
+    const QMetaProperty property = anyOf(properties);
     property.read(object);
     if (property.isWritable()) {
         property.write(object, argumentFor(property.userType()));
@@ -158,35 +160,14 @@ void Soak::useProperty(QObject *object)
 void Soak::callMethod(QObject *object)
 {
     if (random(8) == 0) {
-        const QByteArray singleton = m_singletons.at(random(m_singletons.size())).toLatin1();
+        const QByteArray singleton = anyOf(m_singletons).toLatin1();
         object =
             m_engine.singletonInstance<QObject *>(qmlTypeId(module, 1, 0, singleton.constData()));
     }
-    const QMetaObject *const meta = object->metaObject();
-    std::vector<QMetaMethod> methods;
-    for (int i = 0; i < meta->methodCount(); ++i) {
-        const QMetaMethod method = meta->method(i);
-        const bool ofQt = QByteArray(method.enclosingMetaObject()->className()).startsWith('Q')
-            && qstrcmp(method.enclosingMetaObject()->className(), "QuickActionsModel") != 0;
-        if (!ofQt && method.methodType() != QMetaMethod::Signal
-            && method.access() == QMetaMethod::Public) {
-            methods.push_back(method);
-        }
+    const auto methods = Members::methods(*object);
+    if (!methods.empty()) {
+        Members::call(object, anyOf(methods), [this](int type) { return argumentFor(type); });
     }
-    if (methods.empty()) {
-        return;
-    }
-    const QMetaMethod method = methods[std::size_t(random(int(methods.size())))];
-    std::array<QVariant, 3> values;
-    std::array<QGenericArgument, 3> arguments;
-    for (int i = 0; i < method.parameterCount(); ++i) {
-        const int type = method.parameterType(i);
-        QVariant &value = values.at(std::size_t(i));
-        value = argumentFor(type);
-        value.convert(type);
-        arguments[std::size_t(i)] = {QMetaType::typeName(type), value.constData()};
-    }
-    method.invoke(object, Qt::DirectConnection, arguments[0], arguments[1], arguments[2]);
 }
 
 void Soak::readModel(QObject *object)
@@ -218,8 +199,7 @@ QVariant Soak::argumentFor(int type)
     case QMetaType::QUrl:
         return QUrl::fromLocalFile(m_world.text());
     case QMetaType::QObjectStar:
-        return QVariant::fromValue<QObject *>(
-            m_objects[std::size_t(random(int(m_objects.size())))]);
+        return QVariant::fromValue<QObject *>(anyOf(m_objects));
     case QMetaType::QVariant:
         return m_world.value();
     default:

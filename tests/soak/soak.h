@@ -7,7 +7,6 @@
 #include "world.h"
 
 #include <QElapsedTimer>
-#include <QMetaMethod>
 #include <QPointer>
 #include <QQmlEngine>
 #include <QRandomGenerator>
@@ -36,6 +35,10 @@ private:
     };
 
     int random(int bound) { return int(m_random.bounded(bound)); }
+    template<typename List> auto anyOf(const List &list)
+    {
+        return *(list.begin() + random(int(list.size())));
+    }
     void step();
     void makeObject();
     void changeLanguage();

@@ -2,9 +2,11 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 #include "world.h"
+#include "texts.h"
 
 #include "files.h"
 #include "mgconfitem.h"
+#include "places.h"
 #include "words.h"
 
 #include <QDBusConnection>
@@ -17,21 +19,18 @@
 
 namespace {
 
-const QString actionsDirectory = QStringLiteral("/usr/share/glimmera/quickactions");
-const QString widgetsDirectory = QStringLiteral("/usr/share/glimmera/eventswidgets");
-const QString elsewhere = QStringLiteral("/usr/share/glimmera/elsewhere");
-const QString availableFile = QStringLiteral("/usr/share/glimmera/available");
-const QString mountTable = QStringLiteral("/etc/mtab");
-const QString device = QStringLiteral("/dev/soak-card1");
-const QString session = QStringLiteral("com.marlo.torch");
+const QString elsewhere = "/usr/share/glimmera/elsewhere"_s;
+const QString availableFile = "/usr/share/glimmera/available"_s;
+const QString mountTable = "/etc/mtab"_s;
+const QString device = "/dev/soak-card1"_s;
+const QString session = "com.marlo.torch"_s;
 
 const QStringList names = words("a b c d e f");
 const QStringList catalogs =
     words("maps-fi maps-de maps_eng_en settings-system-fi settings-system_eng_en");
-const QStringList keys = words("/desktop/glimmera-marlo-home/events_screen_actions "
-                               "/desktop/glimmera-marlo-home/blocked_actions "
-                               "/desktop/glimmera-marlo-home/events_screen_widgets "
-                               "/settings/location/enabled /settings/location/custom_settings");
+const QStringList keys = {Places::enabledActions, Places::blockedActions, Places::enabledWidgets,
+                          "/settings/location/gps_enabled"_s,
+                          "/settings/location/custom_settings"_s};
 const QStringList files =
     words("/usr/share/marlo-settings/platform-eula/tarnwick_termsofuse-fi.txt "
           "/usr/share/marlo-settings/platform-eula/tarnwick_termsofuse-en_GB.txt "
@@ -82,7 +81,7 @@ void World::changeSomething()
     switch (random(12)) {
     case 0:
     case 1:
-        return changeDefinition(actionsDirectory, QStringLiteral(".conf"), anyOf(actions));
+        return changeDefinition(Places::quickActions, ".conf"_s, anyOf(actions));
     case 2:
     case 3:
         return changeWidgets();
@@ -93,9 +92,8 @@ void World::changeSomething()
     case 6:
         return random(20) == 0 ? killSettingsService() : changeSettings();
     case 7:
-        return changeCard();
     case 8:
-        return random(5) == 0 ? changeDiskService() : changeCard();
+        return random(10) == 0 ? changeDiskService() : changeCard();
     case 9:
         return changeHelper();
     case 10:
@@ -116,46 +114,37 @@ void World::settle()
 
 QString World::text()
 {
-    switch (random(4)) {
-    case 0:
-        return actionsDirectory + QLatin1Char('/') + anyOf(names) + QLatin1String(".conf");
-    case 1:
-        return QLatin1String("/w/") + anyOf(names);
-    case 2:
-        return anyOf(files);
-    default:
-        return anyOf(values);
-    }
+    const QStringList texts = {Places::quickActions + QLatin1Char('/') + anyOf(names) + ".conf"_s,
+                               "/w/"_s + anyOf(names), anyOf(files), anyOf(values)};
+    return anyOf(texts);
 }
 
 QVariant World::value()
 {
-    switch (random(7)) {
-    case 0:
-        return random(2) == 0;
-    case 1:
-        return random(8) - 2;
-    case 2:
-        return text();
-    case 3:
-        return QStringList{text(), text()};
-    case 4:
-        return QVariantList{random(3), text()};
-    case 5:
-        return QVariantMap{{anyOf(names), random(100)}};
-    default:
-        return {};
+    const QVariantList values = {random(2) == 0,
+                                 random(8) - 2,
+                                 text(),
+                                 QStringList{text(), text()},
+                                 QVariantList{random(3), text()},
+                                 QVariantMap{{anyOf(names), random(100)}},
+                                 QVariant()};
+    return anyOf(values);
+}
+
+void World::changeDefinition(const QString &directory, const QString &suffix, QByteArray content)
+{
+    if (random(20) == 0) {
+        changeDirectory(directory);
+    } else {
+        writeOrRemove(directory + QLatin1Char('/') + anyOf(names) + suffix,
+                      content.replace("%1", QByteArray::number(random(9))));
     }
 }
 
-void World::changeDefinition(const QString &directory, const QString &suffix,
-                             const QByteArray &content)
+void World::writeOrRemove(const QString &path, const QByteArray &content)
 {
-    const QString path = directory + QLatin1Char('/') + anyOf(names) + suffix;
-    if (random(20) == 0) {
-        changeDirectory(directory);
-    } else if (often()) {
-        Files::write(path, QByteArray(content).replace("%1", QByteArray::number(random(9))));
+    if (often()) {
+        Files::write(path, content);
     } else {
         Files::remove(path);
     }
@@ -164,27 +153,21 @@ void World::changeDefinition(const QString &directory, const QString &suffix,
 void World::changeWidgets()
 {
     if (random(8) != 0) {
-        changeDefinition(widgetsDirectory, QStringLiteral(".json"), anyOf(widgets));
-    } else if (QFile::exists(availableFile)) {
-        Files::remove(availableFile);
+        changeDefinition(Places::eventsWidgets, ".json"_s, anyOf(widgets));
     } else {
-        Files::write(availableFile, {});
+        writeOrRemove(availableFile, {});
     }
 }
 
 void World::changeDirectory(const QString &directory)
 {
     Files::remove(directory);
-    switch (random(3)) {
-    case 0:
+    const int choice = random(3); // otherwise it is made with its next file
+    if (choice == 0) {
         Files::makeDirectory(directory);
-        break;
-    case 1:
+    } else if (choice == 1) {
         Files::makeDirectory(elsewhere);
         Files::makeLink(elsewhere, directory);
-        break;
-    default:
-        break; // made with its next file
     }
 }
 
@@ -199,12 +182,7 @@ void World::changeCatalogs()
 
 void World::changeTexts()
 {
-    const QString path = anyOf(files);
-    if (often()) {
-        Files::write(path, QByteArray(random(2000), char('a' + random(26))) + "\nvariant=x\n");
-    } else {
-        Files::remove(path);
-    }
+    writeOrRemove(anyOf(files), QByteArray(random(2000), char('a' + random(26))) + "\nvariant=x\n");
 }
 
 void World::changeSettings()
@@ -216,8 +194,8 @@ void World::changeSettings()
 void World::killSettingsService()
 {
     const QDBusReply<uint> pid =
-        QDBusConnection::sessionBus().interface()->servicePid(QStringLiteral("ca.desrt.dconf"));
-    QFile name(QStringLiteral("/proc/%1/comm").arg(pid.value()));
+        QDBusConnection::sessionBus().interface()->servicePid("ca.desrt.dconf"_s);
+    QFile name("/proc/%1/comm"_s.arg(pid.value()));
     if (pid.isValid() && name.open(QIODevice::ReadOnly) && name.readAll() == "dconf-service\n") {
         kill(pid_t(pid.value()), SIGKILL);
     }
@@ -245,18 +223,14 @@ void World::changeDiskService()
 
 void World::changeHelper()
 {
-    switch (random(8)) {
-    case 0:
+    const int choice = random(8);
+    if (choice == 0) {
         m_helper->remove();
-        break;
-    case 1:
+    } else if (choice == 1) {
         m_helper->installNotExecutable();
-        break;
-    case 2:
-    case 3:
+    } else if (choice < 4) {
         m_helper->release();
-        break;
-    default:
+    } else {
         m_helper->install(anyOf(helperScenarios), QByteArray(random(40), 'x'));
     }
 }
@@ -267,21 +241,16 @@ void World::changeCover()
         m_cover = std::make_unique<CoverDaemon>();
     }
     const QVariant value = random(2) == 0 ? QVariant(text()) : QVariant(random(3));
-    switch (random(8)) {
-    case 0:
+    const int choice = random(8);
+    if (choice == 0) {
         m_cover.reset();
-        break;
-    case 1:
+    } else if (choice == 1) {
         m_cover->answerWithError(anyOf(coverProperties));
-        break;
-    case 2:
+    } else if (choice == 2) {
         m_cover->sendPropertiesChanged({text()});
-        break;
-    case 3:
-    case 4:
+    } else if (choice < 5) {
         m_cover->sendChanges({{anyOf(coverProperties), value}});
-        break;
-    default:
+    } else {
         m_cover->answer(anyOf(coverProperties), {value});
     }
 }
@@ -291,17 +260,11 @@ void World::changeService()
     if (m_service == nullptr) {
         m_service = std::make_unique<RecordingService>(QDBusConnection::SessionBus, session);
     }
-    switch (random(6)) {
-    case 0:
+    using Answer = RecordingService::Answer;
+    if (random(6) == 0) {
         m_service.reset();
-        break;
-    case 1:
-        m_service->setAnswer(RecordingService::Answer::Error, QStringLiteral("com.marlo.Error"));
-        break;
-    case 2:
-        m_service->setAnswer(RecordingService::Answer::Nothing);
-        break;
-    default:
-        m_service->setAnswer(RecordingService::Answer::Reply);
+    } else {
+        const auto answers = {Answer::Error, Answer::Nothing, Answer::Reply, Answer::Reply};
+        m_service->setAnswer(*(answers.begin() + random(4)), "com.marlo.Error"_s);
     }
 }

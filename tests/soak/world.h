@@ -41,9 +41,9 @@ private:
     int random(int bound) { return int(m_random->bounded(bound)); }
     bool often() { return random(4) != 0; }
 
+    void writeOrRemove(const QString &path, const QByteArray &content);
     // Writes or removes a file of the directory, or changes the directory itself.
-    void changeDefinition(const QString &directory, const QString &suffix,
-                          const QByteArray &content);
+    void changeDefinition(const QString &directory, const QString &suffix, QByteArray content);
     void changeWidgets();
     void changeDirectory(const QString &directory);
     void changeCatalogs();

@@ -5,6 +5,7 @@
 
 #include "mgconfitem.h"
 #include "patience.h"
+#include "texts.h"
 
 #include <QProcess>
 #include <QTest>
@@ -12,7 +13,7 @@
 QByteArray DconfTool::run(const QStringList &arguments, const QByteArray &input)
 {
     QProcess tool;
-    tool.start(QStringLiteral("dconf"), arguments);
+    tool.start("dconf"_s, arguments);
     tool.write(input);
     tool.closeWriteChannel();
     if (!tool.waitForFinished(patience) || tool.exitCode() != 0) {
@@ -23,29 +24,29 @@ QByteArray DconfTool::run(const QStringList &arguments, const QByteArray &input)
 
 QByteArray DconfTool::read(const QString &key)
 {
-    return run({QStringLiteral("read"), key});
+    return run({"read"_s, key});
 }
 
 void DconfTool::write(const QString &key, const QByteArray &value)
 {
-    run({QStringLiteral("write"), key, QString::fromUtf8(value)});
+    run({"write"_s, key, QString::fromUtf8(value)});
 }
 
 void DconfTool::write(const QString &key, const QStringList &value)
 {
-    const QString elements = value.join(QStringLiteral("', '"));
+    const QString elements = value.join("', '"_s);
     write(key, value.isEmpty() ? QByteArray("@as []") : "['" + elements.toUtf8() + "']");
 }
 
 void DconfTool::reset(const QString &path)
 {
-    run({QStringLiteral("reset"), QStringLiteral("-f"), path});
+    run({"reset"_s, "-f"_s, path});
 }
 
 void DconfTool::waitUntilStored()
 {
     static int count = 0;
-    const QString key = QStringLiteral("/test/stored");
+    const QString key = "/test/stored"_s;
     MGConfItem(key).set(++count);
     const auto stored = [&key] { return read(key).toInt() == count; };
     if (!QTest::qWaitFor(stored, patience)) {

@@ -2,6 +2,7 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 #include "files.h"
+#include "texts.h"
 
 #include <QDir>
 #include <QFile>
@@ -21,7 +22,7 @@ void require(bool done, const char *what, const QString &path)
 
 QString catalogPath(const QString &name)
 {
-    return QStringLiteral("/usr/share/translations/%1.qm").arg(name);
+    return "/usr/share/translations/%1.qm"_s.arg(name);
 }
 
 // A test that is started by hand, even as root, must not change the machine's real files.
@@ -79,7 +80,7 @@ void Files::makeLink(const QString &target, const QString &path)
 
 void Files::installCatalog(const QString &name)
 {
-    QFile compiled(QStringLiteral(CATALOG_DIR "/%1.qm").arg(name));
+    QFile compiled(CATALOG_DIR "/%1.qm"_s.arg(name));
     require(compiled.open(QIODevice::ReadOnly), "read", compiled.fileName());
     write(catalogPath(name), compiled.readAll());
 }

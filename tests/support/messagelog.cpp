@@ -2,6 +2,7 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 #include "messagelog.h"
+#include "texts.h"
 
 #include <QMutex>
 #include <QMutexLocker>
@@ -68,8 +69,8 @@ QString MessageLog::takeReport()
     QStringList lines;
     const auto taken = takeAll();
     for (const Message &message : taken) {
-        lines.append(QStringLiteral("%1 [%2] %3")
-                         .arg(QLatin1String(types[message.type]), message.category, message.text));
+        lines.append(
+            "%1 [%2] %3"_s.arg(QLatin1String(types[message.type]), message.category, message.text));
     }
     return lines.join(QLatin1Char('\n'));
 }

@@ -2,6 +2,7 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 #include "moduletypes.h"
+#include "texts.h"
 
 #include <QFile>
 #include <QRegularExpression>
@@ -11,15 +12,14 @@ namespace {
 
 std::vector<ModuleType> readTypes()
 {
-    QFile file(QStringLiteral(QMLTYPES_FILE));
+    QFile file(QLatin1String(QMLTYPES_FILE));
     if (!file.open(QIODevice::ReadOnly)) {
         qFatal("cannot open %s", qPrintable(file.fileName()));
     }
-    static const QRegularExpression className(QStringLiteral("^\\s*name: \"(\\w+)\""));
-    static const QRegularExpression exported(QStringLiteral("exports: \\[\"[\\w.]+/(\\w+) "));
+    static const QRegularExpression className("^\\s*name: \"(\\w+)\""_s);
+    static const QRegularExpression exported("exports: \\[\"[\\w.]+/(\\w+) "_s);
     std::vector<ModuleType> types;
-    const QStringList components =
-        QString::fromUtf8(file.readAll()).split(QStringLiteral("\n    Component {"));
+    const QStringList components = QString::fromUtf8(file.readAll()).split("\n    Component {"_s);
     for (const QString &component : components) {
         const QRegularExpressionMatch match = exported.match(component);
         if (match.hasMatch()) {

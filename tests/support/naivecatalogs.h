@@ -4,6 +4,8 @@
 #ifndef NAIVECATALOGS_H
 #define NAIVECATALOGS_H
 
+#include "texts.h"
+
 #include <QHash>
 #include <QLocale>
 #include <QStringList>
@@ -22,14 +24,14 @@ public:
     void add(const QString &user, const QString &catalog)
     {
         if (!catalog.isEmpty()) {
-            addOne(user, catalog + QStringLiteral("_eng_en"), QString());
-            addOne(user, catalog, QStringLiteral("-"));
+            addOne(user, catalog + "_eng_en"_s, QString());
+            addOne(user, catalog, "-"_s);
         }
     }
     void remove(const QString &user, const QString &catalog)
     {
         if (!catalog.isEmpty()) {
-            removeOne(user, catalog + QStringLiteral("_eng_en"));
+            removeOne(user, catalog + "_eng_en"_s);
             removeOne(user, catalog);
         }
     }
@@ -60,7 +62,7 @@ private:
                 return;
             }
         }
-        const QString directory = QStringLiteral("/usr/share/translations");
+        const QString directory = "/usr/share/translations"_s;
         Entry entry{catalog, {user}, std::make_shared<QTranslator>()};
         if (prefix.isEmpty()) {
             static_cast<void>(entry.translator->load(catalog, directory));

@@ -6,6 +6,7 @@
 
 #include "messagelog.h"
 #include "rowevents.h"
+#include "texts.h"
 
 #include <QAbstractListModel>
 #include <QList>
@@ -51,12 +52,12 @@ protected:
     void insert(int row, const Row &value)
     {
         rows.insert(row, value);
-        events.append(QStringLiteral("inserted %1").arg(row));
+        events.append("inserted %1"_s.arg(row));
     }
     void change(int row, const Row &value)
     {
         rows[row] = value;
-        events.append(QStringLiteral("changed %1").arg(row));
+        events.append("changed %1"_s.arg(row));
     }
     // Returns the removed rows.
     QList<Row> removeAllBut(const QStringList &paths)
@@ -68,7 +69,7 @@ protected:
                 ++row;
             } else {
                 removed.append(rows.takeAt(row));
-                events.append(QStringLiteral("removed %1").arg(row));
+                events.append("removed %1"_s.arg(row));
             }
         }
         return removed;

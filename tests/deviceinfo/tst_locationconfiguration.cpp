@@ -7,6 +7,7 @@
 #include "files/regularfile.h"
 #include "locationswitches.h"
 #include "loggedtest.h"
+#include "patience.h"
 #include "texts.h"
 
 #include <QTranslator>
@@ -35,9 +36,7 @@ private Q_SLOTS:
     void statesAreReadAfterTheSwitchesBefore();
     void restoresInOrder();
     void mayBeDeletedInAnyHandler();
-    void anotherObjectRestores();
-    void sharesWithAnotherProcess();
-    void restoresOverChangesThatAreNotDeliveredYet();
+    void storesWhatOtherProcessesRead();
 
     void agreement_data();
     void agreement();
@@ -108,15 +107,18 @@ void TestLocationConfiguration::startsWithTheStoredFlag_data()
 {
     QTest::addColumn<QVariant>("value");
     QTest::addColumn<bool>("enabled");
-    QTest::newRow("not set") << QVariant() << false;
-    QTest::newRow("true") << QVariant(true) << true;
-    QTest::newRow("false") << QVariant(false) << false;
-    QTest::newRow("1") << QVariant(1) << true;
-    QTest::newRow("0") << QVariant(0) << false;
-    QTest::newRow("\"true\"") << QVariant("true"_s) << true;
-    QTest::newRow("\"false\"") << QVariant("false"_s) << false;
-    QTest::newRow("list") << QVariant(QStringList{"a"_s, "b"_s}) << false;
-    QTest::newRow("map") << QVariant(savedMap(true, true, true, true)) << false;
+    const auto row = [](const char *name, const QVariant &value, bool enabled) {
+        QTest::newRow(name) << value << enabled;
+    };
+    row("not set", {}, false);
+    row("true", true, true);
+    row("false", false, false);
+    row("1", 1, true);
+    row("0", 0, false);
+    row("\"true\"", "true"_s, true);
+    row("\"false\"", "false"_s, false);
+    row("list", QStringList{"a"_s, "b"_s}, false);
+    row("map", savedMap(true, true, true, true), false);
 }
 
 void TestLocationConfiguration::startsWithTheStoredFlag()
@@ -307,55 +309,17 @@ void TestLocationConfiguration::mayBeDeletedInAnyHandler()
     QCOMPARE(stored(flagKey), QVariant(true));
 }
 
-void TestLocationConfiguration::anotherObjectRestores()
-{
-    setSwitches({1, 0, 2, 1});
-    LocationConfiguration().saveCustomSettings();
-    setSwitches({0, 1, 1, 2});
-    LocationConfiguration configuration;
-    configuration.restoreCustomSettings();
-    QCOMPARE(switchesOf(configuration), Switches({1, 0, 2, 1}));
-
-    // If the settings were saved before the user agreed to a service, restoring them later disables
-    // it.
-    setSwitches({1, 0, 0, 1});
-    configuration.saveCustomSettings();
-    configuration.restoreCustomSettings();
-    QCOMPARE(configuration.mlsOnlineState(), State(0));
-    setSwitches({1, 0, 2, 1});
-    configuration.restoreCustomSettings();
-    QCOMPARE(configuration.mlsOnlineState(), State(1));
-}
-
-void TestLocationConfiguration::sharesWithAnotherProcess()
+void TestLocationConfiguration::storesWhatOtherProcessesRead()
 {
     setSwitches({1, 0, 2, 1});
     LocationConfiguration configuration;
     configuration.saveCustomSettings();
     configuration.setCustomSettingsEnabled(true);
     // The flag is stored last.
-    QTRY_COMPARE(DconfTool::read(flagKey), QByteArray("true"));
+    TRY_COMPARE(DconfTool::read(flagKey), QByteArray("true"));
     QCOMPARE(DconfTool::read(savedKey),
              QByteArray("{'gps/enabled': <true>, 'here/enabled': <false>, 'mls/enabled': <false>, "
                         "'mls/online_enabled': <true>}"));
-
-    DconfTool::write(savedKey, "{'mls/enabled': <true>, 'here/enabled': <true>}");
-    QTRY_COMPARE(stored(savedKey).toMap().size(), 2);
-    configuration.restoreCustomSettings();
-    QCOMPARE(switchesOf(configuration), Switches({0, 1, 1, 2}));
-}
-
-void TestLocationConfiguration::restoresOverChangesThatAreNotDeliveredYet()
-{
-    LocationConfiguration configuration;
-    configuration.saveCustomSettings();
-    DconfTool::waitUntilStored();
-    DconfTool::run({"load"_s, "/settings/location/"_s},
-                   "[/]\ngps_enabled=true\nmls_online_state=2\n");
-    configuration.restoreCustomSettings();
-    DconfTool::waitUntilStored();
-    QCOMPARE(DconfTool::read(gpsKey), QByteArray("false"));
-    QCOMPARE(DconfTool::read(mlsOnlineKey), QByteArray("1"));
 }
 
 void TestLocationConfiguration::agreement_data()
@@ -443,15 +407,18 @@ void TestLocationConfiguration::agreementContent_data()
 {
     QTest::addColumn<QByteArray>("content");
     QTest::addColumn<QString>("text");
-    QTest::newRow("lines") << QByteArray(" One\n\nTwo \n") << " One\n\nTwo \n"_s;
-    QTest::newRow("UTF-8") << QByteArray("Hyv\xC3\xA4ksyn \xE2\x9C\x93") << "Hyväksyn ✓"_s;
-    QTest::newRow("byte-order mark") << QByteArray("\xEF\xBB\xBFText") << "Text"_s;
-    QTest::newRow("no UTF-8") << QByteArray("a\xFF") << "a\uFFFD"_s;
-    QTest::newRow("NUL") << QByteArray("before\0after", 12) << "before"_s;
-    QTest::newRow("NUL first") << QByteArray("\0after", 6) << ""_s;
-    QTest::newRow("carriage returns") << QByteArray("One\r\nTwo\r\n") << "One\nTwo\n"_s;
-    QTest::newRow("empty") << QByteArray() << ""_s;
-    QTest::newRow("long") << QByteArray(300000, 'x') << QString(300000, QLatin1Char('x'));
+    const auto row = [](const char *name, const QByteArray &content, const QString &text) {
+        QTest::newRow(name) << content << text;
+    };
+    row("lines", " One\n\nTwo \n", " One\n\nTwo \n"_s);
+    row("UTF-8", "Hyväksyn ✓", "Hyväksyn ✓"_s);
+    row("byte-order mark", "\uFEFFText", "Text"_s);
+    row("no UTF-8", "a\xFF", "a\uFFFD"_s);
+    row("NUL", QByteArray("before\0after", 12), "before"_s);
+    row("NUL first", QByteArray("\0after", 6), ""_s);
+    row("carriage returns", "One\r\nTwo\r\n", "One\nTwo\n"_s);
+    row("empty", "", ""_s);
+    row("long", QByteArray(300000, 'x'), QString(300000, QLatin1Char('x')));
 }
 
 void TestLocationConfiguration::agreementContent()

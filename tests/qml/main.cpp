@@ -1,6 +1,7 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
+#include "texts.h"
 #include "throwawayroot.h"
 
 #include <QQmlContext>
@@ -15,7 +16,7 @@ class Setup : public QObject
 public Q_SLOTS:
     void qmlEngineAvailable(QQmlEngine *engine)
     {
-        engine->rootContext()->setContextProperty(QStringLiteral("root"),
+        engine->rootContext()->setContextProperty("root"_s,
                                                   new ThrowAwayRoot(engine));
     }
 };

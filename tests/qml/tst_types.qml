@@ -291,11 +291,6 @@ TestCase {
         page.mlsOnlineState = LocationConfiguration.OnlineAGpsDisabled;
         page.hereState = LocationConfiguration.OnlineAGpsEnabled;
         compare(page.heard, ["mls online 1", "here 2"]);
-        page.mlsOnlineState = 3;
-        page.hereState = -1;
-        compare([page.mlsOnlineState, page.hereState], [1, 2]);
-        compare(root.takeMessages(), ["LocationSettings: 3 is not a state of an online service",
-                                      "LocationSettings: -1 is not a state of an online service"]);
     }
 
     function test_bindingsOfConstantsAreNotUpdated_data() {

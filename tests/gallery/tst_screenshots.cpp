@@ -3,6 +3,8 @@
 
 // Takes the screenshots of the gallery as ./dev run does, and checks them.
 
+#include "texts.h"
+
 #include <QDir>
 #include <QFile>
 #include <QImage>
@@ -29,9 +31,8 @@ Result takeScreenshots(const QString &source, const QString &directory)
 {
     QProcess process;
     process.setProcessChannelMode(QProcess::MergedChannels);
-    process.start(QStringLiteral(QML_PROGRAM),
-                  {source + QStringLiteral("/tests/gallery/Screenshots.qml"), QStringLiteral("--"),
-                   directory});
+    process.start(QLatin1String(QML_PROGRAM),
+                  {source + "/tests/gallery/Screenshots.qml"_s, "--"_s, directory});
     Result result;
     if (process.waitForFinished(patience) && process.exitStatus() == QProcess::NormalExit) {
         result.exitCode = process.exitCode();
@@ -86,10 +87,9 @@ void ScreenshotsTest::everyPageIsShown()
     // The problem is in the last line.
     QVERIFY2(result.exitCode == 0, qPrintable(result.output.right(800)));
 
-    static const QRegularExpression line(
-        QStringLiteral("^(?:qml: )?([\\w-]+) \\([\\w-]+\\): (.*\\.png)$"),
-        QRegularExpression::MultilineOption);
-    static const QRegularExpression size(QStringLiteral("-(\\d+)x(\\d+)-"));
+    static const QRegularExpression line("^(?:qml: )?([\\w-]+): (.*\\.png)$"_s,
+                                         QRegularExpression::MultilineOption);
+    static const QRegularExpression size("-(\\d+)x(\\d+)-"_s);
     QSet<QString> pages;
     QRegularExpressionMatchIterator lines = line.globalMatch(result.output);
     while (lines.hasNext()) {
@@ -106,11 +106,7 @@ void ScreenshotsTest::everyPageIsShown()
         }
     }
     // The start page and every file in pages/.
-    QCOMPARE(pages.size(),
-             1
-                 + QDir(source + QStringLiteral("/gallery/pages"))
-                       .entryList({QStringLiteral("*.qml")})
-                       .size());
+    QCOMPARE(pages.size(), 1 + QDir(source + "/gallery/pages"_s).entryList({"*.qml"_s}).size());
 }
 
 void ScreenshotsTest::problemsAreReported_data()
@@ -140,11 +136,11 @@ void ScreenshotsTest::problemsAreReported()
     QFETCH(const QString, report);
 
     const QTemporaryDir directory;
-    const QString copy = directory.filePath(QStringLiteral("copy"));
+    const QString copy = directory.filePath("copy"_s);
     for (const char *directory : {"/gallery", "/tests/gallery"}) {
         copyDirectory(source + QLatin1String(directory), copy + QLatin1String(directory));
     }
-    QFile page(copy + QStringLiteral("/gallery/pages/QuickActionsPage.qml"));
+    QFile page(copy + "/gallery/pages/QuickActionsPage.qml"_s);
     QVERIFY(page.open(QIODevice::ReadWrite));
     QByteArray content = page.readAll();
     QVERIFY(content.contains(old));
@@ -157,15 +153,15 @@ void ScreenshotsTest::problemsAreReported()
     const Result result = takeScreenshots(copy, directory.path());
     QVERIFY2(result.exitCode > 0, qPrintable(result.output));
     QVERIFY2(result.output.contains(report), qPrintable(result.output));
-    QVERIFY2(result.output.contains(QStringLiteral("screenshots: quick-actions (en): ")),
+    QVERIFY2(result.output.contains("screenshots: quick-actions (en): "_s),
              qPrintable(result.output));
 }
 
 void ScreenshotsTest::unwritableDirectoryIsReported()
 {
-    const Result result = takeScreenshots(source, QStringLiteral("/nonexistent"));
+    const Result result = takeScreenshots(source, "/nonexistent"_s);
     QCOMPARE(result.exitCode, 1);
-    QVERIFY2(result.output.contains(QStringLiteral("cannot save /nonexistent/start-")),
+    QVERIFY2(result.output.contains("cannot save /nonexistent/start-"_s),
              qPrintable(result.output));
 }
 

@@ -1,24 +1,35 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
-#include "soak.h"
+// usage: soak [--seed NUMBER] SECONDS
 
 #include "members.h"
 #include "moduletypes.h"
-#include "process.h"
 #include "texts.h"
+#include "world.h"
 
 #include <QAbstractItemModel>
+#include <QCommandLineParser>
 #include <QCoreApplication>
+#include <QDir>
+#include <QElapsedTimer>
 #include <QEvent>
+#include <QFile>
 #include <QLocale>
+#include <QPointer>
 #include <QQmlComponent>
+#include <QQmlEngine>
+#include <QRandomGenerator>
 #include <QThreadPool>
 #include <QUrl>
 
 #include <algorithm>
 #include <cstdio>
 #include <memory>
+#include <vector>
+
+#include <malloc.h>
+#include <unistd.h>
 
 namespace {
 
@@ -41,6 +52,27 @@ constexpr qint64 memoryTolerance = 2048; // KiB
 // For files that Qt and GLib open on first use and keep open.
 constexpr int fileTolerance = 2;
 
+// In KiB, after the process has returned its free memory to the system.
+qint64 residentMemory()
+{
+    malloc_trim(0);
+    QFile file("/proc/self/statm"_s);
+    if (!file.open(QIODevice::ReadOnly)) {
+        qFatal("cannot read %s", qPrintable(file.fileName()));
+    }
+    constexpr int residentField = 1;
+    return file.readAll().split(' ').value(residentField).toLongLong() * sysconf(_SC_PAGESIZE)
+        / 1024;
+}
+
+int openFiles()
+{
+    const QDir directory("/proc/self/fd"_s);
+    // Without the descriptor that reads the directory.
+    return int(directory.entryList(QDir::AllEntries | QDir::System | QDir::NoDotAndDotDot).size())
+        - 1;
+}
+
 void processEvents(int time)
 {
     QElapsedTimer timer;
@@ -51,7 +83,49 @@ void processEvents(int time)
     } while (timer.elapsed() < time);
 }
 
-} // namespace
+/*
+    At random, makes objects of all the module's types, sets their properties and calls their
+    methods, while their environment changes. From time to time it deletes all objects. The process
+    must then use no more memory and files than before.
+*/
+class Soak
+{
+public:
+    explicit Soak(quint32 seed);
+
+    // Prints a line for each measurement. Returns whether nothing has grown.
+    bool run(int seconds);
+
+private:
+    struct Measurement {
+        qint64 memory; // KiB
+        int files;
+    };
+
+    int random(int bound) { return int(m_random.bounded(bound)); }
+    template<typename List> auto anyOf(const List &list)
+    {
+        return *(list.begin() + random(int(list.size())));
+    }
+    void step();
+    void makeObject();
+    void changeLanguage();
+    void useProperty(QObject *object);
+    void callMethod(QObject *object);
+    void readModel(QObject *object);
+    QVariant argumentFor(int type);
+    void settle();
+    Measurement measure();
+
+    QRandomGenerator m_random;
+    World m_world;
+    QQmlEngine m_engine;
+    QStringList m_creatable;
+    QStringList m_singletons;
+    std::vector<QPointer<QObject>> m_objects;
+    QElapsedTimer m_time;
+    qint64 m_steps = 0;
+};
 
 Soak::Soak(quint32 seed) : m_random(seed), m_world(&m_random)
 {
@@ -60,8 +134,6 @@ Soak::Soak(quint32 seed) : m_random(seed), m_world(&m_random)
         (type.isSingleton ? m_singletons : m_creatable).append(type.name);
     }
 }
-
-Soak::~Soak() = default;
 
 bool Soak::run(int seconds)
 {
@@ -222,17 +294,57 @@ void Soak::settle()
     timer.start();
     int files = 0;
     do {
-        files = Process::openFiles();
+        files = openFiles();
         processEvents(quietTime);
-    } while (Process::openFiles() != files && timer.elapsed() < settleTime);
+    } while (openFiles() != files && timer.elapsed() < settleTime);
 }
 
 Soak::Measurement Soak::measure()
 {
     settle();
-    const Measurement now = {Process::residentMemory(), Process::openFiles()};
+    const Measurement now = {residentMemory(), openFiles()};
     std::printf("%7lld  %10lld  %10lld  %10d\n", m_time.elapsed() / 1000, m_steps, now.memory,
                 now.files);
     std::fflush(stdout);
     return now;
+}
+
+// Much of what happens here makes the module log warnings.
+void keepQuiet(QtMsgType type, const QMessageLogContext &context, const QString &text)
+{
+    Q_UNUSED(context)
+    if (type == QtFatalMsg) {
+        std::fprintf(stderr, "%s\n", qPrintable(text));
+    }
+}
+
+} // namespace
+
+int main(int argc, char *argv[])
+{
+    if (!qEnvironmentVariableIsSet("MARLO_THROW_AWAY_ROOT")) {
+        qFatal("this program runs only in the throw-away root of simulator");
+    }
+    const QCoreApplication application(argc, argv);
+    QCommandLineParser parser;
+    const QCommandLineOption seedOption("seed"_s, "of all chance"_s, "number"_s);
+    parser.addOption(seedOption);
+    parser.addPositionalArgument("seconds"_s, "how long to run"_s);
+    parser.process(application);
+
+    bool isNumber = false;
+    const int seconds = parser.positionalArguments().value(0).toInt(&isNumber);
+    const quint32 seed = parser.isSet(seedOption) ? parser.value(seedOption).toUInt()
+                                                  : QRandomGenerator::global()->generate();
+    if (!isNumber || seconds <= 0) {
+        parser.showHelp(2);
+    }
+    std::printf("seed: %u\n", seed);
+    std::fflush(stdout);
+    qInstallMessageHandler(keepQuiet);
+    if (!Soak(seed).run(seconds)) {
+        std::fprintf(stderr, "more is held at the end than at the start\n");
+        return 1;
+    }
+    return 0;
 }

@@ -86,6 +86,9 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t *data, std::size_t size
     const GVariantPtr stored(g_variant_ref_sink(
         g_variant_new_from_data(G_VARIANT_TYPE(type.constData()), content.constData(),
                                 gsize(content.size()), FALSE, nullptr, nullptr)));
-    store(toQVariant(stored.get()));
+    const QVariant value = toQVariant(stored.get());
+    Fuzzing::require(!value.isValid() || g_variant_is_normal_form(stored.get()),
+                     "damaged data is invalid");
+    store(value);
     return 0;
 }

@@ -92,34 +92,11 @@ int follow(QCoreApplication &app)
     return app.exec();
 }
 
-// Prints "ready" when its connection can be cut, "cut" after that.
-int outliveTheBus(QCoreApplication &app)
-{
-    const MGConfItem item(followedKey);
-    GDBusConnection *const bus = g_bus_get_sync(G_BUS_TYPE_SESSION, nullptr, nullptr);
-    bool ready = false;
-    QTimer poll;
-    QObject::connect(&poll, &QTimer::timeout, &app, [&] {
-        if (!ready && g_dbus_connection_get_exit_on_close(bus) == FALSE) {
-            ready = true;
-            say("ready");
-        }
-        if (g_dbus_connection_is_closed(bus) != FALSE) {
-            say("cut");
-            QTimer::singleShot(300, &app, &QCoreApplication::quit);
-            poll.stop();
-        }
-    });
-    poll.start(10);
-    const int status = app.exec();
-    g_object_unref(bus);
-    return status;
-}
-
 const QHash<QString, int (*)(QCoreApplication &)> all = {
-    {"setAndExit"_s, setAndExit},           {"setLocked"_s, setLocked},
-    {"setAndSeeItFail"_s, setAndSeeItFail}, {"follow"_s, follow},
-    {"outliveTheBus"_s, outliveTheBus},
+    {"setAndExit"_s, setAndExit},
+    {"setLocked"_s, setLocked},
+    {"setAndSeeItFail"_s, setAndSeeItFail},
+    {"follow"_s, follow},
 };
 
 } // namespace scenarios
@@ -295,8 +272,6 @@ template<typename Function> Function *original(const char *name)
 
 } // namespace
 
-Q_DECLARE_METATYPE(Call)
-
 extern "C" Q_DECL_EXPORT void g_mutex_lock(GMutex *mutex)
 {
     static auto *const lock = original<decltype(g_mutex_lock)>("g_mutex_lock");
@@ -338,18 +313,14 @@ private Q_SLOTS:
     void setIsSeenByEveryItemBeforeItReturns();
     void equalValueEmitsNothing();
     void anotherTypeIsAnotherValue();
-    void unsetForgetsTheValue_data();
     void unsetForgetsTheValue();
-    void temporaryItemStores();
     void deletedItemHearsNothing();
     void deletedItemIsNoLongerWatched();
 
     void followsOtherProcesses();
-    void followsSeveralChangesAtOnce();
-    void followsTheResetOfADirectory();
+    void followsChangesOfADirectory();
     void missesNothingWhileTheBusIsSlow();
 
-    void everySetIsSeenWhileWritesComplete_data();
     void everySetIsSeenWhileWritesComplete();
 
     void slotMaySet();
@@ -357,10 +328,8 @@ private Q_SLOTS:
     void slotMayDeleteAnotherItem();
     void slotMayMakeAnItem();
 
-    void storesWhatOthersRead_data();
-    void storesWhatOthersRead();
-    void readsWhatOthersStore_data();
-    void readsWhatOthersStore();
+    void sharesValuesWithOthers_data();
+    void sharesValuesWithOthers();
 
     void refusesOtherValues_data();
     void refusesOtherValues();
@@ -369,12 +338,10 @@ private Q_SLOTS:
     void lockedKeyStays();
     void failedStoreReverts();
 
-    void exitLosesNothing_data();
     void exitLosesNothing();
     void exitDoesNotHangOnAStoppedService();
     void withoutABusWarnsOnce();
     void withoutGlibWarnsOnce();
-    void outlivesTheBus();
 };
 
 void TestMGConfItem::startsUnset()
@@ -449,39 +416,21 @@ void TestMGConfItem::anotherTypeIsAnotherValue()
     QCOMPARE(describe(item.value()), describe(QStringList()));
 }
 
-void TestMGConfItem::unsetForgetsTheValue_data()
-{
-    QTest::addColumn<bool>("byInvalidValue");
-    QTest::newRow("unset()") << false;
-    QTest::newRow("set() with an invalid value") << true;
-}
-
 void TestMGConfItem::unsetForgetsTheValue()
 {
-    QFETCH(const bool, byInvalidValue);
-
-    const QString key = newKey();
-    Item item(key);
-    store(&item, 1);
-    item.forgetChanges();
-    const Item fresh(key); // has seen no change yet
-    for (int i = 0; i < 2; ++i) {
-        byInvalidValue ? item.set(QVariant()) : item.unset();
-        QCOMPARE(item.changes(), 1);
-        QCOMPARE(fresh.changes(), 1);
-        QVERIFY(!item.value().isValid());
-    }
-    QTRY_COMPARE(DconfTool::read(key), QByteArray());
-}
-
-void TestMGConfItem::temporaryItemStores()
-{
-    for (int i = 0; i < 20; ++i) {
-        MGConfItem("/test/many/key%1"_s.arg(i)).set(i);
-    }
-    for (int i = 0; i < 20; ++i) {
-        const QString key = "/test/many/key%1"_s.arg(i);
-        QTRY_COMPARE(DconfTool::read(key), QByteArray::number(i));
+    for (const bool byInvalidValue : {false, true}) {
+        const QString key = newKey();
+        Item item(key);
+        store(&item, 1);
+        item.forgetChanges();
+        const Item fresh(key); // has seen no change yet
+        for (int i = 0; i < 2; ++i) {
+            byInvalidValue ? item.set(QVariant()) : item.unset();
+            QCOMPARE(item.changes(), 1);
+            QCOMPARE(fresh.changes(), 1);
+            QVERIFY(!item.value().isValid());
+        }
+        TRY_COMPARE(DconfTool::read(key), QByteArray());
     }
 }
 
@@ -496,7 +445,7 @@ void TestMGConfItem::deletedItemHearsNothing()
     MGConfItem(key).set(1);
     DconfTool::waitUntilStored();
     DconfTool::write(key, "2");
-    QTRY_COMPARE(another.changes(), 2); // the other item still follows the key
+    TRY_COMPARE(another.changes(), 2); // the other item still follows the key
     QCOMPARE(heard, 0);
 }
 
@@ -522,19 +471,19 @@ void TestMGConfItem::deletedItemIsNoLongerWatched()
 
     auto item = std::make_unique<MGConfItem>(key);
     auto another = std::make_unique<MGConfItem>(key);
-    QTRY_COMPARE(watches.load(), 1);
+    TRY_COMPARE(watches.load(), 1);
     item.reset();
     QTest::qWait(100);
     QCOMPARE(watches.load(), 1);
     another.reset();
-    QTRY_COMPARE(watches.load(), 0);
+    TRY_COMPARE(watches.load(), 0);
     QCOMPARE(messages.load(), 2);
 
     // Short-lived items share one watch. Otherwise a message for each would wait to be sent.
     for (int i = 0; i < 1000; ++i) {
         const MGConfItem brief(key);
     }
-    QTRY_COMPARE(messages.load(), 4);
+    TRY_COMPARE(messages.load(), 4);
     QTest::qWait(100);
     QCOMPARE(messages.load(), 4);
     QCOMPARE(watches.load(), 0);
@@ -550,53 +499,46 @@ void TestMGConfItem::followsOtherProcesses()
     const Item another(key);
 
     DconfTool::write(key, "'theirs'");
-    QTRY_COMPARE(item.changes(), 1);
-    QTRY_COMPARE(another.changes(), 1);
+    TRY_COMPARE(item.changes(), 1);
+    TRY_COMPARE(another.changes(), 1);
     QCOMPARE(describe(item.value()), describe("theirs"_s));
 
     DconfTool::reset(key);
-    QTRY_COMPARE(item.changes(), 2);
-    QTRY_COMPARE(another.changes(), 2);
+    TRY_COMPARE(item.changes(), 2);
+    TRY_COMPARE(another.changes(), 2);
     QVERIFY(!item.value().isValid());
 }
 
-void TestMGConfItem::followsSeveralChangesAtOnce()
+void TestMGConfItem::followsChangesOfADirectory()
 {
     const Item first("/test/directory/first"_s);
     const Item second("/test/directory/below/second"_s);
     Item same("/test/directory/same"_s);
     const Item untouched("/test/directory/untouched"_s);
-    const Item neighbour("/test/directory2"_s);
+    Item neighbour("/test/directory2"_s);
+    neighbour.set(2);
     store(&same, 3);
     same.forgetChanges();
+    neighbour.forgetChanges();
 
     DconfTool::run({"load"_s, "/test/directory/"_s}, "[/]\nfirst=1\nsame=3\n[below]\nsecond=2\n");
-    QTRY_COMPARE(first.changes(), 1);
-    QTRY_COMPARE(second.changes(), 1);
+    TRY_COMPARE(first.changes(), 1);
+    TRY_COMPARE(second.changes(), 1);
     QCOMPARE(describe(first.value()), describe(1));
     QCOMPARE(describe(second.value()), describe(2));
-
     QTest::qWait(100);
     QCOMPARE(first.changes(), 1);
     QCOMPARE(second.changes(), 1);
-    QCOMPARE(same.changes() + untouched.changes() + neighbour.changes(), 0);
-}
-
-void TestMGConfItem::followsTheResetOfADirectory()
-{
-    Item inside("/test/directory/inside"_s);
-    const Item empty("/test/directory/empty"_s);
-    Item neighbour("/test/directory2"_s);
-    inside.set(1);
-    store(&neighbour, 2);
+    QCOMPARE(same.changes(), 0);
 
     DconfTool::reset("/test/directory/"_s);
-    QTRY_COMPARE(inside.changes(), 2);
-    QVERIFY(!inside.value().isValid());
+    for (const Item *item : {&first, &second}) {
+        TRY_COMPARE(item->changes(), 2);
+        QVERIFY(!item->value().isValid());
+    }
     QTest::qWait(100);
-    QCOMPARE(inside.changes(), 2);
-    QCOMPARE(empty.changes(), 0);
-    QCOMPARE(neighbour.changes(), 1);
+    QCOMPARE(first.changes(), 2);
+    QCOMPARE(untouched.changes() + neighbour.changes(), 0);
 }
 
 void TestMGConfItem::missesNothingWhileTheBusIsSlow()
@@ -614,30 +556,22 @@ void TestMGConfItem::missesNothingWhileTheBusIsSlow()
     QVERIFY(child.says("changed"));
 }
 
-void TestMGConfItem::everySetIsSeenWhileWritesComplete_data()
-{
-    QTest::addColumn<Call>("waits");
-
-    QTest::newRow("during a read") << Call::Read;
-    QTest::newRow("during a write") << Call::Write;
-}
-
 void TestMGConfItem::everySetIsSeenWhileWritesComplete()
 {
-    QFETCH(const Call, waits);
-
-    const QScopedValueRollback<Call> wait(callThatWaits, waits);
-    Item item(newKey());
-    int lost = 0;
-    for (int i = 1; i <= 1000; ++i) {
-        const bool value = i % 2 != 0;
-        item.forgetChanges();
-        item.set(value);
-        if (item.changes() != 1 || item.value() != value) {
-            ++lost;
+    for (const Call waits : {Call::Read, Call::Write}) {
+        const QScopedValueRollback<Call> wait(callThatWaits, waits);
+        Item item(newKey());
+        int lost = 0;
+        for (int i = 1; i <= 1000; ++i) {
+            const bool value = i % 2 != 0;
+            item.forgetChanges();
+            item.set(value);
+            if (item.changes() != 1 || item.value() != value) {
+                ++lost;
+            }
         }
+        QCOMPARE(lost, 0);
     }
-    QCOMPARE(lost, 0);
 }
 
 void TestMGConfItem::slotMaySet()
@@ -657,7 +591,7 @@ void TestMGConfItem::slotMaySet()
     second.set(1);
     QCOMPARE(seenByFirst, (QVariantList{1, 2, 3}));
     QCOMPARE(seenBySecond, (QVariantList{3}));
-    QTRY_COMPARE(DconfTool::read(key), QByteArray("3"));
+    TRY_COMPARE(DconfTool::read(key), QByteArray("3"));
 }
 
 void TestMGConfItem::slotMayDeleteItsItem()
@@ -671,7 +605,7 @@ void TestMGConfItem::slotMayDeleteItsItem()
             QVERIFY(!item);
         } else {
             DconfTool::write(key, "2");
-            QTRY_VERIFY(!item);
+            TRY(!item);
         }
     }
 }
@@ -714,48 +648,42 @@ void TestMGConfItem::slotMayMakeAnItem()
     QCOMPARE(made->changes(), 1);
 }
 
-void TestMGConfItem::storesWhatOthersRead_data()
+void TestMGConfItem::sharesValuesWithOthers_data()
 {
     QTest::addColumn<QVariant>("value");
-    QTest::addColumn<QByteArray>("printed");
+    QTest::addColumn<bool>("isStored");
 
-    const QString text = "tëxt"_s;
-    QTest::newRow("uint") << QVariant(5U) << QByteArray("uint32 5");
-    QTest::newRow("empty string list") << QVariant(QStringList()) << QByteArray("@as []");
-    QTest::newRow("map") << QVariant(QVariantMap{{text, QStringList{text}}})
-                         << QByteArray("{'tëxt': <['tëxt']>}");
+    const auto row = [](const char *printed, const QVariant &value, bool isStored = true) {
+        QTest::newRow(printed) << value << isStored;
+    };
+    row("true", true);
+    row("uint32 5", 5U);
+    row("@as []", QStringList());
+    row("{'tëxt': <['tëxt']>}", QVariantMap{{"tëxt"_s, QStringList{"tëxt"_s}}});
+    // These are read, but never stored.
+    row("{'a': <[1, 2]>}", QVariantMap{{"a"_s, QVariantList{1, 2}}}, false);
+    row("handle 5", QVariantList(), false);
 }
 
-void TestMGConfItem::storesWhatOthersRead()
+void TestMGConfItem::sharesValuesWithOthers()
 {
     QFETCH(const QVariant, value);
-    QFETCH(const QByteArray, printed);
+    QFETCH(const bool, isStored);
 
+    const QByteArray printed = QTest::currentDataTag();
     const QString key = newKey();
-    MGConfItem item(key);
-    item.set(value);
-    QCOMPARE(describe(item.value()), describe(value)); // not stored yet
-    QTRY_COMPARE(DconfTool::read(key), printed);
-    QCOMPARE(describe(item.value()), describe(value)); // from the database
-}
-
-void TestMGConfItem::readsWhatOthersStore_data()
-{
-    QTest::addColumn<QVariant>("value");
-
-    QTest::newRow("true") << QVariant(true);
-    QTest::newRow("{'a': <[1, 2]>}") << QVariant(QVariantMap{{"a"_s, QVariantList{1, 2}}});
-    QTest::newRow("handle 5") << QVariant(QVariantList());
-}
-
-void TestMGConfItem::readsWhatOthersStore()
-{
-    QFETCH(const QVariant, value);
-
-    const QString key = newKey();
-    const Item item(key);
-    DconfTool::write(key, QTest::currentDataTag());
-    QTRY_COMPARE(item.changes(), 1);
+    Item item(key);
+    if (isStored) {
+        item.set(value);
+        QCOMPARE(describe(item.value()), describe(value)); // not stored yet
+        TRY_COMPARE(DconfTool::read(key), printed);
+        QCOMPARE(describe(item.value()), describe(value)); // from the database
+        item.unset();
+        DconfTool::waitUntilStored();
+        item.forgetChanges();
+    }
+    DconfTool::write(key, printed);
+    TRY_COMPARE(item.changes(), 1);
     QCOMPARE(describe(item.value()), describe(value));
     QCOMPARE(describe(item.value(7)), describe(value));
 }
@@ -871,26 +799,16 @@ void TestMGConfItem::failedStoreReverts()
         const QVariantList seenAtOnce = seen;
         stopped.reset();
         QCOMPARE(seenAtOnce, QVariantList{2});
-        QTRY_COMPARE(seen, (QVariantList{2, 1}));
+        TRY_COMPARE(seen, (QVariantList{2, 1}));
     }
     store(&item, 3);
     QCOMPARE(DconfTool::read(key), QByteArray("3"));
     QCOMPARE(seen, (QVariantList{2, 1, 3}));
 }
 
-void TestMGConfItem::exitLosesNothing_data()
-{
-    QTest::addColumn<int>("count");
-
-    QTest::newRow("one") << 1;
-    QTest::newRow("several") << 20;
-}
-
 void TestMGConfItem::exitLosesNothing()
 {
-    QFETCH(const int, count);
-
-    for (int round = 0; round < 5; ++round) {
+    for (const int count : {1, 20, 1, 20, 1, 20}) {
         DconfTool::reset("/test/child/"_s);
         Child child({"setAndExit"_s, QString::number(count)});
         QVERIFY(child.succeeds());
@@ -930,12 +848,12 @@ void TestMGConfItem::withoutGlibWarnsOnce()
     for (const bool hasGlib : {false, true}) {
         Child child({"follow"_s, "set"_s}, "QT_NO_GLIB"_s, hasGlib ? QString() : "1"_s);
         QVERIFY(child.says("ready"));
-        QTRY_COMPARE(DconfTool::read(scenarios::followedKey), QByteArray("'own'"));
+        TRY_COMPARE(DconfTool::read(scenarios::followedKey), QByteArray("'own'"));
         DconfTool::write(scenarios::followedKey, "'theirs'");
         QList<QByteArray> expected = {"changed", "ready"}; // it sees its own change
         if (hasGlib) {
             expected.append("changed");
-            QTRY_COMPARE(child.lines(), expected);
+            TRY_COMPARE(child.lines(), expected);
         } else {
             QTest::qWait(300);
         }
@@ -944,17 +862,6 @@ void TestMGConfItem::withoutGlibWarnsOnce()
         QCOMPARE(child.lines(), expected);
         QCOMPARE(child.warnings(), hasGlib ? QList<QByteArray>() : QList<QByteArray>{withoutGlib});
     }
-}
-
-void TestMGConfItem::outlivesTheBus()
-{
-    Bus bus;
-    Child child({"outliveTheBus"_s}, busVariable, bus.address());
-    QVERIFY(child.says("ready"));
-    bus.kill();
-    QVERIFY(bus.waitForFinished());
-    QVERIFY(child.says("cut"));
-    QVERIFY(child.succeeds());
 }
 
 int main(int argc, char *argv[])

@@ -9,7 +9,9 @@
 #include "eventswidgets/eventswidgetsfile.h"
 #include "files.h"
 #include "loggedtest.h"
+#include "patience.h"
 #include "quickactions/quickaction.h"
+#include "texts.h"
 
 #include <QDBusError>
 #include <QDBusMessage>
@@ -68,7 +70,7 @@ int below(int end, Random *random)
 QVector<QByteArray> corpus(const char *kind)
 {
     QVector<QByteArray> contents;
-    const QDir directory(QStringLiteral(CORPUS_DIR "/") + QLatin1String(kind));
+    const QDir directory(CORPUS_DIR "/"_s + QLatin1String(kind));
     const QStringList names = directory.entryList(QDir::Files);
     for (const QString &name : names) {
         QFile file(directory.filePath(name));
@@ -113,7 +115,7 @@ QByteArray mutilated(QByteArray content, const QByteArray &meaningful, Random *r
 
 std::vector<Finding> check(const QString &path)
 {
-    DefinitionsChecker checker(QStringLiteral("/"));
+    DefinitionsChecker checker("/"_s);
     checker.check(path);
     return checker.findings();
 }
@@ -152,8 +154,8 @@ void TestAgreement::init()
 {
     LoggedTest::init();
     // In memory, because there are many files.
-    m_directory = std::make_unique<QTemporaryDir>(qEnvironmentVariable("XDG_RUNTIME_DIR")
-                                                  + QStringLiteral("/XXXXXX"));
+    m_directory =
+        std::make_unique<QTemporaryDir>(qEnvironmentVariable("XDG_RUNTIME_DIR") + "/XXXXXX"_s);
 }
 
 void TestAgreement::cleanup()
@@ -165,8 +167,7 @@ void TestAgreement::cleanup()
 // Uses a new name each time, because QSettings caches what it has read.
 QString TestAgreement::write(const QByteArray &content, const char *suffix)
 {
-    const QString path =
-        m_directory->filePath(QStringLiteral("%1.%2").arg(++m_files).arg(QLatin1String(suffix)));
+    const QString path = m_directory->filePath("%1.%2"_s.arg(++m_files).arg(QLatin1String(suffix)));
     Files::write(path, content);
     return path;
 }
@@ -245,7 +246,7 @@ void TestAgreement::walkerReadsWhatQJsonDocumentReads()
     contents.append(
         R"( { "a\"]" : [ -1.5e3 ,true, null,{ } , [ ] ,"\\" ] ,"\u0061": {"b\\":"}" }, "a":[{"":0}] } )");
     // QJsonDocument reads these as unpaired surrogates, which compare unequal.
-    static const QRegularExpression escapedBytes(QStringLiteral("\\\\[\\x80-\\xff]"));
+    static const QRegularExpression escapedBytes("\\\\[\\x80-\\xff]"_s);
     Random random(5);
     int accepted = 0;
     for (int i = 0; i < 8000; ++i) {
@@ -264,10 +265,9 @@ void TestAgreement::walkerReadsWhatQJsonDocumentReads()
 
 void TestAgreement::namesThatCanBeSent()
 {
-    const QStringList keys = {QStringLiteral("remote-service"), QStringLiteral("remote-path"),
-                              QStringLiteral("remote-interface"), QStringLiteral("remote-method")};
-    const QStringList good = {QStringLiteral("org.example.lamp"), QStringLiteral("/lamp"),
-                              QStringLiteral("org.example.Lamp"), QStringLiteral("toggle")};
+    const QStringList keys = {"remote-service"_s, "remote-path"_s, "remote-interface"_s,
+                              "remote-method"_s};
+    const QStringList good = {"org.example.lamp"_s, "/lamp"_s, "org.example.Lamp"_s, "toggle"_s};
     const QByteArray characters = "aZ_-./:1 ";
     Random random(4);
     int sent = 0;
@@ -289,7 +289,7 @@ void TestAgreement::namesThatCanBeSent()
         const bool isSent = QuickAction(path, false)
                                 .trigger(&receiver, nullptr, SLOT(fail(QDBusError, QDBusMessage)));
         if (isSent) {
-            QTRY_VERIFY(receiver.error.isValid());
+            TRY(receiver.error.isValid());
         }
         // No service has this name, so a call that is sent fails with ServiceUnknown.
         const bool arrived = receiver.error.type() == QDBusError::ServiceUnknown;

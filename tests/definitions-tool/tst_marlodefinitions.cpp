@@ -8,6 +8,7 @@
 #include "mgconfitem.h"
 #include "patience.h"
 #include "simulator/recordingservice.h"
+#include "texts.h"
 
 #include <QDir>
 #include <QJsonArray>
@@ -64,9 +65,9 @@ private:
 
 namespace {
 
-const QString glimmera = QStringLiteral("/usr/share/glimmera");
-const QString quickActions = QStringLiteral("/usr/share/glimmera/quickactions/");
-const QString eventsWidgets = QStringLiteral("/usr/share/glimmera/eventswidgets/");
+const QString glimmera = "/usr/share/glimmera"_s;
+const QString quickActions = "/usr/share/glimmera/quickactions/"_s;
+const QString eventsWidgets = "/usr/share/glimmera/eventswidgets/"_s;
 
 // Makes a file of the given name.
 using Make = std::function<void(const QString &)>;
@@ -108,9 +109,9 @@ Result run(const QByteArray &line, const char *locale = "C.UTF-8")
 {
     QProcess process;
     QProcessEnvironment environment = QProcessEnvironment::systemEnvironment();
-    environment.insert(QStringLiteral("LC_ALL"), QLatin1String(locale));
+    environment.insert("LC_ALL"_s, QLatin1String(locale));
     process.setProcessEnvironment(environment);
-    process.start(QStringLiteral(PROGRAM),
+    process.start(QLatin1String(PROGRAM),
                   QString::fromUtf8(line).split(QLatin1Char(' '), Qt::SkipEmptyParts));
     if (!process.waitForFinished(patience) || process.exitStatus() != QProcess::NormalExit) {
         process.kill();
@@ -130,16 +131,16 @@ void TestMarloDefinitions::init()
     LoggedTest::init();
     m_directory = std::make_unique<QTemporaryDir>();
     QVERIFY(QDir::setCurrent(m_directory->path()));
-    Files::installCatalog(QStringLiteral("maps_eng_en"));
+    Files::installCatalog("maps_eng_en"_s);
 }
 
 void TestMarloDefinitions::cleanup()
 {
     LoggedTest::cleanup();
-    QVERIFY(QDir::setCurrent(QStringLiteral("/")));
+    QVERIFY(QDir::setCurrent("/"_s));
     m_directory.reset();
     Files::remove(glimmera);
-    Files::remove(QStringLiteral("/usr/share/translations"));
+    Files::remove("/usr/share/translations"_s);
 }
 
 void TestMarloDefinitions::exitStatus_data()
@@ -205,13 +206,12 @@ void TestMarloDefinitions::jsonFormat()
     const QJsonArray findings = QJsonDocument::fromJson(result.output).array();
     QCOMPARE(findings.size(), 4);
     QCOMPARE(findings.at(0).toObject(),
-             (QJsonObject{{QStringLiteral("file"), QStringLiteral("lamp.conf")},
-                          {QStringLiteral("line"), 1},
-                          {QStringLiteral("severity"), QStringLiteral("warning")},
-                          {QStringLiteral("rule"), QStringLiteral("unknown-key")},
-                          {QStringLiteral("text"), QStringLiteral("unknown key \"x\"")}}));
-    QCOMPARE(findings.at(2).toObject().value(QStringLiteral("rule")).toString(),
-             QStringLiteral("encoding"));
+             (QJsonObject{{"file"_s, "lamp.conf"_s},
+                          {"line"_s, 1},
+                          {"severity"_s, "warning"_s},
+                          {"rule"_s, "unknown-key"_s},
+                          {"text"_s, "unknown key \"x\""_s}}));
+    QCOMPARE(findings.at(2).toObject().value("rule"_s).toString(), "encoding"_s);
 
     write("lamp.conf", goodAction);
     const Result clean = run("check --format json lamp.conf");
@@ -227,9 +227,9 @@ void TestMarloDefinitions::directory()
     write("f/readme.txt", "x");
     write("f/w.json", "[]");
     write("f/deeper/c.conf", "c\n");
-    Files::makeDirectory(QStringLiteral("f/directory.conf"));
-    Files::makeDirectory(QStringLiteral("f/directory.json"));
-    Files::makeLink(QStringLiteral("nowhere.conf"), QStringLiteral("f/link.conf"));
+    Files::makeDirectory("f/directory.conf"_s);
+    Files::makeDirectory("f/directory.json"_s);
+    Files::makeLink("nowhere.conf"_s, "f/link.conf"_s);
     const Result expected{
         1,
         "f/A.CONF:1: error: this line is not a key and is ignored [no-key]\n"
@@ -250,7 +250,7 @@ void TestMarloDefinitions::installedDefinitions()
         run("check"),
         (Result{2, {}, "marlo-definitions: there are no directories of definitions in \"/\"\n"}));
     // One of the two directories is enough.
-    Files::write(eventsWidgets + QStringLiteral("lamp.json"), "{");
+    Files::write(eventsWidgets + "lamp.json"_s, "{");
     const Result result = run("check");
     QCOMPARE(result.status, 1);
     QVERIFY(result.output.startsWith(eventsWidgets.toUtf8() + "lamp.json:1: error:"));
@@ -259,8 +259,8 @@ void TestMarloDefinitions::installedDefinitions()
 void TestMarloDefinitions::root()
 {
     // These are on this machine, and not below the root: they must be ignored.
-    Files::installCatalog(QStringLiteral("atlas_eng_en"));
-    Files::write(quickActions + QStringLiteral("bad.conf"), "x\n");
+    Files::installCatalog("atlas_eng_en"_s);
+    Files::write(quickActions + "bad.conf"_s, "x\n");
     write("root/usr/share/glimmera/quickactions/lamp.conf",
           "translation-catalog=atlas\ntitle=Lamp\npriority=1\n" + call);
     QCOMPARE(run("check --strict --root root"),
@@ -271,26 +271,25 @@ void TestMarloDefinitions::root()
     // If files are named, only the catalogs of the root are used.
     write("lamp.conf", goodAction);
     QCOMPARE(run("check --strict --root root lamp.conf").status, 1);
-    Files::makeDirectory(QStringLiteral("root/usr/share/translations"));
-    QVERIFY(QFile::copy(QStringLiteral("/usr/share/translations/maps_eng_en.qm"),
-                        QStringLiteral("root/usr/share/translations/maps_eng_en.qm")));
+    Files::makeDirectory("root/usr/share/translations"_s);
+    QVERIFY(QFile::copy("/usr/share/translations/maps_eng_en.qm"_s,
+                        "root/usr/share/translations/maps_eng_en.qm"_s));
     QCOMPARE(run("check --strict --root root lamp.conf"), Result{0});
 }
 
 // When sources are checked, their catalogs are not compiled yet.
 void TestMarloDefinitions::catalogsOfSources()
 {
-    Files::removeCatalog(QStringLiteral("maps_eng_en"));
+    Files::removeCatalog("maps_eng_en"_s);
     write("lamp.conf", goodAction);
     // Nor have they the permissions of installed files.
-    QVERIFY(
-        QFile::setPermissions(QStringLiteral("lamp.conf"), QFile::ReadOwner | QFile::WriteOwner));
+    QVERIFY(QFile::setPermissions("lamp.conf"_s, QFile::ReadOwner | QFile::WriteOwner));
     QCOMPARE(run("check --strict lamp.conf").status, 1);
     const QByteArray line = "check --strict lamp.conf --no-catalogs";
     QCOMPARE(run(line), Result{0});
 
     // Installed catalogs, which may be older, are ignored, too.
-    Files::installCatalog(QStringLiteral("maps_eng_en"));
+    Files::installCatalog("maps_eng_en"_s);
     write("lamp.conf", goodAction + "[General]\ntitle=maps-new\n");
     QVERIFY(!run(line).output.contains("[text-id]"));
 
@@ -312,7 +311,7 @@ void TestMarloDefinitions::sameFileTwice()
 {
     write("f/a.json", goodWidget);
     write("f/a.conf", "[x\n");
-    Files::makeLink(QStringLiteral("f"), QStringLiteral("g"));
+    Files::makeLink("f"_s, "g"_s);
     const Result result = run("check f f/a.json g/a.conf ./f/../f/a.conf");
     QCOMPARE(result.status, 1);
     QCOMPARE(result.output.count('\n'), 1);
@@ -321,7 +320,7 @@ void TestMarloDefinitions::sameFileTwice()
 void TestMarloDefinitions::hostileNames()
 {
     // A name must neither forge a line of the report nor control a terminal.
-    Files::write(QStringLiteral("a\nb.conf:1: note\u001b[2J ä.json"), "{");
+    Files::write("a\nb.conf:1: note\u001b[2J ä.json"_s, "{");
     for (const char *locale : {"C.UTF-8", "C", "POSIX"}) {
         const Result result = run("check .", locale);
         QCOMPARE(result.status, 1);
@@ -351,13 +350,11 @@ void TestMarloDefinitions::hostileFiles_data()
     };
     row("pipe", Files::makePipe);
     row("link to a pipe", [](const QString &name) {
-        Files::makePipe(QStringLiteral("pipe"));
-        Files::makeLink(QStringLiteral("pipe"), name);
+        Files::makePipe("pipe"_s);
+        Files::makeLink("pipe"_s, name);
     });
-    row("endless device",
-        [](const QString &name) { Files::makeLink(QStringLiteral("/dev/zero"), name); });
-    row("directory",
-        [](const QString &name) { Files::makeDirectory(name + QStringLiteral("/x")); });
+    row("endless device", [](const QString &name) { Files::makeLink("/dev/zero"_s, name); });
+    row("directory", [](const QString &name) { Files::makeDirectory(name + "/x"_s); });
     row("huge", [](const QString &name) { Files::makeSparse(name, 1LL << 40); });
     constexpr int large = 2 * 1024 * 1024;
     row("one long line", content(QByteArray(large, 'x')));
@@ -379,8 +376,7 @@ void TestMarloDefinitions::hostileFiles()
     make(name);
     const Result result = run("check " + name.toUtf8());
     // A directory with the name of a widgets file is checked as a directory.
-    QCOMPARE(result.status,
-             QFileInfo(name).isDir() && name.endsWith(QStringLiteral("json")) ? 0 : 1);
+    QCOMPARE(result.status, QFileInfo(name).isDir() && name.endsWith("json"_s) ? 0 : 1);
     QCOMPARE(result.errors, QByteArray());
     QVERIFY(result.output.count('\n') <= 3 * 1001);
     QVERIFY(run("show " + name.toUtf8()).status >= 0);
@@ -420,8 +416,8 @@ void TestMarloDefinitions::outputThatCannotBeWritten()
 {
     write("a.conf", "x\n");
     QProcess process;
-    process.setStandardOutputFile(QStringLiteral("/dev/full"));
-    process.start(QStringLiteral(PROGRAM), {QStringLiteral("check"), QStringLiteral("a.conf")});
+    process.setStandardOutputFile("/dev/full"_s);
+    process.start(QLatin1String(PROGRAM), {"check"_s, "a.conf"_s});
     QVERIFY(process.waitForFinished(patience));
     QCOMPARE(process.exitStatus(), QProcess::NormalExit);
     QCOMPARE(process.exitCode(), 2);
@@ -429,19 +425,19 @@ void TestMarloDefinitions::outputThatCannotBeWritten()
 
 void TestMarloDefinitions::list()
 {
-    Files::write(quickActions + QStringLiteral("a.conf"), "title=A\npriority=20\n" + call);
-    Files::write(quickActions + QStringLiteral("b.conf"), "title=B\npriority=10\n" + call);
-    Files::write(quickActions + QStringLiteral("c.conf"),
+    Files::write(quickActions + "a.conf"_s, "title=A\npriority=20\n" + call);
+    Files::write(quickActions + "b.conf"_s, "title=B\npriority=10\n" + call);
+    Files::write(quickActions + "c.conf"_s,
                  "title=maps-title\ntranslation-catalog=maps\npriority=1\n" + call);
-    Files::write(quickActions + QStringLiteral("d.conf"), "title=D\n" + call);
-    Files::write(eventsWidgets + QStringLiteral("w.json"),
+    Files::write(quickActions + "d.conf"_s, "title=D\n" + call);
+    Files::write(eventsWidgets + "w.json"_s,
                  R"({ "widgets": [
         { "path": "/x.qml", "title": "X", "order": 2, "default_enabled": true },
         { "path": "/y.qml", "title": "Y", "order": 1, "available_path": "/nowhere" } ] })");
-    MGConfItem enabled(QStringLiteral("/desktop/glimmera-marlo-home/events_screen_actions"));
-    MGConfItem blocked(QStringLiteral("/desktop/glimmera-marlo-home/blocked_actions"));
-    enabled.set(QStringList(quickActions + QStringLiteral("c.conf")));
-    blocked.set(QStringList(quickActions + QStringLiteral("d.conf")));
+    MGConfItem enabled("/desktop/glimmera-marlo-home/events_screen_actions"_s);
+    MGConfItem blocked("/desktop/glimmera-marlo-home/blocked_actions"_s);
+    enabled.set(QStringList(quickActions + "c.conf"_s));
+    blocked.set(QStringList(quickActions + "d.conf"_s));
 
     const Result expected{0,
                           "quick actions: 3\n"
@@ -452,7 +448,7 @@ void TestMarloDefinitions::list()
                           "  disabled  unavailable  /y.qml  Y\n"
                           "  enabled   available    /x.qml  X\n"};
     // dconf stores values in the background.
-    QTRY_COMPARE(run("list"), expected);
+    TRY_COMPARE(run("list"), expected);
     enabled.unset();
     blocked.unset();
 }
@@ -465,15 +461,13 @@ void TestMarloDefinitions::listWithoutAnything()
 
 void TestMarloDefinitions::listCatalogs()
 {
-    Files::installCatalog(QStringLiteral("maps-de"));
-    Files::installCatalog(QStringLiteral("maps-fi"));
-    Files::write(quickActions + QStringLiteral("a.conf"), "translation-catalog=maps\n");
-    Files::write(eventsWidgets + QStringLiteral("w.json"),
-                 R"({ "translation_catalog": "nowhere" })");
+    Files::installCatalog("maps-de"_s);
+    Files::installCatalog("maps-fi"_s);
+    Files::write(quickActions + "a.conf"_s, "translation-catalog=maps\n");
+    Files::write(eventsWidgets + "w.json"_s, R"({ "translation_catalog": "nowhere" })");
     // The models load neither of these.
-    Files::write(QStringLiteral("/usr/share/translations/maps-sv.qm"), "damaged");
-    Files::write(quickActions + QStringLiteral("b.conf"),
-                 "translation-catalog=../translations/maps\n");
+    Files::write("/usr/share/translations/maps-sv.qm"_s, "damaged");
+    Files::write(quickActions + "b.conf"_s, "translation-catalog=../translations/maps\n");
     QCOMPARE(run("list --catalogs", "fi_FI.UTF-8"),
              (Result{0,
                      "maps\n"
@@ -517,32 +511,29 @@ void TestMarloDefinitions::showSendsTheSameCall_data()
         << QByteArray("[remote-arguments]\nsize=6\n1\\argument=a b\n2\\argument=\n"
                       "3\\argument=\"it's $HOME `x` \\\\ \\\"q\\\"\"\n4\\argument=x, y z\n"
                       "5\\argument=-1\n6\\argument=@ByteArray(\\xe9)\n")
-        << QVariantList{QStringLiteral("a b"),
-                        QString(),
-                        QStringLiteral("it's $HOME `x` \\ \"q\""),
-                        QStringList{QStringLiteral("x"), QStringLiteral("y z")},
-                        QStringLiteral("-1"),
-                        QByteArray("\xe9")};
+        << QVariantList{
+               "a b"_s, QString(),         "it's $HOME `x` \\ \"q\""_s, QStringList{"x"_s, "y z"_s},
+               "-1"_s,  QByteArray("\xe9")};
 }
 
 void TestMarloDefinitions::showSendsTheSameCall()
 {
     QFETCH(QByteArray, arguments);
     QFETCH(QVariantList, expected);
-    RecordingService lamp(QDBusConnection::SessionBus, QStringLiteral("org.example.lamp"));
+    RecordingService lamp(QDBusConnection::SessionBus, "org.example.lamp"_s);
     write("a.conf", goodAction + arguments);
     const QByteArray output = run("show a.conf").output.trimmed();
     const QString line = QString::fromUtf8(output.mid(output.lastIndexOf('\n') + 1));
 
     QProcess shell;
-    shell.start(QStringLiteral("/bin/sh"), {QStringLiteral("-c"), line});
+    shell.start("/bin/sh"_s, {"-c"_s, line});
     TRY_COMPARE(shell.state(), QProcess::NotRunning);
     QCOMPARE(shell.exitCode(), 0);
     QCOMPARE(lamp.calls().size(), 1);
     const QDBusMessage message = lamp.calls().constFirst();
-    QCOMPARE(message.path(), QStringLiteral("/lamp"));
-    QCOMPARE(message.interface(), QStringLiteral("org.example.Lamp"));
-    QCOMPARE(message.member(), QStringLiteral("toggle"));
+    QCOMPARE(message.path(), "/lamp"_s);
+    QCOMPARE(message.interface(), "org.example.Lamp"_s);
+    QCOMPARE(message.member(), "toggle"_s);
     QCOMPARE(message.arguments(), expected);
 }
 
@@ -570,8 +561,7 @@ void TestMarloDefinitions::showEventsWidgets()
 
 void TestMarloDefinitions::showInALanguage()
 {
-    Files::installCatalogs({QStringLiteral("maps-fi"), QStringLiteral("settings-system_eng_en"),
-                            QStringLiteral("settings-system-fi")});
+    Files::installCatalogs({"maps-fi"_s, "settings-system_eng_en"_s, "settings-system-fi"_s});
     write("w.json", goodWidgetWithTexts);
     const QByteArray widget = run("show --locale fi w.json").output;
     QVERIFY2(widget.contains("\ntitle: Kartat\n"), widget.constData());

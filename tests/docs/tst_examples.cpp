@@ -7,7 +7,10 @@
 #include "files.h"
 #include "loggedtest.h"
 #include "mgconfitem.h"
+#include "patience.h"
+#include "places.h"
 #include "simulator/recordingservice.h"
+#include "texts.h"
 #include "words.h"
 
 #include <QAbstractItemModel>
@@ -27,14 +30,13 @@
 
 namespace {
 
-const QString actionPath = QStringLiteral("/usr/share/glimmera/quickactions/torch.conf");
-const QString widgetsPath = QStringLiteral("/usr/share/glimmera/eventswidgets/weather.json");
-const QString programPath = QStringLiteral("/usr/bin/weather");
-const QString enabledKey = QStringLiteral("/desktop/glimmera-marlo-home/events_screen_actions");
+const QString actionPath = Places::quickActions + "/torch.conf"_s;
+const QByteArray moduleImport = "import com.marlo.settings.system 1.0\n";
+const QString programPath = "/usr/bin/weather"_s;
 
 QByteArray contentOf(const QString &path)
 {
-    QFile file(QStringLiteral(SOURCE_DIR "/") + path);
+    QFile file(SOURCE_DIR "/"_s + path);
     if (!file.open(QIODevice::ReadOnly)) {
         qFatal("cannot open %s", qPrintable(file.fileName()));
     }
@@ -43,7 +45,7 @@ QByteArray contentOf(const QString &path)
 
 QByteArray example(const QString &name)
 {
-    return contentOf(QStringLiteral("docs/examples/") + name);
+    return contentOf("docs/examples/"_s + name);
 }
 
 QVariant valueAt(const QAbstractItemModel &model, int row, const QByteArray &role)
@@ -54,12 +56,11 @@ QVariant valueAt(const QAbstractItemModel &model, int row, const QByteArray &rol
 // The examples that a file of the reference shows, as documents.
 QByteArrayList examplesOf(const QString &file)
 {
-    static const QRegularExpression block(QStringLiteral("(?s)\\\\qml\\n(.*?)\\\\endqml"));
+    static const QRegularExpression block("(?s)\\\\qml\\n(.*?)\\\\endqml"_s);
     QByteArrayList documents;
     auto blocks = block.globalMatch(QString::fromUtf8(contentOf(file)));
     while (blocks.hasNext()) {
-        documents.append("import QtQuick 2.15\nimport QtQuick.Controls 2.15\n"
-                         "import com.marlo.settings.system 1.0\n"
+        documents.append("import QtQuick 2.15\nimport QtQuick.Controls 2.15\n" + moduleImport
                          + blocks.next().captured(1).toUtf8());
     }
     return documents;
@@ -89,7 +90,6 @@ private Q_SLOTS:
     void runsThoseOfTheReference_data();
     void runsThoseOfTheReference();
     void areAllThatTheReadmeShows();
-    void standInTheManualPages_data();
     void standInTheManualPages();
 
 private:
@@ -102,21 +102,20 @@ private:
 
 void TestExamples::initTestCase()
 {
-    QLocale::setDefault(QLocale(QStringLiteral("en_GB")));
-    m_engine.addImportPath(QStringLiteral(QML_BUILD_DIR));
-    Files::write(actionPath, example(QStringLiteral("torch.conf")));
-    Files::write(widgetsPath, example(QStringLiteral("weather.json")));
-    Files::write(QStringLiteral("/var/lib/bluetooth/board-address"), "00:1A:7D:DA:71:13\n");
-    Files::write(
-        QStringLiteral("/usr/share/marlo-settings/platform-eula/tarnwick_termsofuse-en_GB.txt"),
-        "Terms\nBody\n");
-    MGConfItem(enabledKey).set(QStringList(actionPath));
+    QLocale::setDefault(QLocale("en_GB"_s));
+    m_engine.addImportPath(QLatin1String(QML_BUILD_DIR));
+    Files::write(actionPath, example("torch.conf"_s));
+    Files::write(Places::eventsWidgets + "/weather.json"_s, example("weather.json"_s));
+    Files::write("/var/lib/bluetooth/board-address"_s, "00:1A:7D:DA:71:13\n");
+    Files::write("/usr/share/marlo-settings/platform-eula/tarnwick_termsofuse-en_GB.txt"_s,
+                 "Terms\nBody\n");
+    MGConfItem(Places::enabledActions).set(QStringList(actionPath));
 }
 
 std::unique_ptr<QObject> TestExamples::create(const QByteArray &document)
 {
     QQmlComponent component(&m_engine);
-    component.setData(document, QUrl(QStringLiteral("file:///example.qml")));
+    component.setData(document, QUrl("file:///example.qml"_s));
     std::unique_ptr<QObject> object(component.create());
     if (object == nullptr) {
         qWarning("%s", qPrintable(component.errorString()));
@@ -126,37 +125,36 @@ std::unique_ptr<QObject> TestExamples::create(const QByteArray &document)
 
 void TestExamples::definesAQuickAction()
 {
-    RecordingService torch(QDBusConnection::SessionBus, QStringLiteral("com.marlo.torch"));
-    const auto object = create("import com.marlo.settings.system 1.0\nQuickActionsModel {}");
+    RecordingService torch(QDBusConnection::SessionBus, "com.marlo.torch"_s);
+    const auto object = create(moduleImport + "QuickActionsModel {}");
     auto *model = qobject_cast<QAbstractItemModel *>(object.get());
     QVERIFY(model != nullptr);
-    QTRY_COMPARE(model->rowCount(), 1);
+    TRY_COMPARE(model->rowCount(), 1);
     // Without its catalog the title is the identifier.
-    QCOMPARE(valueAt(*model, 0, "title"), QVariant(QStringLiteral("torch-quick-action")));
-    QCOMPARE(valueAt(*model, 0, "icon"),
-             QVariant(QStringLiteral("/usr/share/glimmera/icons/torch.svg")));
+    QCOMPARE(valueAt(*model, 0, "title"), QVariant("torch-quick-action"_s));
+    QCOMPARE(valueAt(*model, 0, "icon"), QVariant("/usr/share/glimmera/icons/torch.svg"_s));
 
     QVERIFY(QMetaObject::invokeMethod(model, "triggerAction", Q_ARG(int, 0)));
-    QTRY_COMPARE(torch.calls().size(), 1);
+    TRY_COMPARE(torch.calls().size(), 1);
     const QDBusMessage call = torch.calls().constFirst();
-    QCOMPARE(call.path(), QStringLiteral("/"));
-    QCOMPARE(call.interface(), QStringLiteral("com.marlo.torch"));
-    QCOMPARE(call.member(), QStringLiteral("toggle"));
-    QCOMPARE(call.arguments(), QVariantList{QStringLiteral("bright")});
+    QCOMPARE(call.path(), "/"_s);
+    QCOMPARE(call.interface(), "com.marlo.torch"_s);
+    QCOMPARE(call.member(), "toggle"_s);
+    QCOMPARE(call.arguments(), QVariantList{"bright"_s});
 }
 
 void TestExamples::definesAWidget()
 {
     Files::remove(programPath);
-    const auto object = create("import com.marlo.settings.system 1.0\nEventsWidgetsModel {}");
+    const auto object = create(moduleImport + "EventsWidgetsModel {}");
     auto *model = qobject_cast<QAbstractItemModel *>(object.get());
     QVERIFY(model != nullptr);
     QCOMPARE(model->rowCount(), 1);
     const auto text = [model](const char *role) { return valueAt(*model, 0, role).toString(); };
-    QCOMPARE(text("title"), QStringLiteral("Weather"));
+    QCOMPARE(text("title"), "Weather"_s);
     QCOMPARE(text("description"), QString());
-    QCOMPARE(text("icon"), QStringLiteral("image://theme/weather"));
-    QCOMPARE(text("path"), QStringLiteral("/usr/share/weather/EventsWidget.qml"));
+    QCOMPARE(text("icon"), "image://theme/weather"_s);
+    QCOMPARE(text("path"), "/usr/share/weather/EventsWidget.qml"_s);
     QCOMPARE(valueAt(*model, 0, "enabled"), QVariant(true));
     QCOMPARE(valueAt(*model, 0, "available"), QVariant(false));
 
@@ -176,15 +174,15 @@ void TestExamples::loadsTheWidget()
     loader->setParentItem(window.contentItem());
     window.show();
     loader->setWidth(1000);
-    QTRY_VERIFY(loader->height() > 0);
+    TRY(loader->height() > 0);
     const qreal height = loader->height();
     loader->setWidth(20);
-    QTRY_VERIFY(loader->height() > height);
+    TRY(loader->height() > height);
 }
 
 void TestExamples::listsTheActionOnAPage()
 {
-    const auto object = create(example(QStringLiteral("page.qml")));
+    const auto object = create(example("page.qml"_s));
     auto *page = qobject_cast<QQuickItem *>(object.get());
     QVERIFY(page != nullptr);
     QQuickWindow window;
@@ -192,18 +190,18 @@ void TestExamples::listsTheActionOnAPage()
     page->setParentItem(window.contentItem());
     window.show();
     QVERIFY(QTest::qWaitForWindowExposed(&window));
-    QTRY_COMPARE(page->property("count"), QVariant(1));
+    TRY_COMPARE(page->property("count"), QVariant(1));
 
     QQuickItem *row = nullptr;
-    QTRY_VERIFY((QMetaObject::invokeMethod(page, "itemAtIndex", Q_RETURN_ARG(QQuickItem *, row),
-                                           Q_ARG(int, 0)),
-                 row != nullptr));
-    QCOMPARE(row->property("text"), QVariant(QStringLiteral("torch-quick-action")));
+    TRY((QMetaObject::invokeMethod(page, "itemAtIndex", Q_RETURN_ARG(QQuickItem *, row),
+                                   Q_ARG(int, 0)),
+         row != nullptr));
+    QCOMPARE(row->property("text"), QVariant("torch-quick-action"_s));
 
-    RecordingService torch(QDBusConnection::SessionBus, QStringLiteral("com.marlo.torch"));
+    RecordingService torch(QDBusConnection::SessionBus, "com.marlo.torch"_s);
     QTest::mouseClick(&window, Qt::LeftButton, Qt::NoModifier,
                       row->mapToScene({row->width() / 2, row->height() / 2}).toPoint());
-    QTRY_COMPARE(torch.calls().size(), 1);
+    TRY_COMPARE(torch.calls().size(), 1);
 }
 
 std::unique_ptr<QObject> TestExamples::createExample(const QString &file, const QByteArray &text)
@@ -218,7 +216,7 @@ std::unique_ptr<QObject> TestExamples::createExample(const QString &file, const 
 
 void TestExamples::ordersActions()
 {
-    const QString pattern = QStringLiteral("/usr/share/glimmera/quickactions/order-%1.conf");
+    const QString pattern = Places::quickActions + "/order-%1.conf"_s;
     const auto paths = [&pattern](const char *names) {
         QStringList paths;
         for (const QString &name : words(names)) {
@@ -226,15 +224,14 @@ void TestExamples::ordersActions()
         }
         return paths;
     };
-    MGConfItem list(enabledKey);
+    MGConfItem list(Places::enabledActions);
     const QVariant before = list.value();
     Files::write(pattern.arg(QLatin1Char('a')), "title=a\n");
     Files::write(pattern.arg(QLatin1Char('b')), "title=b\n");
     // The module has a dconf client of its own, which sees what is stored.
     list.set(paths("a missing b"));
     DconfTool::waitUntilStored();
-    const auto page =
-        createExample(QStringLiteral("quickactions/quickactionsmodel.cpp"), "showStoredOrder");
+    const auto page = createExample("quickactions/quickactionsmodel.cpp"_s, "showStoredOrder");
     QVERIFY(page != nullptr);
     const auto model = [&page] { return page->property("model").value<QAbstractItemModel *>(); };
     const auto titles = [&model] {
@@ -244,18 +241,18 @@ void TestExamples::ordersActions()
         QMetaObject::invokeMethod(page.get(), "moveAction", Q_ARG(QVariant, from),
                                   Q_ARG(QVariant, to));
     };
-    QCOMPARE(titles(), QStringLiteral("ab"));
+    QCOMPARE(titles(), "ab"_s);
     // The entry of the missing action moves, so the rows return to the order of the list.
     move(1, 0);
-    QTRY_COMPARE(list.value().toStringList(), paths("missing a b"));
-    QCOMPARE(titles(), QStringLiteral("ab"));
+    TRY_COMPARE(list.value().toStringList(), paths("missing a b"));
+    QCOMPARE(titles(), "ab"_s);
 
     list.set(paths("a b"));
     DconfTool::waitUntilStored();
     const QAbstractItemModel *shown = model();
     move(1, 0);
-    QTRY_COMPARE(list.value().toStringList(), paths("b a"));
-    QCOMPARE(titles(), QStringLiteral("ba"));
+    TRY_COMPARE(list.value().toStringList(), paths("b a"));
+    QCOMPARE(titles(), "ba"_s);
     QCOMPARE(model(), shown);
     list.set(before);
     DconfTool::waitUntilStored();
@@ -265,27 +262,26 @@ void TestExamples::ordersActions()
 
 void TestExamples::selectsByTwoRoles()
 {
-    const QString path = QStringLiteral("/usr/share/glimmera/eventswidgets/roles.json");
-    const QString needed = QStringLiteral("/usr/share/glimmera/needed");
-    const QString key = QStringLiteral("/desktop/glimmera-marlo-home/events_screen_widgets");
+    const QString path = Places::eventsWidgets + "/roles.json"_s;
+    const QString needed = "/usr/share/glimmera/needed"_s;
+    const QString key = Places::enabledWidgets;
     Files::write(path, R"({ "widgets": [
         { "path": "a", "title": "A", "order": 1 },
         { "path": "b", "title": "B", "order": 2, "available_path": "/usr/share/glimmera/needed" },
         { "path": "c", "title": "C", "order": 3 } ] })");
     MGConfItem(key).set(words("a b"));
-    const auto label =
-        createExample(QStringLiteral("eventswidgets/titlesview.cpp"), "Instantiator");
+    const auto label = createExample("eventswidgets/titlesview.cpp"_s, "Instantiator");
     QVERIFY(label != nullptr);
     const auto text = [&label] { return label->property("text").toString(); };
-    QTRY_COMPARE(text(), QStringLiteral("A"));
+    TRY_COMPARE(text(), "A"_s);
     MGConfItem(key).set(words("a b c"));
-    QTRY_COMPARE(text(), QStringLiteral("A and C"));
+    TRY_COMPARE(text(), "A and C"_s);
     Files::write(needed, "");
-    Files::write(path + QStringLiteral(".json"), "{ \"widgets\": [] }"); // A change: scans again.
-    QTRY_COMPARE(text(), QStringLiteral("A, B and C"));
+    Files::write(path + ".json"_s, "{ \"widgets\": [] }"); // A change: scans again.
+    TRY_COMPARE(text(), "A, B and C"_s);
     MGConfItem(key).unset();
     Files::remove(path);
-    Files::remove(path + QStringLiteral(".json"));
+    Files::remove(path + ".json"_s);
     Files::remove(needed);
 }
 
@@ -296,8 +292,8 @@ void TestExamples::runsThoseOfTheReference_data()
         words("deviceinfo documents eventswidgets memorycard quickactions");
     int found = 0;
     for (const QString &directory : directories) {
-        const QStringList names = QDir(QStringLiteral(SOURCE_DIR "/") + directory)
-                                      .entryList({QStringLiteral("*.cpp")}, QDir::Files);
+        const QStringList names =
+            QDir(SOURCE_DIR "/"_s + directory).entryList({"*.cpp"_s}, QDir::Files);
         for (const QString &name : names) {
             const QByteArrayList documents = examplesOf(directory + QLatin1Char('/') + name);
             for (const QByteArray &document : documents) {
@@ -316,44 +312,34 @@ void TestExamples::runsThoseOfTheReference()
     const auto object = create(document);
     QVERIFY(object != nullptr);
     // An example may probe its card. The helper does not exist; wait until its start has failed.
-    QTRY_VERIFY(!isBusy(*object));
+    TRY(!isBusy(*object));
     for (const QString &text : m_log->takeTexts()) {
-        QVERIFY2(text.startsWith(QStringLiteral("Cannot start \"/usr/libexec/sdcardhelper\"")),
-                 qPrintable(text));
+        QVERIFY2(text.startsWith("Cannot start \"/usr/libexec/sdcardhelper\""_s), qPrintable(text));
     }
 }
 
 void TestExamples::areAllThatTheReadmeShows()
 {
-    static const QRegularExpression block(QStringLiteral("(?s)```(?:qml|ini|json)\\n(.*?)```"));
-    auto blocks = block.globalMatch(QString::fromUtf8(contentOf(QStringLiteral("README.md"))));
+    static const QRegularExpression block("(?s)```(?:qml|ini|json)\\n(.*?)```"_s);
+    auto blocks = block.globalMatch(QString::fromUtf8(contentOf("README.md"_s)));
     QStringList shown;
     while (blocks.hasNext()) {
         shown.append(blocks.next().captured(1));
     }
-    QCOMPARE(shown, QStringList(QString::fromUtf8(example(QStringLiteral("page.qml")))));
-}
-
-void TestExamples::standInTheManualPages_data()
-{
-    QTest::addColumn<QString>("page");
-    QTest::addColumn<QString>("file");
-    const auto row = [](const char *page, const char *file) {
-        QTest::newRow(file) << page << file;
-    };
-    row("docs/man/marlo-quickactions.5", "torch.conf");
-    row("docs/man/marlo-eventswidgets.5", "weather.json");
-    row("docs/man/marlo-eventswidgets.5", "EventsWidget.qml");
+    QCOMPARE(shown, QStringList(QString::fromUtf8(example("page.qml"_s))));
 }
 
 void TestExamples::standInTheManualPages()
 {
-    QFETCH(const QString, page);
-    QFETCH(const QString, file);
-    // A manual page writes a backslash as \e.
-    const QByteArray text = contentOf(page).replace("\\e", "\\");
-    QVERIFY2(text.contains(".Bd -literal -offset indent\n" + example(file) + ".Ed\n"),
-             "the manual page has another text than docs/examples");
+    for (const auto &[page, file] :
+         {std::pair("quickactions", "torch.conf"), std::pair("eventswidgets", "weather.json"),
+          std::pair("eventswidgets", "EventsWidget.qml")}) {
+        // A manual page writes a backslash as \e.
+        const QByteArray text =
+            contentOf("docs/man/marlo-%1.5"_s.arg(QLatin1String(page))).replace("\\e", "\\");
+        const QByteArray shown = example(QLatin1String(file));
+        QVERIFY2(text.contains(".Bd -literal -offset indent\n" + shown + ".Ed\n"), file);
+    }
 }
 
 QTEST_MAIN(TestExamples)

@@ -83,9 +83,12 @@ install_missing() { # install_missing PACKAGE...
     (($(id -u) == 0)) || command -v sudo >/dev/null \
         || die "missing packages, and no sudo to install them: ${missing[*]}"
     echo "dev: installing ${missing[*]}"
-    as_root apt-get update -q
-    as_root env DEBIAN_FRONTEND=noninteractive \
-        apt-get install -q -y --no-install-recommends "${missing[@]}"
+    ( # apt-get does not wait for that of another command
+        flock 9
+        as_root apt-get update -q 9<&-
+        as_root env DEBIAN_FRONTEND=noninteractive \
+            apt-get install -q -y --no-install-recommends "${missing[@]}" 9<&-
+    ) 9<debian/control
 }
 
 # Says what the throw-away root will be, or ends with the reason why there can be none. Asked before

@@ -43,8 +43,8 @@ private Q_SLOTS:
 
 private:
     // Starts to empty a card, which blocks the removal of its first file.
-    void startEmptying(FailingCard *card);
-    void startProbing(const QString &path, const QByteArray &helper);
+    bool startEmptying(FailingCard *card);
+    bool startProbing(const QString &path, const QByteArray &helper);
 
     std::unique_ptr<ServiceProcess> m_diskService;
 };
@@ -71,7 +71,9 @@ void installHelper(const QByteArray &script)
 {
     const QString path = "/usr/libexec/sdcardhelper"_s;
     Files::write(path, "#!/bin/sh\n" + script);
-    QVERIFY(QFile::setPermissions(path, QFile::ReadOwner | QFile::ExeOwner));
+    if (!QFile::setPermissions(path, QFile::ReadOwner | QFile::ExeOwner)) {
+        qFatal("cannot make the helper executable");
+    }
 }
 
 } // namespace
@@ -95,18 +97,18 @@ void TestCardFaults::cleanup()
     FormatterTest::cleanup();
 }
 
-void TestCardFaults::startEmptying(FailingCard *card)
+bool TestCardFaults::startEmptying(FailingCard *card)
 {
     card->setFault(Fault::Waits);
     m_formatter->removeAllFiles();
-    TRY_COMPARE(card->waiting(), 1);
+    return QTest::qWaitFor([card] { return card->waiting() == 1; }, patience);
 }
 
-void TestCardFaults::startProbing(const QString &path, const QByteArray &helper)
+bool TestCardFaults::startProbing(const QString &path, const QByteArray &helper)
 {
     installHelper(helper);
     forgetEvents()->setDevicePath(path);
-    QCOMPARE(m_formatter->status(), Formatter::Probing);
+    return m_formatter->status() == Formatter::Probing;
 }
 
 void TestCardFaults::cardThatFails_data()
@@ -147,7 +149,7 @@ void TestCardFaults::cardGoneWhileItIsEmptied()
     NEEDS_FUSE()
     {
         FailingCard card(device, files);
-        startEmptying(&card);
+        QVERIFY(startEmptying(&card));
         card.setFault(Fault::Gone);
         TRY_EVENTS(failed);
         QCOMPARE(card.filesLeft(), files);
@@ -163,7 +165,7 @@ void TestCardFaults::cardDetachedWhileItIsEmptied()
 {
     NEEDS_FUSE()
     FailingCard card(device, files);
-    startEmptying(&card);
+    QVERIFY(startEmptying(&card));
     // The directory under the mount point is not part of the card.
     card.detach();
     const QString below = card.directory() + "/file0"_s;
@@ -184,7 +186,7 @@ void TestCardFaults::cardThatHangs()
 {
     NEEDS_FUSE()
     FailingCard card(device, files);
-    startEmptying(&card);
+    QVERIFY(startEmptying(&card));
     QTest::qWait(100);
     TRY_EVENTS("not busy, Mounting, busy, RemovingFiles");
     QVERIFY(m_formatter->busy());
@@ -197,7 +199,7 @@ void TestCardFaults::goesWhileTheCardHangs()
 {
     NEEDS_FUSE()
     FailingCard card(device, files);
-    startEmptying(&card);
+    QVERIFY(startEmptying(&card));
     m_formatter.reset();
     QTest::qWait(100);
     // The removal continues all the same.
@@ -230,21 +232,21 @@ void TestCardFaults::fullCard()
 
 void TestCardFaults::helperThatWritesAHundredMegabytes()
 {
-    startProbing(otherDevice, "head -c 100000000 /dev/zero | tr '\\0' x\n");
+    QVERIFY(startProbing(otherDevice, "head -c 100000000 /dev/zero | tr '\\0' x\n"));
     TRY_COMPARE(m_formatter->status(), Formatter::Idle);
     // The whole output becomes the file system type.
     QCOMPARE(m_formatter->filesystemType().size(), 100000000);
-    startProbing(device, "echo vfat\n");
+    QVERIFY(startProbing(device, "echo vfat\n"));
     TRY_COMPARE(m_formatter->filesystemType(), vfat);
 }
 
 void TestCardFaults::helperThatClosesItsOutputFirst()
 {
     // The probe ends when the helper exits, not when it closes its output.
-    startProbing(otherDevice, "echo vfat\nexec >&-\nsleep 0.5\nexit 0\n");
+    QVERIFY(startProbing(otherDevice, "echo vfat\nexec >&-\nsleep 0.5\nexit 0\n"));
     TRY_COMPARE(m_formatter->status(), Formatter::Idle);
     QCOMPARE(m_formatter->filesystemType(), vfat);
-    startProbing(device, "exec >&-\nsleep 0.5\nexit 1\n");
+    QVERIFY(startProbing(device, "exec >&-\nsleep 0.5\nexit 1\n"));
     TRY_COMPARE(m_formatter->status(), Formatter::Error);
     QCOMPARE(m_formatter->filesystemType(), QString());
     QCOMPARE(takeLog(), helperEnded("probe", "testcard1", "exited with 1 and the error \"\""));
@@ -253,7 +255,7 @@ void TestCardFaults::helperThatClosesItsOutputFirst()
 void TestCardFaults::helperThatReportsAtLength()
 {
     // A warning has only the front of the first line.
-    startProbing(otherDevice, "head -c 10000000 /dev/zero | tr '\\0' x >&2\nexit 3\n");
+    QVERIFY(startProbing(otherDevice, "head -c 10000000 /dev/zero | tr '\\0' x >&2\nexit 3\n"));
     TRY_COMPARE(m_formatter->status(), Formatter::Error);
     QCOMPARE(takeLog(),
              helperEnded("probe", "testcard2",
@@ -262,7 +264,7 @@ void TestCardFaults::helperThatReportsAtLength()
 
 void TestCardFaults::helperThatNeverEnds()
 {
-    startProbing(otherDevice, "echo $$ >/run/helper\nexec sleep 600\n");
+    QVERIFY(startProbing(otherDevice, "echo $$ >/run/helper\nexec sleep 600\n"));
     QFile file("/run/helper"_s);
     TRY(file.size() > 0);
     QTest::qWait(100);
@@ -275,7 +277,7 @@ void TestCardFaults::helperThatNeverEnds()
     TRY_COMPARE(m_formatter->status(), Formatter::Error);
     QCOMPARE(takeLog(),
              helperEnded("probe", "testcard2", "was ended by signal 9 with the error \"\""));
-    startProbing(device, "echo vfat\n");
+    QVERIFY(startProbing(device, "echo vfat\n"));
     TRY_EVENTS("path /dev/testcard1, Probing, busy, type vfat, Idle, not busy");
 }
 

@@ -53,20 +53,6 @@ int countColours(const QImage &image)
     return colours.size();
 }
 
-void copyDirectory(const QString &from, const QString &to)
-{
-    QVERIFY(QDir().mkpath(to));
-    const QFileInfoList entries = QDir(from).entryInfoList(QDir::AllEntries | QDir::NoDotAndDotDot);
-    for (const QFileInfo &entry : entries) {
-        const QString target = to + QLatin1Char('/') + entry.fileName();
-        if (entry.isDir()) {
-            copyDirectory(entry.filePath(), target);
-        } else {
-            QVERIFY2(QFile::copy(entry.filePath(), target), qPrintable(target));
-        }
-    }
-}
-
 } // namespace
 
 class ScreenshotsTest : public QObject
@@ -137,8 +123,9 @@ void ScreenshotsTest::problemsAreReported()
 
     const QTemporaryDir directory;
     const QString copy = directory.filePath("copy"_s);
-    for (const char *directory : {"/gallery", "/tests/gallery"}) {
-        copyDirectory(source + QLatin1String(directory), copy + QLatin1String(directory));
+    QVERIFY(QDir().mkpath(copy + "/tests"_s));
+    for (const QString &part : {"/gallery"_s, "/tests/gallery"_s}) {
+        QCOMPARE(QProcess::execute("cp"_s, {"-r"_s, source + part, copy + part}), 0);
     }
     QFile page(copy + "/gallery/pages/QuickActionsPage.qml"_s);
     QVERIFY(page.open(QIODevice::ReadWrite));

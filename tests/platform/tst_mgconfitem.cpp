@@ -314,7 +314,6 @@ private Q_SLOTS:
     void equalValueEmitsNothing();
     void anotherTypeIsAnotherValue();
     void unsetForgetsTheValue();
-    void deletedItemHearsNothing();
     void deletedItemIsNoLongerWatched();
 
     void followsOtherProcesses();
@@ -432,21 +431,6 @@ void TestMGConfItem::unsetForgetsTheValue()
         }
         TRY_COMPARE(DconfTool::read(key), QByteArray());
     }
-}
-
-void TestMGConfItem::deletedItemHearsNothing()
-{
-    const QString key = newKey();
-    int heard = 0;
-    auto item = std::make_unique<MGConfItem>(key);
-    connect(item.get(), &MGConfItem::valueChanged, this, [&heard] { ++heard; });
-    const Item another(key);
-    item.reset();
-    MGConfItem(key).set(1);
-    DconfTool::waitUntilStored();
-    DconfTool::write(key, "2");
-    TRY_COMPARE(another.changes(), 2); // the other item still follows the key
-    QCOMPARE(heard, 0);
 }
 
 void TestMGConfItem::deletedItemIsNoLongerWatched()

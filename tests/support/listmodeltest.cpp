@@ -71,7 +71,9 @@ void ListModelTest::define(const QString &names, const QByteArray &catalog) cons
 
 void ListModelTest::choose(const char *verb, const QString &name) const
 {
-    QVERIFY(QMetaObject::invokeMethod(m_watched, verb + m_kind, Q_ARG(QString, path(name))));
+    if (!QMetaObject::invokeMethod(m_watched, verb + m_kind, Q_ARG(QString, path(name)))) {
+        qFatal("the model has no %s%s()", verb, m_kind.constData());
+    }
 }
 
 void ListModelTest::store(const QString &names) const
@@ -148,9 +150,10 @@ QString ListModelTest::inDirectory(const QString &file) const
 
 void ListModelTest::rewrite(const QString &file, const QByteArray &content) const
 {
-    QFile open(inDirectory(file));
-    QVERIFY(open.open(QIODevice::WriteOnly));
-    open.write(content);
+    QFile rewritten(inDirectory(file));
+    if (!rewritten.open(QIODevice::WriteOnly) || rewritten.write(content) != content.size()) {
+        qFatal("cannot write %s", qPrintable(rewritten.fileName()));
+    }
 }
 
 void ListModelTest::writeBroken() const

@@ -174,7 +174,9 @@ QString RandomModelTest::storeInAnotherProcess(const QStringList &list)
 void RandomModelTest::waitForReload()
 {
     const int before = m_reloads;
-    TRY(m_reloads > before);
+    if (!QTest::qWaitFor([&] { return m_reloads > before; }, patience)) {
+        qFatal("the model does not reload");
+    }
 }
 
 QStringList RandomModelTest::listOf(const QStringList &paths, int size)

@@ -74,7 +74,7 @@ void load()
 void check()
 {
     DefinitionsChecker checker(QStringLiteral("/"));
-    // In each file, the catalog is not installed; in each file of a widget, nor is its QML file.
+    // The catalogs and QML files that the definitions name are not installed.
     if (!checker.checkInstalled() || checker.findings().size() != 3 * files) {
         qFatal("%zu findings", checker.findings().size());
     }

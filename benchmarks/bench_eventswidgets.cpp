@@ -28,8 +28,7 @@ constexpr int total = 5000; // for times that can be measured
 
 enum class Layout { OneFile, OneFileEach };
 
-// Stores results that only their timing needs, so that the compiler does not drop their
-// computation.
+// Stores results that nothing reads. Otherwise the compiler would drop their computation.
 volatile qint64 sink = 0;
 
 QJsonObject widget(int number)
@@ -41,7 +40,7 @@ QJsonObject widget(int number)
         {QStringLiteral("translation_id"), QStringLiteral("%1-title").arg(name)},
         {QStringLiteral("description_id"), QStringLiteral("%1-description").arg(name)},
         {QStringLiteral("icon"), QStringLiteral("image://theme/icon-%1").arg(name)},
-        // Out of order, so that most are inserted between others.
+        // Not sorted, so that most rows are inserted between others.
         {QStringLiteral("order"), int(number * 7919LL % 1000)},
         {QStringLiteral("default_enabled"), number % 2 == 0},
     };

@@ -341,8 +341,8 @@ long statusValue(const char *key)
     return value;
 }
 
-// In a process of its own: removes a tree on a pool thread with a small stack, and prints by how many
-// KiB the memory in use grew at most.
+// Removes a tree on a pool thread with a small stack, in a process of its own. Prints the largest growth
+// of the memory in use, in KiB.
 int measure(const QByteArray &path)
 {
     QThreadPool pool;

@@ -2,8 +2,8 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 // Measures how long each constructor, property, method and destructor blocks the main thread while
-// every service that a type uses is stopped; how often a page of all
-// types wakes up while nothing happens; and how many inotify instances 100 models take.
+// every service that a type uses is stopped; how often a page of all types wakes up while nothing
+// happens; and how many inotify instances 100 models take.
 
 #include "everytype.h"
 #include "rounds.h"
@@ -60,8 +60,7 @@ long waits()
     return usage.ru_nvcsw;
 }
 
-// In milliseconds. If the thread did not wait for anything, its processor time: the rest of the time
-// went to other processes.
+// In milliseconds. Without waiting, only the processor time counts: the rest went to other processes.
 template<typename Work> double pauseOf(const Work &work)
 {
     const long waitsBefore = waits();

@@ -72,7 +72,7 @@ void writePhotos(const QDir &card)
     }
 }
 
-// Prints a line for each of the works that main() names.
+// Prints a line for each workload that main() names.
 int runRound()
 {
     QQmlEngine engine;

@@ -30,7 +30,7 @@ const std::string top = "/top"; // is emptied
 const std::string outside = "/outside";
 const std::string aside = outside + "/aside"; // takes what is moved out of the top
 const std::string other = "/other"; // another file system
-// These must survive. No link in a tree leads to a directory with the names that are used in trees,
+// These files must survive. No link in a tree leads to a directory with the names that are used in trees,
 // because the events that change a tree must not change these files. A walk that continues in a
 // wrong directory meets the last four.
 const std::vector<std::string> keptFiles = {
@@ -43,7 +43,7 @@ const std::vector<std::string> keptDirectories = {outside, outside + "/y", outsi
 constexpr size_t maximumNodes = 400;
 constexpr size_t maximumLength = 1000; // of a path
 constexpr int maximumEvents = 8;
-// More calls than a walk over so few nodes can need.
+// A walk over so few nodes needs fewer calls.
 constexpr int tooManyCalls = 100000;
 // The maximum number of descriptors that the walk may hold open.
 constexpr int maximumOpen = 12;

@@ -55,63 +55,20 @@ QVector<QVariant> valuesOf(const QSettings &settings)
 // any combination, because QSettings unpacks them here.
 QByteArray randomFile(std::mt19937 *random)
 {
-    static const std::vector<QByteArray> pieces = {
-        "@Variant(\\0\\0\\0\\x2\\0\\0\\0\\x7)",
-        "@DateTime(\\0\\0\\0\\x2\\0\\0\\0\\x7)",
-        "@Variant(",
-        "@DateTime(",
-        "@Va",
-        "riant(",
-        "@",
-        "@@",
-        "\\x40",
-        "\\x10040",
-        "\\x00000000000040",
-        "\\100",
-        "\\200100",
-        "Variant(",
-        "\\x56",
-        "(",
-        ")",
-        "\\x29",
-        "\\51",
-        "x",
-        "\\x",
-        "\\q",
-        "\\8",
-        "\\t",
-        "\\?",
-        "\\",
-        "\\\\",
-        "\\\"",
-        "\\\n",
-        "\\\r\n",
-        "\\\n\n",
-        "\"",
-        "\"\"",
-        "\"",
-        ",",
-        ",",
-        " ",
-        "\t",
-        ";",
-        "=",
-        "[",
-        "]",
-        "\r",
-        "\n",
-        "\n[s]\n",
-        "\xef\xbb\xbf",
-        "\xc3\xa4",
-        "\xff",
-        "%",
-    };
+    static const QByteArrayList pieces =
+        QByteArray("@Variant(\\0\\0\\0\\x2\\0\\0\\0\\x7) @DateTime(\\0\\0\\0\\x2\\0\\0\\0\\x7) "
+                   "@Variant( @DateTime( @Va riant( @ @@ \\x40 \\x10040 \\x00000000000040 \\100 "
+                   "\\200100 Variant( \\x56 ( ) \\x29 \\51 x \\x \\q \\8 \\t \\? \\ \\\\ \\\" "
+                   "\\\n \\\r\n \\\n\n \" \"\" \" , , ; = [ ] \r \n \n[s]\n \xef\xbb\xbf "
+                   "\xc3\xa4 \xff %")
+            .split(' ')
+        + QByteArrayList{" ", "\t"};
     const auto below = [random](int end) { return int((*random)() % uint(end)); };
     QByteArray text = below(4) == 0 ? iniByteOrderMark : "";
     for (int key = 1 + below(3); key > 0; --key) {
         text += below(8) == 0 ? "" : 'k' + QByteArray::number(key) + '=';
         for (int count = below(7); count > 0; --count) {
-            text += pieces.at(size_t(below(int(pieces.size()))));
+            text += pieces.at(below(pieces.size()));
         }
         text += '\n';
     }

@@ -8,8 +8,8 @@
 #include <algorithm>
 #include <cerrno>
 #include <cstring>
+#include <filesystem>
 
-#include <dirent.h>
 #include <fcntl.h>
 #include <sys/socket.h>
 #include <sys/stat.h>
@@ -24,19 +24,6 @@ int require(int result, const QByteArray &path)
         qFatal("cannot make %s: %s", path.constData(), std::strerror(errno));
     }
     return result;
-}
-
-void append(QByteArrayList &paths, const QByteArray &directory, const QByteArray &prefix)
-{
-    const QByteArrayList names = FileTree::list(directory);
-    for (const QByteArray &name : names) {
-        const QByteArray path = directory + '/' + name;
-        paths.append(prefix + name);
-        struct stat info = {};
-        if (lstat(path.constData(), &info) == 0 && S_ISDIR(info.st_mode)) {
-            append(paths, path, prefix + name + '/');
-        }
-    }
 }
 
 } // namespace
@@ -138,14 +125,9 @@ QByteArray FileTree::read(const QByteArray &path)
 QByteArrayList FileTree::list(const QByteArray &path)
 {
     QByteArrayList names;
-    if (DIR *directory = opendir(path.constData())) {
-        while (const dirent *entry = readdir(directory)) {
-            const QByteArray name = entry->d_name;
-            if (name != "." && name != "..") {
-                names.append(name);
-            }
-        }
-        closedir(directory);
+    std::error_code error;
+    for (const auto &entry : std::filesystem::directory_iterator(path.constData(), error)) {
+        names.append(entry.path().filename().c_str());
     }
     return names;
 }
@@ -153,7 +135,11 @@ QByteArrayList FileTree::list(const QByteArray &path)
 QByteArrayList FileTree::listAll(const QByteArray &path)
 {
     QByteArrayList paths;
-    append(paths, path, QByteArray());
+    std::error_code error;
+    for (const auto &entry :
+         std::filesystem::recursive_directory_iterator(path.constData(), error)) {
+        paths.append(entry.path().c_str() + path.size() + 1);
+    }
     std::sort(paths.begin(), paths.end());
     return paths;
 }

@@ -10,7 +10,6 @@
 
 #include <QDir>
 #include <QFile>
-#include <QMetaMethod>
 #include <QSemaphore>
 #include <QSignalSpy>
 #include <QTemporaryDir>
@@ -122,8 +121,6 @@ private Q_SLOTS:
     void init();
     void cleanup();
 
-    void interface();
-    void onThreadPool_data();
     void onThreadPool();
     void receiverGoesFirst();
     void keepsTheMountDirectory();
@@ -139,14 +136,12 @@ private Q_SLOTS:
     void entriesThatCannotBeRemoved();
     void directoryWithoutPermissions();
     void readOnlyCard();
-    void unreadableMountDirectory();
     void mountDirectoryReplaced_data();
     void mountDirectoryReplaced();
     void directoriesOnTheDevice_data();
     void directoriesOnTheDevice();
     void notRun();
     void removeAllEntries();
-    void removeAllEntriesOfNothing();
 
 private:
     void writeMountTable(const QByteArray &content);
@@ -184,7 +179,9 @@ void tst_FileRemover::writeMountTable(const QByteArray &content)
 {
     const QByteArray draft = mountTable + ".draft";
     makeFile(draft, content);
-    QCOMPARE(::rename(draft.constData(), mountTable.constData()), 0);
+    if (::rename(draft.constData(), mountTable.constData()) != 0) {
+        qFatal("cannot write the mount table");
+    }
 }
 
 Outcome tst_FileRemover::runHere(const QByteArray &devicePath)
@@ -216,63 +213,42 @@ QByteArray tst_FileRemover::makeCard(const char *name)
     return card;
 }
 
-void tst_FileRemover::interface()
-{
-    FileRemover remover(QFile::decodeName(device));
-    QVERIFY(remover.autoDelete());
-    QVERIFY(!remover.parent());
-
-    const QMetaObject *const meta = remover.metaObject();
-    QCOMPARE(meta->className(), "FileRemover");
-    QCOMPARE(meta->propertyCount(), QObject::staticMetaObject.propertyCount());
-    QByteArrayList methods;
-    for (int i = meta->methodOffset(); i < meta->methodCount(); ++i) {
-        QCOMPARE(meta->method(i).methodType(), QMetaMethod::Signal);
-        methods.append(meta->method(i).methodSignature());
-    }
-    QCOMPARE(methods, (QByteArrayList{"completed()", "error()"}));
-    m_log.reset(); // the remover is not run
-}
-
-void tst_FileRemover::onThreadPool_data()
-{
-    QTest::addColumn<bool>("mounted");
-
-    QTest::newRow("mounted") << true;
-    QTest::newRow("not mounted") << false;
-}
-
 void tst_FileRemover::onThreadPool()
 {
-    QFETCH(const bool, mounted);
     const QByteArray card = makeCard("card");
-    writeMountTable(line(mounted ? device : QByteArray("/dev/other"), card));
+    for (const bool mounted : {false, true}) {
+        writeMountTable(line(mounted ? device : QByteArray("/dev/other"), card));
 
-    auto *const remover = new FileRemover(QFile::decodeName(device));
-    const QObject receiver;
-    QByteArrayList received;
-    std::atomic<QThread *> emitter{nullptr};
-    const auto record = [&](auto signal, const QByteArray &name) {
-        connect(remover, signal, &receiver, [&received, name] { received.append(name); });
-        const auto note = [&emitter] { emitter = QThread::currentThread(); };
-        connect(remover, signal, remover, note, Qt::DirectConnection);
-    };
-    record(&FileRemover::completed, "completed");
-    record(&FileRemover::error, "error");
-    QSemaphore deleted;
-    connect(
-        remover, &QObject::destroyed, remover, [&] { deleted.release(); }, Qt::DirectConnection);
-    QThreadPool::globalInstance()->start(remover, 0);
+        auto *const remover = new FileRemover(QFile::decodeName(device));
+        QVERIFY(remover->autoDelete() && !remover->parent());
+        QCOMPARE(FileRemover::staticMetaObject.methodCount(),
+                 QObject::staticMetaObject.methodCount() + 2); // the two signals
+        const QObject receiver;
+        QByteArrayList received;
+        std::atomic<QThread *> emitter{nullptr};
+        const auto record = [&](auto signal, const QByteArray &name) {
+            connect(remover, signal, &receiver, [&received, name] { received.append(name); });
+            const auto note = [&emitter] { emitter = QThread::currentThread(); };
+            connect(remover, signal, remover, note, Qt::DirectConnection);
+        };
+        record(&FileRemover::completed, "completed");
+        record(&FileRemover::error, "error");
+        QSemaphore deleted;
+        connect(
+            remover, &QObject::destroyed, remover, [&] { deleted.release(); },
+            Qt::DirectConnection);
+        QThreadPool::globalInstance()->start(remover, 0);
 
-    // The remover is gone, but its signal arrives only when this thread returns to its event loop.
-    QVERIFY(deleted.tryAcquire(1, patience));
-    QVERIFY(emitter.load() && emitter.load() != QThread::currentThread());
-    QCOMPARE(received, QByteArrayList());
-    TRY_COMPARE(received.size(), 1);
-    QCoreApplication::sendPostedEvents();
-    QCOMPARE(received, QByteArrayList{mounted ? "completed" : "error"});
-    QCOMPARE(m_log->takeAll().size(), mounted ? 0 : 1);
-    QCOMPARE(exists(card + "/file"), !mounted);
+        // The remover is gone, but its signal arrives only when this thread returns to its event loop.
+        QVERIFY(deleted.tryAcquire(1, patience));
+        QVERIFY(emitter.load() && emitter.load() != QThread::currentThread());
+        QCOMPARE(received, QByteArrayList());
+        TRY_COMPARE(received.size(), 1);
+        QCoreApplication::sendPostedEvents();
+        QCOMPARE(received, QByteArrayList{mounted ? "completed" : "error"});
+        QCOMPARE(m_log->takeAll().size(), mounted ? 0 : 1);
+        QCOMPARE(exists(card + "/file"), !mounted);
+    }
 }
 
 void tst_FileRemover::receiverGoesFirst()
@@ -382,14 +358,11 @@ void tst_FileRemover::missingMountTable()
 void tst_FileRemover::mountDirectoriesOfAnyBytes_data()
 {
     QTest::addColumn<QByteArray>("name");
-
-    QTest::newRow("blank") << QByteArray("my card");
-    QTest::newRow("tab and line break") << QByteArray("my\tcard\nhere");
-    QTest::newRow("backslash") << QByteArray("my\\040card");
-    QTest::newRow("UTF-8") << QByteArray("K\xc3\xa4rtchen");
-    QTest::newRow("Latin-1") << QByteArray("K\xe4rtchen");
-    QTest::newRow("no text at all") << QByteArray("\xff\xfe\x80");
-    QTest::newRow("colon") << QByteArray("a:b,c=d");
+    // The last three are UTF-8, Latin-1 and no text at all.
+    for (const QByteArray name : {"my card", "my\tcard\nhere", "my\\040card", "a:b,c=d",
+                                  "K\xc3\xa4rtchen", "K\xe4rtchen", "\xff\xfe\x80"}) {
+        QTest::newRow(name.toPercentEncoding().constData()) << name;
+    }
 }
 
 void tst_FileRemover::mountDirectoriesOfAnyBytes()
@@ -540,6 +513,16 @@ void tst_FileRemover::directoryWithoutPermissions()
     // The permissions of the directory around an entry count, not those of the entry.
     QCOMPARE(listAll(card),
              (QByteArrayList{"unreadable", "unreadable/file", "unwritable", "unwritable/file"}));
+
+    // A card that cannot be read counts as empty.
+    QCOMPARE(chmod(card.constData(), 0), 0);
+    {
+        const WithoutPrivileges guard;
+        QCOMPARE(emptyMounted(card), Completed);
+        QVERIFY(FileRemover::removeAllEntries(QFile::decodeName(card)));
+    }
+    QCOMPARE(chmod(card.constData(), 0700), 0);
+    QCOMPARE(listAll(card).size(), 4);
 }
 
 void tst_FileRemover::readOnlyCard()
@@ -550,20 +533,6 @@ void tst_FileRemover::readOnlyCard()
     QCOMPARE(mount(nullptr, card.constData(), nullptr, MS_BIND | MS_REMOUNT | MS_RDONLY, nullptr),
              0);
     QCOMPARE(emptyMounted(card), Error);
-    QCOMPARE(listAll(card), cardEntries);
-}
-
-void tst_FileRemover::unreadableMountDirectory()
-{
-    const QByteArray card = makeCard("card");
-    QCOMPARE(chmod(card.constData(), 0), 0);
-    {
-        // Such a card counts as empty.
-        const WithoutPrivileges guard;
-        QCOMPARE(emptyMounted(card), Completed);
-        QVERIFY(FileRemover::removeAllEntries(QFile::decodeName(card)));
-    }
-    QCOMPARE(chmod(card.constData(), 0700), 0);
     QCOMPARE(listAll(card), cardEntries);
 }
 
@@ -678,6 +647,12 @@ void tst_FileRemover::notRun()
 
 void tst_FileRemover::removeAllEntries()
 {
+    QVERIFY(QDir::setCurrent(QFile::decodeName(makeCard("current"))));
+    for (const char *name : {"", "nowhere", "file", "link"}) {
+        QVERIFY2(FileRemover::removeAllEntries(QString::fromLatin1(name)), name);
+    }
+    QCOMPARE(listAll(path("current")), cardEntries);
+
     const QByteArray card = makeCard("card");
     QVERIFY(FileRemover::removeAllEntries(QFile::decodeName(card)));
     QCOMPARE(list(card), QByteArrayList());
@@ -689,15 +664,6 @@ void tst_FileRemover::removeAllEntries()
     const MountPoint stuck(card + "/file1");
     QVERIFY(!FileRemover::removeAllEntries(QFile::decodeName(card)));
     QCOMPARE(list(card), QByteArrayList{"file1"});
-}
-
-void tst_FileRemover::removeAllEntriesOfNothing()
-{
-    QVERIFY(QDir::setCurrent(QFile::decodeName(makeCard("current"))));
-    for (const char *name : {"", "nowhere", "file", "link"}) {
-        QVERIFY2(FileRemover::removeAllEntries(QString::fromLatin1(name)), name);
-    }
-    QCOMPARE(listAll(path("current")), cardEntries);
 }
 
 QTEST_GUILESS_MAIN(tst_FileRemover)

@@ -176,8 +176,7 @@ private Q_SLOTS:
     void helperBeyondTheProcessLimit();
     void otherHandlerOfChildren();
     void errorsOfARunningHelper();
-    void retriesWhenTheStatusIsError_data();
-    void retriesWhenTheStatusIsError();
+    void retriesAgainAndAgain();
     void supportedFormatTypes();
 
     void removeAllFilesNeedsADescriptor();
@@ -677,6 +676,15 @@ void TestMemoryCardFormatter::scripts_data()
         "Unmount testcard1, Unmount testcard1",
         "probe|testcard1, format_vfat|testcard1, probe|testcard2",
         {helperFailed("exit=1", "format_vfat", "testcard1")});
+    for (const QByteArray scenario : {"missing", "crash", "exit=1"}) {
+        row("another path in a handler: " + scenario, unset, "done",
+            "helper " + scenario
+                + ", when Error: helper done ext4; path /dev/testcard2, path "
+                  "/dev/testcard1 -> path /dev/testcard1, Probing, busy, Error, path "
+                  "/dev/testcard2, Probing, busy, type ext4, Idle, not busy",
+            "", scenario == "missing" ? "probe|testcard2" : "probe|testcard1, probe|testcard2",
+            {helperFailed(scenario, "probe", "testcard1")});
+    }
     // The failed sequence is dropped without the new request.
     for (const QByteArray method : {"Mount", "Unmount"}) {
         const QByteArray verb = method.toLower();
@@ -706,6 +714,7 @@ void TestMemoryCardFormatter::scripts()
         const QStringList requests = QString::fromUtf8(line.mid(0, end)).split(", "_s);
         for (const QString &request : requests) {
             perform(request);
+            QVERIFY2(!QTest::currentTestFailed(), qPrintable(request));
             isEmpty |= request == "isEmpty"_s;
         }
         if (end >= 0) {
@@ -874,40 +883,21 @@ void TestMemoryCardFormatter::errorsOfARunningHelper()
     TRY_EVENTS(mounted);
 }
 
-void TestMemoryCardFormatter::retriesWhenTheStatusIsError_data()
+void TestMemoryCardFormatter::retriesAgainAndAgain()
 {
-    QTest::addColumn<QByteArray>("scenario");
-    QTest::addColumn<int>("retries");
-    for (const char *scenario : {"missing", "crash", "exit=1"}) {
-        QTest::newRow(scenario) << QByteArray(scenario) << 1;
-    }
-    QTest::newRow("missing again and again") << QByteArray("missing") << 20;
-}
-
-void TestMemoryCardFormatter::retriesWhenTheStatusIsError()
-{
-    QFETCH(QByteArray, scenario);
-    QFETCH(int, retries);
-    installHelper(scenario);
-    int retry = 0;
+    installHelper("missing");
+    int retries = 0;
     onStatus(Formatter::Error, [&] {
-        if (++retry == retries) {
+        if (++retries == 20) {
             installHelper("done", "ext4\n");
         }
-        m_formatter->setDevicePath("/dev/testcard%1"_s.arg(retry));
+        m_formatter->setDevicePath("/dev/testcard%1"_s.arg(retries));
     });
     m_formatter->setDevicePath("/dev/testcard0"_s);
-    TRY(m_formatter->status() == Formatter::Idle && m_formatter->filesystemType() == ext4);
-    QVERIFY(!m_formatter->busy());
-    QCOMPARE(retry, retries);
-    QCOMPARE(runs(),
-             (scenario == "missing" ? ""_s : "probe|testcard0, "_s)
-                 + "probe|testcard%1"_s.arg(retries));
-    // busyChanged() is emitted at most once in between: the step may be over by then.
-    QVERIFY2(events().endsWith("Probing, busy, type ext4, Idle, not busy")
-                 || events().endsWith("not busy, Probing, busy, type ext4, Idle, not busy"),
-             events().constData());
-    QCOMPARE(takeLog().count('\n'), retries - 1);
+    TRY(events().endsWith("Probing, busy, type ext4, Idle, not busy"));
+    QCOMPARE(retries, 20);
+    QCOMPARE(runs(), "probe|testcard20"_s);
+    QCOMPARE(takeLog().count('\n'), 19);
 }
 
 void TestMemoryCardFormatter::supportedFormatTypes()

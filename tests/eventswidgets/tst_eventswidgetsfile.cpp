@@ -22,7 +22,6 @@ private Q_SLOTS:
     void cleanup();
 
     void readsEveryKey();
-    void defaultsOfAbsentKeys();
     void wrongTypesReadAsAbsent_data();
     void wrongTypesReadAsAbsent();
     void order_data();
@@ -104,21 +103,12 @@ void TestEventsWidgetsFile::readsEveryKey()
     QCOMPARE(widget.order, 7);
     QCOMPARE(widget.defaultEnabled, true);
     QCOMPARE(widget.available, false);
-}
 
-void TestEventsWidgetsFile::defaultsOfAbsentKeys()
-{
-    const Widget widget = readWidget("");
-    QCOMPARE(widget.path, "a"_s);
-    QCOMPARE(widget.title, QString());
-    QCOMPARE(widget.translationId, QString());
-    QCOMPARE(widget.descriptionId, QString());
-    QCOMPARE(widget.translationCatalog, QString());
-    QCOMPARE(widget.icon, QString());
-    QCOMPARE(widget.availablePath, QString());
-    QCOMPARE(widget.order, -1);
-    QCOMPARE(widget.defaultEnabled, false);
-    QCOMPARE(widget.available, true);
+    // The other keys may be absent.
+    Widget plain;
+    plain.path = "a"_s;
+    plain.available = true;
+    QVERIFY(!(readWidget("") != plain));
 }
 
 void TestEventsWidgetsFile::wrongTypesReadAsAbsent_data()

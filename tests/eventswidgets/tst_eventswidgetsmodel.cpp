@@ -52,6 +52,8 @@ public:
 private Q_SLOTS:
     void init();
 
+    // tst_randomwidgets compares rows, signals and the stored list after any changes.
+
     // Interface and data
     void roles();
     void dataOfRows();
@@ -61,34 +63,16 @@ private Q_SLOTS:
     // Reading
     void readsJsonFilesOnly();
     void badFilesHideNoGoodOnes();
-    void placesByOrder_data();
-    void placesByOrder();
-    void repeatedPathInOneFile();
-    void repeatedPathInTwoFiles();
 
-    // Following the directory
-    void changedWidgetKeepsItsRow();
-    void unchangedWidgetsAreNotAnnounced();
-    void removesOneRowAtATime();
     void oneScanPerNotification();
 
     // Texts
-    void translatesTitleAndDescription();
-    void looksTextsUpOnEveryCall();
-    void catalogWithoutWidgets();
-    void catalogsAreOnlyEverAdded();
-    void modelsShareNoCatalogs();
 
     // Enabled
-    void defaultsWhileNothingIsStored();
     void valuesOfAnyType_data();
     void valuesOfAnyType();
     void firstChoiceEnablesAllOthers();
-    void orderOfTheFirstChoice();
     void firstChoiceBeforeCompletion();
-
-    // Available
-    void updatesAvailability();
 
     // Re-entrant calls
     void changesWaitForOneAnother();
@@ -262,121 +246,6 @@ void TestEventsWidgetsModel::badFilesHideNoGoodOnes()
     QCOMPARE(warnings, expected);
 }
 
-void TestEventsWidgetsModel::placesByOrder_data()
-{
-    QTest::addColumn<QString>("orders");
-    QTest::addColumn<QString>("rows");
-    const auto row = [](const char *name, const char *orders, const char *rows) {
-        QTest::newRow(name) << orders << rows;
-    };
-    row("in order", "1 3 7", "1 3 7");
-    row("backwards", "7 3 1", "1 3 7");
-    row("before the first", "1 0", "0 1");
-    row("after an equal one", "1 3 7 3", "1 3 3 7");
-    row("none goes last", "1 -1 3", "1 -1 3");
-    row("none before any", "-1 -2", "-1 -2");
-    row("behind what has none", "-1 5 4", "-1 4 5");
-    row("before a higher one only", "5 -1 6 4", "4 5 -1 6");
-    row("first higher one", "5 -1 9 5 6", "5 -1 5 6 9");
-}
-
-void TestEventsWidgetsModel::placesByOrder()
-{
-    QFETCH(QString, orders);
-    QByteArrayList widgets;
-    for (const QByteArray &order : orders.toLatin1().split(' ')) {
-        widgets.append(R"({ "path": ")" + QByteArray::number(widgets.size()) + R"(", "icon": ")"
-                       + order + R"(", "order": )" + order + " }");
-    }
-    loadModel(widgets.join(", "));
-    QTEST(column(Model::IconRole).join(QLatin1Char(' ')), "rows");
-
-    // A widget that is added later also comes after those with the same order.
-    const int last = orders.split(QLatin1Char(' ')).last().toInt();
-    write("more.json"_s, R"({ "path": "late", "order": )" + QByteArray::number(last) + " }");
-    m_model->directoryChanged();
-    const QStringList paths = column(Model::PathRole);
-    QVERIFY(paths.indexOf("late"_s) > paths.indexOf(QString::number(widgets.size() - 1)));
-}
-
-void TestEventsWidgetsModel::repeatedPathInOneFile()
-{
-    write("test.json"_s, R"({ "path": "a", "title": "1", "order": 5 }, { "path": "b", "order": 6 },
-                            { "path": "a", "title": "2", "order": 7 })");
-    makeModel();
-    m_model->componentComplete();
-    QCOMPARE(rows(), "a b"_s);
-    QCOMPARE(column(Model::TitleRole).first(), "2"_s);
-    QCOMPARE(events(), "inserted 0, inserted 1, changed 0"_s);
-    // Every scan does the same: the row becomes the first widget and then the second again.
-    m_model->directoryChanged();
-    QCOMPARE(column(Model::TitleRole).first(), "2"_s);
-    QCOMPARE(events(), "changed 0, changed 0"_s);
-}
-
-void TestEventsWidgetsModel::repeatedPathInTwoFiles()
-{
-    write("1.json"_s, R"({ "path": "a", "title": "1" })");
-    write("2.json"_s, R"({ "path": "a", "title": "2" })");
-    loadModel();
-    // The file that was read last defines the row. Without it, the other one does.
-    QCOMPARE(rows(), "a"_s);
-    const QString title = column(Model::TitleRole).first();
-    Files::remove(pathOf(title + ".json"_s));
-    m_model->directoryChanged();
-    QCOMPARE(rows(), "a"_s);
-    QVERIFY(column(Model::TitleRole).first() != title);
-}
-
-void TestEventsWidgetsModel::changedWidgetKeepsItsRow()
-{
-    write("1.json"_s, R"({ "path": "a", "order": 3 })");
-    write("2.json"_s, R"({ "path": "b", "order": 5 })");
-    loadModel();
-    write("2.json"_s, R"({ "path": "b", "order": 1 })");
-    m_model->directoryChanged();
-    QCOMPARE(rows(), "a b"_s);
-    QCOMPARE(events(), "changed 1"_s);
-
-    // The new order applies to later widgets, and to this widget when it is added again.
-    write("2.json"_s, R"({ "path": "b", "order": 9 }, { "path": "c", "order": 6 })");
-    m_model->directoryChanged();
-    QCOMPARE(rows(), "a c b"_s);
-    Files::remove(pathOf("2.json"_s));
-    m_model->directoryChanged();
-    QCOMPARE(rows(), "a"_s);
-    write("2.json"_s, R"({ "path": "b", "order": 1 })");
-    m_model->directoryChanged();
-    QCOMPARE(rows(), "b a"_s);
-}
-
-void TestEventsWidgetsModel::unchangedWidgetsAreNotAnnounced()
-{
-    loadModel(R"({ "path": "a" }, { "path": "b" })");
-    m_model->directoryChanged();
-    m_model->enabledWidgetsChanged();
-    m_model->updateAvailable();
-    QCOMPARE(events(), QString());
-    // Widgets that move to another file with another catalog are not announced either.
-    Files::remove(pathOf("test.json"_s));
-    write("other.json"_s, R"({ "path": "a" }, { "path": "b" })", "maps");
-    m_model->directoryChanged();
-    QCOMPARE(events(), QString());
-    QCOMPARE(rows(), "a b"_s);
-}
-
-void TestEventsWidgetsModel::removesOneRowAtATime()
-{
-    write("1.json"_s, R"({ "path": "a", "order": 1 }, { "path": "c", "order": 3 },
-                         { "path": "d", "order": 4 })");
-    write("2.json"_s, R"({ "path": "b", "order": 2 })");
-    loadModel();
-    Files::remove(pathOf("1.json"_s));
-    m_model->directoryChanged();
-    QCOMPARE(rows(), "b"_s);
-    QCOMPARE(events(), "removed 0, removed 1, removed 1"_s);
-}
-
 void TestEventsWidgetsModel::oneScanPerNotification()
 {
     writeBroken();
@@ -391,98 +260,6 @@ void TestEventsWidgetsModel::oneScanPerNotification()
     TRY_COMPARE(rows(), "a"_s);
     QTest::qWait(200);
     QCOMPARE(takeMessages().size(), 1);
-}
-
-void TestEventsWidgetsModel::translatesTitleAndDescription()
-{
-    loadModel(R"({ "path": "a", "title": "plain", "translation_id": "maps-title",
-                   "description_id": "maps-english" },
-                 { "path": "b", "title": "plain", "translation_id": "maps-missing",
-                   "description_id": "maps-missing" },
-                 { "path": "c", "title": "maps-title" },
-                 { "path": "d", "translation_id": "maps-missing" })",
-              "maps");
-    QCOMPARE(column(Model::TitleRole),
-             (QStringList{"Kartat"_s, "plain"_s, "maps-title"_s, QString()}));
-    QCOMPARE(column(Model::DescriptionRole),
-             (QStringList{"Maps, English only"_s, QString(), QString(), QString()}));
-}
-
-void TestEventsWidgetsModel::looksTextsUpOnEveryCall()
-{
-    loadModel(R"({ "path": "a", "title": "plain", "translation_id": "maps-title",
-                   "description_id": "maps-title" })");
-    const auto texts = [this] { return column(Model::TitleRole) + column(Model::DescriptionRole); };
-    QCOMPARE(texts(), (QStringList{"plain"_s, QString()}));
-    {
-        QTranslator translator;
-        QVERIFY(translator.load("maps-fi"_s, "/usr/share/translations"_s));
-        QCoreApplication::installTranslator(&translator);
-        QCOMPARE(texts(), words("Kartat Kartat"));
-    }
-    QCOMPARE(texts(), (QStringList{"plain"_s, QString()}));
-}
-
-void TestEventsWidgetsModel::catalogWithoutWidgets()
-{
-    Files::write(pathOf("array.json"_s), R"([ { "translation_catalog": "atlas" } ])");
-    loadModel("", "maps");
-    QCOMPARE(m_model->findChildren<QTranslator *>().size(), 2);
-    QCOMPARE(qtTrId("maps-title"), "Kartat"_s);
-    QCOMPARE(takeMessages().size(), 1);
-}
-
-void TestEventsWidgetsModel::catalogsAreOnlyEverAdded()
-{
-    loadModel(R"({ "path": "a" })", "maps");
-    QCOMPARE(qtTrId("maps-title"), "Kartat"_s);
-    const auto hasBoth = [this] {
-        return qtTrId("maps-title") == "Atlas"_s && qtTrId("maps-english") == "Maps, English only"_s
-            && m_model->findChildren<QTranslator *>().size() == 4;
-    };
-    // Another catalog is added; the first one stays and is not loaded again.
-    write("test.json"_s, R"({ "path": "a" })", "atlas");
-    m_model->directoryChanged();
-    QVERIFY(hasBoth());
-    Files::remove(pathOf("test.json"_s));
-    m_model->directoryChanged();
-    QCOMPARE(m_model->rowCount(), 0);
-    QVERIFY(hasBoth());
-    write("again.json"_s, R"({ "path": "a" })", "maps");
-    m_model->directoryChanged();
-    QVERIFY(hasBoth());
-}
-
-void TestEventsWidgetsModel::modelsShareNoCatalogs()
-{
-    loadModel(R"({ "path": "a" })", "maps");
-    {
-        Model other;
-        other.componentComplete();
-        QCOMPARE(other.findChildren<QTranslator *>().size(), 2);
-    }
-    QCOMPARE(m_model->findChildren<QTranslator *>().size(), 2);
-    QCOMPARE(qtTrId("maps-title"), "Kartat"_s);
-}
-
-void TestEventsWidgetsModel::defaultsWhileNothingIsStored()
-{
-    loadModel(R"({ "path": "a" }, { "path": "b", "default_enabled": true },
-                 { "path": "c", "default_enabled": false })");
-    QCOMPARE(enabled(), words("false true false"));
-    // Loading writes nothing, and reading again changes nothing.
-    m_model->enabledWidgetsChanged();
-    m_model->directoryChanged();
-    QCOMPARE(enabled(), words("false true false"));
-    QVERIFY(!m_key->value().isValid());
-
-    write("more.json"_s, R"({ "path": "d", "default_enabled": true })");
-    m_model->directoryChanged();
-    QCOMPARE(enabled(), words("false true false true"));
-    store(a);
-    QCOMPARE(enabled(), words("true false false false"));
-    m_key->unset();
-    QCOMPARE(enabled(), words("false true false true"));
 }
 
 void TestEventsWidgetsModel::valuesOfAnyType_data()
@@ -530,49 +307,12 @@ void TestEventsWidgetsModel::firstChoiceEnablesAllOthers()
     QCOMPARE(enabled(), words("true false true false"));
 }
 
-// The order of reading after a scan, the order of the rows after a change of the key.
-void TestEventsWidgetsModel::orderOfTheFirstChoice()
-{
-    loadModel(R"({ "path": "b", "order": 2 }, { "path": "a", "order": 1 }, { "path": "b" })");
-    QCOMPARE(rows(), "a b"_s);
-    m_model->directoryChanged();
-    m_model->enableWidget(c);
-    QCOMPARE(stored(), "b a b c"_s);
-    m_key->unset();
-    m_model->enableWidget(c);
-    QCOMPARE(stored(), "a b c"_s);
-}
-
 void TestEventsWidgetsModel::firstChoiceBeforeCompletion()
 {
     // No other widget is known yet, so none is stored with it.
     makeModel();
     m_model->enableWidget(a);
     QCOMPARE(stored(), "a"_s);
-}
-
-void TestEventsWidgetsModel::updatesAvailability()
-{
-    loadModel(R"({ "path": "a", "available_path": "/usr/share/glimmera/needed" },
-                 { "path": "b" }, { "path": "c", "available_path": "/usr/share/glimmera" })");
-    const auto available = [this] { return column(Model::AvailableRole); };
-    // An unavailable widget is listed, too.
-    QCOMPARE(available(), words("false true true"));
-    Files::write(needed, "");
-    QCOMPARE(available(), words("false true true"));
-    m_model->updateAvailable();
-    QCOMPARE(available(), words("true true true"));
-    QCOMPARE(events(), "changed 0 (261)"_s);
-    Files::remove(needed);
-    m_model->updateAvailable();
-    QCOMPARE(available(), words("false true true"));
-    QCOMPARE(events(), "changed 0 (261)"_s);
-
-    // A scan checks this too, and reports that the whole widget changed.
-    Files::write(needed, "");
-    m_model->directoryChanged();
-    QCOMPARE(available(), words("true true true"));
-    QCOMPARE(events(), "changed 0"_s);
 }
 
 void TestEventsWidgetsModel::changesWaitForOneAnother()
@@ -584,6 +324,7 @@ void TestEventsWidgetsModel::changesWaitForOneAnother()
         m_key->set(QStringList{a});
         Files::write(needed, "");
         m_model->updateAvailable();
+        m_model->directoryChanged();
         QCOMPARE(events(), QString());
     });
     write("test.json"_s, widget + R"(, { "path": "b" })");

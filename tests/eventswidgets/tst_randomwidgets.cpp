@@ -1,6 +1,7 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
+#include "eventswidgets/eventswidget.h"
 #include "eventswidgets/eventswidgetsmodel.h"
 #include "files.h"
 #include "mgconfitem.h"
@@ -17,33 +18,10 @@
 #include <QtTest>
 
 #include <functional>
-#include <tuple>
 
 namespace {
 
-struct Widget {
-    QString title;
-    QString translationId;
-    QString descriptionId;
-    QString icon;
-    QString path;
-    QString availablePath;
-    int order = -1;
-    bool enabled = false;
-    bool defaultEnabled = false;
-    bool available = false;
-
-    bool isAvailable() const { return availablePath.isEmpty() || QFile::exists(availablePath); }
-    bool operator!=(const Widget &other) const
-    {
-        const auto all = [](const Widget &widget) {
-            return std::tie(widget.title, widget.translationId, widget.descriptionId, widget.icon,
-                            widget.path, widget.availablePath, widget.order, widget.enabled,
-                            widget.defaultEnabled, widget.available);
-        };
-        return all(*this) != all(other);
-    }
-};
+using Widget = EventsWidget;
 
 class NaiveWidgets : public NaiveRows<Widget>
 {
@@ -207,7 +185,7 @@ private:
     void reset() override;
     void makeModels() override;
     void removeModels() override;
-    const QAbstractListModel *model() const override { return m_model.get(); }
+    QAbstractListModel *model() const override { return m_model.get(); }
     NaiveModel *naive() const override { return m_naive.get(); }
     QString step() override;
     void changeFile(const QString &path);
@@ -221,7 +199,7 @@ private:
 };
 
 TestRandomWidgets::TestRandomWidgets()
-    : RandomModelTest(Places::eventsWidgets, Places::enabledWidgets)
+    : RandomModelTest(Places::eventsWidgets, Places::enabledWidgets, "Widget")
 {
     for (const QString &name : words("one two Three four")) {
         m_files.append("%1/%2.json"_s.arg(Places::eventsWidgets, name));
@@ -300,17 +278,8 @@ QString TestRandomWidgets::step()
     const QString path = anyOf(m_paths);
     const QString file = anyOf(m_files);
     const int kind = m_random.bounded(1000);
-    if (kind < 150) {
-        m_stored = m_naive->enabledList + QStringList(path);
-        m_model->enableWidget(path);
-        return "enable "_s + path;
-    }
     if (kind < 300) {
-        QStringList list = m_naive->enabledList;
-        list.removeAll(path);
-        m_stored = list;
-        m_model->disableWidget(path);
-        return "disable "_s + path;
+        return choose(kind < 150 ? "enable" : "disable", path);
     }
     if (kind < 400) {
         return store(listOf(m_paths, 6));

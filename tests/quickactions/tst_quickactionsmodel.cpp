@@ -42,17 +42,13 @@ public:
 private Q_SLOTS:
     void init();
 
+    // tst_randomactions compares rows, signals and the stored list after any changes.
+
     // Which actions have a row, and where
     void isEmptyUntilComplete();
     void listsActions_data();
     void listsActions();
-    void followsTheEnabledList_data();
-    void followsTheEnabledList();
-    void followsTheBlockedList();
     void listsOfOtherTypes();
-    void showPotentialChanges();
-    void ordersByPriority_data();
-    void ordersByPriority();
 
     // What a row shows
     void roles();
@@ -60,14 +56,11 @@ private Q_SLOTS:
     void get();
     void dataOutside();
     void catalogsOfARowChangeWithIt();
-    void changedCatalogIsAdded();
 
     // The user's choices
     void choicesAreNoted();
-    void rowTurnsWithShowPotential();
     void move_data();
     void move();
-    void moveOutside();
     void moveIsNotReloaded();
     void requestsDuringAMove_data();
     void requestsDuringAMove();
@@ -76,12 +69,10 @@ private Q_SLOTS:
     void firstChangeStartsTheDelay();
     void reloadsAccumulate();
     void reloadsOfUnchangedFiles();
-    void entryGetsItsRowWithItsDefinition();
     void irregularDefinitionsAreListed();
     void definitionFilter();
 
     // Re-entrant calls
-    void languageChangesMayChangeTheModel();
     void showPotentialSetInAHandler();
     void movesWaitForTheRows();
     void moveFollowsTheStoredList();
@@ -232,50 +223,6 @@ void TestQuickActionsModel::listsActions()
     }
 }
 
-void TestQuickActionsModel::followsTheEnabledList_data()
-{
-    QTest::addColumn<QString>("before");
-    QTest::addColumn<QString>("after");
-    QTest::addColumn<QString>("rows");
-    QTest::addColumn<QString>("events");
-    const auto row = [](const char *name, const char *before, const char *after, const char *rows,
-                        const char *events) {
-        QTest::newRow(name) << before << after << rows << events;
-    };
-    row("one more", "a", "a b", "a b", "inserted 1, count");
-    row("above", "c", "a b c", "a b c", "inserted 0, inserted 1, count");
-    row("between", "a c", "a b c", "a b c", "inserted 1, count");
-    row("behind a repeated one", "a a", "a a b", "a b", "inserted 1, count");
-    row("one less", "a b", "b", "b", "removed 0, count");
-    row("none", "a b c", "", "", "removed 0, removed 0, removed 0, count");
-    row("another one", "a", "b", "b", "removed 0, inserted 0");
-    row("another order", "a b", "b a", "a b", "");
-}
-
-void TestQuickActionsModel::followsTheEnabledList()
-{
-    QFETCH(QString, before);
-    QFETCH(QString, after);
-    define("a b c"_s);
-    store(before);
-    loadModel();
-    store(after);
-    QTEST(rows(), "rows");
-    QTEST(events(), "events");
-    MGConfItem(Places::enabledActions).unset();
-    QCOMPARE(m_model->count(), 0);
-}
-
-void TestQuickActionsModel::followsTheBlockedList()
-{
-    loadEnabled("a b"_s);
-    setBlocked("a"_s);
-    QCOMPARE(rows(), "b"_s);
-    setBlocked(QString());
-    QCOMPARE(rows(), "a b"_s);
-    QCOMPARE(events(), "removed 0, count, inserted 0, count"_s);
-}
-
 void TestQuickActionsModel::listsOfOtherTypes()
 {
     define("a"_s);
@@ -292,61 +239,6 @@ void TestQuickActionsModel::listsOfOtherTypes()
         QCOMPARE(rows(), "a"_s);
         QCOMPARE(enabledRows(), QString());
     }
-}
-
-void TestQuickActionsModel::showPotentialChanges()
-{
-    define("b"_s);
-    loadEnabled("a"_s);
-    QVERIFY(!m_model->showPotential());
-    m_model->setShowPotential(true);
-    QVERIFY(m_model->showPotential());
-    // The signal comes after the rows.
-    QCOMPARE(events(), "inserted 1, count, potential"_s);
-    m_model->setShowPotential(true);
-    QCOMPARE(events(), QString());
-    m_model->setShowPotential(false);
-    QCOMPARE(rows(), "a"_s);
-    QCOMPARE(events(), "removed 1, count, potential"_s);
-}
-
-void TestQuickActionsModel::ordersByPriority_data()
-{
-    using Priorities = QByteArrayList;
-    QTest::addColumn<Priorities>("priorities");
-    QTest::addColumn<QByteArray>("priority");
-    QTest::addColumn<int>("row");
-    const Priorities usual{"0", "10", "10", "20"};
-    const auto row = [](const char *name, const Priorities &priorities, const char *priority,
-                        int row) {
-        QTest::newRow(name) << priorities << QByteArray(priority) << row;
-    };
-    row("lowest", usual, "0", 1);
-    row("equal", usual, "10", 3);
-    row("between", usual, "15", 3);
-    row("highest", usual, "30", 4);
-    row("none", usual, "", 4);
-    row("negative", usual, "-1", 4);
-    row("above an enabled row without a priority", {"", ""}, "5", 0);
-    row("below a negative priority", {"-3", "10"}, "5", 1);
-}
-
-// The first row is enabled. The new action is not enabled, and gets its row once it is unblocked.
-void TestQuickActionsModel::ordersByPriority()
-{
-    QFETCH(QByteArrayList, priorities);
-    QFETCH(QByteArray, priority);
-    const QStringList rowNames = words("a b c d").mid(0, priorities.size());
-    for (int i = 0; i < priorities.size(); ++i) {
-        add(rowNames.at(i), "priority=" + priorities.at(i) + '\n');
-    }
-    add("new"_s, "priority=" + priority + '\n');
-    store("a"_s);
-    setBlocked("new"_s);
-    loadModel(true);
-    QCOMPARE(rows(), rowNames.join(QLatin1Char(' ')));
-    setBlocked(QString());
-    QTEST(int(rows().split(QLatin1Char(' ')).indexOf("new"_s)), "row");
 }
 
 void TestQuickActionsModel::roles()
@@ -420,19 +312,6 @@ void TestQuickActionsModel::catalogsOfARowChangeWithIt()
     QCOMPARE(texts.mid(6), words("Kartat maps-title"));
 }
 
-void TestQuickActionsModel::changedCatalogIsAdded()
-{
-    add("a"_s, "title=maps-title\ntranslation-catalog=maps\n");
-    store("a"_s);
-    loadModel();
-    add("a"_s, "title=maps-title\ntranslation-catalog=atlas\n");
-    // The later catalog takes precedence, and has no Finnish.
-    TRY_COMPARE(data(0, Model::TitleRole), QVariant("Atlas"_s));
-    // The row's current catalog is removed together with the row. The earlier catalog is kept.
-    store(QString());
-    QCOMPARE(qtTrId("maps-title"), "Kartat"_s);
-}
-
 void TestQuickActionsModel::choicesAreNoted()
 {
     loadEnabled("a"_s);
@@ -448,19 +327,6 @@ void TestQuickActionsModel::choicesAreNoted()
     };
     check("enable", "a b"_s);
     check("disable", "a"_s);
-}
-
-void TestQuickActionsModel::rowTurnsWithShowPotential()
-{
-    define("a b"_s);
-    store("a b"_s);
-    loadModel(true);
-    for (const bool enabled : {false, true}) {
-        choose(enabled ? "enable" : "disable", "a"_s);
-        QCOMPARE(rows(), "a b"_s);
-        QCOMPARE(data(0, Model::EnabledRole), QVariant(enabled));
-        QCOMPARE(events(), "changed 0"_s);
-    }
 }
 
 void TestQuickActionsModel::move_data()
@@ -504,21 +370,6 @@ void TestQuickActionsModel::move()
     QTEST(rowsOf(other), "rows");
 }
 
-void TestQuickActionsModel::moveOutside()
-{
-    define("a b c"_s);
-    store("a b"_s);
-    loadModel(true);
-    m_model->move(-1, 0);
-    m_model->move(0, -1);
-    // Beyond the list, within the rows.
-    m_model->move(2, 0);
-    m_model->move(0, 2);
-    QCOMPARE(rows(), "a b c"_s);
-    QCOMPARE(stored(), "a b"_s);
-    QVERIFY(!userHasChosen());
-}
-
 void TestQuickActionsModel::moveIsNotReloaded()
 {
     loadEnabled("a b"_s);
@@ -529,12 +380,6 @@ void TestQuickActionsModel::moveIsNotReloaded()
     QCOMPARE(events(), "moved 0 1"_s);
     store("b a a"_s);
     QCOMPARE(events(), "changed 1"_s);
-    // Rows that stay keep their places; move() uses the indexes of the list.
-    store("a b"_s);
-    QCOMPARE(rows(), "b a"_s);
-    m_model->move(0, 1);
-    QCOMPARE(rows(), "a b"_s);
-    QCOMPARE(stored(), "b a"_s);
 }
 
 void TestQuickActionsModel::requestsDuringAMove_data()
@@ -658,15 +503,6 @@ void TestQuickActionsModel::reloadsOfUnchangedFiles()
     takeMessages();
 }
 
-void TestQuickActionsModel::entryGetsItsRowWithItsDefinition()
-{
-    loadEnabled("a b"_s);
-    store("later a b"_s);
-    QCOMPARE(rows(), "a b"_s);
-    define("later"_s);
-    TRY_COMPARE(rows(), "later a b"_s);
-}
-
 void TestQuickActionsModel::irregularDefinitionsAreListed()
 {
     add("broken"_s, "title=x\n[remote-arguments\n");
@@ -688,27 +524,6 @@ void TestQuickActionsModel::definitionFilter()
     }
     loadModel(true);
     QCOMPARE(rows(), "A"_s);
-}
-
-void TestQuickActionsModel::languageChangesMayChangeTheModel()
-{
-    add("a"_s, "title=maps-english\ntranslation-catalog=maps\n");
-    add("b"_s, "title=maps-title\ntranslation-catalog=atlas\n");
-    makeModel(true);
-    Model *model = m_model.get();
-    const LanguageListener listener([&] {
-        for (int row = 0; row < model->rowCount(); ++row) {
-            model->data(model->index(row), Model::TitleRole);
-        }
-        model->setShowPotential(!model->showPotential());
-        model->setShowPotential(!model->showPotential());
-    });
-    // Language changes come in the middle of an insertion and in the destructor of the model.
-    m_model->componentComplete();
-    QCOMPARE(listener.count, 3);
-    QCOMPARE(rows(), "a b"_s);
-    removeModel();
-    QVERIFY(listener.count > 3);
 }
 
 void TestQuickActionsModel::showPotentialSetInAHandler()

@@ -200,7 +200,7 @@ private:
     void reset() override;
     void makeModels() override;
     void removeModels() override;
-    const QAbstractListModel *model() const override { return m_model.get(); }
+    QAbstractListModel *model() const override { return m_model.get(); }
     NaiveModel *naive() const override { return m_naive.get(); }
     QString step() override;
     QString difference() override;
@@ -213,7 +213,7 @@ private:
 };
 
 TestRandomActions::TestRandomActions()
-    : RandomModelTest(Places::quickActions, Places::enabledActions)
+    : RandomModelTest(Places::quickActions, Places::enabledActions, "Action")
 {
     for (const QString &name : words("a b c D e f g h")) {
         m_paths.append("%1/%2.conf"_s.arg(Places::quickActions, name));
@@ -276,19 +276,9 @@ QString TestRandomActions::step()
 {
     const QString path = anyOf(m_paths);
     const int kind = m_random.bounded(1000);
-    if (kind < 150) {
-        m_stored = m_naive->enabledList + QStringList(path);
-        m_userHasChosen = true;
-        m_model->enableAction(path);
-        return "enable "_s + path;
-    }
     if (kind < 300) {
-        QStringList list = m_naive->enabledList;
-        list.removeAll(path);
-        m_stored = list;
         m_userHasChosen = true;
-        m_model->disableAction(path);
-        return "disable "_s + path;
+        return choose(kind < 150 ? "enable" : "disable", path);
     }
     if (kind < 500) {
         const int size = m_naive->enabledList.size();

@@ -202,26 +202,6 @@ void ListModelTest::readsWrittenFilesOnceTheyAreClosed()
     takeMessages();
 }
 
-void ListModelTest::otherFiles()
-{
-    const QString other = "other.txt"_s;
-    writeBroken();
-    loadEverything();
-    QCOMPARE(takeMessages().size(), 1);
-    // Any new or removed entry is a change of the directory.
-    Files::write(inDirectory(other), "x");
-    TRY(!messages().isEmpty());
-    waitForNothing();
-    takeMessages();
-    rewrite(other, "more");
-    waitForNothing();
-    QCOMPARE(takeMessages(), QStringList());
-    Files::remove(inDirectory(other));
-    TRY(!messages().isEmpty());
-    waitForNothing();
-    takeMessages();
-}
-
 void ListModelTest::choices_data()
 {
     QTest::addColumn<QString>("before");

@@ -29,7 +29,6 @@ private Q_SLOTS:
     // Following the directory
     void followsTheDirectory();
     void readsWrittenFilesOnceTheyAreClosed();
-    void otherFiles();
 
     // The user's choices
     void choices_data();

@@ -72,8 +72,8 @@ QVariantList shown(const QAbstractListModel &model, int row)
 
 } // namespace
 
-RandomModelTest::RandomModelTest(QString directory, QString key)
-    : m_directory(std::move(directory)), m_key(std::move(key))
+RandomModelTest::RandomModelTest(QString directory, QString key, QByteArray kind)
+    : m_directory(std::move(directory)), m_key(std::move(key)), m_kind(std::move(kind))
 {
 }
 
@@ -142,6 +142,19 @@ QString RandomModelTest::difference()
     naive->events.clear();
     naive->warnings.clear();
     return differences.join(QLatin1Char('\n'));
+}
+
+QString RandomModelTest::choose(const QByteArray &verb, const QString &path)
+{
+    QStringList list = naive()->enabledList;
+    if (verb == "enable") {
+        list.append(path);
+    } else {
+        list.removeAll(path);
+    }
+    m_stored = list;
+    QMetaObject::invokeMethod(model(), verb + m_kind, Q_ARG(QString, path));
+    return QString::fromLatin1(verb) + " "_s + path;
 }
 
 QString RandomModelTest::store(const QStringList &list)

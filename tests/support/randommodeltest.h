@@ -93,14 +93,15 @@ private Q_SLOTS:
     void steps();
 
 protected:
-    // The directory of the definition files and the dconf key of the user's list.
-    RandomModelTest(QString directory, QString key);
+    // The directory of the definition files, the dconf key of the user's list, and what
+    // enable...() and disable...() take.
+    RandomModelTest(QString directory, QString key, QByteArray kind);
 
     // Restores all settings and files except the directory and the key.
     virtual void reset() { }
     virtual void makeModels() = 0;
     virtual void removeModels() = 0;
-    virtual const QAbstractListModel *model() const = 0;
+    virtual QAbstractListModel *model() const = 0;
     virtual NaiveModel *naive() const = 0;
     // Takes one random step and returns its description.
     virtual QString step() = 0;
@@ -108,6 +109,7 @@ protected:
     virtual QString difference();
 
     // Steps that change the user's list.
+    QString choose(const QByteArray &verb, const QString &path);
     QString store(const QStringList &list);
     QString storeNothing();
     QString storeInAnotherProcess(const QStringList &list);
@@ -126,6 +128,7 @@ protected:
 
     const QString m_directory;
     const QString m_key;
+    const QByteArray m_kind;
     QRandomGenerator m_random;
     std::unique_ptr<RowEvents> m_events;
     QVariant m_stored; // what the key should hold

@@ -7,10 +7,12 @@
 #include <QSemaphore>
 #include <QSet>
 #include <QTimer>
+
 #include <array>
 #include <chrono>
 #include <cstdlib>
-#include <cstring>
+#include <utility>
+
 #include <dconf.h>
 
 Q_LOGGING_CATEGORY(lcPlatformLog, "org.tarnwickos.settings.platform", QtWarningMsg)
@@ -40,31 +42,6 @@ void flushWrites()
         g_thread_unref(thread);
         done->tryAcquire(1, int(exitTimeout.count()));
     }
-}
-
-bool sameData(GVariant *one, GVariant *other)
-{
-    if (!one || !other) {
-        return !one && !other;
-    }
-    const gsize size = g_variant_get_size(one);
-    return g_variant_type_equal(g_variant_get_type(one), g_variant_get_type(other))
-        && size == g_variant_get_size(other)
-        && (size == 0
-            || std::memcmp(g_variant_get_data(one), g_variant_get_data(other), size) == 0);
-}
-
-// dconf_client_read() opens the database before it searches the queue of writes. A write that
-// completes in between is in neither, and the read returns the previous value. This cannot happen
-// again until this thread writes the key: if the first two reads differ, the third one is right.
-GVariantPtr readStored(const QByteArray &path)
-{
-    const auto readOnce = [&path] {
-        return GVariantPtr(dconf_client_read(dconfClient(), path.constData()));
-    };
-    GVariantPtr first = readOnce();
-    const GVariantPtr second = readOnce();
-    return sameData(first.get(), second.get()) ? std::move(first) : readOnce();
 }
 
 void busReceived(GObject *, GAsyncResult *result, gpointer)
@@ -111,10 +88,26 @@ void checkDconfOnce()
     }
 }
 
+// dconf_client_read() opens the database before it searches the queue of writes. A write that
+// completes in between is in neither, and the read returns the previous value. This cannot happen
+// again until this thread writes the key: if the first two reads differ, the third one is right.
 GVariantPtr readDconf(const QByteArray &path)
 {
-    const GVariantPtr stored = readStored(path);
-    return stored ? verified(stored.get()) : nullptr;
+    const auto readOnce = [&path] {
+        return GVariantPtr(dconf_client_read(dconfClient(), path.constData()));
+    };
+    GVariantPtr first = readOnce();
+    return dataOf(first.get()) == dataOf(readOnce().get()) ? std::move(first) : readOnce();
+}
+
+QByteArray dataOf(GVariant *value)
+{
+    if (value == nullptr) {
+        return {};
+    }
+    return g_variant_get_type_string(value) + QByteArray(1, '\0')
+        + QByteArray(static_cast<const char *>(g_variant_get_data(value)),
+                     int(g_variant_get_size(value)));
 }
 
 void writeDconf(const QByteArray &path, GVariant *value)
@@ -127,7 +120,7 @@ void writeDconf(const QByteArray &path, GVariant *value)
         return;
     }
     // dconf reports the change itself, unless it reads an outdated value, as described at
-    // readStored(), and that equals the new one. Items that know the value ignore this signal.
+    // readDconf(), and that equals the new one. Items that know the value ignore this signal.
     const std::array<const char *, 2> changes = {"", nullptr};
     g_signal_emit_by_name(dconfClient(), "changed", path.constData(), changes.data(), "");
 }

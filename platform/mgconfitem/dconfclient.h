@@ -21,8 +21,11 @@ DConfClient *dconfClient();
 // settings.
 void checkDconfOnce();
 
-// Null if no value is stored, or if the stored value is damaged.
+// Null if no value is stored. The value may be damaged.
 GVariantPtr readDconf(const QByteArray &path);
+
+// The type and the data of a value, by which it can be compared; null without a value.
+QByteArray dataOf(GVariant *value);
 
 // Announces the change before it returns; null unsets the key.
 void writeDconf(const QByteArray &path, GVariant *value);

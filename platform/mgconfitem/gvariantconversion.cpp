@@ -3,9 +3,11 @@
 
 #include "gvariantconversion.h"
 
-#include <QByteArray>
 #include <QString>
 #include <QStringList>
+
+#include <algorithm>
+
 #include <glib.h>
 
 namespace {
@@ -15,142 +17,106 @@ GVariantPtr sink(GVariant *floating)
     return GVariantPtr(g_variant_ref_sink(floating));
 }
 
-bool isUnicodeWithoutNul(const QString &text)
-{
-    return text.isValidUtf16() && !text.contains(QChar::Null);
-}
-
-GVariantPtr refuseText(QString *reason)
-{
-    *reason = QStringLiteral("text of type QString with a NUL or half a surrogate pair");
-    return nullptr;
-}
-
-GVariantPtr convertText(const QString &text, QString *reason)
-{
-    if (!isUnicodeWithoutNul(text)) {
-        return refuseText(reason);
-    }
-    return sink(g_variant_new_string(text.toUtf8().constData()));
-}
-
-GVariantPtr convertStringList(const QStringList &list, QString *reason)
-{
-    GVariantBuilder builder;
-    g_variant_builder_init(&builder, G_VARIANT_TYPE_STRING_ARRAY);
-    for (const QString &text : list) {
-        if (!isUnicodeWithoutNul(text)) {
-            g_variant_builder_clear(&builder);
-            return refuseText(reason);
-        }
-        g_variant_builder_add(&builder, "s", text.toUtf8().constData());
-    }
-    return sink(g_variant_builder_end(&builder));
-}
-
-GVariantPtr convertPlain(const QVariant &value, QString *reason)
+// Why dconf does not get a value; empty if it does.
+QString whyRefused(const QVariant &value)
 {
     switch (value.userType()) {
     case QMetaType::Bool:
-        return sink(g_variant_new_boolean(value.toBool() ? TRUE : FALSE));
     case QMetaType::Int:
-        return sink(g_variant_new_int32(value.toInt()));
-    case QMetaType::UInt:
-        return sink(g_variant_new_uint32(value.toUInt()));
-    case QMetaType::LongLong:
-        return sink(g_variant_new_int64(value.toLongLong()));
-    case QMetaType::ULongLong:
-        return sink(g_variant_new_uint64(value.toULongLong()));
+        return {};
     case QMetaType::QString:
-        return convertText(value.toString(), reason);
     case QMetaType::QStringList:
-        return convertStringList(value.toStringList(), reason);
+        break;
     default:
-        *reason = value.isValid()
+        return value.isValid()
             ? QStringLiteral("a value of type %1").arg(QLatin1String(value.typeName()))
             : QStringLiteral("an invalid QVariant");
-        return nullptr;
     }
+    const QStringList texts = value.toStringList();
+    const bool areUnicode = std::all_of(texts.cbegin(), texts.cend(), [](const QString &text) {
+        return text.isValidUtf16() && !text.contains(QChar::Null);
+    });
+    return areUnicode ? QString()
+                      : QStringLiteral("text of type QString with a NUL or half a surrogate pair");
 }
 
-GVariantPtr convertMap(const QVariantMap &map, QString *reason)
+GVariant *newValue(const QVariant &value)
+{
+    switch (value.userType()) {
+    case QMetaType::Bool:
+        return g_variant_new_boolean(value.toBool() ? TRUE : FALSE);
+    case QMetaType::Int:
+        return g_variant_new_int32(value.toInt());
+    case QMetaType::QString:
+        return g_variant_new_string(value.toString().toUtf8().constData());
+    default:
+        break;
+    }
+    GVariantBuilder builder;
+    g_variant_builder_init(&builder, G_VARIANT_TYPE_STRING_ARRAY);
+    const QStringList list = value.toStringList();
+    for (const QString &text : list) {
+        g_variant_builder_add(&builder, "s", text.toUtf8().constData());
+    }
+    return g_variant_builder_end(&builder);
+}
+
+GVariant *newMap(const QVariantMap &map)
 {
     GVariantBuilder builder;
     g_variant_builder_init(&builder, G_VARIANT_TYPE_VARDICT);
     for (auto it = map.cbegin(); it != map.cend(); ++it) {
-        const GVariantPtr converted =
-            isUnicodeWithoutNul(it.key()) ? convertPlain(it.value(), reason) : refuseText(reason);
-        if (converted == nullptr) {
-            g_variant_builder_clear(&builder);
-            return nullptr;
-        }
-        g_variant_builder_add(&builder, "{sv}", it.key().toUtf8().constData(), converted.get());
+        g_variant_builder_add(&builder, "{sv}", it.key().toUtf8().constData(),
+                              newValue(it.value()));
     }
-    return sink(g_variant_builder_end(&builder));
+    return g_variant_builder_end(&builder);
 }
 
 QVariant convert(GVariant *value);
 
-QString toText(GVariant *value)
+QString toText(const char *utf8)
 {
-    gsize length = 0;
-    const char *const utf8 = g_variant_get_string(value, &length);
-    const QString text = QString::fromUtf8(utf8, int(length));
-    // QString takes U+FEFF at the start for a byte order mark and drops it.
-    const bool marked = QByteArray::fromRawData(utf8, int(length)).startsWith("\xEF\xBB\xBF");
-    return marked ? QChar(QChar::ByteOrderMark) + text : text;
-}
-
-GVariantPtr childAt(GVariant *container, gsize index)
-{
-    return GVariantPtr(g_variant_get_child_value(container, index));
-}
-
-QVariantList toList(GVariant *container)
-{
-    const gsize count = g_variant_n_children(container);
-    QVariantList list;
-    list.reserve(int(count));
-    for (gsize i = 0; i < count; ++i) {
-        list.append(convert(childAt(container, i).get()));
-    }
-    return list;
+    // fromUtf8() drops a byte-order mark at the start, which may be the text's own.
+    return QString::fromUtf8(QByteArray("\xEF\xBB\xBF") + utf8);
 }
 
 QStringList toStringList(GVariant *array)
 {
-    const gsize count = g_variant_n_children(array);
     QStringList list;
-    list.reserve(int(count));
-    for (gsize i = 0; i < count; ++i) {
-        list.append(toText(childAt(array, i).get()));
+    GVariantIter texts;
+    g_variant_iter_init(&texts, array);
+    const char *text = nullptr;
+    while (g_variant_iter_next(&texts, "&s", &text)) {
+        list.append(toText(text));
     }
     return list;
 }
 
 QVariantMap toMap(GVariant *dictionary)
 {
-    const gsize count = g_variant_n_children(dictionary);
     QVariantMap map;
-    for (gsize i = 0; i < count; ++i) {
-        const GVariantPtr entry = childAt(dictionary, i);
-        const QString key = toText(childAt(entry.get(), 0).get());
+    GVariantIter entries;
+    g_variant_iter_init(&entries, dictionary);
+    const char *utf8 = nullptr;
+    GVariant *value = nullptr;
+    while (g_variant_iter_loop(&entries, "{&s@*}", &utf8, &value)) {
+        const QString key = toText(utf8);
         if (!map.contains(key)) { // the first of equal keys counts, as in GLib's own look-up
-            map.insert(key, convert(childAt(entry.get(), 1).get()));
+            map.insert(key, convert(value));
         }
     }
     return map;
 }
 
-QVariant convertContainer(GVariant *container)
+QVariantList toList(GVariant *container)
 {
-    if (g_variant_is_of_type(container, G_VARIANT_TYPE_STRING_ARRAY)) {
-        return toStringList(container);
+    QVariantList list;
+    GVariantIter elements;
+    g_variant_iter_init(&elements, container);
+    while (const GVariantPtr element{g_variant_iter_next_value(&elements)}) {
+        list.append(convert(element.get()));
     }
-    if (g_variant_is_of_type(container, G_VARIANT_TYPE("a{s*}"))) {
-        return toMap(container);
-    }
-    return toList(container);
+    return list;
 }
 
 QVariant convert(GVariant *value)
@@ -158,29 +124,35 @@ QVariant convert(GVariant *value)
     switch (g_variant_classify(value)) {
     case G_VARIANT_CLASS_BOOLEAN:
         return g_variant_get_boolean(value) != FALSE;
-    case G_VARIANT_CLASS_BYTE:
-        return int(g_variant_get_byte(value));
-    case G_VARIANT_CLASS_INT16:
-        return int(g_variant_get_int16(value));
-    case G_VARIANT_CLASS_UINT16:
-        return uint(g_variant_get_uint16(value));
     case G_VARIANT_CLASS_INT32:
         return g_variant_get_int32(value);
-    case G_VARIANT_CLASS_UINT32:
-        return g_variant_get_uint32(value);
-    case G_VARIANT_CLASS_INT64:
-        return qlonglong(g_variant_get_int64(value));
-    case G_VARIANT_CLASS_UINT64:
-        return qulonglong(g_variant_get_uint64(value));
-    case G_VARIANT_CLASS_DOUBLE:
-        return g_variant_get_double(value);
     case G_VARIANT_CLASS_STRING:
-        return toText(value);
+        return toText(g_variant_get_string(value, nullptr));
     case G_VARIANT_CLASS_VARIANT:
-        return convert(childAt(value, 0).get());
+        return convert(GVariantPtr(g_variant_get_variant(value)).get());
     default:
-        return g_variant_is_container(value) ? convertContainer(value) : QVariantList();
+        break;
     }
+    if (g_variant_is_of_type(value, G_VARIANT_TYPE_STRING_ARRAY)) {
+        return toStringList(value);
+    }
+    if (g_variant_is_of_type(value, G_VARIANT_TYPE("a{s*}"))) {
+        return toMap(value);
+    }
+    return g_variant_is_container(value) ? toList(value) : QVariantList();
+}
+
+// The same value, marked as trusted; null if it is damaged. GLib needs half a minute to read a list
+// of 100,000 elements that is not marked.
+GVariantPtr verified(GVariant *value)
+{
+    if (!g_variant_is_normal_form(value)) {
+        return nullptr;
+    }
+    GBytes *const data = g_variant_get_data_as_bytes(value);
+    GVariantPtr same = sink(g_variant_new_from_bytes(g_variant_get_type(value), data, TRUE));
+    g_bytes_unref(data);
+    return same;
 }
 
 } // namespace
@@ -192,8 +164,18 @@ void GVariantUnref::operator()(GVariant *value) const
 
 GVariantPtr toGVariant(const QVariant &value, QString *reason)
 {
-    return value.userType() == QMetaType::QVariantMap ? convertMap(value.toMap(), reason)
-                                                      : convertPlain(value, reason);
+    if (value.userType() != QMetaType::QVariantMap) {
+        *reason = whyRefused(value);
+        return reason->isEmpty() ? sink(newValue(value)) : nullptr;
+    }
+    const QVariantMap map = value.toMap();
+    *reason = whyRefused(QStringList(map.keys()));
+    for (const QVariant &each : map) {
+        if (reason->isEmpty()) {
+            *reason = whyRefused(each);
+        }
+    }
+    return reason->isEmpty() ? sink(newMap(map)) : nullptr;
 }
 
 QVariant toQVariant(GVariant *value)
@@ -202,15 +184,4 @@ QVariant toQVariant(GVariant *value)
     // its parts do not overlap, so that it cannot unfold into more than was stored.
     const GVariantPtr normal = verified(value);
     return normal != nullptr ? convert(normal.get()) : QVariant();
-}
-
-GVariantPtr verified(GVariant *value)
-{
-    if (!g_variant_is_normal_form(value)) {
-        return nullptr;
-    }
-    GBytes *const data = g_variant_get_data_as_bytes(value);
-    GVariantPtr same = sink(g_variant_new_from_bytes(g_variant_get_type(value), data, TRUE));
-    g_bytes_unref(data);
-    return same;
 }

@@ -5,22 +5,9 @@
 
 #include "dconfclient.h"
 
+#include <utility>
+
 #include <dconf.h>
-
-namespace {
-
-// The type and the data of a value, by which it can be compared; null without a value.
-QByteArray dataOf(GVariant *value)
-{
-    if (value == nullptr) {
-        return {};
-    }
-    return g_variant_get_type_string(value) + QByteArray(1, '\0')
-        + QByteArray(static_cast<const char *>(g_variant_get_data(value)),
-                     int(g_variant_get_size(value)));
-}
-
-} // namespace
 
 MGConfItem::MGConfItem(const QString &key, QObject *parent) : QObject(parent), m_key(key)
 {

@@ -78,9 +78,6 @@ void TestGVariantConversion::bothWays_data()
     row("true", true, "true");
     row("false", false, "false");
     row("int", std::numeric_limits<int>::min(), "-2147483648");
-    row("uint", std::numeric_limits<uint>::max(), "uint32 4294967295");
-    row("qlonglong", std::numeric_limits<qlonglong>::min(), "int64 -9223372036854775808");
-    row("qulonglong", std::numeric_limits<qulonglong>::max(), "uint64 18446744073709551615");
     row("string", text, "'text'");
     row("empty string", QString(), "''");
     row("beyond Latin", "Ünïcödé 日本 😀"_s, "'Ünïcödé 日本 😀'");
@@ -125,6 +122,8 @@ void TestGVariantConversion::refusesOtherTypes_data()
     row("null pointer", QVariant::fromValue(nullptr), "a value of type std::nullptr_t");
     row("object", QVariant::fromValue<QObject *>(this), "a value of type QObject*");
     row("double", 0.5, "a value of type double");
+    row("uint", 1U, "a value of type uint");
+    row("qlonglong", qlonglong(1), "a value of type qlonglong");
     row("list", QVariantList{1}, "a value of type QVariantList");
     row("hash", QVariantHash(), "a value of type QVariantHash");
     row("map in a map", QVariantMap{{key, QVariantMap()}}, "a value of type QVariantMap");
@@ -183,10 +182,6 @@ void TestGVariantConversion::readsForeignTypes_data()
     const QString a = "a"_s;
     const QString b = "b"_s;
     const QVariantList nothing;
-    row("byte 0xff", 255);
-    row("int16 -5", -5);
-    row("uint16 65535", 65535U);
-    row("1.5", 1.5);
     row("<<<'a'>>>", a);
     row("[<'a'>, <1>]", QVariantList{a, 1});
     row("[1, 2]", QVariantList{1, 2});
@@ -198,11 +193,15 @@ void TestGVariantConversion::readsForeignTypes_data()
     row("@a{ss} {}", QVariantMap());
     // If a key occurs twice, the first value is used.
     row("{'a': 1, 'b': 2, 'a': 3}", QVariantMap{{a, 1}, {b, 2}});
-    // Types that the module never stores are converted, too.
+    // Types that the module never stores.
+    row("byte 0xff", nothing);
+    row("uint32 1", nothing);
+    row("int64 1", nothing);
+    row("1.5", nothing);
     row("handle 3", nothing);
     row("objectpath '/a/b'", nothing);
     row("signature 'a{sv}'", nothing);
-    row("b'a'", QVariantList{97, 0});
+    row("b'a'", QVariantList{nothing, nothing});
     row("{1: 'a'}", QVariantList{QVariantList{1, a}});
     row("@ms nothing", nothing);
     row("@ms 'a'", QVariantList{a});

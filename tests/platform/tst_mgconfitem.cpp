@@ -405,10 +405,11 @@ void TestMGConfItem::equalValueEmitsNothing()
 void TestMGConfItem::anotherTypeIsAnotherValue()
 {
     Item item(newKey());
-    item.set(1);
-    item.set(1U);
+    // In dconf, both are a zero byte.
+    item.set(QString());
+    item.set(false);
     QCOMPARE(item.changes(), 2);
-    QCOMPARE(describe(item.value()), describe(1U));
+    QCOMPARE(describe(item.value()), describe(false));
     item.set(QVariantMap());
     item.set(QStringList());
     QCOMPARE(item.changes(), 4);
@@ -641,7 +642,7 @@ void TestMGConfItem::sharesValuesWithOthers_data()
         QTest::newRow(printed) << value << isStored;
     };
     row("true", true);
-    row("uint32 5", 5U);
+    row("5", 5);
     row("@as []", QStringList());
     row("{'tëxt': <['tëxt']>}", QVariantMap{{"tëxt"_s, QStringList{"tëxt"_s}}});
     // These are read, but never stored.

@@ -7,8 +7,6 @@
 #include <QLocale>
 #include <QtDebug>
 
-#include <functional>
-
 namespace {
 
 // A role of a model, and the chain of properties to read from each of its values.
@@ -48,26 +46,6 @@ private:
     int m_role = noRole;
     QVector<QByteArray> m_properties;
 };
-
-// Calls the function for every object in a value, also within its lists and maps.
-void forEachObject(QVariant *value, const std::function<void(QObject *, QVariant *)> &function)
-{
-    if (value->userType() == QMetaType::QVariantList) {
-        QVariantList list = value->toList();
-        for (QVariant &element : list) {
-            forEachObject(&element, function);
-        }
-        *value = list;
-    } else if (value->userType() == QMetaType::QVariantMap) {
-        QVariantMap map = value->toMap();
-        for (QVariant &element : map) {
-            forEachObject(&element, function);
-        }
-        *value = map;
-    } else if (auto *object = value->value<QObject *>()) {
-        function(object, value);
-    }
-}
 
 } // namespace
 
@@ -212,16 +190,12 @@ void TitlesView::setMatchRole(const QString &matchRole)
 void TitlesView::setMatch(const QVariant &match)
 {
     // A QML array arrives as a QJSValue, which never compares equal.
-    QVariant plain =
+    const QVariant plain =
         match.userType() == qMetaTypeId<QJSValue>() ? match.value<QJSValue>().toVariant() : match;
     if (m_match == plain) {
         return;
     }
-    forEachObject(&plain, [this](QObject *object, QVariant *) {
-        connect(object, &QObject::destroyed, this, &TitlesView::matchDestroyed,
-                Qt::UniqueConnection);
-    });
-    m_match = plain;
+    m_match = watched(plain, nullptr);
     Q_EMIT matchChanged();
     update();
 }
@@ -335,15 +309,34 @@ void TitlesView::modelDestroyed()
 
 void TitlesView::matchDestroyed(QObject *object)
 {
-    bool isHeld = false; // It may belong to an earlier value.
-    forEachObject(&m_match, [object, &isHeld](QObject *held, QVariant *value) {
-        if (held == object) {
-            *value = QVariant::fromValue<QObject *>(nullptr);
-            isHeld = true;
+    setMatch(watched(m_match, object));
+}
+
+// Returns the value with null in place of the destroyed object, also in its lists and maps, and
+// connects to all other objects.
+QVariant TitlesView::watched(const QVariant &value, const QObject *destroyed)
+{
+    if (value.userType() == QMetaType::QVariantList) {
+        QVariantList list = value.toList();
+        for (QVariant &element : list) {
+            element = watched(element, destroyed);
         }
-    });
-    if (isHeld) {
-        Q_EMIT matchChanged();
-        update();
+        return list;
     }
+    if (value.userType() == QMetaType::QVariantMap) {
+        QVariantMap map = value.toMap();
+        for (QVariant &element : map) {
+            element = watched(element, destroyed);
+        }
+        return map;
+    }
+    auto *const object = value.value<QObject *>();
+    if (object == nullptr) {
+        return value;
+    }
+    if (object == destroyed) {
+        return QVariant::fromValue<QObject *>(nullptr);
+    }
+    connect(object, &QObject::destroyed, this, &TitlesView::matchDestroyed, Qt::UniqueConnection);
+    return value;
 }

@@ -55,6 +55,7 @@ private:
     bool matches(const QVariant &value) const;
     void modelDestroyed();
     void matchDestroyed(QObject *object);
+    QVariant watched(const QVariant &value, const QObject *destroyed);
 
     QPointer<QAbstractListModel> m_model;
     std::array<QMetaObject::Connection, 5> m_connections;

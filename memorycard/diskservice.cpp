@@ -3,10 +3,9 @@
 
 #include "diskservice.h"
 
-#include "files/literals.h"
-
 #include <QDBusConnection>
 #include <QDBusError>
+#include <QDBusMessage>
 #include <QMetaEnum>
 #include <QVariantMap>
 
@@ -17,8 +16,6 @@ namespace {
 constexpr QLatin1String service = "org.freedesktop.UDisks2"_L1;
 constexpr QLatin1String objectPath = "/org/freedesktop/UDisks2/block_devices/%1"_L1;
 constexpr QLatin1String interface = "org.freedesktop.UDisks2.Filesystem"_L1;
-constexpr QLatin1String mountMethod = "Mount"_L1;
-constexpr QLatin1String unmountMethod = "Unmount"_L1;
 constexpr QLatin1String fileSystemTypeOption = "fstype"_L1;
 
 // The service writes out all cached data before it replies, which takes long on a slow card.
@@ -28,29 +25,9 @@ constexpr std::chrono::milliseconds requestTimeout = std::chrono::minutes(5);
 constexpr QLatin1String errorPrefix = "org.freedesktop.UDisks2.Error."_L1;
 constexpr const char *keyPrefix = "Error";
 
-QDBusMessage createCall(const QString &deviceName, QLatin1String method, const QString &option)
-{
-    QDBusMessage call = QDBusMessage::createMethodCall(service, QString(objectPath).arg(deviceName),
-                                                       interface, method);
-    call.setArguments({QVariantMap{{option, QString()}}});
-    return call;
-}
-
 } // namespace
 
-QDBusMessage DiskService::mountCall(const QString &deviceName)
-{
-    // With an empty type the service detects the file system itself.
-    return createCall(deviceName, mountMethod, fileSystemTypeOption);
-}
-
-QDBusMessage DiskService::unmountCall(const QString &deviceName)
-{
-    // The option with an empty name is intended. The service ignores it.
-    return createCall(deviceName, unmountMethod, QString());
-}
-
-QDBusPendingCall DiskService::send(const QDBusMessage &call)
+QDBusPendingCall DiskService::call(QLatin1String method, const QString &deviceName)
 {
     const QDBusConnection bus = QDBusConnection::systemBus();
     if (!bus.isConnected()) {
@@ -58,7 +35,13 @@ QDBusPendingCall DiskService::send(const QDBusMessage &call)
         return QDBusPendingCall::fromError(
             {QDBusError::Disconnected, QStringLiteral("Not connected to the system bus")});
     }
-    return bus.asyncCall(call, int(requestTimeout.count()));
+    QDBusMessage message = QDBusMessage::createMethodCall(
+        service, QString(objectPath).arg(deviceName), interface, method);
+    // With an empty type the service detects the file system itself. To unmount, the option with an
+    // empty name is intended: the service ignores it.
+    const QString option = method == mountMethod ? fileSystemTypeOption : QString();
+    message.setArguments({QVariantMap{{option, QString()}}});
+    return bus.asyncCall(message, int(requestTimeout.count()));
 }
 
 std::optional<MemoryCardFormatter::MountError> DiskService::errorCode(const QString &errorName)

@@ -4,22 +4,23 @@
 #ifndef DISKSERVICE_H
 #define DISKSERVICE_H
 
+#include "files/literals.h"
 #include "memorycardformatter.h"
 
-#include <QDBusMessage>
 #include <QDBusPendingCall>
+#include <QString>
 
 #include <optional>
 
 // The calls to the disk service, UDisks2 on the system bus, and the errors that it replies with.
 namespace DiskService {
 
-// The calls that mount and unmount a block device, given by its kernel name.
-QDBusMessage mountCall(const QString &deviceName);
-QDBusMessage unmountCall(const QString &deviceName);
+constexpr QLatin1String mountMethod = "Mount"_L1;
+constexpr QLatin1String unmountMethod = "Unmount"_L1;
 
-// Sends a call without waiting. There is always a reply: without a system bus, it is an error.
-QDBusPendingCall send(const QDBusMessage &call);
+// Calls one of the methods for a block device, given by its kernel name, without waiting. There is
+// always a reply: without a system bus, it is an error.
+QDBusPendingCall call(QLatin1String method, const QString &deviceName);
 
 // Nothing for an error that is not the disk service's own.
 std::optional<MemoryCardFormatter::MountError> errorCode(const QString &errorName);

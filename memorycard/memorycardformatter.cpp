@@ -8,13 +8,13 @@
 #include "files/literals.h"
 
 #include <QDBusError>
-#include <QDBusPendingCall>
 #include <QDBusPendingCallWatcher>
 #include <QFileInfo>
 #include <QLoggingCategory>
 #include <QPointer>
 
 #include <algorithm>
+#include <array>
 #include <memory>
 #include <utility>
 
@@ -22,14 +22,16 @@ namespace {
 
 Q_LOGGING_CATEGORY(lcMemoryCardLog, "org.tarnwickos.settings.memorycard", QtWarningMsg)
 
-constexpr QLatin1String helperFormatVfat = "format_vfat"_L1;
-constexpr QLatin1String helperFormatExt4 = "format_ext4"_L1;
-constexpr QLatin1String helperProbe = "probe"_L1;
-
-constexpr QLatin1String vfat = "vfat"_L1;
-constexpr QLatin1String ext4 = "ext4"_L1;
-constexpr QLatin1String mkfsVfat = "/sbin/mkfs.vfat"_L1;
-constexpr QLatin1String mkfsExt4 = "/sbin/mkfs.ext4"_L1;
+struct FormatType {
+    QLatin1String name;
+    QLatin1String mkfs;
+    QLatin1String helperCommand;
+};
+constexpr std::array formatTypes = {
+    FormatType{"vfat"_L1, "/sbin/mkfs.vfat"_L1, "format_vfat"_L1},
+    FormatType{"ext4"_L1, "/sbin/mkfs.ext4"_L1, "format_ext4"_L1},
+};
+constexpr QLatin1String probeCommand = "probe"_L1;
 
 } // namespace
 
@@ -196,8 +198,8 @@ void MemoryCardFormatter::setDevicePath(const QString &path)
     const QPointer<MemoryCardFormatter> self(this);
     Q_EMIT devicePathChanged();
     if (self) {
-        enqueue({Command::Probe});
-        startIfNothingRuns();
+        m_steps.enqueue({Command::Probe, path, {}});
+        doNextCommand();
     }
 }
 
@@ -220,11 +222,10 @@ void MemoryCardFormatter::setDevicePath(const QString &path)
 QStringList MemoryCardFormatter::supportedFormatTypes() const
 {
     QStringList types;
-    if (QFileInfo(mkfsVfat).isExecutable()) {
-        types.append(vfat);
-    }
-    if (QFileInfo(mkfsExt4).isExecutable()) {
-        types.append(ext4);
+    for (const FormatType &type : formatTypes) {
+        if (QFileInfo(type.mkfs).isExecutable()) {
+            types.append(type.name);
+        }
     }
     return types;
 }
@@ -249,14 +250,12 @@ QStringList MemoryCardFormatter::supportedFormatTypes() const
 */
 void MemoryCardFormatter::format(const QString &type)
 {
-    if (busy()) {
-        warnThatBusy("format() called");
-    } else if (m_devicePath.isEmpty()) {
+    if (!busy() && m_devicePath.isEmpty()) {
         failWithout("devicePath");
-    } else if (type.isEmpty()) {
+    } else if (!busy() && type.isEmpty()) {
         failWithout("type");
     } else {
-        startSequence({Command::Unmount, Command::Format, Command::Mount}, type);
+        startSequence("format() called", {Command::Unmount, Command::Format, Command::Mount}, type);
     }
 }
 
@@ -271,12 +270,10 @@ void MemoryCardFormatter::format(const QString &type)
 */
 void MemoryCardFormatter::removeAllFiles()
 {
-    if (busy()) {
-        warnThatBusy("removeAllFiles() called");
-    } else if (m_devicePath.isEmpty()) {
+    if (!busy() && m_devicePath.isEmpty()) {
         failWithout("devicePath");
     } else {
-        startSequence({Command::Mount, Command::RemoveFiles});
+        startSequence("removeAllFiles() called", {Command::Mount, Command::RemoveFiles});
     }
 }
 
@@ -288,20 +285,12 @@ void MemoryCardFormatter::removeAllFiles()
 */
 void MemoryCardFormatter::mount()
 {
-    if (busy()) {
-        warnThatBusy("mount() called");
-    } else {
-        startSequence({Command::Mount});
-    }
+    startSequence("mount() called", {Command::Mount});
 }
 
 void MemoryCardFormatter::unmount()
 {
-    if (busy()) {
-        warnThatBusy("unmount() called");
-    } else {
-        startSequence({Command::Unmount});
-    }
+    startSequence("unmount() called", {Command::Unmount});
 }
 
 /*!
@@ -346,41 +335,21 @@ void MemoryCardFormatter::unmount()
     of \a error are those of mountError().
 */
 
-void MemoryCardFormatter::commandError(QProcess::ProcessError /*error*/)
-{
-    fail();
-}
-
 void MemoryCardFormatter::commandFinished(int code, QProcess::ExitStatus status)
 {
     const QPointer<MemoryCardFormatter> self(this);
     if (m_running == Command::Probe && status == QProcess::NormalExit) {
         // As a C string: a NUL ends the type.
-        const QByteArray output = m_helper.takeOutput().trimmed();
-        const QString filesystemType = QString::fromLatin1(output.constData());
-        if (m_filesystemType != filesystemType) {
-            m_filesystemType = filesystemType;
+        const QString type = QString::fromLatin1(m_helper.takeOutput().trimmed().constData());
+        if (std::exchange(m_filesystemType, type) != type) {
             Q_EMIT filesystemTypeChanged();
         }
     }
-    if (!self) {
-        return;
-    }
-    if (code != 0 || status != QProcess::NormalExit) {
-        fail();
-    } else {
+    if (self && status == QProcess::NormalExit && code == 0) {
         finishCommand();
+    } else if (self) {
+        fail();
     }
-}
-
-void MemoryCardFormatter::fileRemoverFinished()
-{
-    finishCommand();
-}
-
-void MemoryCardFormatter::fileRemoverError()
-{
-    fail();
 }
 
 void MemoryCardFormatter::warnThatBusy(const char *request) const
@@ -409,35 +378,30 @@ void MemoryCardFormatter::setStatus(Status status)
     }
 }
 
-void MemoryCardFormatter::enqueue(std::initializer_list<Command> commands,
-                                  const QString &formatType)
+void MemoryCardFormatter::startSequence(const char *request,
+                                        std::initializer_list<Command> commands,
+                                        const QString &formatType)
 {
+    if (busy()) {
+        warnThatBusy(request);
+        return;
+    }
     for (const Command command : commands) {
         m_steps.enqueue({command, m_devicePath, formatType});
     }
-}
-
-void MemoryCardFormatter::startSequence(std::initializer_list<Command> commands,
-                                        const QString &formatType)
-{
-    enqueue(commands, formatType);
     const QPointer<MemoryCardFormatter> self(this);
     // busy has not changed yet, but users rely on the signal.
     Q_EMIT busyChanged();
     if (self) {
-        startIfNothingRuns();
-    }
-}
-
-void MemoryCardFormatter::startIfNothingRuns()
-{
-    if (!m_running) {
         doNextCommand();
     }
 }
 
 void MemoryCardFormatter::doNextCommand()
 {
+    if (m_running) {
+        return;
+    }
     m_startsAfterError = false;
     if (m_steps.isEmpty()) {
         setStatus(Idle);
@@ -450,10 +414,8 @@ void MemoryCardFormatter::doNextCommand()
         startMountOperation(step.command);
         break;
     case Command::Format:
-        startFormatting(step);
-        break;
     case Command::Probe:
-        startProbing(step);
+        startHelper(step);
         break;
     case Command::RemoveFiles:
         startRemovingFiles(step);
@@ -464,28 +426,24 @@ void MemoryCardFormatter::doNextCommand()
     }
 }
 
-void MemoryCardFormatter::startFormatting(const Step &step)
+void MemoryCardFormatter::startHelper(const Step &step)
 {
+    const bool probes = step.command == Command::Probe;
     QStringList arguments;
+    if (probes) {
+        arguments.append(probeCommand);
+    }
     // Any other type has no command word, on purpose: the helper's exit code decides.
-    if (step.formatType == vfat) {
-        arguments.append(helperFormatVfat);
-    } else if (step.formatType == ext4) {
-        arguments.append(helperFormatExt4);
+    for (const FormatType &type : formatTypes) {
+        if (step.formatType == type.name) {
+            arguments.append(type.helperCommand);
+        }
     }
     arguments.append(QFileInfo(step.devicePath).fileName());
     m_running = step.command;
-    if (m_helper.start(HelperProcess::Kind::Formatter, arguments)) {
-        setStatus(Formatting);
-    }
-}
-
-void MemoryCardFormatter::startProbing(const Step &step)
-{
-    const QString partition = QFileInfo(step.devicePath).fileName();
-    m_running = step.command;
-    if (m_helper.start(HelperProcess::Kind::Prober, {helperProbe, partition})) {
-        setStatus(Probing);
+    if (m_helper.start(probes ? HelperProcess::Kind::Prober : HelperProcess::Kind::Formatter,
+                       arguments)) {
+        setStatus(Status(step.command));
     }
 }
 
@@ -500,17 +458,13 @@ void MemoryCardFormatter::startMountOperation(Command command)
         return;
     }
     m_running = command;
-    const QDBusMessage call =
-        mounts ? DiskService::mountCall(m_deviceName) : DiskService::unmountCall(m_deviceName);
-    auto *reply = new QDBusPendingCallWatcher(DiskService::send(call), this);
+    const QLatin1String method = mounts ? DiskService::mountMethod : DiskService::unmountMethod;
+    auto *reply = new QDBusPendingCallWatcher(DiskService::call(method, m_deviceName), this);
     connect(reply, &QDBusPendingCallWatcher::finished, this,
-            [this, method = call.member()](auto *finished) {
-                mountOperationFinished(method, finished);
-            });
+            &MemoryCardFormatter::mountOperationFinished);
 }
 
-void MemoryCardFormatter::mountOperationFinished(const QString &method,
-                                                 QDBusPendingCallWatcher *reply)
+void MemoryCardFormatter::mountOperationFinished(QDBusPendingCallWatcher *reply)
 {
     reply->deleteLater();
     const QPointer<MemoryCardFormatter> self(this);
@@ -522,6 +476,7 @@ void MemoryCardFormatter::mountOperationFinished(const QString &method,
         }
         return;
     }
+    const QString method = mounts ? DiskService::mountMethod : DiskService::unmountMethod;
     const QString name = reply->error().name();
     qCWarning(lcMemoryCardLog) << method << "error:" << name.toLatin1().constData();
     const auto code = DiskService::errorCode(name);

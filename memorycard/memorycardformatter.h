@@ -93,10 +93,10 @@ Q_SIGNALS:
     void unmountError(MountError error); // clazy:exclude=fully-qualified-moc-types
 
 private Q_SLOTS:
-    void commandError(QProcess::ProcessError error);
+    void commandError(QProcess::ProcessError /*error*/) { fail(); }
     void commandFinished(int code, QProcess::ExitStatus status);
-    void fileRemoverFinished();
-    void fileRemoverError();
+    void fileRemoverFinished() { finishCommand(); }
+    void fileRemoverError() { fail(); }
 
 private:
     // Each has the number of the status that it leads to.
@@ -119,15 +119,13 @@ private:
     void warnThatBusy(const char *request) const;
     void failWithout(const char *value);
     void setStatus(Status status);
-    void enqueue(std::initializer_list<Command> commands, const QString &formatType = QString());
-    void startSequence(std::initializer_list<Command> commands,
+    void startSequence(const char *request, std::initializer_list<Command> commands,
                        const QString &formatType = QString());
-    void startIfNothingRuns();
+    // Does nothing while a command runs.
     void doNextCommand();
-    void startFormatting(const Step &step);
-    void startProbing(const Step &step);
+    void startHelper(const Step &step);
     void startMountOperation(Command command);
-    void mountOperationFinished(const QString &method, QDBusPendingCallWatcher *reply);
+    void mountOperationFinished(QDBusPendingCallWatcher *reply);
     void startRemovingFiles(const Step &step);
     void finishCommand();
     void fail();

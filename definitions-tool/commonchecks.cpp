@@ -137,7 +137,7 @@ void checkCatalog(const QString &catalog, int line, CheckContext *context, Findi
         findings->add(line, Severity::Warning, Rule::catalog,
                       QStringLiteral("%1 is not installed in %2: languages without a catalog of "
                                      "their own show identifiers")
-                          .arg(quoted(catalog + suffix + QStringLiteral(".qm")), directory));
+                          .arg(quoted(catalog + suffix + CatalogFiles::suffix), directory));
     }
 }
 

@@ -3,27 +3,20 @@
 
 #include "definitionfiles.h"
 
-#include "files/literals.h"
+#include "eventswidgets/eventswidgetsfile.h"
+#include "quickactions/quickaction.h"
 
 #include <QDir>
 #include <QFileInfo>
 
-namespace {
-
-constexpr auto quickActionSuffix = ".conf"_L1;
-constexpr auto eventsWidgetsSuffix = ".json"_L1;
-
-} // namespace
-
 bool DefinitionFiles::isQuickAction(const QString &path)
 {
-    // Like the models, matches suffixes case-insensitively.
-    return path.endsWith(quickActionSuffix, Qt::CaseInsensitive);
+    return QDir::match(QuickAction::nameFilter, QFileInfo(path).fileName());
 }
 
 bool DefinitionFiles::isEventsWidgets(const QString &path)
 {
-    return path.endsWith(eventsWidgetsSuffix, Qt::CaseInsensitive);
+    return QDir::match(EventsWidgetsFile::nameFilter, QFileInfo(path).fileName());
 }
 
 QStringList DefinitionFiles::inDirectory(const QString &path)

@@ -4,18 +4,12 @@
 #ifndef DEFINITIONFILES_H
 #define DEFINITIONFILES_H
 
-#include "files/literals.h"
-
-#include <QLatin1String>
 #include <QStringList>
 
 /*
     The names of the files that the models read.
 */
 namespace DefinitionFiles {
-
-inline constexpr auto quickActionsDirectory = "/usr/share/glimmera/quickactions"_L1;
-inline constexpr auto eventsWidgetsDirectory = "/usr/share/glimmera/eventswidgets"_L1;
 
 // Whether a model reads files of this name.
 bool isQuickAction(const QString &path);

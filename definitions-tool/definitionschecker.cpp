@@ -4,9 +4,10 @@
 #include "definitionschecker.h"
 
 #include "definitionfiles.h"
+#include "eventswidgets/eventswidgetsfile.h"
 #include "eventswidgetscheck.h"
-#include "files/literals.h"
 #include "quickactioncheck.h"
+#include "quickactions/quickaction.h"
 #include "rules.h"
 
 #include <QDir>
@@ -37,8 +38,9 @@ bool DefinitionsChecker::checkInstalled()
 {
     using namespace DefinitionFiles;
     m_context.isInstalled = true;
-    const bool hasQuickActions = checkInstalledDirectory(quickActionsDirectory, isQuickAction);
-    const bool hasEventsWidgets = checkInstalledDirectory(eventsWidgetsDirectory, isEventsWidgets);
+    const bool hasQuickActions = checkInstalledDirectory(QuickAction::directory, isQuickAction);
+    const bool hasEventsWidgets =
+        checkInstalledDirectory(EventsWidgetsFile::directory, isEventsWidgets);
     return hasQuickActions || hasEventsWidgets;
 }
 
@@ -62,8 +64,7 @@ bool DefinitionsChecker::checkInstalledDirectory(QLatin1String directory,
         findings.add(1, Finding::Severity::Error, Rule::place,
                      QStringLiteral("no model reads the file here; *.conf belongs in %1, *.json in "
                                     "%2, and neither in a directory below")
-                         .arg(DefinitionFiles::quickActionsDirectory,
-                              DefinitionFiles::eventsWidgetsDirectory));
+                         .arg(QuickAction::directory, EventsWidgetsFile::directory));
         addFindings(findings.take());
     }
     return checkDirectory(path);

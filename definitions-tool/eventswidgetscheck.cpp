@@ -5,6 +5,7 @@
 
 #include "commonchecks.h"
 #include "eventswidgets/eventswidgetsfile.h"
+#include "files/characters.h"
 #include "files/literals.h"
 #include "jsonwalker.h"
 #include "rules.h"
@@ -15,7 +16,6 @@
 
 #include <algorithm>
 #include <array>
-#include <cctype>
 #include <optional>
 #include <utility>
 
@@ -23,8 +23,6 @@ using Severity = Finding::Severity;
 using Widget = EventsWidget;
 
 namespace {
-
-constexpr const char *byteOrderMark = "\xef\xbb\xbf";
 
 enum class Type { Text, Integer, Boolean, Array, Any };
 
@@ -304,11 +302,6 @@ int EventsWidgetsCheck::lineOf(int position)
     m_line += int(std::count(m_content.cbegin() + m_counted, m_content.cbegin() + position, '\n'));
     m_counted = position;
     return m_line;
-}
-
-bool isSpace(char character)
-{
-    return std::isspace(static_cast<unsigned char>(character)) != 0;
 }
 
 // Whether a text is a JSON value that QJsonDocument refuses: neither an object nor an array.

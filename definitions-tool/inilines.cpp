@@ -3,16 +3,13 @@
 
 #include "inilines.h"
 
+#include "files/characters.h"
+
 #include <QByteArray>
 
 #include <algorithm>
 
 namespace {
-
-bool isSpace(char character)
-{
-    return character == ' ' || character == '\t' || character == '\r' || character == '\n';
-}
 
 // QString::fromLatin1(text) would stop at the first NUL.
 QString fromLatin1(const QByteArray &text)
@@ -71,7 +68,7 @@ std::vector<NamedIniLine> readIniLines(const QByteArray &text)
             break;
         case IniLine::Kind::Key: {
             const auto before = text.cbegin() + span.start;
-            line.isMarked = text.startsWith(iniByteOrderMark)
+            line.isMarked = text.startsWith(byteOrderMark)
                 && std::none_of(text.cbegin(), before, [](char character) {
                                 return character == '\n' || character == '\r';
                             });

@@ -18,7 +18,7 @@ using Severity = Finding::Severity;
 
 namespace {
 
-constexpr auto suffix = ".qm"_L1;
+using CatalogFiles::suffix;
 
 // All names under which Qt looks for the catalogs of a locale.
 QStringList fileNames(const QLocale &locale)

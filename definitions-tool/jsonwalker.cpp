@@ -3,6 +3,8 @@
 
 #include "jsonwalker.h"
 
+#include "files/characters.h"
+
 #include <QJsonArray>
 #include <QJsonDocument>
 #include <QJsonObject>
@@ -10,11 +12,6 @@
 #include <utility>
 
 namespace {
-
-bool isSpace(char character)
-{
-    return character == ' ' || character == '\t' || character == '\n' || character == '\r';
-}
 
 bool isOpening(char character)
 {

@@ -66,8 +66,8 @@ QString listEventsWidgets()
 QStringList namedCatalogs()
 {
     QSet<QString> catalogs;
-    const QStringList files = DefinitionFiles::inDirectory(DefinitionFiles::quickActionsDirectory)
-        + DefinitionFiles::inDirectory(DefinitionFiles::eventsWidgetsDirectory);
+    const QStringList files = DefinitionFiles::inDirectory(QuickAction::directory)
+        + DefinitionFiles::inDirectory(EventsWidgetsFile::directory);
     for (const QString &file : files) {
         if (DefinitionFiles::isQuickAction(file)) {
             catalogs.insert(QuickAction(file, false).translationCatalog());

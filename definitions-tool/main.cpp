@@ -15,7 +15,6 @@
 #include <QHash>
 #include <QLocale>
 #include <QLoggingCategory>
-#include <QTextCodec>
 
 #include <algorithm>
 #include <cstdio>
@@ -235,8 +234,6 @@ QString Command::misplacedOption(const QStringList &allowed) const
 
 int main(int argc, char *argv[])
 {
-    // Findings and file names must not depend on the locale in which a package is built.
-    QTextCodec::setCodecForLocale(QTextCodec::codecForName("UTF-8"));
     const QCoreApplication application(argc, argv);
     QCoreApplication::setApplicationName(QStringLiteral("marlo-definitions"));
     QCoreApplication::setApplicationVersion(QStringLiteral(VERSION));

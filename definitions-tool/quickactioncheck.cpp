@@ -4,6 +4,7 @@
 #include "quickactioncheck.h"
 
 #include "commonchecks.h"
+#include "files/characters.h"
 #include "files/inifile.h"
 #include "files/literals.h"
 #include "inilines.h"
@@ -64,12 +65,12 @@ constexpr std::array names = {
 bool isName(const Name &name, const QString &value)
 {
     static const auto expressions = [] {
-        std::vector<QRegularExpression> expressions;
-        expressions.reserve(names.size());
-        for (const Name &name : names) {
-            expressions.emplace_back(QRegularExpression::anchoredPattern(QString(name.pattern)));
+        std::vector<QRegularExpression> all;
+        all.reserve(names.size());
+        for (const Name &each : names) {
+            all.emplace_back(QRegularExpression::anchoredPattern(QString(each.pattern)));
         }
-        return expressions;
+        return all;
     }();
     const bool isLimited = name.key != pathKey;
     return (!isLimited || value.size() <= maximumName)
@@ -79,12 +80,10 @@ bool isName(const Name &name, const QString &value)
 // Returns the number of the argument that a key holds, from 1, or 0 for other keys.
 int argumentNumber(const QString &key)
 {
-    static const QRegularExpression element(
-        QRegularExpression::anchoredPattern(QStringLiteral("remote-arguments/([0-9]+)/argument")));
-    const QRegularExpressionMatch match = element.match(key);
     // QSettings does not find numbers with leading zeroes.
-    const bool isNumber = match.hasMatch() && !match.capturedRef(1).startsWith(QLatin1Char('0'));
-    return isNumber ? match.capturedRef(1).toInt() : 0;
+    static const QRegularExpression element(QRegularExpression::anchoredPattern(
+        QStringLiteral("remote-arguments/([1-9][0-9]*)/argument")));
+    return element.match(key).captured(1).toInt();
 }
 
 QString argumentKey(int number)
@@ -404,7 +403,7 @@ void checkQuickAction(const QString &path, CheckContext *context, Findings *find
         return;
     }
     QuickActionCheck check(action, readIniLines(content), context, findings);
-    check.checkLines(!content.startsWith(iniByteOrderMark));
+    check.checkLines(!content.startsWith(byteOrderMark));
     check.checkTexts();
     check.checkPriority();
     check.checkArguments();

@@ -27,7 +27,7 @@ public:
     int get() const { return m_fd; }
 
     // Leaves closing to the caller.
-    int release() { return std::exchange(m_fd, -1); }
+    [[nodiscard]] int release() { return std::exchange(m_fd, -1); }
 
     void close()
     {

@@ -3,18 +3,14 @@
 
 #include "inifile.h"
 
-#include "files/regularfile.h"
+#include "characters.h"
+#include "regularfile.h"
 
 #include <QByteArray>
 
 #include <algorithm>
 
 namespace {
-
-bool isBlank(char character)
-{
-    return character == ' ' || character == '\t';
-}
 
 bool isBreak(char character)
 {
@@ -30,7 +26,7 @@ bool isBreakOfTwo(const QByteArray &text, int position, int end)
 
 int skipSpaces(const QByteArray &text, int position)
 {
-    while (position < text.size() && (isBlank(text.at(position)) || isBreak(text.at(position)))) {
+    while (position < text.size() && isSpace(text.at(position))) {
         ++position;
     }
     return position;
@@ -118,8 +114,8 @@ IniFault findIniFault(const QString &path)
 
 IniLine nextIniLine(const QByteArray &text, int position)
 {
-    if (position == 0 && text.startsWith(iniByteOrderMark)) {
-        position = int(qstrlen(iniByteOrderMark));
+    if (position == 0 && text.startsWith(byteOrderMark)) {
+        position = int(qstrlen(byteOrderMark));
     }
     position = skipSpaces(text, position);
     while (position < text.size() && text.at(position) == ';') {

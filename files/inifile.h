@@ -11,9 +11,6 @@ class QString;
 
 constexpr qint64 maximumIniSize = qint64(1024) * 1024;
 
-// If a file begins with this mark, QSettings reads values as UTF-8, otherwise as Latin-1.
-constexpr const char *iniByteOrderMark = "\xef\xbb\xbf";
-
 // Why a file is not read with QSettings.
 enum class IniFault {
     None,

@@ -19,15 +19,8 @@ namespace {
 
 using State = RegularFile::State;
 
-RegularFile tooLarge(qint64 maximumSize)
-{
-    return {State::TooLarge,
-            {},
-            QStringLiteral("file to open is larger than %1 bytes").arg(maximumSize)};
-}
-
-// The content is empty, and the file is open unless the state is another one than Read.
-RegularFile openRegularFile(QFile *file, const QString &path)
+// Opens a regular file, reads it with the function, and checks the size of the result.
+template<typename Read> RegularFile openAndRead(const QString &path, qint64 maximumSize, Read read)
 {
     // open() would cut the path at the NUL and open another file.
     if (path.contains(QChar::Null)) {
@@ -38,59 +31,54 @@ RegularFile openRegularFile(QFile *file, const QString &path)
     if (descriptor < 0) {
         return {State::NotOpened, {}, qt_error_string(errno)};
     }
+    QFile file;
+    file.open(descriptor, QIODevice::ReadOnly, QFileDevice::AutoCloseHandle);
     struct stat entry = {};
-    const bool isRegular = fstat(descriptor, &entry) == 0 && S_ISREG(entry.st_mode);
-    file->open(descriptor, QIODevice::ReadOnly, QFileDevice::AutoCloseHandle);
-    return {isRegular ? State::Read : State::NotRegular,
-            {},
-            isRegular                    ? QString()
-                : S_ISDIR(entry.st_mode) ? QStringLiteral("file to open is a directory")
-                                         : QStringLiteral("file to open is not a regular file")};
+    if (fstat(descriptor, &entry) != 0 || !S_ISREG(entry.st_mode)) {
+        return {State::NotRegular,
+                {},
+                S_ISDIR(entry.st_mode) ? QStringLiteral("file to open is a directory")
+                                       : QStringLiteral("file to open is not a regular file")};
+    }
+    const QByteArray content = read(&file);
+    if (file.error() != QFileDevice::NoError) {
+        return {State::Failed, {}, file.errorString()};
+    }
+    if (content.size() > maximumSize) {
+        return {State::TooLarge,
+                {},
+                QStringLiteral("file to open is larger than %1 bytes").arg(maximumSize)};
+    }
+    return {State::Read, content, {}};
 }
 
 } // namespace
 
 RegularFile readRegularFile(const QString &path, qint64 maximumSize)
 {
-    QFile file;
-    RegularFile result = openRegularFile(&file, path);
-    if (result.state != State::Read) {
-        return result;
-    }
-    if (file.size() > maximumSize) {
-        return tooLarge(maximumSize);
-    }
-    // In /proc, files of any size claim to be empty.
-    const qint64 size = file.size() > 0 ? file.size() : maximumSize + 1;
-    QByteArray piece;
-    // Some file systems return fewer bytes at a time than requested.
-    do {
-        piece = file.read(size - result.content.size());
-        result.content += piece;
-    } while (!piece.isEmpty() && result.content.size() < size);
-    if (file.error() != QFileDevice::NoError) {
-        return {State::Failed, {}, file.errorString()};
-    }
-    return result.content.size() > maximumSize ? tooLarge(maximumSize) : result;
+    return openAndRead(path, maximumSize, [maximumSize](QFile *file) {
+        // In /proc, files of any size claim to be empty.
+        const qint64 claimed = file->size() > 0 ? file->size() : maximumSize + 1;
+        const qint64 size = std::min(claimed, maximumSize + 1);
+        QByteArray content;
+        QByteArray piece;
+        // Some file systems return fewer bytes at a time than requested.
+        do {
+            piece = file->read(size - content.size());
+            content += piece;
+        } while (!piece.isEmpty() && content.size() < size);
+        return content;
+    });
 }
 
 RegularFile readFirstLine(const QString &path, qint64 maximumSize)
 {
-    QFile file;
-    RegularFile result = openRegularFile(&file, path);
-    if (result.state != State::Read) {
-        return result;
-    }
-    // With room for the line break.
-    const QByteArray line = file.readLine(maximumSize + 2);
-    if (file.error() != QFileDevice::NoError) {
-        return {State::Failed, {}, file.errorString()};
-    }
-    const auto end = std::find_if(line.cbegin(), line.cend(), [](char character) {
-        return character == '\n' || character == '\0';
+    return openAndRead(path, maximumSize, [maximumSize](QFile *file) {
+        // With room for the line break. As a C string: a NUL ends the line.
+        QByteArray line = file->readLine(maximumSize + 2).constData();
+        line.chop(line.endsWith('\n') ? 1 : 0);
+        return line;
     });
-    result.content = line.left(int(end - line.cbegin()));
-    return result.content.size() > maximumSize ? tooLarge(maximumSize) : result;
 }
 
 QString textUpToNul(const QByteArray &content)

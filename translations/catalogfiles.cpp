@@ -9,8 +9,6 @@
 
 namespace {
 
-constexpr QLatin1String fileSuffix = ".qm"_L1;
-
 bool isReadableFile(const QString &path)
 {
     const QFileInfo file(path);
@@ -21,7 +19,7 @@ bool isReadableFile(const QString &path)
 QString findFile(const QString &base, QString name, const QString &separators)
 {
     while (!name.isEmpty()) {
-        for (QString path : {base + name + fileSuffix, base + name}) {
+        for (QString path : {base + name + CatalogFiles::suffix, base + name}) {
             if (isReadableFile(path)) {
                 return path;
             }

@@ -17,6 +17,7 @@ namespace CatalogFiles {
 constexpr QLatin1String directory = "/usr/share/translations"_L1;
 constexpr QLatin1String engineeringEnglishSuffix = "_eng_en"_L1;
 constexpr QLatin1String localePrefix = "-"_L1;
+constexpr QLatin1String suffix = ".qm"_L1;
 
 // Whether the name keeps the files of the catalog inside the directory.
 bool isCatalogName(const QString &name);

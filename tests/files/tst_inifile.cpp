@@ -4,6 +4,7 @@
 // Compares the check of settings files with QSettings, which it protects.
 
 #include "files.h"
+#include "files/characters.h"
 #include "files/inifile.h"
 #include "texts.h"
 
@@ -64,7 +65,7 @@ QByteArray randomFile(std::mt19937 *random)
             .split(' ')
         + QByteArrayList{" ", "\t"};
     const auto below = [random](int end) { return int((*random)() % uint(end)); };
-    QByteArray text = below(4) == 0 ? iniByteOrderMark : "";
+    QByteArray text = below(4) == 0 ? byteOrderMark : "";
     for (int key = 1 + below(3); key > 0; --key) {
         text += below(8) == 0 ? "" : 'k' + QByteArray::number(key) + '=';
         for (int count = below(7); count > 0; --count) {

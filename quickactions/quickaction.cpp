@@ -27,7 +27,8 @@ constexpr std::size_t maximumSignature = 255;
 // More arguments than a call can have. A file may claim to have any number of them.
 constexpr int enoughArguments = 256;
 
-// Reserved for D-Bus libraries: the bus disconnects a client that sends a message with one of them.
+// Reserved for D-Bus libraries: the bus disconnects a client that sends a message whose path or interface
+// begins with one of these. It does not compare the rest.
 constexpr auto reservedPath = "/org/freedesktop/DBus/Local"_L1;
 constexpr auto reservedInterface = "org.freedesktop.DBus.Local"_L1;
 
@@ -136,10 +137,10 @@ QDBusError QuickAction::whyUnsendable() const
     if (method().isEmpty()) {
         return {QDBusError::InvalidMember, QStringLiteral("The call names no method")};
     }
-    if (objectPath() == reservedPath) {
+    if (objectPath().startsWith(reservedPath)) {
         return {QDBusError::InvalidObjectPath, QStringLiteral("The path is reserved")};
     }
-    if (interface() == reservedInterface) {
+    if (interface().startsWith(reservedInterface)) {
         return {QDBusError::InvalidInterface, QStringLiteral("The interface is reserved")};
     }
     std::size_t signature = 0;

@@ -3,7 +3,7 @@
 
 import QtQuick 2.15
 import QtQuick.Window 2.15
-import "../tests/gallery/screen.js" as Screen
+import "screen.js" as Screen
 
 /*
     Takes a picture of a page, without a display:

@@ -6,7 +6,7 @@ import QtTest 1.15
 import com.marlo.settings.system 1.0
 import gallery.simulation 1.0
 import "../../gallery"
-import "screen.js" as Screen
+import "../../gallery/screen.js" as Screen
 
 // Drives every page of the gallery with the pointer and the keys, and looks at the screen for the
 // results.
@@ -384,6 +384,7 @@ TestCase {
                                                            && item.forceActiveFocus)
               .forceActiveFocus(Qt.TabFocusReason);
         keyClick(Qt.Key_Up, Qt.ControlModifier);
+        seeRows("Torch,Take a photo,Navigate home,New alarm");
         keyClick(Qt.Key_Up, Qt.ControlModifier);
         seeRows(before);
 

@@ -3,7 +3,6 @@
 
 import QtQuick 2.15
 import gallery.simulation 1.0
-import "../../gallery"
 import "screen.js" as Screen
 
 /*

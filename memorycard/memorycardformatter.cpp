@@ -198,7 +198,7 @@ void MemoryCardFormatter::setDevicePath(const QString &path)
     const QPointer<MemoryCardFormatter> self(this);
     Q_EMIT devicePathChanged();
     if (self) {
-        m_steps.enqueue({Command::Probe, path, {}});
+        m_steps.enqueue({Command::Probe, m_devicePath, {}}); // a handler may have changed it
         doNextCommand();
     }
 }

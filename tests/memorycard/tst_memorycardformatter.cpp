@@ -442,6 +442,11 @@ void TestMemoryCardFormatter::scripts_data()
         "busy\n"
         "helper done ext4, path -> path , Probing, busy, type ext4, Idle, not busy",
         "", "probe|testcard1, probe|testcard2, probe|");
+    // Both probes are for the path that the formatter has then.
+    row("a handler sets another path", unset, "done",
+        "when path /dev/testcard1: path /dev/testcard2, path /dev/testcard1 -> path "
+        "/dev/testcard1, path /dev/testcard2, Probing, busy, Idle, not busy",
+        "", "probe|testcard2, probe|testcard2");
     row("the path is kept while busy", withCard, "done",
         "helper held, format vfat -> not busy, Unmounting, busy, Formatting\n"
         "path /dev/testcard1, path /dev/testcard2, release -> Mounting, Idle, not busy\n"

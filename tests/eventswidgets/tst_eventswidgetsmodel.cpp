@@ -320,7 +320,7 @@ void TestEventsWidgetsModel::changesWaitForOneAnother()
     const QByteArray widget = R"({ "path": "a", "available_path": "/usr/share/glimmera/needed" })";
     m_key->set(QStringList());
     loadModel(widget);
-    connect(m_model.get(), &Model::rowsAboutToBeInserted, this, [this] {
+    once(m_model.get(), &Model::rowsAboutToBeInserted, [this] {
         m_key->set(QStringList{a});
         Files::write(needed, "");
         m_model->updateAvailable();

@@ -61,11 +61,6 @@ CardHelper::~CardHelper()
     Files::remove(directory);
 }
 
-QString CardHelper::path()
-{
-    return program;
-}
-
 void CardHelper::install(const QString &scenario, const QByteArray &output)
 {
     if (QProcess::execute(script, {"--check"_s, scenario}) != 0) {

@@ -23,8 +23,6 @@ public:
     ~CardHelper();
     Q_DISABLE_COPY_MOVE(CardHelper)
 
-    static QString path();
-
     // Ends the test program if there is no such scenario.
     void install(const QString &scenario, const QByteArray &output = QByteArray());
     // Installs a file that cannot be run.

@@ -73,11 +73,6 @@ void FileTree::makeLink(const QByteArray &path, const QByteArray &target)
     require(symlink(target.constData(), path.constData()), path);
 }
 
-void FileTree::makePipe(const QByteArray &path)
-{
-    require(mkfifo(path.constData(), 0600), path);
-}
-
 void FileTree::makeSocket(const QByteArray &path)
 {
     sockaddr_un address = {};

@@ -21,7 +21,6 @@ void makeDirectory(const QByteArray &path);
 void makeFile(const QByteArray &path, const QByteArray &content = QByteArray());
 void makeFiles(const QByteArray &directory, int count);
 void makeLink(const QByteArray &path, const QByteArray &target);
-void makePipe(const QByteArray &path);
 void makeSocket(const QByteArray &path);
 // A chain of directories below the one at path, all of the same name.
 void makeChain(const QByteArray &path, int depth, const QByteArray &name = "d");

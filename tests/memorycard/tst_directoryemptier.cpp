@@ -1,6 +1,7 @@
 // SPDX-FileCopyrightText: 2026 the marlo-settings-system developers
 // SPDX-License-Identifier: BSD-3-Clause
 
+#include "files.h"
 #include "files/filedescriptor.h"
 #include "filetree.h"
 #include "loggedtest.h"
@@ -323,7 +324,7 @@ void tst_DirectoryEmptier::everyKindOfEntry()
               "toLink -> toDirectory", "toParent -> ..", "dangling -> /nowhere/at/all",
               "toItself -> toItself", ".hiddenDirectory/.hidden", "\xe9t\xe9/\x80",
               "\xe9t\xe9/link -> ../..", "\xe9t\xe9/directory/"});
-    makePipe(m_top + "/pipe");
+    Files::makePipe(QFile::decodeName(m_top + "/pipe"));
     makeSocket(m_top + "/socket");
     // An empty directory is emptied, too.
     for (int i = 0; i < 2; ++i) {
@@ -394,7 +395,7 @@ void tst_DirectoryEmptier::unknownTypes()
     makeTree(m_top, {"directory/link -> ../../outside/directory", "link -> ../outside"});
     makeFiles(m_top, 5);
     makeFiles(m_top + "/directory", 5);
-    makePipe(m_top + "/pipe");
+    Files::makePipe(QFile::decodeName(m_top + "/pipe"));
 
     listWithoutTypes();
     const CallCounter counter;

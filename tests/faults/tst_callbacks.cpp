@@ -40,7 +40,7 @@ public:
         for (const QMetaMethod &signal : all) {
             unheard.append(QString::fromLatin1(signal.name()));
             connect(object, signal, this,
-                    metaObject()->method(metaObject()->indexOfSlot("answer()")));
+                    staticMetaObject.method(staticMetaObject.indexOfSlot("answer()")));
         }
     }
 

@@ -345,8 +345,8 @@ void TestMarloDefinitions::hostileFiles_data()
             QTest::addRow("%s %s", name, kind) << name << make;
         }
     };
-    const auto content = [](const QByteArray &content) -> Make {
-        return [=](const QString &name) { Files::write(name, content); };
+    const auto content = [](const QByteArray &text) -> Make {
+        return [=](const QString &name) { Files::write(name, text); };
     };
     row("pipe", Files::makePipe);
     row("link to a pipe", [](const QString &name) {

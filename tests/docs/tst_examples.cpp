@@ -218,11 +218,11 @@ void TestExamples::ordersActions()
 {
     const QString pattern = Places::quickActions + "/order-%1.conf"_s;
     const auto paths = [&pattern](const char *names) {
-        QStringList paths;
+        QStringList list;
         for (const QString &name : words(names)) {
-            paths.append(pattern.arg(name));
+            list.append(pattern.arg(name));
         }
-        return paths;
+        return list;
     };
     MGConfItem list(Places::enabledActions);
     const QVariant before = list.value();

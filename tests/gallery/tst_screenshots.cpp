@@ -27,12 +27,12 @@ struct Result {
     QString output;
 };
 
-Result takeScreenshots(const QString &source, const QString &directory)
+Result takeScreenshots(const QString &tree, const QString &directory)
 {
     QProcess process;
     process.setProcessChannelMode(QProcess::MergedChannels);
     process.start(QLatin1String(QML_PROGRAM),
-                  {source + "/gallery/Screenshots.qml"_s, "--"_s, directory});
+                  {tree + "/gallery/Screenshots.qml"_s, "--"_s, directory});
     Result result;
     if (process.waitForFinished(patience) && process.exitStatus() == QProcess::NormalExit) {
         result.exitCode = process.exitCode();

@@ -73,7 +73,7 @@ void ScreenshotsTest::everyPageIsShown()
     // The problem is in the last line.
     QVERIFY2(result.exitCode == 0, qPrintable(result.output.right(800)));
 
-    static const QRegularExpression line("^(?:qml: )?([\\w-]+): (.*\\.png)$"_s,
+    static const QRegularExpression line("^(?:qml: )?([\\w-]+) \\([\\w-]+\\): (.*\\.png)$"_s,
                                          QRegularExpression::MultilineOption);
     static const QRegularExpression size("-(\\d+)x(\\d+)-"_s);
     QSet<QString> pages;

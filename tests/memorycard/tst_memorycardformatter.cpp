@@ -508,6 +508,11 @@ void TestMemoryCardFormatter::scripts_data()
         {notIdle("format() called", "Probing"), notIdle("format() called", "Probing"),
          notIdle("removeAllFiles() called", "Probing"), notIdle("mount() called", "Probing"),
          notIdle("unmount() called", "Probing")});
+    row("operations without a path while busy", withCard, "done",
+        "helper held, path -> path , Probing, busy\n"
+        "format vfat, empty, release -> Idle, not busy",
+        "", "probe|testcard1, probe|",
+        {notIdle("format() called", "Probing"), notIdle("removeAllFiles() called", "Probing")});
     // The path is checked first. The second refusal does not change the status, so there is no
     // signal. An operation is accepted in this status, which lasts until the disk service replies.
     row("operations need a path and a type", named, "done",

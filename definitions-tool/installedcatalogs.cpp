@@ -68,7 +68,7 @@ bool InstalledCatalogs::Catalog::holds(const QString &id) const
 }
 
 InstalledCatalogs::InstalledCatalogs(const QString &root)
-    : m_directory(QDir::cleanPath(root + CatalogFiles::directory))
+    : m_directory(QDir::cleanPath(root + CatalogFiles::systemDirectory))
 {
     m_fileNames = QDir(m_directory).entryList(QDir::Files);
 }

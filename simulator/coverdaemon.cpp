@@ -60,9 +60,8 @@ void CoverDaemon::sendChanges(const QVariantMap &changes, const QStringList &inv
     sendPropertiesChanged({service, changes, invalidated});
 }
 
-QString CoverDaemon::introspect(const QString &path) const
+QString CoverDaemon::introspect(const QString & /*path*/) const
 {
-    Q_UNUSED(path)
     return {};
 }
 

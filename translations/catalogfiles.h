@@ -14,7 +14,7 @@ class QLocale;
 // maps_eng_en.qm for engineering English, and a file such as maps-fi.qm for each language.
 namespace CatalogFiles {
 
-constexpr QLatin1String directory = "/usr/share/translations"_L1;
+constexpr QLatin1String systemDirectory = "/usr/share/translations"_L1;
 constexpr QLatin1String engineeringEnglishSuffix = "_eng_en"_L1;
 constexpr QLatin1String localePrefix = "-"_L1;
 constexpr QLatin1String suffix = ".qm"_L1;
@@ -25,9 +25,9 @@ bool isCatalogName(const QString &name);
 // These return the path of the file that QTranslator::load() would choose, and an empty string if
 // there is none. QTranslator would also parse the file, and thereby trust it.
 QString findEngineeringEnglish(const QString &catalog,
-                               const QString &directory = CatalogFiles::directory);
+                               const QString &directory = CatalogFiles::systemDirectory);
 QString findLanguage(const QString &catalog, const QLocale &locale,
-                     const QString &directory = CatalogFiles::directory);
+                     const QString &directory = CatalogFiles::systemDirectory);
 
 // The names of a locale in file names. A name in lower case comes after the name itself.
 QStringList localeNames(const QLocale &locale);

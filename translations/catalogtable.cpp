@@ -30,7 +30,7 @@ void CatalogTable::addDefinition(const QString &user, const QString &catalog)
         if (!m_refused.contains(catalog)) {
             m_refused.insert(catalog);
             qWarning() << "The translation catalog" << catalog << "of" << user
-                       << "is not used: its name leads out of" << QString(directory);
+                       << "is not used: its name leads out of" << QString(systemDirectory);
         }
         return;
     }

@@ -2,6 +2,7 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 import QtQuick 2.15
+import "pagesource.js" as Source
 
 /*
     Checks pages without running them:
@@ -29,66 +30,9 @@ Item {
         return request.responseText;
     }
 
-    // The code without comments and texts, each replaced by as many blanks.
-    function codeOf(source) {
-        return source.replace(/\/\*[^]*?\*\/|\/\/.*|"(\\.|[^"\\\n])*"|'(\\.|[^'\\\n])*'/g, blank);
-    }
-
-    function blank(text) {
-        return text.replace(/[^\n]/g, " ");
-    }
-
-    function offsetOf(source, line, column) {
-        return source.split("\n").slice(0, line - 1).join("\n").length + (line > 1 ? 1 : 0) + column - 1;
-    }
-
-    // Where a binding or an object that begins at the offset ends.
-    function endOf(code, start) {
-        for (let i = start, depth = 0; i < code.length; ++i) {
-            if ("([{".includes(code[i])) {
-                ++depth;
-            } else if (")]}".includes(code[i]) && --depth <= 0) {
-                return depth < 0 ? i : i + 1;
-            } else if (depth === 0 && (code[i] === ";" || code[i] === "\n")
-                    && /[^\s:]/.test(code.substring(code.indexOf(":", start) + 1, i))) {
-                return i;
-            }
-        }
-        return code.length;
-    }
-
-    // The source without the mistake, so that the compiler finds the next one: an unknown property
-    // becomes a declaration, an object of an unknown type an empty one, and any other binding is
-    // left out. The same source if this is not possible.
-    function withoutMistake(source, offset, text) {
-        const code = codeOf(source);
-        const before = code.substring(0, offset);
-        const after = code.substring(offset);
-        let start = offset;
-        if (/^[A-Z][\w.]*\s*\{/.test(after)) {
-            const end = endOf(code, offset);
-            const empty = "QtObject {}";
-            const rest = source.substring(offset + empty.length, end);
-            return end - offset < empty.length ? source
-                : source.substring(0, offset) + empty + blank(rest) + source.substring(end);
-        }
-        if (/non-existent property/.test(text) && /^\w+\s*:/.test(after) && !/\.\s*$/.test(before)) {
-            return source.substring(0, offset) + "property var " + source.substring(offset);
-        }
-        if (!/^[\w.]+\s*:/.test(after) || /\.\s*$/.test(before)) {
-            const binding = /[\w.]+(\s*:\s*|\.)$/.exec(before);
-            if (!binding) {
-                return source;
-            }
-            start = binding.index;
-        }
-        const end = endOf(code, start);
-        return source.substring(0, start) + blank(source.substring(start, end)) + source.substring(end);
-    }
-
     function checkTypes(name, url, isComplete) {
         const original = sourceOf(url);
-        const root = isComplete ? /^[ \t]*[A-Z][\w.]*\s*\{/m.exec(codeOf(original)) : null;
+        const root = isComplete ? /^[ \t]*[A-Z][\w.]*\s*\{/m.exec(Source.codeOf(original)) : null;
         const head = "import QtQml 2.15 as Checked; Checked.Component { ";
         const start = root ? root.index : 0;
         const startLine = original.substring(0, start).split("\n").length;
@@ -115,7 +59,7 @@ Item {
                 const added = declared.filter(place => place.line === line && place.column < column).length;
                 report(name, line, column - added * "property var ".length, error.message);
                 const before = source;
-                source = withoutMistake(source, offsetOf(source, line, column), error.message);
+                source = Source.withoutMistake(source, Source.offsetOf(source, line, column), error.message);
                 if (source.length > before.length) {
                     declared.push({ line: line, column: column });
                 }
@@ -125,7 +69,7 @@ Item {
     }
 
     function checkValues(name, url) {
-        const code = codeOf(sourceOf(url));
+        const code = Source.codeOf(sourceOf(url));
         const imports = (sourceOf(url).match(/^[ \t]*import .*$/gm) || []).join("\n");
         const names = /(^|[^.\w])([A-Z]\w*(?:\.[A-Z]\w*)+)(?=[^\w.({]|\s*[)\]:;,]|$)(?!\s*\{)/gm;
         const values = {};

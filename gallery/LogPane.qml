@@ -77,13 +77,10 @@ Rectangle {
             visible: pane.open
             clip: true
             model: Messages
+            currentIndex: -1 // the highlight of a current row would be animated
             boundsBehavior: Flickable.StopAtBounds
             onCountChanged: positionViewAtEnd()
-            ScrollBar.vertical: ScrollBar {
-                width: 6
-                policy: ScrollBar.AlwaysOn
-                visible: size < 1
-            }
+            ScrollBar.vertical: VisibleScrollBar {}
             delegate: Label {
                 width: ListView.view.width
                 leftPadding: 10

@@ -58,12 +58,7 @@ Page {
         activeFocusOnTab: true
         Accessible.role: Accessible.Grouping
         Accessible.name: page.title
-        // Always visible if the page is longer than the screen.
-        ScrollBar.vertical: ScrollBar {
-            width: 6
-            policy: ScrollBar.AlwaysOn
-            visible: size < 1
-        }
+        ScrollBar.vertical: VisibleScrollBar {}
 
         Keys.onUpPressed: page.scrollTo(contentY - 48)
         Keys.onDownPressed: page.scrollTo(contentY + 48)

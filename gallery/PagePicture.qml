@@ -20,6 +20,8 @@ Window {
 
     property var clicks: []
     property int pause: 1000
+    property int looks: 0 // for the control to be clicked next
+    readonly property int enoughLooks: 100
     property var files: []
 
     function fail(problem) {
@@ -51,10 +53,14 @@ Window {
     function click() {
         const control = Screen.control(contentItem, clicks[0]);
         if (!control || !control.enabled) {
+            if (++looks === enoughLooks) {
+                fail("nothing to click shows \"" + clicks[0] + "\", but there is: "
+                     + Screen.texts(contentItem).map(item => item.text).join("; "));
+            }
             return;
         }
+        looks = 0;
         clicks.shift();
-        patience.restart();
         if (control.checkable) {
             control.toggle();
             control.toggled();
@@ -87,18 +93,9 @@ Window {
                 click();
             } else {
                 stop();
-                patience.stop();
                 shutter.start();
             }
         }
-    }
-
-    Timer {
-        id: patience
-        interval: 20000
-        running: true
-        onTriggered: fail("nothing to click shows \"" + clicks[0] + "\", but there is: "
-                          + Screen.texts(window.contentItem).map(item => item.text).join("; "))
     }
 
     Timer {

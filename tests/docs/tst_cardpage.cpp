@@ -114,7 +114,7 @@ bool TestCardPage::openPage()
     page->setParentItem(m_window->contentItem());
     m_window->show();
     const auto isStill = [this] { return !m_page->property("running").toBool(); };
-    return QTest::qWaitForWindowExposed(m_window.get()) && QTest::qWaitFor(isStill, patience);
+    return QTest::qWaitForWindowExposed(m_window.get()) && becomesTrue(isStill);
 }
 
 QQuickItem *TestCardPage::find(const QString &text)
@@ -129,7 +129,7 @@ QQuickItem *TestCardPage::find(const QString &text)
 bool TestCardPage::press(const QString &text)
 {
     const auto isShown = [&] { return shows(text); };
-    return QTest::qWaitFor(isShown, patience) && find(text)->isEnabled()
+    return becomesTrue(isShown) && find(text)->isEnabled()
         && QMetaObject::invokeMethod(find(text), "clicked");
 }
 

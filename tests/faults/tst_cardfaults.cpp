@@ -101,7 +101,7 @@ bool TestCardFaults::startEmptying(FailingCard *card)
 {
     card->setFault(Fault::Waits);
     m_formatter->removeAllFiles();
-    return QTest::qWaitFor([card] { return card->waiting() == 1; }, patience);
+    return becomesTrue([card] { return card->waiting() == 1; });
 }
 
 bool TestCardFaults::startProbing(const QString &path, const QByteArray &helper)

@@ -330,7 +330,7 @@ void TestDconfFaults::takeFailedWrites()
 bool TestDconfFaults::stores(bool on)
 {
     m_user->choose(on);
-    return QTest::qWaitFor([&] { return isStored(on); }, patience);
+    return becomesTrue([&] { return isStored(on); });
 }
 
 bool TestDconfFaults::isStored(bool on) const
@@ -341,7 +341,7 @@ bool TestDconfFaults::isStored(bool on) const
 bool TestDconfFaults::aWriteFails()
 {
     QStringList messages;
-    return QTest::qWaitFor([&] { return !(messages += takeMessages()).isEmpty(); }, patience)
+    return becomesTrue([&] { return !(messages += takeMessages()).isEmpty(); })
         && isFailedWrite(messages.first());
 }
 

@@ -135,7 +135,7 @@ QByteArray TestRealCard::wait()
     // An operation emits "not busy" first. It ends with the status, with "not busy" again, or with
     // a forgiven error.
     const auto isOver = [this] { return !m_formatter->busy() && events() != "not busy"; };
-    if (!QTest::qWaitFor(isOver, patience)) {
+    if (!becomesTrue(isOver)) {
         return events() + " and no end";
     }
     // The signals that are emitted together with the last one.

@@ -256,7 +256,7 @@ void TestPlugin::restsAfterEachLanguageChange()
     // Whether there were exactly this many changes, and no more follow.
     const auto restsAfter = [&changes](int count) {
         const auto hasCount = [&] { return changes.count == count; };
-        const bool came = QTest::qWaitFor(hasCount, patience);
+        const bool came = becomesTrue(hasCount);
         QTest::qWait(100);
         return came && std::exchange(changes.count, 0) == count;
     };

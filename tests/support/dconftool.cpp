@@ -49,7 +49,7 @@ void DconfTool::waitUntilStored()
     const QString key = "/test/stored"_s;
     MGConfItem(key).set(++count);
     const auto stored = [&key] { return read(key).toInt() == count; };
-    if (!QTest::qWaitFor(stored, patience)) {
+    if (!becomesTrue(stored)) {
         qFatal("what was set is not stored");
     }
 }

@@ -178,7 +178,7 @@ QString RandomModelTest::storeInAnotherProcess(const QStringList &list)
     DconfTool::waitUntilStored();
     DconfTool::write(m_key, list);
     const auto isKnown = [&] { return naive()->enabledList == list; };
-    if (changes && !QTest::qWaitFor(isKnown, patience)) {
+    if (changes && !becomesTrue(isKnown)) {
         QTest::qFail("the change of another process is not seen", __FILE__, __LINE__);
     }
     return "another process: list "_s + list.join(QLatin1Char(' '));
@@ -187,7 +187,7 @@ QString RandomModelTest::storeInAnotherProcess(const QStringList &list)
 void RandomModelTest::waitForReload()
 {
     const int before = m_reloads;
-    if (!QTest::qWaitFor([&] { return m_reloads > before; }, patience)) {
+    if (!becomesTrue([&] { return m_reloads > before; })) {
         qFatal("the model does not reload");
     }
 }

@@ -160,6 +160,9 @@ QString whyUnusableCatalog(const QByteArray &content)
         if (section.size() == 0) {
             return QStringLiteral("it is cut short or damaged");
         }
+        if (tag == 0) {
+            break; // QTranslator reads no further.
+        }
         switch (tag) {
         case ContextsTag:
             contexts = section;

@@ -111,6 +111,13 @@ void TestCheckedTranslator::readsWhatQtReads_data()
         hashTable + section(messages, message)
             + section(contexts, bytes(quint16(1), quint16(1), quint16(0), quint16(0x0178)))
             + section(pluralRules, QByteArray::fromHex("0101")));
+    const QByteArray noBuckets = section(contexts, bytes(quint16(0), quint16(0)));
+    const QByteArray oneBucket = section(contexts, bytes(quint16(1), quint16(0), quint16(0)));
+    add("only the last section of a kind is read",
+        noBuckets + oneBucket + hashTable + section(messages, "x") + section(messages, message));
+    add("nothing is read from a section with the tag 0 on",
+        oneBucket + hashTable + section(messages, message) + section(0, "x") + noBuckets
+            + section(messages, "x") + section(dependencies, bytes("other"_s)));
 }
 
 void TestCheckedTranslator::readsWhatQtReads()
@@ -190,6 +197,12 @@ void TestCheckedTranslator::refusesDamagedCatalogs_data()
     addContexts("fewer buckets than announced", bytes(quint16(2), quint16(0)));
     addContexts("bucket behind the names", bytes(quint16(1), quint16(1), quint16(0)));
     addContexts("bucket without names", bytes(quint16(1), quint16(0)));
+    // QTranslator reads the first list.
+    add("no buckets before a section with the tag 0",
+        magic + hashTable + section(messages, message)
+            + section(contexts, bytes(quint16(0), quint16(0))) + section(0, "x")
+            + section(contexts, bytes(quint16(1), quint16(0), quint16(0))),
+        badContexts);
 
     for (const auto *rules : {"01", "0500", "8101", "040102ff", "010102", "0401"}) {
         add(rules, magic + section(pluralRules, QByteArray::fromHex(rules)),

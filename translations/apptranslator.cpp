@@ -24,13 +24,16 @@ void AppTranslator::loadDefaultLocale()
 {
     // First: if the file is replaced in between, the next language change loads it.
     m_loaded = findDefaultLocale();
-    loadFileIfFound(m_loaded.path);
+    if (!loadFileIfFound(m_loaded.path)) {
+        m_loaded = {}; // The next language change tries again.
+    }
 }
 
 bool AppTranslator::eventFilter(QObject *watched, QEvent *event)
 {
     // Loading a file posts another language change, which a host passes on to the watched object.
-    // Only a new file is loaded; otherwise this would never end.
+    // So only a new file is loaded, or one that could not be read: while the translator stays empty
+    // it posts nothing. Otherwise this would never end.
     if (event->type() == QEvent::LanguageChange && !(findDefaultLocale() == m_loaded)) {
         loadDefaultLocale();
     }

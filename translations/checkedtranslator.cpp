@@ -10,9 +10,26 @@
 
 QString CheckedTranslator::loadFile(const QString &path)
 {
-    RegularFile file = readRegularFile(path, maximumCatalogSize);
+    return loadContent(readRegularFile(path, maximumCatalogSize));
+}
+
+bool CheckedTranslator::loadFileIfFound(const QString &path)
+{
+    const RegularFile file = readRegularFile(path, maximumCatalogSize);
+    const QString refusal = loadContent(file);
+    if (!path.isEmpty() && !refusal.isEmpty()) {
+        qWarning() << "The translation catalog" << path << "is not used:" << qPrintable(refusal);
+    }
+    return file.state == RegularFile::State::Read;
+}
+
+QString CheckedTranslator::loadContent(RegularFile file)
+{
     QString refusal =
         file.state == RegularFile::State::Read ? whyUnusableCatalog(file.content) : file.error;
+    if (!refusal.isEmpty() && isEmpty()) {
+        return refusal; // To empty it again would post another language change.
+    }
     const int size = refusal.isEmpty() ? file.content.size() : 0;
     file.content.append(catalogPadding, '\0');
     // Without content this empties the translator.
@@ -23,12 +40,4 @@ QString CheckedTranslator::loadFile(const QString &path)
     // Only now, because the translator has used the content of the last file until here.
     m_content = file.content;
     return refusal;
-}
-
-void CheckedTranslator::loadFileIfFound(const QString &path)
-{
-    const QString refusal = loadFile(path);
-    if (!path.isEmpty() && !refusal.isEmpty()) {
-        qWarning() << "The translation catalog" << path << "is not used:" << qPrintable(refusal);
-    }
 }

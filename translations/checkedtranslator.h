@@ -7,6 +7,8 @@
 #include <QByteArray>
 #include <QTranslator>
 
+struct RegularFile;
+
 // The size limit of a catalog file.
 constexpr qint64 maximumCatalogSize = qint64(16) * 1024 * 1024;
 
@@ -26,10 +28,12 @@ public:
     QString loadFile(const QString &path);
 
     // Like loadFile(), but logs a warning if the file is not used. An empty path stands for a
-    // catalog that does not exist, which is not an error.
-    void loadFileIfFound(const QString &path);
+    // catalog that does not exist, which is not an error. Returns whether the file was read.
+    bool loadFileIfFound(const QString &path);
 
 private:
+    QString loadContent(RegularFile file);
+
     // QTranslator reads it, without a copy.
     QByteArray m_content;
 };

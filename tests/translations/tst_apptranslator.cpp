@@ -2,9 +2,11 @@
 // SPDX-License-Identifier: BSD-3-Clause
 
 #include "files.h"
+#include "languagelistener.h"
 #include "loggedtest.h"
 #include "texts.h"
 #include "translations/apptranslator.h"
+#include "usedupdescriptors.h"
 
 #include <QtTest>
 
@@ -18,6 +20,7 @@ private Q_SLOTS:
     void cleanup();
 
     void loadsWhatIsNew();
+    void triesAgainToReadAFile();
     void otherEventsReadNothing();
 
 private:
@@ -65,6 +68,34 @@ void TestAppTranslator::loadsWhatIsNew()
     QVERIFY(m_translator->isEmpty());
     // A catalog that appears.
     Files::installCatalog("settings-system-de"_s);
+    send(QEvent::LanguageChange);
+    QCOMPARE(text(), "Beide"_s);
+    // A damaged file is read once.
+    Files::write("/usr/share/translations/settings-system-de.qm"_s, "damaged");
+    send(QEvent::LanguageChange);
+    send(QEvent::LanguageChange);
+    QVERIFY(m_translator->isEmpty());
+    QCOMPARE(m_log->takeTexts().size(), 1);
+}
+
+void TestAppTranslator::triesAgainToReadAFile()
+{
+    QCoreApplication::installTranslator(m_translator);
+    // Like a program that passes language changes on.
+    const LanguageListener listener([this] { send(QEvent::LanguageChange); });
+    QLocale::setDefault(QLocale("de_DE"_s));
+    Files::installCatalog("settings-system-de"_s);
+    {
+        const UsedUpDescriptors none;
+        send(QEvent::LanguageChange);
+        QVERIFY(m_translator->isEmpty());
+        QCoreApplication::sendPostedEvents();
+        // Delivers what was posted meanwhile.
+        QCoreApplication::sendPostedEvents();
+    }
+    // The translator has announced that it is empty, and nothing when it stayed empty.
+    QCOMPARE(listener.count, 1);
+    QCOMPARE(m_log->takeTexts().size(), 2);
     send(QEvent::LanguageChange);
     QCOMPARE(text(), "Beide"_s);
 }

@@ -6,7 +6,17 @@
 #include "catalogcheck.h"
 #include "files/regularfile.h"
 
+#include <QCoreApplication>
 #include <QtDebug>
+
+CheckedTranslator::~CheckedTranslator()
+{
+    // QTranslator would do this only after the content is freed, and another thread may look a text
+    // up until then.
+    if (QCoreApplication::instance() != nullptr) {
+        QCoreApplication::removeTranslator(this);
+    }
+}
 
 QString CheckedTranslator::loadFile(const QString &path)
 {

@@ -23,6 +23,7 @@ class CheckedTranslator : public QTranslator
 
 public:
     using QTranslator::QTranslator;
+    ~CheckedTranslator() override;
 
     // Replaces the loaded catalog. Returns why the file is not used; empty if it is.
     QString loadFile(const QString &path);

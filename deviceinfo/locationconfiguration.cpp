@@ -161,10 +161,11 @@ void LocationConfiguration::setCustomSettingsEnabled(bool isEnabled)
     if (m_customSettingsEnabled == isEnabled) {
         return;
     }
-    // Other items on the key announce the change, and their handlers may delete this object.
+    // Other items on the key announce the change, and their handlers may set the property or delete
+    // this object.
     const QPointer<LocationConfiguration> self(this);
     MGConfItem(customSettingsEnabledKey).set(isEnabled);
-    if (self != nullptr) {
+    if (self != nullptr && m_customSettingsEnabled != isEnabled) {
         m_customSettingsEnabled = isEnabled;
         Q_EMIT customSettingsEnabledChanged();
     }

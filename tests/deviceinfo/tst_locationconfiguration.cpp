@@ -25,6 +25,7 @@ private Q_SLOTS:
     void startsWithTheStoredFlag_data();
     void startsWithTheStoredFlag();
     void theFlagIsStoredBeforeItsSignal();
+    void theFlagIsSetOnceAfterItIsStored();
     void theSameFlagWritesNothing();
     void theFlagIsNotFollowed();
 
@@ -143,6 +144,22 @@ void TestLocationConfiguration::theFlagIsStoredBeforeItsSignal()
     QVERIFY(LocationConfiguration().customSettingsEnabled());
     configuration.setCustomSettingsEnabled(false);
     QCOMPARE(seen, QVariantList({true, true, false, false}));
+}
+
+void TestLocationConfiguration::theFlagIsSetOnceAfterItIsStored()
+{
+    LocationConfiguration configuration;
+    QSignalSpy changed(&configuration, &LocationConfiguration::customSettingsEnabledChanged);
+    const MGConfItem witness(flagKey);
+    QVariantList seen;
+    connect(&witness, &MGConfItem::valueChanged, this, [&] {
+        seen << configuration.customSettingsEnabled();
+        configuration.setCustomSettingsEnabled(true);
+    });
+    configuration.setCustomSettingsEnabled(true);
+    QCOMPARE(seen, QVariantList{false});
+    QVERIFY(configuration.customSettingsEnabled());
+    QCOMPARE(changed.size(), 1);
 }
 
 void TestLocationConfiguration::theSameFlagWritesNothing()

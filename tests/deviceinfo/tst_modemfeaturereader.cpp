@@ -50,6 +50,7 @@ void TestModemFeatureReader::readsTheVariant_data()
     row("[general]", "[general]\nvariant=global\n", "global");
     row("[General] last", "[modem]\nvariant=x\n[General]\nvariant=global\n", "global");
     row("another section", "[modem]\nvariant=global\n", "");
+    row("before a section that is not closed", "variant=global\n[modem\na=b\n", "global");
     row("other keys", "variants=a\nvarian=b\n", "");
     row("no value", "variant=\n", "");
     row("empty", "", "");

@@ -8,6 +8,7 @@
 #include "texts.h"
 
 #include <QTemporaryDir>
+#include <QTextCodec>
 #include <QtTest>
 
 #include <sys/socket.h>
@@ -25,6 +26,7 @@ private Q_SLOTS:
 
     void readContent_data();
     void readContent();
+    void readContentInTheEncodingOfTheLocale();
     void readContentOfNothing_data();
     void readContentOfNothing();
     void readContentOfLargeFiles();
@@ -114,6 +116,16 @@ void TestTextFileReader::readContent()
     Files::write(path("file"), content);
     QCOMPARE(read("file"), text);
     QVERIFY(!read("file").isNull());
+}
+
+void TestTextFileReader::readContentInTheEncodingOfTheLocale()
+{
+    Files::write(path("file"), "\xE4");
+    QTextCodec *const before = QTextCodec::codecForLocale();
+    QTextCodec::setCodecForLocale(QTextCodec::codecForName("ISO-8859-1"));
+    const QString text = read("file");
+    QTextCodec::setCodecForLocale(before);
+    QCOMPARE(text, "ä"_s);
 }
 
 void TestTextFileReader::readContentOfNothing_data()

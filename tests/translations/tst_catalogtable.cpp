@@ -8,6 +8,8 @@
 #include "translations/catalogtable.h"
 #include "words.h"
 
+#include <QTextCodec>
+#include <QTranslator>
 #include <QtTest>
 
 class TestCatalogTable : public LoggedTest
@@ -26,6 +28,7 @@ private Q_SLOTS:
     void tablesShareNothing();
     void treatsADamagedCatalogAsMissing();
     void refusesNamesThatLeaveTheDirectory();
+    void looksUpTheIdentifierInTheEncodingOfTheLocale();
 
 private:
     QList<QTranslator *> translators() const { return m_owner->findChildren<QTranslator *>(); }
@@ -183,6 +186,26 @@ void TestCatalogTable::refusesNamesThatLeaveTheDirectory()
                          "its name leads out of \"/usr/share/translations\""_s.arg(name, a)));
     m_table->removeDefinition(a, name);
     QCOMPARE(translators().size(), 0);
+}
+
+void TestCatalogTable::looksUpTheIdentifierInTheEncodingOfTheLocale()
+{
+    class Echo : public QTranslator
+    {
+    public:
+        bool isEmpty() const override { return false; }
+        QString translate(const char *, const char *id, const char *, int) const override
+        {
+            return QString::fromLatin1(id);
+        }
+    };
+    Echo echo;
+    QCoreApplication::installTranslator(&echo);
+    QTextCodec *const before = QTextCodec::codecForLocale();
+    QTextCodec::setCodecForLocale(QTextCodec::codecForName("ISO-8859-1"));
+    const QString text = CatalogTable::text("ä"_s);
+    QTextCodec::setCodecForLocale(before);
+    QCOMPARE(text, "ä"_s);
 }
 
 QTEST_GUILESS_MAIN(TestCatalogTable)

@@ -31,6 +31,7 @@ private Q_SLOTS:
 
     void metaData();
     void oneInstance();
+    void registersUnderTheGivenUri();
     void propertiesAnnounceTheirChanges();
     void oneTextFileReaderPerEngine();
     void otherVersionsAreNotThere();
@@ -130,6 +131,21 @@ void TestPlugin::oneInstance()
     delete instance.data();
     QVERIFY(instance == nullptr);
     QVERIFY(loader.instance() != nullptr);
+}
+
+void TestPlugin::registersUnderTheGivenUri()
+{
+    QPluginLoader loader(libraryPath());
+    qobject_cast<QQmlExtensionInterface *>(loader.instance())->registerTypes("another.module");
+    QQmlEngine engine;
+    for (const ModuleType &type : ModuleType::all()) {
+        const QByteArray object = type.name.toUtf8() + (type.isSingleton ? "" : " { }");
+        QVERIFY(create(&engine,
+                       "import another.module 1.0 as Another\n"
+                       "QtObject { property QtObject it: Another."
+                           + object + " }")
+                != nullptr);
+    }
 }
 
 // The file plugins.qmltypes, which another test compares with the module, does not say which signal

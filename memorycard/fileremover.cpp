@@ -44,6 +44,7 @@ constexpr std::array unnumbered = {
 struct Mount {
     QByteArray directory; // its name has an unknown encoding
     QByteArray type; // without a subtype, such as ".exfat"
+    bool isCovered = false; // by the mount of another device
 };
 
 FileDescriptor openDirectory(const char *path)
@@ -68,9 +69,15 @@ bool carriesRoot(const QByteArray &device, const std::vector<Mount> &mounts)
     });
 }
 
+// Whether a mount on a directory hides another directory, which is the same or below it.
+bool hides(const QByteArray &directory, const QByteArray &other)
+{
+    return (other + '/').startsWith(directory.endsWith('/') ? directory : directory + '/');
+}
+
 // Whether the directory is on the device. If its file system has a device number of its own, this
-// is unknown, and true if the directory is on a file system of the type in the table.
-bool liesOn(const QByteArray &device, const QByteArray &type, int directory)
+// is unknown, and true if the table has no later mount there and the type is that in the table.
+bool liesOn(const QByteArray &device, const Mount &mount, int directory)
 {
     struct stat info = {};
     struct stat node = {};
@@ -81,10 +88,11 @@ bool liesOn(const QByteArray &device, const QByteArray &type, int directory)
         && node.st_rdev == info.st_dev) {
         return true;
     }
-    const auto entry = std::find_if(std::cbegin(unnumbered), std::cend(unnumbered),
-                                    [&type](const auto &known) { return type == known.type; });
+    const auto entry =
+        std::find_if(std::cbegin(unnumbered), std::cend(unnumbered),
+                     [&mount](const auto &known) { return mount.type == known.type; });
     struct statfs system = {};
-    return entry != std::cend(unnumbered) && fstatfs(directory, &system) == 0
+    return entry != std::cend(unnumbered) && !mount.isCovered && fstatfs(directory, &system) == 0
         && static_cast<unsigned>(system.f_type) == entry->magic;
 }
 
@@ -99,10 +107,18 @@ QString emptyMount(const QByteArray &device, const Mount &mount)
     // after the card has been unmounted.
     FileDescriptor fd = openDirectory(mount.directory.constData());
     if (!fd.isOpen()) {
-        // A card that cannot be read counts as empty, as for removeAllEntries().
-        return errno == ENOTDIR ? QStringLiteral("not a directory") : QString();
+        switch (errno) {
+        case ENOTDIR:
+            return QStringLiteral("not a directory");
+        case EMFILE:
+        case ENFILE:
+        case ENOMEM:
+            return qt_error_string(errno);
+        default: // A card that cannot be read counts as empty, as for removeAllEntries().
+            return {};
+        }
     }
-    if (!liesOn(device, mount.type, fd.get())) {
+    if (!liesOn(device, mount, fd.get())) {
         return QStringLiteral("not on the device");
     }
     const Leftovers left = emptyDirectory(std::move(fd));
@@ -175,6 +191,10 @@ bool FileRemover::emptyCard() const
     while (const mntent *entry = table.next()) {
         if (device == entry->mnt_fsname) {
             mounts.push_back({entry->mnt_dir, QByteArray(entry->mnt_type).split('.').first()});
+            continue;
+        }
+        for (Mount &mount : mounts) {
+            mount.isCovered = mount.isCovered || hides(entry->mnt_dir, mount.directory);
         }
     }
     if (mounts.empty()) {

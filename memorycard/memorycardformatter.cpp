@@ -130,10 +130,15 @@ constexpr QLatin1String probeCommand = "probe"_L1;
     card: the card has been unmounted, another file system is mounted over it, or the mount table is
     wrong. The device number of the directory must be that of the device node \l devicePath. Only
     the file systems btrfs, FUSE, overlay and tmpfs have numbers of their own: there, the type of
-    the file system must be the one in the mount table. A device that has the root directory is not
+    the file system must be the one in the mount table, and no other device may come later in the
+    table with the same directory or one above it. A device that has the root directory is not
     a card: none of its mount directories is emptied. A mount directory that cannot be opened counts
-    as empty. If the card is mounted more than once, the operation succeeds if one mount directory
-    can be emptied.
+    as empty, unless the process has too few file descriptors or too little memory. If the card is
+    mounted more than once, the operation succeeds if one mount directory can be emptied.
+
+    A directory on the card with another device number stays, and the status becomes \c Error: another
+    file system is mounted there, or it is a subvolume of btrfs. So does the card if \l devicePath
+    does not begin with a slash.
 
     \section2 Work outlives its formatter
     Destroying a formatter stops neither the removal of files nor a helper that is formatting,
@@ -265,8 +270,8 @@ void MemoryCardFormatter::format(const QString &type)
     Mounts the card, unless it is already mounted, and removes all files and directories on it, on a
     thread of the application's global thread pool. If some cannot be removed, the others are
     removed first, and the status then becomes \c Error. It also becomes \c Error if no thread can
-    be started, or if the application clears the thread pool before the removal starts. An empty
-    \l devicePath leads to \c Error with a warning.
+    be started, if the process may open fewer than 16 more files, or if the application clears the
+    thread pool before the removal starts. An empty \l devicePath leads to \c Error with a warning.
 */
 void MemoryCardFormatter::removeAllFiles()
 {

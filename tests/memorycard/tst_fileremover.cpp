@@ -7,6 +7,7 @@
 #include "patience.h"
 #include "scratchfilesystem.h"
 #include "texts.h"
+#include "usedupdescriptors.h"
 
 #include <QDir>
 #include <QFile>
@@ -20,6 +21,7 @@
 #include <atomic>
 #include <memory>
 
+#include <dlfcn.h>
 #include <linux/capability.h>
 #include <linux/magic.h>
 #include <sys/mount.h>
@@ -61,6 +63,9 @@ QByteArray line(const QByteArray &source, const QByteArray &directory,
 {
     return source + ' ' + escaped(directory) + ' ' + type + " rw,nosuid 0 0\n";
 }
+
+// The type of all file systems, if it is set.
+unsigned pretendedType = 0;
 
 // Root may read and remove everything. Without these capabilities, root has only an owner's
 // permissions.
@@ -113,6 +118,18 @@ private:
 
 } // namespace
 
+// With 64-bit inode numbers this name means fstatfs64.
+extern "C" Q_DECL_EXPORT int fstatfs(int descriptor, struct statfs *system) noexcept
+{
+    static auto *const real =
+        reinterpret_cast<int (*)(int, struct statfs *)>(dlsym(RTLD_NEXT, "fstatfs64"));
+    const int result = real(descriptor, system);
+    if (pretendedType != 0) {
+        system->f_type = pretendedType;
+    }
+    return result;
+}
+
 class tst_FileRemover : public LoggedTest
 {
     Q_OBJECT
@@ -136,6 +153,7 @@ private Q_SLOTS:
     void entriesThatCannotBeRemoved();
     void directoryWithoutPermissions();
     void readOnlyCard();
+    void noDescriptorForTheCard();
     void mountDirectoryReplaced_data();
     void mountDirectoryReplaced();
     void directoriesOnTheDevice_data();
@@ -168,6 +186,7 @@ void tst_FileRemover::init()
 
 void tst_FileRemover::cleanup()
 {
+    pretendedType = 0;
     QDir::setCurrent("/"_s);
     QCOMPARE(read(path("outside/file")), QByteArray("precious"));
     m_files.reset();
@@ -298,6 +317,12 @@ void tst_FileRemover::entriesOfTheMountTable_data()
     completes("mounted twice", card + line(device, "@/other"), "card");
     completes("escape", line("/dev/a\\040card", "@/card"), "card", "/dev/a card");
     completes("encoded", line("/dev/\xc3\xa9", "@/card"), "card", "/dev/\xc3\xa9");
+    completes("another device below it", line("/dev/other", "@/card") + card, "card");
+    completes("another device between", card + line("/dev/other", "@/card") + card, "card");
+    completes("another device beside it",
+              card + line("/dev/other", "@/car") + line("/dev/other", "@/cards")
+                  + line("/dev/other", "@/card/directory"),
+              "card");
     // A directory that cannot be opened counts as empty.
     completes("missing mount directory", line(device, "@/nowhere"), "");
 
@@ -308,6 +333,11 @@ void tst_FileRemover::entriesOfTheMountTable_data()
     fails("empty table", "");
     fails("blank lines", "\n\n   \n#\n");
     fails("comments", "# " + card + '#' + card + line("/dev/other", "@/card"));
+    // The directory may be on the other device.
+    fails("another device over it", card + line("/dev/other", "@/card"));
+    fails("another device over the directory above it",
+          line(device, "@/card/directory") + line("/dev/other", "@/card"));
+    fails("another device over the root directory", card + line("/dev/other", "/"));
     // Device paths are compared exactly.
     for (const char *path : {"/dev/Test-card1", "/dev/test-card", "/dev/test-card11",
                              "/dev/test-card1/", "/dev//test-card1", "/dev/test-card1 "}) {
@@ -536,6 +566,18 @@ void tst_FileRemover::readOnlyCard()
     QCOMPARE(listAll(card), cardEntries);
 }
 
+void tst_FileRemover::noDescriptorForTheCard()
+{
+    const QByteArray card = makeCard("card");
+    writeMountTable(line(device, card));
+    {
+        const UsedUpDescriptors used(1); // the mount table takes it
+        QCOMPARE(runHere(device), Error);
+    }
+    QCOMPARE(m_reason, "on \"" + card + "\" because \"" + qt_error_string(EMFILE).toUtf8() + '"');
+    QCOMPARE(listAll(card), cardEntries);
+}
+
 void tst_FileRemover::mountDirectoryReplaced_data()
 {
     QTest::addColumn<QByteArray>("entry");
@@ -587,6 +629,8 @@ void tst_FileRemover::directoriesOnTheDevice_data()
         row(node, "tmpfs", "tmpfs", none);
         row(node, "tmpfs", "tmpfs.sub", none);
         row(node, "overlay", "overlay", none);
+        row(node, "btrfs", "btrfs", none);
+        row(node, "fuse", "fuse.exfat", none);
         // But it has the type of the entry.
         for (const char *type : {"btrfs", "fuse", "fuse.exfat", "overlay"}) {
             row(node, "tmpfs", type, refused);
@@ -605,7 +649,7 @@ void tst_FileRemover::directoriesOnTheDevice()
     QFETCH(const QByteArray, reason);
     // The throw-away root has overlays.
     const QTemporaryDir onOverlay("/etc/card"_s);
-    const bool inMemory = directory == "tmpfs";
+    const bool inMemory = directory != "overlay";
     const QByteArray card = inMemory ? makeCard("card") : QFile::encodeName(onOverlay.path());
     makeFiles(card, 4);
     struct statfs system = {};
@@ -627,6 +671,9 @@ void tst_FileRemover::directoriesOnTheDevice()
         }
     }
     writeMountTable(line(path, card, type));
+    pretendedType = directory == "btrfs" ? BTRFS_SUPER_MAGIC
+        : directory == "fuse"            ? FUSE_SUPER_MAGIC
+                                         : 0;
     QCOMPARE(runHere(path), reason.isEmpty() ? Completed : Error);
     QVERIFY2(m_reason.contains(reason), m_reason.constData());
     QCOMPARE(listAll(card), reason.isEmpty() ? QByteArrayList() : before);

@@ -23,6 +23,7 @@ namespace {
 constexpr QLatin1String program = "/usr/libexec/sdcardhelper"_L1;
 
 // In bytes. A warning has no more of the standard error.
+constexpr const char *noProcess = "no process can be started";
 constexpr std::size_t maxErrorLine = 200;
 
 } // namespace
@@ -51,10 +52,12 @@ bool HelperProcess::start(Kind kind, const QStringList &arguments)
     m_kind = kind;
     m_isAwaited = true;
     if (!ProcessLimits::hasDescriptorsLeft()) {
-        // Reported later, as QProcess does when it finds that the helper cannot start.
-        QMetaObject::invokeMethod(
-            this, [this] { reportFailedStart(QStringLiteral("too many files are open")); },
-            Qt::QueuedConnection);
+        reportFailedStartLater("too many files are open");
+        return false;
+    }
+    // A limit of processes counts threads, too.
+    if (!ProcessLimits::canStartThread()) {
+        reportFailedStartLater(noProcess);
         return false;
     }
     if (m_process == nullptr) {
@@ -95,7 +98,7 @@ void HelperProcess::makeProcess()
 
 // Qt 5.15 does not notice that clone() fails, and treats the process as running with the process id
 // -1. Killing or destroying such a QProcess would kill all processes of the user, so the object
-// stays until the end of the application and does nothing any more.
+// stays until the end of the application, with three descriptors, and does nothing any more.
 void HelperProcess::abandonProcess()
 {
     static std::vector<QProcess *> abandoned;
@@ -107,9 +110,7 @@ void HelperProcess::abandonProcess()
     m_process->disconnect();
     m_process->setParent(nullptr);
     m_process = nullptr;
-    QMetaObject::invokeMethod(
-        this, [this] { reportFailedStart(QStringLiteral("no process can be started")); },
-        Qt::QueuedConnection);
+    reportFailedStartLater(noProcess);
 }
 
 // Returns the name of a new file in memory. A pipe would end a helper that outlives the
@@ -119,6 +120,14 @@ QString HelperProcess::redirectErrors()
     m_errors = FileDescriptor(memfd_create("errors of the card helper", MFD_CLOEXEC));
     const QString name = QStringLiteral("/proc/self/fd/%1").arg(m_errors.get());
     return access(QFile::encodeName(name).constData(), W_OK) == 0 ? name : QProcess::nullDevice();
+}
+
+// As QProcess does when it finds that the helper cannot start.
+void HelperProcess::reportFailedStartLater(const char *reason)
+{
+    QMetaObject::invokeMethod(
+        this, [this, reason] { reportFailedStart(QString::fromLatin1(reason)); },
+        Qt::QueuedConnection);
 }
 
 void HelperProcess::reportFailedStart(const QString &reason)

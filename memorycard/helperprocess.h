@@ -43,6 +43,7 @@ private:
     void makeProcess();
     void abandonProcess();
     QString redirectErrors();
+    void reportFailedStartLater(const char *reason);
     void reportFailedStart(const QString &reason);
     void reportEnd(int code, QProcess::ExitStatus status);
     QString firstLineOfErrors() const;

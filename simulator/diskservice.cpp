@@ -11,7 +11,7 @@
       done            replies
       ERROR           answers with the disk service's error of that name, such as DeviceBusy
       UnknownError    answers with an error that no version of the disk service knows
-      failed          answers with D-Bus's own error Failed
+      failed          answers with another service's error Failed
       slow            replies after a second
       hung            does not reply until there is a line on its standard input
       gone            ends without a reply
@@ -45,6 +45,8 @@ namespace {
 const QLatin1String service("org.freedesktop.UDisks2");
 const QLatin1String rootPath("/org/freedesktop/UDisks2");
 const QLatin1String errorPrefix("org.freedesktop.UDisks2.Error.");
+// Differs from an error of the disk service in one character.
+const QLatin1String otherError("org.freedesktop.UDisks3.Error.Failed");
 const QLatin1String mountPoint("/media/card");
 constexpr int slowness = 1000; // ms
 
@@ -93,7 +95,7 @@ public:
         if (errors.contains(scenario)) {
             bus.send(message.createErrorReply(errorPrefix + scenario, QStringLiteral("as told")));
         } else if (scenario == QLatin1String("failed")) {
-            bus.send(message.createErrorReply(QDBusError::Failed, QStringLiteral("as told")));
+            bus.send(message.createErrorReply(otherError, QStringLiteral("as told")));
         } else if (scenario == QLatin1String("slow")) {
             QTimer::singleShot(slowness, this, [message, bus] { reply(message, bus); });
         } else if (scenario == QLatin1String("hung")) {

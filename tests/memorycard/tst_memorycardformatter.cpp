@@ -542,7 +542,7 @@ void TestMemoryCardFormatter::scripts_data()
                   method.toLower() + " Error" + error + (isForgiven ? "" : ", Error"));
         }
         fails("UnknownError", "org.freedesktop.UDisks2.Error.UnknownError", "Error");
-        fails("failed", "org.freedesktop.DBus.Error.Failed", "Error");
+        fails("failed", "org.freedesktop.UDisks3.Error.Failed", "Error");
         fails("gone", "org.freedesktop.DBus.Error.NoReply", "Error");
         fails("absent", "org.freedesktop.DBus.Error.ServiceUnknown", "Error");
     }
@@ -675,6 +675,12 @@ void TestMemoryCardFormatter::scripts_data()
         "helper exit=1, when Error: format vfat, path /dev/testcard1, wait -> path /dev/testcard1, "
         "Probing, busy, Error, not busy, not busy",
         "", "probe|testcard1", {helperFailed("exit=1", "probe", "testcard1"), unmountWithoutName});
+    // One that is refused leaves nothing to start, either.
+    row("a refused operation in a handler while another waits", named, "NotAuthorized",
+        "when mount ErrorNotAuthorized: mount, when Error: name; mount; name testcard1, mount, "
+        "wait "
+        "-> not busy, mount ErrorNotAuthorized, not busy, Error, name , not busy, name testcard1",
+        "Mount testcard1", "", {diskServiceError("Mount", "NotAuthorized"), mountWithoutName});
     // The request starts the probe that waits. No second command may start next to it.
     row("a request in a handler while a probe waits", withCard, "hung",
         "format vfat, path /dev/testcard2, helper exit=1, when Error: helper done ext4; unmount, "
@@ -832,13 +838,21 @@ void TestMemoryCardFormatter::helperWithFewDescriptors()
 
 void TestMemoryCardFormatter::helperBeyondTheProcessLimit()
 {
+    const QByteArray none = "warning [com.marlo.settings.system.memorycard] Cannot start "
+                            "\"/usr/libexec/sdcardhelper\" because \"no process can be started\"";
     installHelper("done", "ext4\n");
-    cloneFails = true;
+    // A process that cannot be started costs descriptors, so none is tried where threads cannot be.
+    threadsFail = true;
     m_formatter->setDevicePath(card);
     TRY_EVENTS("path /dev/testcard1, Error");
-    QCOMPARE(takeLog(),
-             QByteArray("warning [com.marlo.settings.system.memorycard] Cannot start "
-                        "\"/usr/libexec/sdcardhelper\" because \"no process can be started\""));
+    QCOMPARE(takeLog(), none);
+    QVERIFY(m_formatter->findChildren<QProcess *>().isEmpty());
+    threadsFail = false;
+    cloneFails = true;
+    makeFormatter();
+    m_formatter->setDevicePath(card);
+    TRY_EVENTS("path /dev/testcard1, Error");
+    QCOMPARE(takeLog(), none);
     // Destroying the formatter signals no process.
     makeFormatter();
     m_formatter->setDevicePath(card);
@@ -1245,9 +1259,10 @@ void TestMemoryCardFormatter::goesDuringAFormat()
         TRY(m_helper->running().size() == 1);
         QTest::qWait(100);
         QCOMPARE(m_helper->running().size(), 1);
-        // The helper writes to /dev/null, so it can continue even after the application has ended.
-        QCOMPARE(QFile::symLinkTarget("/proc/%1/fd/1"_s.arg(m_helper->running().first())),
-                 "/dev/null"_s);
+        // The helper has no pipe, so it can continue even after the application has ended.
+        const QString descriptors = "/proc/%1/fd/"_s.arg(m_helper->running().first());
+        QCOMPARE(QFile::symLinkTarget(descriptors + "1"_s), "/dev/null"_s);
+        QVERIFY(QFile::symLinkTarget(descriptors + "2"_s).startsWith("/memfd:"_s));
         QVERIFY(process != nullptr);
         m_helper->release();
         TRY(process == nullptr);

@@ -13,6 +13,7 @@
 #include <QThreadPool>
 #include <QtTest>
 
+#include <cerrno>
 #include <csignal>
 
 #include <sys/mount.h>
@@ -211,9 +212,12 @@ void TestCardFaults::fullCard()
 {
     const QTemporaryDir dir;
     const QByteArray path = QFile::encodeName(dir.path());
-    QCOMPARE(mount(QFile::encodeName(device).constData(), path.constData(), "tmpfs", 0,
-                   "size=64k,nr_inodes=10"),
-             0);
+    if (mount(QFile::encodeName(device).constData(), path.constData(), "tmpfs", 0,
+              "size=64k,nr_inodes=10")
+        != 0) {
+        QCOMPARE(errno, EPERM);
+        QSKIP("this system forbids mounts");
+    }
     int written = 0;
     for (int i = 0; i < 20; ++i) {
         QFile file(dir.filePath(QString::number(i)));

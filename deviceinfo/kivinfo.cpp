@@ -123,22 +123,27 @@ void KivInfo::slotIdFinished(QDBusPendingCallWatcher *watcher)
 void KivInfo::slotReadyFinished(QDBusPendingCallWatcher *watcher)
 {
     watcher->deleteLater();
-    setKivReady(valueOf<int>(*watcher) == ready);
+    m_latestReady = valueOf<int>(*watcher) == ready;
+    setKivReady(m_latestReady);
 }
 
 void KivInfo::propertiesChanged(const QDBusMessage &message)
 {
     const QVariantMap changed = changedProperties(message);
     const auto id = changed.constFind(idProperty);
-    // A handler of the change may delete this object.
+    const auto readiness = changed.constFind(readyProperty);
+    if (readiness != changed.constEnd()) {
+        // A number that is too large for an int would wrap around.
+        m_latestReady = readiness->toLongLong() == ready;
+    }
+    // A handler of the change may delete this object, or run an event loop in which a newer signal
+    // arrives.
     const QPointer<KivInfo> self(this);
     if (id != changed.constEnd()) {
         setKivId(id->toString());
     }
-    const auto readiness = changed.constFind(readyProperty);
-    if (self != nullptr && readiness != changed.constEnd()) {
-        // A number that is too large for an int would wrap around.
-        setKivReady(readiness->toLongLong() == ready);
+    if (self != nullptr) {
+        setKivReady(m_latestReady);
     }
 }
 

@@ -38,6 +38,7 @@ private:
 
     QString m_kivId;
     bool m_kivReady = false;
+    bool m_latestReady = false; // kivReady as the daemon sent it last
 };
 
 #endif

@@ -39,6 +39,7 @@ private Q_SLOTS:
     void nonsenseChangesNothing();
     void othersChangeNothing();
     void aHandlerMayCallBack();
+    void aHandlerMayWaitForTheNextSignal();
 
     void followsADaemonThatStartsLater();
 };
@@ -210,8 +211,10 @@ void TestKivInfo::repliesAreTyped()
     QTEST(info.report(), "report");
 
     // The values stay until the next change signal.
+    const bool wasReady = info.kivReady();
     sendLast(daemon);
     TRY_COMPARE(info.kivId(), lastCover);
+    QCOMPARE(info.kivReady(), wasReady);
 }
 
 void TestKivInfo::errorsKeepTheDefaults()
@@ -455,6 +458,20 @@ void TestKivInfo::aHandlerMayCallBack()
     page = new KivInfo;
     connect(page, &KivInfo::kivIdChanged, this, [&page] { delete page; });
     TRY(page == nullptr);
+}
+
+void TestKivInfo::aHandlerMayWaitForTheNextSignal()
+{
+    CoverDaemon daemon;
+    const CountingKivInfo info;
+    connect(&info, &KivInfo::kivIdChanged, this, [&] {
+        if (info.kivId() == cover) {
+            daemon.sendChanges({{idProperty, lastCover}, {readyProperty, 0}});
+            TRY_COMPARE(info.kivId(), lastCover);
+        }
+    });
+    daemon.sendChanges({{idProperty, cover}, {readyProperty, 1}});
+    TRY_COMPARE(info.report(), "last not ready: 2 0"_s);
 }
 
 void TestKivInfo::followsADaemonThatStartsLater()

@@ -261,9 +261,12 @@ void EventsWidgetsModel::enabledWidgetsChanged()
 
     const Choice choice(m_enabledItem.value());
     m_knownPaths.clear();
+    // First, because a handler of the rest may make the user's first choice.
+    for (const Widget &widget : qAsConst(m_rows)) {
+        m_knownPaths.append(widget.path);
+    }
     for (int row = 0; row < m_rows.size(); ++row) {
         Widget &widget = m_rows[row];
-        m_knownPaths.append(widget.path);
         const bool enabled = choice.enables(widget);
         if (widget.enabled != enabled) {
             widget.enabled = enabled;

@@ -77,6 +77,7 @@ private Q_SLOTS:
     // Re-entrant calls
     void changesWaitForOneAnother();
     void firstChoiceInTheMiddleOfAScan();
+    void firstChoiceInTheMiddleOfAChange();
     void languageChangesInTheMiddleOfAScan();
 
 private:
@@ -350,6 +351,19 @@ void TestEventsWidgetsModel::firstChoiceInTheMiddleOfAScan()
     QCOMPARE(listThen, "a b c a"_s);
     QCOMPARE(stored(), "a c"_s);
     TRY_COMPARE(enabled(), words("true false true"));
+}
+
+void TestEventsWidgetsModel::firstChoiceInTheMiddleOfAChange()
+{
+    store(a);
+    loadModel(R"({ "path": "a" }, { "path": "b", "default_enabled": true },
+                 { "path": "c", "default_enabled": true })");
+    // The handler sees the first row changed only. The stored list names every other widget.
+    once(m_model.get(), &Model::dataChanged, [this] { m_model->disableWidget(a); });
+    m_key->unset();
+    QCOMPARE(stored(), "b c"_s);
+    QCoreApplication::processEvents();
+    QCOMPARE(enabledRows(), "b c"_s);
 }
 
 void TestEventsWidgetsModel::languageChangesInTheMiddleOfAScan()

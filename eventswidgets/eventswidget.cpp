@@ -3,9 +3,8 @@
 
 #include "eventswidget.h"
 
+#include "files/regularfile.h"
 #include "translations/catalogtable.h"
-
-#include <QFileInfo>
 
 namespace {
 
@@ -32,7 +31,7 @@ QString EventsWidget::translatedDescription() const
 
 bool EventsWidget::isAvailable() const
 {
-    return availablePath.isEmpty() || QFileInfo::exists(availablePath);
+    return availablePath.isEmpty() || fileExists(availablePath);
 }
 
 bool EventsWidget::operator!=(const EventsWidget &other) const

@@ -338,6 +338,13 @@ void TestEventsWidgetsFile::availability()
 
     const QByteArray path = '"' + widget.availablePath.toUtf8() + '"';
     QVERIFY(readWidget(", \"available_path\": " + path).available);
+
+    // Only a path can exist: not a name in a search path of the application, nor a cut path.
+    QDir::addSearchPath("root"_s, m_root->path());
+    widget.availablePath = "root:needed"_s;
+    QVERIFY(!widget.isAvailable());
+    widget.availablePath = m_root->filePath("needed"_s) + QChar::Null;
+    QVERIFY(!widget.isAvailable());
 }
 
 void TestEventsWidgetsFile::comparison()

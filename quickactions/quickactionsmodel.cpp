@@ -486,7 +486,8 @@ void QuickActionsModel::applyMoves()
 // stored another one.
 void QuickActionsModel::applyMove(int index, int newIndex)
 {
-    if (storedList() != m_enabledList) {
+    // At most twice: a handler of the first update may store yet another list, but not forever.
+    for (int i = 0; i < 2 && storedList() != m_enabledList; ++i) {
         updateEnabledActions();
     }
     const int size = m_enabledList.size();

@@ -76,6 +76,7 @@ private Q_SLOTS:
     void showPotentialSetInAHandler();
     void movesWaitForTheRows();
     void moveFollowsTheStoredList();
+    void moveFollowsAChoiceInAHandler();
 
 private:
     void makeModel(bool showPotential);
@@ -570,6 +571,29 @@ void TestQuickActionsModel::moveFollowsTheStoredList()
     m_model->move(2, 0);
     QCOMPARE(rows(), "b c a"_s);
     QCOMPARE(stored(), "b c a"_s);
+}
+
+void TestQuickActionsModel::moveFollowsAChoiceInAHandler()
+{
+    loadEnabled("a b"_s);
+    define("c d"_s);
+    DconfTool::waitUntilStored();
+    DconfTool::write(Places::enabledActions, paths("a b c"_s));
+    // The row of "c" is inserted for the move.
+    once(m_model.get(), &Model::rowsInserted, [this] { choose("enable", "d"_s); });
+    m_model->move(0, 1);
+    QCOMPARE(rows(), "b a c d"_s);
+    QCOMPARE(stored(), "b a c d"_s);
+
+    // A handler that stores another list each time prevents the move, but the call returns.
+    m_model->setShowPotential(true);
+    connect(m_model.get(), &Model::dataChanged, this,
+            [this] { choose(words(stored()).contains("b"_s) ? "disable" : "enable", "b"_s); });
+    DconfTool::waitUntilStored();
+    DconfTool::write(Places::enabledActions, paths("a c d"_s));
+    m_model->move(0, 1);
+    QCOMPARE(rows(), "b a c d"_s);
+    QCOMPARE(stored(), "a c d b"_s);
 }
 
 QTEST_GUILESS_MAIN(TestQuickActionsModel)

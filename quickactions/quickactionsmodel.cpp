@@ -84,8 +84,9 @@ QSet<QString> setOf(const QStringList &texts)
     \endqml
 
     \note Handlers may call any method of the model. enableAction() and disableAction() store the
-    list at once. While rows are being changed, everything else waits until control returns to the
-    event loop. The model then reloads at most once, and the moves follow in the order of the calls.
+    list at once. While rows are being changed, updates and moves wait until control returns to the
+    event loop. The model then runs each kind of update at most once, and all moves in the order of
+    the calls.
 
     \image gallery-quick-actions.png The gallery's page for this type
 

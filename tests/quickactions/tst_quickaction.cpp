@@ -5,6 +5,7 @@
 
 #include "files.h"
 #include "loggedtest.h"
+#include "openings.h"
 #include "patience.h"
 #include "places.h"
 #include "quickactions/quickaction.h"
@@ -15,11 +16,7 @@
 #include <QtTest>
 
 #include <algorithm>
-#include <array>
 #include <iterator>
-
-#include <sys/inotify.h>
-#include <unistd.h>
 
 using Action = QuickAction;
 
@@ -260,23 +257,17 @@ void TestQuickAction::priority()
 
 void TestQuickAction::rereadsChangedFilesOnly()
 {
-    const int watcher = inotify_init1(IN_NONBLOCK | IN_CLOEXEC);
-    QVERIFY(watcher >= 0);
-    const auto isOpened = [watcher] {
-        std::array<char, 4096> events = {};
-        return read(watcher, events.data(), events.size()) > 0;
-    };
     write("title=old\n");
     QFile file(m_path);
     QVERIFY(file.open(QIODevice::ReadWrite));
     const QDateTime time = QDateTime::currentDateTime();
     QVERIFY(file.setFileTime(time, QFileDevice::FileModificationTime));
-    QVERIFY(inotify_add_watch(watcher, QFile::encodeName(m_path), IN_OPEN) >= 0);
+    const Openings openings(m_path);
     const Action action(m_path, true);
-    QVERIFY(isOpened());
+    QVERIFY(openings.take());
     QCOMPARE(action.reread(true), action);
     QVERIFY(!action.reread(false).enabled());
-    QVERIFY(!isOpened());
+    QVERIFY(!openings.take());
 
     // The same size and modification time: only the time of the change differs.
     const QDateTime change = QFileInfo(m_path).metadataChangeTime();
@@ -285,10 +276,9 @@ void TestQuickAction::rereadsChangedFilesOnly()
     file.close();
     const Action touched = action.reread(true);
     QCOMPARE(touched, action);
-    QVERIFY(isOpened());
+    QVERIFY(openings.take());
     QCOMPARE(touched.reread(true), action);
-    QVERIFY(!isOpened());
-    close(watcher);
+    QVERIFY(!openings.take());
 
     write("title=changed\n");
     QCOMPARE(action.reread(true).title(), "changed"_s);

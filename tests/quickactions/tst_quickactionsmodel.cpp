@@ -5,6 +5,7 @@
 #include "files.h"
 #include "listmodeltest.h"
 #include "mgconfitem.h"
+#include "openings.h"
 #include "patience.h"
 #include "places.h"
 #include "quickactions/quickactionsmodel.h"
@@ -61,6 +62,7 @@ private Q_SLOTS:
     void choicesAreNoted();
     void move_data();
     void move();
+    void moveBeforeCompletion();
     void moveIsNotReloaded();
     void requestsDuringAMove_data();
     void requestsDuringAMove();
@@ -311,6 +313,13 @@ void TestQuickActionsModel::catalogsOfARowChangeWithIt()
     QCOMPARE(texts.mid(2), words("Kartat Kartat Kartat Kartat"));
     store(QString());
     QCOMPARE(texts.mid(6), words("Kartat maps-title"));
+    // A changed row has the texts of its new catalog when views learn of it.
+    store("a"_s);
+    QString changed;
+    once(m_model.get(), &Model::dataChanged, [&] { changed = qtTrId("maps-title"); });
+    define("a"_s, "atlas");
+    reload();
+    QCOMPARE(changed, "Atlas"_s);
 }
 
 void TestQuickActionsModel::choicesAreNoted()
@@ -369,6 +378,14 @@ void TestQuickActionsModel::move()
     QuickActionsModel other;
     other.componentComplete();
     QTEST(rowsOf(other), "rows");
+}
+
+void TestQuickActionsModel::moveBeforeCompletion()
+{
+    store("a b"_s);
+    makeModel(false);
+    m_model->move(0, 1);
+    QCOMPARE(stored(), "b a"_s);
 }
 
 void TestQuickActionsModel::moveIsNotReloaded()
@@ -488,7 +505,9 @@ void TestQuickActionsModel::reloadsOfUnchangedFiles()
     writeBroken();
     loadModel(true);
     QCOMPARE(takeMessages(), QStringList(unreadableWarning));
+    const Openings openings(path("a"_s));
     reload();
+    QVERIFY(!openings.take());
     QCOMPARE(events(), QString());
     // A file that cannot be read is tried, and reported, each time.
     QCOMPARE(takeMessages(), QStringList(unreadableWarning));

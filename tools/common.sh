@@ -82,19 +82,26 @@ install_missing() { # install_missing PACKAGE...
     ((${#missing[@]} > 0)) || return 0
     (($(id -u) == 0)) || command -v sudo >/dev/null \
         || die "missing packages, and no sudo to install them: ${missing[*]}"
+    [[ -z ${MARLO_THROW_AWAY_ROOT-} ]] || die "install these outside of the sandbox: ${missing[*]}"
     echo "dev: installing ${missing[*]}"
-    ( # apt-get does not wait for that of another command
+    ( # A sandbox that uses this system's own root has the same lock.
         flock 9
         as_root apt-get update -q 9<&-
         as_root env DEBIAN_FRONTEND=noninteractive \
-            apt-get install -q -y --no-install-recommends "${missing[@]}" 9<&-
-    ) 9<debian/control
+            apt-get install -q -y --no-install-recommends -o DPkg::Lock::Timeout=600 "${missing[@]}" 9<&-
+    ) 9</var/lib
 }
 
 # Says what the throw-away root will be, or ends with the reason why there can be none. Asked before
 # anything is installed or built.
 check_sandbox() {
     simulator/sandbox --check || exit
+    if [[ $(simulator/sandbox --mode) == *namespace ]]; then
+        [[ $PWD/ != @(/mnt|/run)/* ]] || die "move the sources: the sandbox hides /mnt and /run"
+    elif [[ -e /var/lib/marlo-sandbox ]]; then
+        # What another run restores must not be what this one installs.
+        simulator/sandbox -- true
+    fi
 }
 
 # Lists all files of this tree that git does not ignore, including new ones. A copy of the tree has

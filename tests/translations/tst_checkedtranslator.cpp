@@ -11,6 +11,9 @@
 #include <QFile>
 #include <QtTest>
 
+#include <atomic>
+#include <thread>
+
 class TestCheckedTranslator : public LoggedTest
 {
     Q_OBJECT
@@ -25,6 +28,7 @@ private Q_SLOTS:
     void readsOnlyRegularFilesOfLimitedSize();
     void keepsACatalogWhoseFileIsCut();
     void replacesACatalog();
+    void mayBeDeletedWhileAnotherThreadTranslates();
     void warnsOnceOfACatalogThatItDoesNotUse();
 };
 
@@ -286,6 +290,37 @@ void TestCheckedTranslator::replacesACatalog()
     QVERIFY(!translator.loadFile(path).isEmpty());
     QCOMPARE(qtTrId("maps-title"), "maps-title"_s);
     QVERIFY(translator.isEmpty());
+}
+
+void TestCheckedTranslator::mayBeDeletedWhileAnotherThreadTranslates()
+{
+    // The address sanitizer notices if the thread reads freed content. Each look-up reads all these
+    // messages, so the thread spends nearly all its time there.
+    const QByteArray another = bytes(quint8(6), QByteArray("x"), quint8(1));
+    const int count = 100000;
+    QByteArray index;
+    for (int i = 0; i < count; ++i) {
+        index += bytes(1, i * another.size());
+    }
+    Files::write(path, magic + section(hashes, index) + section(messages, another.repeated(count)));
+    auto translator = std::make_unique<CheckedTranslator>();
+    QCOMPARE(translator->loadFile(path), QString());
+    QCoreApplication::installTranslator(translator.get());
+
+    std::atomic<bool> isReading = false;
+    std::atomic<bool> isDone = false;
+    std::thread reader([&] {
+        while (!isDone) {
+            qtTrId(text);
+            isReading = true;
+        }
+    });
+    while (!isReading) {
+        std::this_thread::yield();
+    }
+    translator.reset();
+    isDone = true;
+    reader.join();
 }
 
 void TestCheckedTranslator::warnsOnceOfACatalogThatItDoesNotUse()

@@ -12,15 +12,14 @@ constexpr int patience = 60000;
 
 // Unlike QTRY_VERIFY and QTRY_COMPARE, which look every 50 ms, these look every 2 ms.
 #define TRY(condition) QVERIFY2(becomesTrue([&] { return bool(condition); }), #condition)
-#define TRY_COMPARE(actual, expected) \
-    do { \
-        becomesTrue([&] { return (actual) == (expected); }); \
-        QCOMPARE(actual, expected); \
+#define TRY_COMPARE(actual, expected)                                                              \
+    do {                                                                                           \
+        becomesTrue([&] { return (actual) == (expected); });                                       \
+        QCOMPARE(actual, expected);                                                                \
     } while (false)
 
 // Whether a condition is met in time.
-template<typename Condition>
-bool becomesTrue(Condition condition)
+template<typename Condition> bool becomesTrue(Condition condition)
 {
     const QDeadlineTimer deadline(patience);
     bool met = false;

@@ -330,7 +330,9 @@ void QuickActionsModel::disableAction(const QString &path)
 
     Moves the row and the entry of the user's list at \a index to \a newIndex. Like enableAction(),
     it records that the user has changed the list. An index outside the user's list is silently
-    ignored. If a dconf profile locks the list, the row returns to its old place.
+    ignored. If a dconf profile locks the list, or a handler of \c rowsAboutToBeMoved stores another
+    one, the row returns to its old place. If dconf fails to store the list later, it restores the
+    list from before, but the row stays at its new place.
 
     The rows must begin with the enabled actions in the user's order. Without \l showPotential this
     is true unless an enabled action is missing or blocked, or another model or process has changed

@@ -62,6 +62,7 @@ private Q_SLOTS:
     void goesWhileTheServiceHangs();
     void serviceDiesInTheMiddleOfAWrite();
     void serviceIsAbsent();
+    void moveIsNotStored();
     void everyOtherType();
     void hugeLists();
     void hugeDatabase();
@@ -265,6 +266,35 @@ void reloadBusConfiguration()
     QCOMPARE(QDBusConnection::sessionBus().call(call).type(), QDBusMessage::ReplyMessage);
 }
 
+// Takes the service away. The bus cannot start it again.
+class AbsentService
+{
+public:
+    AbsentService()
+    {
+        if (!QFile::rename(serviceFile, m_away)) {
+            qFatal("cannot take the service of dconf away");
+        }
+        reloadBusConfiguration();
+        const pid_t pid = servicePid();
+        if (pid > 0) {
+            kill(pid, SIGKILL);
+        }
+        becomesTrue([] { return servicePid() == 0; });
+    }
+    ~AbsentService() { comeBack(); }
+    Q_DISABLE_COPY_MOVE(AbsentService)
+    void comeBack()
+    {
+        if (QFile::rename(m_away, serviceFile)) {
+            reloadBusConfiguration();
+        }
+    }
+
+private:
+    const QString m_away = serviceFile + QStringLiteral(".away");
+};
+
 // dconf logs this for each failed write. Their number varies, because it may merge waiting writes.
 bool isFailedWrite(const QString &message)
 {
@@ -404,25 +434,48 @@ void TestDconfFaults::serviceDiesInTheMiddleOfAWrite()
 
 void TestDconfFaults::serviceIsAbsent()
 {
-    const QString away = serviceFile + QStringLiteral(".away");
-    QVERIFY(QFile::rename(serviceFile, away));
-    reloadBusConfiguration();
-    const pid_t pid = servicePid();
-    if (pid > 0) {
-        QCOMPARE(kill(pid, SIGKILL), 0);
-    }
-    TRY_COMPARE(servicePid(), 0);
-
+    AbsentService service;
+    QCOMPARE(servicePid(), 0);
     m_user->choose(true);
     QVERIFY(aWriteFails());
     TRY_COMPARE(m_user->isOn(), false);
     QVERIFY(!m_make().isOn());
 
-    QVERIFY(QFile::rename(away, serviceFile));
-    reloadBusConfiguration();
+    service.comeBack();
     QVERIFY(stores(true));
     QVERIFY(m_user->isOn());
     takeFailedWrites();
+}
+
+void TestDconfFaults::moveIsNotStored()
+{
+    if (m_user->key != actionsKey) {
+        return; // The other types order nothing.
+    }
+    const QString other = actionPath + QStringLiteral(".conf");
+    const QStringList paths = {actionPath, other};
+    Files::write(other, "title=torch\n");
+    Change change(actionsKey);
+    DconfTool::write(actionsKey, paths);
+    QVERIFY(change.hasCome());
+    QuickActionsModel model;
+    model.componentComplete();
+
+    // If the write failed at once, the row would return to its old place.
+    signalService(SIGSTOP);
+    model.move(0, 1);
+    QVERIFY(change.hasCome());
+    AbsentService service;
+    QVERIFY(aWriteFails());
+    QVERIFY(change.hasCome());
+    QCOMPARE(MGConfItem(actionsKey).value().toStringList(), paths);
+    // As when another process changes the order.
+    QCOMPARE(model.count(), 2);
+    QCOMPARE(model.get(0).value(QStringLiteral("path")).toString(), other);
+    service.comeBack();
+    DconfTool::waitUntilStored();
+    takeFailedWrites();
+    Files::remove(other);
 }
 
 void TestDconfFaults::everyOtherType()

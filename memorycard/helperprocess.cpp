@@ -22,8 +22,9 @@ namespace {
 
 constexpr QLatin1String program = "/usr/libexec/sdcardhelper"_L1;
 
-// In bytes. A warning has no more of the standard error.
 constexpr const char *noProcess = "no process can be started";
+
+// In bytes. A warning has no more of the standard error.
 constexpr std::size_t maxErrorLine = 200;
 
 } // namespace
